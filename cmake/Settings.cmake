@@ -1,0 +1,45 @@
+# Compiler settings that every target of ours shares, and the shape of the staged tree.
+include(GNUInstallDirs)
+
+set(CMAKE_CXX_STANDARD 17)
+set(CMAKE_CXX_STANDARD_REQUIRED ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+set(CMAKE_C_STANDARD 11)
+set(CMAKE_C_EXTENSIONS OFF)
+set(CMAKE_POSITION_INDEPENDENT_CODE ON)
+set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
+set(THREADS_PREFER_PTHREAD_FLAG ON)
+find_package(Threads REQUIRED)
+
+if(NOT CMAKE_BUILD_TYPE)
+  set(CMAKE_BUILD_TYPE RelWithDebInfo CACHE STRING "" FORCE)
+endif()
+
+find_program(VRX_CCACHE ccache)
+if(VRX_CCACHE AND NOT CMAKE_CXX_COMPILER_LAUNCHER)
+  set(CMAKE_C_COMPILER_LAUNCHER ${VRX_CCACHE})
+  set(CMAKE_CXX_COMPILER_LAUNCHER ${VRX_CCACHE})
+endif()
+
+# Warnings are errors in our own code; link against vrx_warnings (PRIVATE) to get them.
+add_library(vrx_warnings INTERFACE)
+target_compile_options(vrx_warnings INTERFACE
+  -Wall -Wextra -Werror -Wshadow -Wconversion -Wformat=2
+  $<$<COMPILE_LANGUAGE:CXX>:-Wnon-virtual-dtor -Woverloaded-virtual -Wold-style-cast>)
+target_compile_definitions(vrx_warnings INTERFACE _GNU_SOURCE)
+
+# A library or program of ours: warnings on, undefined symbols are link errors
+# (sanitizer runtimes live in the executable, so not under a sanitizer).
+add_library(vrx_strict_link INTERFACE)
+if(NOT CMAKE_CXX_FLAGS MATCHES "-fsanitize")
+  target_link_options(vrx_strict_link INTERFACE -Wl,-z,defs)
+endif()
+
+# The deployed tree R: R/vrxhost, R/lib*.so, R/pegasus/{bin,lib,provider,pegSchema}.
+set(VRX_DEST_ROOT .)
+set(VRX_DEST_PEGASUS pegasus)
+set(VRX_DEST_PEGASUS_BIN pegasus/bin)
+set(VRX_DEST_PEGASUS_LIB pegasus/lib)
+set(VRX_DEST_PROVIDER pegasus/provider)
+set(VRX_DEST_SCHEMA pegasus/pegSchema)
+set(CMAKE_BUILD_WITH_INSTALL_RPATH OFF)
