@@ -1,0 +1,45 @@
+#pragma once
+
+#include <cstddef>
+#include <stdexcept>
+#include <string>
+
+namespace Pegasus::mof {
+
+/// A place in a source text; lines and columns count from 1, columns in bytes.
+struct SourcePlace
+{
+    std::string file;
+    std::size_t line = 1;
+    std::size_t column = 1;
+    std::string lineText; ///< the whole line, for the caret; empty where none can be shown
+
+    /// "file:line:column"
+    std::string text() const;
+};
+
+/// What stopped a compilation, and where.
+class MofError : public std::runtime_error
+{
+  public:
+    MofError(SourcePlace place, const std::string& cause);
+
+    const SourcePlace& place() const noexcept { return fPlace; }
+    const std::string& cause() const noexcept { return fCause; }
+
+    /// "file:line:column: error: cause", the line, and a caret below the column; ends with a newline.
+    std::string diagnostic() const;
+
+  private:
+    SourcePlace fPlace;
+    std::string fCause;
+};
+
+/// A source file that could not be opened or read.
+class FileError : public std::runtime_error
+{
+  public:
+    using std::runtime_error::runtime_error;
+};
+
+} // namespace Pegasus::mof
