@@ -1,0 +1,13 @@
+# pegasus::client from an installed OpenPegasus under PEGASUS_ROOT: the same target that the embedded stack defines.
+find_path(PEGASUS_INCLUDE_DIR Pegasus/Client/CIMClient.h
+  HINTS ${PEGASUS_ROOT}/include ${PEGASUS_ROOT}/src ${PEGASUS_ROOT} NO_DEFAULT_PATH REQUIRED)
+foreach(library pegclient pegcommon)
+  find_library(PEGASUS_${library}_LIBRARY ${library}
+    HINTS ${PEGASUS_ROOT}/lib ${PEGASUS_ROOT}/lib64 ${PEGASUS_ROOT}/lib/x86_64-linux-gnu NO_DEFAULT_PATH REQUIRED)
+endforeach()
+
+add_library(pegasus_client INTERFACE)
+add_library(pegasus::client ALIAS pegasus_client)
+target_include_directories(pegasus_client SYSTEM INTERFACE ${PEGASUS_INCLUDE_DIR})
+target_compile_definitions(pegasus_client INTERFACE PEGASUS_PLATFORM_LINUX_X86_64_GNU)
+target_link_libraries(pegasus_client INTERFACE ${PEGASUS_pegclient_LIBRARY} ${PEGASUS_pegcommon_LIBRARY})

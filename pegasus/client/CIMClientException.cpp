@@ -1,0 +1,1 @@
+#include <Pegasus/Client/CIMClientException.h>

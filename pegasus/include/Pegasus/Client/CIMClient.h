@@ -1,0 +1,91 @@
+#ifndef Pegasus_CIMClient_h
+#define Pegasus_CIMClient_h
+
+#include <Pegasus/Client/CIMClientException.h>
+#include <Pegasus/Common/CIMClass.h>
+#include <Pegasus/Common/CIMInstance.h>
+#include <Pegasus/Common/CIMName.h>
+#include <Pegasus/Common/CIMObject.h>
+#include <Pegasus/Common/CIMObjectPath.h>
+#include <Pegasus/Common/CIMParamValue.h>
+#include <Pegasus/Common/CIMPropertyList.h>
+#include <Pegasus/Common/CIMQualifierDecl.h>
+#include <Pegasus/Common/CIMValue.h>
+#include <Pegasus/Common/Config.h>
+#include <Pegasus/Common/Exception.h>
+#include <Pegasus/Common/String.h>
+
+PEGASUS_NAMESPACE_BEGIN
+
+class CIMClientRep;
+
+/// A connection to a CIM server and its operations (CIM-XML over HTTP/1.1, DSP0200).
+///
+/// The connection is kept. When the server closes it, when a call runs out of time or an answer is broken, the client
+/// stays connected in name and opens a new one at the next operation.
+///
+/// Throws (operations): NotConnectedException; CannotConnectException (also on that reconnection);
+/// ConnectionTimeoutException; CIMClientMalformedHTTPException, CIMClientHTTPErrorException, CIMClientXmlException,
+/// CIMClientResponseException; CIMException with the server's status; InvalidNamespaceNameException (null namespace).
+/// Thread: one thread at a time for each client.
+/// Blocks: at most the time-out for each call, connecting, sending, waiting and reading together.
+class PEGASUS_CLIENT_LINKAGE CIMClient
+{
+  public:
+    CIMClient();
+    /// Disconnects.
+    ~CIMClient();
+    CIMClient(const CIMClient&) = delete;
+    CIMClient& operator=(const CIMClient&) = delete;
+
+    /// In milliseconds; at first 20000.
+    Uint32 getTimeout() const;
+    /// From the next call on. With 0 every operation ends at once with ConnectionTimeoutException.
+    void setTimeout(Uint32 timeoutMilliseconds);
+
+    /// Opens a TCP connection; user and password are only remembered. An empty host is the local machine, an empty host
+    /// with port 0 the local socket.
+    /// Throws: AlreadyConnectedException, CannotConnectException, InvalidLocatorException.
+    void connect(const String& host, const Uint32 portNumber, const String& userName, const String& password);
+    /// Connects to the private socket of the server whose tree is named by the environment's PEGASUS_HOME.
+    /// Throws: AlreadyConnectedException, CannotConnectException.
+    void connectLocal();
+    void disconnect();
+
+    CIMClass getClass(const CIMNamespaceName& nameSpace, const CIMName& className, Boolean localOnly = true,
+                      Boolean includeQualifiers = true, Boolean includeClassOrigin = false,
+                      const CIMPropertyList& propertyList = CIMPropertyList());
+    Array<CIMClass> enumerateClasses(const CIMNamespaceName& nameSpace, const CIMName& className = CIMName(),
+                                     Boolean deepInheritance = false, Boolean localOnly = true,
+                                     Boolean includeQualifiers = true, Boolean includeClassOrigin = false);
+    Array<CIMName> enumerateClassNames(const CIMNamespaceName& nameSpace, const CIMName& className = CIMName(),
+                                       Boolean deepInheritance = false);
+    void createClass(const CIMNamespaceName& nameSpace, const CIMClass& newClass);
+
+    CIMInstance getInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& instanceName,
+                            Boolean localOnly = true, Boolean includeQualifiers = false,
+                            Boolean includeClassOrigin = false,
+                            const CIMPropertyList& propertyList = CIMPropertyList());
+    Array<CIMInstance> enumerateInstances(const CIMNamespaceName& nameSpace, const CIMName& className,
+                                          Boolean deepInheritance = true, Boolean localOnly = true,
+                                          Boolean includeQualifiers = false, Boolean includeClassOrigin = false,
+                                          const CIMPropertyList& propertyList = CIMPropertyList());
+    Array<CIMObjectPath> enumerateInstanceNames(const CIMNamespaceName& nameSpace, const CIMName& className);
+    CIMObjectPath createInstance(const CIMNamespaceName& nameSpace, const CIMInstance& newInstance);
+
+    CIMQualifierDecl getQualifier(const CIMNamespaceName& nameSpace, const CIMName& qualifierName);
+    Array<CIMQualifierDecl> enumerateQualifiers(const CIMNamespaceName& nameSpace);
+    void setQualifier(const CIMNamespaceName& nameSpace, const CIMQualifierDecl& qualifierDeclaration);
+
+    /// The path's host and namespace are not used. `outParameters` is replaced.
+    CIMValue invokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPath& instanceName,
+                          const CIMName& methodName, const Array<CIMParamValue>& inParameters,
+                          Array<CIMParamValue>& outParameters);
+
+  private:
+    CIMClientRep* fRep;
+};
+
+PEGASUS_NAMESPACE_END
+
+#endif
