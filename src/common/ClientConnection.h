@@ -1,0 +1,60 @@
+#ifndef SRC_COMMON_CLIENTCONNECTION_H
+#define SRC_COMMON_CLIENTCONNECTION_H
+
+#include <memory>
+#include <string>
+
+namespace Pegasus {
+class CIMClient;
+}
+
+namespace NKOLVRX20 {
+
+// The log texts of a connection; all else about it is the same for every owner.
+struct TConnectionTexts
+{
+    const char* fCreationFailed;
+    const char* fEnter;
+    const char* fSucceeded;
+    const char* fFailed;
+};
+
+// The one way in which the plug-in makes and connects a CIM client.
+// Ownership: owns the client; it lives until the connection is destroyed.
+// Thread: one at a time.
+class TClientConnection
+{
+  public:
+    // The texts must outlive the connection.
+    explicit TClientConnection(const TConnectionTexts& texts);
+    ~TClientConnection();
+
+    TClientConnection(const TClientConnection&) = delete;
+    TClientConnection& operator=(const TClientConnection&) = delete;
+
+    // Makes the client unless there is one, and gives it the short time-out of an unconnected client.
+    // Throws: TVRXException 42.
+    void Init();
+
+    // Connects, with three tries and a pause of one second after each failure; nothing happens when connected.
+    // From then on an operation waits as long as its own time-out says, for hours if nobody sets one.
+    // Requires: Init.
+    // Throws: TVRXException 42 after the third failure.
+    // Blocks: while the server accepts no connection, and the pauses.
+    void Connect(const std::string& host, unsigned short port, const std::string& user, const std::string& password);
+
+    // Returns: true once a Connect has succeeded, also when the server has gone since.
+    bool IsConnected() const { return fConnected; }
+
+    // Returns: the client; null before Init.
+    Pegasus::CIMClient* GetClient() const { return fClient.get(); }
+
+  private:
+    const TConnectionTexts& fTexts;
+    std::unique_ptr<Pegasus::CIMClient> fClient;
+    bool fConnected = false;
+};
+
+} // namespace NKOLVRX20
+
+#endif

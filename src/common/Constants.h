@@ -1,0 +1,24 @@
+// Texts that several concerns of the plug-in share.
+#ifndef SRC_COMMON_CONSTANTS_H
+#define SRC_COMMON_CONSTANTS_H
+
+#include <string>
+
+namespace NKOLVRX20 {
+
+// The default time-out, in seconds.
+inline const std::string strTimeout = "60";
+
+// The one CIM namespace that the plug-in offers; also the server namespace of a class that names none.
+inline const std::string kDefaultCimNamespace = "root/cimv2";
+
+// The pseudo-class above every class without a superclass.
+inline const std::string kRootClassName = "<root>";
+
+// Context keys that name a class's server namespace and its time-out in seconds; both hold strings.
+inline const std::string kNspKey = "nsp";
+inline const std::string kTimeoutKey = "timeout";
+
+} // namespace NKOLVRX20
+
+#endif

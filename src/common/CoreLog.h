@@ -1,0 +1,49 @@
+// Entries of the host's core log, put together with a string stream in the "C" locale.
+#ifndef SRC_COMMON_CORELOG_H
+#define SRC_COMMON_CORELOG_H
+
+#include <locale>
+#include <sstream>
+#include <string>
+
+#include <host/ILogger.h>
+
+namespace Pegasus {
+class String;
+}
+
+namespace NKOLVRX20 {
+
+// Returns: the text in UTF-8. (The stream operator of Pegasus::String does not write UTF-8.)
+std::string ToStdString(const Pegasus::String& text);
+
+void WriteCoreLog(ILogger::EVRXLogSeverity severity, const std::string& text);
+
+// Returns: the parts written one after the other; numbers in plain decimal whatever the host's locale is.
+template <typename... TParts> std::string JoinText(const TParts&... parts)
+{
+    std::ostringstream text;
+    text.imbue(std::locale::classic());
+    (text << ... << parts);
+    return text.str();
+}
+
+// A failure: severity 0.
+template <typename... TParts> void LogFailure(const TParts&... parts)
+{
+    WriteCoreLog(ILogger::kError, JoinText(parts...));
+}
+
+// Progress, or the output of a program: severity 3.
+template <typename... TParts> void LogProgress(const TParts&... parts)
+{
+    WriteCoreLog(ILogger::kInfo, JoinText(parts...));
+}
+
+// To be called inside a catch block. Returns: what the exception in flight says, of whichever family it is.
+// Throws: nothing but std::bad_alloc.
+std::string DescribeCurrentException();
+
+} // namespace NKOLVRX20
+
+#endif

@@ -1,0 +1,104 @@
+#ifndef SRC_PROVIDER_TPEGASUSPROVIDER_H
+#define SRC_PROVIDER_TPEGASUSPROVIDER_H
+
+#include <string>
+#include <vector>
+
+#include <boost/shared_ptr.hpp>
+
+#include <Pegasus/Client/CIMClient.h>
+#include <host/IProvider.h>
+#include <host/TProviderInfo.h>
+
+#include "src/common/ClientConnection.h"
+
+// CMPI's own names for a broker and a call context.
+struct _CMPIBroker;
+struct _CMPIContext;
+
+namespace NKOLVRX20 {
+
+// One vendor provider: what its requested-class file says, the classes that were fetched for it, and a client of its
+// own.
+// Ownership: shared by the namespace's list, the classes bound to it, and the host.
+// Thread: one at a time.
+class TPEGASUSProvider : public IProvider
+{
+  public:
+    TPEGASUSProvider();
+    ~TPEGASUSProvider() override;
+
+    std::string GetName(TCIMContext context) const override;
+    // Returns: "lib" and the name.
+    std::string GetModuleName(TCIMContext context) const override;
+    std::string GetDescription(TCIMContext context) const override;
+    // Throws: TVRXException 31, always.
+    boost::shared_ptr<ICIMNamespace> GetNamespace(TCIMContext context) const override;
+    // Visits the collected classes in request order, without those tagged "CDM" and those whose qualifier
+    // "DONTCOLLECT" is true. The visitor's result does not count; a TVRXException costs only its own class.
+    void EnumerateClassesProvided(TClassVisitor visitor, TCIMContext context) override;
+    // Copies nothing.
+    IProvider& operator=(const IProvider& other) override;
+
+    // Creates the client and connects it, as the namespace does.
+    void initPegasusClient();
+    void connectPegasusClient(const std::string& host, unsigned short port, const std::string& user,
+                              const std::string& password);
+    // Returns: the client; null before initPegasusClient. Ownership: the provider's.
+    Pegasus::CIMClient* getPegClient() const { return fConnection.GetClient(); }
+    // Returns: the namespace name as the client library wants it.
+    // Throws: Pegasus::InvalidNamespaceNameException when the requested-class file gave none or a bad one.
+    Pegasus::CIMNamespaceName GetPegNamespace() const;
+    bool isConnected() const { return fConnection.IsConnected(); }
+
+    // Returns: whether a class of exactly this name, case included, was collected.
+    bool IsClassesProvided(const std::string& className) const;
+
+    // Kept for the host's callers; do nothing.
+    void Initialize(const _CMPIBroker* broker, const _CMPIContext* context);
+    void AddPluginToClass();
+
+    void SetType(std::string type);
+    void SetPath(std::string path);
+    void SetName(std::string name);
+    void SetDescription(std::string description);
+    void SetModuleName(std::string moduleName);
+    void SetNameSpaceName(std::string nameSpaceName);
+    void SetDefaultTimeoutVal(std::string& seconds);
+    void SetClassVector(std::vector<std::string>& entries);
+    void SetCollectedClasses(std::vector<boost::shared_ptr<ICIMClass>> classes);
+    void SetDiagnosticOnly(bool diagnosticOnly);
+
+    const std::string& GetType() const { return fType; }
+    // Returns: the full path of the requested-class file; the provider's identity.
+    const std::string& GetPath() const { return fPath; }
+    // Returns: the server namespace of the provider's classes, for instance "root/cimv2"; possibly empty.
+    const std::string& GetNameSpaceName(const TCIMContext& context) const;
+    const std::string& GetDefaultTimeoutVal() const { return fDefaultTimeout; }
+    // Returns: the requested entries as the file has them, time-outs and tags included.
+    std::vector<std::string> GetClassVector() const { return fRequestedClasses; }
+    const std::vector<boost::shared_ptr<ICIMClass>>& GetCollectedClasses() const { return fCollectedClasses; }
+    bool GetDiagnosticOnly() const { return fDiagnosticOnly; }
+    boost::shared_ptr<TProviderInfo> GetProviderInfo() const { return fProviderInfo; }
+    // Returns: false; nothing initialises a provider by way of CMPI.
+    bool IsInitialized() const { return fInitialized; }
+
+  private:
+    std::string fType;
+    std::string fPath;
+    std::string fName;
+    std::string fDescription;
+    std::string fModuleName;
+    std::string fNameSpaceName;
+    std::string fDefaultTimeout;
+    std::vector<std::string> fRequestedClasses;
+    std::vector<boost::shared_ptr<ICIMClass>> fCollectedClasses;
+    bool fDiagnosticOnly = false;
+    boost::shared_ptr<TProviderInfo> fProviderInfo;
+    bool fInitialized = false;
+    TClientConnection fConnection;
+};
+
+} // namespace NKOLVRX20
+
+#endif
