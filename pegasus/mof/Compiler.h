@@ -1,7 +1,7 @@
 #pragma once
 
-#include <mof/DefinitionHandler.h>
-#include <mof/MofError.h>
+#include "pegasus/mof/DefinitionHandler.h"
+#include "pegasus/mof/MofError.h"
 
 #include <string>
 #include <vector>
@@ -14,7 +14,6 @@ struct Limits
     std::size_t fileBytes = 64u << 20;     ///< one source file
     std::size_t includeDepth = 32;         ///< files within files
     std::size_t includeCount = 20000;      ///< files read by one compilation
-    std::size_t nestingDepth = 32;         ///< instance values within instance values
     std::size_t tokenBytes = 4096;         ///< one name or number
     std::size_t stringBytes = 1u << 20;    ///< one string value, its adjacent literals joined
     std::size_t arrayElementCount = 65536; ///< one array initialiser

@@ -1,0 +1,126 @@
+#include "pegasus/mof/ClassParser.h"
+#include "pegasus/mof/DataType.h"
+#include "pegasus/mof/ValueBuilder.h"
+
+namespace Pegasus::mof {
+
+namespace {
+
+std::string utf8(const CIMName& name)
+{
+    return std::string(name.getString().getCString());
+}
+
+} // namespace
+
+ParsedClass ClassParser::parse(const Qualifiers& qualifiers)
+{
+    ParsedClass parsed;
+    const CIMName name = parseName(fCursor, "a class name");
+    if (fCursor.skipWord("as"))
+        parsed.alias = fCursor.expect(TokenKind::Alias, "an alias").text;
+    CIMName superClass;
+    if (fCursor.skipPunctuation(':'))
+        superClass = parseName(fCursor, "a superclass name");
+
+    parsed.itsClass = CIMClass(name, superClass);
+    addQualifiers(parsed.itsClass, qualifiers);
+    fCursor.expectPunctuation('{');
+    while (!fCursor.skipPunctuation('}'))
+        parseFeature(parsed.itsClass);
+    fCursor.expectPunctuation(';');
+    return parsed;
+}
+
+void ClassParser::parseFeature(CIMClass& owner)
+{
+    checkMemberCount(owner.getPropertyCount() + owner.getMethodCount());
+    const Qualifiers qualifiers = fQualifiers.parseList();
+    CIMName referenceClass;
+    const ValueType type = parseElementType(fCursor, referenceClass);
+    const std::size_t offset = fCursor.current().offset;
+    const CIMName name = parseName(fCursor, "a property or method name");
+    if (fCursor.atPunctuation('(')) {
+        if (type.type == CIMTYPE_REFERENCE)
+            fCursor.failAt(offset, "a method cannot return a reference");
+        CIMMethod method = parseMethod(name, type.type);
+        addQualifiers(method, qualifiers);
+        addMethod(owner, method, offset);
+    } else {
+        CIMProperty property = parseProperty(name, type, referenceClass);
+        addQualifiers(property, qualifiers);
+        addProperty(owner, property, offset);
+    }
+}
+
+CIMProperty ClassParser::parseProperty(const CIMName& name, ValueType type, const CIMName& referenceClass)
+{
+    const std::size_t suffix = fCursor.current().offset;
+    parseArraySuffix(fCursor, type);
+    if (type.isArray && type.type == CIMTYPE_REFERENCE)
+        fCursor.failAt(suffix, "a reference property cannot be an array");
+    CIMValue value(type.type, type.isArray, type.arraySize);
+    if (fCursor.skipPunctuation('='))
+        value = buildValue(fCursor, fSession.aliases, parseInitializer(fCursor), type);
+    fCursor.expectPunctuation(';');
+    return CIMProperty(name, value, type.arraySize, referenceClass);
+}
+
+CIMMethod ClassParser::parseMethod(const CIMName& name, CIMType type)
+{
+    CIMMethod method(name, type);
+    fCursor.expectPunctuation('(');
+    if (!fCursor.skipPunctuation(')')) {
+        do {
+            checkMemberCount(method.getParameterCount());
+            const std::size_t offset = fCursor.current().offset;
+            const CIMParameter parameter = parseParameter();
+            if (method.findParameter(parameter.getName()) != PEG_NOT_FOUND)
+                fCursor.failAt(offset, "parameter " + utf8(parameter.getName()) + " is given twice");
+            method.addParameter(parameter);
+        } while (fCursor.skipPunctuation(','));
+        fCursor.expectPunctuation(')');
+    }
+    fCursor.expectPunctuation(';');
+    return method;
+}
+
+CIMParameter ClassParser::parseParameter()
+{
+    const Qualifiers qualifiers = fQualifiers.parseList();
+    CIMName referenceClass;
+    ValueType type = parseElementType(fCursor, referenceClass);
+    const CIMName name = parseName(fCursor, "a parameter name");
+    parseArraySuffix(fCursor, type);
+    if (fCursor.atPunctuation('='))
+        fCursor.fail("a parameter cannot have a default value");
+    CIMParameter parameter(name, type.type, type.isArray, type.arraySize, referenceClass);
+    addQualifiers(parameter, qualifiers);
+    return parameter;
+}
+
+/// A second property of one name is left out, as OpenPegasus's compiler does.
+void ClassParser::addProperty(CIMClass& owner, const CIMProperty& property, std::size_t offset)
+{
+    if (owner.findProperty(property.getName()) == PEG_NOT_FOUND)
+        owner.addProperty(property);
+    else
+        fSession.handler.warn(fCursor.place(offset).text(), "Property " + utf8(property.getName()) +
+                                                                " already exists in class " +
+                                                                utf8(owner.getClassName()));
+}
+
+void ClassParser::addMethod(CIMClass& owner, const CIMMethod& method, std::size_t offset)
+{
+    if (owner.findMethod(method.getName()) != PEG_NOT_FOUND)
+        fCursor.failAt(offset, "method " + utf8(method.getName()) + " is given twice");
+    owner.addMethod(method);
+}
+
+void ClassParser::checkMemberCount(std::size_t count)
+{
+    if (count >= fCursor.limits().memberCount)
+        fCursor.fail("more members than the limit memberCount (" + std::to_string(fCursor.limits().memberCount) + ")");
+}
+
+} // namespace Pegasus::mof

@@ -1,0 +1,46 @@
+#pragma once
+
+#include "pegasus/mof/QualifierParser.h"
+#include "pegasus/mof/ValueBuilder.h"
+
+#include <Pegasus/Common/CIMClass.h>
+#include <Pegasus/Common/CIMMethod.h>
+#include <Pegasus/Common/CIMParameter.h>
+#include <Pegasus/Common/CIMProperty.h>
+
+namespace Pegasus::mof {
+
+/// A class and the alias that its declaration gave it, if any.
+struct ParsedClass
+{
+    CIMClass itsClass;
+    std::string alias;
+};
+
+/// Parses classes, associations and indications: they differ in their qualifiers only. Throws MofError.
+class ClassParser
+{
+  public:
+    ClassParser(TokenCursor& cursor, Session& session)
+        : fCursor(cursor), fSession(session), fQualifiers(cursor, session)
+    {
+    }
+
+    /// The text behind the word "class", up to and with the semicolon.
+    ParsedClass parse(const Qualifiers& qualifiers);
+
+  private:
+    void parseFeature(CIMClass& owner);
+    CIMProperty parseProperty(const CIMName& name, ValueType type, const CIMName& referenceClass);
+    CIMMethod parseMethod(const CIMName& name, CIMType type);
+    CIMParameter parseParameter();
+    void addProperty(CIMClass& owner, const CIMProperty& property, std::size_t offset);
+    void addMethod(CIMClass& owner, const CIMMethod& method, std::size_t offset);
+    void checkMemberCount(std::size_t count);
+
+    TokenCursor& fCursor;
+    Session& fSession;
+    QualifierParser fQualifiers;
+};
+
+} // namespace Pegasus::mof

@@ -1,0 +1,176 @@
+#include "pegasus/mof/FileCompiler.h"
+#include "pegasus/mof/ClassParser.h"
+#include "pegasus/mof/IncludeSearch.h"
+#include "pegasus/mof/InstanceParser.h"
+#include "pegasus/mof/ValueBuilder.h"
+
+#include <Pegasus/Common/Exception.h>
+
+namespace Pegasus::mof {
+
+namespace {
+
+std::string utf8(const String& text)
+{
+    return std::string(text.getCString());
+}
+
+template <class T> bool qualifierValue(const CIMConstClass& owner, const char* name, T& value)
+{
+    const Uint32 index = owner.findQualifier(CIMName(name));
+    if (index == PEG_NOT_FOUND)
+        return false;
+    const CIMValue held = owner.getQualifier(index).getValue();
+    if (held.isNull() || !held.typeCompatible(CIMValue(value)))
+        return false;
+    held.get(value);
+    return true;
+}
+
+/// m.n.u, digits all (DSP0004, Version)
+bool isVersion(const std::string& text)
+{
+    std::size_t at = 0;
+    for (int part = 0; part < 3; ++part) {
+        const std::size_t digits = text.find_first_not_of("0123456789", at);
+        const std::size_t end = digits == std::string::npos ? text.size() : digits;
+        if (end == at || (part < 2 ? end == text.size() || text[end] != '.' : end != text.size()))
+            return false;
+        at = end + 1;
+    }
+    return true;
+}
+
+} // namespace
+
+FileCompiler::FileCompiler(const SourceText& source, Session& session)
+    : fSource(source), fSession(session), fCursor(source, session.options.limits)
+{
+}
+
+void FileCompiler::run()
+{
+    while (fCursor.current().kind != TokenKind::End) {
+        fSubject = fCursor.current().offset;
+        try {
+            definition();
+        } catch (const Exception& error) {
+            fCursor.failAt(fSubject, utf8(error.getMessage()));
+        }
+    }
+}
+
+void FileCompiler::definition()
+{
+    if (fCursor.current().kind == TokenKind::Pragma) {
+        obeyPragma();
+        return;
+    }
+    const Qualifiers qualifiers = QualifierParser(fCursor, fSession).parseList();
+    if (fCursor.skipWord("class"))
+        defineClass(qualifiers);
+    else if (fCursor.skipWord("instance"))
+        defineInstance();
+    else if (fCursor.skipWord("qualifier"))
+        defineQualifier(qualifiers);
+    else
+        fCursor.failExpected("a class, an instance, a qualifier declaration or a pragma");
+}
+
+void FileCompiler::defineClass(const Qualifiers& qualifiers)
+{
+    fSubject = fCursor.current().offset;
+    const ParsedClass parsed = ClassParser(fCursor, fSession).parse(qualifiers);
+    const CIMName name = parsed.itsClass.getClassName();
+    if (isWelcome(parsed.itsClass))
+        fSession.handler.createClass(parsed.itsClass);
+    if (!parsed.alias.empty() &&
+        !fSession.aliases.define(parsed.alias, CIMObjectPath(String(), CIMNamespaceName(), name)))
+        fCursor.failAt(fSubject, "alias $" + parsed.alias + " is already defined");
+}
+
+/// Classes with a true Experimental or a malformed Version are left out with a warning, as OpenPegasus's compiler does.
+bool FileCompiler::isWelcome(const CIMClass& newClass)
+{
+    const std::string start = "Class " + utf8(newClass.getClassName().getString()) + " was not added or updated: ";
+    Boolean isExperimental = false;
+    if (!fSession.options.allowExperimental && qualifierValue(newClass, "Experimental", isExperimental) &&
+        isExperimental) {
+        warn(start + "Experimental update not allowed (set appropriate compiler option)");
+        return false;
+    }
+    String version;
+    if (qualifierValue(newClass, "Version", version) && !isVersion(utf8(version))) {
+        warn(start + "Invalid version format in mof class or repository class (valid format is m.n.u)");
+        return false;
+    }
+    return true;
+}
+
+void FileCompiler::defineInstance()
+{
+    fSession.instances.submit(InstanceParser(fCursor, fSession).parse());
+}
+
+void FileCompiler::defineQualifier(const Qualifiers& qualifiers)
+{
+    if (!qualifiers.empty())
+        fCursor.failAt(fSubject, "a qualifier declaration cannot have qualifiers");
+    fSubject = fCursor.current().offset;
+    fSession.handler.declareQualifier(QualifierParser(fCursor, fSession).parseDeclaration());
+}
+
+void FileCompiler::obeyPragma()
+{
+    fCursor.take();
+    const Token name = fCursor.expect(TokenKind::Identifier, "a pragma name");
+    fCursor.expectPunctuation('(');
+    const Token parameter = fCursor.expect(TokenKind::String, "a string");
+    fSubject = parameter.offset;
+    fCursor.expectPunctuation(')');
+    if (name.isWord("include"))
+        include(parameter.text);
+    else if (name.isWord("namespace"))
+        changeNamespace(parameter.text);
+    else if (!name.isWord("locale") && !name.isWord("instancelocale"))
+        warn("Pragma \"" + name.text + "\" not implemented by the compiler. Ignored");
+}
+
+void FileCompiler::include(const std::string& name)
+{
+    const Limits& limits = fSession.options.limits;
+    if (fSession.includeDepth == limits.includeDepth)
+        fCursor.failAt(fSubject, "include is nested deeper than the limit includeDepth (" +
+                                     std::to_string(limits.includeDepth) + ")");
+    if (++fSession.includeCount > limits.includeCount)
+        fCursor.failAt(fSubject,
+                       "more includes than the limit includeCount (" + std::to_string(limits.includeCount) + ")");
+    const std::string path = findInclude(name, fSource.directory(), fSession.options.includeDirectories);
+    if (path.empty())
+        fCursor.failAt(fSubject, "Could not open include file " + name);
+    try {
+        const SourceText source = SourceText::read(path, limits.fileBytes);
+        ++fSession.includeDepth;
+        FileCompiler(source, fSession).run();
+        --fSession.includeDepth;
+    } catch (const FileError& error) {
+        fCursor.failAt(fSubject, error.what());
+    }
+}
+
+void FileCompiler::changeNamespace(const std::string& name)
+{
+    if (!CIMNamespaceName::legal(cimString(fCursor, name, fSubject))) {
+        warn("Pragma \"namespace\": " + name + " is not a namespace name. Ignored");
+        return;
+    }
+    fSession.nameSpace = CIMNamespaceName(name.c_str());
+    fSession.handler.useNamespace(fSession.nameSpace);
+}
+
+void FileCompiler::warn(const std::string& text)
+{
+    fSession.handler.warn(fCursor.place(fSubject).text(), text);
+}
+
+} // namespace Pegasus::mof

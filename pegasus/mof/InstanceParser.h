@@ -1,0 +1,29 @@
+#pragma once
+
+#include "pegasus/mof/QualifierParser.h"
+
+namespace Pegasus::mof {
+
+/// Parses instances; the types of their values come from their classes. Throws MofError.
+class InstanceParser
+{
+  public:
+    InstanceParser(TokenCursor& cursor, Session& session)
+        : fCursor(cursor), fSession(session), fQualifiers(cursor, session)
+    {
+    }
+
+    /// The text behind the word "instance", up to and with the semicolon.
+    ParsedInstance parse();
+
+  private:
+    CIMClass parseClass();
+    void parseValue(ParsedInstance& parsed);
+    void setValue(ParsedInstance& parsed, const CIMConstProperty& declared);
+
+    TokenCursor& fCursor;
+    Session& fSession;
+    QualifierParser fQualifiers;
+};
+
+} // namespace Pegasus::mof

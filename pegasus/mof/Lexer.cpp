@@ -1,0 +1,255 @@
+#include "pegasus/mof/Lexer.h"
+
+#include <cstdio>
+#include <cstring>
+
+namespace Pegasus::mof {
+
+namespace {
+
+constexpr char kByteOrderMark[] = "\xEF\xBB\xBF";
+
+bool isDigit(char c)
+{
+    return c >= '0' && c <= '9';
+}
+
+bool isHexDigit(char c)
+{
+    return isDigit(c) || (c >= 'a' && c <= 'f') || (c >= 'A' && c <= 'F');
+}
+
+bool startsName(char c)
+{
+    return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_';
+}
+
+bool continuesName(char c)
+{
+    return startsName(c) || isDigit(c);
+}
+
+bool isBlank(char c)
+{
+    return c == ' ' || c == '\t' || c == '\n' || c == '\r' || c == '\f' || c == '\v';
+}
+
+bool isPunctuation(char c)
+{
+    return c != '\0' && std::strchr("{}[](),;:=", c) != nullptr;
+}
+
+std::string shownByte(char c)
+{
+    char text[16];
+    if (c > ' ' && c < 0x7F)
+        std::snprintf(text, sizeof text, "'%c'", c);
+    else
+        std::snprintf(text, sizeof text, "byte 0x%02X", static_cast<unsigned char>(c));
+    return text;
+}
+
+/// A code unit as UTF-8. Each half of a surrogate pair takes three bytes; CIM strings put the halves together again.
+void appendCodeUnit(std::string& value, unsigned unit)
+{
+    if (unit < 0x80u) {
+        value += static_cast<char>(unit);
+        return;
+    }
+    if (unit < 0x800u) {
+        value += static_cast<char>(0xC0u | (unit >> 6));
+    } else {
+        value += static_cast<char>(0xE0u | (unit >> 12));
+        value += static_cast<char>(0x80u | ((unit >> 6) & 0x3Fu));
+    }
+    value += static_cast<char>(0x80u | (unit & 0x3Fu));
+}
+
+/// What a one-letter escape stands for, or NUL if it is none.
+char simpleEscape(char letter)
+{
+    switch (letter) {
+    case 'b':
+        return '\b';
+    case 't':
+        return '\t';
+    case 'n':
+        return '\n';
+    case 'f':
+        return '\f';
+    case 'r':
+        return '\r';
+    case '"':
+    case '\'':
+    case '\\':
+        return letter;
+    default:
+        return '\0';
+    }
+}
+
+} // namespace
+
+Lexer::Lexer(const SourceText& source, const Limits& limits) : fSource(source), fText(source.text()), fLimits(limits)
+{
+    if (fText.compare(0, 3, kByteOrderMark) == 0)
+        fAt = 3;
+}
+
+Token Lexer::next()
+{
+    skipBlanksAndComments();
+    if (atEnd())
+        return Token{TokenKind::End, "", fAt};
+    const char c = peek();
+    if (startsName(c))
+        return word(TokenKind::Identifier, fAt);
+    if (isDigit(c) || c == '+' || c == '-' || c == '.')
+        return number();
+    if (c == '"')
+        return strings();
+    if (c == '\'')
+        return character();
+    if (c == '$' && startsName(peek(1)))
+        return word(TokenKind::Alias, ++fAt - 1);
+    if (isPunctuation(c))
+        return Token{TokenKind::Punctuation, std::string(1, c), fAt++};
+    if (c == '#') {
+        Token directive = word(TokenKind::Pragma, ++fAt - 1);
+        if (toLower(directive.text) == "pragma")
+            return directive;
+        fail(directive.offset, "unknown directive '#" + directive.text + "'");
+    }
+    fail(fAt, "unexpected " + shownByte(c));
+}
+
+void Lexer::skipBlanksAndComments()
+{
+    for (;;) {
+        while (!atEnd() && isBlank(peek()))
+            ++fAt;
+        if (peek() == '/' && peek(1) == '/')
+            fAt = std::min(fText.find('\n', fAt), fText.size());
+        else if (peek() == '/' && peek(1) == '*')
+            skipBlockComment();
+        else
+            return;
+    }
+}
+
+void Lexer::skipBlockComment()
+{
+    const std::size_t end = fText.find("*/", fAt + 2);
+    if (end == std::string::npos)
+        fail(fAt, "comment is not closed");
+    fAt = end + 2;
+}
+
+Token Lexer::word(TokenKind kind, std::size_t start)
+{
+    const std::size_t first = fAt;
+    while (continuesName(peek()))
+        ++fAt;
+    if (fAt - first > fLimits.tokenBytes)
+        fail(start, "name is longer than the limit tokenBytes (" + std::to_string(fLimits.tokenBytes) + ")");
+    return Token{kind, fText.substr(first, fAt - first), start};
+}
+
+/// Takes everything that can belong to a number; whether it is one in which base is decided where its value is made.
+Token Lexer::number()
+{
+    const std::size_t start = fAt;
+    bool isReal = false;
+    if (peek() == '+' || peek() == '-')
+        ++fAt;
+    const bool isHex = peek() == '0' && (peek(1) == 'x' || peek(1) == 'X');
+    while (continuesName(peek()) || peek() == '.') {
+        const bool isExponent = !isHex && isReal && (peek() == 'e' || peek() == 'E');
+        isReal = isReal || peek() == '.';
+        ++fAt;
+        if (isExponent && (peek() == '+' || peek() == '-'))
+            ++fAt;
+    }
+    if (fAt - start > fLimits.tokenBytes)
+        fail(start, "number is longer than the limit tokenBytes (" + std::to_string(fLimits.tokenBytes) + ")");
+    return Token{isReal ? TokenKind::Real : TokenKind::Integer, fText.substr(start, fAt - start), start};
+}
+
+Token Lexer::strings()
+{
+    Token token{TokenKind::String, "", fAt};
+    do {
+        stringLiteral(token.text);
+        if (token.text.size() > fLimits.stringBytes)
+            fail(token.offset,
+                 "string is longer than the limit stringBytes (" + std::to_string(fLimits.stringBytes) + ")");
+        skipBlanksAndComments();
+    } while (peek() == '"');
+    return token;
+}
+
+void Lexer::stringLiteral(std::string& value)
+{
+    const std::size_t start = fAt++;
+    for (;;) {
+        const std::size_t plainEnd = std::min(fText.find_first_of("\"\\\n", fAt), fText.size());
+        value.append(fText, fAt, plainEnd - fAt);
+        fAt = plainEnd;
+        if (atEnd() || peek() == '\n')
+            fail(start, "string is not closed on its line");
+        if (peek() == '"')
+            break;
+        escape(value);
+    }
+    ++fAt;
+}
+
+void Lexer::escape(std::string& value)
+{
+    const char letter = peek(1);
+    if (letter == 'x' || letter == 'X') {
+        hexEscape(value);
+        return;
+    }
+    const char meaning = simpleEscape(letter);
+    if (meaning == '\0')
+        fail(fAt, "unknown escape sequence \\" + std::string(letter == '\0' ? "" : std::string(1, letter)));
+    value += meaning;
+    fAt += 2;
+}
+
+void Lexer::hexEscape(std::string& value)
+{
+    const std::size_t start = fAt;
+    fAt += 2;
+    unsigned unit = 0;
+    std::size_t digitCount = 0;
+    for (; digitCount < 4 && isHexDigit(peek()); ++digitCount, ++fAt)
+        unit = unit * 16 + static_cast<unsigned>(std::stoi(std::string(1, peek()), nullptr, 16));
+    if (digitCount == 0)
+        fail(start, "\\x needs one to four hexadecimal digits");
+    if (unit == 0)
+        fail(start, "\\x0 is not a character");
+    appendCodeUnit(value, unit);
+}
+
+Token Lexer::character()
+{
+    Token token{TokenKind::Character, "", fAt++};
+    while (!atEnd() && peek() != '\'' && peek() != '\n') {
+        if (peek() == '\\')
+            escape(token.text);
+        else
+            token.text += fText[fAt++];
+        if (token.text.size() > 4)
+            break;
+    }
+    if (peek() != '\'')
+        fail(token.offset, "character literal is not closed after one character");
+    ++fAt;
+    if (token.text.empty())
+        fail(token.offset, "character literal is empty");
+    return token;
+}
+
+} // namespace Pegasus::mof

@@ -1,0 +1,41 @@
+#pragma once
+
+#include "pegasus/mof/Compiler.h"
+#include "pegasus/mof/SourceText.h"
+#include "pegasus/mof/Token.h"
+
+namespace Pegasus::mof {
+
+/// Cuts a source text into tokens; blanks and comments go, adjacent string literals become one token.
+///
+/// Ownership: keeps references to the text and the limits.
+class Lexer
+{
+  public:
+    Lexer(const SourceText& source, const Limits& limits);
+
+    /// Throws MofError at the offending byte.
+    Token next();
+
+  private:
+    void skipBlanksAndComments();
+    void skipBlockComment();
+    Token word(TokenKind kind, std::size_t start);
+    Token number();
+    Token strings();
+    Token character();
+    void stringLiteral(std::string& value);
+    void escape(std::string& value);
+    void hexEscape(std::string& value);
+
+    bool atEnd() const noexcept { return fAt >= fText.size(); }
+    char peek(std::size_t ahead = 0) const noexcept { return fAt + ahead < fText.size() ? fText[fAt + ahead] : '\0'; }
+    [[noreturn]] void fail(std::size_t offset, const std::string& cause) const { fSource.fail(offset, cause); }
+
+    const SourceText& fSource;
+    const std::string& fText;
+    const Limits& fLimits;
+    std::size_t fAt = 0;
+};
+
+} // namespace Pegasus::mof

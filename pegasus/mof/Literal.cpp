@@ -1,0 +1,85 @@
+#include "pegasus/mof/Literal.h"
+
+namespace Pegasus::mof {
+
+namespace {
+
+Literal keywordLiteral(TokenCursor& cursor)
+{
+    const std::size_t offset = cursor.current().offset;
+    if (cursor.skipWord("null"))
+        return {Literal::Kind::Null, "", offset};
+    if (cursor.skipWord("true"))
+        return {Literal::Kind::Boolean, "true", offset};
+    if (cursor.skipWord("false"))
+        return {Literal::Kind::Boolean, "false", offset};
+    cursor.failExpected("a value");
+}
+
+} // namespace
+
+std::string Literal::shown() const
+{
+    switch (kind) {
+    case Kind::Null:
+        return "null";
+    case Kind::String:
+        return "a string";
+    case Kind::Character:
+        return "a character";
+    case Kind::Alias:
+        return "$" + text;
+    default:
+        return text;
+    }
+}
+
+Literal parseLiteral(TokenCursor& cursor)
+{
+    const auto literal = [&cursor](Literal::Kind kind) {
+        Token token = cursor.take();
+        return Literal{kind, std::move(token.text), token.offset};
+    };
+    switch (cursor.current().kind) {
+    case TokenKind::Integer:
+        return literal(Literal::Kind::Integer);
+    case TokenKind::Real:
+        return literal(Literal::Kind::Real);
+    case TokenKind::String:
+        return literal(Literal::Kind::String);
+    case TokenKind::Character:
+        return literal(Literal::Kind::Character);
+    case TokenKind::Alias:
+        return literal(Literal::Kind::Alias);
+    default:
+        return keywordLiteral(cursor);
+    }
+}
+
+Initializer parseArrayInitializer(TokenCursor& cursor)
+{
+    Initializer result;
+    result.isArray = true;
+    result.offset = cursor.current().offset;
+    cursor.expectPunctuation('{');
+    do {
+        if (result.elements.size() == cursor.limits().arrayElementCount)
+            cursor.fail("array has more elements than the limit arrayElementCount (" +
+                        std::to_string(cursor.limits().arrayElementCount) + ")");
+        result.elements.push_back(parseLiteral(cursor));
+    } while (cursor.skipPunctuation(','));
+    cursor.expectPunctuation('}');
+    return result;
+}
+
+Initializer parseInitializer(TokenCursor& cursor)
+{
+    if (cursor.atPunctuation('{'))
+        return parseArrayInitializer(cursor);
+    Initializer result;
+    result.offset = cursor.current().offset;
+    result.elements.push_back(parseLiteral(cursor));
+    return result;
+}
+
+} // namespace Pegasus::mof

@@ -1,0 +1,46 @@
+#pragma once
+
+#include "pegasus/mof/Session.h"
+#include "pegasus/mof/TokenCursor.h"
+
+#include <Pegasus/Common/CIMQualifier.h>
+#include <Pegasus/Common/CIMQualifierDecl.h>
+
+#include <vector>
+
+namespace Pegasus::mof {
+
+using Qualifiers = std::vector<CIMQualifier>;
+
+/// Parses uses and declarations of qualifiers. All functions throw MofError.
+class QualifierParser
+{
+  public:
+    QualifierParser(TokenCursor& cursor, Session& session) : fCursor(cursor), fSession(session) {}
+
+    /// A list in brackets, or nothing. A use without flavors of its own has the flavor NONE; its declaration decides.
+    Qualifiers parseList();
+    /// The text behind the word "qualifier", up to and with the semicolon.
+    CIMQualifierDecl parseDeclaration();
+
+  private:
+    CIMQualifier parseUse();
+    CIMQualifierDecl declarationOf(const Token& name);
+    CIMValue parseParameter(const CIMQualifierDecl& declaration);
+    CIMScope parseScopes();
+    CIMFlavor parseUseFlavors(CIMFlavor declared);
+    CIMFlavor parseDeclaredFlavors();
+    bool applyFlavorWord(CIMFlavor& flavor);
+
+    TokenCursor& fCursor;
+    Session& fSession;
+};
+
+/// Adds a parsed list to a class, property, method or parameter.
+template <class Owner> void addQualifiers(Owner& owner, const Qualifiers& qualifiers)
+{
+    for (const CIMQualifier& qualifier : qualifiers)
+        owner.addQualifier(qualifier);
+}
+
+} // namespace Pegasus::mof

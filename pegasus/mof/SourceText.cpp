@@ -1,0 +1,103 @@
+#include "pegasus/mof/SourceText.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <cstring>
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+namespace Pegasus::mof {
+
+namespace {
+
+/// Long lines are cut for the diagnostic: a megabyte on one line helps nobody.
+constexpr std::size_t kShownLineBytes = 240;
+
+class Descriptor
+{
+  public:
+    explicit Descriptor(const std::string& path) : fDescriptor(::open(path.c_str(), O_RDONLY | O_CLOEXEC)) {}
+    ~Descriptor()
+    {
+        if (fDescriptor >= 0)
+            ::close(fDescriptor);
+    }
+    Descriptor(const Descriptor&) = delete;
+    Descriptor& operator=(const Descriptor&) = delete;
+
+    int get() const noexcept { return fDescriptor; }
+
+  private:
+    int fDescriptor;
+};
+
+ssize_t readSome(int descriptor, char* buffer, std::size_t size)
+{
+    ssize_t count;
+    do
+        count = ::read(descriptor, buffer, size);
+    while (count < 0 && errno == EINTR);
+    return count;
+}
+
+std::string readAll(int descriptor, const std::string& path, std::size_t maxBytes)
+{
+    std::string text;
+    char buffer[65536];
+    for (;;) {
+        const ssize_t count = readSome(descriptor, buffer, sizeof buffer);
+        if (count < 0)
+            throw FileError("Can't read file " + path + ": " + std::strerror(errno));
+        if (count == 0)
+            return text;
+        text.append(buffer, static_cast<std::size_t>(count));
+        if (text.size() > maxBytes)
+            throw FileError("Can't read file " + path + ": larger than the limit fileBytes (" +
+                            std::to_string(maxBytes) + ")");
+    }
+}
+
+} // namespace
+
+SourceText SourceText::read(const std::string& path, std::size_t maxBytes)
+{
+    const Descriptor file(path);
+    struct stat status = {};
+    if (file.get() < 0 || ::fstat(file.get(), &status) != 0)
+        throw FileError("Can't open file " + path);
+    if (S_ISDIR(status.st_mode))
+        throw FileError("Can't read file " + path + ": it is a directory");
+    return SourceText(path, readAll(file.get(), path, maxBytes));
+}
+
+std::string SourceText::directory() const
+{
+    const std::size_t slash = fName.rfind('/');
+    return slash == std::string::npos ? std::string() : fName.substr(0, slash + 1);
+}
+
+SourcePlace SourceText::place(std::size_t offset) const
+{
+    offset = std::min(offset, fText.size());
+    const auto begin = fText.begin();
+    const auto at = begin + static_cast<std::ptrdiff_t>(offset);
+    const std::size_t lastBreak = offset == 0 ? std::string::npos : fText.rfind('\n', offset - 1);
+    const std::size_t lineStart = lastBreak == std::string::npos ? 0 : lastBreak + 1;
+    const std::size_t lineEnd = std::min(fText.find_first_of("\r\n", lineStart), fText.size());
+
+    SourcePlace place;
+    place.file = fName;
+    place.line = 1 + static_cast<std::size_t>(std::count(begin, at, '\n'));
+    place.column = 1 + offset - lineStart;
+    if (lineEnd - lineStart <= kShownLineBytes)
+        place.lineText = fText.substr(lineStart, lineEnd - lineStart);
+    return place;
+}
+
+void SourceText::fail(std::size_t offset, const std::string& cause) const
+{
+    throw MofError(place(offset), cause);
+}
+
+} // namespace Pegasus::mof

@@ -1,0 +1,32 @@
+#pragma once
+
+#include "pegasus/mof/MofError.h"
+
+#include <string>
+
+namespace Pegasus::mof {
+
+/// One source file in memory. Places in it are byte offsets until somebody has to read them.
+class SourceText
+{
+  public:
+    SourceText(std::string name, std::string text) : fName(std::move(name)), fText(std::move(text)) {}
+
+    /// Throws FileError ("Can't open file <path>", "Can't read file …", a file beyond maxBytes). Refuses anything but a
+    /// regular file or a pipe.
+    static SourceText read(const std::string& path, std::size_t maxBytes);
+
+    const std::string& name() const noexcept { return fName; }
+    const std::string& text() const noexcept { return fText; }
+    /// Up to and with the last slash of the name; empty for the current directory.
+    std::string directory() const;
+
+    SourcePlace place(std::size_t offset) const;
+    [[noreturn]] void fail(std::size_t offset, const std::string& cause) const;
+
+  private:
+    std::string fName;
+    std::string fText;
+};
+
+} // namespace Pegasus::mof

@@ -1,0 +1,44 @@
+#pragma once
+
+#include "pegasus/mof/Lexer.h"
+
+#include <string_view>
+
+namespace Pegasus::mof {
+
+/// A parser's view of a text: one token of look-ahead, and the ways to insist on the next one.
+/// A token is only cut when it is looked at, so that a fault behind a definition does not spoil the definition.
+class TokenCursor
+{
+  public:
+    TokenCursor(const SourceText& source, const Limits& limits);
+
+    const Token& current();
+    /// Returns the current token and moves on.
+    Token take();
+
+    bool atPunctuation(char sign) { return current().isPunctuation(sign); }
+    bool atWord(std::string_view lowerWord) { return current().isWord(lowerWord); }
+    /// Moves on and returns true if the current token is this one.
+    bool skipPunctuation(char sign);
+    bool skipWord(std::string_view lowerWord);
+
+    /// Throw MofError "expected … instead of …" at the current token unless it is of this kind.
+    void expectPunctuation(char sign);
+    Token expect(TokenKind kind, std::string_view what);
+
+    const Limits& limits() const noexcept { return fLimits; }
+    SourcePlace place(std::size_t offset) const { return fSource.place(offset); }
+    [[noreturn]] void fail(const std::string& cause) { fSource.fail(current().offset, cause); }
+    [[noreturn]] void failAt(std::size_t offset, const std::string& cause) const { fSource.fail(offset, cause); }
+    [[noreturn]] void failExpected(std::string_view what);
+
+  private:
+    const SourceText& fSource;
+    const Limits& fLimits;
+    Lexer fLexer;
+    Token fCurrent;
+    bool fIsCut = false; ///< fCurrent is the current token
+};
+
+} // namespace Pegasus::mof
