@@ -59,7 +59,7 @@ using InstanceSink = std::function<bool(const CIMInstance&)>;
 /// CIM_ERR_FAILED when the storage fails.
 ///
 /// Thread: all operations may be called from any thread at any time; they run one after the other.
-/// Ownership: classes that are given back share their parts with the cache: read them, clone() before changing one.
+/// Ownership: classes that are given back share their parts with the cache; clone() gives one to change.
 /// Blocks: for single file accesses only.
 class Repository
 {
@@ -84,12 +84,13 @@ class Repository
     std::vector<CIMQualifierDecl> enumerateQualifiers(const CIMNamespaceName& nameSpace) const;
     /// Creates the declaration. An existing one is replaced, except that one with another type or array form is kept
     /// silently (as OpenPegasus does).
-    void setQualifier(const CIMNamespaceName& nameSpace, const CIMQualifierDecl& declaration);
+    void setQualifier(const CIMNamespaceName& nameSpace, const CIMConstQualifierDecl& declaration);
     /// Throws CIM_ERR_NOT_FOUND.
     void deleteQualifier(const CIMNamespaceName& nameSpace, const CIMName& name);
 
     /// Throws CIM_ERR_NOT_FOUND.
-    CIMClass getClass(const CIMNamespaceName& nameSpace, const CIMName& className, const ClassOptions& options) const;
+    CIMConstClass getClass(const CIMNamespaceName& nameSpace, const CIMName& className,
+                           const ClassOptions& options) const;
     bool hasClass(const CIMNamespaceName& nameSpace, const CIMName& className) const;
     /// The null name if the class has none. Throws CIM_ERR_NOT_FOUND.
     CIMName superClass(const CIMNamespaceName& nameSpace, const CIMName& className) const;
@@ -97,15 +98,15 @@ class Repository
     /// Throws CIM_ERR_INVALID_CLASS.
     std::vector<CIMName> enumerateClassNames(const CIMNamespaceName& nameSpace, const CIMName& className,
                                              bool deepInheritance) const;
-    std::vector<CIMClass> enumerateClasses(const CIMNamespaceName& nameSpace, const CIMName& className,
-                                           bool deepInheritance, const ClassOptions& options) const;
+    std::vector<CIMConstClass> enumerateClasses(const CIMNamespaceName& nameSpace, const CIMName& className,
+                                                bool deepInheritance, const ClassOptions& options) const;
     /// Checks and stores a class. Qualifiers take the flavors of their declarations; a use may narrow them.
     /// Throws CIM_ERR_ALREADY_EXISTS, CIM_ERR_INVALID_SUPERCLASS, CIM_ERR_INVALID_PARAMETER and CIM_ERR_FAILED (rules
     /// of qualifiers, overriding, keys and references).
-    void createClass(const CIMNamespaceName& nameSpace, const CIMClass& newClass);
+    void createClass(const CIMNamespaceName& nameSpace, const CIMConstClass& newClass);
     /// Replaces a class that has neither subclasses nor instances, under the rules of createClass.
     /// Throws CIM_ERR_NOT_FOUND, CIM_ERR_CLASS_HAS_CHILDREN, CIM_ERR_CLASS_HAS_INSTANCES and createClass's codes.
-    void modifyClass(const CIMNamespaceName& nameSpace, const CIMClass& modifiedClass);
+    void modifyClass(const CIMNamespaceName& nameSpace, const CIMConstClass& modifiedClass);
     /// Throws CIM_ERR_NOT_FOUND, CIM_ERR_CLASS_HAS_CHILDREN, CIM_ERR_CLASS_HAS_INSTANCES.
     void deleteClass(const CIMNamespaceName& nameSpace, const CIMName& className);
 
@@ -113,13 +114,13 @@ class Repository
     /// Returns: its path, without host and namespace.
     /// Throws CIM_ERR_INVALID_CLASS, CIM_ERR_ALREADY_EXISTS (message: the path), CIM_ERR_FAILED ("no such property: X",
     /// "type mismatch", "class has no keys: X"), CIM_ERR_NOT_SUPPORTED for an abstract class.
-    CIMObjectPath createInstance(const CIMNamespaceName& nameSpace, const CIMInstance& newInstance);
+    CIMObjectPath createInstance(const CIMNamespaceName& nameSpace, const CIMConstInstance& newInstance);
     /// Throws CIM_ERR_INVALID_CLASS, CIM_ERR_NOT_FOUND (message: the path).
     CIMInstance getInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path,
                             const InstanceOptions& options) const;
     /// Replaces the values of the given properties (all of modified, or those that the list names).
     /// Throws CIM_ERR_INVALID_CLASS, CIM_ERR_NOT_FOUND, CIM_ERR_FAILED as createInstance.
-    void modifyInstance(const CIMNamespaceName& nameSpace, const CIMInstance& modified,
+    void modifyInstance(const CIMNamespaceName& nameSpace, const CIMConstInstance& modified,
                         const CIMPropertyList& propertyList);
     /// Throws CIM_ERR_INVALID_CLASS, CIM_ERR_NOT_FOUND.
     void deleteInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path);
