@@ -1,0 +1,87 @@
+"""A deployed tree of one test's own: laid down, run, and searched for what a run must not leave behind."""
+import json
+import os
+import shutil
+import signal
+import subprocess
+import tempfile
+import time
+import uuid
+
+RUN_SECONDS = 120
+
+
+class Tree:
+    """A private copy of the deployed tree with a consumer name that no other test uses."""
+
+    def __init__(self, build):
+        self.root = tempfile.mkdtemp(prefix="vrx-e2e-")
+        self.consumer = "e2e-" + uuid.uuid4().hex[:12]
+        subprocess.run(["cmake", "--install", build, "--prefix", self.root], check=True, stdout=subprocess.DEVNULL)
+
+    def path(self, *parts):
+        return os.path.join(self.root, *parts)
+
+    def vendor(self, *parts):
+        return self.path("pegasus", "provider", "linux", *parts)
+
+    @property
+    def start_file(self):
+        return f"/var/tmp/cimserverkol_tc_{self.consumer}_start.conf"
+
+    def start(self, *arguments, **keywords):
+        command = [self.path("vrxhost"), *arguments, "--consumer", self.consumer]
+        return subprocess.Popen(command, cwd=self.root, stdin=subprocess.DEVNULL, stdout=subprocess.PIPE,
+                                stderr=subprocess.PIPE, text=True, **keywords)
+
+    def run(self, *arguments):
+        """Returns (exit status, standard output, standard error)."""
+        process = self.start(*arguments)
+        try:
+            out, err = process.communicate(timeout=RUN_SECONDS)
+        except subprocess.TimeoutExpired:
+            process.kill()
+            process.communicate()
+            raise
+        return process.returncode, out, err
+
+    def inventory(self, *arguments):
+        """Returns (exit status, the JSON document, standard error)."""
+        status, out, err = self.run("inventory", "--format", "json", *arguments)
+        return status, json.loads(out), err
+
+    def processes(self):
+        """The ids of the processes that run a program of this tree."""
+        found = []
+        for pid in filter(str.isdigit, os.listdir("/proc")):
+            try:
+                if os.readlink(f"/proc/{pid}/exe").startswith(self.root + "/"):
+                    found.append(int(pid))
+            except OSError:
+                continue
+        return found
+
+    def leftovers(self):
+        """What a finished run must have taken away; agents get a moment to notice that their server has gone."""
+        deadline = time.monotonic() + 5
+        while self.processes() and time.monotonic() < deadline:
+            time.sleep(0.05)
+        left = [f"process {pid}" for pid in self.processes()]
+        left += [path for path in (self.start_file, self.path("pegasus", "repository")) if os.path.lexists(path)]
+        return left
+
+    def remove(self):
+        for pid in self.processes():
+            os.kill(pid, signal.SIGKILL)
+        if os.path.lexists(self.start_file):
+            os.unlink(self.start_file)
+        shutil.rmtree(self.root, ignore_errors=True)
+
+
+def wait_until(condition, seconds, what):
+    deadline = time.monotonic() + seconds
+    while time.monotonic() < deadline:
+        if condition():
+            return
+        time.sleep(0.02)
+    raise AssertionError(f"{what} did not happen within {seconds} s")
