@@ -1,0 +1,37 @@
+#ifndef VRX_TCIMVALUEREP_H
+#define VRX_TCIMVALUEREP_H
+
+#include <variant>
+
+#include <boost/weak_ptr.hpp>
+
+#include <host/TCIMValue.h>
+
+namespace NKOLVRX20 {
+
+// What a TCIMValue points to. Values share a representation and never change it; whoever writes makes a new one.
+// The exception is a lent one, whose element vector was handed out for writing: it belongs to one value alone, and
+// copies of that value copy it.
+struct TCIMValue::TRep
+{
+    // The alternatives' indices are the scalar type codes; index 0 is null, the last one an array.
+    typedef std::variant<std::monostate, bool, unsigned char, signed char, unsigned short, short, unsigned int, int,
+                         unsigned long, long, float, double, TCIMChar16, std::string, TCIMDateTime, TCIMReference,
+                         std::vector<TCIMValue>>
+        TData;
+
+    TRep(TCIMType elementType, TData data) : fElementType(elementType), fData(std::move(data)) {}
+    explicit TRep(TData data) : fElementType(TCIMType::ECIMType(data.index())), fData(std::move(data)) {}
+
+    bool IsNull() const { return fData.index() == 0; }
+    bool IsArray() const { return std::holds_alternative<std::vector<TCIMValue>>(fData); }
+
+    TCIMType fElementType; // a scalar code, also of an array
+    TData fData;
+    boost::weak_ptr<ICIMClass> fReferencedClass;
+    bool fLent = false;
+};
+
+} // namespace NKOLVRX20
+
+#endif

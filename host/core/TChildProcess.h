@@ -1,0 +1,92 @@
+#ifndef VRX_TCHILDPROCESS_H
+#define VRX_TCHILDPROCESS_H
+
+#include <chrono>
+#include <cstddef>
+#include <string>
+#include <vector>
+
+#include <sys/types.h>
+
+#include "UniqueFd.h"
+
+namespace NKOLVRX20 {
+
+// What to run.
+struct TProcessRequest
+{
+    std::string fProgram;                  // a path, or a name to be searched in PATH
+    bool fSearchPath = false;              // PATH of this process
+    std::vector<std::string> fArguments;   // argv, the program's name first
+    std::vector<std::string> fEnvironment; // "NAME=value"
+    bool fInheritEnvironment = false;      // instead of fEnvironment
+};
+
+// What became of it.
+struct TProcessOutcome
+{
+    enum EEnd
+    {
+        kExited,   // fStatus is the exit status
+        kSignaled, // fStatus is the signal
+        kUnknown,  // it ended, but this process's SIGCHLD disposition threw the status away
+        kNotRun,   // fStatus is the errno of the failed start
+        kTimedOut  // killed
+    };
+
+    EEnd fEnd = kNotRun;
+    int fStatus = 0;
+    std::string fOutput;
+    std::string fErrorOutput;
+    std::size_t fDroppedBytes = 0; // of both, beyond the limits
+
+    bool IsSuccess() const { return fEnd == kExited && fStatus == 0; }
+};
+
+// Captured beyond these, output is read and dropped, so that the child does not stall.
+constexpr std::size_t kMaxOutputBytes = 16 * 1024 * 1024;
+constexpr std::size_t kMaxErrorOutputBytes = 64 * 1024;
+
+// One run of a child process: started with default signal dispositions, an empty mask, its own process group, standard
+// input from /dev/null and no descriptor above 2; standard output and error are captured.
+// Thread: one at a time; several objects may be used at once.
+class TChildProcess
+{
+  public:
+    explicit TChildProcess(const TProcessRequest& request);
+
+    // Never throws for what the child does; see TProcessOutcome.
+    // Throws: std::bad_alloc.
+    // Blocks: until the child exits (not until its last descendant closes the pipes) or the time is over.
+    TProcessOutcome Run(std::chrono::milliseconds timeout);
+
+  private:
+    typedef std::chrono::steady_clock TClock;
+
+    struct TPipe
+    {
+        UniqueFd fRead;
+        UniqueFd fWrite;
+    };
+
+    int Start();
+    int Spawn();
+    bool AwaitExit(TClock::time_point deadline);
+    bool PollOnce(TClock::time_point deadline);
+    bool HasExited() const;
+    void Drain(UniqueFd& from, std::string& into, std::size_t limit);
+    void DrainBoth();
+    void Kill();
+    void Reap();
+
+    const TProcessRequest& fRequest;
+    TPipe fOutputPipe;
+    TPipe fErrorPipe;
+    pid_t fPid = -1;
+    UniqueFd fPidFd; // readable when the child has exited; none on kernels before 5.3
+    TProcessOutcome fOutcome;
+};
+
+} // namespace NKOLVRX20
+
+#endif

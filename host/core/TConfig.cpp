@@ -1,0 +1,91 @@
+#include <host/TConfig.h>
+
+#include <cerrno>
+#include <fstream>
+#include <sstream>
+
+#include <host/TVRXException.h>
+
+namespace NKOLVRX20 {
+namespace {
+
+constexpr std::size_t kMaxFileBytes = 1024 * 1024;
+
+std::string Trimmed(const std::string& text)
+{
+    static const char kBlanks[] = " \t\r";
+    const std::size_t begin = text.find_first_not_of(kBlanks);
+    if (begin == std::string::npos)
+        return "";
+    return text.substr(begin, text.find_last_not_of(kBlanks) - begin + 1);
+}
+
+std::string ReadWhole(const std::string& path)
+{
+    std::ifstream file(path, std::ios::binary);
+    std::string text(kMaxFileBytes + 1, '\0');
+    file.read(&text[0], static_cast<std::streamsize>(text.size()));
+    // A directory opens like a file; only reading it fails.
+    if (!file.is_open() || file.bad() || static_cast<std::size_t>(file.gcount()) > kMaxFileBytes)
+        throw TVRXException(TVRXStatusCode::kBadPath);
+    text.resize(static_cast<std::size_t>(file.gcount()));
+    return text;
+}
+
+std::map<std::string, std::string> ParseLines(const std::string& text)
+{
+    std::map<std::string, std::string> values;
+    std::istringstream lines(text);
+    for (std::string line; std::getline(lines, line);) {
+        line = Trimmed(line);
+        if (line.empty() || line[0] == '#')
+            continue;
+        const std::size_t equals = line.find('=');
+        if (equals == std::string::npos)
+            throw TVRXException(TVRXStatusCode::kTypeMismatch);
+        values[Trimmed(line.substr(0, equals))] = Trimmed(line.substr(equals + 1));
+    }
+    return values;
+}
+
+} // namespace
+
+TConfig* TConfig::GetInstance()
+{
+    static TConfig instance;
+    return &instance;
+}
+
+std::string TConfig::getValue(const std::string& key) const
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    for (const auto* values : {&fOverrides, &fFileValues}) {
+        const auto found = values->find(key);
+        if (found != values->end())
+            return found->second;
+    }
+    return "";
+}
+
+void TConfig::Load(const std::string& path)
+{
+    const auto values = ParseLines(ReadWhole(path));
+    const std::lock_guard<std::mutex> lock(fMutex);
+    for (const auto& entry : values)
+        fFileValues[entry.first] = entry.second;
+}
+
+void TConfig::setValue(const std::string& key, const std::string& value)
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    fOverrides[key] = value;
+}
+
+void TConfig::Clear()
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    fFileValues.clear();
+    fOverrides.clear();
+}
+
+} // namespace NKOLVRX20

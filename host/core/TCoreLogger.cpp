@@ -1,0 +1,82 @@
+#include "TCoreLogger.h"
+
+#define SPDLOG_PREVENT_CHILD_FD // the file is close-on-exec
+#include <spdlog/logger.h>
+#include <spdlog/sinks/basic_file_sink.h>
+#include <spdlog/sinks/stdout_sinks.h>
+
+#include <host/TVRXException.h>
+
+namespace NKOLVRX20 {
+
+struct TCoreLogger::TSinks
+{
+    spdlog::logger fLogger{"vrx"};
+};
+
+namespace {
+
+constexpr char kPattern[] = "%Y-%m-%d %H:%M:%S.%e %-7l %t %v";
+
+spdlog::level::level_enum ToLevel(ILogger::EVRXLogSeverity severity)
+{
+    switch (severity) {
+    case ILogger::kError:
+        return spdlog::level::err;
+    case ILogger::kWarning:
+        return spdlog::level::warn;
+    case ILogger::kNotice:
+    case ILogger::kInfo:
+        return spdlog::level::info;
+    default:
+        return spdlog::level::debug;
+    }
+}
+
+} // namespace
+
+TCoreLogger& TCoreLogger::Instance()
+{
+    // Never destroyed: a plug-in's static destructors may still log.
+    static TCoreLogger* instance = new TCoreLogger;
+    return *instance;
+}
+
+TCoreLogger::TCoreLogger()
+{
+    TOptions options;
+    options.fToStandardError = true;
+    options.fLeastSevere = kError;
+    Configure(options);
+}
+
+TCoreLogger::~TCoreLogger() = default;
+
+void TCoreLogger::Configure(const TOptions& options)
+{
+    const auto sinks = std::make_shared<TSinks>();
+    try {
+        if (!options.fFile.empty())
+            sinks->fLogger.sinks().push_back(std::make_shared<spdlog::sinks::basic_file_sink_mt>(options.fFile));
+        if (options.fToStandardError)
+            sinks->fLogger.sinks().push_back(std::make_shared<spdlog::sinks::stderr_sink_mt>());
+    } catch (const spdlog::spdlog_ex&) {
+        throw TVRXException(TVRXStatusCode::kBadPath);
+    }
+    sinks->fLogger.set_pattern(kPattern);
+    sinks->fLogger.set_level(ToLevel(options.fLeastSevere));
+    sinks->fLogger.flush_on(spdlog::level::trace); // a process that dies must not take its last lines along
+    std::atomic_store(&fSinks, sinks);
+}
+
+void TCoreLogger::Log(EVRXLogSeverity severity, const std::string& text)
+{
+    Current()->fLogger.log(ToLevel(severity), text);
+}
+
+std::shared_ptr<TCoreLogger::TSinks> TCoreLogger::Current() const
+{
+    return std::atomic_load(&fSinks);
+}
+
+} // namespace NKOLVRX20

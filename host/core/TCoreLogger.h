@@ -1,0 +1,44 @@
+#ifndef VRX_TCORELOGGER_H
+#define VRX_TCORELOGGER_H
+
+#include <memory>
+#include <string>
+
+#include <host/ILogger.h>
+
+namespace NKOLVRX20 {
+
+// The host's own logger: time, severity and text of each entry, to a file, to standard error, to both or nowhere.
+// At first it writes errors to standard error and nothing else.
+// Thread: safe.
+class TCoreLogger : public ILogger
+{
+  public:
+    struct TOptions
+    {
+        std::string fFile; // empty for none; appended to, created with mode 0666 less the umask
+        bool fToStandardError = false;
+        EVRXLogSeverity fLeastSevere = kInfo; // entries beyond this severity are dropped
+    };
+
+    static TCoreLogger& Instance();
+
+    // Replaces what was configured before.
+    // Throws: TVRXException 3 when the file cannot be opened for writing; the configuration is then unchanged.
+    void Configure(const TOptions& options);
+
+    void Log(EVRXLogSeverity severity, const std::string& text) override;
+
+  private:
+    TCoreLogger();
+    ~TCoreLogger() override;
+
+    struct TSinks;
+    std::shared_ptr<TSinks> Current() const;
+
+    std::shared_ptr<TSinks> fSinks; // replaced as a whole, accessed atomically
+};
+
+} // namespace NKOLVRX20
+
+#endif

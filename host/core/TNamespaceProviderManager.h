@@ -1,0 +1,28 @@
+#ifndef VRX_TNAMESPACEPROVIDERMANAGER_H
+#define VRX_TNAMESPACEPROVIDERMANAGER_H
+
+#include <mutex>
+#include <vector>
+
+#include <host/INamespaceProviderManager.h>
+
+namespace NKOLVRX20 {
+
+// The process's one namespace-provider manager. A provider's own operations are never called under the lock.
+class TNamespaceProviderManager : public INamespaceProviderManager
+{
+  public:
+    void RegisterNamespaceProvider(boost::shared_ptr<INamespaceProvider> provider) override;
+    void UnregisterNamespaceProvider(boost::shared_ptr<INamespaceProvider> provider) override;
+    boost::shared_ptr<INamespaceProvider> GetNamespaceProvider(const std::string& name) const override;
+
+  private:
+    std::vector<boost::shared_ptr<INamespaceProvider>> Snapshot() const;
+
+    mutable std::mutex fMutex;
+    std::vector<boost::shared_ptr<INamespaceProvider>> fProviders; // in the order of registration
+};
+
+} // namespace NKOLVRX20
+
+#endif

@@ -1,0 +1,83 @@
+#include "TProcessLog.h"
+
+#include <cstring>
+#include <iterator>
+
+#include <host/TRootObject.h>
+
+namespace NKOLVRX20 {
+namespace {
+
+TFailedProgram Describe(const TProcessRequest& request, const TProcessOutcome& outcome)
+{
+    TFailedProgram program;
+    program.fName = request.fArguments.front();
+    program.fArguments.assign(std::next(request.fArguments.begin()), request.fArguments.end());
+    program.fEnd = outcome.fEnd;
+    program.fStatus = outcome.fStatus;
+    program.fErrorOutput = outcome.fErrorOutput;
+    return program;
+}
+
+std::string LogLine(const TFailedProgram& program, const TProcessOutcome& outcome)
+{
+    std::string line = "TOSSpecific::SpawnProcess " + program.fName;
+    for (const std::string& argument : program.fArguments)
+        line += " " + argument;
+    line += ": " + program.GetReason();
+    if (outcome.fDroppedBytes > 0)
+        line += ", " + std::to_string(outcome.fDroppedBytes) + " bytes of output dropped";
+    if (!outcome.fErrorOutput.empty())
+        line += ": " + outcome.fErrorOutput;
+    return line;
+}
+
+} // namespace
+
+std::string TFailedProgram::GetReason() const
+{
+    switch (fEnd) {
+    case TProcessOutcome::kExited:
+        return "exit status " + std::to_string(fStatus);
+    case TProcessOutcome::kSignaled:
+        return "signal " + std::to_string(fStatus) + " (" + strsignal(fStatus) + ")";
+    case TProcessOutcome::kUnknown:
+        return "exit status unknown";
+    case TProcessOutcome::kNotRun:
+        return std::string("not started: ") + std::strerror(fStatus);
+    case TProcessOutcome::kTimedOut:
+        return "killed because its time ran out";
+    }
+    return "";
+}
+
+TProcessLog& TProcessLog::Instance()
+{
+    static TProcessLog* instance = new TProcessLog; // outlives every plug-in
+    return *instance;
+}
+
+void TProcessLog::Add(const TProcessRequest& request, const TProcessOutcome& outcome)
+{
+    if (outcome.IsSuccess() && outcome.fErrorOutput.empty() && outcome.fDroppedBytes == 0)
+        return;
+    const TFailedProgram program = Describe(request, outcome);
+    TRootObject::GetCoreLogger()->Log(ILogger::kInfo, LogLine(program, outcome));
+    if (outcome.IsSuccess())
+        return;
+    const std::lock_guard<std::mutex> lock(fMutex);
+    if (fEntries.size() == kMaxEntries)
+        fEntries.pop_front();
+    fEntries.push_back(program);
+}
+
+std::vector<TFailedProgram> TProcessLog::Take()
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    std::vector<TFailedProgram> taken(std::make_move_iterator(fEntries.begin()),
+                                      std::make_move_iterator(fEntries.end()));
+    fEntries.clear();
+    return taken;
+}
+
+} // namespace NKOLVRX20

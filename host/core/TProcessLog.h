@@ -1,0 +1,49 @@
+#ifndef VRX_TPROCESSLOG_H
+#define VRX_TPROCESSLOG_H
+
+#include <cstddef>
+#include <deque>
+#include <mutex>
+#include <string>
+#include <vector>
+
+#include "TChildProcess.h"
+
+namespace NKOLVRX20 {
+
+// A program that did not do its work, as the host tells it to its user.
+struct TFailedProgram
+{
+    std::string fName;                   // argv[0]
+    std::vector<std::string> fArguments; // without argv[0]
+    TProcessOutcome::EEnd fEnd;
+    int fStatus;
+    std::string fErrorOutput;
+
+    // Returns: "exit status 250", "signal 11 (Segmentation fault)", "not started: No such file or directory" ...
+    std::string GetReason() const;
+};
+
+// The host's memory of failed programs, beside the log line that each gets. The oldest go when there are too many.
+// Thread: safe.
+class TProcessLog
+{
+  public:
+    static constexpr std::size_t kMaxEntries = 1000;
+
+    static TProcessLog& Instance();
+
+    // Logs a program that failed, or that wrote to standard error, as one line of severity 3, and keeps a failed one.
+    void Add(const TProcessRequest& request, const TProcessOutcome& outcome);
+
+    // Returns: the failed programs since the last call, in the order in which they ended.
+    std::vector<TFailedProgram> Take();
+
+  private:
+    std::mutex fMutex;
+    std::deque<TFailedProgram> fEntries;
+};
+
+} // namespace NKOLVRX20
+
+#endif

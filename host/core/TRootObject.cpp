@@ -1,0 +1,34 @@
+#include <host/TRootObject.h>
+
+#include <atomic>
+
+#include <boost/make_shared.hpp>
+
+#include "TCoreLogger.h"
+#include "TNamespaceProviderManager.h"
+
+namespace NKOLVRX20 {
+namespace {
+
+std::atomic<ILogger*> gCoreLogger{nullptr}; // null: the host's own
+
+} // namespace
+
+ILogger* TRootObject::GetCoreLogger()
+{
+    ILogger* logger = gCoreLogger.load();
+    return logger ? logger : &TCoreLogger::Instance();
+}
+
+ILogger* TRootObject::SetCoreLogger(ILogger* logger)
+{
+    return gCoreLogger.exchange(logger);
+}
+
+boost::shared_ptr<INamespaceProviderManager> TRootObject::GetNamespaceProviderManager()
+{
+    static const boost::shared_ptr<INamespaceProviderManager> manager = boost::make_shared<TNamespaceProviderManager>();
+    return manager;
+}
+
+} // namespace NKOLVRX20
