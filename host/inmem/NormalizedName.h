@@ -1,0 +1,13 @@
+#ifndef VRX_NORMALIZEDNAME_H
+#define VRX_NORMALIZEDNAME_H
+
+#include <string>
+
+namespace NKOLVRX20 {
+
+// Returns: the name as a map key: CIM names do not tell upper from lower case (DSP0004, 5.1.2.8).
+std::string NormalizedName(const std::string& name);
+
+} // namespace NKOLVRX20
+
+#endif

@@ -1,0 +1,178 @@
+#include <host/TInmemInstance.h>
+
+#include <boost/make_shared.hpp>
+
+#include <host/ICIMClass.h>
+#include <host/ICIMProperty.h>
+#include <host/ICIMPropertyDecl.h>
+#include <host/TVRXException.h>
+
+#include "NormalizedName.h"
+#include "ObjectPathText.h"
+#include "TInmemProperty.h"
+
+namespace NKOLVRX20 {
+namespace {
+
+// A property that its class does not declare is kept all the same; it has no texts then.
+boost::shared_ptr<ICIMPropertyDecl> FindDeclaration(const boost::shared_ptr<ICIMClass>& instanceClass,
+                                                    const std::string& name, const TCIMContext& context)
+{
+    try {
+        return instanceClass ? instanceClass->GetPropertyDecl(name, context) : nullptr;
+    } catch (const TVRXException& e) {
+        if (e.GetStatusCode() != TVRXStatusCode::kUnknownProperty)
+            throw;
+        return nullptr;
+    }
+}
+
+std::string ClassNameOf(const ICIMInstance& instance)
+{
+    const auto instanceClass = instance.GetClass(TCIMContext());
+    return instanceClass ? instanceClass->GetName(TCIMContext()) : std::string();
+}
+
+// The contract's property has no name of its own: it is its declaration's, unless the property is of this library.
+std::string NameOf(const ICIMProperty& property)
+{
+    if (const auto* own = dynamic_cast<const TInmemProperty*>(&property))
+        return own->GetName();
+    const auto declaration = property.GetDeclaration(TCIMContext());
+    return declaration ? declaration->GetName(TCIMContext()) : std::string();
+}
+
+std::map<std::string, TCIMValue> ValuesOf(const ICIMInstance& instance)
+{
+    std::map<std::string, TCIMValue> values;
+    instance.EnumerateProperties(
+        [&values](boost::shared_ptr<ICIMProperty> property) {
+            values[NormalizedName(NameOf(*property))] = property->GetValue(TCIMContext());
+            return true;
+        },
+        TCIMContext());
+    return values;
+}
+
+} // namespace
+
+TInmemInstance::TInmemInstance(boost::shared_ptr<ICIMClass> instanceClass, TCIMContext)
+    : fClass(std::move(instanceClass))
+{
+}
+
+TInmemInstance::~TInmemInstance() = default;
+
+// Values are kept as they were set, whatever the declarations say; there is nothing to hold against them.
+void TInmemInstance::Validate(TCIMContext) {}
+
+void TInmemInstance::AddToNamespace(TCIMContext)
+{
+    if (fClass)
+        fClass->AddInstance(shared_from_this());
+}
+
+void TInmemInstance::ModifyInstance(boost::shared_ptr<ICIMInstance> newValues, TCIMContext context)
+{
+    for (const auto& value : ValuesOf(*newValues))
+        SetPropertyValue(value.first, value.second, context);
+}
+
+void TInmemInstance::Delete(TCIMContext)
+{
+    if (fClass)
+        fClass->RemoveInstance(shared_from_this());
+}
+
+TCIMReference TInmemInstance::GetReference(TCIMContext context) const
+{
+    if (!fClass)
+        return TCIMReference();
+    TCIMContext keys;
+    fClass->EnumerateKeyNames(
+        [&](const std::string* name) {
+            const auto found = fProperties.find(NormalizedName(*name));
+            if (found != fProperties.end())
+                keys[*name] = found->second->GetValue(context);
+            return true;
+        },
+        context);
+    TCIMReference reference(fClass->GetNamespace(context), keys);
+    reference.SetPath(ObjectPathText(fClass->GetName(context), keys));
+    return reference;
+}
+
+boost::shared_ptr<ICIMClass> TInmemInstance::GetClass(TCIMContext) const
+{
+    return fClass;
+}
+
+std::string TInmemInstance::GetPegasusNSPStr() const
+{
+    return "";
+}
+
+void TInmemInstance::EnumerateAssociatedInstances(TInstanceVisitor, const std::string&, const std::string&,
+                                                  const std::string&, const std::string&, TCIMContext)
+{
+}
+
+void TInmemInstance::EnumerateAssociationInstances(TInstanceVisitor, const std::string&, const std::string&,
+                                                   TCIMContext)
+{
+}
+
+boost::shared_ptr<ICIMProperty> TInmemInstance::GetProperty(const std::string& name, TCIMContext) const
+{
+    const auto found = fProperties.find(NormalizedName(name));
+    if (found == fProperties.end())
+        throw TVRXException(TVRXStatusCode::kUnknownProperty);
+    return found->second;
+}
+
+void TInmemInstance::SetPropertyValue(const std::string& name, TCIMValue value, TCIMContext context)
+{
+    const std::string key = NormalizedName(name);
+    const auto found = fProperties.find(key);
+    if (found != fProperties.end())
+        return found->second->SetValue(std::move(value), context);
+    fProperties[key] =
+        boost::make_shared<TInmemProperty>(name, std::move(value), FindDeclaration(fClass, name, context), fClass);
+}
+
+void TInmemInstance::EnumerateProperties(TPropertyVisitor visitor, TCIMContext) const
+{
+    const auto properties = fProperties; // the visitor may set values
+    for (const auto& property : properties)
+        if (!visitor(property.second))
+            return;
+}
+
+TCIMValue TInmemInstance::InvokeMethod(const std::string&, TCIMContext&, TCIMContext)
+{
+    throw TVRXException(TVRXStatusCode::kNotSupported);
+}
+
+bool TInmemInstance::operator==(const ICIMInstance& other) const
+{
+    return ClassNameOf(*this) == ClassNameOf(other) && ValuesOf(*this) == ValuesOf(other);
+}
+
+bool TInmemInstance::operator<(const ICIMInstance& other) const
+{
+    const std::string name = ClassNameOf(*this), otherName = ClassNameOf(other);
+    return name != otherName ? name < otherName : ValuesOf(*this) < ValuesOf(other);
+}
+
+ICIMInstance& TInmemInstance::operator=(const ICIMInstance& other)
+{
+    if (this == &other)
+        return *this;
+    fClass = other.GetClass(TCIMContext());
+    fProperties.clear();
+    for (const auto& value : ValuesOf(other))
+        SetPropertyValue(value.first, value.second, TCIMContext());
+    return *this;
+}
+
+} // namespace NKOLVRX20

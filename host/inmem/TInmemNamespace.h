@@ -1,0 +1,66 @@
+#ifndef VRX_TINMEMNAMESPACE_H
+#define VRX_TINMEMNAMESPACE_H
+
+#include <map>
+
+#include <boost/weak_ptr.hpp>
+
+#include <host/ICIMNamespace.h>
+
+namespace NKOLVRX20 {
+
+// A namespace whose classes, qualifier declarations and instances are kept in memory. The host gives it to a plug-in
+// as upcall namespace (where the plug-in looks up qualifier declarations) and as repository (where the plug-in sends
+// what it does not serve itself).
+// Thread: one at a time.
+class TInmemNamespace : public ICIMNamespace
+{
+  public:
+    // Enter an object; one of the same name or path is replaced.
+    void AddClass(const boost::shared_ptr<ICIMClass>& newClass);
+    void AddQualifierDecl(const boost::shared_ptr<ICIMQualifierDecl>& declaration);
+    void AddInstance(const boost::shared_ptr<ICIMInstance>& instance);
+
+    // Returns: null; no plug-in made it.
+    boost::shared_ptr<INamespaceProvider> GetNamespaceProvider(TCIMContext context) override;
+    void SetUpcallNamespace(boost::shared_ptr<ICIMNamespace> upcall, TCIMContext context) override;
+    // Throws: TVRXException 31.
+    void AddUnderlyingNamespace(boost::shared_ptr<ICIMNamespace> underlying, TCIMContext context) override;
+    // Throws: TVRXException 31: it keeps classes but has no kind of its own.
+    boost::shared_ptr<ICIMClass> AllocateClass(const std::string& name, boost::shared_ptr<ICIMClass> superClass,
+                                               TCIMContext context) override;
+    boost::shared_ptr<ICIMClass> GetClass(const std::string& name, TCIMContext context) override;
+    void EnumerateRootClasses(TClassVisitor visitor, TCIMContext context) override;
+    // Visits nothing.
+    void EnumerateProviders(TProviderVisitor visitor, TCIMContext context) override;
+    // Throws: TVRXException 31.
+    boost::shared_ptr<ICIMQualifierDecl> AllocateQualifierDecl(const std::string& name, TCIMValue defaultValue,
+                                                               ICIMQualifierDecl::EScope scope,
+                                                               ICIMQualifierDecl::EFlavor flavor,
+                                                               TCIMContext context) override;
+    boost::shared_ptr<ICIMQualifierDecl> GetQualifierDecl(const std::string& name, TCIMContext context) override;
+    void EnumerateQualifierDecls(TQualifierDeclVisitor visitor, TCIMContext context) override;
+    // Throws: TVRXException 31.
+    void Subscribe(boost::shared_ptr<ICIMIndicationFilter> filter, TInstanceVisitor visitor,
+                   TCIMContext context) override;
+    // Finds an instance by its path text, byte for byte.
+    boost::shared_ptr<ICIMInstance> GetInstance(const TCIMReference& reference, TCIMContext context) override;
+    // Throws: TVRXException 6 when there is no such instance.
+    void DeleteInstance(const TCIMReference& reference, TCIMContext context) override;
+    // Throws: TVRXException 6 when there is no such instance.
+    void ModifyInstance(const TCIMReference& reference, TCIMContext values, TCIMContext context) override;
+    // Throws: TVRXException 31: no query language is known here.
+    void ExecuteQuery(TInstanceVisitor visitor, std::string& language, std::string& query,
+                      TCIMContext context) override;
+    void ClearInstances() override;
+
+  private:
+    std::map<std::string, boost::shared_ptr<ICIMClass>> fClasses;                // by normalised name
+    std::map<std::string, boost::shared_ptr<ICIMQualifierDecl>> fQualifierDecls; // by normalised name
+    std::map<std::string, boost::shared_ptr<ICIMInstance>> fInstances;           // by path text
+    boost::weak_ptr<ICIMNamespace> fUpcall;
+};
+
+} // namespace NKOLVRX20
+
+#endif

@@ -1,0 +1,116 @@
+#include "TInmemProperty.h"
+
+#include <host/ICIMClass.h>
+#include <host/ICIMPropertyDecl.h>
+
+#include "PropertyText.h"
+
+namespace NKOLVRX20 {
+
+TInmemProperty::TInmemProperty(const std::string& name, TCIMValue value,
+                               const boost::shared_ptr<ICIMPropertyDecl>& declaration,
+                               const boost::shared_ptr<ICIMClass>& instanceClass)
+    : fName(declaration ? declaration->GetName(TCIMContext()) : name), fValue(std::move(value)),
+      fDeclaration(declaration), fClass(instanceClass)
+{
+}
+
+std::string TInmemProperty::GetName() const
+{
+    return fName;
+}
+
+TCIMValue::TCIMType TInmemProperty::GetType(TCIMContext context) const
+{
+    if (fValue.IsArray())
+        return TCIMValue::TCIMType::ECIMType(fValue.GetType() + TCIMValue::TCIMType::kArrayOffset);
+    const auto declaration = fDeclaration.lock();
+    const bool typeless = fValue.GetType() == TCIMValue::TCIMType::kNone;
+    return typeless && declaration ? declaration->GetType(context) : fValue.GetType();
+}
+
+bool TInmemProperty::IsArray(TCIMContext context) const
+{
+    return GetType(context).IsArray();
+}
+
+bool TInmemProperty::IsDefaultValue(TCIMContext context) const
+{
+    const auto declaration = fDeclaration.lock();
+    return declaration && declaration->GetDefaultValue(context) == fValue;
+}
+
+TCIMValue TInmemProperty::GetValue(TCIMContext) const
+{
+    return fValue;
+}
+
+void TInmemProperty::SetValue(TCIMValue value, TCIMContext)
+{
+    fValue = std::move(value);
+}
+
+bool TInmemProperty::GetPropagated(TCIMContext context) const
+{
+    const auto declaration = fDeclaration.lock();
+    const auto owner = declaration ? declaration->GetClass(context) : boost::shared_ptr<ICIMClass>();
+    return owner && owner != fClass.lock();
+}
+
+boost::shared_ptr<ICIMPropertyDecl> TInmemProperty::GetDeclaration(TCIMContext) const
+{
+    return fDeclaration.lock();
+}
+
+bool TInmemProperty::operator==(const ICIMProperty& other) const
+{
+    return fValue == other.GetValue(TCIMContext());
+}
+
+bool TInmemProperty::operator<(const ICIMProperty& other) const
+{
+    return fValue < other.GetValue(TCIMContext());
+}
+
+ICIMProperty& TInmemProperty::operator=(const ICIMProperty& other)
+{
+    fValue = other.GetValue(TCIMContext());
+    return *this;
+}
+
+TCIMValue TInmemProperty::GetPrevValue() const
+{
+    return fPrevValue;
+}
+
+void TInmemProperty::SetPrevValue(TCIMValue value)
+{
+    fPrevValue = std::move(value);
+}
+
+void TInmemProperty::SetPrevValue()
+{
+    fPrevValue = fValue;
+}
+
+bool TInmemProperty::IsPrevValueDifferent() const
+{
+    return fPrevValue != fValue;
+}
+
+std::string TInmemProperty::ToString() const
+{
+    return PropertyText(fValue, fDeclaration.lock());
+}
+
+std::string TInmemProperty::PrevValueToString() const
+{
+    return PropertyText(fPrevValue, fDeclaration.lock());
+}
+
+std::vector<std::string> TInmemProperty::ToStringVector() const
+{
+    return PropertyTexts(fValue, fDeclaration.lock());
+}
+
+} // namespace NKOLVRX20

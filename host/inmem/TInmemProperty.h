@@ -1,0 +1,52 @@
+#ifndef VRX_TINMEMPROPERTY_H
+#define VRX_TINMEMPROPERTY_H
+
+#include <boost/weak_ptr.hpp>
+
+#include <host/ICIMProperty.h>
+
+namespace NKOLVRX20 {
+
+// A property of an instance in memory: a value, the previous one, and the declaration that gives it its texts.
+// Ownership: does not keep the declaration or the class alive.
+class TInmemProperty : public ICIMProperty
+{
+  public:
+    TInmemProperty(const std::string& name, TCIMValue value, const boost::shared_ptr<ICIMPropertyDecl>& declaration,
+                   const boost::shared_ptr<ICIMClass>& instanceClass);
+
+    // Returns: the name in the declaration's spelling; without a declaration as the instance was told it.
+    std::string GetName() const;
+
+    // The value's type; of a null without type the declaration's.
+    TCIMValue::TCIMType GetType(TCIMContext context) const override;
+    bool IsArray(TCIMContext context) const override;
+    bool IsDefaultValue(TCIMContext context) const override;
+    TCIMValue GetValue(TCIMContext context) const override;
+    void SetValue(TCIMValue value, TCIMContext context) override;
+    // Returns: true when the declaration belongs to another class than the instance.
+    bool GetPropagated(TCIMContext context) const override;
+    boost::shared_ptr<ICIMPropertyDecl> GetDeclaration(TCIMContext context) const override;
+    bool operator==(const ICIMProperty& other) const override;
+    bool operator<(const ICIMProperty& other) const override;
+    // Takes over the value alone.
+    ICIMProperty& operator=(const ICIMProperty& other) override;
+    TCIMValue GetPrevValue() const override;
+    void SetPrevValue(TCIMValue value) override;
+    void SetPrevValue() override;
+    bool IsPrevValueDifferent() const override;
+    std::string ToString() const override;
+    std::string PrevValueToString() const override;
+    std::vector<std::string> ToStringVector() const override;
+
+  private:
+    std::string fName;
+    TCIMValue fValue;
+    TCIMValue fPrevValue;
+    boost::weak_ptr<ICIMPropertyDecl> fDeclaration;
+    boost::weak_ptr<ICIMClass> fClass;
+};
+
+} // namespace NKOLVRX20
+
+#endif
