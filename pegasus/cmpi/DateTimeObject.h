@@ -1,0 +1,34 @@
+#ifndef PEGASUS_CMPI_DATETIMEOBJECT_H
+#define PEGASUS_CMPI_DATETIMEOBJECT_H
+
+#include "pegasus/cmpi/Slot.h"
+
+#include <Pegasus/Common/CIMDateTime.h>
+
+namespace Pegasus::cmpi {
+
+// A CMPIDateTime. Its binary form counts microseconds since 1970, or the length of an interval.
+class DateTimeObject final : public Owned, public CMPIDateTime
+{
+  public:
+    explicit DateTimeObject(const CIMDateTime& value);
+    DateTimeObject(const DateTimeObject& other) : DateTimeObject(other.fValue) {}
+
+    const CIMDateTime& value() const { return fValue; }
+
+    Lifetime lifetime = Lifetime::kFrame;
+
+  private:
+    CIMDateTime fValue;
+};
+
+extern const CMPIDateTimeFT kDateTimeTable;
+
+CIMDateTime dateTimeFromBinary(CMPIUint64 microseconds, bool isInterval);
+
+// Throws: CMPI_RC_ERR_INVALID_PARAMETER for text that is no CIM datetime.
+CIMDateTime dateTimeFromText(const char* text);
+
+} // namespace Pegasus::cmpi
+
+#endif

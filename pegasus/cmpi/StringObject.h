@@ -1,0 +1,29 @@
+#ifndef PEGASUS_CMPI_STRINGOBJECT_H
+#define PEGASUS_CMPI_STRINGOBJECT_H
+
+#include "pegasus/cmpi/Slot.h"
+
+#include <string>
+
+namespace Pegasus::cmpi {
+
+// A CMPIString. Its handle is the text itself: providers built with older headers read it without asking.
+class StringObject final : public Owned, public CMPIString
+{
+  public:
+    explicit StringObject(std::string text);
+    StringObject(const StringObject& other) : StringObject(other.fText) {}
+
+    const std::string& text() const { return fText; }
+
+    Lifetime lifetime = Lifetime::kFrame;
+
+  private:
+    std::string fText;
+};
+
+extern const CMPIStringFT kStringTable;
+
+} // namespace Pegasus::cmpi
+
+#endif
