@@ -15,6 +15,9 @@ inline const std::string kDefaultCimNamespace = "root/cimv2";
 // The pseudo-class above every class without a superclass.
 inline const std::string kRootClassName = "<root>";
 
+// The tag of a class that is fetched but not offered to the host.
+inline const std::string kCdmTag = "CDM";
+
 // Context keys that name a class's server namespace and its time-out in seconds; both hold strings.
 inline const std::string kNspKey = "nsp";
 inline const std::string kTimeoutKey = "timeout";

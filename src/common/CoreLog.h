@@ -40,9 +40,20 @@ template <typename... TParts> void LogProgress(const TParts&... parts)
     WriteCoreLog(ILogger::kInfo, JoinText(parts...));
 }
 
-// To be called inside a catch block. Returns: what the exception in flight says, of whichever family it is.
-// Throws: nothing but std::bad_alloc.
+// Requires: a catch block around the call.
+// Returns: what the exception in flight says, whichever family it is of.
 std::string DescribeCurrentException();
+
+// Logs the parts and the exception in flight as a failure; for places that must not throw, so a logger that fails is
+// given up on.
+// Requires: a catch block around the call.
+template <typename... TParts> void LogCaughtException(const TParts&... parts) noexcept
+{
+    try {
+        LogFailure(parts..., DescribeCurrentException());
+    } catch (...) { // nobody is left to tell
+    }
+}
 
 } // namespace NKOLVRX20
 

@@ -13,6 +13,10 @@
 
 #include "src/common/ClientConnection.h"
 
+namespace Pegasus {
+class CIMClass;
+}
+
 namespace NKOLVRX20 {
 
 class TPEGASUSClass;
@@ -191,17 +195,29 @@ class TPEGASUSNamespace : public ICIMNamespace, public boost::enable_shared_from
     void CreateRootClass();
     void CompileBaseSchema();
     void WriteLsiConfiguration() const;
-    void StopCimserver();
+
     std::string RunServerProgram(const std::string& name, const std::vector<std::string>& arguments) const;
     std::string StartFilePath() const;
-    void RegisterProviders();
-    std::string AskForClass(const std::string& name);
-    boost::shared_ptr<ICIMClass> FetchClass(const std::string& name, const std::string& key, TCIMContext& context);
+    void StopCimserver();
     void ReleaseCycles();
+
+    void RegisterProviders();
+    boost::shared_ptr<ICIMClass> CollectClass(const std::string& entry,
+                                              const boost::shared_ptr<TPEGASUSProvider>& provider);
+    void VisitProvidersInOrder(const TProviderVisitor& visitor);
+    void VisitProvidersOnThreads(const TProviderVisitor& visitor);
+
+    ICIMNamespace& RepositoryNamespace() const;
+
+    boost::shared_ptr<TPEGASUSClass> FindClass(const std::string& key) const;
+    bool AskServerForClass(const std::string& cimNamespace, const std::string& name, Pegasus::CIMClass& answer);
+    boost::shared_ptr<ICIMClass> FetchClass(const std::string& name, const std::string& key,
+                                            const TCIMContext& context);
+    bool MirrorClass(const Pegasus::CIMClass& source, const TCIMContext& callerContext, TCIMContext& classContext);
 
     const std::string fName;
     const std::string fRootDirectory;
-    const std::string fServerProgramPath;
+    const std::string fServerProgramDirectory;
     const std::vector<std::string> fServerEnvironment;
     const std::string fHostAddress;
     unsigned short fPort;

@@ -84,6 +84,8 @@ class TPEGASUSProvider : public IProvider
     bool IsInitialized() const { return fInitialized; }
 
   private:
+    void OfferClass(const boost::shared_ptr<ICIMClass>& collected, const TClassVisitor& visitor) const;
+
     std::string fType;
     std::string fPath;
     std::string fName;

@@ -1,0 +1,35 @@
+#include "src/common/CoreLog.h"
+
+#include <exception>
+
+#include <Pegasus/Common/Exception.h>
+#include <Pegasus/Common/String.h>
+#include <host/TRootObject.h>
+
+namespace NKOLVRX20 {
+
+std::string ToStdString(const Pegasus::String& text)
+{
+    const Pegasus::CString bytes = text.getCString();
+    return static_cast<const char*>(bytes);
+}
+
+void WriteCoreLog(ILogger::EVRXLogSeverity severity, const std::string& text)
+{
+    TRootObject::GetCoreLogger()->Log(severity, text);
+}
+
+std::string DescribeCurrentException()
+{
+    try {
+        throw;
+    } catch (const Pegasus::Exception& exception) {
+        return ToStdString(exception.getMessage());
+    } catch (const std::exception& exception) {
+        return exception.what();
+    } catch (...) {
+        return "an exception of unknown type";
+    }
+}
+
+} // namespace NKOLVRX20

@@ -1,0 +1,31 @@
+// What the plug-in asks the file system, without exceptions.
+#ifndef SRC_COMMON_FILES_H
+#define SRC_COMMON_FILES_H
+
+#include <cstdio>
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace NKOLVRX20 {
+
+bool IsDirectory(const std::string& path);
+bool IsRegularFile(const std::string& path);
+
+// Appends the names of all entries, "." and ".." too, in the directory's order.
+// Returns: false when the directory cannot be opened.
+bool ReadDirectory(const std::string& path, std::vector<std::string>& names);
+
+struct TFileCloser
+{
+    void operator()(std::FILE* file) const { static_cast<void>(std::fclose(file)); }
+};
+typedef std::unique_ptr<std::FILE, TFileCloser> TFile;
+
+// Opens a regular file for reading, close-on-exec; anything else (a pipe could block for ever) counts as not there.
+// Returns: null when it cannot be opened.
+TFile OpenRegularFile(const std::string& path);
+
+} // namespace NKOLVRX20
+
+#endif

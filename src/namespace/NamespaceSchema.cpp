@@ -1,0 +1,209 @@
+// The cache of classes: looked up by normalised name, fetched from the server on first use.
+#include <cctype>
+#include <iostream>
+
+#include <boost/make_shared.hpp>
+
+#include <Pegasus/Client/CIMClient.h>
+#include <host/TVRXException.h>
+
+#include "src/common/Constants.h"
+#include "src/common/CoreLog.h"
+#include "src/namespace/DefinitionSlot.h"
+#include "src/namespace/NamespaceConstants.h"
+#include "src/namespace/TPEGASUSNamespace.h"
+#include "src/schema/TPEGASUSClass.h"
+
+namespace NKOLVRX20 {
+
+namespace {
+
+constexpr Pegasus::Uint32 kGetClassTimeoutMs = 5000;
+// No real schema comes near; a server that names classes as each other's superclass would never end.
+constexpr unsigned int kMaxSuperClassDepth = 128;
+constexpr unsigned char kDecimal = 10;
+
+bool IsNameStart(unsigned char character)
+{
+    return character == '_' || std::isalpha(character) != 0;
+}
+
+bool IsNamePart(unsigned char character)
+{
+    return character == '_' || std::isalnum(character) != 0;
+}
+
+bool IsLegalName(const std::string& name)
+{
+    if (!name.empty() && !IsNameStart(static_cast<unsigned char>(name.front())))
+        return false;
+    for (const char character : name) {
+        if (!IsNamePart(static_cast<unsigned char>(character)))
+            return false;
+    }
+    return true;
+}
+
+std::string TextFromContext(const TCIMContext& context, const std::string& key, const std::string& fallback)
+{
+    const auto entry = context.find(key);
+    if (entry == context.end())
+        return fallback;
+    if (entry->second.IsArray() || entry->second.GetType() != TCIMValue::TCIMType::kString) {
+        LogFailure(kWrongContextTypeText);
+        throw TVRXException(TVRXStatusCode::kTypeMismatch);
+    }
+    return entry->second.ToString(kDecimal);
+}
+
+// Counts the links of a superclass chain while it is being followed.
+class TDepthCount
+{
+  public:
+    explicit TDepthCount(unsigned int& depth) : fDepth(depth) { ++fDepth; }
+    ~TDepthCount() { --fDepth; }
+    TDepthCount(const TDepthCount&) = delete;
+    TDepthCount& operator=(const TDepthCount&) = delete;
+
+  private:
+    unsigned int& fDepth;
+};
+
+} // namespace
+
+std::string TPEGASUSNamespace::NormalizeName(const std::string& name)
+{
+    std::string normalized = name;
+    for (char& character : normalized)
+        character = static_cast<char>(std::tolower(static_cast<unsigned char>(character)));
+    if (!IsLegalName(normalized)) {
+        LogFailure("PEGASUS: CIM name '", name, "' is invalid");
+        throw TVRXException(TVRXStatusCode::kInvalidName);
+    }
+    return normalized;
+}
+
+boost::shared_ptr<TPEGASUSClass> TPEGASUSNamespace::FindClass(const std::string& key) const
+{
+    const auto entry = fClasses.find(key);
+    return entry == fClasses.end() ? nullptr : entry->second;
+}
+
+boost::shared_ptr<ICIMClass> TPEGASUSNamespace::GetClass(const std::string& name, TCIMContext context)
+{
+    if (!isConnected() || name.empty())
+        return nullptr;
+    if (name == kRootClassName) {
+        LogProgress("TPEGASUSNamespace::GetClass ", name, " : return <root>");
+        return fRootClass;
+    }
+    const std::string key = NormalizeName(name);
+    if (const auto cached = FindClass(key)) {
+        LogProgress("TPEGASUSNamespace::GetClass ", name, " Found in TPEGASUSNamespace");
+        return cached;
+    }
+    return FetchClass(name, key, context);
+}
+
+boost::shared_ptr<ICIMClass> TPEGASUSNamespace::FetchClass(const std::string& name, const std::string& key,
+                                                           const TCIMContext& context)
+{
+    const TDepthCount depth(fSuperClassDepth);
+    if (fSuperClassDepth > kMaxSuperClassDepth) {
+        LogFailure("TPEGASUSNamespace::GetClass failed for: ", name, ": more than ", kMaxSuperClassDepth,
+                   " superclasses");
+        return nullptr;
+    }
+    LogProgress("TPEGASUSNamespace::GetClass from Pegasus for: ", name);
+    const std::string cimNamespace = TextFromContext(context, kNspKey, kDefaultCimNamespace);
+    const std::string timeout = TextFromContext(context, kTimeoutKey, strTimeout);
+    LogProgress("TPEGASUSNamespace::GetClass  NSP=", cimNamespace, " CLASSNAME = ", name,
+                " From Pegasus CIMOM with ei timeout = ", timeout);
+    Pegasus::CIMClass answer;
+    TCIMContext classContext = {{kNspKey, cimNamespace}, {kTimeoutKey, timeout}};
+    if (!AskServerForClass(cimNamespace, name, answer) || !MirrorClass(answer, context, classContext))
+        return nullptr;
+    const auto mirrored = FindClass(key);
+    if (mirrored)
+        LogProgress("TPEGASUSNamespace::GetClass ", name, " Now it is Found in TPEGASUSNamespace");
+    else
+        LogFailure("TPEGASUSNamespace::GetClass ", name, " Not Found - Something Wrong");
+    return mirrored;
+}
+
+// Returns: false when the server does not give the class. An answer that is no HTTP message counts as an answer, and
+// leaves the class uninitialised.
+bool TPEGASUSNamespace::AskServerForClass(const std::string& cimNamespace, const std::string& name,
+                                          Pegasus::CIMClass& answer)
+{
+    try {
+        getPegClient()->setTimeout(kGetClassTimeoutMs);
+        answer =
+            getPegClient()->getClass(Pegasus::CIMNamespaceName(cimNamespace.c_str()), Pegasus::CIMName(name.c_str()),
+                                     false, true, false, Pegasus::CIMPropertyList());
+    } catch (const Pegasus::CIMClientMalformedHTTPException& exception) {
+        LogProgress("Pegasus::CIMClientMalformedHTTPException -- ", ToStdString(exception.getMessage()));
+    } catch (const Pegasus::Exception& exception) {
+        LogProgress("TPEGASUSNamespace::GetClass from Pegasus for: ", name,
+                    " returned exception: ", ToStdString(exception.getMessage()));
+        return false;
+    }
+    return true;
+}
+
+// Builds the class below its superclass, which is mirrored first, and enters it into the cache.
+// Returns: false when it cannot be built.
+// Throws: Pegasus::UninitializedObjectException when the source holds no class.
+bool TPEGASUSNamespace::MirrorClass(const Pegasus::CIMClass& source, const TCIMContext& callerContext,
+                                    TCIMContext& classContext)
+{
+    const std::string name = ToStdString(source.getClassName().getString());
+    const std::string superName = ToStdString(source.getSuperClassName().getString());
+    const boost::shared_ptr<ICIMClass> superClass = GetClass(superName, callerContext);
+    try {
+        const boost::shared_ptr<ICIMClass> mirrored =
+            AllocateClass(name, classContext[kNspKey].ToString(kDecimal), classContext[kTimeoutKey].ToString(kDecimal),
+                          superClass, classContext);
+        LogProgress("AllocateClass  --> ", name, "  inherit from --> ", superName);
+        boost::dynamic_pointer_cast<TPEGASUSClass>(mirrored)->AddToNamespace({});
+    } catch (const std::exception& exception) {
+        LogProgress("Catching exeption: AllocateClass  --- ", name, "  ", superName,
+                    "\twith reason: ", exception.what());
+        std::cout << "AllocateClass falied  --- " << name << "  " << superName << std::endl;
+        return false;
+    }
+    return true;
+}
+
+boost::shared_ptr<ICIMClass> TPEGASUSNamespace::AllocateClass(const std::string&, boost::shared_ptr<ICIMClass>,
+                                                              TCIMContext)
+{
+    return nullptr;
+}
+
+boost::shared_ptr<ICIMClass> TPEGASUSNamespace::AllocateClass(const std::string& name, const std::string& cimNamespace,
+                                                              const std::string& timeout,
+                                                              boost::shared_ptr<ICIMClass> superClass, TCIMContext&)
+{
+    const auto parent = superClass ? boost::dynamic_pointer_cast<TPEGASUSClass>(superClass) : fRootClass;
+    const auto allocated = boost::make_shared<TPEGASUSClass>(shared_from_this(), name, parent);
+    allocated->Initialize(cimNamespace, timeout, parent);
+    return allocated;
+}
+
+void TPEGASUSNamespace::AddClass(boost::shared_ptr<TPEGASUSClass> newClass)
+{
+    boost::shared_ptr<TPEGASUSClass>& slot =
+        DefinitionSlot(fClasses, newClass->GetName({}), fAllowRedefinition, "TPEGASUSNamespace: class ");
+    if (slot)
+        newClass->SetChildClasses(slot->GetChildClasses());
+    slot = newClass;
+}
+
+void TPEGASUSNamespace::EnumerateRootClasses(TClassVisitor visitor, TCIMContext context)
+{
+    if (isConnected() && fRootClass)
+        fRootClass->EnumerateSubClasses(visitor, true, context);
+}
+
+} // namespace NKOLVRX20

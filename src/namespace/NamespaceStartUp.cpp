@@ -1,0 +1,147 @@
+// Start-up: from a constructed namespace to a connected one with the base schema and the vendors' files in place.
+#include <fstream>
+
+#include <unistd.h>
+
+#include <host/TOSSpecific.h>
+#include <host/TVRXException.h>
+
+#include "src/common/Constants.h"
+#include "src/common/CoreLog.h"
+#include "src/namespace/Removal.h"
+#include "src/namespace/SafeNames.h"
+#include "src/namespace/ServerTree.h"
+#include "src/namespace/TPEGASUSNamespace.h"
+#include "src/plugin/TPEGASUSNamespaceProvider.h"
+#include "src/schema/TPEGASUSClass.h"
+
+namespace NKOLVRX20 {
+
+namespace {
+
+constexpr std::size_t kRootPathBytes = 1024;
+constexpr char kConsumerKey[] = "consumer";
+constexpr char kDefaultConsumer[] = "quvex";
+
+constexpr int kStartAttempts = 6;
+constexpr unsigned int kRestartPauseSeconds = 1;
+constexpr unsigned char kDecimal = 10;
+
+// The LSI provider reads its configuration from the file-system root.
+constexpr char kLsiConfiguration[] = "/lsi_mr.conf";
+
+// The Brocade provider works with adapters of this version only.
+constexpr char kBrocadeVersionCommand[] = "bcu -v";
+constexpr int kBrocadeTimeoutSeconds = 300;
+constexpr char kBrocadeVersion[] = "3.0.0";
+constexpr char kBrocadeLibrary[] = "/brocade/libdbfaj.so";
+
+std::string ConsumerFromContext(const TCIMContext& context)
+{
+    const auto entry = context.find(kConsumerKey);
+    return entry == context.end() ? kDefaultConsumer : entry->second.ToString(kDecimal);
+}
+
+std::string BrocadeVersion()
+{
+    std::string output;
+    try {
+        TOSSpecific::SpawnProcess(kBrocadeVersionCommand, {}, output, kBrocadeTimeoutSeconds);
+    } catch (const TVRXException& exception) {
+        LogFailure(exception.what());
+        output.clear();
+    }
+    return output;
+}
+
+} // namespace
+
+std::string TPEGASUSNamespace::GetVRXRootPath()
+{
+    char path[kRootPathBytes];
+    return ::getcwd(path, sizeof path) ? path : "";
+}
+
+void TPEGASUSNamespace::Initialize(TCIMContext context)
+{
+    fConsumerName = ConsumerFromContext(context);
+    LogProgress("PEGASUS NSP with the consumer: ", fConsumerName);
+    RefuseUnsafeNames();
+    StartServerAndConnect();
+    CreateRootClass();
+    CompileBaseSchema();
+    preConfig();
+}
+
+void TPEGASUSNamespace::RefuseUnsafeNames()
+{
+    const bool safeConsumer = IsSafeNamePart(fConsumerName);
+    if (!fRefused && safeConsumer)
+        return;
+    const bool unsafeRoot = fRefused;
+    fRefused = true;
+    LogFailure(
+        "TPEGASUSNamespace::Initialize failed: ", unsafeRoot ? "unsafe root directory: \"" : "unsafe consumer name: \"",
+        unsafeRoot ? fRootDirectory : fConsumerName, "\"");
+    throw TVRXException(TVRXStatusCode::kBadPath);
+}
+
+void TPEGASUSNamespace::StartServerAndConnect()
+{
+    for (int attempt = 1; attempt <= kStartAttempts; ++attempt) {
+        if (TryToStartServer(attempt))
+            return;
+    }
+}
+
+bool TPEGASUSNamespace::TryToStartServer(int attempt)
+{
+    try {
+        cleanCimserver();
+        closeCimserver(false);
+        fPort = getAvailablePort();
+        callCimserver(fPort);
+        Init();
+        connect(fHostAddress, fPort, "", "");
+        return true;
+    } catch (const TVRXException& exception) {
+        LogFailure("TPEGASUSNamespace::connect failed: ", exception.what(), " try to restart cimserver ", attempt,
+                   "\n");
+        ::sleep(kRestartPauseSeconds);
+        return false;
+    }
+}
+
+void TPEGASUSNamespace::CreateRootClass()
+{
+    TCIMContext context;
+    fRootClass = boost::dynamic_pointer_cast<TPEGASUSClass>(
+        AllocateClass(kRootClassName, kDefaultCimNamespace, strTimeout, nullptr, context));
+}
+
+void TPEGASUSNamespace::CompileBaseSchema()
+{
+    const std::string schema = TPEGASUSNamespaceProvider::GetfgModulePathName() + kSchemaDirectory;
+    callCimmof(kInternalNamespace, schema + "/PG_Internal/PG_Internal.mof");
+    callCimmof(kInterOpNamespace, schema + "/PG_InterOp/PG_InterOp.mof");
+}
+
+void TPEGASUSNamespace::preConfig()
+{
+    const std::string vendors = fRootDirectory + kProviderDirectory;
+    callCimconfig();
+    RemovePath(kLsiConfiguration, kRemoveTree);
+    if (BrocadeVersion().find(kBrocadeVersion) == std::string::npos)
+        RemovePath(vendors + kBrocadeLibrary, kRemoveTree);
+    WriteLsiConfiguration();
+}
+
+void TPEGASUSNamespace::WriteLsiConfiguration() const
+{
+    const std::string directory = fRootDirectory + kLsiDirectory;
+    std::ofstream file(kLsiConfiguration, std::ios::trunc);
+    if (file)
+        file << "DATA_DIR=" << directory << "\nLIBRARY_DIR=" << directory;
+}
+
+} // namespace NKOLVRX20

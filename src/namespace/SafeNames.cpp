@@ -1,0 +1,35 @@
+#include "src/namespace/SafeNames.h"
+
+#include <algorithm>
+
+namespace NKOLVRX20 {
+
+namespace {
+
+constexpr char kShellCharacters[] = " \"'\\`$&|;<>()*?[]{}!#~";
+
+bool IsControl(char character)
+{
+    const auto byte = static_cast<unsigned char>(character);
+    return byte < 0x20 || byte == 0x7F;
+}
+
+bool HasUnsafeCharacter(const std::string& text)
+{
+    return std::any_of(text.begin(), text.end(), IsControl) ||
+           text.find_first_of(kShellCharacters) != std::string::npos;
+}
+
+} // namespace
+
+bool IsSafeDirectory(const std::string& path)
+{
+    return !path.empty() && !HasUnsafeCharacter(path);
+}
+
+bool IsSafeNamePart(const std::string& name)
+{
+    return name.find('/') == std::string::npos && !HasUnsafeCharacter(name);
+}
+
+} // namespace NKOLVRX20
