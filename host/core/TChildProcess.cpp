@@ -1,5 +1,7 @@
 #include "TChildProcess.h"
 
+#include "TProcessControl.h"
+
 #include <algorithm>
 #include <cerrno>
 #include <csignal>
@@ -20,6 +22,10 @@ namespace {
 
 // How often the child is looked at where the kernel cannot announce its exit.
 constexpr std::chrono::milliseconds kExitPollInterval{20};
+
+// Read at a time: more than a pipe holds, so that nothing is missed after the exit, but bounded, so that a program that
+// never stops writing cannot keep the deadline from being looked at.
+constexpr int kMaxReadsAtOnce = 16;
 
 // RAII for the two plain structures of posix_spawn.
 struct TSpawnSettings
@@ -109,6 +115,10 @@ TChildProcess::TChildProcess(const TProcessRequest& request) : fRequest(request)
 TProcessOutcome TChildProcess::Run(std::chrono::milliseconds timeout)
 {
     const auto deadline = TClock::now() + timeout;
+    if (TProcessControl::Instance().IsCancelled()) {
+        fOutcome.fEnd = TProcessOutcome::kCancelled;
+        return std::move(fOutcome);
+    }
     if (const int error = Start()) {
         fOutcome.fEnd = TProcessOutcome::kNotRun;
         fOutcome.fStatus = error;
@@ -120,7 +130,8 @@ TProcessOutcome TChildProcess::Run(std::chrono::milliseconds timeout)
     Reap();
     DrainBoth();
     if (!exited)
-        fOutcome.fEnd = TProcessOutcome::kTimedOut;
+        fOutcome.fEnd =
+            TProcessControl::Instance().IsCancelled() ? TProcessOutcome::kCancelled : TProcessOutcome::kTimedOut;
     return std::move(fOutcome);
 }
 
@@ -161,16 +172,18 @@ bool TChildProcess::AwaitExit(TClock::time_point deadline)
     return true;
 }
 
-// Waits for output, for the exit or for the deadline. Returns: false when the deadline has passed.
+// Waits for output, for the exit, for the deadline or for a cancellation. Returns: false for the latter two.
 bool TChildProcess::PollOnce(TClock::time_point deadline)
 {
     const auto left = std::chrono::ceil<std::chrono::milliseconds>(deadline - TClock::now());
-    if (left.count() <= 0)
+    if (left.count() <= 0 || TProcessControl::Instance().IsCancelled())
         return false;
     const auto wait = fPidFd ? left : std::min(left, kExitPollInterval);
     // A negative descriptor is skipped, so closed pipes and a missing pid descriptor need no special case.
-    pollfd fds[] = {
-        {fOutputPipe.fRead.Get(), POLLIN, 0}, {fErrorPipe.fRead.Get(), POLLIN, 0}, {fPidFd.Get(), POLLIN, 0}};
+    pollfd fds[] = {{fOutputPipe.fRead.Get(), POLLIN, 0},
+                    {fErrorPipe.fRead.Get(), POLLIN, 0},
+                    {fPidFd.Get(), POLLIN, 0},
+                    {TProcessControl::Instance().GetWakeFd(), POLLIN, 0}};
     constexpr long kMaxWaitMs = 60 * 60 * 1000; // poll takes an int
     ::poll(fds, std::size(fds), static_cast<int>(std::min<long>(wait.count(), kMaxWaitMs)));
     return true;

@@ -31,7 +31,8 @@ struct TProcessOutcome
         kSignaled, // fStatus is the signal
         kUnknown,  // it ended, but this process's SIGCHLD disposition threw the status away
         kNotRun,   // fStatus is the errno of the failed start
-        kTimedOut  // killed
+        kTimedOut, // killed
+        kCancelled // killed, or not started, because programs are cancelled (TProcessControl)
     };
 
     EEnd fEnd = kNotRun;
@@ -57,7 +58,8 @@ class TChildProcess
 
     // Never throws for what the child does; see TProcessOutcome.
     // Throws: std::bad_alloc.
-    // Blocks: until the child exits (not until its last descendant closes the pipes) or the time is over.
+    // Blocks: until the child exits (not until its last descendant closes the pipes), the time is over or programs are
+    // cancelled.
     TProcessOutcome Run(std::chrono::milliseconds timeout);
 
   private:

@@ -57,7 +57,8 @@ void TCoreLogger::Configure(const TOptions& options)
     const auto sinks = std::make_shared<TSinks>();
     try {
         if (!options.fFile.empty())
-            sinks->fLogger.sinks().push_back(std::make_shared<spdlog::sinks::basic_file_sink_mt>(options.fFile));
+            sinks->fLogger.sinks().push_back(
+                std::make_shared<spdlog::sinks::basic_file_sink_mt>(options.fFile, options.fTruncate));
         if (options.fToStandardError)
             sinks->fLogger.sinks().push_back(std::make_shared<spdlog::sinks::stderr_sink_mt>());
     } catch (const spdlog::spdlog_ex&) {

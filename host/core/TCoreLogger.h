@@ -16,7 +16,8 @@ class TCoreLogger : public ILogger
   public:
     struct TOptions
     {
-        std::string fFile; // empty for none; appended to, created with mode 0666 less the umask
+        std::string fFile;      // empty for none; created with mode 0666 less the umask
+        bool fTruncate = false; // what the file holds already is dropped rather than appended to
         bool fToStandardError = false;
         EVRXLogSeverity fLeastSevere = kInfo; // entries beyond this severity are dropped
     };

@@ -8,6 +8,7 @@
 #include <host/TVRXException.h>
 
 #include "TChildProcess.h"
+#include "TProcessControl.h"
 #include "TProcessLog.h"
 
 namespace NKOLVRX20 {
@@ -27,6 +28,8 @@ void RunAndReport(const TProcessRequest& request, std::string& output, int timeo
     TProcessOutcome outcome = TChildProcess(request).Run(std::chrono::seconds(std::max(timeoutSeconds, 1)));
     TProcessLog::Instance().Add(request, outcome);
     output = std::move(outcome.fOutput);
+    if (outcome.fEnd == TProcessOutcome::kCancelled)
+        throw TProgramsCancelled();
     if (outcome.fEnd == TProcessOutcome::kNotRun || outcome.fEnd == TProcessOutcome::kTimedOut)
         throw TVRXException(TVRXStatusCode::kProcessFailed);
 }

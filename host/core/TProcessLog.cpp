@@ -15,6 +15,7 @@ TFailedProgram Describe(const TProcessRequest& request, const TProcessOutcome& o
     program.fArguments.assign(std::next(request.fArguments.begin()), request.fArguments.end());
     program.fEnd = outcome.fEnd;
     program.fStatus = outcome.fStatus;
+    program.fOutput = outcome.fOutput.substr(0, kMaxErrorOutputBytes);
     program.fErrorOutput = outcome.fErrorOutput;
     return program;
 }
@@ -47,6 +48,8 @@ std::string TFailedProgram::GetReason() const
         return std::string("not started: ") + std::strerror(fStatus);
     case TProcessOutcome::kTimedOut:
         return "killed because its time ran out";
+    case TProcessOutcome::kCancelled:
+        return "cancelled";
     }
     return "";
 }
@@ -63,7 +66,7 @@ void TProcessLog::Add(const TProcessRequest& request, const TProcessOutcome& out
         return;
     const TFailedProgram program = Describe(request, outcome);
     TRootObject::GetCoreLogger()->Log(ILogger::kInfo, LogLine(program, outcome));
-    if (outcome.IsSuccess())
+    if (outcome.IsSuccess() || outcome.fEnd == TProcessOutcome::kCancelled)
         return;
     const std::lock_guard<std::mutex> lock(fMutex);
     if (fEntries.size() == kMaxEntries)

@@ -18,6 +18,7 @@ struct TFailedProgram
     std::vector<std::string> fArguments; // without argv[0]
     TProcessOutcome::EEnd fEnd;
     int fStatus;
+    std::string fOutput; // its beginning: some programs tell their failures here
     std::string fErrorOutput;
 
     // Returns: "exit status 250", "signal 11 (Segmentation fault)", "not started: No such file or directory" ...

@@ -134,13 +134,15 @@ class TCIMValue
     bool IsArray() const;
     bool IsNull() const;
 
-    // Reads the text as the value's own type (a value without type becomes a string) and makes it not null.
+    // Reads the text as the value's own type (a value without type becomes a string) and makes it not null. Integers
+    // and char16 codes are decimal; an array takes the empty text alone and becomes empty.
     // Throws: TVRXException 14 when the text is no such value; the value is then unchanged.
     void Set(const std::string& text);
 
-    // Returns: integers in the radix (2 to 36); reals in %g with all digits; booleans "true"/"false"; char16 its
-    // code in the radix; datetime its 25 characters; reference its path text; arrays their elements joined by ", ";
-    // null the empty text.
+    // Returns: integers in the radix (2 to 36); reals in %g form with just the digits that tell them apart; booleans
+    // "true"/"false"; char16 its code in the radix; datetime its 25 characters; reference its path text; arrays their
+    // elements joined by ", "; null the empty text. No locale has influence.
+    // Throws: TVRXException 14 for another radix.
     std::string ToString(unsigned char radix) const;
 
     // The class that a reference value refers to.
@@ -148,7 +150,7 @@ class TCIMValue
     boost::shared_ptr<ICIMClass> GetReferencedClass() const;
     void SetReferencedClass(const boost::shared_ptr<ICIMClass>& referencedClass);
 
-    // Same type, same array flag, both null or equal values.
+    // Same type, same array flag, both null or equal values; not-a-number equals itself.
     bool operator==(const TCIMValue& other) const;
     bool operator!=(const TCIMValue& other) const { return !(*this == other); }
     // A total order: by type code, nulls first, then by value (arrays lexicographically).

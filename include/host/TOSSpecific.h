@@ -12,8 +12,10 @@ namespace NKOLVRX20 {
 // SpawnProcess runs a program without a shell and captures its standard output. The child gets default signal
 // dispositions, an empty signal mask, a process group of its own, and no descriptor above 2 that this process did not
 // mean for it. Standard error and a status other than 0 are not an error of the call: the host logs them.
-// Time-outs are in seconds; one that ends kills and reaps the whole group.
-// Throws: TVRXException 12 when the program cannot be run or its time ran out; output holds what was captured.
+// Time-outs are in seconds, at least 1; one that ends kills the whole group and reaps the child. Output beyond 16 MiB
+// and standard error beyond 64 KiB are dropped, and the log says so.
+// Throws: TVRXException 12 when the program cannot be run or its time ran out; output holds what was captured. While
+// the host shuts down, an exception of its own that is no TVRXException and is not for the caller to handle.
 // Blocks: until the child exits (a daemon that it leaves behind does not count) or the time-out ends.
 // Thread: safe.
 class TOSSpecific

@@ -1,0 +1,35 @@
+#include "TProcessControl.h"
+
+#include <sys/eventfd.h>
+
+namespace NKOLVRX20 {
+
+TProgramsCancelled::~TProgramsCancelled() = default;
+
+const char* TProgramsCancelled::what() const noexcept
+{
+    return "The host is shutting down and runs no programs";
+}
+
+TProcessControl& TProcessControl::Instance()
+{
+    static TProcessControl* instance = new TProcessControl; // outlives every plug-in
+    return *instance;
+}
+
+TProcessControl::TProcessControl() : fWake(::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK)) {}
+
+void TProcessControl::Cancel()
+{
+    fCancelled = true;
+    ::eventfd_write(fWake.Get(), 1);
+}
+
+void TProcessControl::Resume()
+{
+    fCancelled = false;
+    eventfd_t ignored;
+    ::eventfd_read(fWake.Get(), &ignored);
+}
+
+} // namespace NKOLVRX20

@@ -1,0 +1,43 @@
+#ifndef VRX_TPROCESSCONTROL_H
+#define VRX_TPROCESSCONTROL_H
+
+#include <atomic>
+#include <exception>
+
+#include "UniqueFd.h"
+
+namespace NKOLVRX20 {
+
+// What leaves TOSSpecific::SpawnProcess while programs are cancelled. On purpose no TVRXException: a plug-in that
+// retries after one of those must not retry against a host that is shutting down.
+class TProgramsCancelled : public std::exception
+{
+  public:
+    ~TProgramsCancelled() override;
+    const char* what() const noexcept override;
+};
+
+// The host's switch for all child processes: while cancelled, running programs are killed and none is started.
+// Thread: safe.
+class TProcessControl
+{
+  public:
+    static TProcessControl& Instance();
+
+    void Cancel();
+    void Resume();
+    bool IsCancelled() const { return fCancelled; }
+
+    // Readable while cancelled, for poll().
+    int GetWakeFd() const { return fWake.Get(); }
+
+  private:
+    TProcessControl();
+
+    std::atomic<bool> fCancelled{false};
+    UniqueFd fWake;
+};
+
+} // namespace NKOLVRX20
+
+#endif
