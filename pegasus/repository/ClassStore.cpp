@@ -1,0 +1,129 @@
+#include "pegasus/repository/ClassStore.h"
+
+#include "pegasus/repository/ClassChecker.h"
+#include "pegasus/repository/ClassFilter.h"
+#include "pegasus/repository/ClassResolver.h"
+#include "pegasus/repository/Failure.h"
+#include "pegasus/repository/Names.h"
+
+namespace Pegasus::repository {
+
+ClassStore::ClassStore(Storage& storage, ObjectText& texts, QualifierStore& qualifiers, const Limits& limits)
+    : fStorage(storage), fTexts(texts), fQualifiers(qualifiers), fLimits(limits), fCache(limits.cachedClassCount)
+{
+}
+
+/// Recursion ends at a root class; the depth is bounded when classes are created.
+CIMClass ClassStore::resolved(NamespaceId nameSpace, const CIMName& name)
+{
+    const std::string key = folded(name);
+    const CIMClass cached = fCache.find(nameSpace, key);
+    if (!cached.isUninitialized())
+        return cached;
+    const std::optional<std::string> text = fStorage.findClass(nameSpace, key);
+    if (!text)
+        return CIMClass();
+    const CIMClass local = fTexts.toClass(*text);
+    const CIMName superName = local.getSuperClassName();
+    const CIMClass whole = resolveClass(local, superName.isNull() ? CIMClass() : resolved(nameSpace, superName));
+    fCache.insert(nameSpace, key, whole);
+    return whole;
+}
+
+CIMClass ClassStore::get(NamespaceId nameSpace, const CIMName& name, const ClassOptions& options)
+{
+    const CIMClass whole = resolved(nameSpace, name);
+    if (whole.isUninitialized())
+        fail(CIM_ERR_NOT_FOUND, utf8(name));
+    return options.propertyList.isNull() ? fCache.filtered(nameSpace, folded(name), options)
+                                         : filterClass(whole, options);
+}
+
+bool ClassStore::has(NamespaceId nameSpace, const CIMName& name)
+{
+    return fStorage.findSuperClass(nameSpace, utf8(name)).has_value();
+}
+
+CIMName ClassStore::superClass(NamespaceId nameSpace, const CIMName& name)
+{
+    const std::optional<std::string> superName = fStorage.findSuperClass(nameSpace, utf8(name));
+    if (!superName)
+        fail(CIM_ERR_NOT_FOUND, utf8(name));
+    return superName->empty() ? CIMName() : CIMName(superName->c_str());
+}
+
+std::vector<CIMName> ClassStore::listNames(NamespaceId nameSpace, const CIMName& name, bool isDeep)
+{
+    if (!name.isNull() && !has(nameSpace, name))
+        fail(CIM_ERR_INVALID_CLASS, utf8(name));
+    std::vector<CIMName> names;
+    for (const std::string& text : fStorage.listSubclasses(nameSpace, utf8(name), isDeep))
+        names.emplace_back(text.c_str());
+    return names;
+}
+
+void ClassStore::create(NamespaceId nameSpace, const CIMConstClass& newClass)
+{
+    if (has(nameSpace, newClass.getClassName()))
+        fail(CIM_ERR_ALREADY_EXISTS, utf8(newClass.getClassName()));
+    put(nameSpace, newClass);
+}
+
+void ClassStore::modify(NamespaceId nameSpace, const CIMConstClass& modified)
+{
+    expectUnused(nameSpace, modified.getClassName());
+    put(nameSpace, modified);
+}
+
+void ClassStore::remove(NamespaceId nameSpace, const CIMName& name)
+{
+    expectUnused(nameSpace, name);
+    fStorage.deleteClass(nameSpace, utf8(name));
+    fCache.remove(nameSpace, folded(name));
+}
+
+/// The new class goes into the cache at once: a compiler creates its subclasses next.
+void ClassStore::put(NamespaceId nameSpace, const CIMConstClass& newClass)
+{
+    checkDepth(nameSpace, newClass);
+    const CIMClass superClass = resolvedSuperClass(nameSpace, newClass);
+    const CIMClass local = checkClass(newClass, superClass, fQualifiers.lookupIn(nameSpace));
+    const std::string text = fTexts.fromClass(local);
+    fStorage.putClass(nameSpace, utf8(local.getClassName()), utf8(local.getSuperClassName()), text);
+    fCache.insert(nameSpace, folded(local.getClassName()), resolveClass(local, superClass));
+}
+
+CIMClass ClassStore::resolvedSuperClass(NamespaceId nameSpace, const CIMConstClass& newClass)
+{
+    const CIMName superName = newClass.getSuperClassName();
+    if (superName.isNull())
+        return CIMClass();
+    const CIMClass superClass = resolved(nameSpace, superName);
+    if (superClass.isUninitialized() || superName.equal(newClass.getClassName()))
+        fail(CIM_ERR_INVALID_SUPERCLASS, utf8(superName));
+    return superClass;
+}
+
+void ClassStore::checkDepth(NamespaceId nameSpace, const CIMConstClass& newClass)
+{
+    std::size_t depth = 1;
+    std::string above = utf8(newClass.getSuperClassName());
+    while (!above.empty()) {
+        if (++depth > fLimits.inheritanceDepth)
+            fail(CIM_ERR_SERVER_LIMITS_EXCEEDED,
+                 "class is deeper than the limit inheritanceDepth (" + std::to_string(fLimits.inheritanceDepth) + ")");
+        above = fStorage.findSuperClass(nameSpace, above).value_or("");
+    }
+}
+
+void ClassStore::expectUnused(NamespaceId nameSpace, const CIMName& name)
+{
+    if (!has(nameSpace, name))
+        fail(CIM_ERR_NOT_FOUND, utf8(name));
+    if (!fStorage.listSubclasses(nameSpace, utf8(name), false).empty())
+        fail(CIM_ERR_CLASS_HAS_CHILDREN, utf8(name));
+    if (fStorage.hasInstances(nameSpace, utf8(name)))
+        fail(CIM_ERR_CLASS_HAS_INSTANCES, utf8(name));
+}
+
+} // namespace Pegasus::repository

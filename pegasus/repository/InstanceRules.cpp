@@ -1,0 +1,133 @@
+#include "pegasus/repository/InstanceRules.h"
+
+#include <algorithm>
+
+#include "pegasus/repository/ClassFilter.h"
+#include "pegasus/repository/Failure.h"
+#include "pegasus/repository/Names.h"
+
+namespace Pegasus::repository {
+
+namespace {
+
+CIMConstProperty declaredProperty(const CIMConstClass& itsClass, const CIMName& name)
+{
+    const Uint32 index = itsClass.findProperty(name);
+    if (index == PEG_NOT_FOUND)
+        fail(CIM_ERR_FAILED, "no such property: " + utf8(name));
+    return itsClass.getProperty(index);
+}
+
+CIMProperty propertyOf(const CIMConstProperty& declared, const CIMValue& value, bool isPropagated)
+{
+    return CIMProperty(declared.getName(), value, declared.getArraySize(), declared.getReferenceClassName(),
+                       declared.getClassOrigin(), isPropagated);
+}
+
+CIMProperty givenProperty(const CIMConstProperty& given, const CIMConstClass& itsClass)
+{
+    const CIMConstProperty declared = declaredProperty(itsClass, given.getName());
+    if (given.getType() != declared.getType() || given.isArray() != declared.isArray())
+        fail(CIM_ERR_FAILED, "type mismatch");
+    return propertyOf(declared, given.getValue(), false);
+}
+
+CIMKeyBinding keyBinding(const CIMConstProperty& property)
+{
+    const CIMValue& value = property.getValue();
+    const CIMType type = value.getType();
+    const bool isText = type == CIMTYPE_STRING || type == CIMTYPE_CHAR16 || type == CIMTYPE_DATETIME;
+    if (value.isNull() && !isText)
+        fail(CIM_ERR_INVALID_PARAMETER, "key property " + utf8(property.getName()) + " is null");
+    if (value.isNull())
+        return CIMKeyBinding(property.getName(), String(), CIMKeyBinding::STRING);
+    return CIMKeyBinding(property.getName(), value);
+}
+
+std::string canonicalValue(const CIMKeyBinding& key)
+{
+    switch (key.getType()) {
+    case CIMKeyBinding::REFERENCE: {
+        const CIMObjectPath path(key.getValue());
+        return folded(path.getNameSpace()) + ":" + pathKey(path);
+    }
+    case CIMKeyBinding::BOOLEAN:
+        return foldCase(utf8(key.getValue()));
+    case CIMKeyBinding::NUMERIC:
+        return canonicalNumber(utf8(key.getValue()));
+    default:
+        return utf8(key.getValue());
+    }
+}
+
+} // namespace
+
+CIMInstance completeInstance(const CIMConstInstance& given, const CIMConstClass& itsClass)
+{
+    if (itsClass.isAbstract())
+        fail(CIM_ERR_NOT_SUPPORTED, "abstract class cannot have instances: " + utf8(itsClass.getClassName()));
+    CIMInstance completed(itsClass.getClassName());
+    for (Uint32 i = 0; i < itsClass.getPropertyCount(); ++i) {
+        const CIMConstProperty declared = itsClass.getProperty(i);
+        if (given.findProperty(declared.getName()) == PEG_NOT_FOUND)
+            completed.addProperty(propertyOf(declared, declared.getValue(), true));
+    }
+    for (Uint32 i = 0; i < given.getPropertyCount(); ++i)
+        completed.addProperty(givenProperty(given.getProperty(i), itsClass));
+    return completed;
+}
+
+CIMObjectPath instancePath(const CIMConstInstance& completed, const CIMConstClass& itsClass)
+{
+    Array<CIMName> keyNames;
+    itsClass.getKeyNames(keyNames);
+    if (keyNames.size() == 0)
+        fail(CIM_ERR_FAILED, "class has no keys: " + utf8(itsClass.getClassName()));
+    Array<CIMKeyBinding> keys;
+    for (Uint32 i = 0; i < keyNames.size(); ++i)
+        keys.append(keyBinding(completed.getProperty(completed.findProperty(keyNames[i]))));
+    return CIMObjectPath(String(), CIMNamespaceName(), itsClass.getClassName(), keys);
+}
+
+void mergeValues(CIMInstance& stored, const CIMConstInstance& modified, const CIMPropertyList& list)
+{
+    for (Uint32 i = 0; i < modified.getPropertyCount(); ++i) {
+        const CIMConstProperty property = modified.getProperty(i);
+        if (!isListed(list, property.getName()))
+            continue;
+        const Uint32 index = stored.findProperty(property.getName());
+        if (index == PEG_NOT_FOUND)
+            fail(CIM_ERR_FAILED, "no such property: " + utf8(property.getName()));
+        CIMProperty target = stored.getProperty(index);
+        if (property.getType() != target.getType() || property.isArray() != target.isArray())
+            fail(CIM_ERR_FAILED, "type mismatch");
+        target.setValue(property.getValue());
+        target.setPropagated(false);
+    }
+}
+
+void filterInstance(CIMInstance& stored, const CIMConstClass& shape, const InstanceOptions& options)
+{
+    for (Uint32 i = stored.getPropertyCount(); i-- > 0;) {
+        CIMProperty property = stored.getProperty(i);
+        const bool fitsShape = shape.isUninitialized() || shape.findProperty(property.getName()) != PEG_NOT_FOUND;
+        if (!fitsShape || !isListed(options.propertyList, property.getName()))
+            stored.removeProperty(i);
+        else if (!options.includeClassOrigin)
+            property.setClassOrigin(CIMName());
+    }
+}
+
+/// Each value comes behind its length, so that no value can look like a further key. CIMObjectPath has its keys sorted.
+std::string pathKey(const CIMObjectPath& path)
+{
+    std::string text = folded(path.getClassName());
+    const Array<CIMKeyBinding>& keys = path.getKeyBindings();
+    for (Uint32 i = 0; i < keys.size(); ++i) {
+        const std::string value = canonicalValue(keys[i]);
+        text += "." + folded(keys[i].getName()) + "=" + std::to_string(value.size()) + ":" + value;
+    }
+    return text;
+}
+
+} // namespace Pegasus::repository

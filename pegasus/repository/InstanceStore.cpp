@@ -1,0 +1,94 @@
+#include "pegasus/repository/InstanceStore.h"
+
+#include "pegasus/repository/Failure.h"
+#include "pegasus/repository/InstanceRules.h"
+
+namespace Pegasus::repository {
+
+namespace {
+
+/// Enough to spread the cost of a query, little enough to keep memory flat.
+constexpr std::size_t kBatchSize = 64;
+
+CIMObjectPath withoutNamespace(CIMObjectPath path)
+{
+    path.setHost(String());
+    path.setNameSpace(CIMNamespaceName());
+    return path;
+}
+
+} // namespace
+
+CIMObjectPath InstanceStore::create(NamespaceId nameSpace, const CIMConstInstance& newInstance)
+{
+    const CIMClass itsClass = classOf(nameSpace, newInstance.getClassName());
+    const CIMInstance completed = completeInstance(newInstance, itsClass);
+    const CIMObjectPath path = instancePath(completed, itsClass);
+    const std::string key = pathKey(path);
+    if (fStorage.findInstance(nameSpace, key))
+        fail(CIM_ERR_ALREADY_EXISTS, utf8(path.toString()));
+    fStorage.insertInstance(nameSpace, utf8(itsClass.getClassName()), key, fTexts.fromInstance(completed));
+    return path;
+}
+
+CIMInstance InstanceStore::get(NamespaceId nameSpace, const CIMObjectPath& path, const InstanceOptions& options)
+{
+    CIMInstance instance = withPath(nameSpace, find(nameSpace, path).body);
+    filterInstance(instance, CIMClass(), options);
+    return instance;
+}
+
+void InstanceStore::modify(NamespaceId nameSpace, const CIMConstInstance& modified, const CIMPropertyList& list)
+{
+    const InstanceRow row = find(nameSpace, modified.getPath());
+    const CIMClass itsClass = classOf(nameSpace, modified.getPath().getClassName());
+    CIMInstance stored = fTexts.toInstance(row.body);
+    mergeValues(stored, modified, list);
+    if (pathKey(instancePath(stored, itsClass)) != pathKey(modified.getPath()))
+        fail(CIM_ERR_INVALID_PARAMETER, "a key property cannot change");
+    fStorage.updateInstance(row.sequence, fTexts.fromInstance(stored));
+}
+
+void InstanceStore::remove(NamespaceId nameSpace, const CIMObjectPath& path)
+{
+    fStorage.deleteInstance(find(nameSpace, path).sequence);
+}
+
+std::vector<CIMInstance> InstanceStore::nextBatch(NamespaceId nameSpace, const CIMName& className,
+                                                  const InstanceOptions& options, std::int64_t& after)
+{
+    const CIMClass itsClass = classOf(nameSpace, className);
+    std::vector<CIMInstance> batch;
+    for (const InstanceRow& row : fStorage.listInstances(nameSpace, utf8(className), after, kBatchSize)) {
+        after = row.sequence;
+        batch.push_back(withPath(nameSpace, row.body));
+        filterInstance(batch.back(), options.deepInheritance ? CIMClass() : itsClass, options);
+    }
+    return batch;
+}
+
+CIMClass InstanceStore::classOf(NamespaceId nameSpace, const CIMName& name)
+{
+    const CIMClass itsClass = fClasses.resolved(nameSpace, name);
+    if (itsClass.isUninitialized())
+        fail(CIM_ERR_INVALID_CLASS, utf8(name));
+    return itsClass;
+}
+
+InstanceRow InstanceStore::find(NamespaceId nameSpace, const CIMObjectPath& path)
+{
+    classOf(nameSpace, path.getClassName());
+    const std::optional<InstanceRow> row = fStorage.findInstance(nameSpace, pathKey(path));
+    if (!row)
+        fail(CIM_ERR_NOT_FOUND, utf8(withoutNamespace(path).toString()));
+    return *row;
+}
+
+CIMInstance InstanceStore::withPath(NamespaceId nameSpace, const std::string& body)
+{
+    CIMInstance instance = fTexts.toInstance(body);
+    instance.setPath(instancePath(instance, classOf(nameSpace, instance.getClassName())));
+    return instance;
+}
+
+} // namespace Pegasus::repository

@@ -1,0 +1,230 @@
+#include "pegasus/repository/Repository.h"
+
+#include "pegasus/repository/Failure.h"
+#include "pegasus/repository/InstanceStore.h"
+#include "pegasus/repository/NamespaceTable.h"
+
+#include <cerrno>
+#include <cstring>
+#include <mutex>
+#include <sys/stat.h>
+
+namespace Pegasus::repository {
+
+namespace {
+
+using Lock = std::lock_guard<std::mutex>;
+
+constexpr const char* kFileName = "/repository.db";
+
+/// Like mkdir -p. Only the owner may look into what is created here.
+void makeDirectories(const std::string& directory)
+{
+    for (std::size_t end = directory.find('/', 1);; end = directory.find('/', end + 1)) {
+        const std::string part = directory.substr(0, end);
+        if (::mkdir(part.c_str(), S_IRWXU) != 0 && errno != EEXIST)
+            fail(CIM_ERR_FAILED, "cannot create directory " + part + ": " + std::strerror(errno));
+        if (end == std::string::npos)
+            return;
+    }
+}
+
+std::string preparedFile(const std::string& directory)
+{
+    makeDirectories(directory);
+    return directory + kFileName;
+}
+
+} // namespace
+
+/// The stores, and the lock that makes operations run one after the other.
+class Repository::State
+{
+  public:
+    State(const std::string& directory, const Limits& givenLimits)
+        : limits(givenLimits), storage(preparedFile(directory)), texts(limits.objectBytes),
+          namespaces(storage, limits.namespaceCount), qualifiers(storage, texts),
+          classes(storage, texts, qualifiers, limits), instances(storage, texts, classes)
+    {
+    }
+
+    const Limits limits;
+    std::mutex mutex;
+    Storage storage;
+    ObjectText texts;
+    NamespaceTable namespaces;
+    QualifierStore qualifiers;
+    ClassStore classes;
+    InstanceStore instances;
+};
+
+Repository::Repository(const std::string& directory, const Limits& limits)
+    : fState(std::make_unique<State>(directory, limits))
+{
+}
+
+Repository::~Repository() = default;
+
+void Repository::createNamespace(const CIMNamespaceName& nameSpace)
+{
+    const Lock lock(fState->mutex);
+    fState->namespaces.create(nameSpace);
+}
+
+void Repository::deleteNamespace(const CIMNamespaceName& nameSpace)
+{
+    const Lock lock(fState->mutex);
+    fState->namespaces.remove(nameSpace);
+}
+
+bool Repository::hasNamespace(const CIMNamespaceName& nameSpace) const
+{
+    const Lock lock(fState->mutex);
+    return fState->namespaces.has(nameSpace);
+}
+
+std::vector<CIMNamespaceName> Repository::namespaces() const
+{
+    const Lock lock(fState->mutex);
+    return fState->namespaces.list();
+}
+
+CIMQualifierDecl Repository::getQualifier(const CIMNamespaceName& nameSpace, const CIMName& name) const
+{
+    const Lock lock(fState->mutex);
+    const CIMQualifierDecl found = fState->qualifiers.find(fState->namespaces.id(nameSpace), name);
+    if (found.isUninitialized())
+        fail(CIM_ERR_NOT_FOUND, utf8(name));
+    return found;
+}
+
+std::vector<CIMQualifierDecl> Repository::enumerateQualifiers(const CIMNamespaceName& nameSpace) const
+{
+    const Lock lock(fState->mutex);
+    return fState->qualifiers.list(fState->namespaces.id(nameSpace));
+}
+
+void Repository::setQualifier(const CIMNamespaceName& nameSpace, const CIMConstQualifierDecl& declaration)
+{
+    const Lock lock(fState->mutex);
+    fState->qualifiers.set(fState->namespaces.id(nameSpace), declaration);
+}
+
+void Repository::deleteQualifier(const CIMNamespaceName& nameSpace, const CIMName& name)
+{
+    const Lock lock(fState->mutex);
+    fState->qualifiers.remove(fState->namespaces.id(nameSpace), name);
+}
+
+CIMConstClass Repository::getClass(const CIMNamespaceName& nameSpace, const CIMName& className,
+                                   const ClassOptions& options) const
+{
+    const Lock lock(fState->mutex);
+    return fState->classes.get(fState->namespaces.id(nameSpace), className, options);
+}
+
+bool Repository::hasClass(const CIMNamespaceName& nameSpace, const CIMName& className) const
+{
+    const Lock lock(fState->mutex);
+    return fState->classes.has(fState->namespaces.id(nameSpace), className);
+}
+
+CIMName Repository::superClass(const CIMNamespaceName& nameSpace, const CIMName& className) const
+{
+    const Lock lock(fState->mutex);
+    return fState->classes.superClass(fState->namespaces.id(nameSpace), className);
+}
+
+std::vector<CIMName> Repository::enumerateClassNames(const CIMNamespaceName& nameSpace, const CIMName& className,
+                                                     bool deepInheritance) const
+{
+    const Lock lock(fState->mutex);
+    return fState->classes.listNames(fState->namespaces.id(nameSpace), className, deepInheritance);
+}
+
+std::vector<CIMConstClass> Repository::enumerateClasses(const CIMNamespaceName& nameSpace, const CIMName& className,
+                                                        bool deepInheritance, const ClassOptions& options) const
+{
+    const Lock lock(fState->mutex);
+    const NamespaceId id = fState->namespaces.id(nameSpace);
+    std::vector<CIMConstClass> found;
+    for (const CIMName& name : fState->classes.listNames(id, className, deepInheritance))
+        found.push_back(fState->classes.get(id, name, options));
+    return found;
+}
+
+void Repository::createClass(const CIMNamespaceName& nameSpace, const CIMConstClass& newClass)
+{
+    const Lock lock(fState->mutex);
+    fState->classes.create(fState->namespaces.id(nameSpace), newClass);
+}
+
+void Repository::modifyClass(const CIMNamespaceName& nameSpace, const CIMConstClass& modifiedClass)
+{
+    const Lock lock(fState->mutex);
+    fState->classes.modify(fState->namespaces.id(nameSpace), modifiedClass);
+}
+
+void Repository::deleteClass(const CIMNamespaceName& nameSpace, const CIMName& className)
+{
+    const Lock lock(fState->mutex);
+    fState->classes.remove(fState->namespaces.id(nameSpace), className);
+}
+
+CIMObjectPath Repository::createInstance(const CIMNamespaceName& nameSpace, const CIMConstInstance& newInstance)
+{
+    const Lock lock(fState->mutex);
+    return fState->instances.create(fState->namespaces.id(nameSpace), newInstance);
+}
+
+CIMInstance Repository::getInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path,
+                                    const InstanceOptions& options) const
+{
+    const Lock lock(fState->mutex);
+    return fState->instances.get(fState->namespaces.id(nameSpace), path, options);
+}
+
+void Repository::modifyInstance(const CIMNamespaceName& nameSpace, const CIMConstInstance& modified,
+                                const CIMPropertyList& propertyList)
+{
+    const Lock lock(fState->mutex);
+    fState->instances.modify(fState->namespaces.id(nameSpace), modified, propertyList);
+}
+
+void Repository::deleteInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path)
+{
+    const Lock lock(fState->mutex);
+    fState->instances.remove(fState->namespaces.id(nameSpace), path);
+}
+
+/// The lock is let go between batches; instances created or deleted meanwhile may or may not be seen.
+void Repository::enumerateInstances(const CIMNamespaceName& nameSpace, const CIMName& className,
+                                    const InstanceOptions& options, const InstanceSink& sink) const
+{
+    std::int64_t after = 0;
+    for (;;) {
+        std::vector<CIMInstance> batch;
+        {
+            const Lock lock(fState->mutex);
+            batch = fState->instances.nextBatch(fState->namespaces.id(nameSpace), className, options, after);
+        }
+        if (batch.empty())
+            return;
+        for (const CIMInstance& instance : batch)
+            if (!sink(instance))
+                return;
+    }
+}
+
+std::vector<CIMObjectPath> Repository::enumerateInstanceNames(const CIMNamespaceName& nameSpace,
+                                                              const CIMName& className) const
+{
+    std::vector<CIMObjectPath> paths;
+    enumerateInstances(nameSpace, className, InstanceOptions(), [&paths](const CIMInstance& instance) {
+        paths.push_back(instance.getPath());
+        return true;
+    });
+    return paths;
+}
+
+} // namespace Pegasus::repository

@@ -1,0 +1,212 @@
+#include "pegasus/repository/Storage.h"
+
+namespace Pegasus::repository {
+
+namespace {
+
+constexpr const char* kSchema =
+    "BEGIN;"
+    "CREATE TABLE IF NOT EXISTS namespaces(id INTEGER PRIMARY KEY, name TEXT NOT NULL COLLATE NOCASE UNIQUE);"
+    "CREATE TABLE IF NOT EXISTS qualifiers(sequence INTEGER PRIMARY KEY, namespace INTEGER NOT NULL,"
+    "  name TEXT NOT NULL COLLATE NOCASE, body TEXT NOT NULL, UNIQUE(namespace, name));"
+    "CREATE TABLE IF NOT EXISTS classes(sequence INTEGER PRIMARY KEY, namespace INTEGER NOT NULL,"
+    "  name TEXT NOT NULL COLLATE NOCASE, super TEXT NOT NULL COLLATE NOCASE, body TEXT NOT NULL,"
+    "  UNIQUE(namespace, name));"
+    "CREATE INDEX IF NOT EXISTS subclasses ON classes(namespace, super);"
+    "CREATE TABLE IF NOT EXISTS instances(sequence INTEGER PRIMARY KEY, namespace INTEGER NOT NULL,"
+    "  class TEXT NOT NULL COLLATE NOCASE, path TEXT NOT NULL, body TEXT NOT NULL, UNIQUE(namespace, path));"
+    "CREATE INDEX IF NOT EXISTS instances_of ON instances(namespace, class);"
+    "COMMIT;";
+
+constexpr const char* kListDeepSubclasses =
+    "WITH RECURSIVE below(name) AS (SELECT ?2 UNION SELECT c.name FROM classes c JOIN below b ON c.super = b.name"
+    "  WHERE c.namespace = ?1)"
+    " SELECT name FROM classes WHERE namespace = ?1 AND super IN (SELECT name FROM below) ORDER BY sequence";
+
+constexpr const char* kListInstances =
+    "WITH RECURSIVE below(name) AS (SELECT ?2 UNION SELECT c.name FROM classes c JOIN below b ON c.super = b.name"
+    "  WHERE c.namespace = ?1)"
+    " SELECT sequence, body FROM instances WHERE namespace = ?1 AND class IN (SELECT name FROM below)"
+    "  AND sequence > ?3 ORDER BY sequence LIMIT ?4";
+
+std::optional<std::string> firstText(Rows rows)
+{
+    if (!rows.next())
+        return std::nullopt;
+    return std::string(rows.text(0));
+}
+
+std::vector<std::string> allTexts(Rows rows)
+{
+    std::vector<std::string> texts;
+    while (rows.next())
+        texts.emplace_back(rows.text(0));
+    return texts;
+}
+
+} // namespace
+
+struct Storage::Statements
+{
+    explicit Statements(const Database& db)
+        : listNamespaces(db, "SELECT id, name FROM namespaces ORDER BY id"),
+          insertNamespace(db, "INSERT INTO namespaces(name) VALUES(?) RETURNING id"),
+          deleteNamespace(db, "DELETE FROM namespaces WHERE id = ?"),
+          namespaceContent(db, "SELECT EXISTS(SELECT 1 FROM qualifiers WHERE namespace = ?1)"
+                               " OR EXISTS(SELECT 1 FROM classes WHERE namespace = ?1)"
+                               " OR EXISTS(SELECT 1 FROM instances WHERE namespace = ?1)"),
+          findQualifier(db, "SELECT body FROM qualifiers WHERE namespace = ? AND name = ?"),
+          listQualifiers(db, "SELECT body FROM qualifiers WHERE namespace = ? ORDER BY sequence"),
+          putQualifier(db, "INSERT INTO qualifiers(namespace, name, body) VALUES(?, ?, ?)"
+                           " ON CONFLICT(namespace, name) DO UPDATE SET body = excluded.body"),
+          deleteQualifier(db, "DELETE FROM qualifiers WHERE namespace = ? AND name = ? RETURNING 1"),
+          findClass(db, "SELECT body FROM classes WHERE namespace = ? AND name = ?"),
+          findSuperClass(db, "SELECT super FROM classes WHERE namespace = ? AND name = ?"),
+          listSubclasses(db, "SELECT name FROM classes WHERE namespace = ? AND super = ? ORDER BY sequence"),
+          listDeepSubclasses(db, kListDeepSubclasses),
+          putClass(db, "INSERT INTO classes(namespace, name, super, body) VALUES(?, ?, ?, ?)"
+                       " ON CONFLICT(namespace, name) DO UPDATE SET super = excluded.super, body = excluded.body"),
+          deleteClass(db, "DELETE FROM classes WHERE namespace = ? AND name = ?"),
+          hasInstances(db, "SELECT 1 FROM instances WHERE namespace = ? AND class = ? LIMIT 1"),
+          findInstance(db, "SELECT sequence, body FROM instances WHERE namespace = ? AND path = ?"),
+          insertInstance(db, "INSERT INTO instances(namespace, class, path, body) VALUES(?, ?, ?, ?)"),
+          updateInstance(db, "UPDATE instances SET body = ?2 WHERE sequence = ?1"),
+          deleteInstance(db, "DELETE FROM instances WHERE sequence = ?"), listInstances(db, kListInstances)
+    {
+    }
+
+    Statement listNamespaces, insertNamespace, deleteNamespace, namespaceContent;
+    Statement findQualifier, listQualifiers, putQualifier, deleteQualifier;
+    Statement findClass, findSuperClass, listSubclasses, listDeepSubclasses, putClass, deleteClass, hasInstances;
+    Statement findInstance, insertInstance, updateInstance, deleteInstance, listInstances;
+};
+
+Storage::Storage(const std::string& path) : fDatabase(path)
+{
+    fDatabase.execute(kSchema);
+    fStatements = std::make_unique<Statements>(fDatabase);
+}
+
+Storage::~Storage() = default;
+
+std::vector<std::pair<NamespaceId, std::string>> Storage::namespaces()
+{
+    std::vector<std::pair<NamespaceId, std::string>> all;
+    Rows rows = fStatements->listNamespaces.run();
+    while (rows.next())
+        all.emplace_back(rows.integer(0), rows.text(1));
+    return all;
+}
+
+NamespaceId Storage::insertNamespace(const std::string& name)
+{
+    Rows rows = fStatements->insertNamespace.run(std::string_view(name));
+    rows.next();
+    const NamespaceId id = rows.integer(0);
+    rows.next(); // the row is only kept once the statement has ended
+    return id;
+}
+
+void Storage::deleteNamespace(NamespaceId id)
+{
+    fStatements->deleteNamespace.execute(id);
+}
+
+bool Storage::isNamespaceEmpty(NamespaceId id)
+{
+    Rows rows = fStatements->namespaceContent.run(id);
+    return rows.next() && rows.integer(0) == 0;
+}
+
+std::optional<std::string> Storage::findQualifier(NamespaceId id, const std::string& name)
+{
+    return firstText(fStatements->findQualifier.run(id, std::string_view(name)));
+}
+
+std::vector<std::string> Storage::listQualifiers(NamespaceId id)
+{
+    return allTexts(fStatements->listQualifiers.run(id));
+}
+
+void Storage::putQualifier(NamespaceId id, const std::string& name, const std::string& body)
+{
+    fStatements->putQualifier.execute(id, std::string_view(name), std::string_view(body));
+}
+
+bool Storage::deleteQualifier(NamespaceId id, const std::string& name)
+{
+    Rows rows = fStatements->deleteQualifier.run(id, std::string_view(name));
+    const bool wasThere = rows.next();
+    if (wasThere)
+        rows.next();
+    return wasThere;
+}
+
+std::optional<std::string> Storage::findClass(NamespaceId id, const std::string& name)
+{
+    return firstText(fStatements->findClass.run(id, std::string_view(name)));
+}
+
+std::optional<std::string> Storage::findSuperClass(NamespaceId id, const std::string& name)
+{
+    return firstText(fStatements->findSuperClass.run(id, std::string_view(name)));
+}
+
+std::vector<std::string> Storage::listSubclasses(NamespaceId id, const std::string& name, bool isDeep)
+{
+    Statement& statement = isDeep ? fStatements->listDeepSubclasses : fStatements->listSubclasses;
+    return allTexts(statement.run(id, std::string_view(name)));
+}
+
+void Storage::putClass(NamespaceId id, const std::string& name, const std::string& superName, const std::string& body)
+{
+    fStatements->putClass.execute(id, std::string_view(name), std::string_view(superName), std::string_view(body));
+}
+
+void Storage::deleteClass(NamespaceId id, const std::string& name)
+{
+    fStatements->deleteClass.execute(id, std::string_view(name));
+}
+
+bool Storage::hasInstances(NamespaceId id, const std::string& className)
+{
+    return fStatements->hasInstances.run(id, std::string_view(className)).next();
+}
+
+std::optional<InstanceRow> Storage::findInstance(NamespaceId id, const std::string& path)
+{
+    Rows rows = fStatements->findInstance.run(id, std::string_view(path));
+    if (!rows.next())
+        return std::nullopt;
+    return InstanceRow{rows.integer(0), std::string(rows.text(1))};
+}
+
+void Storage::insertInstance(NamespaceId id, const std::string& className, const std::string& path,
+                             const std::string& body)
+{
+    fStatements->insertInstance.execute(id, std::string_view(className), std::string_view(path),
+                                        std::string_view(body));
+}
+
+void Storage::updateInstance(std::int64_t sequence, const std::string& body)
+{
+    fStatements->updateInstance.execute(sequence, std::string_view(body));
+}
+
+void Storage::deleteInstance(std::int64_t sequence)
+{
+    fStatements->deleteInstance.execute(sequence);
+}
+
+std::vector<InstanceRow> Storage::listInstances(NamespaceId id, const std::string& className, std::int64_t after,
+                                                std::size_t limit)
+{
+    std::vector<InstanceRow> found;
+    Rows rows =
+        fStatements->listInstances.run(id, std::string_view(className), after, static_cast<std::int64_t>(limit));
+    while (rows.next())
+        found.push_back(InstanceRow{rows.integer(0), std::string(rows.text(1))});
+    return found;
+}
+
+} // namespace Pegasus::repository
