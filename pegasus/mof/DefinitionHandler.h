@@ -30,8 +30,10 @@ class DefinitionHandler
     virtual bool findClass(const CIMName& name, CIMClass& found) = 0;
 
     virtual void declareQualifier(const CIMQualifierDecl& declaration) = 0;
-    virtual void createClass(const CIMClass& newClass) = 0;
-    virtual void createInstance(const CIMInstance& newInstance) = 0;
+    /// Returns false if the class exists and was left as it is.
+    virtual bool createClass(const CIMClass& newClass) = 0;
+    /// Returns false if the instance exists and was left as it is.
+    virtual bool createInstance(const CIMInstance& newInstance) = 0;
 
     /// A remark that does not stop the compilation; place is "file:line:column".
     virtual void warn(const std::string& place, const std::string& text) = 0;

@@ -82,8 +82,8 @@ void FileCompiler::defineClass(const Qualifiers& qualifiers)
     fSubject = fCursor.current().offset;
     const ParsedClass parsed = ClassParser(fCursor, fSession).parse(qualifiers);
     const CIMName name = parsed.itsClass.getClassName();
-    if (isWelcome(parsed.itsClass))
-        fSession.handler.createClass(parsed.itsClass);
+    if (isWelcome(parsed.itsClass) && !fSession.handler.createClass(parsed.itsClass))
+        warn("Class " + utf8(name.getString()) + " already exists in the repository");
     if (!parsed.alias.empty() &&
         !fSession.aliases.define(parsed.alias, CIMObjectPath(String(), CIMNamespaceName(), name)))
         fCursor.failAt(fSubject, "alias $" + parsed.alias + " is already defined");

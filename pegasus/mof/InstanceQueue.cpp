@@ -53,7 +53,8 @@ void InstanceQueue::settle()
             if (it->open.empty()) {
                 const ParsedInstance complete = std::move(*it);
                 it = fWaiting.erase(it);
-                fHandler.createInstance(complete.instance);
+                if (!fHandler.createInstance(complete.instance))
+                    fHandler.warn(complete.place.text(), "the instance already exists, it is not changed");
             } else {
                 ++it;
             }

@@ -77,18 +77,27 @@ std::string SourceText::directory() const
     return slash == std::string::npos ? std::string() : fName.substr(0, slash + 1);
 }
 
+std::size_t SourceText::lineOf(std::size_t offset) const
+{
+    if (offset < fCountedOffset)
+        fCountedOffset = fCountedBreaks = 0;
+    const auto begin = fText.begin();
+    const auto at = [&begin](std::size_t o) { return begin + static_cast<std::ptrdiff_t>(o); };
+    fCountedBreaks += static_cast<std::size_t>(std::count(at(fCountedOffset), at(offset), '\n'));
+    fCountedOffset = offset;
+    return 1 + fCountedBreaks;
+}
+
 SourcePlace SourceText::place(std::size_t offset) const
 {
     offset = std::min(offset, fText.size());
-    const auto begin = fText.begin();
-    const auto at = begin + static_cast<std::ptrdiff_t>(offset);
     const std::size_t lastBreak = offset == 0 ? std::string::npos : fText.rfind('\n', offset - 1);
     const std::size_t lineStart = lastBreak == std::string::npos ? 0 : lastBreak + 1;
     const std::size_t lineEnd = std::min(fText.find_first_of("\r\n", lineStart), fText.size());
 
     SourcePlace place;
     place.file = fName;
-    place.line = 1 + static_cast<std::size_t>(std::count(begin, at, '\n'));
+    place.line = lineOf(offset);
     place.column = 1 + offset - lineStart;
     if (lineEnd - lineStart <= kShownLineBytes)
         place.lineText = fText.substr(lineStart, lineEnd - lineStart);

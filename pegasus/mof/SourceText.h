@@ -21,12 +21,17 @@ class SourceText
     /// Up to and with the last slash of the name; empty for the current directory.
     std::string directory() const;
 
+    /// Cheap for places asked for in the order of the text: lines are counted on from the last one.
     SourcePlace place(std::size_t offset) const;
     [[noreturn]] void fail(std::size_t offset, const std::string& cause) const;
 
   private:
+    std::size_t lineOf(std::size_t offset) const;
+
     std::string fName;
     std::string fText;
+    mutable std::size_t fCountedOffset = 0; ///< up to here there are
+    mutable std::size_t fCountedBreaks = 0; ///< so many line ends
 };
 
 } // namespace Pegasus::mof

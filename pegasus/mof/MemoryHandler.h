@@ -1,0 +1,39 @@
+#pragma once
+
+#include "pegasus/mof/DefinitionHandler.h"
+
+#include <map>
+#include <string>
+#include <vector>
+
+namespace Pegasus::mof {
+
+/// Keeps definitions in memory, one namespace at a time, and checks no more than that superclasses exist.
+/// For looking at a file without a server.
+class MemoryHandler : public DefinitionHandler
+{
+  public:
+    void useNamespace(const CIMNamespaceName& nameSpace) override;
+    bool findQualifier(const CIMName& name, CIMQualifierDecl& declaration) override;
+    bool findClass(const CIMName& name, CIMClass& found) override;
+    void declareQualifier(const CIMQualifierDecl& declaration) override;
+    bool createClass(const CIMClass& newClass) override;
+    bool createInstance(const CIMInstance& newInstance) override;
+    void warn(const std::string& place, const std::string& text) override;
+
+    const std::map<std::string, CIMQualifierDecl>& qualifiers() const noexcept { return fQualifiers; }
+    /// As declared, in order.
+    const std::vector<CIMClass>& classes() const noexcept { return fClasses; }
+    const std::vector<CIMInstance>& instances() const noexcept { return fInstances; }
+    /// "place: warning: text"
+    const std::vector<std::string>& warnings() const noexcept { return fWarnings; }
+
+  private:
+    std::map<std::string, CIMQualifierDecl> fQualifiers; ///< by lower-case name, as the next
+    std::map<std::string, CIMClass> fWholeClasses;       ///< with inherited properties
+    std::vector<CIMClass> fClasses;
+    std::vector<CIMInstance> fInstances;
+    std::vector<std::string> fWarnings;
+};
+
+} // namespace Pegasus::mof
