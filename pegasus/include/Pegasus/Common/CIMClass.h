@@ -15,6 +15,7 @@ class CIMClass;
 class CIMConstObject;
 class CIMObject;
 struct CIMClassRep;
+extern template class RepPointer<CIMClassRep>;
 
 /// Read-only handle to a class. Copies of a handle share the class; clone() does not.
 /// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();

@@ -8,6 +8,7 @@
 PEGASUS_NAMESPACE_BEGIN
 
 struct CIMDateTimeRep;
+extern template class RepPointer<CIMDateTimeRep>;
 
 /// A CIM time stamp or interval in its 25-character form (DSP0004), with `*` for what is not significant.
 class PEGASUS_COMMON_LINKAGE CIMDateTime

@@ -14,6 +14,7 @@ class CIMConstObject;
 class CIMObject;
 class CIMInstance;
 struct CIMInstanceRep;
+extern template class RepPointer<CIMInstanceRep>;
 
 /// Read-only handle to an instance. Copies of a handle share the instance; clone() does not.
 /// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();

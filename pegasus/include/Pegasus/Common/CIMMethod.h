@@ -9,6 +9,7 @@ PEGASUS_NAMESPACE_BEGIN
 
 class CIMMethod;
 struct CIMMethodRep;
+extern template class RepPointer<CIMMethodRep>;
 
 /// Read-only handle to a method declaration. Copies of a handle share it; clone() does not.
 /// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized().

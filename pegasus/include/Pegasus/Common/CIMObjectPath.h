@@ -10,7 +10,9 @@ PEGASUS_NAMESPACE_BEGIN
 
 class CIMValue;
 struct CIMKeyBindingRep;
+extern template class RepPointer<CIMKeyBindingRep>;
 struct CIMObjectPathRep;
+extern template class RepPointer<CIMObjectPathRep>;
 
 /// One key of an object path: name, text and kind. The text is not checked against the kind.
 class PEGASUS_COMMON_LINKAGE CIMKeyBinding

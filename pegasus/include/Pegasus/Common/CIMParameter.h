@@ -8,6 +8,7 @@ PEGASUS_NAMESPACE_BEGIN
 
 class CIMParameter;
 struct CIMParameterRep;
+extern template class RepPointer<CIMParameterRep>;
 
 /// Read-only handle to a parameter declaration. Copies of a handle share it; clone() does not.
 /// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();

@@ -9,6 +9,7 @@ PEGASUS_NAMESPACE_BEGIN
 
 class CIMProperty;
 struct CIMPropertyRep;
+extern template class RepPointer<CIMPropertyRep>;
 
 /// Read-only handle to a property. Copies of a handle share the property; clone() does not.
 /// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();

@@ -9,6 +9,7 @@ PEGASUS_NAMESPACE_BEGIN
 
 class CIMQualifier;
 struct CIMQualifierRep;
+extern template class RepPointer<CIMQualifierRep>;
 
 /// Read-only handle to a qualifier. Copies of a handle share the qualifier; clone() does not.
 /// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized().

@@ -10,6 +10,7 @@ PEGASUS_NAMESPACE_BEGIN
 
 class CIMQualifierDecl;
 struct CIMQualifierDeclRep;
+extern template class RepPointer<CIMQualifierDeclRep>;
 
 /// Read-only handle to a qualifier declaration. Copies of a handle share the declaration; clone() does not.
 /// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized().

@@ -14,6 +14,7 @@ PEGASUS_NAMESPACE_BEGIN
 class CIMObject;
 class CIMInstance;
 struct CIMValueRep;
+extern template class RepPointer<CIMValueRep>;
 
 /// A value of any CIM type, scalar or array, or a typed null. The default is a null boolean.
 /// There is no constructor from `const char*`: such an argument becomes the boolean true.

@@ -25,6 +25,7 @@ class PEGASUS_COMMON_LINKAGE CString
 };
 
 struct StringRep;
+extern template class RepPointer<StringRep>;
 
 /// Text as UTF-16 code units; copies share until one is changed.
 /// Every `const char*` is read as UTF-8. Throws: Exception (not UTF-8), NullPointer (null pointer).

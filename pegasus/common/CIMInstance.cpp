@@ -1,0 +1,171 @@
+#include "pegasus/common/ObjectReps.h"
+
+namespace Pegasus {
+
+template class RepPointer<CIMInstanceRep>;
+
+/// An instance lacks a property that was needed.
+class PEGASUS_COMMON_LINKAGE NoSuchProperty : public Exception
+{
+  public:
+    NoSuchProperty(const String& name) : Exception("no such property: " + name) {}
+};
+
+namespace {
+
+void dropQualifiersAndOrigins(CIMProperty property, Boolean includeQualifiers, Boolean includeClassOrigin)
+{
+    while (!includeQualifiers && property.getQualifierCount() > 0)
+        property.removeQualifier(property.getQualifierCount() - 1);
+    if (!includeClassOrigin)
+        property.setClassOrigin(CIMName());
+}
+
+} // namespace
+
+CIMConstInstance::CIMConstInstance(const CIMName& className) : fRep(new CIMInstanceRep())
+{
+    fRep->fPath.setClassName(notNull(className));
+}
+
+CIMConstInstance::CIMConstInstance(const CIMConstObject& object) : fRep(ObjectAccess::instanceIn(object).fRep)
+{
+    if (!fRep)
+        throw DynamicCastFailedException();
+}
+
+CIMInstance::CIMInstance(const CIMObject& object) : CIMConstInstance(static_cast<const CIMConstObject&>(object)) {}
+
+const CIMName& CIMConstInstance::getClassName() const
+{
+    return fRep.checked().fPath.getClassName();
+}
+
+const CIMObjectPath& CIMConstInstance::getPath() const
+{
+    return fRep.checked().fPath;
+}
+
+Uint32 CIMConstInstance::findQualifier(const CIMName& name) const
+{
+    return ObjectAccess::find(fRep.checked().fQualifiers, name);
+}
+
+CIMConstQualifier CIMConstInstance::getQualifier(Uint32 index) const
+{
+    return ObjectAccess::at(fRep.checked().fQualifiers, index);
+}
+
+Uint32 CIMConstInstance::getQualifierCount() const
+{
+    return fRep.checked().fQualifiers.size();
+}
+
+Uint32 CIMConstInstance::findProperty(const CIMName& name) const
+{
+    return ObjectAccess::find(fRep.checked().fProperties, name);
+}
+
+CIMConstProperty CIMConstInstance::getProperty(Uint32 index) const
+{
+    return ObjectAccess::at(fRep.checked().fProperties, index);
+}
+
+Uint32 CIMConstInstance::getPropertyCount() const
+{
+    return fRep.checked().fProperties.size();
+}
+
+CIMObjectPath CIMConstInstance::buildPath(const CIMConstClass& cimClass) const
+{
+    Array<CIMName> keyNames;
+    cimClass.getKeyNames(keyNames);
+    Array<CIMKeyBinding> keys;
+    for (Uint32 i = 0; i < keyNames.size(); ++i) {
+        const Uint32 index = findProperty(keyNames[i]);
+        if (index == PEG_NOT_FOUND)
+            throw NoSuchProperty(keyNames[i].getString());
+        keys.append(CIMKeyBinding(keyNames[i], fRep->fProperties[index].getValue()));
+    }
+    return CIMObjectPath(String(), CIMNamespaceName(), getClassName(), keys);
+}
+
+Boolean CIMConstInstance::isUninitialized() const
+{
+    return !fRep;
+}
+
+Boolean CIMConstInstance::identical(const CIMConstInstance& instance) const
+{
+    const CIMInstanceRep& x = fRep.checked();
+    const CIMInstanceRep& y = instance.fRep.checked();
+    return &x == &y || (x.fPath.identical(y.fPath) && ObjectAccess::identical(x.fQualifiers, y.fQualifiers) &&
+                        ObjectAccess::identical(x.fProperties, y.fProperties));
+}
+
+CIMInstance CIMConstInstance::clone() const
+{
+    auto* copy = new CIMInstanceRep(fRep.checked());
+    const CIMInstance instance = ObjectAccess::wrap<CIMInstance>(copy);
+    copy->fQualifiers = ObjectAccess::clone(copy->fQualifiers);
+    copy->fProperties = ObjectAccess::clone(copy->fProperties);
+    return instance;
+}
+
+void CIMInstance::setPath(const CIMObjectPath& path)
+{
+    if (!path.getClassName().equal(getClassName()))
+        throw TypeMismatchException();
+    fRep->fPath = path;
+}
+
+CIMInstance& CIMInstance::addQualifier(const CIMQualifier& qualifier)
+{
+    ObjectAccess::add(fRep.checked().fQualifiers, qualifier, "qualifier");
+    return *this;
+}
+
+CIMQualifier CIMInstance::getQualifier(Uint32 index)
+{
+    return ObjectAccess::at(fRep.checked().fQualifiers, index);
+}
+
+void CIMInstance::removeQualifier(Uint32 index)
+{
+    fRep.checked().fQualifiers.remove(index);
+}
+
+CIMInstance& CIMInstance::addProperty(const CIMProperty& property)
+{
+    ObjectAccess::add(fRep.checked().fProperties, property, "property");
+    return *this;
+}
+
+CIMProperty CIMInstance::getProperty(Uint32 index)
+{
+    return ObjectAccess::at(fRep.checked().fProperties, index);
+}
+
+void CIMInstance::removeProperty(Uint32 index)
+{
+    fRep.checked().fProperties.remove(index);
+}
+
+void CIMInstance::instanceFilter(Boolean includeQualifiers, Boolean includeClassOrigin,
+                                 const CIMPropertyList& propertyList)
+{
+    CIMInstanceRep& rep = fRep.checked();
+    if (!includeQualifiers)
+        rep.fQualifiers.clear();
+    Array<CIMProperty> kept;
+    for (Uint32 i = 0; i < rep.fProperties.size(); ++i) {
+        const CIMProperty& property = rep.fProperties[i];
+        if (!propertyList.isNull() && !propertyList.contains(property.getName()))
+            continue;
+        dropQualifiersAndOrigins(property, includeQualifiers, includeClassOrigin);
+        kept.append(property);
+    }
+    rep.fProperties.swap(kept);
+}
+
+} // namespace Pegasus

@@ -1,0 +1,148 @@
+#ifndef PEGASUS_COMMON_OBJECTREPS_H
+#define PEGASUS_COMMON_OBJECTREPS_H
+
+#include "pegasus/common/ArrayImpl.h"
+#include "pegasus/common/NameAccess.h"
+#include "pegasus/common/RepPointerImpl.h"
+
+#include <Pegasus/Common/CIMClass.h>
+#include <Pegasus/Common/CIMObject.h>
+#include <Pegasus/Common/CIMQualifierDecl.h>
+
+#include <string>
+
+namespace Pegasus {
+
+/// What the handle classes share. Copying a representation copies handles; the clone functions go deep.
+
+struct CIMQualifierRep : RefCounted
+{
+    CIMName fName;
+    CIMValue fValue;
+    CIMFlavor fFlavor;
+    bool fPropagated = false;
+};
+
+struct CIMQualifierDeclRep : RefCounted
+{
+    CIMName fName;
+    CIMValue fValue;
+    CIMScope fScope;
+    CIMFlavor fFlavor;
+    Uint32 fArraySize = 0;
+};
+
+struct CIMPropertyRep : RefCounted
+{
+    Uint32 fArraySize = 0;
+    CIMName fName;
+    CIMValue fValue;
+    CIMName fReferenceClassName;
+    CIMName fClassOrigin;
+    Array<CIMQualifier> fQualifiers;
+    bool fPropagated = false;
+};
+
+struct CIMParameterRep : RefCounted
+{
+    CIMType fType = CIMTYPE_BOOLEAN;
+    CIMName fName;
+    CIMName fReferenceClassName;
+    Array<CIMQualifier> fQualifiers;
+    Uint32 fArraySize = 0;
+    bool fIsArray = false;
+};
+
+struct CIMMethodRep : RefCounted
+{
+    CIMType fType = CIMTYPE_BOOLEAN;
+    CIMName fName;
+    CIMName fClassOrigin;
+    Array<CIMQualifier> fQualifiers;
+    Array<CIMParameter> fParameters;
+    bool fPropagated = false;
+};
+
+/// The class name is the path's.
+struct CIMInstanceRep : RefCounted
+{
+    CIMObjectPath fPath;
+    Array<CIMQualifier> fQualifiers;
+    Array<CIMProperty> fProperties;
+};
+
+/// The class name is the path's.
+struct CIMClassRep : RefCounted
+{
+    CIMObjectPath fPath;
+    CIMName fSuperClassName;
+    Array<CIMQualifier> fQualifiers;
+    Array<CIMProperty> fProperties;
+    Array<CIMMethod> fMethods;
+};
+
+/// Sub-objects by name, in lists that hold handles. `what` names the kind in "already exists: property "p"".
+struct ObjectAccess
+{
+    template <class Handle> static auto& rep(const Handle& handle) { return handle.fRep.checked(); }
+    template <class Handle, class Rep> static Handle wrap(Rep* adopted)
+    {
+        Handle handle;
+        handle.fRep = RepPointer<Rep>(adopted);
+        return handle;
+    }
+    static const CIMClass& classIn(const CIMConstObject& object) { return object.fClass; }
+    static const CIMInstance& instanceIn(const CIMConstObject& object) { return object.fInstance; }
+
+    template <class Item> static Uint32 find(const Array<Item>& items, const CIMName& name)
+    {
+        const Item* data = items.getData();
+        for (Uint32 i = 0; i < items.size(); ++i) {
+            if (data[i].getName().equal(name))
+                return i;
+        }
+        return PEG_NOT_FOUND;
+    }
+
+    template <class Item> static void add(Array<Item>& items, const Item& item, const char* what)
+    {
+        const CIMName& name = item.getName();
+        if (find(items, name) != PEG_NOT_FOUND)
+            throw AlreadyExistsException(String(what) + " \"" + name.getString() + "\"");
+        items.append(item);
+    }
+
+    /// The handle itself: a change through it is a change of the list's object.
+    template <class Item> static Item at(const Array<Item>& items, Uint32 index) { return items[index]; }
+
+    template <class Item> static Array<Item> clone(const Array<Item>& items)
+    {
+        Array<Item> copies;
+        copies.reserveCapacity(items.size());
+        for (Uint32 i = 0; i < items.size(); ++i)
+            copies.append(items[i].clone());
+        return copies;
+    }
+
+    template <class Item> static bool identical(const Array<Item>& x, const Array<Item>& y)
+    {
+        if (x.size() != y.size())
+            return false;
+        for (Uint32 i = 0; i < x.size(); ++i) {
+            if (!x[i].identical(y[i]))
+                return false;
+        }
+        return true;
+    }
+
+    /// Is there a qualifier of this name, boolean and true?
+    static bool isTrue(const Array<CIMQualifier>& qualifiers, const char* name)
+    {
+        const Uint32 index = find(qualifiers, name);
+        return index != PEG_NOT_FOUND && qualifiers[index].getValue() == CIMValue(true);
+    }
+};
+
+} // namespace Pegasus
+
+#endif
