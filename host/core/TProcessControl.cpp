@@ -21,12 +21,17 @@ TProcessControl::TProcessControl() : fWake(::eventfd(0, EFD_CLOEXEC | EFD_NONBLO
 
 void TProcessControl::Cancel()
 {
+    const std::lock_guard<std::mutex> lock(fMutex);
+    if (fResumed)
+        return;
     fCancelled = true;
     ::eventfd_write(fWake.Get(), 1);
 }
 
 void TProcessControl::Resume()
 {
+    const std::lock_guard<std::mutex> lock(fMutex);
+    fResumed = true;
     fCancelled = false;
     eventfd_t ignored;
     ::eventfd_read(fWake.Get(), &ignored);

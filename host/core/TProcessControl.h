@@ -3,6 +3,7 @@
 
 #include <atomic>
 #include <exception>
+#include <mutex>
 
 #include "UniqueFd.h"
 
@@ -17,13 +18,15 @@ class TProgramsCancelled : public std::exception
     const char* what() const noexcept override;
 };
 
-// The host's switch for all child processes: while cancelled, running programs are killed and none is started.
+// The host's switch for all child processes: while cancelled, running programs are killed and none is started. It turns
+// once: programs are cancelled when a user interrupts the host's work, and resumed for the shutdown, which runs some.
 // Thread: safe.
 class TProcessControl
 {
   public:
     static TProcessControl& Instance();
 
+    // No effect after Resume.
     void Cancel();
     void Resume();
     bool IsCancelled() const { return fCancelled; }
@@ -34,6 +37,8 @@ class TProcessControl
   private:
     TProcessControl();
 
+    std::mutex fMutex; // orders Cancel and Resume
+    bool fResumed = false;
     std::atomic<bool> fCancelled{false};
     UniqueFd fWake;
 };

@@ -1,0 +1,47 @@
+#ifndef VRX_CLI_COLLECTOR_H
+#define VRX_CLI_COLLECTOR_H
+
+#include <functional>
+
+#include <host/ICIMNamespace.h>
+
+#include "Document.h"
+#include "LossLog.h"
+
+namespace vrxhost {
+
+// Asks a namespace for what a command shows. Every question is guarded: what fails becomes a loss, the rest goes on.
+// Thread: one at a time; only the list of providers may come in from several threads of the plug-in.
+class Collector
+{
+  public:
+    // isStopped: asked between elements; once true, collecting ends early.
+    Collector(NKOLVRX20::ICIMNamespace& ns, LossLog& losses, std::function<bool()> isStopped);
+
+    // Returns: the providers, filled to the depth of the command; of kInstances one without a name, with the one class.
+    std::vector<TProviderRecord> Collect(ECommand command, const std::string& className);
+
+  private:
+    typedef boost::shared_ptr<NKOLVRX20::ICIMClass> TClassPtr;
+    typedef boost::shared_ptr<NKOLVRX20::IProvider> TProviderPtr;
+
+    std::vector<TProviderPtr> ListProviders();
+    std::vector<TClassPtr> ListClasses(NKOLVRX20::IProvider& provider, const std::string& name);
+    TClassPtr FindClass(const std::string& name);
+    TProviderRecord ReadProvider(NKOLVRX20::IProvider& provider, ECommand command);
+    TClassRecord ReadClass(NKOLVRX20::ICIMClass& each, ECommand command);
+    void ReadDeclarations(NKOLVRX20::ICIMClass& each, TClassRecord& record);
+    void ReadInstances(NKOLVRX20::ICIMClass& each, TClassRecord& record);
+    TInstanceRecord ReadInstance(NKOLVRX20::ICIMInstance& instance);
+
+    // Runs a question; what it throws becomes the loss "<what> could not be <done>: <cause>".
+    void Ask(const std::string& what, const std::function<void()>& question);
+
+    NKOLVRX20::ICIMNamespace& fNamespace;
+    LossLog& fLosses;
+    std::function<bool()> fIsStopped;
+};
+
+} // namespace vrxhost
+
+#endif

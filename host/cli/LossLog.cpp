@@ -1,0 +1,78 @@
+#include "LossLog.h"
+
+#include <core/TCoreLogger.h>
+#include <core/TProcessLog.h>
+
+#include "LossRules.h"
+
+namespace vrxhost {
+namespace {
+
+constexpr char kLoading[] = "Loading... ";
+// Every message about a provider description begins thus; those on names that the description's reader does not know
+// are routine, the root element's own name among them.
+constexpr char kDescription[] = "Performance Data RDD Parser line ";
+constexpr char kRoutine[] = ":Unrecognized ";
+
+bool BeginsWith(const std::string& text, const char* begin)
+{
+    return text.rfind(begin, 0) == 0;
+}
+
+std::string WithoutLineFeed(const std::string& text)
+{
+    const std::size_t end = text.find_last_not_of('\n');
+    return text.substr(0, end == std::string::npos ? 0 : end + 1);
+}
+
+} // namespace
+
+LossLog::LossLog(const std::string& root) : fRoot(root) {}
+
+void LossLog::Log(EVRXLogSeverity severity, const std::string& text)
+{
+    NKOLVRX20::TCoreLogger::Instance().Log(severity, text);
+    const std::lock_guard<std::mutex> lock(fMutex);
+    Learn(severity, text);
+}
+
+void LossLog::Learn(EVRXLogSeverity severity, const std::string& text)
+{
+    if (BeginsWith(text, kLoading))
+        fLoadedFile = text.substr(sizeof kLoading - 1);
+    else if (const auto sentence = LossOfLine(text))
+        Enter(*sentence);
+    else if (severity != kError || IsHarmless(text))
+        return;
+    else if (!BeginsWith(text, kDescription))
+        Enter(WithoutLineFeed(text));
+    else if (text.find(kRoutine) == std::string::npos)
+        Enter("provider description " + fLoadedFile + ", line " + text.substr(sizeof kDescription - 1));
+}
+
+void LossLog::Add(const std::string& sentence)
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    Enter(sentence);
+}
+
+void LossLog::AddFailedPrograms(bool serverIsUp)
+{
+    for (const auto& program : NKOLVRX20::TProcessLog::Instance().Take())
+        if (const auto sentence = LossOfProgram(program, fRoot, serverIsUp))
+            Add(*sentence);
+}
+
+std::vector<std::string> LossLog::GetSentences() const
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    return fSentences;
+}
+
+void LossLog::Enter(const std::string& sentence)
+{
+    if (fKnown.insert(sentence).second)
+        fSentences.push_back(sentence);
+}
+
+} // namespace vrxhost

@@ -1,0 +1,46 @@
+#ifndef VRX_CLI_LOSSLOG_H
+#define VRX_CLI_LOSSLOG_H
+
+#include <mutex>
+#include <set>
+#include <string>
+#include <vector>
+
+#include <host/ILogger.h>
+
+namespace vrxhost {
+
+// The host's core logger while vrxhost runs: hands every line on to the host's own logger, and learns from the
+// plug-in's lines what was lost. Each loss becomes one sentence, told once. Thread: safe.
+class LossLog : public NKOLVRX20::ILogger
+{
+  public:
+    // root: the directory below which the server's programs and providers lie.
+    explicit LossLog(const std::string& root);
+
+    void Log(EVRXLogSeverity severity, const std::string& text) override;
+
+    // Enters what the host itself found out.
+    void Add(const std::string& sentence);
+
+    // Takes the programs that failed since the last call into account.
+    // serverIsUp: failed attempts to start the server are no loss then.
+    void AddFailedPrograms(bool serverIsUp);
+
+    // Returns: the sentences so far, in the order in which things were lost.
+    std::vector<std::string> GetSentences() const;
+
+  private:
+    void Enter(const std::string& sentence);
+    void Learn(EVRXLogSeverity severity, const std::string& text);
+
+    const std::string fRoot;
+    mutable std::mutex fMutex;
+    std::string fLoadedFile; // the provider description being read
+    std::vector<std::string> fSentences;
+    std::set<std::string> fKnown;
+};
+
+} // namespace vrxhost
+
+#endif

@@ -1,0 +1,124 @@
+#include "LossRules.h"
+
+#include <algorithm>
+#include <filesystem>
+
+#include <host/TVRXStatusCode.h>
+
+namespace vrxhost {
+namespace {
+
+// A line of the plug-in: fBegin, an object, fMiddle, a cause. The sentence is fSubject, the object, fVerb, the cause.
+struct TRule
+{
+    const char* fBegin;
+    const char* fMiddle;
+    const char* fSubject;
+    const char* fVerb;
+};
+
+constexpr TRule kRules[] = {
+    {"TPEGASUSNamespace::GetClass from Pegasus for: ", " returned exception: ", "class ", " could not be fetched: "},
+    {"Catching exeption: AllocateClass  --- ", "\twith reason: ", "class ", " could not be built: "},
+    {"Get Instances for: ", " returned ConnectionTimeoutException: ", "instances of ",
+     " could not be fetched in time: "},
+    {"DEBUG1:TPEGASUSClass::EnumerateInstances from Pegasus for: ", " returned exception: ", "instances of ",
+     " could not be fetched: "},
+    {"TPEGASUSClass::EnumerateInstances from Pegasus for: ", " returned exception: ", "instances of ",
+     " could not be fetched: "},
+    {"TPEGASUSClass:EnumerateInstances. NSP :", "with pegasus exeption: ", "instances could not be fetched, ", ": "},
+    {"DEBUG3:TPEGASUSClass::EI Error from Pegasus for: ", " returned exception: ", "an instance could not be built, ",
+     ": "},
+    {"DEBUG2:TPEGASUSClass::EI VRX Error for: ", "", "an instance could not be built, ", ""},
+    {"4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: ", "", "property ",
+     " could not be converted and is missing from its instance"},
+    {"TPEGASUSProvider::EnumerateClassesProvided catch exection : ", "", "a class could not be listed: ", ""},
+};
+
+bool BeginsWith(const std::string& text, const std::string& begin)
+{
+    return text.compare(0, begin.size(), begin) == 0;
+}
+
+// On one line and without blanks at its ends; programs write several lines.
+std::string OneLine(const std::string& text)
+{
+    std::string line = text;
+    while (!line.empty() && std::isspace(static_cast<unsigned char>(line.back())))
+        line.pop_back();
+    std::replace(line.begin(), line.end(), '\n', ' ');
+    return line;
+}
+
+std::optional<std::string> Apply(const TRule& rule, const std::string& line)
+{
+    if (!BeginsWith(line, rule.fBegin))
+        return std::nullopt;
+    const std::string middle = rule.fMiddle;
+    const std::size_t object = std::char_traits<char>::length(rule.fBegin);
+    const std::size_t split = middle.empty() ? line.size() : line.find(middle, object);
+    if (split == std::string::npos)
+        return std::nullopt;
+    const std::string cause = split < line.size() ? line.substr(split + middle.size()) : "";
+    return rule.fSubject + OneLine(line.substr(object, split - object)) + rule.fVerb + OneLine(cause);
+}
+
+std::string Cause(const NKOLVRX20::TFailedProgram& program)
+{
+    const std::string& text = program.fErrorOutput.empty() ? program.fOutput : program.fErrorOutput;
+    return program.GetReason() + (text.empty() ? "" : ": " + OneLine(text));
+}
+
+// ".../provider/linux/x.properties.mof" belongs to the provider "linux".
+std::string LossOfCompilation(const NKOLVRX20::TFailedProgram& program)
+{
+    const std::filesystem::path file = program.fArguments.empty() ? "" : program.fArguments.back();
+    const std::string folder = file.parent_path().parent_path().filename();
+    const std::string owner = folder == "provider" ? " of provider " + file.parent_path().filename().string() : "";
+    return "MOF file " + file.string() + owner + " did not compile, cimmof: " + Cause(program);
+}
+
+} // namespace
+
+std::optional<std::string> LossOfLine(const std::string& line)
+{
+    for (const TRule& rule : kRules)
+        if (auto sentence = Apply(rule, line))
+            return sentence;
+    return std::nullopt;
+}
+
+bool IsHarmless(const std::string& errorLine)
+{
+    // Repeated until the server is up; if it never is, the namespace itself fails.
+    if (BeginsWith(errorLine, "TPEGASUSNamespace::connect failed: "))
+        return true;
+    // A program that could not be run has a sentence of its own, with the cause.
+    return errorLine == NKOLVRX20::TVRXStatusCode(NKOLVRX20::TVRXStatusCode::kProcessFailed).TranslateStatusCode();
+}
+
+std::optional<std::string> LossOfProgram(const NKOLVRX20::TFailedProgram& program, const std::string& root,
+                                         bool serverIsUp)
+{
+    if (program.fName == "cimmof")
+        return LossOfCompilation(program);
+    if (program.fName == "cimserver") {
+        const bool isStop = !program.fArguments.empty() && program.fArguments.front() == "-s";
+        return isStop || serverIsUp ? std::nullopt
+                                    : std::optional("the server did not start, cimserver: " + Cause(program));
+    }
+    // Looks for a leftover server; without it none is found.
+    if (program.fName == "ps")
+        return std::nullopt;
+    // An adapter tool that only machines with the adapter have.
+    if (program.fName == "bcu")
+        return std::filesystem::exists(root + "/pegasus/provider/brocade")
+                   ? std::optional("provider brocade is disabled, bcu: " + Cause(program))
+                   : std::nullopt;
+    std::string command = program.fName;
+    for (const std::string& argument : program.fArguments)
+        command += " " + argument;
+    return command + " failed: " + Cause(program);
+}
+
+} // namespace vrxhost

@@ -1,0 +1,124 @@
+#include "Options.h"
+
+#include <filesystem>
+#include <iostream>
+
+#include <CLI/CLI.hpp>
+
+namespace vrxhost {
+namespace {
+
+namespace fs = std::filesystem;
+
+constexpr char kFooter[] =
+    "Everything runs in the root directory: the working directory if it holds a folder \"pegasus\", else the "
+    "program's.\n"
+    "Standard output carries the document alone; what was lost is said on standard error.\n"
+    "Exit status: 0 complete, 1 failed, 2 wrong usage, 3 partial (something was lost), 130 interrupted.";
+
+fs::path ProgramDirectory()
+{
+    std::error_code error;
+    const fs::path program = fs::read_symlink("/proc/self/exe", error);
+    return error ? fs::current_path() : program.parent_path();
+}
+
+std::string DefaultRoot()
+{
+    const fs::path here = fs::current_path();
+    return fs::is_directory(here / "pegasus") ? here : ProgramDirectory();
+}
+
+// Paths are the user's, from where the program was started; later the root becomes the working directory.
+void MakeAbsolute(std::string& path)
+{
+    if (!path.empty())
+        path = fs::absolute(path).lexically_normal();
+}
+
+bool SplitSetting(const std::string& text, TOptions& options)
+{
+    const std::size_t equals = text.find('=');
+    if (equals == 0 || equals == std::string::npos)
+        return false;
+    options.fSettings.emplace_back(text.substr(0, equals), text.substr(equals + 1));
+    return true;
+}
+
+void AddOptions(CLI::App& app, TOptions& options, std::vector<std::string>& settings)
+{
+    app.add_option("--format", options.fFormat, "table or json")
+        ->transform(CLI::CheckedTransformer(
+            std::map<std::string, EFormat>{{"table", EFormat::kTable}, {"json", EFormat::kJson}}));
+    app.add_option("--consumer", options.fConsumer,
+                   "Name that keeps this host's server apart from others' (default quvex)");
+    app.add_option("--config", options.fConfigFile, "Settings file, lines \"key = value\" (default ROOT/vrx.conf)")
+        ->check(CLI::ExistingFile);
+    app.add_option("--set", settings, "key=value, before the settings file; may be given several times")
+        ->type_size(1)
+        ->allow_extra_args(false)
+        ->check([](const std::string& text) {
+            TOptions ignored;
+            return SplitSetting(text, ignored) ? std::string() : "key=value is expected, not \"" + text + "\"";
+        });
+    app.add_option("--log", options.fLogFile, "The host's log, begun anew (default ROOT/vrxhost.log)");
+    app.add_option("--plugin", options.fPlugin, "The plug-in (default libpegasus.nsp.so beside the program)");
+    app.add_option("--root", options.fRoot, "The root directory")->check(CLI::ExistingDirectory);
+    app.add_flag("-v,--verbose", options.fVerbose, "Show the log on standard error too");
+}
+
+void AddCommands(CLI::App& app, TOptions& options)
+{
+    const auto add = [&](const char* name, const char* text, ECommand command) {
+        return app.add_subcommand(name, text)->fallthrough()->callback([&options, command] {
+            options.fCommand = command;
+        });
+    };
+    add("inventory", "Show every provider's classes and their instances", ECommand::kInventory);
+    add("providers", "List the providers and their classes", ECommand::kProviders);
+    add("classes", "List the classes with their properties and methods", ECommand::kClasses);
+    add("instances", "Show one class's instances", ECommand::kInstances)
+        ->add_option("CLASS", options.fClassName, "The class's name")
+        ->required();
+    app.require_subcommand(1);
+}
+
+void FillDefaults(TOptions& options, const std::vector<std::string>& settings)
+{
+    for (const std::string& setting : settings)
+        SplitSetting(setting, options);
+    for (std::string* path : {&options.fConfigFile, &options.fLogFile, &options.fPlugin, &options.fRoot})
+        MakeAbsolute(*path);
+    if (options.fRoot.empty())
+        options.fRoot = DefaultRoot();
+    if (options.fPlugin.empty())
+        options.fPlugin = ProgramDirectory() / kPluginFile;
+    if (options.fLogFile.empty())
+        options.fLogFile = fs::path(options.fRoot) / kLogFile;
+    const fs::path config = fs::path(options.fRoot) / kConfigFile;
+    if (options.fConfigFile.empty() && fs::exists(config))
+        options.fConfigFile = config;
+}
+
+} // namespace
+
+int ParseOptions(int argc, const char* const* argv, TOptions& options)
+{
+    CLI::App app("Shows the inventory that a namespace-provider plug-in serves.", "vrxhost");
+    std::vector<std::string> settings;
+    app.footer(kFooter);
+    AddOptions(app, options, settings);
+    AddCommands(app, options);
+    try {
+        app.parse(argc, argv);
+        FillDefaults(options, settings);
+    } catch (const CLI::ParseError& e) {
+        return app.exit(e, std::cout, std::cerr) == 0 ? kComplete : kUsage;
+    } catch (const fs::filesystem_error& e) {
+        std::cerr << "vrxhost: " << e.what() << "\n";
+        return kFailed;
+    }
+    return -1;
+}
+
+} // namespace vrxhost

@@ -1,0 +1,59 @@
+#ifndef VRX_CLI_OPTIONS_H
+#define VRX_CLI_OPTIONS_H
+
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace vrxhost {
+
+enum class ECommand
+{
+    kInventory, // providers, classes, instances
+    kProviders, // providers and the names of their classes
+    kClasses,   // providers and their classes' declarations
+    kInstances  // the instances of one class
+};
+
+enum class EFormat
+{
+    kTable,
+    kJson
+};
+
+// What vrxhost ends with; docs and tests name these.
+enum EExitStatus : int
+{
+    kComplete = 0,
+    kFailed = 1, // there is no inventory
+    kUsage = 2,
+    kPartial = 3, // something was lost and is named on standard error
+    kInterrupted = 130
+};
+
+struct TOptions
+{
+    ECommand fCommand = ECommand::kInventory;
+    std::string fClassName; // of kInstances
+    EFormat fFormat = EFormat::kTable;
+    std::string fRoot;   // the directory in which everything runs; see DefaultRoot
+    std::string fPlugin; // empty: kPluginFile beside the program
+    std::string fConsumer;
+    std::string fConfigFile; // empty: kConfigFile in the root, if there is one
+    std::string fLogFile;    // empty: kLogFile in the root
+    std::vector<std::pair<std::string, std::string>> fSettings;
+    bool fVerbose = false;
+};
+
+constexpr char kPluginFile[] = "libpegasus.nsp.so";
+constexpr char kConfigFile[] = "vrx.conf";
+constexpr char kLogFile[] = "vrxhost.log";
+constexpr char kDefaultConsumer[] = "quvex";
+
+// Reads the command line; paths come out absolute. Help goes to standard output, errors to standard error.
+// Returns: -1 to go on with the options, else the exit status.
+int ParseOptions(int argc, const char* const* argv, TOptions& options);
+
+} // namespace vrxhost
+
+#endif

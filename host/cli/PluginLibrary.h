@@ -1,0 +1,60 @@
+#ifndef VRX_CLI_PLUGINLIBRARY_H
+#define VRX_CLI_PLUGINLIBRARY_H
+
+#include <cstddef>
+#include <stdexcept>
+#include <string>
+
+#include <boost/shared_ptr.hpp>
+
+#include <host/INamespaceProvider.h>
+
+namespace vrxhost {
+
+// Why a plug-in cannot be used, as a sentence.
+class TPluginError : public std::runtime_error
+{
+  public:
+    using std::runtime_error::runtime_error;
+};
+
+// A loaded plug-in: its library, its entry points, and its provider in the host's manager.
+// Thread: one at a time.
+class PluginLibrary
+{
+  public:
+    // Loads the library and has it register its provider.
+    // Throws: TPluginError. A library that failed half way stays loaded: it may have left something behind.
+    explicit PluginLibrary(const std::string& path);
+    ~PluginLibrary();
+
+    PluginLibrary(const PluginLibrary&) = delete;
+    PluginLibrary& operator=(const PluginLibrary&) = delete;
+
+    const boost::shared_ptr<NKOLVRX20::INamespaceProvider>& GetProvider() const { return fProvider; }
+
+    // Lets the namespace go and unloads the library. Everything that came from the plug-in must be gone.
+    // Returns: empty, or what went wrong, as sentences; a library that left threads behind stays loaded.
+    // Blocks: for the plug-in's own shutdown, and up to a second more for its threads to end.
+    std::string Unload();
+
+    // Returns: true once a library stayed loaded because of its threads: the process must then end without clean-up.
+    static bool HasLeftThreads();
+
+  private:
+    typedef void (*TEntryPoint)();
+
+    TEntryPoint Symbol(const char* name) const;
+    void Register();
+    void Unregister();
+
+    std::string fPath;
+    std::size_t fThreadCountBefore;
+    void* fHandle = nullptr;
+    TEntryPoint fClearNamespace = nullptr;
+    boost::shared_ptr<NKOLVRX20::INamespaceProvider> fProvider;
+};
+
+} // namespace vrxhost
+
+#endif

@@ -1,0 +1,90 @@
+#include "PrivateServer.h"
+
+#include <cerrno>
+#include <climits>
+#include <csignal>
+#include <cstdlib>
+#include <vector>
+
+#include <fcntl.h>
+#include <poll.h>
+#include <unistd.h>
+
+extern "C" {
+#include <sys/pidfd.h> // C only in glibc 2.36
+}
+
+#include <core/TProcessLog.h>
+#include <core/UniqueFd.h>
+#include <host/TOSSpecific.h>
+
+#include "Guard.h"
+
+namespace vrxhost {
+namespace {
+
+using NKOLVRX20::UniqueFd;
+
+constexpr int kConfigTimeoutSeconds = 30;
+constexpr int kOrderlyEndMs = 2000;
+
+std::string RealPath(const std::string& path)
+{
+    char resolved[PATH_MAX];
+    return ::realpath(path.c_str(), resolved) ? resolved : "";
+}
+
+// Returns: the first token of the file as a process id, 0 for none.
+pid_t ReadProcessId(const std::string& path)
+{
+    const UniqueFd file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW));
+    char text[32] = "";
+    if (!file || ::read(file.Get(), text, sizeof text - 1) <= 0)
+        return 0;
+    const long id = std::strtol(text, nullptr, 10);
+    return id > 1 && id <= INT_MAX ? static_cast<pid_t>(id) : 0;
+}
+
+bool HasExited(const UniqueFd& process, int timeoutMs)
+{
+    pollfd fd = {process.Get(), POLLIN, 0};
+    return ::poll(&fd, 1, timeoutMs) > 0;
+}
+
+} // namespace
+
+PrivateServer::PrivateServer(const std::string& root, const std::string& consumer) : fRoot(root), fConsumer(consumer) {}
+
+std::string PrivateServer::SetConsumer() const
+{
+    const std::vector<std::string> environment = {"PEGASUS_HOME=" + fRoot + "/pegasus",
+                                                  "LD_LIBRARY_PATH=" + fRoot + "/pegasus/lib:" + fRoot,
+                                                  "PATH=/usr/bin:/bin"};
+    std::string output;
+    const std::string error = Guarded([&] {
+        NKOLVRX20::TOSSpecific::SpawnProcess("cimconfig", {"-s", "consumer=" + fConsumer, "-p"},
+                                             fRoot + "/pegasus/bin/cimconfig", environment, output,
+                                             kConfigTimeoutSeconds);
+    });
+    std::string reason = error;
+    for (const auto& failed : NKOLVRX20::TProcessLog::Instance().Take())
+        reason = failed.GetReason() + (failed.fErrorOutput.empty() ? "" : ": " + failed.fErrorOutput);
+    return reason;
+}
+
+void PrivateServer::End() const
+{
+    const pid_t id = ReadProcessId("/var/tmp/cimserverkol_tc_" + fConsumer + "_start.conf");
+    // The descriptor first: what is checked through it afterwards is about this very process.
+    const UniqueFd process(id ? ::pidfd_open(id, 0) : -1);
+    if (!process)
+        return;
+    const std::string program = RealPath("/proc/" + std::to_string(id) + "/exe");
+    if (program.empty() || program != RealPath(fRoot + "/pegasus/bin/cimserver"))
+        return;
+    ::pidfd_send_signal(process.Get(), SIGTERM, nullptr, 0);
+    if (!HasExited(process, kOrderlyEndMs))
+        ::pidfd_send_signal(process.Get(), SIGKILL, nullptr, 0);
+}
+
+} // namespace vrxhost

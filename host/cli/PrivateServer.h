@@ -1,0 +1,31 @@
+#ifndef VRX_CLI_PRIVATESERVER_H
+#define VRX_CLI_PRIVATESERVER_H
+
+#include <string>
+
+namespace vrxhost {
+
+// The private server as the host sees it: programs below the root, and a start file that names its process.
+class PrivateServer
+{
+  public:
+    PrivateServer(const std::string& root, const std::string& consumer);
+
+    // Plans the consumer's name for the server's next start.
+    // Returns: empty, or why it could not be done.
+    // Blocks: up to 30 seconds.
+    std::string SetConsumer() const;
+
+    // Ends the running server, if the start file names a process that runs this root's server program: in order, and by
+    // force when it has not gone after 2 seconds.
+    // Thread: safe.
+    void End() const;
+
+  private:
+    std::string fRoot;
+    std::string fConsumer;
+};
+
+} // namespace vrxhost
+
+#endif

@@ -1,0 +1,67 @@
+#include "Session.h"
+
+#include <boost/make_shared.hpp>
+
+#include <core/TProcessControl.h>
+#include <host/TCIMValue.h>
+#include <inmem/TInmemNamespace.h>
+
+#include "Guard.h"
+
+namespace vrxhost {
+
+using namespace NKOLVRX20;
+
+namespace {
+
+// The name that is asked for; this kind of plug-in has one namespace, whatever the name.
+constexpr char kNamespaceName[] = "root/cimv2";
+
+TCIMValue AddressOf(const boost::shared_ptr<ICIMNamespace>& ns)
+{
+    return TCIMValue(static_cast<unsigned long>(reinterpret_cast<std::uintptr_t>(&ns)));
+}
+
+} // namespace
+
+Session::Session(const std::string& pluginPath, const std::string& consumer)
+    : fRepository(boost::make_shared<TInmemNamespace>()), fUpcall(boost::make_shared<TInmemNamespace>()),
+      fPlugin(pluginPath)
+{
+    const std::string error = Guarded([&] { Allocate(consumer); });
+    if (!error.empty()) {
+        Close();
+        throw TPluginError("the namespace could not be opened: " + error);
+    }
+    if (!fNamespace) {
+        Close();
+        throw TPluginError("the namespace could not be opened: the plug-in returned none");
+    }
+}
+
+Session::~Session()
+{
+    Close();
+}
+
+void Session::Allocate(const std::string& consumer)
+{
+    TCIMContext context;
+    context["repository"] = AddressOf(fRepository);
+    context["upcall"] = AddressOf(fUpcall);
+    context["consumer"] = TCIMValue(consumer);
+    fNamespace = fPlugin.GetProvider()->AllocateNamespace(context, false, kNamespaceName);
+}
+
+std::string Session::Close()
+{
+    if (fClosed)
+        return "";
+    fClosed = true;
+    // The shutdown itself runs programs, also after an interruption.
+    TProcessControl::Instance().Resume();
+    fNamespace.reset();
+    return fPlugin.Unload();
+}
+
+} // namespace vrxhost

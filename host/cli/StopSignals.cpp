@@ -1,0 +1,52 @@
+#include "StopSignals.h"
+
+#include <cerrno>
+
+#include <poll.h>
+#include <sys/eventfd.h>
+#include <unistd.h>
+
+#include "Options.h"
+
+namespace vrxhost {
+
+StopSignals::StopSignals(std::function<void()> onFirst)
+    : fOnFirst(std::move(onFirst)), fEvent(::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK))
+{
+    sigemptyset(&fSignals);
+    for (const int number : {SIGINT, SIGTERM, SIGHUP})
+        sigaddset(&fSignals, number);
+    pthread_sigmask(SIG_BLOCK, &fSignals, nullptr);
+    fSignalThread = std::thread([this] { AwaitSignals(); });
+    fFirstThread = std::thread([this] { AwaitFirst(); });
+}
+
+StopSignals::~StopSignals()
+{
+    fEnding = true;
+    ::eventfd_write(fEvent.Get(), 1);
+    pthread_kill(fSignalThread.native_handle(), SIGTERM);
+    fSignalThread.join();
+    fFirstThread.join();
+}
+
+void StopSignals::AwaitSignals()
+{
+    for (int number = 0; sigwait(&fSignals, &number) == 0 && !fEnding;) {
+        if (fStopped.exchange(true))
+            ::_exit(kInterrupted);
+        ::eventfd_write(fEvent.Get(), 1);
+    }
+}
+
+// On a thread of its own, so that the second signal is heard while this is under way.
+void StopSignals::AwaitFirst()
+{
+    pollfd event = {fEvent.Get(), POLLIN, 0};
+    while (::poll(&event, 1, -1) < 0 && errno == EINTR)
+        continue;
+    if (fStopped)
+        fOnFirst();
+}
+
+} // namespace vrxhost

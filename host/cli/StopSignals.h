@@ -1,0 +1,47 @@
+#ifndef VRX_CLI_STOPSIGNALS_H
+#define VRX_CLI_STOPSIGNALS_H
+
+#include <atomic>
+#include <functional>
+#include <thread>
+
+#include <signal.h>
+
+#include <core/UniqueFd.h>
+
+namespace vrxhost {
+
+// ^C and its relatives (SIGINT, SIGTERM, SIGHUP): the first calls a function on a thread of its own, the second ends
+// the process at once. Must be made before any other thread starts, so that all inherit the blocked signals.
+class StopSignals
+{
+  public:
+    explicit StopSignals(std::function<void()> onFirst);
+    // Ends the threads; the signals stay blocked.
+    ~StopSignals();
+
+    StopSignals(const StopSignals&) = delete;
+    StopSignals& operator=(const StopSignals&) = delete;
+
+    bool IsStopped() const { return fStopped; }
+
+    // Readable from the first signal on, for poll().
+    int GetFd() const { return fEvent.Get(); }
+
+  private:
+    void AwaitSignals();
+    void AwaitFirst();
+
+    sigset_t fSignals;
+    std::function<void()> fOnFirst;
+    std::atomic<bool> fStopped{false};
+    std::atomic<bool> fEnding{false};
+    NKOLVRX20::UniqueFd fEvent;
+    // Both run from the start: while a plug-in is loaded, the host's own threads never become more.
+    std::thread fSignalThread;
+    std::thread fFirstThread;
+};
+
+} // namespace vrxhost
+
+#endif
