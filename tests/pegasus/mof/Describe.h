@@ -1,0 +1,18 @@
+#pragma once
+
+#include <Pegasus/Common/CIMClass.h>
+#include <Pegasus/Common/CIMInstance.h>
+#include <Pegasus/Common/CIMQualifierDecl.h>
+
+#include <string>
+
+namespace mof_test {
+
+std::string utf8(const Pegasus::String& text);
+
+/// One line each, close to MOF, with everything that a definition says and nothing else.
+std::string describe(const Pegasus::CIMConstQualifierDecl& declaration);
+std::string describe(const Pegasus::CIMConstClass& cimClass);
+std::string describe(const Pegasus::CIMConstInstance& instance);
+
+} // namespace mof_test
