@@ -55,7 +55,8 @@ Qualifiers QualifierParser::parseList()
                          ")");
         const CIMQualifier qualifier = parseUse();
         if (isAmong(list, qualifier.getName()))
-            fCursor.failAt(offset, "qualifier is given twice");
+            fCursor.failAt(offset, "qualifier " + std::string(qualifier.getName().getString().getCString()) +
+                                       " is given twice");
         list.push_back(qualifier);
     } while (fCursor.skipPunctuation(','));
     fCursor.expectPunctuation(']');

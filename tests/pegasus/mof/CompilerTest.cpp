@@ -138,7 +138,7 @@ INSTANTIATE_TEST_SUITE_P(
         LiteralCase{"arraySizeZero", "uint8 p[0]", "3:9: array size must be a positive decimal number"},
         LiteralCase{"arrayForScalar", "uint8 p = {1}", "3:11: type mismatch: a single uint8 value is expected"},
         LiteralCase{"scalarForArray", "uint8 p[] = 1", "3:13: type mismatch: an array of uint8 value is expected"}),
-    [](const testing::TestParamInfo<LiteralCase>& info) { return std::string(info.param.name); });
+    [](const testing::TestParamInfo<LiteralCase>& row) { return std::string(row.param.name); });
 
 TEST(Compiler, ReadsEveryPartOfAClass)
 {
@@ -214,7 +214,8 @@ TEST(Compiler, ResolvesAliasesInAnyOrder)
     };
     for (const Row& row : rows) {
         std::vector<std::string> got;
-        for (const CIMInstance& instance : compile(schema + row.text).instances())
+        const MemoryHandler handler = compile(schema + row.text);
+        for (const CIMInstance& instance : handler.instances())
             got.push_back(describe(instance));
         EXPECT_THAT(got, testing::ElementsAreArray(row.expected)) << row.name;
     }

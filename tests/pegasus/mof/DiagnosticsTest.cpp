@@ -72,4 +72,4 @@ TEST_P(Diagnostics, ReadAsExpected)
 }
 
 INSTANTIATE_TEST_SUITE_P(Cases, Diagnostics, testing::ValuesIn(caseNames()),
-                         [](const testing::TestParamInfo<std::string>& info) { return info.param; });
+                         [](const testing::TestParamInfo<std::string>& row) { return row.param; });
