@@ -43,10 +43,11 @@ std::optional<std::uint16_t> linkState(const std::optional<std::string>& word)
 std::vector<std::uint8_t> octets(const std::string& address)
 {
     std::vector<std::uint8_t> result;
+    if (address.size() % 3 != 2)
+        return result;
     for (std::size_t at = 0; at < address.size(); at += 3) {
         const auto octet = toNatural("0x" + address.substr(at, 2));
-        const bool isSeparated = at + 2 == address.size() || address[at + 2] == ':';
-        if (!octet || address.size() < at + 2 || !isSeparated)
+        if (!octet || (at != 0 && address[at - 1] != ':'))
             return {};
         result.push_back(static_cast<std::uint8_t>(*octet));
     }

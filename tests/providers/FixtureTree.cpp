@@ -1,0 +1,38 @@
+#include "providers/FixtureTree.h"
+
+#include <stdlib.h>
+
+#include <fstream>
+#include <stdexcept>
+
+namespace lnx {
+
+FixtureTree::FixtureTree()
+{
+    std::string name = (std::filesystem::temp_directory_path() / "lnx-fixture-XXXXXX").string();
+    if (::mkdtemp(name.data()) == nullptr)
+        throw std::runtime_error("mkdtemp " + name);
+    fRoot = name;
+}
+
+FixtureTree::~FixtureTree()
+{
+    std::error_code ignored;
+    std::filesystem::remove_all(fRoot, ignored);
+}
+
+FixtureTree& FixtureTree::file(const std::string& path, const std::string& text)
+{
+    const std::filesystem::path full = fRoot.string() + path;
+    std::filesystem::create_directories(full.parent_path());
+    std::ofstream(full, std::ios::binary) << text;
+    return *this;
+}
+
+FixtureTree& FixtureTree::directory(const std::string& path)
+{
+    std::filesystem::create_directories(fRoot.string() + path);
+    return *this;
+}
+
+} // namespace lnx

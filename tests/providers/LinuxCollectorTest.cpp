@@ -1,0 +1,366 @@
+#include "providers/FixtureTree.h"
+#include "providers/linux/Classes.h"
+#include "providers/linux/Parse.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <limits>
+#include <set>
+#include <sstream>
+#include <sys/stat.h>
+
+namespace lnx {
+namespace {
+
+struct Shown
+{
+    std::string operator()(bool value) const { return value ? "true" : "false"; }
+    std::string operator()(Char16 value) const { return std::string(1, static_cast<char>(value.code)); }
+    std::string operator()(const std::string& value) const { return value; }
+    std::string operator()(const DateTime& value) const
+    {
+        return std::to_string(value.microseconds) + (value.isInterval ? " long" : "");
+    }
+    std::string operator()(const Reference& value) const
+    {
+        std::string text = value.className;
+        for (const auto& [name, key] : value.keys)
+            text += " " + name + "=" + key;
+        return text;
+    }
+    template <class T> std::string operator()(const std::vector<T>& values) const
+    {
+        std::string text;
+        for (const T& value : values)
+            text += (text.empty() ? "" : ",") + (*this)(value);
+        return text;
+    }
+    template <class T> std::string operator()(T number) const
+    {
+        std::ostringstream text;
+        text << +number;
+        return text.str();
+    }
+};
+
+std::string shown(const Record& record, const std::string& name)
+{
+    const Value* value = record.find(name);
+    return value == nullptr ? "<null>" : std::visit(Shown(), *value);
+}
+
+struct Expected
+{
+    const char* property;
+    const char* value;
+};
+
+void expectProperties(const Record& record, const std::vector<Expected>& expected)
+{
+    for (const Expected& row : expected)
+        EXPECT_EQ(shown(record, row.property), row.value) << record.className() << '.' << row.property;
+}
+
+void addPort(FixtureTree& fixture, const std::string& name,
+             const std::vector<std::pair<std::string, std::string>>& files)
+{
+    for (const auto& [file, text] : files)
+        fixture.file("/sys/class/net/" + name + "/" + file, text);
+}
+
+TEST(NetworkPorts, ReadWhatTheKernelShows)
+{
+    FixtureTree fixture;
+    addPort(fixture, "eth0",
+            {{"address", "02:fc:00:aa:bb:01\n"},
+             {"mtu", "1400\n"},
+             {"operstate", "up\n"},
+             {"speed", "10000\n"},
+             {"duplex", "full\n"},
+             {"type", "1\n"},
+             {"carrier", "1\n"},
+             {"flags", "0x1003\n"},
+             {"ifindex", "4\n"},
+             {"statistics/rx_bytes", "18446744073709551615\n"},
+             {"statistics/tx_errors", "7\n"}});
+    addPort(fixture, "lo",
+            {{"address", "00:00:00:00:00:00\n"},
+             {"mtu", "65536\n"},
+             {"operstate", "unknown\n"},
+             {"type", "772\n"},
+             {"flags", "0x8\n"},
+             {"speed", "-1\n"}});
+    fixture.file("/sys/class/net/bonding_masters", "bond0\n");
+
+    const std::vector<Record> ports = networkPorts(fixture.tree());
+    ASSERT_EQ(ports.size(), 2U);
+    expectProperties(ports[0], {{"DeviceID", "eth0"},
+                                {"MACAddress", "02:fc:00:aa:bb:01"},
+                                {"MACOctets", "2,252,0,170,187,1"},
+                                {"PermanentAddress", "02FC00AABB01"},
+                                {"NetworkAddresses", "02FC00AABB01"},
+                                {"ActiveMaximumTransmissionUnit", "1400"},
+                                {"LinkState", "6"},
+                                {"LinkTechnology", "2"},
+                                {"CarrierDetected", "true"},
+                                {"EnabledState", "2"},
+                                {"NegotiatedSpeed", "10000"},
+                                {"Speed", "10000000000"},
+                                {"FullDuplex", "true"},
+                                {"InterfaceFlags", "4099"},
+                                {"BytesReceived", "18446744073709551615"},
+                                {"TransmitErrors", "7"},
+                                {"BytesTransmitted", "<null>"}});
+    expectProperties(ports[1], {{"DeviceID", "lo"},
+                                {"OtherLinkTechnology", "loopback"},
+                                {"LinkState", "0"},
+                                {"CarrierDetected", "<null>"},
+                                {"EnabledState", "3"},
+                                {"NegotiatedSpeed", "-1"},
+                                {"Speed", "<null>"}});
+}
+
+TEST(NetworkPorts, OddAddressesStayText)
+{
+    for (const char* address : {"0", "02:fc:0", "02:fc:00:", "zz:00:00:00:00:00", "02-fc-00-00-00-01", ":::::"}) {
+        FixtureTree fixture;
+        addPort(fixture, "x0", {{"address", address}});
+        expectProperties(networkPorts(fixture.tree()).at(0),
+                         {{"MACAddress", address}, {"MACOctets", "<null>"}, {"PermanentAddress", "<null>"}});
+    }
+}
+
+TEST(Processors, OneForEachListed)
+{
+    FixtureTree fixture;
+    std::string info;
+    for (int i = 0; i < 12; ++i)
+        info += "processor\t: " + std::to_string(i) + "\nvendor_id\t: GenuineIntel\ncpu family\t: 6\nmodel\t\t: 85\n" +
+                "model name\t: Some Processor @ 2.50GHz\nstepping\t: 7\ncpu MHz\t\t: 2499.998\nphysical id\t: 1\n" +
+                "core id\t\t: 3\nflags\t\t: fpu vme lm\nbogomips\t: 4999.99\npower management:\n\n";
+    fixture.file("/proc/cpuinfo", info)
+        .file("/sys/devices/system/cpu/cpu11/cache/index0/size", "32K\n")
+        .file("/sys/devices/system/cpu/cpu11/cache/index1/size", "1024K\n")
+        .file("/sys/devices/system/cpu/cpu11/cpufreq/cpuinfo_max_freq", "3900000\n")
+        .directory("/sys/devices/system/cpu/cpu11/node1");
+
+    const std::vector<Record> all = processors(fixture.tree());
+    ASSERT_EQ(all.size(), 12U);
+    expectProperties(all[11], {{"DeviceID", "CPU11"},
+                               {"Name", "Some Processor @ 2.50GHz"},
+                               {"CurrentClockSpeed", "2500"},
+                               {"MaxClockSpeed", "3900"},
+                               {"BogoMips", "4999.99"},
+                               {"VendorFamily", "6"},
+                               {"VendorModel", "85"},
+                               {"PackageID", "1"},
+                               {"CoreID", "3"},
+                               {"AddressWidth", "64"},
+                               {"Features", "fpu,vme,lm"},
+                               {"CacheSizes", "32,1024"},
+                               {"NumaNode", "1"}});
+    expectProperties(all[0], {{"CacheSizes", "<null>"}, {"MaxClockSpeed", "<null>"}, {"NumaNode", "-1"}});
+}
+
+TEST(Processors, OtherArchitecturesAndOddFiles)
+{
+    struct Case
+    {
+        const char* name;
+        std::string info;
+        std::size_t count;
+    };
+    const std::vector<Case> cases{
+        {"arm, with a trailing block about the board",
+         "processor\t: 0\nBogoMIPS\t: 108.00\n\nprocessor\t: 1\n\nHardware\t: Board\nSerial\t: 0\n", 2},
+        {"no blank line at the end", "processor: 0", 1},
+        {"empty", "", 0},
+        {"one endless line", std::string(100'000, 'x'), 0},
+        {"colons only", ":::\n:\n\n:processor\n", 0},
+        {"binary", std::string("processor\0: 0\n\n\xff\xfe", 18), 0},
+    };
+    for (const Case& row : cases) {
+        FixtureTree fixture;
+        fixture.file("/proc/cpuinfo", row.info);
+        EXPECT_EQ(processors(fixture.tree()).size(), row.count) << row.name;
+    }
+}
+
+TEST(Memories, CommitHeadroomMayBeNegative)
+{
+    FixtureTree fixture;
+    fixture.file("/proc/meminfo", "MemTotal:        1000 kB\nMemFree:          100 kB\nMemAvailable:     250 kB\n"
+                                  "Cached:            50 kB\nCommitLimit:      500 kB\nCommitted_AS:     700 kB\n");
+    expectProperties(memories(fixture.tree()).at(0), {{"BlockSize", "1024"},
+                                                      {"NumberOfBlocks", "1000"},
+                                                      {"ConsumableBlocks", "250"},
+                                                      {"TotalBytes", "1024000"},
+                                                      {"FreeBytes", "102400"},
+                                                      {"UsedPercentage", "75"},
+                                                      {"CommitHeadroom", "-204800"}});
+}
+
+TEST(BlockDevices, ThoseWithASize)
+{
+    FixtureTree fixture;
+    fixture.file("/sys/block/nvme0n1/size", "2000\n")
+        .file("/sys/block/nvme0n1/dev", "259:0\n")
+        .file("/sys/block/nvme0n1/ro", "1\n")
+        .file("/sys/block/nvme0n1/removable", "0\n")
+        .file("/sys/block/nvme0n1/queue/logical_block_size", "4096\n")
+        .file("/sys/block/nvme0n1/queue/physical_block_size", "4096\n")
+        .file("/sys/block/nvme0n1/queue/rotational", "0\n")
+        .file("/sys/block/nvme0n1/queue/scheduler", "[none] mq-deadline kyber\n")
+        .file("/sys/block/nvme0n1/stat", "  10 0 200 5 30 0 400 5 0 1 2\n")
+        .file("/sys/block/nvme0n1/device/model", "Some Disk                \n")
+        .file("/sys/block/loop0/size", "0\n")
+        .directory("/sys/block/broken");
+
+    const std::vector<Record> all = blockDevices(fixture.tree());
+    ASSERT_EQ(all.size(), 1U);
+    expectProperties(all[0], {{"DeviceID", "nvme0n1"},
+                              {"Name", "/dev/nvme0n1"},
+                              {"TotalBytes", "1024000"},
+                              {"BlockSize", "4096"},
+                              {"NumberOfBlocks", "250"},
+                              {"PhysicalBlockSize", "4096"},
+                              {"Access", "1"},
+                              {"Removable", "false"},
+                              {"Rotational", "false"},
+                              {"Scheduler", "none"},
+                              {"Model", "Some Disk"},
+                              {"Vendor", "<null>"},
+                              {"ReadsCompleted", "10"},
+                              {"SectorsWritten", "400"}});
+}
+
+FixtureTree& addProcess(FixtureTree& fixture, const std::string& id, const std::string& command, char state)
+{
+    return fixture.file("/proc/" + id + "/comm", command + "\n")
+        .file("/proc/" + id + "/stat", id + " (" + command + ") " + state + " 0 0\n");
+}
+
+TEST(OperatingSystems, ReadReleaseTimesAndProcesses)
+{
+    FixtureTree fixture;
+    addProcess(fixture, "1", "init", 'S');
+    addProcess(fixture, "20", "worker) R (x", 'R'); // a name that tries to look like the rest of the line
+    addProcess(fixture, "3", "worker", 'S');
+    fixture.file("/etc/os-release", "NAME=\"Some Linux\"\nID=some\nPRETTY_NAME='Some Linux 1'\n")
+        .file("/proc/sys/kernel/hostname", "box\n")
+        .file("/proc/sys/kernel/osrelease", "6.1.0\n")
+        .file("/proc/stat", "cpu 1 2 3\nbtime 1700000000\n")
+        .file("/proc/uptime", "123.50 99.00\n")
+        .file("/proc/loadavg", "0.50 1.25 2.00 1/80 1000\n")
+        .file("/proc/meminfo", "MemTotal: 1000 kB\nSwapTotal: 500 kB\n");
+
+    const Record system = operatingSystems(fixture.tree()).at(0);
+    expectProperties(system, {{"CSName", "box"},
+                              {"Name", "some"},
+                              {"Caption", "Some Linux 1"},
+                              {"Version", "6.1.0"},
+                              {"LastBootUpTime", "1700000000000000"},
+                              {"UpTime", "123500000 long"},
+                              {"UpTimeSeconds", "123.5"},
+                              {"LoadAverages", "0.5,1.25,2"},
+                              {"NumberOfProcesses", "3"},
+                              {"ProcessStates", "R,S"},
+                              {"ProcessStateCounts", "1,2"},
+                              {"InitProcessState", "S"},
+                              {"TotalVirtualMemorySize", "1500"}});
+    EXPECT_EQ(countProcesses(fixture.tree(), std::nullopt), 3U);
+    EXPECT_EQ(countProcesses(fixture.tree(), std::string("worker")), 1U);
+    EXPECT_EQ(countProcesses(fixture.tree(), std::string("nobody")), 0U);
+}
+
+// Every file missing, every file empty, every file a directory: properties are missing then, nothing else.
+TEST(AllClasses, SurviveAMachineWithoutFiles)
+{
+    const std::vector<std::string> files{"/proc/cpuinfo",
+                                         "/proc/meminfo",
+                                         "/proc/stat",
+                                         "/proc/uptime",
+                                         "/proc/loadavg",
+                                         "/etc/os-release",
+                                         "/proc/sys/kernel/hostname",
+                                         "/sys/class/net/eth0/address",
+                                         "/sys/block/sda/size",
+                                         "/proc/1/stat"};
+    for (const char* kind : {"missing", "empty", "directory"}) {
+        FixtureTree fixture;
+        for (const std::string& file : files)
+            if (kind == std::string("empty"))
+                fixture.file(file, "");
+            else if (kind == std::string("directory"))
+                fixture.directory(file);
+        EXPECT_EQ(computerSystems(fixture.tree()).size(), 1U) << kind;
+        EXPECT_EQ(operatingSystems(fixture.tree()).size(), 1U) << kind;
+        EXPECT_TRUE(processors(fixture.tree()).empty()) << kind;
+        EXPECT_TRUE(memories(fixture.tree()).empty()) << kind;
+        EXPECT_TRUE(blockDevices(fixture.tree()).empty()) << kind;
+        EXPECT_EQ(networkPorts(fixture.tree()).size(), kind == std::string("missing") ? 0U : 1U) << kind;
+        EXPECT_EQ(shown(operatingSystems(fixture.tree())[0], "LastBootUpTime"), "<null>") << kind;
+    }
+}
+
+TEST(SystemDevices, LinkTheSystemWithEveryDevice)
+{
+    FixtureTree fixture;
+    addPort(fixture, "eth0", {{"address", "02:fc:00:00:00:01"}});
+    fixture.file("/proc/sys/kernel/hostname", "box\n").file("/proc/cpuinfo", "processor: 0\n");
+    const std::vector<Record> links = systemDevices(fixture.tree());
+    ASSERT_EQ(links.size(), 2U);
+    expectProperties(links[1], {{"GroupComponent", "LNX_ComputerSystem CreationClassName=LNX_ComputerSystem Name=box"},
+                                {"PartComponent", "LNX_NetworkPort SystemCreationClassName=LNX_ComputerSystem "
+                                                  "SystemName=box CreationClassName=LNX_NetworkPort DeviceID=eth0"}});
+}
+
+TEST(SystemTree, ReadsNoMoreThanItsLimit)
+{
+    FixtureTree fixture;
+    fixture.file("/big", std::string(SystemTree::kMaxFileBytes + 10, 'x'));
+    EXPECT_EQ(fixture.tree().text("/big")->size(), SystemTree::kMaxFileBytes);
+}
+
+TEST(SystemTree, DoesNotWaitForAPipe)
+{
+    FixtureTree fixture;
+    ASSERT_EQ(::mkfifo((fixture.root() / "pipe").c_str(), 0600), 0);
+    EXPECT_EQ(fixture.tree().text("/pipe"), "");
+}
+
+TEST(Numbers, AreWholeOrAbsent)
+{
+    struct Case
+    {
+        const char* text;
+        std::optional<std::uint64_t> natural;
+        std::optional<std::int64_t> integer;
+    };
+    constexpr std::uint64_t kMax = std::numeric_limits<std::uint64_t>::max();
+    const std::vector<Case> cases{
+        {"0", 0, 0},
+        {" 42\n", 42, 42},
+        {"-1", {}, -1},
+        {"0x1003", 0x1003, {}},
+        {"", {}, {}},
+        {"12 kB", {}, {}},
+        {"1e3", {}, {}},
+        {"0x", {}, {}},
+        {"18446744073709551615", kMax, {}},
+        {"18446744073709551616", {}, {}},
+        {"+1", {}, {}},
+        {"--1", {}, {}},
+    };
+    for (const Case& row : cases) {
+        EXPECT_EQ(toNatural(row.text), row.natural) << row.text;
+        EXPECT_EQ(toInteger(row.text), row.integer) << row.text;
+    }
+    EXPECT_EQ(narrowed<std::int8_t>(std::optional<std::uint64_t>(200)), std::nullopt);
+    EXPECT_EQ(narrowed<std::uint16_t>(std::optional<std::int64_t>(-1)), std::nullopt);
+    EXPECT_EQ(narrowed<std::int8_t>(std::optional<std::uint64_t>(127)), std::int8_t{127});
+}
+
+} // namespace
+} // namespace lnx

@@ -1,0 +1,211 @@
+#include "pegasus/cmpi/MofServices.h"
+
+#include <Pegasus/Common/CIMProperty.h>
+#include <Pegasus/Common/Exception.h>
+
+#include <gtest/gtest.h>
+
+#include <dlfcn.h>
+
+#include <filesystem>
+#include <fstream>
+#include <map>
+#include <set>
+
+namespace Pegasus::cmpi {
+namespace {
+
+constexpr const char* kProvider = "LinuxInventory";
+
+const char* const kClasses[] = {"LNX_ComputerSystem", "LNX_OperatingSystem", "LNX_Processor",   "LNX_Memory",
+                                "LNX_NetworkPort",    "LNX_BlockDevice",     "LNX_SystemDevice"};
+
+// The vendor's library in the broker, with the vendor's own MOF as schema.
+class LinuxProvider : public testing::Test
+{
+  protected:
+    LinuxProvider()
+    {
+        services.compileFile(PROVIDER_SOURCES "/linux.properties.mof");
+        module = std::make_unique<ProviderModule>("linuxinventory", PROVIDER_LIBRARY, services);
+        services.route(*module, kProvider);
+    }
+
+    std::vector<CIMInstance> all(const char* className, const CIMPropertyList& properties = CIMPropertyList())
+    {
+        std::vector<CIMInstance> found;
+        module->enumerateInstances(MofServices::request(kProvider), CIMName(className), properties,
+                                   [&](const CIMInstance& instance) { found.push_back(instance); });
+        return found;
+    }
+
+    MofServices services;
+    std::unique_ptr<ProviderModule> module;
+};
+
+std::string firstLine(const std::filesystem::path& path)
+{
+    std::string line;
+    std::ifstream file(path);
+    std::getline(file, line);
+    return line;
+}
+
+TEST_F(LinuxProvider, ShowsEveryAddressAsTheKernelDoes)
+{
+    std::map<std::string, std::string> expected;
+    for (const auto& entry : std::filesystem::directory_iterator("/sys/class/net"))
+        if (std::filesystem::exists(entry.path() / "address"))
+            expected[entry.path().filename()] = firstLine(entry.path() / "address");
+
+    std::map<std::string, std::string> shown;
+    for (const CIMInstance& port : all("LNX_NetworkPort"))
+        shown[propertyText(port, "DeviceID")] = propertyText(port, "MACAddress");
+    EXPECT_EQ(shown, expected);
+}
+
+TEST_F(LinuxProvider, ShowsAsManyProcessorsAsTheKernelLists)
+{
+    std::size_t listed = 0;
+    std::ifstream info("/proc/cpuinfo");
+    for (std::string line; std::getline(info, line);)
+        listed += line.rfind("processor", 0) == 0 ? 1 : 0;
+    EXPECT_EQ(all("LNX_Processor").size(), listed);
+}
+
+// Paths are complete, unique, name the class and lead back to their instance; nothing that is set is unknown or
+// mistyped.
+TEST_F(LinuxProvider, EveryInstanceIsFoundByItsPath)
+{
+    for (const char* name : kClasses) {
+        std::set<std::string> paths;
+        for (const CIMInstance& instance : all(name)) {
+            const CIMObjectPath& path = instance.getPath();
+            EXPECT_TRUE(paths.insert(text(path.toString())).second) << text(path.toString());
+            const CIMInstance found = module->getInstance(MofServices::request(kProvider), path, CIMPropertyList());
+            EXPECT_EQ(text(found.getPath().toString()), text(path.toString()));
+        }
+        EXPECT_FALSE(paths.empty()) << name;
+
+        std::set<std::string> names;
+        module->enumerateInstanceNames(MofServices::request(kProvider), CIMName(name),
+                                       [&](const CIMObjectPath& path) { names.insert(text(path.toString())); });
+        EXPECT_EQ(names, paths) << name;
+    }
+    EXPECT_TRUE(services.logged().empty()) << services.logged().front();
+}
+
+TEST_F(LinuxProvider, DeclaresAndDeliversEveryCimType)
+{
+    std::set<std::pair<int, bool>> delivered;
+    for (const char* name : kClasses)
+        for (const CIMInstance& instance : all(name))
+            for (Uint32 i = 0; i < instance.getPropertyCount(); ++i)
+                if (!instance.getProperty(i).getValue().isNull())
+                    delivered.insert({instance.getProperty(i).getType(), instance.getProperty(i).isArray()});
+
+    for (int type = CIMTYPE_BOOLEAN; type <= CIMTYPE_REFERENCE; ++type)
+        EXPECT_TRUE(delivered.count({type, false})) << cimTypeToString(static_cast<CIMType>(type));
+    for (const CIMType type : {CIMTYPE_UINT8, CIMTYPE_UINT16, CIMTYPE_REAL32, CIMTYPE_CHAR16, CIMTYPE_STRING})
+        EXPECT_TRUE(delivered.count({type, true})) << cimTypeToString(type) << "[]";
+}
+
+TEST_F(LinuxProvider, AssociationNamesSystemAndDevice)
+{
+    const std::vector<CIMInstance> links = all("LNX_SystemDevice");
+    ASSERT_FALSE(links.empty());
+    CIMObjectPath system;
+    links[0].getProperty(links[0].findProperty(CIMName("GroupComponent"))).getValue().get(system);
+    EXPECT_EQ(text(system.getClassName().getString()), "LNX_ComputerSystem");
+    EXPECT_EQ(text(system.getNameSpace().getString()), "root/cimv2");
+    EXPECT_EQ(system.getKeyBindings().size(), 2U);
+}
+
+TEST_F(LinuxProvider, PropertyListCutsInstances)
+{
+    Array<CIMName> names;
+    names.append(CIMName("macaddress"));
+    const std::vector<CIMInstance> ports = all("LNX_NetworkPort", CIMPropertyList(names));
+    ASSERT_FALSE(ports.empty());
+    EXPECT_EQ(ports[0].getPropertyCount(), 1U);
+    EXPECT_EQ(ports[0].getPath().getKeyBindings().size(), 4U);
+}
+
+TEST_F(LinuxProvider, CountsProcesses)
+{
+    const CIMObjectPath path = all("LNX_OperatingSystem").at(0).getPath();
+    const std::string own = firstLine("/proc/self/comm");
+    struct Case
+    {
+        const char* name;
+        CIMValue argument;
+        Uint32 atLeast;
+    };
+    const std::vector<Case> cases{{"all", CIMValue(CIMTYPE_STRING, false), 2},
+                                  {"this one", CIMValue(String(own.c_str())), 1}};
+    for (const Case& row : cases) {
+        Array<CIMParamValue> in;
+        Array<CIMParamValue> out;
+        in.append(CIMParamValue(String("Name"), row.argument));
+        const CIMValue result =
+            module->invokeMethod(MofServices::request(kProvider), path, CIMName("CountProcesses"), in, out);
+        EXPECT_EQ(result, CIMValue(Uint32{0})) << row.name;
+        ASSERT_EQ(out.size(), 1U) << row.name;
+        Uint32 count = 0;
+        out[0].getValue().get(count);
+        EXPECT_GE(count, row.atLeast) << row.name;
+    }
+}
+
+template <class Call> CIMStatusCode codeOf(Call&& call)
+{
+    try {
+        call();
+    } catch (const CIMException& error) {
+        return error.getCode();
+    }
+    return CIM_ERR_SUCCESS;
+}
+
+TEST_F(LinuxProvider, RefusesWhatItDoesNotServe)
+{
+    const ProviderRequest request = MofServices::request(kProvider);
+    CIMObjectPath path = all("LNX_Processor").at(0).getPath();
+    Array<CIMParamValue> none;
+    EXPECT_EQ(codeOf([&] { module->invokeMethod(request, path, CIMName("CountProcesses"), none, none); }),
+              CIM_ERR_METHOD_NOT_FOUND);
+    EXPECT_EQ(codeOf([&] { all("CIM_Processor"); }), CIM_ERR_INVALID_CLASS);
+
+    Array<CIMKeyBinding> keys = path.getKeyBindings();
+    for (Uint32 i = 0; i < keys.size(); ++i)
+        if (keys[i].getName().equal(CIMName("DeviceID")))
+            keys[i].setValue(String("CPU99999"));
+    path.setKeyBindings(keys);
+    EXPECT_EQ(codeOf([&] { module->getInstance(request, path, CIMPropertyList()); }), CIM_ERR_NOT_FOUND);
+}
+
+TEST(LinuxLibrary, ResolvesEverythingAtOnce)
+{
+    void* library = ::dlopen(PROVIDER_LIBRARY, RTLD_NOW | RTLD_LOCAL);
+    ASSERT_NE(library, nullptr) << ::dlerror();
+    EXPECT_NE(::dlsym(library, "LinuxInventory_Create_InstanceMI"), nullptr);
+    ::dlclose(library);
+    EXPECT_EQ(::dlopen(PROVIDER_LIBRARY, RTLD_NOW | RTLD_NOLOAD), nullptr) << "it stays loaded";
+}
+
+TEST(LinuxFiles, RegistrationNamesTheClassesOfTheClassFile)
+{
+    const auto contentOf = [](const char* name) {
+        std::ifstream file(std::string(PROVIDER_SOURCES "/") + name);
+        return std::string(std::istreambuf_iterator<char>(file), {});
+    };
+    const std::string classes = contentOf("linux.classes.xml");
+    const std::string registration = contentOf("linux.registration.mof");
+    for (const char* name : kClasses) {
+        EXPECT_NE(classes.find("<class name=\"" + std::string(name) + "\"/>"), std::string::npos) << name;
+        EXPECT_NE(registration.find("ClassName = \"" + std::string(name) + "\""), std::string::npos) << name;
+    }
+}
+
+} // namespace
+} // namespace Pegasus::cmpi
