@@ -22,6 +22,8 @@ struct XmlLimits
     std::size_t maxArrayElements = 1024 * 1024;
     /// Key bindings of one object path, nested ones not counted.
     std::size_t maxKeyBindings = 256;
+    /// Embedded objects in embedded objects.
+    std::size_t maxEmbedding = 8;
 };
 
 } // namespace Pegasus::wire

@@ -80,6 +80,8 @@ class XmlDocument
     /// The text is changed in place and must outlive the elements. Earlier elements of this document become invalid.
     /// Throws: XmlError (not well formed, over a limit, a DOCTYPE, another encoding than UTF-8).
     XmlElement parseMessage(char* text, std::size_t size);
+    /// The same without an XML declaration: an object embedded in a string.
+    XmlElement parseFragment(char* text, std::size_t size);
     /// The same for one element cut out of a message, where `start` is its place there.
     /// Requires: the text is one balanced element within the limits, as XmlSlicer delivers it.
     XmlElement parseElement(char* text, std::size_t size, XmlPlace start);
@@ -91,6 +93,7 @@ class XmlDocument
     struct Tree;
 
     XmlElement parse(char* text, std::size_t size);
+    XmlElement parseChecked(char* text, std::size_t size, bool isMessage);
     XmlPlace placeOf(const char* position) const;
     XmlPlace placeAtOffset(std::size_t offset) const;
 
