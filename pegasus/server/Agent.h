@@ -1,0 +1,12 @@
+#pragma once
+
+namespace Pegasus::server {
+
+// The program in agent mode: "cimprovagt --agent <module> <megabytes>", with the control socket on descriptor 3.
+// Returns: the exit status, when the server has closed the control socket.
+int runAgent(int argc, char** argv);
+
+// Whether the program was started so.
+bool isAgentCommand(int argc, char** argv);
+
+} // namespace Pegasus::server

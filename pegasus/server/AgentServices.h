@@ -1,0 +1,42 @@
+#pragma once
+
+#include "pegasus/cmpi/BrokerServices.h"
+
+#include <Pegasus/Client/CIMClient.h>
+
+#include <memory>
+#include <mutex>
+#include <vector>
+
+namespace Pegasus::server {
+
+// Upcalls of an agent's providers: requests of an ordinary client to the server's local socket, on as many connections
+// as calls run at once.
+class AgentServices : public cmpi::BrokerServices
+{
+  public:
+    explicit AgentServices(const std::string& module) : fModule(module) {}
+
+    CIMClass getClass(const CIMNamespaceName& nameSpace, const CIMName& className) override;
+    CIMInstance getInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path,
+                            const CIMPropertyList& properties) override;
+    Array<CIMInstance> enumerateInstances(const CIMNamespaceName& nameSpace, const CIMName& className,
+                                          const CIMPropertyList& properties) override;
+    Array<CIMObjectPath> enumerateInstanceNames(const CIMNamespaceName& nameSpace, const CIMName& className) override;
+    CIMValue invokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPath& path, const CIMName& method,
+                          const Array<CIMParamValue>& in, Array<CIMParamValue>& out) override;
+    CIMObjectPath createInstance(const CIMNamespaceName& nameSpace, const CIMInstance& instance) override;
+    void log(Severity severity, const std::string& text) noexcept override;
+
+  private:
+    // Runs a call on a client of its own; a client whose call failed without a CIM status is dropped.
+    template <typename Call> auto withClient(const Call& call);
+    std::unique_ptr<CIMClient> takeClient();
+    void giveBack(std::unique_ptr<CIMClient> client);
+
+    std::string fModule;
+    std::mutex fMutex;
+    std::vector<std::unique_ptr<CIMClient>> fIdle;
+};
+
+} // namespace Pegasus::server

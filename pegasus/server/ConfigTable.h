@@ -1,0 +1,43 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+namespace Pegasus::server {
+
+// One property of the server's configuration. Names are compared as written.
+struct ConfigProperty
+{
+    enum class Kind
+    {
+        kBoolean,
+        kFalse,       // a facility that this server does not have: only "false" is accepted
+        kPort,        // 1 to 65535
+        kCount,       // 1 to 2^31-1
+        kCountOrZero, // 0 to 2^31-1, 0 switches the facility off
+        kConsumer,    // becomes a part of a file name
+        kDirectory,
+        kDirectoryList, // colon-separated, each below the home directory unless absolute, each readable
+        kLogLevel
+    };
+
+    const char* name;
+    const char* defaultValue;
+    Kind kind;
+    bool dynamic; // may be changed while the server runs
+    const char* meaning;
+};
+
+// Every property, in the order in which they are listed.
+const std::vector<ConfigProperty>& configTable();
+
+// Returns: null if there is no such property.
+const ConfigProperty* findConfigProperty(const std::string& name);
+
+// Whether a property may take a value; `home` is where relative directories start.
+bool isValidConfigValue(const ConfigProperty& property, const std::string& value, const std::string& home);
+
+// Splits a directory list and puts relative entries below `home`; empty entries are left out.
+std::vector<std::string> splitDirectoryList(const std::string& list, const std::string& home);
+
+} // namespace Pegasus::server

@@ -1,0 +1,67 @@
+#pragma once
+
+#include <cstddef>
+#include <stdexcept>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace Pegasus::server {
+
+// Bounds on one request (named alike in the configuration).
+struct HttpLimits
+{
+    std::size_t maxHeaderBytes = 65536;
+    std::size_t maxBodyBytes = 16u << 20;
+};
+
+// One request as it came. Header names compare without regard to case.
+struct HttpRequest
+{
+    std::string method; // "POST"; "M-POST" has been resolved (its numbered headers bear their plain names)
+    std::string body;
+    std::vector<std::pair<std::string, std::string>> headers;
+    bool hasBodyLength = false;  // by Content-Length or chunks
+    std::string extensionPrefix; // "NN-" of an M-POST, for the answer's headers
+
+    // Returns: null if absent.
+    const std::string* header(const char* name) const;
+    // Whether a comma-separated header holds a word, whatever its parameters.
+    bool headerHas(const char* name, const char* word) const;
+};
+
+// A request that gets an HTTP error instead of an answer.
+class HttpError : public std::runtime_error
+{
+  public:
+    // Whether the stream is still in step behind this request.
+    enum class After
+    {
+        kKeepOpen,
+        kClose
+    };
+
+    // `cimError` and `detail` may be empty; they become the CIMError and PGErrorDetail headers.
+    HttpError(unsigned status, After after, const std::string& cimError = "", const std::string& detail = "");
+
+    unsigned status() const { return fStatus; }
+    const std::string& cimError() const { return fCimError; }
+    const std::string& detail() const { return fDetail; }
+    bool closes() const { return fAfter == After::kClose; }
+
+  private:
+    unsigned fStatus;
+    After fAfter;
+    std::string fCimError;
+    std::string fDetail;
+};
+
+// Returns: "Not Found" for 404.
+const char* httpReason(unsigned status);
+
+// Percent-encoding of header values (RFC 3986 unreserved characters stay).
+std::string percentEncode(const std::string& text);
+// Ill-formed escapes stay as they are.
+std::string percentDecode(const std::string& text);
+
+} // namespace Pegasus::server

@@ -1,0 +1,15 @@
+#pragma once
+
+#include <string>
+
+namespace Pegasus::server {
+
+// Replaces `path` by a regular file of mode 0600 with this content, in one step: a reader sees the old file or the new
+// one. A link at `path` is replaced, never followed.
+// Throws: std::system_error.
+void writePrivateFile(const std::string& path, const std::string& content);
+
+// Returns: at most `maxBytes` of the file; empty if it is missing, unreadable or no regular file.
+std::string readSmallFile(const std::string& path, std::size_t maxBytes);
+
+} // namespace Pegasus::server

@@ -1,0 +1,174 @@
+#include "pegasus/server/Server.h"
+
+#include "pegasus/common/LocalSocket.h"
+#include "pegasus/server/Acceptor.h"
+#include "pegasus/server/Dispatcher.h"
+#include "pegasus/server/Housekeeper.h"
+#include "pegasus/server/Listener.h"
+#include "pegasus/server/Log.h"
+#include "pegasus/server/PeerCheck.h"
+#include "pegasus/server/StartFile.h"
+#include "pegasus/server/StopSignal.h"
+#include "pegasus/server/TreeLock.h"
+
+#include <system_error>
+
+namespace Pegasus::server {
+
+namespace {
+
+constexpr std::chrono::seconds kGraceAfterBreak{5};
+constexpr std::chrono::seconds kHousekeepingInterval{2};
+
+Severity logLevel(const Config& config)
+{
+    const std::string level = config.text("logLevel");
+    return level == "ERROR"     ? Severity::kError
+           : level == "WARNING" ? Severity::kWarning
+           : level == "DEBUG"   ? Severity::kDebug
+                                : Severity::kInformation;
+}
+
+ConnectionSettings connectionSettings(const Config& config)
+{
+    ConnectionSettings settings;
+    settings.http = {config.number("maxHeaderBytes"), config.number("maxBodyBytes")};
+    settings.times = {config.seconds("idleConnectionTimeout"), config.seconds("requestReadTimeout")};
+    settings.writePatience = config.seconds("socketWriteTimeout");
+    settings.maxXmlDepth = config.number("maxXmlDepth");
+    settings.maxBufferedAnswerBytes = config.number("maxBufferedAnswerBytes");
+    return settings;
+}
+
+AgentSettings agentSettings(const Config& config)
+{
+    AgentSettings settings;
+    settings.providerDirectories = config.directories("providerDir");
+    settings.patience = config.seconds("providerTimeout");
+    settings.idle = config.seconds("agentIdleTimeout");
+    settings.memoryMegabytes = config.number("agentMemoryMegabytes");
+    return settings;
+}
+
+// The files that say that this server runs; taken first, removed last.
+class Presence
+{
+  public:
+    explicit Presence(const Config& config) : fHome(config.home()), fStartFile(config.text("consumer")) {}
+    ~Presence()
+    {
+        if (fWritten)
+            fStartFile.removeIfOf(::getpid());
+        fLock.release();
+    }
+    Presence(const Presence&) = delete;
+    Presence& operator=(const Presence&) = delete;
+
+    void take(const Config& config)
+    try {
+        if (!fLock.acquire(fHome) || fStartFile.runningServer())
+            throw StartError("Unable to start CIMServer. CIMServer is already running.");
+        config.save();
+    } catch (const std::system_error&) {
+        throw StartError("cimserver not started: Failed to save configuration properties to file: cannot open file: " +
+                         currentConfigPath(fHome) + ". Configuration property not set.");
+    }
+
+    void announce()
+    {
+        fStartFile.write(::getpid());
+        fWritten = true;
+        Log::write(Severity::kInformation, "Wrote the start file " + fStartFile.path() + ".");
+    }
+
+  private:
+    std::string fHome;
+    StartFile fStartFile;
+    TreeLock fLock;
+    bool fWritten = false;
+};
+
+// Removes the local socket when the server ends.
+class LocalSocketFile
+{
+  public:
+    explicit LocalSocketFile(const std::string& home) : fHome(home) {}
+    ~LocalSocketFile() { wire::removeLocalSocket(fHome); }
+    LocalSocketFile(const LocalSocketFile&) = delete;
+    LocalSocketFile& operator=(const LocalSocketFile&) = delete;
+
+  private:
+    std::string fHome;
+};
+
+std::string repositoryPath(const Config& config)
+{
+    const std::string directory = config.text("repositoryDir");
+    return directory[0] == '/' ? directory : config.home() + "/" + directory;
+}
+
+std::vector<Acceptor::Source> listen(const Config& config, ConnectionGroup& remote, ConnectionGroup& local)
+{
+    std::vector<Acceptor::Source> sources;
+    if (config.flag("enableHttpConnection")) {
+        const auto port = static_cast<std::uint16_t>(config.number("httpPort"));
+        sources.push_back({listenOnLoopback(port), tcpPeerUser, &remote});
+        Log::write(Severity::kInformation, "Listening on 127.0.0.1:" + std::to_string(port) + ".");
+    }
+    sources.push_back({listenLocally(config.home()), localPeerUser, &local});
+    return sources;
+}
+
+// Running requests get their time, then agents and connections are ended under them.
+void endConnections(ConnectionGroup& remote, ConnectionGroup& local, AgentPool& agents, std::chrono::seconds grace)
+{
+    remote.endReading();
+    const Deadline deadline = Clock::now() + grace;
+    const bool remoteEnded = remote.waitForEnd(deadline);
+    // Agents call back over local connections as long as they work for remote ones.
+    local.endReading();
+    const bool localEnded = local.waitForEnd(deadline);
+    agents.shutDown();
+    if (remoteEnded && localEnded)
+        return;
+    remote.breakAll();
+    local.breakAll();
+    if (!remote.waitForEnd(Clock::now() + kGraceAfterBreak) || !local.waitForEnd(Clock::now() + kGraceAfterBreak)) {
+        Log::write(Severity::kError, "Requests do not end; the server ends without them.");
+        wire::removeLocalSocket(defaultHome());
+        ::_exit(1);
+    }
+}
+
+} // namespace
+
+void Server::run(LaunchSignal& signal)
+{
+    Presence presence(fConfig);
+    presence.take(fConfig);
+    Log::open(fConfig.home(), !fConfig.flag("daemon"));
+    Log::setLevel(logLevel(fConfig));
+    StopSignal stop;
+    repository::Repository repository(repositoryPath(fConfig));
+    ProviderRegistry registry(repository);
+    AgentPool agents([&] { return agentSettings(fConfig); });
+    ServerCore core = {fConfig, repository, registry, agents, [&] { stop.raise(); }};
+    Dispatcher dispatcher(core);
+    const auto settings = [&] { return connectionSettings(fConfig); };
+    ConnectionGroup remote(dispatcher, settings);
+    ConnectionGroup local(dispatcher, settings);
+    const LocalSocketFile socketFile(fConfig.home());
+    Acceptor acceptor(listen(fConfig, remote, local), stop.fd(), [&] { return fConfig.number("maxConnections"); });
+    presence.announce();
+    Log::write(Severity::kInformation, "Started CIM Server, process " + std::to_string(::getpid()) + ".");
+    const Housekeeper housekeeper(kHousekeepingInterval, [&] {
+        Log::setLevel(logLevel(fConfig));
+        agents.endIdleAgents();
+    });
+    signal.ready();
+    acceptor.run();
+    endConnections(remote, local, agents, fConfig.seconds("shutdownTimeout"));
+    Log::write(Severity::kInformation, "CIM Server stopped.");
+}
+
+} // namespace Pegasus::server

@@ -1,0 +1,36 @@
+#pragma once
+
+#include "pegasus/server/Config.h"
+#include "pegasus/server/Daemon.h"
+
+#include <string>
+#include <vector>
+
+namespace Pegasus::server {
+
+// The server cannot start. what() is what the launcher prints.
+class StartError : public std::runtime_error
+{
+  public:
+    using std::runtime_error::runtime_error;
+};
+
+// One run of the server, from its configuration to its orderly end.
+//
+// It ends on SIGTERM, SIGINT and SIGHUP, and when a client calls PG_ShutdownService.shutdown: no new request is read,
+// running ones get shutdownTimeout, then the agents are ended; socket, start file and lock are removed.
+class Server
+{
+  public:
+    explicit Server(Config& config) : fConfig(config) {}
+
+    // Serves. Tells `signal` when connections are accepted.
+    // Throws: StartError before that.
+    // Requires: no other thread runs; called once a process (it takes the process's signals).
+    void run(LaunchSignal& signal);
+
+  private:
+    Config& fConfig;
+};
+
+} // namespace Pegasus::server
