@@ -24,7 +24,7 @@ class TCIMValue
     class TCIMType
     {
       public:
-        enum ECIMType
+        enum ECIMType : unsigned int
         {
             kNone = 0,
             kBoolean = 1,
