@@ -27,18 +27,18 @@ template <class T> bool qualifierValue(const CIMConstClass& owner, const char* n
     return true;
 }
 
-/// m.n.u, digits all (DSP0004, Version)
+/// m.n.u, digits all (DSP0004, Version). The DMTF's own files leave out the last part now and then.
 bool isVersion(const std::string& text)
 {
-    std::size_t at = 0;
-    for (int part = 0; part < 3; ++part) {
-        const std::size_t digits = text.find_first_not_of("0123456789", at);
-        const std::size_t end = digits == std::string::npos ? text.size() : digits;
-        if (end == at || (part < 2 ? end == text.size() || text[end] != '.' : end != text.size()))
+    int dotCount = 0;
+    for (std::size_t at = 0;; ++dotCount) {
+        const std::size_t end = std::min(text.find('.', at), text.size());
+        if (end == at || text.find_first_not_of("0123456789", at) < end)
             return false;
+        if (end == text.size())
+            return dotCount <= 2;
         at = end + 1;
     }
-    return true;
 }
 
 } // namespace

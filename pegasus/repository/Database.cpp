@@ -11,8 +11,8 @@ namespace {
 /// EXCLUSIVE keeps the write-ahead log's index in this process's memory: no further file, no locking per statement.
 /// OFF leaves writing back to the kernel, which outlives the process.
 constexpr const char* kPragmas = "PRAGMA locking_mode=EXCLUSIVE;"
-                                 "PRAGMA journal_mode=WAL;"
                                  "PRAGMA synchronous=OFF;"
+                                 "PRAGMA journal_mode=WAL;"
                                  "PRAGMA temp_store=MEMORY;";
 
 } // namespace

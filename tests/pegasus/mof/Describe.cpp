@@ -25,12 +25,23 @@ std::string flavorText(const CIMFlavor& flavor)
     return words.empty() ? "" : ":" + words;
 }
 
+std::string propagatedText(bool isPropagated)
+{
+    return isPropagated ? "~" : "";
+}
+
+std::string originText(const CIMName& origin)
+{
+    return origin.isNull() ? "" : "@" + utf8(origin.getString());
+}
+
 template <class Owner> std::string qualifiersText(const Owner& owner)
 {
     std::string text;
     for (Uint32 i = 0; i < owner.getQualifierCount(); ++i) {
         const CIMConstQualifier qualifier = owner.getQualifier(i);
-        text += (i == 0 ? "[" : ", ") + utf8(qualifier.getName().getString()) + "=" + valueText(qualifier.getValue()) +
+        text += (i == 0 ? "[" : ", ") + propagatedText(qualifier.getPropagated() != 0) +
+                utf8(qualifier.getName().getString()) + "=" + valueText(qualifier.getValue()) +
                 flavorText(qualifier.getFlavor());
     }
     return text.empty() ? "" : text + "] ";
@@ -38,9 +49,10 @@ template <class Owner> std::string qualifiersText(const Owner& owner)
 
 std::string describe(const CIMConstProperty& property)
 {
-    return qualifiersText(property) +
+    return propagatedText(property.getPropagated()) + qualifiersText(property) +
            typeText(property.getType(), property.isArray(), property.getArraySize(), property.getReferenceClassName()) +
-           " " + utf8(property.getName().getString()) + "=" + valueText(property.getValue()) + "; ";
+           " " + utf8(property.getName().getString()) + originText(property.getClassOrigin()) + "=" +
+           valueText(property.getValue()) + "; ";
 }
 
 std::string describe(const CIMConstParameter& parameter)
@@ -53,8 +65,9 @@ std::string describe(const CIMConstParameter& parameter)
 
 std::string describe(const CIMConstMethod& method)
 {
-    std::string text =
-        qualifiersText(method) + cimTypeToString(method.getType()) + " " + utf8(method.getName().getString()) + "(";
+    std::string text = propagatedText(method.getPropagated()) + qualifiersText(method) +
+                       cimTypeToString(method.getType()) + " " + utf8(method.getName().getString()) +
+                       originText(method.getClassOrigin()) + "(";
     for (Uint32 i = 0; i < method.getParameterCount(); ++i)
         text += (i == 0 ? "" : ", ") + describe(method.getParameter(i));
     return text + "); ";
