@@ -6,6 +6,7 @@
 #include <fcntl.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
+#include <sys/time.h>
 #include <sys/un.h>
 #include <system_error>
 #include <unistd.h>
@@ -87,10 +88,13 @@ std::string localSocketHome()
     return home ? home : "";
 }
 
-int connectLocalSocket(const std::string& home)
+int connectLocalSocket(const std::string& home, int timeoutMs)
 {
     const Descriptor folder(openHome(home));
     Descriptor socket(newSocket(home));
+    const timeval limit{timeoutMs / 1000, (timeoutMs % 1000) * 1000};
+    if (::setsockopt(socket.get(), SOL_SOCKET, SO_SNDTIMEO, &limit, sizeof(limit)) < 0)
+        fail("cannot set the time-out of", home);
     if (connectRetrying(socket.get(), addressIn(folder.get())) < 0)
         fail("cannot connect to", home);
     return socket.release();

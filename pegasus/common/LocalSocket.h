@@ -14,7 +14,8 @@ extern const char* const kLocalSocketName;
 /// Returns: the folder that the environment's PEGASUS_HOME names; empty when unset.
 std::string localSocketHome();
 /// A connected, blocking stream socket. The caller owns the descriptor.
-int connectLocalSocket(const std::string& home);
+/// Blocks: at most `timeoutMs` when the listener's queue is full; 0 waits without a bound.
+int connectLocalSocket(const std::string& home, int timeoutMs = 0);
 /// A listening socket with mode 0600; a socket file left over is replaced. The caller owns the descriptor.
 int listenLocalSocket(const std::string& home, int backlog);
 /// Removes the socket file; not being there is no error.

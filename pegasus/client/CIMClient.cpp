@@ -1,0 +1,223 @@
+#include "pegasus/client/CIMClientRep.h"
+#include "pegasus/common/StringRep.h"
+
+#include <Pegasus/Client/CIMClient.h>
+
+namespace Pegasus {
+namespace {
+
+using client::IntrinsicRequest;
+using wire::ElementDecoder;
+using wire::XmlElement;
+
+[[noreturn]] void failMissing(const char* method, const char* element)
+{
+    throw CIMClientXmlException(String("Validation error: expected ERROR or IRETURNVALUE element with ") + element +
+                                " (" + method + " answer)");
+}
+
+void failUnexpected(const XmlElement& element)
+{
+    element.fail(wire::XmlError::Kind::Invalid,
+                 "Expected close of IRETURNVALUE element, got " + std::string(element.name()) + " instead");
+}
+
+/// An operation whose result is one object. An answer that says success without a result gives an uninitialised one.
+template <class T>
+T readOne(CIMClientRep& rep, const client::Request& request, const char* elementName,
+          T (ElementDecoder::*decode)(const XmlElement&))
+{
+    T result;
+    bool found = false;
+    const bool saidSuccess = rep.exchange(request, [&](const XmlElement& element, ElementDecoder& decoder) {
+        if (found)
+            failUnexpected(element);
+        result = (decoder.*decode)(element);
+        found = true;
+    });
+    if (!found && !saidSuccess)
+        failMissing(request.method.c_str(), elementName);
+    return result;
+}
+
+/// An operation whose result is a list.
+template <class T>
+Array<T> readAll(CIMClientRep& rep, const client::Request& request, T (ElementDecoder::*decode)(const XmlElement&))
+{
+    Array<T> results;
+    rep.exchange(request, [&](const XmlElement& element, ElementDecoder& decoder) {
+        results.append((decoder.*decode)(element));
+    });
+    return results;
+}
+
+void readNothing(CIMClientRep& rep, const client::Request& request)
+{
+    rep.exchange(request, [](const XmlElement& element, ElementDecoder&) { failUnexpected(element); });
+}
+
+constexpr bool kReads = true;
+constexpr bool kWrites = false;
+
+} // namespace
+
+CIMClient::CIMClient() : fRep(new CIMClientRep()) {}
+
+CIMClient::~CIMClient()
+{
+    delete fRep;
+}
+
+Uint32 CIMClient::getTimeout() const
+{
+    return fRep->timeoutMs();
+}
+
+void CIMClient::setTimeout(Uint32 timeoutMilliseconds)
+{
+    fRep->setTimeoutMs(timeoutMilliseconds);
+}
+
+void CIMClient::connect(const String& host, const Uint32 portNumber, const String&, const String&)
+{
+    if (host.size() == 0 && portNumber == 0)
+        return connectLocal();
+    client::ServerAddress address;
+    address.host = host.size() > 0 ? StringAccess::toUtf8(host) : "localhost";
+    address.port = portNumber;
+    fRep->connect(address);
+}
+
+void CIMClient::connectLocal()
+{
+    client::ServerAddress address;
+    address.isLocal = true;
+    fRep->connect(address);
+}
+
+void CIMClient::disconnect()
+{
+    fRep->disconnect();
+}
+
+CIMClass CIMClient::getClass(const CIMNamespaceName& nameSpace, const CIMName& className, Boolean localOnly,
+                             Boolean includeQualifiers, Boolean includeClassOrigin, const CIMPropertyList& propertyList)
+{
+    IntrinsicRequest request("GetClass", nameSpace, kReads);
+    request.className("ClassName", className)
+        .flag("LocalOnly", localOnly, true)
+        .flag("IncludeQualifiers", includeQualifiers, true)
+        .flag("IncludeClassOrigin", includeClassOrigin, false)
+        .propertyList(propertyList);
+    return readOne(*fRep, request.finish(), "CLASS", &ElementDecoder::decodeClass);
+}
+
+Array<CIMClass> CIMClient::enumerateClasses(const CIMNamespaceName& nameSpace, const CIMName& className,
+                                            Boolean deepInheritance, Boolean localOnly, Boolean includeQualifiers,
+                                            Boolean includeClassOrigin)
+{
+    IntrinsicRequest request("EnumerateClasses", nameSpace, kReads);
+    request.className("ClassName", className)
+        .flag("DeepInheritance", deepInheritance, false)
+        .flag("LocalOnly", localOnly, true)
+        .flag("IncludeQualifiers", includeQualifiers, true)
+        .flag("IncludeClassOrigin", includeClassOrigin, false);
+    return readAll(*fRep, request.finish(), &ElementDecoder::decodeClass);
+}
+
+Array<CIMName> CIMClient::enumerateClassNames(const CIMNamespaceName& nameSpace, const CIMName& className,
+                                              Boolean deepInheritance)
+{
+    IntrinsicRequest request("EnumerateClassNames", nameSpace, kReads);
+    request.className("ClassName", className).flag("DeepInheritance", deepInheritance, false);
+    return readAll(*fRep, request.finish(), &ElementDecoder::decodeClassName);
+}
+
+void CIMClient::createClass(const CIMNamespaceName& nameSpace, const CIMClass& newClass)
+{
+    IntrinsicRequest request("CreateClass", nameSpace, kWrites);
+    request.newClass(newClass);
+    readNothing(*fRep, request.finish());
+}
+
+CIMInstance CIMClient::getInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& instanceName,
+                                   Boolean localOnly, Boolean includeQualifiers, Boolean includeClassOrigin,
+                                   const CIMPropertyList& propertyList)
+{
+    IntrinsicRequest request("GetInstance", nameSpace, kReads);
+    request.instanceName(instanceName)
+        .flag("LocalOnly", localOnly, true)
+        .flag("IncludeQualifiers", includeQualifiers, false)
+        .flag("IncludeClassOrigin", includeClassOrigin, false)
+        .propertyList(propertyList);
+    return readOne(*fRep, request.finish(), "INSTANCE", &ElementDecoder::decodeInstance);
+}
+
+Array<CIMInstance> CIMClient::enumerateInstances(const CIMNamespaceName& nameSpace, const CIMName& className,
+                                                 Boolean deepInheritance, Boolean localOnly, Boolean includeQualifiers,
+                                                 Boolean includeClassOrigin, const CIMPropertyList& propertyList)
+{
+    IntrinsicRequest request("EnumerateInstances", nameSpace, kReads);
+    request.className("ClassName", className)
+        .flag("LocalOnly", localOnly, true)
+        .flag("DeepInheritance", deepInheritance, true)
+        .flag("IncludeQualifiers", includeQualifiers, false)
+        .flag("IncludeClassOrigin", includeClassOrigin, false)
+        .propertyList(propertyList);
+    return readAll(*fRep, request.finish(), &ElementDecoder::decodeNamedInstance);
+}
+
+Array<CIMObjectPath> CIMClient::enumerateInstanceNames(const CIMNamespaceName& nameSpace, const CIMName& className)
+{
+    IntrinsicRequest request("EnumerateInstanceNames", nameSpace, kReads);
+    request.className("ClassName", className);
+    return readAll(*fRep, request.finish(), &ElementDecoder::decodeInstanceName);
+}
+
+CIMObjectPath CIMClient::createInstance(const CIMNamespaceName& nameSpace, const CIMInstance& newInstance)
+{
+    IntrinsicRequest request("CreateInstance", nameSpace, kWrites);
+    request.newInstance(newInstance);
+    return readOne(*fRep, request.finish(), "INSTANCENAME", &ElementDecoder::decodeInstanceName);
+}
+
+CIMQualifierDecl CIMClient::getQualifier(const CIMNamespaceName& nameSpace, const CIMName& qualifierName)
+{
+    IntrinsicRequest request("GetQualifier", nameSpace, kReads);
+    request.text("QualifierName", qualifierName.getString());
+    return readOne(*fRep, request.finish(), "QUALIFIER.DECLARATION", &ElementDecoder::decodeQualifierDeclaration);
+}
+
+Array<CIMQualifierDecl> CIMClient::enumerateQualifiers(const CIMNamespaceName& nameSpace)
+{
+    return readAll(*fRep, IntrinsicRequest("EnumerateQualifiers", nameSpace, kReads).finish(),
+                   &ElementDecoder::decodeQualifierDeclaration);
+}
+
+void CIMClient::setQualifier(const CIMNamespaceName& nameSpace, const CIMQualifierDecl& qualifierDeclaration)
+{
+    IntrinsicRequest request("SetQualifier", nameSpace, kWrites);
+    request.qualifierDeclaration(qualifierDeclaration);
+    readNothing(*fRep, request.finish());
+}
+
+CIMValue CIMClient::invokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPath& instanceName,
+                                 const CIMName& methodName, const Array<CIMParamValue>& inParameters,
+                                 Array<CIMParamValue>& outParameters)
+{
+    CIMValue returnValue;
+    Array<CIMParamValue> outputs;
+    bool isFirst = true;
+    fRep->exchange(client::encodeInvokeMethod(nameSpace, instanceName, methodName, inParameters),
+                   [&](const XmlElement& element, ElementDecoder& decoder) {
+                       if (isFirst && element.is("RETURNVALUE"))
+                           returnValue = decoder.decodeReturnValue(element);
+                       else
+                           outputs.append(decoder.decodeParamValue(element));
+                       isFirst = false;
+                   });
+    outParameters = outputs;
+    return returnValue;
+}
+
+} // namespace Pegasus

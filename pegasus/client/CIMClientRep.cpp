@@ -1,0 +1,226 @@
+#include "pegasus/client/CIMClientRep.h"
+
+#include "pegasus/common/NumberText.h"
+#include "pegasus/common/StringRep.h"
+
+#include <Pegasus/Client/CIMClientException.h>
+
+#include <atomic>
+#include <pwd.h>
+#include <strings.h>
+#include <unistd.h>
+
+namespace Pegasus {
+namespace {
+
+using client::Deadline;
+using client::HttpResponse;
+using client::ResponseFields;
+using client::ResponseReader;
+using Result = client::Connection::Result;
+
+constexpr std::size_t kReceiveBytes = 64 * 1024;
+constexpr const char* kClosed = "Connection closed by CIM Server.";
+
+std::string nextMessageId()
+{
+    static std::atomic<Uint32> next{1000};
+    return std::to_string(next.fetch_add(1, std::memory_order_relaxed));
+}
+
+/// Text of a peer: UTF-8 if it is, else each byte a character.
+String toString(std::string_view text)
+{
+    try {
+        return StringAccess::fromUtf8(text);
+    } catch (const Exception&) {
+        String result;
+        for (const char c : text)
+            result.append(Char16(static_cast<unsigned char>(c)));
+        return result;
+    }
+}
+
+std::string localUser()
+{
+    char buffer[4096];
+    passwd entry{};
+    passwd* found = nullptr;
+    if (::getpwuid_r(::geteuid(), &entry, buffer, sizeof(buffer), &found) != 0 || !found)
+        return std::to_string(::geteuid());
+    return found->pw_name;
+}
+
+bool equalNoCase(std::string_view x, std::string_view y)
+{
+    return x.size() == y.size() && ::strncasecmp(x.data(), y.data(), x.size()) == 0;
+}
+
+/// The next word of a Content-Type: a token, a quoted text without its quotes, or one of the separators.
+std::string_view takeWord(std::string_view& text)
+{
+    text.remove_prefix(std::min(text.find_first_not_of(" \t"), text.size()));
+    if (text.empty())
+        return text;
+    if (text.front() == '"') {
+        const std::size_t end = text.find('"', 1);
+        const std::string_view word = text.substr(1, end == std::string_view::npos ? end : end - 1);
+        text.remove_prefix(end == std::string_view::npos ? text.size() : end + 1);
+        return word;
+    }
+    const std::size_t size = text.find_first_of(" \t;=") == 0 ? 1 : std::min(text.find_first_of(" \t;="), text.size());
+    const std::string_view word = text.substr(0, size);
+    text.remove_prefix(size);
+    return word;
+}
+
+/// application/xml or text/xml, with charset utf-8.
+bool isXmlInUtf8(std::string_view contentType)
+{
+    const std::string_view type = takeWord(contentType);
+    return (equalNoCase(type, "application/xml") || equalNoCase(type, "text/xml")) && takeWord(contentType) == ";" &&
+           equalNoCase(takeWord(contentType), "charset") && takeWord(contentType) == "=" &&
+           equalNoCase(takeWord(contentType), "utf-8");
+}
+
+void checkHeader(const ResponseFields& fields)
+{
+    if (fields.status != 200)
+        throw CIMClientHTTPErrorException(fields.status, toString(fields.reason), toString(fields.cimError),
+                                          toString(client::percentDecoded(fields.errorDetail)));
+    if (!fields.hasCimOperation)
+        throw CIMClientMalformedHTTPException("Missing CIMOperation HTTP header");
+    if (!equalNoCase(fields.cimOperation, "MethodResponse"))
+        throw CIMClientMalformedHTTPException("Received CIMOperation HTTP header value \"" +
+                                              toString(fields.cimOperation) + "\", expected \"MethodResponse\"");
+    if (fields.hasContentType && !isXmlInUtf8(fields.contentType))
+        throw CIMClientMalformedHTTPException("Bad Content-Type HTTP header; " + toString(fields.contentType));
+}
+
+/// The status that a header or trailer field carries.
+void checkStatusField(const ResponseFields& fields)
+{
+    if (!fields.hasStatusCode)
+        return;
+    const auto code = number::parseUnsigned(fields.statusCode);
+    if (!code || *code > 0xFFFF)
+        throw CIMClientMalformedHTTPException("Bad CIMStatusCode HTTP header; " + toString(fields.statusCode));
+    if (*code == CIM_ERR_SUCCESS)
+        return;
+    const auto status = static_cast<CIMStatusCode>(*code);
+    const String description = toString(client::percentDecoded(fields.statusDescription));
+    throw CIMException(status, description.size() > 0 ? description : String(cimStatusCodeToString(status)));
+}
+
+/// `on line 2: cause (GetClass answer, column 14)`
+[[noreturn]] void throwXml(const std::string& method, const wire::XmlError& error)
+{
+    const std::string place = " (" + method + " answer, column " + std::to_string(error.place().column) + ")";
+    throw CIMClientXmlException(error.getMessage() + toString(place));
+}
+
+} // namespace
+
+void CIMClientRep::connect(const client::ServerAddress& address)
+{
+    if (fAddress)
+        throw AlreadyConnectedException();
+    fConnection.open(address, Deadline(fTimeoutMs));
+    fAddress = address;
+}
+
+void CIMClientRep::disconnect()
+{
+    fConnection.close();
+    fAddress.reset();
+}
+
+bool CIMClientRep::exchange(const client::Request& request, const ContentHandler& onContent)
+{
+    if (!fAddress)
+        throw NotConnectedException();
+    try {
+        return exchangeOnce(request, onContent);
+    } catch (const CIMException&) {
+        throw; // an answer like any other; the connection is still good
+    } catch (const wire::XmlError& error) {
+        fConnection.close();
+        throwXml(request.method, error);
+    } catch (const TypeMismatchException&) {
+        fConnection.close();
+        throw CIMClientResponseException("type mismatch");
+    } catch (...) {
+        fConnection.close();
+        throw;
+    }
+}
+
+bool CIMClientRep::exchangeOnce(const client::Request& request, const ContentHandler& onContent)
+{
+    const Deadline deadline(fTimeoutMs);
+    if (fTimeoutMs == 0)
+        throw ConnectionTimeoutException();
+    const client::ExpectedResponse expected{nextMessageId(), request.method, request.isIntrinsic};
+    const std::string message = client::encodeMessage(request, expected.messageId, fAddress->text(),
+                                                      fAddress->isLocal ? localUser() : std::string());
+    if (fConnection.isOpen() && fConnection.isStale())
+        fConnection.close();
+    bool mayRepeat = fConnection.isOpen() && request.isRepeatable;
+    for (;;) {
+        ResponseReader reader(expected, fLimits.xml, onContent);
+        HttpResponse response(fLimits, checkHeader, [&](std::string_view body) { reader.feed(body); });
+        if (sendAndReceive(message, response, deadline) == Outcome::NothingReceived) {
+            if (!mayRepeat)
+                throw CIMClientMalformedHTTPException(kClosed);
+            mayRepeat = false; // an idle connection that the server had given up; once more on a new one
+            continue;
+        }
+        if (!response.isComplete())
+            throw wire::XmlError(wire::XmlError::Kind::Invalid, reader.place(),
+                                 "the connection was closed inside the answer");
+        if (!response.keepsAlive())
+            fConnection.close();
+        checkStatusField(response.fields());
+        reader.finish();
+        if (reader.error() && reader.error()->getCode() != CIM_ERR_SUCCESS)
+            throw *reader.error();
+        return reader.error().has_value();
+    }
+}
+
+CIMClientRep::Outcome CIMClientRep::sendAndReceive(const std::string& message, HttpResponse& response,
+                                                   const Deadline& deadline)
+{
+    if (!fConnection.isOpen())
+        fConnection.open(*fAddress, deadline);
+    // A server that closes while it is sent to may have answered all the same.
+    if (fConnection.send(message, deadline) == Result::TimedOut)
+        throw ConnectionTimeoutException();
+    return receive(response, deadline);
+}
+
+CIMClientRep::Outcome CIMClientRep::receive(HttpResponse& response, const Deadline& deadline)
+{
+    fReceiveBuffer.resize(kReceiveBytes);
+    bool isFirst = true;
+    while (!response.isComplete()) {
+        std::size_t received = 0;
+        const Result result = fConnection.receive(fReceiveBuffer.data(), fReceiveBuffer.size(), deadline, received);
+        if (result == Result::TimedOut)
+            throw ConnectionTimeoutException();
+        if (result == Result::Closed) {
+            fConnection.close();
+            if (isFirst)
+                return Outcome::NothingReceived;
+            if (!response.hasHeader())
+                throw CIMClientMalformedHTTPException("Missing CIMOperation HTTP header");
+            response.endOfConnection();
+            break;
+        }
+        isFirst = false;
+        response.feed(std::string_view(fReceiveBuffer.data(), received));
+    }
+    return Outcome::Answered;
+}
+
+} // namespace Pegasus

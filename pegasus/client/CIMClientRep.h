@@ -1,0 +1,62 @@
+#ifndef PEGASUS_CLIENT_CIMCLIENTREP_H
+#define PEGASUS_CLIENT_CIMCLIENTREP_H
+
+#include "pegasus/client/ClientLimits.h"
+#include "pegasus/client/Connection.h"
+#include "pegasus/client/HttpResponse.h"
+#include "pegasus/client/RequestEncoder.h"
+#include "pegasus/client/ResponseReader.h"
+
+#include <Pegasus/Common/String.h>
+
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace Pegasus {
+
+/// What a client is inside: an address, a connection that is opened when it is needed, and the exchange of one request
+/// for its answer within the time-out.
+class CIMClientRep
+{
+  public:
+    using ContentHandler = client::ResponseReader::ContentHandler;
+
+    CIMClientRep() = default;
+    explicit CIMClientRep(const client::ClientLimits& limits) : fLimits(limits) {}
+
+    Uint32 timeoutMs() const { return fTimeoutMs; }
+    void setTimeoutMs(Uint32 timeoutMs) { fTimeoutMs = timeoutMs; }
+
+    /// Throws: AlreadyConnectedException, and as Connection::open.
+    void connect(const client::ServerAddress& address);
+    void disconnect();
+
+    /// Sends the request and gives each element of the result to `onContent`. Whatever goes wrong, the connection is
+    /// closed and the next call opens a new one.
+    /// Returns: whether an ERROR element said success, so that there is no result.
+    /// Throws: what CIMClient's operations throw.
+    bool exchange(const client::Request& request, const ContentHandler& onContent);
+
+  private:
+    enum class Outcome
+    {
+        Answered,
+        NothingReceived ///< the server closed the connection before it answered
+    };
+
+    bool exchangeOnce(const client::Request& request, const ContentHandler& onContent);
+    Outcome sendAndReceive(const std::string& message, client::HttpResponse& response,
+                           const client::Deadline& deadline);
+    Outcome receive(client::HttpResponse& response, const client::Deadline& deadline);
+
+    client::ClientLimits fLimits;
+    std::optional<client::ServerAddress> fAddress;
+    client::Connection fConnection;
+    std::vector<char> fReceiveBuffer;
+    Uint32 fTimeoutMs = 20000;
+};
+
+} // namespace Pegasus
+
+#endif

@@ -1,0 +1,169 @@
+#include "pegasus/client/Connection.h"
+
+#include "pegasus/common/LocalSocket.h"
+
+#include <Pegasus/Common/Exception.h>
+
+#include <cerrno>
+#include <fcntl.h>
+#include <memory>
+#include <netdb.h>
+#include <netinet/in.h>
+#include <netinet/tcp.h>
+#include <poll.h>
+#include <sys/socket.h>
+#include <system_error>
+#include <unistd.h>
+
+namespace Pegasus::client {
+namespace {
+
+struct FreeAddresses
+{
+    void operator()(addrinfo* list) const { ::freeaddrinfo(list); }
+};
+using Addresses = std::unique_ptr<addrinfo, FreeAddresses>;
+
+String toString(const std::string& text)
+{
+    return String(text.c_str());
+}
+
+Addresses resolve(const ServerAddress& address)
+{
+    addrinfo hints{};
+    hints.ai_family = AF_UNSPEC;
+    hints.ai_socktype = SOCK_STREAM;
+    hints.ai_flags = AI_NUMERICSERV;
+    addrinfo* list = nullptr;
+    if (::getaddrinfo(address.host.c_str(), std::to_string(address.port).c_str(), &hints, &list) != 0)
+        throw InvalidLocatorException(toString(address.text()));
+    return Addresses(list);
+}
+
+/// Returns: the result of the connection attempt that is under way, 0 or an errno.
+int pendingError(int fd)
+{
+    int error = 0;
+    socklen_t size = sizeof(error);
+    return ::getsockopt(fd, SOL_SOCKET, SO_ERROR, &error, &size) < 0 ? errno : error;
+}
+
+bool isRetry(int error)
+{
+    return error == EAGAIN || error == EWOULDBLOCK || error == EINTR;
+}
+
+} // namespace
+
+std::string ServerAddress::text() const
+{
+    return isLocal ? std::string() : host + ":" + std::to_string(port);
+}
+
+void Connection::open(const ServerAddress& address, const Deadline& deadline)
+{
+    close();
+    if (address.isLocal)
+        openLocal(deadline);
+    else
+        openTcp(address, deadline);
+}
+
+void Connection::openTcp(const ServerAddress& address, const Deadline& deadline)
+{
+    const Addresses addresses = resolve(address);
+    for (const addrinfo* candidate = addresses.get(); candidate; candidate = candidate->ai_next) {
+        fFd = ::socket(candidate->ai_family, candidate->ai_socktype | SOCK_CLOEXEC | SOCK_NONBLOCK, 0);
+        if (fFd < 0)
+            continue;
+        const int started = ::connect(fFd, candidate->ai_addr, candidate->ai_addrlen);
+        const bool isPending = started < 0 && (errno == EINPROGRESS || errno == EINTR);
+        if (started == 0 || (isPending && waitFor(POLLOUT, deadline) == Result::Done && pendingError(fFd) == 0)) {
+            // A request is one message; waiting to fill a packet would only delay it.
+            const int on = 1;
+            ::setsockopt(fFd, IPPROTO_TCP, TCP_NODELAY, &on, sizeof(on));
+            return;
+        }
+        close();
+    }
+    throw CannotConnectException(toString("Cannot connect to " + address.text() + ". Connection failed."));
+}
+
+void Connection::openLocal(const Deadline& deadline)
+{
+    try {
+        fFd = wire::connectLocalSocket(wire::localSocketHome(), deadline.remainingMs());
+    } catch (const std::system_error&) {
+        throw CannotConnectException("Cannot connect to local CIM server. Connection failed.");
+    }
+    const int flags = ::fcntl(fFd, F_GETFL);
+    ::fcntl(fFd, F_SETFL, flags | O_NONBLOCK);
+}
+
+void Connection::close()
+{
+    if (fFd >= 0)
+        ::close(fFd);
+    fFd = -1;
+}
+
+bool Connection::isStale() const
+{
+    char byte;
+    const ssize_t count = ::recv(fFd, &byte, 1, MSG_PEEK | MSG_DONTWAIT);
+    return count >= 0 || !isRetry(errno);
+}
+
+Connection::Result Connection::waitFor(short events, const Deadline& deadline) const
+{
+    for (;;) {
+        pollfd entry{fFd, events, 0};
+        const int ready = ::poll(&entry, 1, deadline.remainingMs());
+        if (ready > 0)
+            return Result::Done;
+        if (ready == 0 && deadline.hasPassed())
+            return Result::TimedOut;
+        if (ready < 0 && errno != EINTR)
+            return Result::Closed;
+    }
+}
+
+Connection::Result Connection::send(std::string_view bytes, const Deadline& deadline)
+{
+    while (!bytes.empty()) {
+        const ssize_t count = ::send(fFd, bytes.data(), bytes.size(), MSG_NOSIGNAL);
+        if (count >= 0) {
+            bytes.remove_prefix(static_cast<std::size_t>(count));
+            continue;
+        }
+        if (!isRetry(errno))
+            return Result::Closed;
+        const Result waited = waitFor(POLLOUT, deadline);
+        if (waited != Result::Done)
+            return waited;
+    }
+    return Result::Done;
+}
+
+Connection::Result Connection::receive(char* buffer, std::size_t capacity, const Deadline& deadline,
+                                       std::size_t& received)
+{
+    for (;;) {
+        // Asked before each read: a server that never stops sending must not outlast the deadline.
+        if (deadline.hasPassed())
+            return Result::TimedOut;
+        const ssize_t count = ::recv(fFd, buffer, capacity, 0);
+        if (count >= 0) {
+            received = static_cast<std::size_t>(count);
+            return count == 0 ? Result::Closed : Result::Done;
+        }
+        if (!isRetry(errno))
+            return Result::Closed;
+        const Result waited = waitFor(POLLIN, deadline);
+        if (waited != Result::Done)
+            return waited;
+    }
+}
+
+} // namespace Pegasus::client

@@ -1,0 +1,222 @@
+#include "pegasus/client/RequestEncoder.h"
+
+#include "pegasus/common/ElementEncoder.h"
+#include "pegasus/common/StringRep.h"
+
+#include <Pegasus/Common/Exception.h>
+
+#include <cctype>
+#include <cstdio>
+
+namespace Pegasus::client {
+namespace {
+
+const CIMNamespaceName& notNull(const CIMNamespaceName& nameSpace)
+{
+    if (nameSpace.isNull())
+        throw InvalidNamespaceNameException(String());
+    return nameSpace;
+}
+
+int hexValue(char c)
+{
+    if (c >= '0' && c <= '9')
+        return c - '0';
+    const char lower = static_cast<char>(c | 0x20);
+    return lower >= 'a' && lower <= 'f' ? lower - 'a' + 10 : -1;
+}
+
+std::string body(const Request& request, std::string_view messageId)
+{
+    std::string out;
+    out.reserve(request.call.size() + 256);
+    out += "<?xml version=\"1.0\" encoding=\"utf-8\" ?>\n"
+           "<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">\n<MESSAGE ID=\"";
+    out += messageId;
+    out += "\" PROTOCOLVERSION=\"1.0\">\n<SIMPLEREQ>\n";
+    out += request.call;
+    out += "</SIMPLEREQ>\n</MESSAGE>\n</CIM>\n";
+    return out;
+}
+
+} // namespace
+
+IntrinsicRequest::IntrinsicRequest(std::string_view method, const CIMNamespaceName& nameSpace, bool isRepeatable)
+{
+    fRequest.method = method;
+    fRequest.object = percentEncoded(StringAccess::toUtf8(notNull(nameSpace).getString()));
+    fRequest.isRepeatable = isRepeatable;
+    fRequest.call.append("<IMETHODCALL NAME=\"").append(method).append("\">\n");
+    wire::appendLocalNamespacePath(fRequest.call, nameSpace);
+}
+
+void IntrinsicRequest::open(std::string_view parameter)
+{
+    fRequest.call.append("<IPARAMVALUE NAME=\"").append(parameter).append("\">\n");
+}
+
+void IntrinsicRequest::close()
+{
+    fRequest.call += "</IPARAMVALUE>\n";
+}
+
+IntrinsicRequest& IntrinsicRequest::className(std::string_view parameter, const CIMName& name)
+{
+    if (name.isNull())
+        return *this;
+    open(parameter);
+    wire::appendClassName(fRequest.call, name);
+    close();
+    return *this;
+}
+
+IntrinsicRequest& IntrinsicRequest::instanceName(const CIMObjectPath& path)
+{
+    open("InstanceName");
+    wire::appendInstanceName(fRequest.call, path);
+    close();
+    return *this;
+}
+
+IntrinsicRequest& IntrinsicRequest::flag(std::string_view parameter, Boolean value, Boolean ifMissing)
+{
+    if (value == ifMissing)
+        return *this;
+    open(parameter);
+    fRequest.call.append("<VALUE>").append(value ? "TRUE" : "FALSE").append("</VALUE>\n");
+    close();
+    return *this;
+}
+
+IntrinsicRequest& IntrinsicRequest::text(std::string_view parameter, const String& value)
+{
+    open(parameter);
+    fRequest.call += "<VALUE>";
+    wire::appendEscaped(fRequest.call, value);
+    fRequest.call += "</VALUE>\n";
+    close();
+    return *this;
+}
+
+IntrinsicRequest& IntrinsicRequest::propertyList(const CIMPropertyList& list)
+{
+    if (list.isNull())
+        return *this;
+    open("PropertyList");
+    fRequest.call += "<VALUE.ARRAY>\n";
+    for (Uint32 i = 0; i < list.size(); ++i) {
+        fRequest.call += "<VALUE>";
+        wire::appendEscaped(fRequest.call, list[i].getString());
+        fRequest.call += "</VALUE>\n";
+    }
+    fRequest.call += "</VALUE.ARRAY>\n";
+    close();
+    return *this;
+}
+
+IntrinsicRequest& IntrinsicRequest::newClass(const CIMClass& cimClass)
+{
+    open("NewClass");
+    wire::appendClass(fRequest.call, cimClass);
+    close();
+    return *this;
+}
+
+IntrinsicRequest& IntrinsicRequest::newInstance(const CIMInstance& instance)
+{
+    open("NewInstance");
+    wire::appendInstance(fRequest.call, instance);
+    close();
+    return *this;
+}
+
+IntrinsicRequest& IntrinsicRequest::qualifierDeclaration(const CIMQualifierDecl& declaration)
+{
+    open("QualifierDeclaration");
+    wire::appendQualifierDeclaration(fRequest.call, declaration);
+    close();
+    return *this;
+}
+
+Request IntrinsicRequest::finish()
+{
+    fRequest.call += "</IMETHODCALL>\n";
+    return std::move(fRequest);
+}
+
+Request encodeInvokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPath& path, const CIMName& method,
+                           const Array<CIMParamValue>& parameters)
+{
+    CIMObjectPath target = path;
+    target.setHost(String());
+    target.setNameSpace(notNull(nameSpace));
+    Request request;
+    request.isIntrinsic = false;
+    request.method = StringAccess::toUtf8(method.getString());
+    request.object = percentEncoded(StringAccess::toUtf8(target.toString()));
+    request.call = "<METHODCALL NAME=\"";
+    wire::appendEscaped(request.call, method.getString());
+    request.call += "\">\n";
+    if (path.getKeyBindings().size() > 0)
+        wire::appendLocalInstancePath(request.call, nameSpace, path);
+    else
+        wire::appendLocalClassPath(request.call, nameSpace, path.getClassName());
+    for (Uint32 i = 0; i < parameters.size(); ++i)
+        wire::appendParamValue(request.call, parameters[i]);
+    request.call += "</METHODCALL>\n";
+    return request;
+}
+
+std::string encodeMessage(const Request& request, std::string_view messageId, std::string_view host,
+                          std::string_view localUser)
+{
+    const std::string content = body(request, messageId);
+    char length[16];
+    std::snprintf(length, sizeof(length), "%010zu", content.size());
+    std::string out;
+    out.reserve(content.size() + 512);
+    out.append("POST /cimom HTTP/1.1\r\nHOST: ").append(host).append("\r\n");
+    out.append("Content-Type: application/xml; charset=utf-8\r\n");
+    out.append("content-length: ").append(length).append("\r\n");
+    out.append("TE: chunked, trailers\r\n");
+    out.append("CIMOperation: MethodCall\r\n");
+    out.append("CIMMethod: ").append(percentEncoded(request.method)).append("\r\n");
+    out.append("CIMObject: ").append(request.object).append("\r\n");
+    if (!localUser.empty())
+        out.append("PegasusAuthorization: Local \"").append(localUser).append("\"\r\n");
+    return out.append("\r\n").append(content);
+}
+
+std::string percentEncoded(std::string_view text)
+{
+    std::string out;
+    for (const char c : text) {
+        const auto byte = static_cast<unsigned char>(c);
+        if (byte < 0x80 && (std::isalnum(byte) || c == '-' || c == '_' || c == '.')) {
+            out += c;
+        } else {
+            char escape[4];
+            std::snprintf(escape, sizeof(escape), "%%%02X", static_cast<unsigned>(byte));
+            out += escape;
+        }
+    }
+    return out;
+}
+
+std::string percentDecoded(std::string_view text)
+{
+    std::string out;
+    for (std::size_t i = 0; i < text.size(); ++i) {
+        const int high = text[i] == '%' && i + 2 < text.size() ? hexValue(text[i + 1]) : -1;
+        const int low = high >= 0 ? hexValue(text[i + 2]) : -1;
+        if (low < 0) {
+            out += text[i];
+            continue;
+        }
+        out += static_cast<char>(high * 16 + low);
+        i += 2;
+    }
+    return out;
+}
+
+} // namespace Pegasus::client

@@ -1,0 +1,65 @@
+#ifndef PEGASUS_CLIENT_RESPONSEREADER_H
+#define PEGASUS_CLIENT_RESPONSEREADER_H
+
+#include "pegasus/client/ClientLimits.h"
+#include "pegasus/common/ElementDecoder.h"
+#include "pegasus/common/XmlSlicer.h"
+
+#include <Pegasus/Common/Exception.h>
+
+#include <functional>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace Pegasus::client {
+
+/// What a request asked, and so what its answer has to be.
+struct ExpectedResponse
+{
+    std::string messageId;
+    std::string method;
+    bool isIntrinsic = true;
+};
+
+/// Reads the CIM-XML answer to one request while it arrives.
+/// Throws: wire::XmlError; CIMClientResponseException (an answer to something else);
+/// TypeMismatchException (an instance under another class's name).
+class ResponseReader : private wire::XmlSliceHandler
+{
+  public:
+    /// Gets each element of the result: the children of IRETURNVALUE, or of METHODRESPONSE.
+    using ContentHandler = std::function<void(const wire::XmlElement&, wire::ElementDecoder&)>;
+
+    ResponseReader(const ExpectedResponse& expected, const wire::XmlLimits& limits, ContentHandler onContent);
+
+    void feed(std::string_view bytes) { fSlicer.feed(bytes); }
+    /// The body has ended as it should. Throws: XmlError when the answer has not.
+    void finish();
+
+    /// The ERROR element of the answer, if there was one; it may say success.
+    const std::optional<CIMException>& error() const { return fError; }
+    wire::XmlPlace place() const { return fSlicer.place(); }
+
+  private:
+    void openEnvelope(const wire::XmlElement& tag) override;
+    void closeEnvelope(std::string_view name) override;
+    void slice(const wire::XmlElement& element) override;
+
+    void openMessage(const wire::XmlElement& tag);
+    void openMethodResponse(const wire::XmlElement& tag);
+    void readError(const wire::XmlElement& element);
+
+    const ExpectedResponse& fExpected;
+    wire::ElementDecoder fDecoder;
+    ContentHandler fOnContent;
+    std::size_t fDepth = 0;
+    bool fHasResponse = false;
+    bool fHasReturnValue = false;
+    std::optional<CIMException> fError;
+    wire::XmlSlicer fSlicer;
+};
+
+} // namespace Pegasus::client
+
+#endif

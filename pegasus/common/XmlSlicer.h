@@ -1,0 +1,73 @@
+#ifndef PEGASUS_COMMON_XMLSLICER_H
+#define PEGASUS_COMMON_XMLSLICER_H
+
+#include "pegasus/common/XmlReader.h"
+#include "pegasus/common/XmlScanner.h"
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace Pegasus::wire {
+
+/// What a sliced message is delivered to. A view is valid until the call returns.
+class XmlSliceHandler
+{
+  public:
+    virtual ~XmlSliceHandler() = default;
+    /// A start tag of the envelope, as an element without content.
+    virtual void openEnvelope(const XmlElement& tag) = 0;
+    virtual void closeEnvelope(std::string_view name) = 0;
+    /// An element inside the envelope, with everything in it.
+    virtual void slice(const XmlElement& element) = 0;
+};
+
+/// Cuts a message that arrives in pieces: the outer elements (the envelope) tag by tag, each element inside them as
+/// soon as it is there as a whole. Nothing of it is kept after it was delivered. Throws: XmlError, and what the handler
+/// throws; the slicer is of no use afterwards.
+class XmlSlicer
+{
+  public:
+    /// `envelope` names the elements that are opened rather than taken whole. Both references must outlive the slicer.
+    XmlSlicer(std::vector<std::string_view> envelope, XmlSliceHandler& handler, const XmlLimits& limits);
+
+    void feed(std::string_view bytes);
+    /// The message has ended. Throws: XmlError when its XML has not.
+    void finish();
+
+    /// How far the message was read.
+    XmlPlace place() const { return fPlace; }
+
+  private:
+    void run();
+    bool step();
+    void take(const XmlToken& token);
+    void takeInSlice(const XmlToken& token);
+    void takeInEnvelope(const XmlToken& token);
+    void open(const XmlToken& token);
+    void close(std::string_view name);
+    void deliver(std::size_t size);
+    void beginSlice();
+    void consume(std::size_t size);
+    bool isEnvelope(std::string_view name) const;
+    std::string_view rest() const;
+
+    const std::vector<std::string_view> fEnvelope;
+    XmlSliceHandler& fHandler;
+    const XmlLimits fLimits;
+    const XmlScanner fScanner;
+    XmlDocument fDocument;
+
+    std::vector<char> fBuffer;
+    std::size_t fStart = 0;   ///< in the buffer: where what was not delivered yet begins
+    std::size_t fScanned = 0; ///< in the buffer: how far tokens were found
+    XmlPlace fPlace{1, 1};    ///< of fStart
+    std::vector<std::string> fOpen;
+    std::size_t fSliceDepth = 0; ///< elements open in the slice that begins at fStart; 0 outside
+    bool fHasDeclaration = false;
+    bool fHasRoot = false;
+};
+
+} // namespace Pegasus::wire
+
+#endif
