@@ -1,6 +1,8 @@
 // The private server as a process: port, configuration, start, stop, what an earlier run left, clean-up.
+#include <cerrno>
 #include <csignal>
 #include <cstdlib>
+#include <cstring>
 #include <fstream>
 #include <sstream>
 
@@ -40,7 +42,7 @@ class TProbeSocket
     TProbeSocket() : fDescriptor(::socket(AF_INET, SOCK_STREAM, 0))
     {
         if (fDescriptor == -1) {
-            LogFailure("TPEGASUSNamespace::getAvailablePort failed: no socket");
+            LogFailure("TPEGASUSNamespace::getAvailablePort failed: no socket: ", std::strerror(errno));
             throw TVRXException(TVRXStatusCode::kServerConnectionFailed);
         }
         static_cast<void>(::fcntl(fDescriptor, F_SETFD, FD_CLOEXEC));

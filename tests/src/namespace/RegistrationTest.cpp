@@ -1,0 +1,355 @@
+// From a provider on disk to one that the host is offered: compilation, collection, connection, enumeration.
+#include <algorithm>
+#include <atomic>
+#include <stdexcept>
+#include <thread>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <boost/thread/exceptions.hpp>
+
+#include <host/ICIMClass.h>
+#include <host/TConfig.h>
+#include <host/TVRXException.h>
+
+#include "src/provider/TPEGASUSProvider.h"
+#include "src/schema/TPEGASUSClass.h"
+#include "src/support/NamespaceRig.h"
+
+namespace NKOLVRX20 {
+namespace {
+
+using ::testing::Contains;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+using ::testing::UnorderedElementsAre;
+
+constexpr char kDontCollect[] = "<QUALIFIER NAME=\"DONTCOLLECT\" TYPE=\"boolean\"><VALUE>TRUE</VALUE></QUALIFIER>";
+constexpr char kDoCollect[] = "<QUALIFIER NAME=\"DONTCOLLECT\" TYPE=\"boolean\"><VALUE>FALSE</VALUE></QUALIFIER>";
+constexpr char kNullCollect[] = "<QUALIFIER NAME=\"DONTCOLLECT\" TYPE=\"boolean\"></QUALIFIER>";
+constexpr char kDontCollectDeclaration[] =
+    "<QUALIFIER.DECLARATION NAME=\"DONTCOLLECT\" TYPE=\"boolean\"><SCOPE CLASS=\"true\"/><VALUE>FALSE</VALUE>"
+    "</QUALIFIER.DECLARATION>";
+
+class RegistrationTest : public ::testing::Test
+{
+  protected:
+    RegistrationTest() { fServer.Answer("GetQualifier DONTCOLLECT", kDontCollectDeclaration); }
+
+    // Writes a provider's class file. Returns: its path.
+    std::string AddProvider(const std::string& vendor, const std::vector<std::string>& entries) const
+    {
+        std::string text = "<vrx><nsp name='root/" + vendor + "'/><module name='" + vendor + "'/><timeout value='30'/>";
+        for (const std::string& entry : entries)
+            text += "<class name='" + entry + "'/>";
+        return fRig.WriteProvider(vendor, "a.classes.xml", text + "</vrx>");
+    }
+
+    // Returns: the names that the provider offers.
+    static std::vector<std::string> Offered(TPEGASUSProvider& provider)
+    {
+        std::vector<std::string> names;
+        provider.EnumerateClassesProvided(
+            [&names](boost::shared_ptr<ICIMClass> offered) {
+                names.push_back(offered->GetName({}));
+                return false; // does not count here
+            },
+            {});
+        return names;
+    }
+
+    TFakeCimServer fServer;
+    TNamespaceRig fRig;
+};
+
+TEST_F(RegistrationTest, WithoutProvidersOnlyTheMilestonesAreLogged)
+{
+    for (const char* setting : {"", "on"}) {
+        SCOPED_TRACE(setting);
+        TConfig::GetInstance()->setValue("pegasus_multi_thread", setting);
+        const auto ns = fRig.MakeConnectedNamespace(fServer);
+        ns->FindProviders();
+        ns->undoProvidersSetup();
+        EXPECT_THAT(fRig.fLog.Lines(), ElementsAre("3|TPEGASUSNamespace::Prefilter: 0 providers.",
+                                                   "3|TPEGASUSNamespace::Postfilter: 0 providers.",
+                                                   "3|before reg...", "3|after reg..."));
+        EXPECT_THAT(fRig.fWorld.Trace(), IsEmpty());
+    }
+}
+
+TEST_F(RegistrationTest, CompilesDefinitionsBeforeRegistrationsThenCollectsAndConnects)
+{
+    const std::string path = AddProvider("acme", {"ACME_One[300]", "ACME_Two"});
+    fRig.WriteProvider("acme", "a.registration.mof", "");
+    fRig.WriteProvider("acme", "a.properties.mof", "");
+    fServer.AnswerClass("ACME_One", "");
+    fServer.AnswerClass("ACME_Two", "");
+    const auto ns = fRig.MakeConnectedNamespace(fServer);
+    ns->FindProviders();
+
+    const std::string directory = "M/pegasus/provider/acme/";
+    EXPECT_THAT(fRig.Abbreviate(fRig.fWorld.Trace()),
+                ElementsAre("run cimmof -n root/acme -aE " + directory + "a.properties.mof",
+                            "run cimmof -n root/PG_InterOp -aE " + directory + "a.registration.mof"));
+    const std::string fetched = "3|TPEGASUSNamespace::GetClass from Pegasus for: ";
+    const std::string asked = "3|TPEGASUSNamespace::GetClass  NSP=root/acme CLASSNAME = ";
+    const std::string timeout = " From Pegasus CIMOM with ei timeout = ";
+    const auto mirrored = [](const std::string& name) {
+        return "3|TPEGASUSNamespace::GetClass " + name + " Now it is Found in TPEGASUSNamespace";
+    };
+    EXPECT_THAT(fRig.fLog.Lines(),
+                ElementsAre("3|TPEGASUSNamespace::Prefilter: 1 providers.",
+                            "3|TPEGASUSNamespace::Postfilter: 1 providers.", "3|Loading... " + path,
+                            "3|TPEGASUSNamespace::parseClasses collected for Class info = ACME_One[300] , ACME_Two , \n"
+                            "NSP = root/acme\nDefault timeout = 30\nModule name = acme",
+                            "3|TPEGASUSNamespace created Provider " + path + "\n", "3|before reg...",
+                            "3|Entering TPEGASUSNamespace::regProvider: " + path, "3|", "3|", "3|after reg...",
+                            "3|Entering TPEGASUSNamespace::ffinishRegProvider: " + path, fetched + "ACME_One",
+                            asked + "ACME_One" + timeout + "300", "3|AllocateClass  --> ACME_One  inherit from --> ",
+                            mirrored("ACME_One"), "3|TPEGASUSNamespace::Getting class: ACME_One from Pegasus CIMOM",
+                            fetched + "ACME_Two", asked + "ACME_Two" + timeout + "30",
+                            "3|AllocateClass  --> ACME_Two  inherit from --> ", mirrored("ACME_Two"),
+                            "3|TPEGASUSNamespace::Getting class: ACME_Two from Pegasus CIMOM",
+                            "3|TPEGASUSProvider::connect enter", "3|TPEGASUSProvider::connect succeeded ",
+                            "3|TPEGASUSNamespace finished adding Provider " + path));
+    TPEGASUSProvider& provider = *ns->GetProvidersContainer().front();
+    EXPECT_TRUE(provider.isConnected());
+    EXPECT_NE(ns->getPegClient(), provider.getPegClient());
+    EXPECT_THAT(Offered(provider), ElementsAre("ACME_One", "ACME_Two"));
+    EXPECT_TRUE(provider.IsClassesProvided("ACME_One"));
+    EXPECT_FALSE(provider.IsClassesProvided("acme_one"));
+    const auto bound = boost::dynamic_pointer_cast<TPEGASUSClass>(ns->GetClass("acme_two", {}));
+    EXPECT_EQ(&provider, bound->GetProvider().get());
+}
+
+TEST_F(RegistrationTest, UnknownClassesAreLeftOutAndTheNextFollow)
+{
+    AddProvider("acme", {"ACME_One", "ACME_None", "ACME_Two"});
+    fServer.AnswerClass("ACME_One", "");
+    fServer.AnswerClass("ACME_Two", "");
+    const auto ns = fRig.MakeConnectedNamespace(fServer);
+    ns->FindProviders();
+    EXPECT_THAT(Offered(*ns->GetProvidersContainer().front()), ElementsAre("ACME_One", "ACME_Two"));
+    EXPECT_THAT(fRig.fLog.LinesWith("3|TPEGASUSNamespace::Getting class: "),
+                ElementsAre("3|TPEGASUSNamespace::Getting class: ACME_One from Pegasus CIMOM",
+                            "3|TPEGASUSNamespace::Getting class: ACME_None from Pegasus CIMOM",
+                            "3|TPEGASUSNamespace::Getting class: ACME_Two from Pegasus CIMOM"));
+}
+
+TEST_F(RegistrationTest, ABadRequestedNameEndsTheRegistrationOfAllThatFollow)
+{
+    AddProvider("acme", {"1 bad"});
+    AddProvider("beta", {"BETA_One"});
+    const auto ns = fRig.MakeConnectedNamespace(fServer);
+    EXPECT_EQ(25U, StatusOf([&] { ns->FindProviders(); }));
+    EXPECT_THAT(ns->GetProvidersContainer(), ::testing::SizeIs(2));
+    EXPECT_EQ(nullptr, ns->GetProvidersContainer().back()->getPegClient());
+    EXPECT_EQ(0, fServer.Count("GetClass BETA_One"));
+}
+
+TEST_F(RegistrationTest, AProviderThatCannotConnectEndsTheRegistration)
+{
+    AddProvider("acme", {});
+    const auto ns = fRig.MakeConnectedNamespace(fServer);
+    fServer.Refuse();
+    EXPECT_EQ(42U, StatusOf([&] { ns->FindProviders(); }));
+    EXPECT_EQ(3U, fRig.fLog.LinesWith("3|TPEGASUSProvider::connect failed: ").size());
+}
+
+TEST_F(RegistrationTest, OffersNeitherCdmClassesNorThoseNotToBeCollected)
+{
+    AddProvider("acme", {"ACME_Cdm%^CDM^%", "ACME_Other%^other^%", "ACME_Dont", "ACME_Do", "ACME_Null"});
+    fServer.AnswerClass("ACME_Cdm", "");
+    fServer.AnswerClass("ACME_Other", "");
+    fServer.AnswerClass("ACME_Dont", "", kDontCollect);
+    fServer.AnswerClass("ACME_Do", "", kDoCollect);
+    fServer.AnswerClass("ACME_Null", "", kNullCollect);
+    const auto ns = fRig.MakeConnectedNamespace(fServer);
+    ns->FindProviders();
+    fRig.fLog.Take();
+    TPEGASUSProvider& provider = *ns->GetProvidersContainer().front();
+    EXPECT_THAT(Offered(provider), ElementsAre("ACME_Other", "ACME_Do", "ACME_Null"));
+    const std::string asking = "3|TPEGASUSProvider::EnumerateClassesProvided Asking plugin acme for ";
+    EXPECT_THAT(fRig.fLog.Lines(),
+                ElementsAre("3|TPEGASUSProvider::EnumerateClassesProvided ignored one CDM class: ACME_Cdm",
+                            asking + "ACME_Other", asking + "ACME_Do", asking + "ACME_Null"));
+    EXPECT_TRUE(provider.IsClassesProvided("ACME_Cdm"));
+}
+
+TEST_F(RegistrationTest, AHostExceptionCostsOnlyItsClass)
+{
+    AddProvider("acme", {"ACME_One", "ACME_Two"});
+    fServer.AnswerClass("ACME_One", "");
+    fServer.AnswerClass("ACME_Two", "");
+    const auto ns = fRig.MakeConnectedNamespace(fServer);
+    ns->FindProviders();
+    fRig.fLog.Take();
+    TPEGASUSProvider& provider = *ns->GetProvidersContainer().front();
+    int visits = 0;
+    const auto throwing = [&visits](boost::shared_ptr<ICIMClass>) -> bool {
+        ++visits;
+        throw TVRXException(15);
+    };
+    provider.EnumerateClassesProvided(throwing, {});
+    EXPECT_EQ(2, visits);
+    const std::string caught =
+        "0|TPEGASUSProvider::EnumerateClassesProvided catch exection : " + std::string(TVRXException(15).what());
+    EXPECT_THAT(fRig.fLog.LinesWith("0|"), ElementsAre(caught, caught));
+    const auto foreign = [](boost::shared_ptr<ICIMClass>) -> bool { throw std::runtime_error("foreign"); };
+    EXPECT_THROW(provider.EnumerateClassesProvided(foreign, {}), std::runtime_error);
+}
+
+// --- threads ---
+
+class ThreadedRegistrationTest : public RegistrationTest
+{
+  protected:
+    ThreadedRegistrationTest()
+    {
+        for (const char* vendor : {"acme", "beta", "gamma"}) {
+            AddProvider(vendor, {});
+            fRig.WriteProvider(vendor, "a.properties.mof", "");
+        }
+    }
+
+    static void SetThreads(const char* setting) { TConfig::GetInstance()->setValue("pegasus_multi_thread", setting); }
+
+    std::string PathOf(const std::string& vendor) const
+    {
+        return fRig.M() + "/pegasus/provider/" + vendor + "/a.classes.xml";
+    }
+};
+
+TEST_F(ThreadedRegistrationTest, OnlyTheExactSettingStartsThreads)
+{
+    struct
+    {
+        const char* fSetting;
+        bool fThreaded;
+    } const rows[] = {{"on", true}, {"off", false}, {"On", false}, {"ON", false}, {"on ", false}, {"1", false}};
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.fSetting);
+        SetThreads(row.fSetting);
+        const auto ns = fRig.MakeConnectedNamespace(fServer);
+        std::atomic<int> foreignThreads{0};
+        fRig.fWorld.fRun = [&, self = std::this_thread::get_id()](const TSpawnCall&, std::string&) {
+            foreignThreads += std::this_thread::get_id() != self;
+        };
+        ns->FindProviders();
+        EXPECT_EQ(row.fThreaded ? 3 : 0, foreignThreads);
+        std::vector<std::string> entering = fRig.fLog.LinesWith("3|Entering TPEGASUSNamespace::regProvider: ");
+        EXPECT_THAT(entering,
+                    UnorderedElementsAre("3|Entering TPEGASUSNamespace::regProvider: " + PathOf("acme"),
+                                         "3|Entering TPEGASUSNamespace::regProvider: " + PathOf("beta"),
+                                         "3|Entering TPEGASUSNamespace::regProvider: " + PathOf("gamma")));
+        if (!row.fThreaded)
+            EXPECT_TRUE(std::is_sorted(entering.begin(), entering.end()));
+        std::atomic<int> visitsElsewhere{0}, visits{0};
+        ns->EnumerateProviders(
+            [&, self = std::this_thread::get_id()](boost::shared_ptr<IProvider>) {
+                visitsElsewhere += std::this_thread::get_id() != self;
+                return ++visits != 2;
+            },
+            {});
+        EXPECT_EQ(row.fThreaded ? 3 : 0, visitsElsewhere);
+        EXPECT_EQ(row.fThreaded ? 3 : 2, visits); // a false counts on the calling thread only
+        EXPECT_EQ("3|after inventory pegasus NSP", fRig.fLog.Lines().back());
+        fRig.fWorld.fRun = nullptr;
+    }
+}
+
+TEST_F(ThreadedRegistrationTest, AThreadThatThrowsCostsOneLineAndTheSequenceGoesOn)
+{
+    SetThreads("on");
+    const auto ns = fRig.MakeConnectedNamespace(fServer);
+    fRig.fWorld.fRun = [](const TSpawnCall& call, std::string&) {
+        if (call.fArguments[1] == "root/beta")
+            throw TVRXException(12);
+        if (call.fArguments[1] == "root/gamma")
+            throw 42;
+    };
+    ns->FindProviders();
+    fRig.fWorld.fRun = nullptr;
+    EXPECT_THAT(fRig.fLog.LinesWith("0|"),
+                UnorderedElementsAre("0|TPEGASUSNamespace::regProvider failed for provider " + PathOf("beta") + ": " +
+                                         TVRXException(12).what(),
+                                     "0|TPEGASUSNamespace::regProvider failed for provider " + PathOf("gamma") +
+                                         ": an exception of unknown type"));
+    EXPECT_EQ(3U, fRig.fLog.LinesWith("3|TPEGASUSNamespace finished adding Provider ").size());
+}
+
+TEST_F(ThreadedRegistrationTest, AnExceptionOnTheCallingThreadLeaves)
+{
+    const auto ns = fRig.MakeConnectedNamespace(fServer);
+    fRig.fWorld.fRun = [](const TSpawnCall&, std::string&) { throw TVRXException(12); };
+    EXPECT_EQ(12U, StatusOf([&] { ns->FindProviders(); }));
+    fRig.fWorld.fRun = nullptr;
+    EXPECT_THAT(fRig.fLog.LinesWith("3|after reg..."), IsEmpty());
+    EXPECT_EQ(15U, StatusOf([&] {
+                  ns->EnumerateProviders([](boost::shared_ptr<IProvider>) -> bool { throw TVRXException(15); }, {});
+              }));
+}
+
+TEST_F(ThreadedRegistrationTest, AVisitorThatThrowsOnAThreadCostsOneLine)
+{
+    SetThreads("on");
+    const auto ns = fRig.MakeConnectedNamespace(fServer);
+    ns->FindProviders();
+    fRig.fLog.Take();
+    ns->EnumerateProviders(
+        [](boost::shared_ptr<IProvider> provider) -> bool {
+            if (provider->GetName({}) == "beta")
+                throw std::runtime_error("no beta");
+            return true;
+        },
+        {});
+    EXPECT_THAT(fRig.fLog.Lines(),
+                ElementsAre("3|TPEGASUSNamespace::EnumerateProviders: fProviders.size() = 3",
+                            "3|before inventory pegasus NSP",
+                            "0|TPEGASUSNamespace::EnumerateProviders failed for provider " + PathOf("beta") +
+                                ": no beta",
+                            "3|after inventory pegasus NSP"));
+}
+
+TEST_F(ThreadedRegistrationTest, AThreadThatCannotBeMadeLeavesAfterTheOthersHaveEnded)
+{
+    SetThreads("on");
+    const auto ns = fRig.MakeConnectedNamespace(fServer);
+    for (int made = 0; made < 3; ++made) {
+        SCOPED_TRACE(made);
+        fRig.fWorld.Take();
+        fRig.fWorld.fThreadsUntilFailure = made;
+        EXPECT_THROW(ns->FindProviders(), boost::thread_resource_error);
+        fRig.fWorld.fThreadsUntilFailure = -1;
+        EXPECT_EQ(static_cast<std::size_t>(made), fRig.fWorld.Traced("run").size());
+    }
+}
+
+TEST_F(ThreadedRegistrationTest, ListsProvidersForTheirOwnPluginTypeOnly)
+{
+    const auto ns = fRig.MakeConnectedNamespace(fServer);
+    ns->FindProviders();
+    const auto visits = [&](const TCIMContext& context) {
+        int count = 0;
+        ns->EnumerateProviders([&count](boost::shared_ptr<IProvider>) { return ++count, true; }, context);
+        return count;
+    };
+    EXPECT_EQ(3, visits({}));
+    EXPECT_EQ(3, visits({{"pluginType", static_cast<signed char>(7)}}));
+    fRig.fLog.Take();
+    EXPECT_EQ(0, visits({{"pluginType", static_cast<signed char>(3)}}));
+    EXPECT_THAT(fRig.fLog.Lines(), IsEmpty());
+    const TCIMValue wrong[] = {"7", 7, static_cast<unsigned char>(7), TCIMValue(),
+                               TCIMValue(TCIMValue::TCIMType::kSint8, 0, {static_cast<signed char>(7)})};
+    for (const TCIMValue& value : wrong) {
+        fRig.fLog.Take();
+        EXPECT_EQ(14U, StatusOf([&] { visits({{"pluginType", value}}); }));
+        EXPECT_THAT(fRig.fLog.Lines(),
+                    ElementsAre("0|Invalid context pluginType datatype provided to "
+                                "TPluginManagerNamespace::EnumerateProviders(), must be of type kSint8."));
+    }
+}
+
+} // namespace
+} // namespace NKOLVRX20

@@ -1,0 +1,21 @@
+#ifndef TESTS_SRC_SUPPORT_STATUSOF_H
+#define TESTS_SRC_SUPPORT_STATUSOF_H
+
+#include <host/TVRXException.h>
+
+namespace NKOLVRX20 {
+
+// Returns: the status code that the call throws; 0 when it throws nothing.
+template <typename TCall> unsigned int StatusOf(TCall call)
+{
+    try {
+        call();
+        return 0;
+    } catch (const TVRXException& exception) {
+        return exception.GetStatusCode();
+    }
+}
+
+} // namespace NKOLVRX20
+
+#endif
