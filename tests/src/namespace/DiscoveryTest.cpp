@@ -102,9 +102,9 @@ TEST_F(DiscoveryTest, OnlyTheExactWordMakesAProviderDiagnosticOnly)
     const auto ns = fRig.MakeNamespace();
     for (const char* word : {"yes", "Yes", "NO", "", "YES "}) {
         SCOPED_TRACE(word);
-        ns->prepareRegProvider(fRig.WriteProvider(
-            "acme", std::string("x") + word + ".classes.xml",
-            std::string("<vrx><functionality diagnosticonly='") + word + "'/></vrx>"));
+        ns->prepareRegProvider(
+            fRig.WriteProvider("acme", std::string("x") + word + ".classes.xml",
+                               std::string("<vrx><functionality diagnosticonly='") + word + "'/></vrx>"));
         EXPECT_FALSE(ns->GetProvidersContainer().back()->GetDiagnosticOnly());
     }
 }
@@ -149,9 +149,9 @@ TEST_F(DiscoveryTest, ATooLargeFileCostsItsOwnProviderOnly)
     ASSERT_EQ(1U, ns->GetProvidersContainer().size());
     EXPECT_EQ(good, ns->GetProvidersContainer().front()->GetPath());
     EXPECT_THAT(fRig.fLog.LinesWith("0|").front(), "0|" + std::string(TVRXException(4).what()));
-    EXPECT_THAT(fRig.fLog.LinesWith("3|TPEGASUSNamespace::P"),
-                ElementsAre("3|TPEGASUSNamespace::Prefilter: 2 providers.",
-                            "3|TPEGASUSNamespace::Postfilter: 2 providers."));
+    EXPECT_THAT(
+        fRig.fLog.LinesWith("3|TPEGASUSNamespace::P"),
+        ElementsAre("3|TPEGASUSNamespace::Prefilter: 2 providers.", "3|TPEGASUSNamespace::Postfilter: 2 providers."));
 }
 
 TEST_F(DiscoveryTest, SplitsARequestedEntry)

@@ -71,9 +71,9 @@ TEST_F(RegistrationTest, WithoutProvidersOnlyTheMilestonesAreLogged)
         const auto ns = fRig.MakeConnectedNamespace(fServer);
         ns->FindProviders();
         ns->undoProvidersSetup();
-        EXPECT_THAT(fRig.fLog.Lines(), ElementsAre("3|TPEGASUSNamespace::Prefilter: 0 providers.",
-                                                   "3|TPEGASUSNamespace::Postfilter: 0 providers.",
-                                                   "3|before reg...", "3|after reg..."));
+        EXPECT_THAT(fRig.fLog.Lines(),
+                    ElementsAre("3|TPEGASUSNamespace::Prefilter: 0 providers.",
+                                "3|TPEGASUSNamespace::Postfilter: 0 providers.", "3|before reg...", "3|after reg..."));
         EXPECT_THAT(fRig.fWorld.Trace(), IsEmpty());
     }
 }
@@ -239,10 +239,9 @@ TEST_F(ThreadedRegistrationTest, OnlyTheExactSettingStartsThreads)
         ns->FindProviders();
         EXPECT_EQ(row.fThreaded ? 3 : 0, foreignThreads);
         std::vector<std::string> entering = fRig.fLog.LinesWith("3|Entering TPEGASUSNamespace::regProvider: ");
-        EXPECT_THAT(entering,
-                    UnorderedElementsAre("3|Entering TPEGASUSNamespace::regProvider: " + PathOf("acme"),
-                                         "3|Entering TPEGASUSNamespace::regProvider: " + PathOf("beta"),
-                                         "3|Entering TPEGASUSNamespace::regProvider: " + PathOf("gamma")));
+        EXPECT_THAT(entering, UnorderedElementsAre("3|Entering TPEGASUSNamespace::regProvider: " + PathOf("acme"),
+                                                   "3|Entering TPEGASUSNamespace::regProvider: " + PathOf("beta"),
+                                                   "3|Entering TPEGASUSNamespace::regProvider: " + PathOf("gamma")));
         if (!row.fThreaded)
             EXPECT_TRUE(std::is_sorted(entering.begin(), entering.end()));
         std::atomic<int> visitsElsewhere{0}, visits{0};
@@ -304,12 +303,11 @@ TEST_F(ThreadedRegistrationTest, AVisitorThatThrowsOnAThreadCostsOneLine)
             return true;
         },
         {});
-    EXPECT_THAT(fRig.fLog.Lines(),
-                ElementsAre("3|TPEGASUSNamespace::EnumerateProviders: fProviders.size() = 3",
-                            "3|before inventory pegasus NSP",
-                            "0|TPEGASUSNamespace::EnumerateProviders failed for provider " + PathOf("beta") +
-                                ": no beta",
-                            "3|after inventory pegasus NSP"));
+    EXPECT_THAT(
+        fRig.fLog.Lines(),
+        ElementsAre("3|TPEGASUSNamespace::EnumerateProviders: fProviders.size() = 3", "3|before inventory pegasus NSP",
+                    "0|TPEGASUSNamespace::EnumerateProviders failed for provider " + PathOf("beta") + ": no beta",
+                    "3|after inventory pegasus NSP"));
 }
 
 TEST_F(ThreadedRegistrationTest, AThreadThatCannotBeMadeLeavesAfterTheOthersHaveEnded)

@@ -26,9 +26,10 @@ TEST(NormalizeNameTest, LowersLegalNamesAndRefusesTheRest)
         const char* fName;
         const char* fNormalized; // null: refused
     } const rows[] = {
-        {"", ""},           {"CIM_Foo", "cim_foo"}, {"_x1", "_x1"},       {"A", "a"},          {"z9_Z", "z9_z"},
-        {"1abc", nullptr},  {"a-b", nullptr},       {"a b", nullptr},     {" a", nullptr},     {"a.b", nullptr},
-        {"<root>", nullptr}, {"a\xC3\xA9", nullptr}, {"a/b", nullptr},    {"a:b", nullptr},    {"9", nullptr},
+        {"", ""},         {"CIM_Foo", "cim_foo"}, {"_x1", "_x1"},      {"A", "a"},
+        {"z9_Z", "z9_z"}, {"1abc", nullptr},      {"a-b", nullptr},    {"a b", nullptr},
+        {" a", nullptr},  {"a.b", nullptr},       {"<root>", nullptr}, {"a\xC3\xA9", nullptr},
+        {"a/b", nullptr}, {"a:b", nullptr},       {"9", nullptr},
     };
     for (const auto& row : rows) {
         SCOPED_TRACE(row.fName);
@@ -99,8 +100,8 @@ TEST_F(SchemaCacheTest, MirrorsAChainFromTheTopAndAsksOnlyOnce)
     const std::size_t requests = fServer.Requests().size();
     for (const char* name : {"A_Leaf", "a_leaf", "A_LEAF"}) {
         EXPECT_EQ(leaf, fNamespace->GetClass(name, {{"timeout", 5}})); // the context is not looked at
-        EXPECT_THAT(fRig.fLog.Take(), ElementsAre(std::string("3|TPEGASUSNamespace::GetClass ") + name +
-                                                  " Found in TPEGASUSNamespace"));
+        EXPECT_THAT(fRig.fLog.Take(),
+                    ElementsAre(std::string("3|TPEGASUSNamespace::GetClass ") + name + " Found in TPEGASUSNamespace"));
     }
     EXPECT_NE(nullptr, fNamespace->GetClass("A_Top", {}));
     EXPECT_EQ(requests, fServer.Requests().size());

@@ -119,11 +119,10 @@ TEST_F(StartUpTest, GoesOnUnconnectedAfterSixAttemptsOfThreeTries)
                       "sleep 1", "sleep 1", "sleep 1", "sleep 1", "sleep 1"});
     }
     log.insert(log.end(), {"3|", "3|", "3|"}); // two compilations and the configuration
-    trace.insert(trace.end(),
-                 {"run cimmof -n root/PG_Internal -aE M/pegasus/pegSchema/PG_Internal/PG_Internal.mof",
-                  "run cimmof -n root/PG_InterOp -aE M/pegasus/pegSchema/PG_InterOp/PG_InterOp.mof",
-                  "run cimconfig -s providerDir=", "system " + RemovalOf("/lsi_mr.conf"), "run bcu -v",
-                  "system " + RemovalOf("R/pegasus/provider/brocade/libdbfaj.so")});
+    trace.insert(trace.end(), {"run cimmof -n root/PG_Internal -aE M/pegasus/pegSchema/PG_Internal/PG_Internal.mof",
+                               "run cimmof -n root/PG_InterOp -aE M/pegasus/pegSchema/PG_InterOp/PG_InterOp.mof",
+                               "run cimconfig -s providerDir=", "system " + RemovalOf("/lsi_mr.conf"), "run bcu -v",
+                               "system " + RemovalOf("R/pegasus/provider/brocade/libdbfaj.so")});
     log.insert(log.end(), {"3|", "3|Error opening START"}); // the destructor
     trace.insert(trace.end(), {"run cimserver -s", "sleep 3", "system " + RemovalOf("START", "-f"),
                                "system " + RemovalOf("R/pegasus/repository"),

@@ -10,7 +10,10 @@ namespace NKOLVRX20 {
 
 TCapturedLog::TCapturedLog() : fReplaced(TRootObject::SetCoreLogger(this)) {}
 
-TCapturedLog::~TCapturedLog() { TRootObject::SetCoreLogger(fReplaced); }
+TCapturedLog::~TCapturedLog()
+{
+    TRootObject::SetCoreLogger(fReplaced);
+}
 
 void TCapturedLog::Log(EVRXLogSeverity severity, const std::string& text)
 {

@@ -137,6 +137,25 @@ void TFakeCimServer::KeepSilentOn(const std::string& request)
     fReplies[request] = {TReply::kSilence, ""};
 }
 
+void TFakeCimServer::WaitUntilIdle() const
+{
+    std::unique_lock<std::mutex> lock(fMutex);
+    fConnectionsChanged.wait_for(lock, std::chrono::seconds(5), [this] { return fConnectionCount == 0; });
+}
+
+void TFakeCimServer::CountConnections()
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    fConnectionCount = static_cast<int>(fConnections.size());
+    fConnectionsChanged.notify_all();
+}
+
+void TFakeCimServer::ForgetRequests()
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    fRequests.clear();
+}
+
 std::vector<std::string> TFakeCimServer::Requests() const
 {
     const std::lock_guard<std::mutex> lock(fMutex);
@@ -180,6 +199,7 @@ void TFakeCimServer::Serve()
         }
         if (watched[1].revents & POLLIN)
             Accept();
+        CountConnections();
     }
 }
 

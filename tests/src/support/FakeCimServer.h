@@ -2,6 +2,7 @@
 #define TESTS_SRC_SUPPORT_FAKECIMSERVER_H
 
 #include <atomic>
+#include <condition_variable>
 #include <map>
 #include <mutex>
 #include <string>
@@ -38,6 +39,9 @@ class TFakeCimServer
     // Never answers.
     void KeepSilentOn(const std::string& request);
 
+    // Blocks: until all connections have ended, five seconds at most.
+    void WaitUntilIdle() const;
+    void ForgetRequests();
     std::vector<std::string> Requests() const;
     // Returns: how often this was asked.
     long Count(const std::string& request) const;
@@ -47,7 +51,12 @@ class TFakeCimServer
   private:
     struct TReply
     {
-        enum EKind { kReturnValue, kRaw, kSilence } fKind;
+        enum EKind
+        {
+            kReturnValue,
+            kRaw,
+            kSilence
+        } fKind;
         std::string fText;
     };
     struct TConnection
@@ -57,6 +66,7 @@ class TFakeCimServer
     };
 
     void Serve();
+    void CountConnections();
     void Accept();
     bool Receive(TConnection& connection);
     bool Respond(int descriptor, const std::string& body);
@@ -69,6 +79,8 @@ class TFakeCimServer
     std::map<std::string, TReply> fReplies;
     std::vector<std::pair<std::string, std::string>> fRequests; // name and body
     std::vector<TConnection> fConnections;                      // the thread's own
+    int fConnectionCount = 0;
+    mutable std::condition_variable fConnectionsChanged;
     std::thread fThread;
 };
 

@@ -105,7 +105,10 @@ int dladdr(const void* address, Dl_info* info) noexcept
     TOutsideWorld* world = TOutsideWorld::Current();
     if (world && world->fDladdrFails)
         return 0;
-    return Next<int(const void*, Dl_info*)>("dladdr")(address, info);
+    const int found = Next<int(const void*, Dl_info*)>("dladdr")(address, info);
+    if (world && world->fDladdrFile)
+        info->dli_fname = world->fDladdrFile;
+    return found;
 }
 
 int pthread_create(pthread_t* thread, const pthread_attr_t* attributes, void* (*start)(void*), void* argument) noexcept
@@ -114,7 +117,7 @@ int pthread_create(pthread_t* thread, const pthread_attr_t* attributes, void* (*
     if (world && !world->TakeThread())
         return EAGAIN;
     return Next<int(pthread_t*, const pthread_attr_t*, void* (*)(void*), void*)>("pthread_create")(thread, attributes,
-                                                                                                 start, argument);
+                                                                                                   start, argument);
 }
 
 DIR* opendir(const char* path)
@@ -127,9 +130,15 @@ DIR* opendir(const char* path)
     return Next<DIR*(const char*)>("opendir")(path);
 }
 
-std::FILE* fopen(const char* path, const char* mode) { return OpenFile("fopen", path, mode); }
+std::FILE* fopen(const char* path, const char* mode)
+{
+    return OpenFile("fopen", path, mode);
+}
 
-std::FILE* fopen64(const char* path, const char* mode) { return OpenFile("fopen64", path, mode); }
+std::FILE* fopen64(const char* path, const char* mode)
+{
+    return OpenFile("fopen64", path, mode);
+}
 
 } // extern "C"
 

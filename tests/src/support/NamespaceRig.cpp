@@ -41,9 +41,15 @@ TNamespaceRig::~TNamespaceRig()
     TConfig::GetInstance()->Clear();
 }
 
-TCIMContext TNamespaceRig::Context() const { return {{"consumer", fConsumer}}; }
+TCIMContext TNamespaceRig::Context() const
+{
+    return {{"consumer", fConsumer}};
+}
 
-std::string TNamespaceRig::StartFile() const { return "/var/tmp/cimserverkol_tc_" + fConsumer + "_start.conf"; }
+std::string TNamespaceRig::StartFile() const
+{
+    return "/var/tmp/cimserverkol_tc_" + fConsumer + "_start.conf";
+}
 
 boost::shared_ptr<TPEGASUSNamespace> TNamespaceRig::MakeNamespace() const
 {

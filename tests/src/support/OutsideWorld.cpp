@@ -10,11 +10,20 @@ std::atomic<TOutsideWorld*> gCurrent{nullptr};
 
 } // namespace
 
-TOutsideWorld::TOutsideWorld() { gCurrent = this; }
+TOutsideWorld::TOutsideWorld()
+{
+    gCurrent = this;
+}
 
-TOutsideWorld::~TOutsideWorld() { gCurrent = nullptr; }
+TOutsideWorld::~TOutsideWorld()
+{
+    gCurrent = nullptr;
+}
 
-TOutsideWorld* TOutsideWorld::Current() { return gCurrent; }
+TOutsideWorld* TOutsideWorld::Current()
+{
+    return gCurrent;
+}
 
 std::vector<std::string> TOutsideWorld::Trace() const
 {
@@ -44,6 +53,13 @@ std::vector<TSpawnCall> TOutsideWorld::Runs() const
 {
     const std::lock_guard<std::mutex> lock(fMutex);
     return fRuns;
+}
+
+void TOutsideWorld::Forget()
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    fTrace.clear();
+    fRuns.clear();
 }
 
 void TOutsideWorld::Record(const std::string& entry)

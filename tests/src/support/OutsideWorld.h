@@ -40,6 +40,9 @@ class TOutsideWorld
     std::vector<std::string> Take();
     std::vector<TSpawnCall> Runs() const;
 
+    // Forgets the trace and the runs.
+    void Forget();
+
     // --- the script: set before the plug-in runs ---
 
     // Told of every pause before it "ends".
@@ -51,6 +54,7 @@ class TOutsideWorld
     bool fBindForReal = true; // false: a free port is only said to be bound
     bool fSocketFails = false;
     bool fDladdrFails = false;
+    const char* fDladdrFile = nullptr; // null: the real one
     bool fKillFails = false;
     int fThreadsUntilFailure = -1; // -1: none fails
     std::string fUnreadableDirectory;

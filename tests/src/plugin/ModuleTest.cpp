@@ -1,0 +1,206 @@
+// The library as a host loads it: what it exports, and that it goes without a trace.
+#include <algorithm>
+#include <cstdio>
+#include <filesystem>
+#include <set>
+
+#include <dlfcn.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <malloc.h>
+#include <unistd.h>
+
+#include <host/ICIMClass.h>
+#include <host/ICIMInstance.h>
+#include <host/ICIMNamespace.h>
+#include <host/INamespaceProvider.h>
+#include <host/INamespaceProviderManager.h>
+#include <host/IProvider.h>
+#include <host/PluginSymbols.h>
+#include <host/TRootObject.h>
+
+#include "src/support/CapturedLog.h"
+#include "src/support/FakeCimServer.h"
+#include "src/support/OutsideWorld.h"
+#include "src/support/TempTree.h"
+
+namespace NKOLVRX20 {
+namespace {
+
+// A copy of the library in a tree of its own, as a host deploys it.
+class TDeployedModule
+{
+  public:
+    explicit TDeployedModule(const std::string& vendor)
+    {
+        fFile = fTree.Path() + "/libpegasus.nsp.so";
+        std::filesystem::copy_file(VRX_PLUGIN_FILE, fFile);
+        fTree.Write("pegasus/provider/" + vendor + "/a.classes.xml",
+                    "<vrx><nsp name='root/cimv2'/><module name='" + vendor + "'/><class name='A_Leaf'/></vrx>");
+    }
+    ~TDeployedModule() { Unload(); }
+
+    void Load()
+    {
+        fHandle = ::dlopen(fFile.c_str(), RTLD_NOW | RTLD_LOCAL);
+        ASSERT_NE(nullptr, fHandle) << ::dlerror();
+        Call(kInitializeSymbol);
+        fProvider = TRootObject::GetNamespaceProviderManager()->GetNamespaceProvider("pegasus");
+        ASSERT_NE(nullptr, fProvider);
+    }
+    void Clear() const { Call(kClearNamespaceSymbol); }
+    void Unload()
+    {
+        if (!fHandle)
+            return;
+        TRootObject::GetNamespaceProviderManager()->UnregisterNamespaceProvider(fProvider);
+        fProvider.reset();
+        ::dlclose(fHandle);
+        fHandle = nullptr;
+    }
+    bool IsStillLoaded() const
+    {
+        void* handle = ::dlopen(fFile.c_str(), RTLD_NOW | RTLD_NOLOAD);
+        if (handle)
+            ::dlclose(handle);
+        return handle != nullptr;
+    }
+    boost::shared_ptr<INamespaceProvider> Provider() const { return fProvider; }
+
+  private:
+    void Call(const char* symbol) const
+    {
+        const auto function = reinterpret_cast<void (*)()>(::dlsym(fHandle, symbol));
+        ASSERT_NE(nullptr, function) << symbol;
+        function();
+    }
+
+    TTempTree fTree;
+    std::string fFile;
+    void* fHandle = nullptr;
+    boost::shared_ptr<INamespaceProvider> fProvider;
+};
+
+class ModuleTest : public ::testing::Test
+{
+  protected:
+    ModuleTest()
+    {
+        std::filesystem::current_path(fRoot.Path());
+        fWorld.fBindForReal = false;
+        fWorld.fIsPortFree = [this](unsigned short port) { return port == fServer.Port(); };
+        fWorld.fFiles["/lsi_mr.conf"] = "";
+        fServer.AnswerClass("A_Top", "");
+        fServer.AnswerClass("A_Leaf", "A_Top", "<PROPERTY NAME=\"Name\" TYPE=\"string\"></PROPERTY>");
+        fServer.Answer("EnumerateInstances A_Leaf",
+                       "<VALUE.NAMEDINSTANCE><INSTANCENAME CLASSNAME=\"A_Leaf\"><KEYBINDING NAME=\"Name\"><KEYVALUE "
+                       "VALUETYPE=\"string\">one</KEYVALUE></KEYBINDING></INSTANCENAME><INSTANCE CLASSNAME=\"A_Leaf\">"
+                       "<PROPERTY NAME=\"Name\" TYPE=\"string\"><VALUE>one</VALUE></PROPERTY></INSTANCE>"
+                       "</VALUE.NAMEDINSTANCE>");
+        fServer.Listen();
+    }
+    ~ModuleTest() override { std::filesystem::current_path("/"); }
+
+    // Goes the whole way from a namespace to its instances. Returns: how many there were.
+    static int CountInstances(const TDeployedModule& module)
+    {
+        int count = 0;
+        const auto countOne = [&count](boost::shared_ptr<ICIMInstance>) { return ++count, true; };
+        const auto ofClass = [&](boost::shared_ptr<ICIMClass> offered) {
+            offered->EnumerateInstances(countOne, true, {});
+            return true;
+        };
+        const auto ofProvider = [&](boost::shared_ptr<IProvider> provider) {
+            provider->EnumerateClassesProvided(ofClass, {});
+            return true;
+        };
+        const TCIMContext context = {{"consumer", "nsptest-module-" + std::to_string(::getpid())}};
+        module.Provider()->AllocateNamespace(context, true, "root/cimv2")->EnumerateProviders(ofProvider, {});
+        return count;
+    }
+
+    TFakeCimServer fServer;
+    TTempTree fRoot;
+    TCapturedLog fLog;
+    TOutsideWorld fWorld;
+};
+
+std::set<std::string> ExportedSymbols()
+{
+    std::set<std::string> symbols;
+    const std::string command = std::string("nm -D --defined-only ") + VRX_PLUGIN_FILE;
+    std::FILE* output = ::popen(command.c_str(), "r");
+    char address[64], kind[8], name[512];
+    while (std::fscanf(output, "%63s %7s %511s", address, kind, name) == 3)
+        symbols.insert(name);
+    EXPECT_EQ(0, ::pclose(output));
+    return symbols;
+}
+
+TEST(ModuleExportsTest, AreTheEntryPointsAndNothingElse)
+{
+    const std::string entry = "_ZN9NKOLVRX2025TPEGASUSNamespaceProvider";
+    EXPECT_THAT(ExportedSymbols(),
+                ::testing::UnorderedElementsAre(kInitializeSymbol, kClearNamespaceSymbol, entry + "11GetInstanceEv",
+                                                entry + "12GetNamespaceEv", entry + "19GetfgModulePathNameB5cxx11Ev"));
+}
+
+long CountEntries(const char* directory)
+{
+    const std::filesystem::directory_iterator entries(directory);
+    return std::distance(begin(entries), end(entries));
+}
+
+TEST_F(ModuleTest, LeavesNothingBehindHoweverOftenItIsLoaded)
+{
+    long descriptors = 0, threads = 0;
+    std::size_t bytes = 0;
+    TDeployedModule module("acme");
+    for (int round = 0; round < 50; ++round) {
+        SCOPED_TRACE(round);
+        module.Load();
+        ASSERT_EQ(1, CountInstances(module));
+        module.Clear();
+        module.Unload();
+        ASSERT_FALSE(module.IsStillLoaded());
+        fLog.Take();
+        fWorld.Forget();
+        fServer.ForgetRequests();
+        fServer.WaitUntilIdle();
+        if (round == 9) { // whatever libraries keep for good, they have by now
+            descriptors = CountEntries("/proc/self/fd");
+            threads = CountEntries("/proc/self/task");
+            bytes = ::mallinfo2().uordblks;
+        }
+    }
+    EXPECT_EQ(threads, CountEntries("/proc/self/task"));
+    EXPECT_EQ(descriptors, CountEntries("/proc/self/fd"));
+#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
+    EXPECT_LT(::mallinfo2().uordblks, bytes + 16384) << "forty rounds more";
+#endif
+}
+
+TEST_F(ModuleTest, TwoCopiesDoNotMeet)
+{
+    TDeployedModule first("acme"), second("beta");
+    first.Load();
+    ASSERT_EQ(1, CountInstances(first));
+    first.Clear();
+    second.Load();
+    EXPECT_NE(first.Provider(), second.Provider());
+    fLog.Take();
+    ASSERT_EQ(1, CountInstances(second));
+    EXPECT_EQ(1U, fLog.LinesWith("3|TPEGASUSProvider::EnumerateClassesProvided Asking plugin beta for A_Leaf").size());
+    second.Clear();
+}
+
+TEST_F(ModuleTest, TellsWhenItCannotFindItself)
+{
+    TDeployedModule module("acme");
+    fWorld.fDladdrFails = true;
+    module.Load();
+    EXPECT_THAT(fLog.Lines(), ::testing::ElementsAre("0|PEGASUS NSP initialization failed"));
+}
+
+} // namespace
+} // namespace NKOLVRX20
