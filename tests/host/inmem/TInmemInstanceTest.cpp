@@ -1,0 +1,210 @@
+#include <climits>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <host/ICIMProperty.h>
+#include <host/TInmemInstance.h>
+#include <inmem/TInmemNamespace.h>
+
+#include "host/support/FakeModel.h"
+
+namespace NKOLVRX20 {
+namespace {
+
+typedef TCIMValue::TCIMType TType;
+using testing::ElementsAre;
+
+TCIMValue Strings(const std::vector<std::string>& texts)
+{
+    return TCIMValue(TType::kString, 0, std::vector<TCIMValue>(texts.begin(), texts.end()));
+}
+
+boost::shared_ptr<TFakeClass> FanClass()
+{
+    const auto fan = boost::make_shared<TFakeClass>("CIM_Fan");
+    fan->Declare("SystemName", TType::kString, true);
+    fan->Declare("DeviceID", TType::kUint16, true);
+    fan->Declare("Speed", TType::kUint32);
+    return fan;
+}
+
+boost::shared_ptr<TInmemInstance> Fan(const boost::shared_ptr<ICIMClass>& fanClass, unsigned short id)
+{
+    const auto fan = boost::make_shared<TInmemInstance>(fanClass, TCIMContext());
+    fan->SetPropertyValue("systemname", TCIMValue("a\"b\\c"), TCIMContext());
+    fan->SetPropertyValue("DEVICEID", TCIMValue(id), TCIMContext());
+    return fan;
+}
+
+TEST(TInmemInstance, NamesAreMatchedWithoutCaseAndOverwritten)
+{
+    const auto fan = Fan(FanClass(), 1);
+    const auto property = fan->GetProperty("DeviceId", TCIMContext());
+    fan->SetPropertyValue("deviceID", TCIMValue(static_cast<unsigned short>(9)), TCIMContext());
+    EXPECT_EQ(property->GetValue(TCIMContext()), TCIMValue(static_cast<unsigned short>(9)));
+    EXPECT_EQ(property->GetDeclaration(TCIMContext())->GetName(TCIMContext()), "DeviceID");
+    std::vector<std::string> names;
+    fan->EnumerateProperties(
+        [&](boost::shared_ptr<ICIMProperty> each) {
+            names.push_back(each->GetDeclaration(TCIMContext())->GetName(TCIMContext()));
+            return true;
+        },
+        TCIMContext());
+    EXPECT_THAT(names, ElementsAre("DeviceID", "SystemName"));
+}
+
+TEST(TInmemInstance, UnknownPropertiesAreKeptAndMissingOnesThrow)
+{
+    const auto fan = Fan(FanClass(), 1);
+    fan->SetPropertyValue("Undeclared", TCIMValue(1), TCIMContext());
+    EXPECT_FALSE(fan->GetProperty("undeclared", TCIMContext())->GetDeclaration(TCIMContext()));
+    EXPECT_THROW(fan->GetProperty("Speed", TCIMContext()), TVRXException);
+    EXPECT_THROW(fan->SetPropertyValue("1st", TCIMValue(1), TCIMContext()), TVRXException);
+    EXPECT_THROW(fan->GetProperty("1st", TCIMContext()), TVRXException) << "a refused name left a property";
+}
+
+TEST(TInmemInstance, PathHoldsTheKeysInOrder)
+{
+    const auto fanClass = FanClass();
+    const auto ns = boost::make_shared<TInmemNamespace>();
+    fanClass->fNamespace = ns;
+    const TCIMReference reference = Fan(fanClass, 7)->BuildPath(TCIMContext());
+    EXPECT_EQ(reference.GetPath(), "CIM_Fan.DeviceID=7,SystemName=\"a\\\"b\\\\c\"");
+    EXPECT_EQ(reference.GetNamespace(), ns);
+    EXPECT_EQ(reference.GetClassName(), "CIM_Fan");
+}
+
+TEST(TInmemInstance, EntersAndLeavesItsClass)
+{
+    const auto fanClass = FanClass();
+    const auto fan = Fan(fanClass, 1);
+    fan->AddToNamespace(TCIMContext());
+    EXPECT_THAT(fanClass->fInstances, ElementsAre(fan));
+    fan->Delete(TCIMContext());
+    EXPECT_THAT(fanClass->fInstances, ElementsAre());
+}
+
+TEST(TInmemInstance, ComparesAndCopiesByClassAndValues)
+{
+    const auto fanClass = FanClass();
+    const auto one = Fan(fanClass, 1), same = Fan(fanClass, 1), two = Fan(fanClass, 2);
+    two->SetPropertyValue("Undeclared", TCIMValue(1), TCIMContext());
+    EXPECT_TRUE(*static_cast<ICIMInstance*>(one.get()) == *same);
+    EXPECT_TRUE(*static_cast<ICIMInstance*>(one.get()) < *two);
+    EXPECT_FALSE(*static_cast<ICIMInstance*>(two.get()) < *one);
+    *static_cast<ICIMInstance*>(one.get()) = *static_cast<const ICIMInstance*>(two.get());
+    EXPECT_TRUE(*static_cast<ICIMInstance*>(one.get()) == *two);
+    same->ModifyInstance(two, TCIMContext());
+    EXPECT_TRUE(*static_cast<ICIMInstance*>(same.get()) == *two);
+}
+
+struct TTextRow
+{
+    const char* fName;
+    TCIMValue fValue;
+    std::map<std::string, TCIMValue> fQualifiers;
+    std::vector<std::string> fTexts;
+};
+
+const std::map<std::string, TCIMValue> kRanges = {
+    {"ValueMap", Strings({"0", "1..4", "..", "-5", "10..", "word"})},
+    {"Values", Strings({"Unknown", "Low", "Other", "Minus five", "High", "Word"})}};
+
+const TTextRow kTexts[] = {
+    {"null", TCIMValue(TType(TType::kUint32), 0), {{"Units", TCIMValue("Bytes")}}, {}},
+    {"plain", TCIMValue(5), {}, {"5"}},
+    {"mapped", TCIMValue(0), kRanges, {"Unknown"}},
+    {"in a range", TCIMValue(4), kRanges, {"Low"}},
+    {"open range before the rest", TCIMValue(10), kRanges, {"High"}},
+    {"above 63 bits", TCIMValue(ULONG_MAX), kRanges, {"High"}},
+    {"the rest", TCIMValue(7), kRanges, {"Other"}},
+    {"exact before a range", TCIMValue(-5), kRanges, {"Minus five"}},
+    {"mapped string", TCIMValue("word"), kRanges, {"Word"}},
+    {"unmapped string", TCIMValue("words"), kRanges, {"words"}},
+    {"index without a map", TCIMValue(1), {{"Values", Strings({"zero", "one"})}}, {"one"}},
+    {"index out of range", TCIMValue(2), {{"Values", Strings({"zero", "one"})}}, {"2"}},
+    {"more entries than texts", TCIMValue(2), {{"ValueMap", Strings({"1", "2"})}, {"Values", Strings({"one"})}}, {"2"}},
+    {"unit", TCIMValue(5), {{"Units", TCIMValue("Bytes")}, {"PUnit", TCIMValue("byte")}}, {"5 Bytes"}},
+    {"programmatic unit", TCIMValue(1.5), {{"PUnit", TCIMValue("hertz")}}, {"1.5 hertz"}},
+    {"unit of a string", TCIMValue("5"), {{"Units", TCIMValue("Bytes")}}, {"5"}},
+    {"array", TCIMValue(TType(TType::kSint32), 0, {TCIMValue(0), TCIMValue(2)}), kRanges, {"Unknown", "Low"}},
+    {"datetime", TCIMValue(TCIMDateTime("00000003040506.000000:000")), {}, {"3 days 04:05:06"}},
+};
+
+TEST(TInmemProperty, TextsComeFromTheDeclaration)
+{
+    for (const TTextRow& row : kTexts) {
+        SCOPED_TRACE(row.fName);
+        const auto fan = boost::make_shared<TFakeClass>("CIM_Fan");
+        const auto declaration = fan->Declare("X", row.fValue.GetType());
+        for (const auto& qualifier : row.fQualifiers)
+            declaration->SetQualifier(qualifier.first, qualifier.second);
+        const auto instance = boost::make_shared<TInmemInstance>(fan, TCIMContext());
+        instance->SetPropertyValue("x", row.fValue, TCIMContext());
+        const auto property = instance->GetProperty("x", TCIMContext());
+        EXPECT_EQ(property->ToStringVector(), row.fTexts);
+        std::string joined;
+        for (const std::string& text : row.fTexts)
+            joined += (joined.empty() ? "" : ", ") + text;
+        EXPECT_EQ(property->ToString(), joined);
+    }
+}
+
+TEST(TInmemProperty, OutlivesItsClassWithPlainText)
+{
+    boost::shared_ptr<ICIMProperty> property;
+    {
+        const auto fan = boost::make_shared<TFakeClass>("CIM_Fan");
+        fan->Declare("X", TType::kSint32)->SetQualifier("Units", TCIMValue("Bytes"));
+        const auto instance = boost::make_shared<TInmemInstance>(fan, TCIMContext());
+        instance->SetPropertyValue("X", TCIMValue(1), TCIMContext());
+        property = instance->GetProperty("X", TCIMContext());
+        EXPECT_EQ(property->ToString(), "1 Bytes");
+    }
+    EXPECT_EQ(property->ToString(), "1");
+    EXPECT_FALSE(property->GetDeclaration(TCIMContext()));
+}
+
+TEST(TInmemProperty, RemembersThePreviousValueAndTheDefault)
+{
+    const auto fan = boost::make_shared<TFakeClass>("CIM_Fan");
+    fan->Declare("X", TType::kSint32)->SetDefaultValue(TCIMValue(1), TCIMContext());
+    const auto instance = boost::make_shared<TInmemInstance>(fan, TCIMContext());
+    instance->SetPropertyValue("X", TCIMValue(1), TCIMContext());
+    const auto property = instance->GetProperty("X", TCIMContext());
+    EXPECT_TRUE(property->IsDefaultValue(TCIMContext()));
+    property->SetPrevValue();
+    EXPECT_FALSE(property->IsPrevValueDifferent());
+    property->SetValue(TCIMValue(2), TCIMContext());
+    EXPECT_TRUE(property->IsPrevValueDifferent());
+    EXPECT_FALSE(property->IsDefaultValue(TCIMContext()));
+    EXPECT_EQ(property->PrevValueToString(), "1");
+    EXPECT_EQ(property->GetPrevValue(), TCIMValue(1));
+}
+
+TEST(TInmemNamespace, ServesAsRepository)
+{
+    TInmemNamespace ns;
+    const auto fanClass = FanClass();
+    const auto fan = Fan(fanClass, 7);
+    ns.AddClass(fanClass);
+    ns.AddInstance(fan);
+    const TCIMReference reference = fan->GetReference(TCIMContext());
+    TCIMReference other;
+    other.SetPath("CIM_Fan.DeviceID=8");
+    EXPECT_EQ(ns.GetClass("cim_FAN", TCIMContext()), fanClass);
+    EXPECT_FALSE(ns.GetClass("CIM_None", TCIMContext()));
+    EXPECT_EQ(ns.GetInstance(reference, TCIMContext()), fan);
+    EXPECT_FALSE(ns.GetInstance(other, TCIMContext()));
+    ns.ModifyInstance(reference, {{"Speed", TCIMValue(5u)}}, TCIMContext());
+    EXPECT_EQ(fan->GetProperty("speed", TCIMContext())->GetValue(TCIMContext()), TCIMValue(5u));
+    EXPECT_THROW(ns.ModifyInstance(other, {}, TCIMContext()), TVRXException);
+    EXPECT_THROW(ns.DeleteInstance(other, TCIMContext()), TVRXException);
+    ns.DeleteInstance(reference, TCIMContext());
+    EXPECT_FALSE(ns.GetInstance(reference, TCIMContext()));
+    EXPECT_FALSE(ns.GetQualifierDecl("Key", TCIMContext()));
+}
+
+} // namespace
+} // namespace NKOLVRX20
