@@ -49,15 +49,17 @@ template <class Body> CMPIStatus perform(Body&& body) noexcept
 template <class Result, class Body> Result answer(CMPIStatus* rc, Result otherwise, Body&& body) noexcept
 {
     CMPIStatus status{CMPI_RC_OK, nullptr};
-    Result result = otherwise;
+    const auto leave = [&](const Result& result) {
+        if (rc != nullptr)
+            *rc = status;
+        return result;
+    };
     try {
-        result = body();
+        return leave(body());
     } catch (...) {
         status = currentFailure();
     }
-    if (rc != nullptr)
-        *rc = status;
-    return result;
+    return leave(otherwise);
 }
 
 // Returns: the broker's object behind what the provider holds.

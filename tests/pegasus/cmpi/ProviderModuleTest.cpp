@@ -1,0 +1,414 @@
+#include "pegasus/cmpi/MofServices.h"
+
+#include <Pegasus/Common/CIMProperty.h>
+#include <Pegasus/Common/Exception.h>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <dlfcn.h>
+
+#include <atomic>
+#include <memory>
+#include <thread>
+
+#define FAULT_LIBRARY(fault) FAULT_LIBRARY_PREFIX #fault ".so"
+
+namespace Pegasus::cmpi {
+namespace {
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+
+constexpr const char* kProvider = "Conformance";
+
+// "code: text" of what the call threw, "" when it did not.
+template <class Call> std::string errorOf(Call&& call)
+{
+    try {
+        call();
+    } catch (const CIMException& error) {
+        return std::to_string(error.getCode()) + ": " + text(error.getMessage());
+    }
+    return {};
+}
+
+class Module : public testing::Test
+{
+  protected:
+    Module() { services.compileFile(TEST_SOURCES "/conformance.mof"); }
+
+    void load(const char* library = CONFORMANCE_LIBRARY, const char* provider = kProvider)
+    {
+        name = provider;
+        module = std::make_unique<ProviderModule>("tests", library, services);
+        services.route(*module, name);
+    }
+
+    ProviderRequest request() const { return MofServices::request(name); }
+
+    CIMValue invoke(const char* method, const Array<CIMParamValue>& in, Array<CIMParamValue>& out)
+    {
+        return module->invokeMethod(request(), CIMObjectPath(String("TST_Check")), CIMName(method), in, out);
+    }
+
+    CIMValue invoke(const char* method, const char* parameter, const CIMValue& value)
+    {
+        Array<CIMParamValue> in;
+        Array<CIMParamValue> out;
+        in.append(CIMParamValue(String(parameter), value));
+        return invoke(method, in, out);
+    }
+
+    void setMode(const std::string& mode) { invoke("SetMode", "Mode", CIMValue(String(mode.c_str()))); }
+
+    std::vector<CIMInstance> items(const CIMPropertyList& properties = CIMPropertyList())
+    {
+        std::vector<CIMInstance> found;
+        module->enumerateInstances(request(), CIMName("TST_Item"), properties,
+                                   [&](const CIMInstance& instance) { found.push_back(instance); });
+        return found;
+    }
+
+    MofServices services;
+    std::string name;
+    std::unique_ptr<ProviderModule> module;
+};
+
+std::vector<std::string> checkNames()
+{
+    MofServices services;
+    services.compileFile(TEST_SOURCES "/conformance.mof");
+    ProviderModule module("tests", CONFORMANCE_LIBRARY, services);
+    Array<CIMParamValue> out;
+    module.invokeMethod(MofServices::request(kProvider), CIMObjectPath(String("TST_Check")), CIMName("List"),
+                        Array<CIMParamValue>(), out);
+    Array<String> names;
+    out[0].getValue().get(names);
+    std::vector<std::string> result;
+    for (Uint32 i = 0; i < names.size(); ++i)
+        result.push_back(text(names[i]));
+    return result;
+}
+
+// The checks that the provider makes from its side; each runs in a module of its own.
+TEST_F(Module, PassesTheProvidersChecks)
+{
+    const std::vector<std::string> names = checkNames();
+    EXPECT_GE(names.size(), 40U);
+    for (const std::string& check : names) {
+        load();
+        String failed;
+        invoke("Run", "Name", CIMValue(String(check.c_str()))).get(failed);
+        EXPECT_EQ(text(failed), "") << check;
+        module.reset();
+    }
+}
+
+TEST_F(Module, DeliversAsManyAsTheProviderReturns)
+{
+    load();
+    for (const std::size_t count : {0U, 1U, 5000U}) {
+        setMode("count " + std::to_string(count)); // without returnDone
+        EXPECT_EQ(items().size(), count);
+    }
+    setMode("after done");
+    EXPECT_EQ(items().size(), 1U);
+    setMode("changed");
+    const std::vector<CIMInstance> two = items();
+    ASSERT_EQ(two.size(), 2U);
+    EXPECT_EQ(propertyText(two[0], "Text"), "item 0");
+    EXPECT_EQ(propertyText(two[1], "Text"), "changed");
+}
+
+TEST_F(Module, InstancesHaveWhatWasSetAndTheirKeys)
+{
+    load();
+    const CIMInstance item = items().at(1);
+    EXPECT_EQ(text(item.getPath().toString()), "TST_Item.Id=\"1\"");
+    EXPECT_EQ(propertyText(item, "Id"), "1");
+    EXPECT_EQ(propertyText(item, "Number"), "1");
+    EXPECT_EQ(propertyText(item, "Unset"), "<none>");
+}
+
+TEST_F(Module, PropertyListReachesProviderAndResult)
+{
+    struct Case
+    {
+        const char* name;
+        CIMPropertyList list;
+        const char* seen; // by the provider
+        Uint32 delivered;
+    };
+    Array<CIMName> one;
+    one.append(CIMName("text"));
+    const std::vector<Case> cases{{"all", CIMPropertyList(), "1: all", 3},
+                                  {"none", CIMPropertyList(Array<CIMName>()), "1: ", 0},
+                                  {"one", CIMPropertyList(one), "1: text;", 1}};
+    load();
+    for (const Case& row : cases) {
+        setMode("properties");
+        EXPECT_EQ(errorOf([&] { items(row.list); }), row.seen) << row.name;
+        setMode("");
+        const CIMInstance item = items(row.list).at(2);
+        EXPECT_EQ(item.getPropertyCount(), row.delivered) << row.name;
+        EXPECT_EQ(text(item.getPath().toString()), "TST_Item.Id=\"2\"") << row.name;
+    }
+}
+
+TEST_F(Module, StatusDecidesAndKeepsItsCode)
+{
+    load();
+    for (int code = 1; code <= 17; ++code) {
+        setMode("fail " + std::to_string(code));
+        EXPECT_EQ(errorOf([&] { items(); }), std::to_string(code) + ": the reason");
+    }
+    for (const int code : {18, 50, 51, 60, 61, 100, 200, -1}) {
+        setMode("fail " + std::to_string(code));
+        EXPECT_EQ(errorOf([&] { items(); }), "1: the reason") << code;
+    }
+    setMode("fail without text");
+    EXPECT_EQ(errorOf([&] { items(); }), "2: ");
+}
+
+TEST_F(Module, WrongKindsOfResultAreRefused)
+{
+    load();
+    setMode("wrong kinds");
+    EXPECT_EQ(errorOf([&] { items(); }), "1: path 7, data 7, null 60");
+}
+
+TEST_F(Module, GetInstanceWantsExactlyOne)
+{
+    load();
+    const CIMObjectPath path(String("TST_Item.Id=\"7\""));
+    EXPECT_EQ(propertyText(module->getInstance(request(), path, CIMPropertyList()), "Text"), "item 7");
+    setMode("nothing");
+    EXPECT_EQ(errorOf([&] { module->getInstance(request(), path, CIMPropertyList()); }), "6: TST_Item.Id=\"7\"");
+    setMode("two");
+    EXPECT_EQ(errorOf([&] { module->getInstance(request(), path, CIMPropertyList()); }),
+              "1: getInstance returns one instance");
+}
+
+TEST_F(Module, SinkMayEndTheEnumeration)
+{
+    load();
+    setMode("count 5000");
+    int delivered = 0;
+    const auto sink = [&](const CIMInstance&) {
+        if (++delivered == 2)
+            throw std::runtime_error("the client is gone");
+    };
+    EXPECT_THROW(module->enumerateInstances(request(), CIMName("TST_Item"), CIMPropertyList(), sink),
+                 std::runtime_error);
+    EXPECT_EQ(delivered, 2);
+}
+
+CIMInstance embedded()
+{
+    CIMInstance instance(CIMName("TST_Root"));
+    instance.addProperty(CIMProperty(CIMName("Text"), CIMValue(String("inner"))));
+    return instance;
+}
+
+TEST_F(Module, MethodsEchoEveryType)
+{
+    Array<String> strings;
+    strings.append(String("a"));
+    strings.append(String("b"));
+    Array<CIMObjectPath> paths;
+    paths.append(CIMObjectPath(String("root/cimv2:TST_Root.Id=\"a\"")));
+    struct Case
+    {
+        const char* name;
+        CIMValue value;
+    };
+    const std::vector<Case> cases{
+        {"boolean", CIMValue(Boolean{true})},
+        {"uint8", CIMValue(Uint8{255})},
+        {"sint64", CIMValue(Sint64{-1})},
+        {"real32", CIMValue(Real32{0.5F})},
+        {"char16", CIMValue(Char16(65))},
+        {"string", CIMValue(String("\xC3\xA9"))},
+        {"datetime", CIMValue(CIMDateTime(String("20231114221320.123456+060")))},
+        {"reference", CIMValue(CIMObjectPath(String("root/cimv2:TST_Everything.Id=\"a\",Number=3")))},
+        {"instance", CIMValue(embedded())},
+        {"strings", CIMValue(strings)},
+        {"no strings", CIMValue(Array<String>())},
+        {"references", CIMValue(paths)},
+    };
+    load();
+    for (const Case& row : cases) {
+        Array<CIMParamValue> in;
+        Array<CIMParamValue> out;
+        in.append(CIMParamValue(String("P"), row.value));
+        in.append(CIMParamValue(String("Null"), CIMValue(row.value.getType(), row.value.isArray())));
+        out.append(CIMParamValue(String("Old"), CIMValue(Uint8{1})));
+        const CIMValue result = invoke("Echo", in, out);
+        ASSERT_EQ(out.size(), 2U) << row.name;
+        EXPECT_EQ(out[1].getValue(), in[1].getValue()) << row.name;
+        if (row.value.getType() == CIMTYPE_INSTANCE) {
+            CIMInstance instance;
+            result.get(instance);
+            EXPECT_EQ(propertyText(instance, "Text"), "inner");
+            continue;
+        }
+        EXPECT_EQ(text(result.toString()), text(row.value.toString())) << row.name;
+        EXPECT_EQ(out[0].getValue(), row.value) << row.name;
+    }
+}
+
+TEST_F(Module, MethodWithoutResultFails)
+{
+    load();
+    EXPECT_EQ(errorOf([&] { invoke("Echo", "Null", CIMValue(CIMTYPE_UINT8, false)); }),
+              "1: The object is not initialized.");
+    EXPECT_EQ(errorOf([&] { invoke("Nope", "X", CIMValue(Uint8{1})); }), "17: Nope");
+}
+
+TEST_F(Module, UnknownPropertyIsLoggedOnce)
+{
+    load();
+    for (int i = 0; i < 2; ++i)
+        invoke("Run", "Name", CIMValue(String("unknown and mistyped properties")));
+    EXPECT_THAT(services.logged(), ElementsAre("setProperty: class TST_Everything has no property Nope"));
+}
+
+TEST_F(Module, AsksForAClassOnce)
+{
+    load();
+    setMode("count 1000");
+    items();
+    items();
+    EXPECT_EQ(services.classCount(), 2U); // TST_Item and the method's TST_Check
+}
+
+TEST_F(Module, CleanupAnswers)
+{
+    struct Case
+    {
+        const char* mode;
+        ProviderModule::Cleanup first;
+        ProviderModule::Cleanup second;
+        std::size_t lines;
+    };
+    using Cleanup = ProviderModule::Cleanup;
+    const std::vector<Case> cases{{"cleanup 0", Cleanup::kReleased, Cleanup::kReleased, 2},
+                                  {"cleanup 50", Cleanup::kStayLoaded, Cleanup::kStayLoaded, 4},
+                                  {"cleanup 51", Cleanup::kNeverUnload, Cleanup::kNeverUnload, 2}};
+    for (const Case& row : cases) {
+        load();
+        items();
+        setMode(row.mode);
+        const std::size_t before = services.logged().size();
+        EXPECT_EQ(module->cleanupWhenIdle(), row.first) << row.mode;
+        EXPECT_EQ(module->cleanupWhenIdle(), row.second) << row.mode;
+        EXPECT_EQ(services.logged().size() - before, row.lines) << row.mode;
+        EXPECT_EQ(items().size(), 3U) << "usable again after " << row.mode;
+        module.reset();
+        EXPECT_THAT(services.logged().back(), HasSubstr("terminating 1")) << row.mode;
+    }
+}
+
+TEST_F(Module, EndsInterfacesInOrderAndUnloads)
+{
+    load();
+    invoke("Tell", "X", CIMValue(Uint8{1}));
+    items();
+    module.reset();
+    EXPECT_THAT(services.logged(), ElementsAre("cleanup instance terminating 1", "cleanup method terminating 1"));
+    EXPECT_EQ(::dlopen(CONFORMANCE_LIBRARY, RTLD_LAZY | RTLD_NOLOAD), nullptr);
+    load();
+    EXPECT_EQ(invoke("Tell", "X", CIMValue(Uint8{1})), CIMValue(Uint32{1})) << "statics are fresh";
+}
+
+TEST_F(Module, ServesSixteenClientsAndNeverCleansUpMeanwhile)
+{
+    load();
+    setMode("count 20");
+    std::atomic<int> wrong{0};
+    std::atomic<int> running{16};
+    std::vector<std::thread> clients;
+    for (int i = 0; i < 16; ++i)
+        clients.emplace_back([&] {
+            for (int round = 0; round < 20; ++round)
+                wrong += items().size() != 20;
+            --running;
+        });
+    std::thread cleaner([&] {
+        while (running > 0)
+            module->cleanupWhenIdle();
+    });
+    for (std::thread& client : clients)
+        client.join();
+    cleaner.join();
+    EXPECT_EQ(wrong, 0);
+    Array<CIMParamValue> out;
+    invoke("Tell", Array<CIMParamValue>(), out);
+    EXPECT_EQ(out[0].getValue(), CIMValue(Sint32{0}));
+}
+
+TEST_F(Module, RefusesLibrariesThatAreNone)
+{
+    struct Case
+    {
+        const char* name;
+        const char* library;
+        const char* provider;
+        const char* expected;
+    };
+    const std::vector<Case> cases{
+        {"no such file", "/nonexistent/libx.so", "Faulty",
+         "ProviderLoadFailure: (/nonexistent/libx.so) Cannot load library, error: "},
+        {"not a library", TEST_SOURCES "/conformance.mof", "Faulty", "Cannot load library, error: "},
+        {"other provider name", CONFORMANCE_LIBRARY, "conformance",
+         ") Provider is not a CMPI style provider. Cannot find conformance_Create<mi-type>MI symbol."},
+        {"misspelt", FAULT_LIBRARY(MISSPELT), "Faulty", "Cannot find Faulty_Create<mi-type>MI symbol."},
+        {"both styles", FAULT_LIBRARY(BOTH_STYLES), "Faulty", "both generic and Faulty entry points"},
+        {"no interface", FAULT_LIBRARY(NULL_OK), "Faulty", "ProviderInitFailure: "},
+    };
+    for (const Case& row : cases) {
+        const std::string error = errorOf([&] {
+            load(row.library, row.provider);
+            items();
+        });
+        EXPECT_THAT(error, testing::StartsWith("1: Provider")) << row.name;
+        EXPECT_THAT(error, HasSubstr(row.expected)) << row.name;
+    }
+}
+
+TEST_F(Module, TriesAFailedFactoryAgain)
+{
+    load(FAULT_LIBRARY(FAILS_ONCE), "Faulty");
+    const std::string error = errorOf([&] { items(); });
+    EXPECT_THAT(error, HasSubstr("Faulty_Create_InstanceMI: no device yet"));
+    EXPECT_EQ(items().size(), 1U);
+    EXPECT_EQ(errorOf([&] { invoke("Any", "X", CIMValue(Uint8{1})); }), "16: provider Faulty has no method interface");
+}
+
+TEST_F(Module, GenericFactoriesGetTheProvidersName)
+{
+    load(FAULT_LIBRARY(GENERIC), "AnyName");
+    EXPECT_EQ(propertyText(items().at(0), "Id"), "AnyName");
+}
+
+TEST_F(Module, ReadsNothingBehindAnOldTable)
+{
+    load(FAULT_LIBRARY(OLD_TABLE), "Faulty");
+    EXPECT_EQ(propertyText(items().at(0), "Id"), "static");
+    EXPECT_EQ(
+        errorOf([&] { module->getInstance(request(), CIMObjectPath(String("TST_Item.Id=\"1\"")), CIMPropertyList()); }),
+        "7: provider Faulty does not implement getInstance");
+}
+
+TEST(ProviderLibrary, IsTheFirstInTheDirectories)
+{
+    const std::string directory = TEST_SOURCES;
+    EXPECT_EQ(findProviderLibrary({"/nonexistent", CONFORMANCE_DIRECTORY, directory}, "conformance", "M"),
+              std::string(CONFORMANCE_DIRECTORY) + "/libconformance.so");
+    EXPECT_EQ(errorOf([&] { findProviderLibrary({directory}, "NoSuchLibrary", "NoLibModule"); }),
+              "1: File \"libNoSuchLibrary.so\" was not found for provider module \"NoLibModule\".");
+}
+
+} // namespace
+} // namespace Pegasus::cmpi

@@ -1,0 +1,130 @@
+/* Arrays and arguments. */
+#include "Conformance.h"
+
+#include <string.h>
+
+static const char* arraysStartNull(const Env* env)
+{
+    const CMPIType forms[] = {CMPI_uint16, CMPI_uint16A};
+    for (size_t i = 0; i < 2; ++i) {
+        CMPIStatus rc = kGarbage;
+        const CMPIArray* array = env->mb->eft->newArray(env->mb, 3, forms[i], &rc);
+        REQUIRE(array != NULL && rc.rc == CMPI_RC_OK && rc.msg == NULL);
+        REQUIRE(array->ft->getSize(array, NULL) == 3);
+        REQUIRE(array->ft->getSimpleType(array, NULL) == CMPI_uint16);
+        const CMPIData data = array->ft->getElementAt(array, 2, NULL);
+        REQUIRE(data.type == CMPI_uint16 && data.state == CMPI_nullValue);
+    }
+    const CMPIArray* empty = env->mb->eft->newArray(env->mb, 0, CMPI_string, NULL);
+    REQUIRE(empty != NULL && empty->ft->getSize(empty, NULL) == 0);
+    CMPIStatus rc = kGarbage;
+    REQUIRE(env->mb->eft->newArray(env->mb, 1, 0x0777, &rc) == NULL && rc.rc != CMPI_RC_OK);
+    REQUIRE(env->mb->eft->newArray(env->mb, 0xFFFFFFFFU, CMPI_uint8, &rc) == NULL && rc.rc != CMPI_RC_OK);
+    return NULL;
+}
+
+static const char* elementsAreChecked(const Env* env)
+{
+    const CMPIArray* array = env->mb->eft->newArray(env->mb, 3, CMPI_uint32A, NULL);
+    CMPIValue value = {.uint32 = 7};
+    REQUIRE(array->ft->setElementAt(array, 1, &value, CMPI_uint32).rc == CMPI_RC_OK);
+    REQUIRE(array->ft->getElementAt(array, 1, NULL).value.uint32 == 7);
+    REQUIRE(array->ft->setElementAt(array, 3, &value, CMPI_uint32).rc == CMPI_RC_ERR_NO_SUCH_PROPERTY);
+    REQUIRE(array->ft->setElementAt(array, 1, &value, CMPI_uint16).rc == CMPI_RC_ERR_TYPE_MISMATCH);
+    REQUIRE(array->ft->setElementAt(array, 1, NULL, CMPI_null).rc == CMPI_RC_OK);
+    REQUIRE(array->ft->getElementAt(array, 1, NULL).state == CMPI_nullValue);
+    CMPIStatus rc = kGarbage;
+    const CMPIData data = array->ft->getElementAt(array, 3, &rc);
+    REQUIRE(rc.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY && (data.state & CMPI_nullValue) != 0);
+    return NULL;
+}
+
+static const char* arraysOfText(const Env* env)
+{
+    const CMPIArray* chars = env->mb->eft->newArray(env->mb, 1, CMPI_chars, NULL);
+    REQUIRE(chars->ft->setElementAt(chars, 0, (const CMPIValue*)"x", CMPI_chars).rc == CMPI_RC_OK);
+    CMPIData data = chars->ft->getElementAt(chars, 0, NULL);
+    REQUIRE(data.type == CMPI_chars && strcmp(data.value.chars, "x") == 0);
+
+    const CMPIArray* strings = env->mb->eft->newArray(env->mb, 1, CMPI_string, NULL);
+    REQUIRE(strings->ft->setElementAt(strings, 0, (const CMPIValue*)"y", CMPI_chars).rc == CMPI_RC_OK);
+    data = strings->ft->getElementAt(strings, 0, NULL);
+    REQUIRE(data.type == CMPI_string && strcmp(textOf(data.value.string), "y") == 0);
+    return NULL;
+}
+
+static const char* storedArraysAreCopies(const Env* env)
+{
+    const CMPIInstance* instance = newInst(env, "TST_Everything");
+    CMPIValue array = {.array = env->mb->eft->newArray(env->mb, 2, CMPI_uint16, NULL)};
+    CMPIValue value = {.uint16 = 5};
+    array.array->ft->setElementAt(array.array, 0, &value, CMPI_uint16);
+    REQUIRE(instance->ft->setProperty(instance, "U16A", &array, CMPI_uint16A).rc == CMPI_RC_OK);
+    value.uint16 = 6;
+    array.array->ft->setElementAt(array.array, 0, &value, CMPI_uint16);
+    REQUIRE(array.array->ft->release(array.array).rc == CMPI_RC_OK);
+    const CMPIData data = instance->ft->getProperty(instance, "U16A", NULL);
+    REQUIRE(data.type == CMPI_uint16A && data.state == CMPI_goodValue);
+    REQUIRE(data.value.array->ft->getSize(data.value.array, NULL) == 2);
+    REQUIRE(data.value.array->ft->getElementAt(data.value.array, 0, NULL).value.uint16 == 5);
+
+    CMPIValue wrong = {.array = env->mb->eft->newArray(env->mb, 1, CMPI_uint8, NULL)};
+    REQUIRE(instance->ft->setProperty(instance, "U16A", &wrong, CMPI_uint16A).rc == CMPI_RC_ERR_INVALID_DATA_TYPE);
+    REQUIRE(instance->ft->setProperty(instance, "U16", &wrong, CMPI_uint8A).rc == CMPI_RC_ERR_INVALID_DATA_TYPE);
+    return NULL;
+}
+
+static const char* everyArrayType(const Env* env)
+{
+    const struct
+    {
+        const char* property;
+        CMPIType type;
+        size_t size;
+    } rows[] = {{"BA", CMPI_boolean, 1},  {"C16A", CMPI_char16, 2}, {"U8A", CMPI_uint8, 1},   {"S8A", CMPI_sint8, 1},
+                {"U16A", CMPI_uint16, 2}, {"S16A", CMPI_sint16, 2}, {"U32A", CMPI_uint32, 4}, {"S32A", CMPI_sint32, 4},
+                {"U64A", CMPI_uint64, 8}, {"S64A", CMPI_sint64, 8}, {"R32A", CMPI_real32, 4}, {"R64A", CMPI_real64, 8}};
+    const CMPIInstance* instance = newInst(env, "TST_Everything");
+    for (size_t i = 0; i < sizeof rows / sizeof *rows; ++i) {
+        CMPIValue array = {.array = env->mb->eft->newArray(env->mb, 1, rows[i].type, NULL)};
+        const CMPIValue value = {.uint64 = 1};
+        REQUIRE(array.array->ft->setElementAt(array.array, 0, &value, rows[i].type).rc == CMPI_RC_OK);
+        const CMPIType type = (CMPIType)(rows[i].type | CMPI_ARRAY);
+        REQUIRE(instance->ft->setProperty(instance, rows[i].property, &array, type).rc == CMPI_RC_OK);
+        const CMPIData data = instance->ft->getProperty(instance, rows[i].property, NULL);
+        REQUIRE(data.type == type);
+        const CMPIData element = data.value.array->ft->getElementAt(data.value.array, 0, NULL);
+        REQUIRE(element.type == rows[i].type && memcmp(&element.value, &value, rows[i].size) == 0);
+    }
+    return NULL;
+}
+
+static const char* argumentsAreNamed(const Env* env)
+{
+    const CMPIArgs* args = env->mb->eft->newArgs(env->mb, NULL);
+    CMPIValue value = {.uint32 = 1};
+    REQUIRE(args->ft->addArg(args, "First", &value, CMPI_uint32).rc == CMPI_RC_OK);
+    REQUIRE(args->ft->addArg(args, "Second", (const CMPIValue*)"x", CMPI_chars).rc == CMPI_RC_OK);
+    value.uint32 = 2;
+    REQUIRE(args->ft->addArg(args, "FIRST", &value, CMPI_uint32).rc == CMPI_RC_OK);
+    REQUIRE(args->ft->getArgCount(args, NULL) == 2);
+    REQUIRE(args->ft->getArg(args, "first", NULL).value.uint32 == 2);
+    CMPIString* name = NULL;
+    REQUIRE(args->ft->getArgAt(args, 1, &name, NULL).type == CMPI_string && strcmp(textOf(name), "Second") == 0);
+    REQUIRE(args->ft->getArgAt(args, 0, NULL, NULL).value.uint32 == 2);
+    CMPIStatus rc = kGarbage;
+    REQUIRE(args->ft->getArg(args, "Third", &rc).state == (CMPI_nullValue | CMPI_notFound));
+    REQUIRE(rc.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY);
+    rc = kGarbage;
+    args->ft->getArgAt(args, 2, &name, &rc);
+    REQUIRE(rc.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY);
+    return NULL;
+}
+
+const CheckRow kArrayChecks[] = {{"arrays start null", arraysStartNull},
+                                 {"elements are checked", elementsAreChecked},
+                                 {"arrays of text", arraysOfText},
+                                 {"stored arrays are copies", storedArraysAreCopies},
+                                 {"every array type", everyArrayType},
+                                 {"arguments are named", argumentsAreNamed},
+                                 {NULL, NULL}};

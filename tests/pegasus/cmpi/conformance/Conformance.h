@@ -1,0 +1,55 @@
+/* Checks of a broker from where its providers stand. Every check is a row: a name and a function. */
+#ifndef TESTS_CMPI_CONFORMANCE_H
+#define TESTS_CMPI_CONFORMANCE_H
+
+#include <cmpi/cmpi.h>
+
+typedef struct Env
+{
+    const CMPIBroker* mb;
+    const CMPIContext* ctx;
+    const CMPIObjectPath* op;
+    const CMPIResult* result;
+    const CMPIArgs* in;
+    CMPIArgs* out;
+} Env;
+
+/* Returns: what did not hold, or NULL. */
+typedef const char* (*Check)(const Env* env);
+
+typedef struct CheckRow
+{
+    const char* name;
+    Check check;
+} CheckRow;
+
+extern const CheckRow kTableChecks[];
+extern const CheckRow kStringChecks[];
+extern const CheckRow kValueChecks[];
+extern const CheckRow kArrayChecks[];
+extern const CheckRow kPathChecks[];
+extern const CheckRow kInstanceChecks[];
+extern const CheckRow kCloneChecks[];
+extern const CheckRow kContextChecks[];
+extern const CheckRow kUpcallChecks[];
+extern const CheckRow kThreadChecks[];
+
+#define CONFORMANCE_TEXT_(x) #x
+#define CONFORMANCE_TEXT(x) CONFORMANCE_TEXT_(x)
+#define REQUIRE(condition)                                                                                             \
+    do {                                                                                                               \
+        if (!(condition))                                                                                              \
+            return __FILE__ ":" CONFORMANCE_TEXT(__LINE__) ": " #condition;                                            \
+    } while (0)
+
+#define NS "root/cimv2"
+
+/* A status that the callee has to overwrite. */
+extern const CMPIStatus kGarbage;
+
+/* Short forms of the calls that every check makes. */
+CMPIObjectPath* newPath(const Env* env, const char* className);
+CMPIInstance* newInst(const Env* env, const char* className);
+const char* textOf(const CMPIString* string);
+
+#endif

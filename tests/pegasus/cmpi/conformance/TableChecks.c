@@ -1,0 +1,112 @@
+/* The tables themselves: versions, and that no slot is empty. */
+#include "Conformance.h"
+
+#include <string.h>
+
+static int hasNoHole(const void* table, size_t from, size_t size)
+{
+    for (size_t at = from; at < size; at += sizeof(void*)) {
+        const void* slot;
+        memcpy(&slot, (const char*)table + at, sizeof slot);
+        if (slot == NULL)
+            return 0;
+    }
+    return 1;
+}
+
+static const char* brokerTables(const Env* env)
+{
+    const CMPIBroker* mb = env->mb;
+    REQUIRE(mb->hdl != NULL);
+    REQUIRE(mb->bft->brokerVersion >= CMPIVersion200);
+    REQUIRE(mb->bft->brokerName != NULL && mb->bft->brokerName[0] != '\0');
+    REQUIRE(mb->eft->ftVersion >= mb->bft->brokerVersion);
+    REQUIRE(mb->xft->ftVersion >= mb->bft->brokerVersion);
+    REQUIRE(hasNoHole(mb->bft, 8, sizeof *mb->bft));
+    REQUIRE(hasNoHole(mb->eft, 8, sizeof *mb->eft));
+    REQUIRE(hasNoHole(mb->xft, 8, sizeof *mb->xft));
+    REQUIRE(mb->mft != NULL && hasNoHole(mb->mft, 8, sizeof *mb->mft));
+    return NULL;
+}
+
+#define REQUIRE_OBJECT(object)                                                                                         \
+    do {                                                                                                               \
+        REQUIRE((object) != NULL && (object)->hdl != NULL);                                                            \
+        REQUIRE((object)->ft->ftVersion >= env->mb->bft->brokerVersion);                                               \
+        REQUIRE(hasNoHole((object)->ft, 8, sizeof *(object)->ft));                                                     \
+    } while (0)
+
+static const char* objectTables(const Env* env)
+{
+    const CMPIBrokerEncFT* eft = env->mb->eft;
+    REQUIRE_OBJECT(env->ctx);
+    REQUIRE_OBJECT(env->op);
+    REQUIRE_OBJECT(env->in);
+    REQUIRE_OBJECT(env->out);
+    REQUIRE_OBJECT(env->result);
+    REQUIRE_OBJECT(newInst(env, "TST_Everything"));
+    REQUIRE_OBJECT(newPath(env, "TST_Everything"));
+    REQUIRE_OBJECT(eft->newString(env->mb, "x", NULL));
+    REQUIRE_OBJECT(eft->newArray(env->mb, 1, CMPI_uint8, NULL));
+    REQUIRE_OBJECT(eft->newDateTime(env->mb, NULL));
+    REQUIRE_OBJECT(env->mb->bft->enumerateInstanceNames(env->mb, env->ctx, newPath(env, "TST_Item"), NULL));
+    return NULL;
+}
+
+static const char* kindsAreNamed(const Env* env)
+{
+    const CMPIBrokerEncFT* eft = env->mb->eft;
+    const struct
+    {
+        const void* object;
+        const char* name;
+    } rows[] = {
+        {env->ctx, "CMPIContext"},
+        {env->op, "CMPIObjectPath"},
+        {env->in, "CMPIArgs"},
+        {env->result, "CMPIResult"},
+        {newInst(env, "TST_Everything"), "CMPIInstance"},
+        {eft->newString(env->mb, "x", NULL), "CMPIString"},
+        {eft->newArray(env->mb, 1, CMPI_uint8, NULL), "CMPIArray"},
+        {eft->newDateTime(env->mb, NULL), "CMPIDateTime"},
+    };
+    for (size_t i = 0; i < sizeof rows / sizeof *rows; ++i) {
+        REQUIRE(strcmp(textOf(eft->getType(env->mb, rows[i].object, NULL)), rows[i].name) == 0);
+        REQUIRE(eft->isOfType(env->mb, rows[i].object, rows[i].name, NULL));
+        REQUIRE(!eft->isOfType(env->mb, rows[i].object, "CMPIBroker", NULL));
+        REQUIRE(eft->toString(env->mb, rows[i].object, NULL) != NULL);
+    }
+    CMPIStatus rc = kGarbage;
+    REQUIRE(eft->getType(env->mb, NULL, &rc) == NULL && rc.rc == CMPI_RC_ERR_INVALID_HANDLE);
+    return NULL;
+}
+
+/* What is not meant to work says so, with a null result. */
+static const char* unsupportedSlotsAnswer(const Env* env)
+{
+    const CMPIBroker* mb = env->mb;
+    CMPIStatus rc = kGarbage;
+    REQUIRE(mb->eft->newSelectExp(mb, "select * from X", "WQL", NULL, &rc) == NULL && rc.rc != CMPI_RC_OK);
+    rc = kGarbage;
+    REQUIRE(mb->eft->newCMPIError(mb, "o", "i", "m", ErrorSevLow, ErrorProbCauseOther, CMPI_RC_ERR_FAILED, &rc) ==
+            NULL);
+    REQUIRE(rc.rc == CMPI_RC_ERR_NOT_SUPPORTED);
+    rc = kGarbage;
+    REQUIRE(mb->bft->execQuery(mb, env->ctx, env->op, "q", "WQL", &rc) == NULL && rc.rc == CMPI_RC_ERR_NOT_SUPPORTED);
+    rc = kGarbage;
+    REQUIRE(mb->bft->associators(mb, env->ctx, env->op, NULL, NULL, NULL, NULL, NULL, &rc) == NULL);
+    REQUIRE(rc.rc == CMPI_RC_ERR_NOT_SUPPORTED);
+    REQUIRE(mb->bft->deliverIndication(mb, env->ctx, NS, newInst(env, "TST_Item")).rc == CMPI_RC_ERR_FAILED);
+    rc = kGarbage;
+    const CMPIData none = env->op->ft->getClassQualifier(env->op, "Version", &rc);
+    REQUIRE(rc.rc == CMPI_RC_ERR_NOT_SUPPORTED && (none.state & CMPI_nullValue) != 0);
+    rc = kGarbage;
+    REQUIRE(env->result->ft->clone(env->result, &rc) == NULL && rc.rc == CMPI_RC_ERR_NOT_SUPPORTED);
+    return NULL;
+}
+
+const CheckRow kTableChecks[] = {{"broker tables have no hole", brokerTables},
+                                 {"object tables have no hole", objectTables},
+                                 {"kinds of objects are named", kindsAreNamed},
+                                 {"unsupported slots answer", unsupportedSlotsAnswer},
+                                 {NULL, NULL}};
