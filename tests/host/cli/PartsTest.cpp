@@ -1,0 +1,157 @@
+// Parts of vrxhost that need no plug-in.
+#include <filesystem>
+#include <fstream>
+
+#include <spawn.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <gtest/gtest.h>
+
+#include <cli/LossRules.h>
+#include <cli/PrivateServer.h>
+
+extern char** environ;
+
+namespace vrxhost {
+namespace {
+
+namespace fs = std::filesystem;
+using NKOLVRX20::TFailedProgram;
+using NKOLVRX20::TProcessOutcome;
+
+struct TLineRow
+{
+    const char* fName;
+    const char* fLine;
+    const char* fSentence; // null: no loss
+};
+
+const TLineRow kLines[] = {
+    {"class fetched", "TPEGASUSNamespace::GetClass from Pegasus for: CIM_Fan", nullptr},
+    {"class not fetched", "TPEGASUSNamespace::GetClass from Pegasus for: CIM_Fan returned exception: timed out",
+     "class CIM_Fan could not be fetched: timed out"},
+    {"time-out with its warning",
+     "Get Instances for: OMC_IpmiLogRecord returned ConnectionTimeoutException: late(may cause 'IPMI Event' page  "
+     "lost)",
+     "instances of OMC_IpmiLogRecord could not be fetched in time: late(may cause 'IPMI Event' page  lost)"},
+    {"instances", "DEBUG1:TPEGASUSClass::EnumerateInstances from Pegasus for: A returned exception: x\ny\n",
+     "instances of A could not be fetched: x y"},
+    {"one instance", "DEBUG3:TPEGASUSClass::EI Error from Pegasus for: A, pegInst 2 returned exception: x",
+     "an instance could not be built, A, pegInst 2: x"},
+    {"property", "4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: speed",
+     "property speed could not be converted and is missing from its instance"},
+    {"progress", "before reg...", nullptr},
+};
+
+TEST(LossRules, LinesOfThePlugin)
+{
+    for (const TLineRow& row : kLines) {
+        const auto sentence = LossOfLine(row.fLine);
+        EXPECT_EQ(sentence.value_or("none"), row.fSentence ? row.fSentence : "none") << row.fName;
+    }
+}
+
+struct TProgramRow
+{
+    const char* fName;
+    TFailedProgram fProgram;
+    bool fServerIsUp;
+    const char* fSentence; // null: no loss
+};
+
+const TProgramRow kPrograms[] = {
+    {"base schema",
+     {"cimmof",
+      {"-n", "root/PG_InterOp", "-aE", "/r/pegasus/pegSchema/PG_InterOp/PG_InterOp.mof"},
+      TProcessOutcome::kSignaled,
+      9,
+      "",
+      ""},
+     true,
+     "MOF file /r/pegasus/pegSchema/PG_InterOp/PG_InterOp.mof did not compile, cimmof: signal 9 (Killed)"},
+    {"failed start that was repeated",
+     {"cimserver", {"httpPort=1"}, TProcessOutcome::kExited, 1, "", "in use"},
+     true,
+     nullptr},
+    {"failed start",
+     {"cimserver", {"httpPort=1"}, TProcessOutcome::kExited, 1, "\n", "in use\n"},
+     false,
+     "the server did not start, cimserver: exit status 1: in use"},
+    {"stop of a stopped server", {"cimserver", {"-s"}, TProcessOutcome::kExited, 1, "", "x"}, false, nullptr},
+    {"text on standard output",
+     {"cimconfig", {"-s", "providerDir="}, TProcessOutcome::kExited, 1, "Failed\n", ""},
+     true,
+     "cimconfig -s providerDir= failed: exit status 1: Failed"},
+    {"no adapter tool, no adapter", {"bcu", {"-v"}, TProcessOutcome::kNotRun, 2, "", ""}, true, nullptr},
+    {"process list", {"ps", {"-e"}, TProcessOutcome::kNotRun, 2, "", ""}, true, nullptr},
+};
+
+TEST(LossRules, Programs)
+{
+    for (const TProgramRow& row : kPrograms) {
+        const auto sentence = LossOfProgram(row.fProgram, "/nonexistent", row.fServerIsUp);
+        EXPECT_EQ(sentence.value_or("none"), row.fSentence ? row.fSentence : "none") << row.fName;
+    }
+}
+
+// A tree whose "server" is a copy of a program that waits, and its start file.
+class PrivateServerTest : public testing::Test
+{
+  protected:
+    PrivateServerTest()
+    {
+        fs::create_directories(fRoot + "/pegasus/bin");
+        fs::copy_file("/bin/sleep", fRoot + "/pegasus/bin/cimserver", fs::copy_options::overwrite_existing);
+    }
+    ~PrivateServerTest() override
+    {
+        fs::remove_all(fRoot);
+        fs::remove(fStartFile);
+    }
+
+    pid_t Start(const std::string& program)
+    {
+        char name[] = "server", seconds[] = "60";
+        char* const arguments[] = {name, seconds, nullptr};
+        pid_t pid = -1;
+        EXPECT_EQ(::posix_spawn(&pid, program.c_str(), nullptr, nullptr, arguments, environ), 0);
+        std::ofstream(fStartFile) << pid << "\n";
+        return pid;
+    }
+
+    static int Reap(pid_t pid)
+    {
+        int status = 0;
+        ::waitpid(pid, &status, 0);
+        return status;
+    }
+
+    const std::string fConsumer = "parts-test-" + std::to_string(::getpid());
+    const std::string fRoot = testing::TempDir() + "/" + fConsumer;
+    const std::string fStartFile = "/var/tmp/cimserverkol_tc_" + fConsumer + "_start.conf";
+};
+
+TEST_F(PrivateServerTest, EndsTheServerOfItsOwnTree)
+{
+    const pid_t pid = Start(fRoot + "/pegasus/bin/cimserver");
+    PrivateServer(fRoot, fConsumer).End();
+    EXPECT_EQ(WTERMSIG(Reap(pid)), SIGTERM);
+}
+
+TEST_F(PrivateServerTest, LeavesAnyOtherProcessAlone)
+{
+    const pid_t pid = Start("/bin/sleep");
+    const PrivateServer server(fRoot, fConsumer);
+    server.End();
+    for (const char* text : {"", "none", "0", "1", "-1", "99999999999999999999"}) {
+        std::ofstream(fStartFile) << text;
+        server.End();
+    }
+    EXPECT_EQ(::waitpid(pid, nullptr, WNOHANG), 0) << "a foreign process was ended";
+    ::kill(pid, SIGKILL);
+    Reap(pid);
+}
+
+} // namespace
+} // namespace vrxhost

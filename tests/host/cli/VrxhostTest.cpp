@@ -1,0 +1,351 @@
+// vrxhost as a program, with a plug-in that misbehaves on demand: what it prints, what it says and how it exits.
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
+
+#include <core/TChildProcess.h>
+
+namespace {
+
+namespace fs = std::filesystem;
+using NKOLVRX20::TChildProcess;
+using NKOLVRX20::TProcessOutcome;
+using NKOLVRX20::TProcessRequest;
+using testing::HasSubstr;
+using testing::Not;
+
+constexpr std::chrono::seconds kDeadline{60};
+
+std::string ReadFile(const fs::path& path)
+{
+    std::stringstream text;
+    text << std::ifstream(path).rdbuf();
+    return text.str();
+}
+
+// A root directory of each test's own.
+class Vrxhost : public testing::Test
+{
+  protected:
+    Vrxhost() : fRoot(fs::path(testing::TempDir()) / ("vrxhost-" + std::to_string(::getpid())))
+    {
+        fs::remove_all(fRoot);
+        fs::create_directories(fRoot);
+    }
+    ~Vrxhost() override { fs::remove_all(fRoot); }
+
+    TProcessOutcome Start(const std::vector<std::string>& command) const
+    {
+        TProcessRequest request;
+        request.fProgram = command.front();
+        request.fArguments = command;
+        request.fInheritEnvironment = true;
+        return TChildProcess(request).Run(kDeadline);
+    }
+
+    std::vector<std::string> Command(const std::vector<std::string>& arguments, const std::string& fault = "") const
+    {
+        std::vector<std::string> command = {VRXHOST,     "--root", fRoot,           "--plugin",
+                                            FAKE_PLUGIN, "--set",  "fault=" + fault};
+        command.insert(command.end(), arguments.begin(), arguments.end());
+        return command;
+    }
+
+    TProcessOutcome Run(const std::vector<std::string>& arguments, const std::string& fault = "") const
+    {
+        return Start(Command(arguments, fault));
+    }
+
+    // A program of the tree, as a shell script.
+    void Install(const std::string& name, const std::string& script) const
+    {
+        fs::create_directories(fRoot / "pegasus/bin");
+        std::ofstream(fRoot / "pegasus/bin" / name) << "#!/bin/sh\n" << script;
+        ::chmod((fRoot / "pegasus/bin" / name).c_str(), 0700);
+    }
+
+    bool IsCleared() const { return fs::exists(fRoot / "cleared"); }
+
+    const fs::path fRoot;
+};
+
+testing::AssertionResult HasStatus(const TProcessOutcome& outcome, int status)
+{
+    if (outcome.fEnd == TProcessOutcome::kExited && outcome.fStatus == status)
+        return testing::AssertionSuccess();
+    return testing::AssertionFailure() << "end " << outcome.fEnd << ", status " << outcome.fStatus << ", not " << status
+                                       << "\nout: " << outcome.fOutput << "\nerr: " << outcome.fErrorOutput;
+}
+
+TEST_F(Vrxhost, InventoryAsTable)
+{
+    const auto outcome = Run({"inventory"});
+    EXPECT_TRUE(HasStatus(outcome, 0));
+    EXPECT_EQ(outcome.fOutput, R"(Provider fake (libfake): 3 classes
+  Fake_EveryType: 1 instance
+    #1
+      Boolean    true
+      Character  8364
+      Date       2026-11-21 04:15:00 +01:00
+      Empty      
+      ID         one "two"\x1b[31m
+      Minimum    -9223372036854775808
+      MixedCase  -128
+      Names      a, b)"
+                               "\xff"
+                               R"(
+      Real32     0.1
+      Real64     1e+300
+      Reference  root/cimv2:A.k="1"
+      Speed      18446744073709551615 Bits per second
+  Fake_Broken: 0 instances
+  Fake_Many: 0 instances
+)");
+    EXPECT_EQ(outcome.fErrorOutput, "");
+    EXPECT_TRUE(IsCleared());
+    EXPECT_THAT(ReadFile(fRoot / "vrxhost.log"), HasSubstr("consumer quvex"));
+}
+
+TEST_F(Vrxhost, InstancesAsJsonWithTrueTypes)
+{
+    const auto outcome = Run({"instances", "fake_everytype", "--format", "json"});
+    EXPECT_TRUE(HasStatus(outcome, 0));
+    EXPECT_EQ(outcome.fOutput, R"({
+  "name": "Fake_EveryType",
+  "instances": [
+    {
+      "path": "Fake_EveryType.ID=\"one \\\"two\\\"\u001b[31m\"",
+      "properties": {
+        "Boolean": true,
+        "Character": "€",
+        "Date": "20261121041500.000000+060",
+        "Empty": [],
+        "ID": "one \"two\"\u001b[31m",
+        "Minimum": -9223372036854775808,
+        "MixedCase": -128,
+        "Names": [
+          "a",
+          "b�"
+        ],
+        "Nothing": null,
+        "Real32": 0.1,
+        "Real64": 1e+300,
+        "Reference": "root/cimv2:A.k=\"1\"",
+        "Speed": 18446744073709551615
+      }
+    }
+  ],
+  "complete": true,
+  "losses": []
+}
+)");
+}
+
+TEST_F(Vrxhost, ClassesAndProviders)
+{
+    EXPECT_EQ(Run({"classes"}).fOutput, R"(Provider fake (libfake): 3 classes
+  Fake_EveryType : CIM_Thing
+    string     ID  [key]
+    uint64     Speed
+    sint8      MixedCase
+    string[]   Names
+    uint32     Reset(boolean Force, uint16[] Ports)
+  Fake_Broken
+  Fake_Many
+)");
+    EXPECT_EQ(Run({"providers"}).fOutput, R"(Provider fake (libfake): 3 classes
+  Fake_EveryType
+  Fake_Broken
+  Fake_Many
+)");
+    const auto json = nlohmann::json::parse(Run({"classes", "--format", "json"}).fOutput);
+    EXPECT_EQ(json["providers"][0]["classes"][0]["methods"][0].dump(),
+              R"({"name":"Reset","parameters":[{"name":"Force","type":"boolean"},{"name":"Ports","type":"uint16[]"}],)"
+              R"("type":"uint32"})");
+    EXPECT_EQ(json["providers"][0]["classes"][1]["superclass"], nullptr);
+}
+
+struct TFaultRow
+{
+    const char* fFault;
+    int fStatus;
+    const char* fSentence;
+};
+
+const TFaultRow kFaults[] = {
+    {"initialize-throws", 1, "could not be initialised: no initialisation today"},
+    {"registers-nothing", 1, "registered no provider named \"pegasus\""},
+    {"throws-standard", 1, "the namespace could not be opened: out of luck"},
+    {"throws-status", 1, "the namespace could not be opened: The connection to the CIM server failed (status 42)"},
+    {"throws-int", 1, "the namespace could not be opened: an exception of type int"},
+    {"returns-null", 1, "the namespace could not be opened: the plug-in returned none"},
+    {"class-throws", 3, "instances of Fake_Broken could not be fetched: an exception of type int"},
+    {"clear-throws", 3, "the plug-in could not shut its namespace down: no shutdown today"},
+    {"leaves-a-thread", 3, "the plug-in left threads behind and stays loaded"},
+    {"prints", 0, ""},
+    {"threads", 0, ""},
+};
+
+TEST_F(Vrxhost, EveryFaultOfAPluginIsOneSentenceAndAValidDocument)
+{
+    for (const TFaultRow& row : kFaults) {
+        SCOPED_TRACE(row.fFault);
+        fs::remove(fRoot / "cleared");
+        const auto outcome = Run({"inventory", "--format", "json"}, row.fFault);
+        EXPECT_TRUE(HasStatus(outcome, row.fStatus));
+        const auto json = nlohmann::json::parse(outcome.fOutput, nullptr, false);
+        ASSERT_TRUE(json.is_object()) << outcome.fOutput;
+        EXPECT_THAT(outcome.fErrorOutput, HasSubstr(row.fSentence));
+        EXPECT_EQ(json["complete"], row.fStatus == 0 || json["losses"].empty());
+        const bool hasNamespace =
+            std::string(row.fFault).find("initialize") != 0 && std::string(row.fFault).find("registers") != 0;
+        EXPECT_EQ(IsCleared(), hasNamespace);
+    }
+}
+
+TEST_F(Vrxhost, WhatThePluginPrintsDoesNotReachTheDocument)
+{
+    const auto outcome = Run({"providers"}, "prints");
+    EXPECT_THAT(outcome.fOutput, Not(HasSubstr("printed")));
+    EXPECT_EQ(outcome.fErrorOutput, "printed by the plug-in\n");
+}
+
+TEST_F(Vrxhost, ProvidersOfSeveralThreadsAreAllListed)
+{
+    const auto json = nlohmann::json::parse(Run({"providers", "--format", "json"}, "threads").fOutput);
+    EXPECT_EQ(json["providers"].size(), 8u);
+}
+
+TEST_F(Vrxhost, LossesAreLearntFromTheLogAndFromPrograms)
+{
+    const auto outcome = Run({"inventory", "--format", "json"}, "losses");
+    EXPECT_TRUE(HasStatus(outcome, 3));
+    const std::vector<std::string> expected = {
+        "provider description /x/linux/a.classes.xml, line 3:syntax error",
+        "class CIM_Gone could not be fetched: CIM_ERR_NOT_FOUND",
+        "class CIM_Odd  CIM_Base could not be built: The value has the wrong type",
+        "MOF file /x/provider/linux/bad.mof of provider linux did not compile, cimmof: exit status 250: "
+        "Parsing error: bad.mof:3"};
+    EXPECT_EQ(nlohmann::json::parse(outcome.fOutput)["losses"], nlohmann::json(expected));
+    std::string sentences;
+    for (const std::string& sentence : expected)
+        sentences += "vrxhost: " + sentence + "\n";
+    EXPECT_EQ(outcome.fErrorOutput, sentences);
+}
+
+TEST_F(Vrxhost, MissingOrForeignPluginFails)
+{
+    auto command = Command({"inventory"});
+    command[4] = "/nonexistent.so";
+    auto outcome = Start(command);
+    EXPECT_TRUE(HasStatus(outcome, 1));
+    EXPECT_THAT(outcome.fErrorOutput, HasSubstr("vrxhost: the plug-in could not be loaded: /nonexistent.so"));
+    command[4] = PLUGIN_WITHOUT_ENTRY_POINTS;
+    outcome = Start(command);
+    EXPECT_TRUE(HasStatus(outcome, 1));
+    EXPECT_THAT(outcome.fErrorOutput, HasSubstr("is no namespace-provider plug-in"));
+}
+
+struct TUsageRow
+{
+    std::vector<std::string> fArguments;
+    int fStatus;
+    const char* fError;
+};
+
+const TUsageRow kUsages[] = {
+    {{}, 2, "subcommand"},
+    {{"frobnicate"}, 2, "subcommand"},
+    {{"instances"}, 2, "CLASS is required"},
+    {{"inventory", "--format", "xml"}, 2, "--format"},
+    {{"inventory", "--set", "novalue"}, 2, "key=value is expected, not \"novalue\""},
+    {{"inventory", "--config", "/nonexistent"}, 2, "/nonexistent"},
+    {{"instances", "Fake_None"}, 1, "there is no class Fake_None"},
+};
+
+TEST_F(Vrxhost, UsageErrorsHaveTheirOwnStatus)
+{
+    for (const TUsageRow& row : kUsages) {
+        const auto outcome = Run(row.fArguments);
+        EXPECT_TRUE(HasStatus(outcome, row.fStatus)) << row.fError;
+        EXPECT_EQ(outcome.fOutput, "");
+        EXPECT_THAT(outcome.fErrorOutput, HasSubstr(row.fError));
+    }
+    const auto help = Run({"--help"});
+    EXPECT_TRUE(HasStatus(help, 0));
+    EXPECT_THAT(help.fOutput, HasSubstr("Exit status: 0 complete"));
+}
+
+TEST_F(Vrxhost, SettingsFileAndLogFile)
+{
+    std::ofstream(fRoot / "vrx.conf") << "fault=prints\ncount=2\n";
+    const auto outcome = Start({VRXHOST, "--root", fRoot, "--plugin", FAKE_PLUGIN, "instances", "Fake_Many", "--log",
+                                fRoot / "other.log", "-v"});
+    EXPECT_TRUE(HasStatus(outcome, 0));
+    EXPECT_THAT(outcome.fOutput, HasSubstr("Fake_Many: 2 instances"));
+    EXPECT_THAT(outcome.fErrorOutput, HasSubstr("consumer quvex")) << "-v shows the log";
+    EXPECT_THAT(ReadFile(fRoot / "other.log"), HasSubstr("consumer quvex"));
+    EXPECT_FALSE(fs::exists(fRoot / "vrxhost.log"));
+    std::ofstream(fRoot / "vrx.conf") << "no equals sign";
+    const auto bad = Run({"providers"});
+    EXPECT_TRUE(HasStatus(bad, 1));
+    EXPECT_THAT(bad.fErrorOutput, HasSubstr("vrx.conf could not be read"));
+    const auto noLog = Run({"--config", "/dev/null", "--log", "/dev/null/x", "providers"});
+    EXPECT_TRUE(HasStatus(noLog, 0));
+    EXPECT_THAT(noLog.fErrorOutput, HasSubstr("the log file /dev/null/x could not be opened"));
+}
+
+TEST_F(Vrxhost, ConsumerIsPlannedBeforeTheNamespaceIsOpened)
+{
+    Install("cimconfig", "echo \"$*\" >> arguments; echo \"$PEGASUS_HOME\" >> arguments");
+    EXPECT_TRUE(HasStatus(Run({"providers", "--consumer", "me"}), 0));
+    EXPECT_EQ(ReadFile(fRoot / "arguments"), "-s consumer=me -p\n" + fRoot.string() + "/pegasus\n");
+    EXPECT_THAT(ReadFile(fRoot / "vrxhost.log"), HasSubstr("consumer me"));
+    Install("cimconfig", "echo 'no such property' >&2; exit 1");
+    const auto refused = Run({"providers", "--consumer", "me"});
+    EXPECT_TRUE(HasStatus(refused, 1));
+    EXPECT_EQ(refused.fErrorOutput,
+              "vrxhost: the consumer me could not be set, cimconfig: exit status 1: no such property\n\n");
+    EXPECT_TRUE(HasStatus(Run({"providers"}), 0)) << "without a name of its own a host takes what the server has";
+}
+
+TEST_F(Vrxhost, InterruptionEndsWaitingProgramsAndEnumerations)
+{
+    for (const char* fault : {"interrupt-program", "interrupt-enumeration", "program-at-shutdown"}) {
+        SCOPED_TRACE(fault);
+        fs::remove(fRoot / "cleared");
+        const auto outcome = Run({"inventory"}, fault);
+        EXPECT_TRUE(HasStatus(outcome, 130));
+        EXPECT_EQ(outcome.fOutput, "");
+        EXPECT_EQ(outcome.fErrorOutput, "vrxhost: interrupted\n");
+        EXPECT_TRUE(IsCleared());
+    }
+    EXPECT_TRUE(fs::exists(fRoot / "shut-down-program-ran"));
+}
+
+TEST_F(Vrxhost, SecondInterruptionEndsAtOnce)
+{
+    EXPECT_TRUE(HasStatus(Run({"inventory"}, "interrupt-twice"), 130));
+    EXPECT_FALSE(IsCleared());
+}
+
+TEST_F(Vrxhost, ReaderThatLeavesEarlyIsNoCrash)
+{
+    std::vector<std::string> command = {"/bin/bash", "-c", "\"$0\" \"$@\" | head -c 1; exit ${PIPESTATUS[0]}"};
+    const auto run = Command({"inventory", "--set", "count=5000"});
+    command.insert(command.end(), run.begin(), run.end());
+    const auto outcome = Start(command);
+    EXPECT_TRUE(HasStatus(outcome, 1));
+    EXPECT_EQ(outcome.fOutput, "P");
+    EXPECT_EQ(outcome.fErrorOutput, "");
+    EXPECT_TRUE(IsCleared());
+}
+
+} // namespace
