@@ -68,6 +68,17 @@ template <class Item> void addNew(const XmlElement& element, Array<Item>& items,
     items.append(item);
 }
 
+/// A string property whose qualifiers say so holds embedded objects, also where the attribute is missing.
+CIMType embeddedByQualifier(CIMType type, const Array<CIMQualifier>& qualifiers)
+{
+    if (type != CIMTYPE_STRING || qualifiers.size() == 0)
+        return type;
+    if (ObjectAccess::isTrue(qualifiers, "EmbeddedObject"))
+        return CIMTYPE_OBJECT;
+    const Uint32 index = ObjectAccess::find(qualifiers, "EmbeddedInstance");
+    return index != PEG_NOT_FOUND && qualifiers[index].getType() == CIMTYPE_STRING ? CIMTYPE_INSTANCE : type;
+}
+
 Uint32 countFrom(XmlElement child)
 {
     Uint32 count = 0;
@@ -239,10 +250,11 @@ CIMProperty ElementDecoder::decodeScalarProperty(const XmlElement& element)
     const CIMProperty property = ObjectAccess::wrap<CIMProperty>(new CIMPropertyRep());
     CIMPropertyRep& rep = ObjectAccess::rep(property);
     rep.fName = nameAttribute(element, "NAME", values[0]);
-    const CIMType type = embeddedType(element, typeAttribute(element, "TYPE", values[1]), values[4], values[5]);
+    const CIMType declared = embeddedType(element, typeAttribute(element, "TYPE", values[1]), values[4], values[5]);
     rep.fClassOrigin = optionalName(element, "CLASSORIGIN", values[2]);
     rep.fPropagated = boolAttribute(element, "PROPAGATED", values[3], false);
     XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
+    const CIMType type = embeddedByQualifier(declared, rep.fQualifiers);
     if (child.is("VALUE")) {
         rep.fValue = decodeValue(child, type);
         child = child.nextSibling();
@@ -260,11 +272,12 @@ CIMProperty ElementDecoder::decodeArrayProperty(const XmlElement& element)
     const CIMProperty property = ObjectAccess::wrap<CIMProperty>(new CIMPropertyRep());
     CIMPropertyRep& rep = ObjectAccess::rep(property);
     rep.fName = nameAttribute(element, "NAME", values[0]);
-    const CIMType type = embeddedType(element, typeAttribute(element, "TYPE", values[1]), values[4], values[5]);
+    const CIMType declared = embeddedType(element, typeAttribute(element, "TYPE", values[1]), values[4], values[5]);
     rep.fClassOrigin = optionalName(element, "CLASSORIGIN", values[2]);
     rep.fPropagated = boolAttribute(element, "PROPAGATED", values[3], false);
     rep.fArraySize = sizeAttribute(element, values[6]);
     XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
+    const CIMType type = embeddedByQualifier(declared, rep.fQualifiers);
     if (child.is("VALUE.ARRAY")) {
         rep.fValue = decodeValue(child, type);
         child = child.nextSibling();

@@ -234,6 +234,9 @@ CIMParamValue ElementDecoder::decodeParamValue(const XmlElement& element)
     element.attributes({"NAME", "PARAMTYPE", "EmbeddedObject", "EMBEDDEDOBJECT"}, values);
     const CIMName name = nameAttribute(element, "NAME", values[0]);
     const bool isTyped = values[1].data() != nullptr;
+    // A null without a type: the value is the untyped one that a default-constructed CIMValue is.
+    if (!isTyped && !element.firstChild())
+        return CIMParamValue(name.getString(), CIMValue(), false);
     const CIMType type = isTyped ? typeAttribute(element, "PARAMTYPE", values[1]) : CIMTYPE_STRING;
     const CIMValue value = decodeParameterContent(element, embeddedType(element, type, values[2], values[3]));
     return CIMParamValue(name.getString(), value, isTyped);
