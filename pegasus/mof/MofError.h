@@ -35,11 +35,22 @@ class MofError : public std::runtime_error
     std::string fCause;
 };
 
-/// A source file that could not be opened or read.
+/// A source file that could not be opened or, once open, not be read.
 class FileError : public std::runtime_error
 {
   public:
-    using std::runtime_error::runtime_error;
+    enum class Kind
+    {
+        NotOpened,
+        NotReadable ///< a directory, too large, a device that fails
+    };
+
+    FileError(Kind kind, const std::string& text) : std::runtime_error(text), fKind(kind) {}
+
+    Kind kind() const noexcept { return fKind; }
+
+  private:
+    Kind fKind;
 };
 
 } // namespace Pegasus::mof

@@ -48,13 +48,14 @@ std::string readAll(int descriptor, const std::string& path, std::size_t maxByte
     for (;;) {
         const ssize_t count = readSome(descriptor, buffer, sizeof buffer);
         if (count < 0)
-            throw FileError("Can't read file " + path + ": " + std::strerror(errno));
+            throw FileError(FileError::Kind::NotReadable, "Can't read file " + path + ": " + std::strerror(errno));
         if (count == 0)
             return text;
         text.append(buffer, static_cast<std::size_t>(count));
         if (text.size() > maxBytes)
-            throw FileError("Can't read file " + path + ": larger than the limit fileBytes (" +
-                            std::to_string(maxBytes) + ")");
+            throw FileError(FileError::Kind::NotReadable, "Can't read file " + path +
+                                                              ": larger than the limit fileBytes (" +
+                                                              std::to_string(maxBytes) + ")");
     }
 }
 
@@ -65,9 +66,9 @@ SourceText SourceText::read(const std::string& path, std::size_t maxBytes)
     const Descriptor file(path);
     struct stat status = {};
     if (file.get() < 0 || ::fstat(file.get(), &status) != 0)
-        throw FileError("Can't open file " + path);
+        throw FileError(FileError::Kind::NotOpened, "Can't open file " + path);
     if (S_ISDIR(status.st_mode))
-        throw FileError("Can't read file " + path + ": it is a directory");
+        throw FileError(FileError::Kind::NotReadable, "Can't read file " + path + ": it is a directory");
     return SourceText(path, readAll(file.get(), path, maxBytes));
 }
 

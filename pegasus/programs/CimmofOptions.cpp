@@ -13,8 +13,8 @@ const char* const kHelp =
     "  -w                         no warnings\n"
     "  -h, --help                 this text\n"
     "\n"
-    "Exit status: 0 done; 250 error in a file or from the server; 249 a file cannot be opened; 247 bad namespace;\n"
-    "246 no server; 254 bad command line; 255 after this text.\n";
+    "Exit status: 0 done; 250 error in a file or from the server; 249 a file cannot be opened; 2 nor read;\n"
+    "247 bad namespace; 246 no server; 254 bad command line; 255 after this text.\n";
 
 namespace {
 

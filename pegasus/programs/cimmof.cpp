@@ -15,6 +15,7 @@ namespace {
 enum Status
 {
     kDone = 0,
+    kUnreadableFile = 2,
     kNoServer = 246,
     kBadNamespace = 247,
     kNoFile = 249,
@@ -38,7 +39,7 @@ Status compileOne(const std::string& file, const mof::CompileOptions& options, m
         return kFailed;
     } catch (const mof::FileError& error) {
         std::cerr << error.what() << "\n";
-        return kNoFile;
+        return error.kind() == mof::FileError::Kind::NotOpened ? kNoFile : kUnreadableFile;
     } catch (const Exception& error) {
         std::cerr << file << ": error: " << utf8(error.getMessage()) << "\n";
         return kFailed;
