@@ -41,11 +41,14 @@ std::string NameOf(const ICIMProperty& property)
     return own ? own->GetName() : std::string();
 }
 
-// A reference value points into the plug-in's namespace, which ends before the document is shown.
+// A reference, a null one too, points weakly at objects of the plug-in, and even a weak pointer runs the code of the
+// library that made it, which is unloaded before the document goes.
 TCIMValue Detached(const TCIMValue& value)
 {
-    if (value.GetType() != TCIMValue::TCIMType::kReference || value.IsNull())
+    if (value.GetType() != TCIMValue::TCIMType::kReference)
         return value;
+    if (value.IsNull())
+        return TCIMValue(TCIMValue::TCIMType::kString, 0);
     if (!value.IsArray())
         return TCIMValue(value.ToString(10));
     std::vector<TCIMValue> paths;

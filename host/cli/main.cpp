@@ -1,13 +1,17 @@
 // vrxhost: a command-line host for a namespace-provider plug-in.
+#include <cerrno>
 #include <csignal>
 #include <cstring>
 #include <iostream>
 #include <system_error>
 
+#include <fcntl.h>
+#include <sys/file.h>
 #include <unistd.h>
 
 #include <core/TCoreLogger.h>
 #include <core/TProcessControl.h>
+#include <core/UniqueFd.h>
 #include <host/TConfig.h>
 #include <host/TRootObject.h>
 #include <host/TVRXException.h>
@@ -191,16 +195,30 @@ class Run
     int fWriteError = 0;
 };
 
+// Enters the root and keeps every other vrxhost out of it: two hosts would stop each other's server.
+// Returns: the lock, none when it failed and was told.
+NKOLVRX20::UniqueFd EnterRoot(const std::string& root)
+{
+    NKOLVRX20::UniqueFd directory(::open(root.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    if (!directory || ::fchdir(directory.Get()) != 0)
+        Say("the root directory " + root + " could not be entered: " + std::strerror(errno));
+    else if (::flock(directory.Get(), LOCK_EX | LOCK_NB) != 0)
+        Say(errno == EWOULDBLOCK ? "another vrxhost is at work in " + root
+                                 : "the root directory " + root + " could not be locked: " + std::strerror(errno));
+    else
+        return directory;
+    return NKOLVRX20::UniqueFd();
+}
+
 int Main(int argc, const char* const* argv)
 {
     TOptions options;
     const int status = ParseOptions(argc, argv, options);
     if (status >= 0)
         return status;
-    if (::chdir(options.fRoot.c_str()) != 0) {
-        Say("the root directory " + options.fRoot + " could not be entered: " + std::strerror(errno));
+    const NKOLVRX20::UniqueFd rootLock = EnterRoot(options.fRoot);
+    if (!rootLock)
         return kFailed;
-    }
     std::signal(SIGPIPE, SIG_IGN); // a reader that has gone is a write error here
     OpenLog(options);
     Run run(options);

@@ -79,6 +79,9 @@ boost::shared_ptr<TFakeClass> EveryTypeClass(const boost::shared_ptr<ICIMNamespa
     Put(*instance, "Empty", TCIMValue(TType(TType::kUint32Array), 0));
     Put(*instance, "Minimum", -9223372036854775807l - 1);
     Put(*instance, "Nothing", TCIMValue());
+    TCIMValue nullReference;
+    nullReference.SetReferencedClass(each);
+    Put(*instance, "NullReference", nullReference);
     Put(*instance, "Real32", 0.1f);
     Put(*instance, "Real64", 1e300);
     Put(*instance, "Reference", ReferenceTo("root/cimv2:A.k=\"1\"", ns));

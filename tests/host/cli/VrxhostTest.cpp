@@ -3,6 +3,8 @@
 #include <fstream>
 #include <sstream>
 
+#include <fcntl.h>
+#include <sys/file.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -11,6 +13,7 @@
 #include <nlohmann/json.hpp>
 
 #include <core/TChildProcess.h>
+#include <core/UniqueFd.h>
 
 namespace {
 
@@ -135,6 +138,7 @@ TEST_F(Vrxhost, InstancesAsJsonWithTrueTypes)
           "b�"
         ],
         "Nothing": null,
+        "NullReference": null,
         "Real32": 0.1,
         "Real64": 1e+300,
         "Reference": "root/cimv2:A.k=\"1\"",
@@ -334,6 +338,18 @@ TEST_F(Vrxhost, SecondInterruptionEndsAtOnce)
 {
     EXPECT_TRUE(HasStatus(Run({"inventory"}, "interrupt-twice"), 130));
     EXPECT_FALSE(IsCleared());
+}
+
+// Two at once would stop each other's server.
+TEST_F(Vrxhost, SecondHostInOneRootIsRefused)
+{
+    std::ofstream(fRoot / "vrxhost.log") << "of the first";
+    const NKOLVRX20::UniqueFd root(::open(fRoot.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    ASSERT_EQ(::flock(root.Get(), LOCK_EX | LOCK_NB), 0);
+    const auto outcome = Run({"inventory"});
+    EXPECT_TRUE(HasStatus(outcome, 1));
+    EXPECT_EQ(outcome.fErrorOutput, "vrxhost: another vrxhost is at work in " + fRoot.string() + "\n");
+    EXPECT_EQ(ReadFile(fRoot / "vrxhost.log"), "of the first");
 }
 
 TEST_F(Vrxhost, ReaderThatLeavesEarlyIsNoCrash)
