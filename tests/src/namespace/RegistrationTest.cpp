@@ -98,9 +98,11 @@ TEST_F(RegistrationTest, CompilesDefinitionsBeforeRegistrationsThenCollectsAndCo
     const auto mirrored = [](const std::string& name) {
         return "3|TPEGASUSNamespace::GetClass " + name + " Now it is Found in TPEGASUSNamespace";
     };
+    const std::string reported = "0|Performance Data RDD Parser line 1:Unrecognized identifier";
     EXPECT_THAT(fRig.fLog.Lines(),
                 ElementsAre("3|TPEGASUSNamespace::Prefilter: 1 providers.",
-                            "3|TPEGASUSNamespace::Postfilter: 1 providers.", "3|Loading... " + path,
+                            "3|TPEGASUSNamespace::Postfilter: 1 providers.", "3|Loading... " + path, reported + ":vrx",
+                            reported, reported, reported,
                             "3|TPEGASUSNamespace::parseClasses collected for Class info = ACME_One[300] , ACME_Two , \n"
                             "NSP = root/acme\nDefault timeout = 30\nModule name = acme",
                             "3|TPEGASUSNamespace created Provider " + path + "\n", "3|before reg...",
@@ -269,7 +271,7 @@ TEST_F(ThreadedRegistrationTest, AThreadThatThrowsCostsOneLineAndTheSequenceGoes
     };
     ns->FindProviders();
     fRig.fWorld.fRun = nullptr;
-    EXPECT_THAT(fRig.fLog.LinesWith("0|"),
+    EXPECT_THAT(fRig.fLog.LinesWith("0|TPEGASUS"),
                 UnorderedElementsAre("0|TPEGASUSNamespace::regProvider failed for provider " + PathOf("beta") + ": " +
                                          TVRXException(12).what(),
                                      "0|TPEGASUSNamespace::regProvider failed for provider " + PathOf("gamma") +

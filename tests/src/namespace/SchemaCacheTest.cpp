@@ -121,7 +121,7 @@ TEST_F(SchemaCacheTest, AsksForAllPropertiesWithQualifiers)
     fServer.AnswerClass("A", "");
     fNamespace->GetClass("A", {{"nsp", "root/acme"}});
     const std::string body = fServer.LastBody("GetClass A");
-    EXPECT_NE(std::string::npos, body.find("<IPARAMVALUE NAME=\"LocalOnly\"><VALUE>FALSE</VALUE>")) << body;
+    EXPECT_NE(std::string::npos, body.find("<IPARAMVALUE NAME=\"LocalOnly\">\n<VALUE>FALSE</VALUE>")) << body;
     EXPECT_EQ(std::string::npos, body.find("IncludeQualifiers")) << "true is the default: " << body;
     EXPECT_EQ(std::string::npos, body.find("PropertyList")) << body;
     EXPECT_NE(std::string::npos, body.find("<NAMESPACE NAME=\"acme\"/>")) << body;

@@ -76,17 +76,11 @@ std::size_t MessageBytes(const std::string& received, std::size_t& headBytes)
 
 } // namespace
 
-TFakeCimServer::TFakeCimServer() : fListener(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0))
+TFakeCimServer::TFakeCimServer()
 {
-    sockaddr_in address = {};
-    address.sin_family = AF_INET;
-    address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
-    socklen_t length = sizeof address;
-    if (::bind(fListener, reinterpret_cast<sockaddr*>(&address), length) != 0 ||
-        ::getsockname(fListener, reinterpret_cast<sockaddr*>(&address), &length) != 0 ||
-        ::pipe2(fWakeUp, O_CLOEXEC) != 0)
-        throw std::runtime_error("no port for the server of the tests");
-    fPort = ntohs(address.sin_port);
+    BindListener();
+    if (::pipe2(fWakeUp, O_CLOEXEC) != 0)
+        throw std::runtime_error("no pipe for the server of the tests");
     fThread = std::thread([this] { Serve(); });
 }
 
@@ -100,17 +94,55 @@ TFakeCimServer::~TFakeCimServer()
     ::close(fListener);
 }
 
+// Takes a free port, or the old one again, without listening.
+void TFakeCimServer::BindListener()
+{
+    fListener = ::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0);
+    const int reuse = 1;
+    ::setsockopt(fListener, SOL_SOCKET, SO_REUSEADDR, &reuse, sizeof reuse);
+    sockaddr_in address = {};
+    address.sin_family = AF_INET;
+    address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
+    address.sin_port = htons(fPort);
+    socklen_t length = sizeof address;
+    if (::bind(fListener, reinterpret_cast<sockaddr*>(&address), length) != 0 ||
+        ::getsockname(fListener, reinterpret_cast<sockaddr*>(&address), &length) != 0)
+        throw std::runtime_error("no port for the server of the tests");
+    fPort = ntohs(address.sin_port);
+}
+
 void TFakeCimServer::Listen()
 {
-    fIsListening = true;
-    if (::listen(fListener, 16) != 0 || ::write(fWakeUp[1], "x", 1) != 1)
-        throw std::runtime_error("the server of the tests cannot listen");
+    Wish('L');
 }
 
 void TFakeCimServer::Refuse()
 {
-    fIsListening = false;
-    ::shutdown(fListener, SHUT_RDWR);
+    Wish('R');
+}
+
+// Has the thread do it, and waits until it is done.
+void TFakeCimServer::Wish(char wish)
+{
+    std::unique_lock<std::mutex> lock(fMutex);
+    ++fWishes;
+    if (::write(fWakeUp[1], &wish, 1) != 1)
+        throw std::runtime_error("the thread of the tests' server is gone");
+    fChanged.wait(lock, [this] { return fWishes == 0; });
+}
+
+void TFakeCimServer::Grant(char wish)
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    if (wish == 'L') {
+        fIsListening = ::listen(fListener, 16) == 0;
+    } else if (fIsListening) {
+        ::close(fListener); // one that was shut down never listens again
+        BindListener();
+        fIsListening = false;
+    }
+    --fWishes;
+    fChanged.notify_all();
 }
 
 void TFakeCimServer::Answer(const std::string& request, const std::string& returnValue)
@@ -140,14 +172,14 @@ void TFakeCimServer::KeepSilentOn(const std::string& request)
 void TFakeCimServer::WaitUntilIdle() const
 {
     std::unique_lock<std::mutex> lock(fMutex);
-    fConnectionsChanged.wait_for(lock, std::chrono::seconds(5), [this] { return fConnectionCount == 0; });
+    fChanged.wait_for(lock, std::chrono::seconds(5), [this] { return fConnectionCount == 0; });
 }
 
 void TFakeCimServer::CountConnections()
 {
     const std::lock_guard<std::mutex> lock(fMutex);
     fConnectionCount = static_cast<int>(fConnections.size());
-    fConnectionsChanged.notify_all();
+    fChanged.notify_all();
 }
 
 void TFakeCimServer::ForgetRequests()
@@ -188,9 +220,13 @@ void TFakeCimServer::Serve()
             watched.push_back({connection.fDescriptor, POLLIN, 0});
         if (::poll(watched.data(), watched.size(), -1) < 0)
             continue;
-        char ignored = 0;
-        if (watched[0].revents != 0 && ::read(fWakeUp[0], &ignored, 1) != 1)
-            return; // the other end is closed
+        if (watched[0].revents != 0) {
+            char wish = 0;
+            if (::read(fWakeUp[0], &wish, 1) != 1)
+                return; // the other end is closed
+            Grant(wish);
+            continue; // the listener may be another now
+        }
         for (std::size_t i = watched.size(); i-- > 2;) {
             if (watched[i].revents == 0 || Receive(fConnections[i - 2]))
                 continue;

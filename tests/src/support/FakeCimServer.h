@@ -1,7 +1,6 @@
 #ifndef TESTS_SRC_SUPPORT_FAKECIMSERVER_H
 #define TESTS_SRC_SUPPORT_FAKECIMSERVER_H
 
-#include <atomic>
 #include <condition_variable>
 #include <map>
 #include <mutex>
@@ -65,6 +64,9 @@ class TFakeCimServer
         std::string fReceived;
     };
 
+    void BindListener();
+    void Wish(char wish);
+    void Grant(char wish);
     void Serve();
     void CountConnections();
     void Accept();
@@ -72,7 +74,8 @@ class TFakeCimServer
     bool Respond(int descriptor, const std::string& body);
 
     int fListener = -1;
-    std::atomic<bool> fIsListening{false};
+    bool fIsListening = false; // the thread's own
+    int fWishes = 0;
     int fWakeUp[2] = {-1, -1};
     unsigned short fPort = 0;
     mutable std::mutex fMutex;
@@ -80,7 +83,7 @@ class TFakeCimServer
     std::vector<std::pair<std::string, std::string>> fRequests; // name and body
     std::vector<TConnection> fConnections;                      // the thread's own
     int fConnectionCount = 0;
-    mutable std::condition_variable fConnectionsChanged;
+    mutable std::condition_variable fChanged;
     std::thread fThread;
 };
 
