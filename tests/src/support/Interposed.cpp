@@ -42,6 +42,14 @@ std::FILE* OpenFile(const char* function, const char* path, const char* mode)
     return next(redirected->second.c_str(), mode);
 }
 
+// Returns: whether the socket is one of the tests' own; the plug-in's probe sets no options.
+bool IsReusingAddresses(int descriptor)
+{
+    int reuse = 0;
+    socklen_t length = sizeof reuse;
+    return ::getsockopt(descriptor, SOL_SOCKET, SO_REUSEADDR, &reuse, &length) == 0 && reuse != 0;
+}
+
 } // namespace
 
 extern "C" {
@@ -88,7 +96,7 @@ int socket(int domain, int type, int protocol) noexcept
 int bind(int descriptor, const sockaddr* address, socklen_t length) noexcept
 {
     TOutsideWorld* world = TOutsideWorld::Current();
-    if (world && world->fIsPortFree && address->sa_family == AF_INET) {
+    if (world && world->fIsPortFree && address->sa_family == AF_INET && !IsReusingAddresses(descriptor)) {
         const unsigned short port = ntohs(reinterpret_cast<const sockaddr_in*>(address)->sin_port);
         if (port != 0 && !world->fIsPortFree(port)) {
             errno = EADDRINUSE;
