@@ -243,7 +243,7 @@ bool ScriptedPeer::play(int socket, const PeerAnswer& answer)
         waitFor(socket, POLLIN);
         return false;
     }
-    std::string_view rest = answer.bytes;
+    std::string_view rest = answer.prepared ? *answer.prepared : answer.bytes;
     while (!rest.empty()) {
         const std::size_t piece = answer.pieceBytes ? std::min(answer.pieceBytes, rest.size()) : rest.size();
         const ssize_t count = ::send(socket, rest.data(), piece, MSG_NOSIGNAL);

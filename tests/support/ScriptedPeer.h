@@ -33,8 +33,9 @@ struct PeerRequest
 /// What the peer does with a request.
 struct PeerAnswer
 {
-    std::string bytes;          ///< sent as they are, header and all
-    std::size_t pieceBytes = 0; ///< at most so many bytes in one send; 0: all at once
+    std::string bytes;                     ///< sent as they are, header and all
+    const std::string* prepared = nullptr; ///< sent instead, without a copy; must outlive the peer
+    std::size_t pieceBytes = 0;            ///< at most so many bytes in one send; 0: all at once
     std::chrono::milliseconds pauseBetweenPieces{0};
     bool closesAfterwards = false;
     bool neverAnswers = false; ///< keeps the connection open and silent
