@@ -1,0 +1,283 @@
+// Vendor code behind the server: what it delivers, and what becomes of everybody else when it fails.
+#include "pegasus/server/HttpExchange.h"
+#include "pegasus/server/ServerTree.h"
+
+#include <Pegasus/Client/CIMClient.h>
+
+#include <gtest/gtest.h>
+
+#include <signal.h>
+
+#include <cstdio>
+#include <fstream>
+#include <memory>
+
+namespace servertest {
+namespace {
+
+using namespace Pegasus;
+
+const CIMNamespaceName kNamespace("root/probe");
+
+class AgentTest : public testing::Test
+{
+  protected:
+    void start(const std::vector<std::string>& properties = {})
+    {
+        fTree.start(properties);
+        fTree.installProbe();
+        connect(fClient);
+    }
+
+    void connect(CIMClient& client) const { client.connect("127.0.0.1", fTree.port(), String(), String()); }
+
+    static Uint32 call(CIMClient& client, const char* className, const char* method,
+                       const Array<CIMParamValue>& in = Array<CIMParamValue>())
+    {
+        Array<CIMParamValue> out;
+        Uint32 number = 0;
+        client.invokeMethod(kNamespace, CIMObjectPath(className), method, in, out).get(number);
+        return number;
+    }
+
+    // Returns: the error's text.
+    template <typename Action> static std::string errorOf(const Action& action)
+    {
+        try {
+            action();
+        } catch (const Exception& error) {
+            return std::string(error.getMessage().getCString());
+        }
+        return "no error";
+    }
+
+    Uint32 countOf(const char* className, Boolean deep = true)
+    {
+        return fClient.enumerateInstances(kNamespace, className, deep).size();
+    }
+
+    void setCount(Uint32 count)
+    {
+        Array<CIMParamValue> in;
+        in.append(CIMParamValue("Count", CIMValue(count)));
+        EXPECT_EQ(call(fClient, "Probe_Bulk", "SetCount", in), count);
+    }
+
+    ServerTree fTree;
+    CIMClient fClient;
+};
+
+TEST_F(AgentTest, aLargeAnswerIsPassedOnWhole)
+{
+    start();
+    setCount(20'000); // many times the size of any buffer on the way
+    const Array<CIMInstance> bulk = fClient.enumerateInstances(kNamespace, "Probe_Bulk");
+    ASSERT_EQ(bulk.size(), 20'000u);
+    for (Uint32 i = 0; i < bulk.size(); i += 1999) {
+        char path[64];
+        std::snprintf(path, sizeof path, "Probe_Bulk.Id=\"bulk-%07u\"", i);
+        EXPECT_EQ(bulk[i].getPath().toString(), String(path));
+        EXPECT_EQ(bulk[i].getPropertyCount(), 17u);
+    }
+    // A client that takes no trailers gets the same, with its length in front.
+    const std::string request =
+        intrinsicRequest("EnumerateInstances", "root/probe", classNameParameter("Probe_Bulk"), "");
+    const HttpAnswer whole = exchange(fTree.port(), request);
+    EXPECT_TRUE(whole.isComplete);
+    EXPECT_GT(whole.body.size(), 20'000'000u);
+    EXPECT_EQ(fTree.run("cimconfig", {"-s", "maxBufferedAnswerBytes=100000"}).exitStatus, 0);
+    EXPECT_NE(exchange(fTree.port(), request).body.find("<ERROR CODE=\"27\""), std::string::npos);
+}
+
+TEST_F(AgentTest, aFamilyComesFromProvidersAndTheRepositoryTogether)
+{
+    start();
+    setCount(2);
+    const Array<CIMInstance> deep = fClient.enumerateInstances(kNamespace, "Probe_Family", true);
+    ASSERT_EQ(deep.size(), 1003u) << "two, a thousand of the other module, one stored";
+    const Array<CIMInstance> shallow = fClient.enumerateInstances(kNamespace, "Probe_Family", false);
+    ASSERT_EQ(shallow.size(), 1003u);
+    for (Uint32 i = 0; i < shallow.size(); ++i) {
+        EXPECT_EQ(shallow[i].getPropertyCount(), 3u) << "cut down to the named class";
+        EXPECT_NE(shallow[i].getClassName(), CIMName("Probe_Family"));
+    }
+    EXPECT_EQ(deep[0].getPropertyCount(), 4u);
+    EXPECT_EQ(fClient.enumerateInstanceNames(kNamespace, "Probe_Family").size(), 1003u);
+}
+
+TEST_F(AgentTest, enumeratesNamesGetsAndInvokes)
+{
+    start();
+    setCount(3);
+    EXPECT_EQ(fClient.enumerateInstanceNames(kNamespace, "Probe_Other").size(), 1000u) << "its agent has its own count";
+    CIMObjectPath path("Probe_Bulk.Id=\"bulk-0000002\"");
+    const CIMInstance instance = fClient.getInstance(kNamespace, path, false);
+    EXPECT_EQ(instance.getPropertyCount(), 17u);
+    path = CIMObjectPath("Probe_Bulk.Id=\"bulk-0000003\"");
+    EXPECT_EQ(errorOf([&] { fClient.getInstance(kNamespace, path, false); }), "CIM_ERR_NOT_FOUND: no such probe");
+
+    Array<CIMParamValue> in;
+    Array<CIMParamValue> out;
+    in.append(CIMParamValue("Text", CIMValue(String("<caf\xc3\xa9> "))));
+    fClient.invokeMethod(kNamespace, CIMObjectPath("Probe_Bulk"), "Echo", in, out);
+    ASSERT_EQ(out.size(), 1u);
+    EXPECT_EQ(out[0].getValue().toString(), String("<caf\xc3\xa9> "));
+    EXPECT_EQ(errorOf([&] { call(fClient, "Probe_Bulk", "Nope"); }), "CIM_ERR_METHOD_NOT_AVAILABLE: Nope");
+    EXPECT_EQ(errorOf([&] { call(fClient, "Probe_Stored", "Nope"); }), "CIM_ERR_METHOD_NOT_AVAILABLE: Nope");
+    EXPECT_EQ(errorOf([&] { call(fClient, "Nope", "Nope"); }), "CIM_ERR_NOT_FOUND: Nope");
+    EXPECT_EQ(errorOf([&] { countOf("Nope"); }), "CIM_ERR_INVALID_CLASS: Nope");
+}
+
+TEST_F(AgentTest, aPropertyListReachesTheProvider)
+{
+    start();
+    Array<CIMName> wanted;
+    wanted.append("N3");
+    const Array<CIMInstance> listed =
+        fClient.enumerateInstances(kNamespace, "Probe_Other", true, true, false, false, CIMPropertyList(wanted));
+    ASSERT_EQ(listed.size(), 1000u);
+    EXPECT_EQ(listed[0].getPropertyCount(), 1u);
+}
+
+TEST_F(AgentTest, anUpcallIsServedWhileTheRequestWaits)
+{
+    start();
+    setCount(5);
+    EXPECT_EQ(call(fClient, "Probe_Bulk", "CountByUpcall"), 5u) << "into the agent that makes the call";
+    EXPECT_EQ(call(fClient, "Probe_Other", "CountByUpcall"), 5u);
+}
+
+TEST_F(AgentTest, anErrorLeavesNothingDelivered)
+{
+    start();
+    EXPECT_EQ(errorOf([&] { countOf("Probe_FailAfter"); }), "CIM_ERR_ACCESS_DENIED: the probe says no: \xc3\xa9");
+    EXPECT_EQ(errorOf([&] { countOf("Probe_NoLibrary"); }),
+              "CIM_ERR_FAILED: File \"libNoSuchLibrary.so\" was not found for provider module \"NoLibModule\".");
+    const HttpAnswer answer = exchange(
+        fTree.port(), intrinsicRequest("EnumerateInstances", "root/probe", classNameParameter("Probe_FailAfter")));
+    EXPECT_EQ(answer.body.find("IRETURNVALUE"), std::string::npos);
+    EXPECT_EQ(answer.trailers.at("cimstatuscodedescription"),
+              "CIM_ERR_ACCESS_DENIED%3A%20the%20probe%20says%20no%3A%20%C3%A9");
+}
+
+TEST_F(AgentTest, aDeathIsReportedWithModuleAndCauseAndTheOthersGoOn)
+{
+    start();
+    const std::pair<const char*, std::string> rows[] = {
+        {"Crash",
+         "CIM_ERR_FAILED: Lost connection with cimprovagt \"ProbeModule\". killed by signal 11 (Segmentation fault)"},
+        {"Exit", "CIM_ERR_FAILED: Lost connection with cimprovagt \"ProbeModule\". exit status 3"},
+    };
+    const Uint32 other = call(fClient, "Probe_Other", "ProcessId");
+    for (const auto& [method, text] : rows) {
+        SCOPED_TRACE(method);
+        EXPECT_EQ(errorOf([&, name = method] { call(fClient, "Probe_Bulk", name); }), text);
+        EXPECT_GT(call(fClient, "Probe_Bulk", "ProcessId"), 0u) << "a new agent serves the next request";
+        EXPECT_EQ(call(fClient, "Probe_Other", "ProcessId"), other);
+    }
+}
+
+TEST_F(AgentTest, aModuleThatKeepsDyingIsLeftAloneForAWhile)
+{
+    start();
+    for (int i = 0; i < 3; ++i)
+        EXPECT_NE(errorOf([&] { call(fClient, "Probe_Bulk", "Crash"); }).find("Lost connection"), std::string::npos);
+    EXPECT_NE(errorOf([&] { call(fClient, "Probe_Bulk", "Crash"); }).find("it is not started again yet"),
+              std::string::npos);
+    EXPECT_TRUE(eventually([&] { return errorOf([&] { call(fClient, "Probe_Bulk", "ProcessId"); }) == "no error"; }));
+}
+
+TEST_F(AgentTest, aHangIsEnded)
+{
+    start({"providerTimeout=1"});
+    const Uint32 agent = call(fClient, "Probe_Bulk", "ProcessId");
+    EXPECT_EQ(errorOf([&] {
+                  call(fClient, "Probe_Bulk", "Hang");
+              }).rfind("CIM_ERR_FAILED: Lost connection with cimprovagt \"ProbeModule\".", 0),
+              0u);
+    EXPECT_FALSE(isRunning(static_cast<int>(agent)));
+    EXPECT_NE(call(fClient, "Probe_Bulk", "ProcessId"), agent);
+}
+
+TEST_F(AgentTest, killedInTheMiddleOfAnEnumeration)
+{
+    start();
+    const int agent = static_cast<int>(call(fClient, "Probe_Bulk", "ProcessId"));
+    RawConnection endless(fTree.port());
+    endless.send(intrinsicRequest("EnumerateInstances", "root/probe", classNameParameter("Probe_Endless")));
+    const HttpAnswer begun = endless.receive(std::chrono::milliseconds(200));
+    EXPECT_GT(begun.body.size(), 1u << 20);
+    EXPECT_FALSE(begun.isComplete);
+    ASSERT_EQ(::kill(agent, SIGKILL), 0);
+    EXPECT_FALSE(endless.isClosed(std::chrono::milliseconds(200))) << "the answer is ended properly";
+    EXPECT_EQ(countOf("Probe_Other"), 1000u);
+    EXPECT_EQ(fClient.enumerateInstances(kNamespace, "Probe_Stored").size(), 1u);
+    EXPECT_TRUE(eventually([&] { return !isRunning(agent); }));
+}
+
+TEST_F(AgentTest, aClientThatLeavesEndsItsEnumeration)
+{
+    start();
+    const int agent = static_cast<int>(call(fClient, "Probe_Bulk", "ProcessId"));
+    {
+        RawConnection endless(fTree.port());
+        endless.send(intrinsicRequest("EnumerateInstances", "root/probe", classNameParameter("Probe_Endless")));
+        endless.receive(std::chrono::milliseconds(50));
+    }
+    // The agent's processor time stands still once the provider has been refused further instances.
+    auto busy = [&, last = std::string()]() mutable {
+        std::ifstream file("/proc/" + std::to_string(agent) + "/schedstat");
+        std::string now;
+        std::getline(file, now);
+        const bool changed = now != last;
+        last = now;
+        return changed;
+    };
+    EXPECT_TRUE(eventually([&] { return !busy(); }));
+    EXPECT_EQ(static_cast<int>(call(fClient, "Probe_Bulk", "ProcessId")), agent);
+}
+
+TEST_F(AgentTest, idleAgentsEndAndStartAgain)
+{
+    start({"agentIdleTimeout=1"});
+    const int agent = static_cast<int>(call(fClient, "Probe_Bulk", "ProcessId"));
+    EXPECT_TRUE(eventually([&] { return !isRunning(agent); }));
+    EXPECT_NE(static_cast<int>(call(fClient, "Probe_Bulk", "ProcessId")), agent);
+}
+
+TEST_F(AgentTest, noAgentOutlivesAnOrderlyEnd)
+{
+    start();
+    const int agent = static_cast<int>(call(fClient, "Probe_Bulk", "ProcessId"));
+    const int server = fTree.serverProcess();
+    EXPECT_EQ(fTree.run("cimserver", {"-s"}).out, "CIM Server stopped.\n");
+    EXPECT_FALSE(isRunning(server));
+    EXPECT_FALSE(isRunning(agent));
+}
+
+TEST_F(AgentTest, agentsEndWhenTheServerIsKilled)
+{
+    start();
+    const int idle = static_cast<int>(call(fClient, "Probe_Bulk", "ProcessId"));
+    const int busy = static_cast<int>(call(fClient, "Probe_Other", "ProcessId"));
+    RawConnection connection(fTree.port());
+    connection.send(intrinsicRequest("EnumerateInstances", "root/probe", classNameParameter("Probe_Endless")));
+    connection.receive(std::chrono::milliseconds(50));
+    ASSERT_EQ(::kill(fTree.serverProcess(), SIGKILL), 0);
+    EXPECT_TRUE(eventually([&] { return !isRunning(idle) && !isRunning(busy); }));
+}
+
+TEST_F(AgentTest, agentsAreNotCalledCimserverAndLeaveNoZombie)
+{
+    start();
+    const int agent = static_cast<int>(call(fClient, "Probe_Bulk", "ProcessId"));
+    std::ifstream name("/proc/" + std::to_string(agent) + "/comm");
+    std::string text;
+    std::getline(name, text);
+    EXPECT_EQ(text, "cimprovagt");
+    ASSERT_EQ(::kill(agent, SIGKILL), 0);
+    EXPECT_TRUE(eventually([&] { return childrenOf(fTree.serverProcess()).empty(); }));
+}
+
+} // namespace
+} // namespace servertest

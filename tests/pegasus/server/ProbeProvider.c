@@ -1,0 +1,242 @@
+/* A provider that does what a test asks for: many instances, instances without end, errors, crashes.
+ * Probe_Bulk delivers as many instances as SetCount said (1000 at first); Probe_Endless delivers for ever;
+ * Probe_FailAfter delivers one instance, then fails. */
+#include <cmpi/cmpi.h>
+
+#include <signal.h>
+#include <stdio.h>
+#include <stdlib.h>
+#include <string.h>
+#include <strings.h>
+#include <unistd.h>
+
+static const CMPIBroker* gBroker;
+static CMPIUint32 gCount = 1000;
+
+static const CMPIStatus kOk = {CMPI_RC_OK, NULL};
+
+static CMPIStatus failure(CMPIrc code, const char* text)
+{
+    CMPIStatus status = {code, gBroker->eft->newString(gBroker, text, NULL)};
+    return status;
+}
+
+static const char* textOf(const CMPIString* string)
+{
+    return string == NULL ? "" : (const char*)string->hdl;
+}
+
+static void setText(CMPIInstance* instance, const char* name, const char* text)
+{
+    instance->ft->setProperty(instance, name, (const CMPIValue*)text, CMPI_chars);
+}
+
+static void setNumbers(CMPIInstance* instance, CMPIUint32 number)
+{
+    static const char* const kNames[] = {"N1", "N2", "N3", "N4", "N5", "N6"};
+    CMPIValue value;
+    for (size_t i = 0; i < sizeof kNames / sizeof kNames[0]; ++i) {
+        value.uint64 = number * 1000003ull + i;
+        instance->ft->setProperty(instance, kNames[i], &value, CMPI_uint64);
+    }
+    value.boolean = (CMPIBoolean)(number % 2);
+    instance->ft->setProperty(instance, "Flag", &value, CMPI_boolean);
+}
+
+static CMPIObjectPath* makePath(const CMPIObjectPath* of, CMPIUint32 number)
+{
+    char id[32];
+    snprintf(id, sizeof id, "bulk-%07u", (unsigned)number);
+    CMPIObjectPath* path = gBroker->eft->newObjectPath(gBroker, textOf(of->ft->getNameSpace(of, NULL)),
+                                                       textOf(of->ft->getClassName(of, NULL)), NULL);
+    path->ft->addKey(path, "Id", (const CMPIValue*)id, CMPI_chars);
+    return path;
+}
+
+static CMPIStatus deliver(const CMPIResult* result, const CMPIObjectPath* of, CMPIUint32 number)
+{
+    static const char* const kTexts[] = {"T1", "T2", "T3", "T4", "T5", "T6", "T7", "T8", "T9"};
+    char id[32];
+    CMPIObjectPath* path = makePath(of, number);
+    CMPIStatus status = kOk;
+    CMPIInstance* instance = gBroker->eft->newInstance(gBroker, path, &status);
+    if (instance == NULL)
+        return status;
+    snprintf(id, sizeof id, "bulk-%07u", (unsigned)number);
+    setText(instance, "Id", id);
+    for (size_t i = 0; i < sizeof kTexts / sizeof kTexts[0]; ++i)
+        setText(instance, kTexts[i], "A text of about sixty characters, as inventories are full of <them>.");
+    setNumbers(instance, number);
+    status = result->ft->returnInstance(result, instance);
+    instance->ft->release(instance);
+    path->ft->release(path);
+    return status;
+}
+
+static CMPIStatus enumerateInstances(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
+                                     const CMPIObjectPath* path, const char** properties)
+{
+    const char* name = textOf(path->ft->getClassName(path, NULL));
+    CMPIStatus status = kOk;
+    (void)mi, (void)context, (void)properties;
+    if (strcasecmp(name, "Probe_FailAfter") == 0) {
+        deliver(result, path, 0);
+        return failure(CMPI_RC_ERR_ACCESS_DENIED, "the probe says no: \xc3\xa9");
+    }
+    const int endless = strcasecmp(name, "Probe_Endless") == 0;
+    for (CMPIUint32 i = 0; status.rc == CMPI_RC_OK && (endless || i < gCount); ++i)
+        status = deliver(result, path, i);
+    return status.rc == CMPI_RC_OK ? result->ft->returnDone(result) : status;
+}
+
+static CMPIStatus enumerateInstanceNames(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
+                                         const CMPIObjectPath* path)
+{
+    (void)mi, (void)context;
+    for (CMPIUint32 i = 0; i < gCount; ++i) {
+        CMPIObjectPath* name = makePath(path, i);
+        result->ft->returnObjectPath(result, name);
+        name->ft->release(name);
+    }
+    return result->ft->returnDone(result);
+}
+
+static CMPIStatus getInstance(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
+                              const CMPIObjectPath* path, const char** properties)
+{
+    unsigned number = 0;
+    (void)mi, (void)context, (void)properties;
+    const CMPIData id = path->ft->getKey(path, "Id", NULL);
+    if (id.type != CMPI_string || sscanf(textOf(id.value.string), "bulk-%u", &number) != 1 || number >= gCount)
+        return failure(CMPI_RC_ERR_NOT_FOUND, "no such probe");
+    CMPIStatus status = deliver(result, path, number);
+    return status.rc == CMPI_RC_OK ? result->ft->returnDone(result) : status;
+}
+
+static CMPIStatus createInstance(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
+                                 const CMPIObjectPath* path, const CMPIInstance* instance)
+{
+    (void)mi, (void)context, (void)result, (void)path, (void)instance;
+    return failure(CMPI_RC_ERR_NOT_SUPPORTED, "");
+}
+
+static CMPIStatus modifyInstance(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
+                                 const CMPIObjectPath* path, const CMPIInstance* instance, const char** properties)
+{
+    (void)properties;
+    return createInstance(mi, context, result, path, instance);
+}
+
+static CMPIStatus deleteInstance(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
+                                 const CMPIObjectPath* path)
+{
+    return createInstance(mi, context, result, path, NULL);
+}
+
+static CMPIStatus execQuery(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
+                            const CMPIObjectPath* path, const char* language, const char* query)
+{
+    (void)language, (void)query;
+    return createInstance(mi, context, result, path, NULL);
+}
+
+static CMPIStatus cleanupInstances(CMPIInstanceMI* mi, const CMPIContext* context, CMPIBoolean terminating)
+{
+    (void)mi, (void)context, (void)terminating;
+    return kOk;
+}
+
+static CMPIStatus returnNumber(const CMPIResult* result, CMPIUint32 number)
+{
+    CMPIValue value;
+    value.uint32 = number;
+    result->ft->returnData(result, &value, CMPI_uint32);
+    return result->ft->returnDone(result);
+}
+
+static CMPIStatus echo(const CMPIResult* result, const CMPIArgs* in, CMPIArgs* out)
+{
+    const CMPIData text = in->ft->getArg(in, "Text", NULL);
+    if (text.type == CMPI_string && (text.state & CMPI_nullValue) == 0)
+        out->ft->addArg(out, "Back", &text.value, CMPI_string);
+    return returnNumber(result, 0);
+}
+
+static CMPIStatus setCount(const CMPIResult* result, const CMPIArgs* in)
+{
+    const CMPIData count = in->ft->getArg(in, "Count", NULL);
+    if (count.type != CMPI_uint32)
+        return failure(CMPI_RC_ERR_INVALID_PARAMETER, "Count");
+    gCount = count.value.uint32;
+    return returnNumber(result, gCount);
+}
+
+/* Calls back into the server: how many instances of Probe_Bulk does it say there are? */
+static CMPIStatus countByUpcall(const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path)
+{
+    CMPIStatus status = kOk;
+    CMPIUint32 count = 0;
+    CMPIObjectPath* bulk =
+        gBroker->eft->newObjectPath(gBroker, textOf(path->ft->getNameSpace(path, NULL)), "Probe_Bulk", NULL);
+    CMPIEnumeration* names = gBroker->bft->enumerateInstanceNames(gBroker, context, bulk, &status);
+    if (names == NULL)
+        return status;
+    for (; names->ft->hasNext(names, NULL); names->ft->getNext(names, NULL))
+        ++count;
+    return returnNumber(result, count);
+}
+
+static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, const CMPIResult* result,
+                               const CMPIObjectPath* path, const char* method, const CMPIArgs* in, CMPIArgs* out)
+{
+    (void)mi;
+    if (strcasecmp(method, "Echo") == 0)
+        return echo(result, in, out);
+    if (strcasecmp(method, "SetCount") == 0)
+        return setCount(result, in);
+    if (strcasecmp(method, "CountByUpcall") == 0)
+        return countByUpcall(context, result, path);
+    if (strcasecmp(method, "ProcessId") == 0)
+        return returnNumber(result, (CMPIUint32)getpid());
+    if (strcasecmp(method, "Crash") == 0)
+        raise(SIGSEGV);
+    if (strcasecmp(method, "Exit") == 0)
+        _exit(3);
+    if (strcasecmp(method, "Hang") == 0)
+        for (;;)
+            pause();
+    return failure(CMPI_RC_ERR_METHOD_NOT_AVAILABLE, method);
+}
+
+static CMPIStatus cleanupMethods(CMPIMethodMI* mi, const CMPIContext* context, CMPIBoolean terminating)
+{
+    (void)mi, (void)context, (void)terminating;
+    return kOk;
+}
+
+static const CMPIInstanceMIFT kInstanceTable = {
+    CMPIVersion200,         CMPIVersion200,     "instanceProbe", cleanupInstances,
+    enumerateInstanceNames, enumerateInstances, getInstance,     createInstance,
+    modifyInstance,         deleteInstance,     execQuery,       NULL};
+static const CMPIMethodMIFT kMethodTable = {CMPIVersion200, CMPIVersion200, "methodProbe", cleanupMethods,
+                                            invokeMethod};
+
+static CMPIInstanceMI gInstanceMI = {NULL, &kInstanceTable};
+static CMPIMethodMI gMethodMI = {NULL, &kMethodTable};
+
+CMPIInstanceMI* Probe_Create_InstanceMI(const CMPIBroker* broker, const CMPIContext* context, CMPIStatus* status);
+CMPIMethodMI* Probe_Create_MethodMI(const CMPIBroker* broker, const CMPIContext* context, CMPIStatus* status);
+
+CMPIInstanceMI* Probe_Create_InstanceMI(const CMPIBroker* broker, const CMPIContext* context, CMPIStatus* status)
+{
+    (void)context, (void)status;
+    gBroker = broker;
+    return &gInstanceMI;
+}
+
+CMPIMethodMI* Probe_Create_MethodMI(const CMPIBroker* broker, const CMPIContext* context, CMPIStatus* status)
+{
+    (void)context, (void)status;
+    gBroker = broker;
+    return &gMethodMI;
+}
