@@ -1,0 +1,121 @@
+#include "src/instance/InstanceBuilder.h"
+
+#include <optional>
+
+#include <host/ICIMProperty.h>
+#include <host/TCIMValue.h>
+
+#include "src/common/Constants.h"
+#include "src/common/CoreLog.h"
+#include "src/instance/TPEGASUSInstance.h"
+#include "src/instance/ValueConversion.h"
+#include "src/namespace/TPEGASUSNamespace.h"
+#include "src/schema/TPEGASUSClass.h"
+
+namespace NKOLVRX20 {
+
+namespace {
+
+constexpr unsigned char kDecimal = 10;
+constexpr char kInstanceIdName[] = "InstanceID";
+constexpr char kSlotClass[] = "OMC_ProcessorSlot";
+constexpr char kSlotNumber[] = "Number";
+
+// Takes the text apart at the first hit. Returns: what follows the first character of it; nothing without a hit.
+std::optional<std::string> TextAfter(const std::string& text, const std::string& wanted)
+{
+    const auto hit = text.find(wanted);
+    return hit == std::string::npos ? std::nullopt : std::make_optional(text.substr(hit + 1));
+}
+
+// Reads the class that a key reference names out of the path of the instance that holds it:
+// Holder.Property="ns:Class.Key=...".
+// Returns: nothing when the path has not that shape.
+std::optional<std::string> ReferencedClassName(const std::string& path, const std::string& property)
+{
+    const auto fromProperty = TextAfter(path, property);
+    const auto fromClass = fromProperty ? TextAfter(*fromProperty, ":") : std::nullopt;
+    const auto dot = fromClass ? fromClass->find('.') : std::string::npos;
+    return dot == std::string::npos ? std::nullopt : std::make_optional(fromClass->substr(0, dot));
+}
+
+boost::shared_ptr<ICIMClass> ReferencedClass(const TPEGASUSClass& holder, const Pegasus::CIMInstance& source,
+                                             const std::string& property)
+{
+    const auto name = ReferencedClassName(ToStdString(source.getPath().toString()), property);
+    return name ? holder.LockNamespace()->GetClass(*name, {{kNspKey, holder.GetPegasusNSPStr()}}) : nullptr;
+}
+
+// One property on its way from the server's instance to the host's.
+class TPropertyTransfer
+{
+  public:
+    TPropertyTransfer(TPEGASUSClass& instanceClass, const Pegasus::CIMInstance& source,
+                      const Pegasus::CIMConstProperty& property)
+        : fClass(instanceClass), fSource(source), fProperty(property),
+          fServerName(ToStdString(property.getName().getString()))
+    {
+    }
+
+    // Returns: the name as the log gives it; the server's spelling where it is no name for the host.
+    const std::string& Name() const { return fName.empty() ? fServerName : fName; }
+
+    void To(TPEGASUSInstance& target)
+    {
+        fName = TPEGASUSNamespace::NormalizeName(fServerName);
+        target.SetPropertyValue(fName, Value(), {});
+        if (fServerName == kSlotNumber && fClass.GetName({}) == kSlotClass)
+            Narrow(target);
+    }
+
+  private:
+    TCIMValue Value() const
+    {
+        TCIMValue value;
+        const bool isReference = fProperty.getType() == Pegasus::CIMTYPE_REFERENCE;
+        const auto referenced = isReference ? ReferencedClass(fClass, fSource, fServerName) : nullptr;
+        if (!fProperty.getValue().isNull())
+            pegValToVRX(fName, fProperty.getValue(), fProperty.getType(), fProperty.isArray(), value,
+                        fClass.shared_from_this());
+        if (referenced)
+            value.SetReferencedClass(referenced);
+        if (fServerName.find(kInstanceIdName) != std::string::npos && value.ToString(kDecimal).empty())
+            value.Set("");
+        return value;
+    }
+
+    // Servers disagree on the width of a slot's number; the host knows it as 16 bits.
+    void Narrow(TPEGASUSInstance& target) const
+    {
+        const int number = target.GetProperty(fName, {})->GetValue({});
+        target.SetPropertyValue(fName, static_cast<unsigned short>(number), {});
+    }
+
+    TPEGASUSClass& fClass;
+    const Pegasus::CIMInstance& fSource;
+    const Pegasus::CIMConstProperty& fProperty;
+    const std::string fServerName;
+    std::string fName;
+};
+
+} // namespace
+
+boost::shared_ptr<TPEGASUSInstance> BuildInstance(TPEGASUSClass& instanceClass, const Pegasus::CIMInstance& source,
+                                                  const std::string& operation)
+{
+    const auto target = boost::dynamic_pointer_cast<TPEGASUSInstance>(instanceClass.AllocateInstance({}));
+    for (Pegasus::Uint32 i = 0; i < source.getPropertyCount(); ++i) {
+        const Pegasus::CIMConstProperty property = source.getProperty(i);
+        TPropertyTransfer transfer(instanceClass, source, property);
+        try {
+            transfer.To(*target);
+        } catch (...) { // one property must not cost the others
+            LogProgress("4TPEGASUSClass::", operation, " - Unable to retrieve property: ", transfer.Name());
+        }
+    }
+    target->setPegNameSpace(instanceClass.GetPegasusNSP());
+    target->setPegInstanceName(source.getPath());
+    return target;
+}
+
+} // namespace NKOLVRX20

@@ -1,0 +1,24 @@
+#ifndef SRC_INSTANCE_INSTANCEBUILDER_H
+#define SRC_INSTANCE_INSTANCEBUILDER_H
+
+#include <string>
+
+#include <boost/shared_ptr.hpp>
+
+#include <Pegasus/Client/CIMClient.h>
+
+namespace NKOLVRX20 {
+
+class TPEGASUSClass;
+class TPEGASUSInstance;
+
+// Makes the host's instance of a class from the server's. A property that does not convert is left out and logged
+// under the name of the operation that asked.
+// Throws: boost::bad_weak_ptr when the namespace is gone; Pegasus::Exception for an instance that cannot be read.
+// Blocks: for each reference property to a class that is new to the namespace, as long as its GetClass.
+boost::shared_ptr<TPEGASUSInstance> BuildInstance(TPEGASUSClass& instanceClass, const Pegasus::CIMInstance& source,
+                                                  const std::string& operation);
+
+} // namespace NKOLVRX20
+
+#endif

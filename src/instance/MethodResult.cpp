@@ -1,0 +1,27 @@
+#include "src/instance/MethodResult.h"
+
+#include "src/common/CoreLog.h"
+#include "src/instance/ValueConversion.h"
+
+namespace NKOLVRX20 {
+
+TCIMValue MethodValueToHost(const std::string& name, const Pegasus::CIMValue& value,
+                            const boost::shared_ptr<ICIMClass>& forClass)
+{
+    TCIMValue converted;
+    if (!value.isNull())
+        pegValToVRX(name, value, value.getType(), value.isArray(), converted, forClass);
+    return converted;
+}
+
+void AddOutputs(const Pegasus::Array<Pegasus::CIMParamValue>& outputs, const boost::shared_ptr<ICIMClass>& forClass,
+                const boost::function<void(const std::string&)>& onOutput, TCIMContext& entries)
+{
+    for (Pegasus::Uint32 i = 0; i < outputs.size(); ++i) {
+        const std::string name = ToStdString(outputs[i].getParameterName());
+        entries[name] = MethodValueToHost(name, outputs[i].getValue(), forClass);
+        onOutput(name);
+    }
+}
+
+} // namespace NKOLVRX20

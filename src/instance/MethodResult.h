@@ -1,0 +1,24 @@
+#ifndef SRC_INSTANCE_METHODRESULT_H
+#define SRC_INSTANCE_METHODRESULT_H
+
+#include <boost/function.hpp>
+#include <boost/shared_ptr.hpp>
+
+#include <Pegasus/Client/CIMClient.h>
+#include <host/TCIMValue.h>
+
+namespace NKOLVRX20 {
+
+// Returns: the value that came back from a method, by its own type; null for null and for what the host has no type
+// for. Throws: as pegValToVRX.
+TCIMValue MethodValueToHost(const std::string& name, const Pegasus::CIMValue& value,
+                            const boost::shared_ptr<ICIMClass>& forClass);
+
+// Enters the outputs under their names, replacing what is there, and tells onOutput each name.
+// Throws: as pegValToVRX; the outputs before the failing one have been entered.
+void AddOutputs(const Pegasus::Array<Pegasus::CIMParamValue>& outputs, const boost::shared_ptr<ICIMClass>& forClass,
+                const boost::function<void(const std::string&)>& onOutput, TCIMContext& entries);
+
+} // namespace NKOLVRX20
+
+#endif

@@ -1,0 +1,95 @@
+#include "src/instance/TPEGASUSInstance.h"
+
+#include <host/ICIMMethodDecl.h>
+#include <host/ICIMParameterDecl.h>
+#include <host/ICIMQualifier.h>
+#include <host/TVRXException.h>
+
+#include "src/common/ConnectedClient.h"
+#include "src/common/CoreLog.h"
+#include "src/instance/MethodResult.h"
+#include "src/namespace/TPEGASUSNamespace.h"
+#include "src/schema/TPEGASUSClass.h"
+
+namespace NKOLVRX20 {
+
+namespace {
+
+constexpr Pegasus::Uint32 kMethodTimeoutMs = 300000;
+constexpr unsigned char kDecimal = 10;
+
+boost::shared_ptr<ICIMParameterDecl> ParameterDeclOf(const ICIMClass& instanceClass, const std::string& method,
+                                                     const std::string& parameter)
+{
+    const auto methodDecl = instanceClass.GetMethodDecl(method, {});
+    const auto parameterDecl = methodDecl ? methodDecl->GetParameterDecl(parameter, {}) : nullptr;
+    if (!parameterDecl)
+        throw TVRXException(TVRXStatusCode::kNotFound);
+    return parameterDecl;
+}
+
+Pegasus::CIMParamValue ReferenceParameter(const std::string& name, const TCIMValue& value)
+{
+    const Pegasus::CIMObjectPath path(Pegasus::String(value.ToString(kDecimal).c_str()));
+    return Pegasus::CIMParamValue(name.c_str(), Pegasus::CIMValue(path), true);
+}
+
+} // namespace
+
+TPEGASUSInstance::TPEGASUSInstance(boost::shared_ptr<ICIMClass> instanceClass, TCIMContext context)
+    : TInmemInstance(instanceClass, context), fPegNameSpace(std::make_unique<Pegasus::CIMNamespaceName>()),
+      fPegInstanceName(std::make_unique<Pegasus::CIMObjectPath>())
+{
+}
+
+TPEGASUSInstance::~TPEGASUSInstance() = default;
+
+void TPEGASUSInstance::AddToNamespace(TCIMContext context)
+{
+    const auto instanceClass = boost::dynamic_pointer_cast<TPEGASUSClass>(GetClass(context));
+    instanceClass->AddInstance(boost::dynamic_pointer_cast<TPEGASUSInstance>(shared_from_this()));
+}
+
+std::string TPEGASUSInstance::GetPegasusNSPStr() const
+{
+    return fNsp;
+}
+
+// Both tests are made, so that a parameter of both directions is sent twice; the servers expect it.
+Pegasus::Array<Pegasus::CIMParamValue> TPEGASUSInstance::InputsFor(const std::string& method,
+                                                                   const TCIMContext& parameters) const
+{
+    Pegasus::Array<Pegasus::CIMParamValue> inputs;
+    for (const auto& [name, value] : parameters) {
+        const auto declaration = ParameterDeclOf(*GetClass({}), method, name);
+        if (declaration->GetQualifier("OUT", {}))
+            inputs.append(ReferenceParameter(name, value));
+        if (declaration->GetQualifier("IN", {}))
+            inputs.append(ReferenceParameter(name, value));
+    }
+    return inputs;
+}
+
+TCIMValue TPEGASUSInstance::InvokeMethod(const std::string& name, TCIMContext& parameters, TCIMContext)
+{
+    const Pegasus::CIMName method(name.c_str());
+    const auto inputs = InputsFor(name, parameters);
+    const auto instanceClass = boost::dynamic_pointer_cast<TPEGASUSClass>(GetClass({}));
+    const auto ns = instanceClass->LockNamespace();
+    Pegasus::Array<Pegasus::CIMParamValue> outputs;
+    Pegasus::CIMValue returned;
+    try {
+        Pegasus::CIMClient& client = ConnectedClient(*ns);
+        client.setTimeout(kMethodTimeoutMs);
+        returned = client.invokeMethod(*fPegNameSpace, *fPegInstanceName, method, inputs, outputs);
+    } catch (const Pegasus::Exception& exception) {
+        LogProgress("pegClient->invokeMethod returned exception: ", ToStdString(exception.getMessage()));
+        return TCIMValue();
+    }
+    const TCIMValue result = MethodValueToHost(name, returned, instanceClass);
+    const auto logOutput = [](const std::string& output) { LogProgress("adding output param : ", output); };
+    AddOutputs(outputs, instanceClass, logOutput, parameters);
+    return result;
+}
+
+} // namespace NKOLVRX20

@@ -1,0 +1,335 @@
+#include "src/instance/ValueConversion.h"
+
+#include <sstream>
+
+#include <host/ICIMClass.h>
+#include <host/ICIMNamespace.h>
+
+#include "src/common/CoreLog.h"
+
+namespace NKOLVRX20 {
+
+namespace {
+
+typedef TCIMValue::TCIMType TType;
+
+constexpr unsigned char kDecimal = 10;
+
+// One element of a host value, from what the client library holds. The two 64-bit types differ only in name.
+TCIMValue ToHost(Pegasus::Uint64 element)
+{
+    return TCIMValue(static_cast<unsigned long>(element));
+}
+
+TCIMValue ToHost(Pegasus::Sint64 element)
+{
+    return TCIMValue(static_cast<long>(element));
+}
+
+TCIMValue ToHost(const Pegasus::Char16& element)
+{
+    return TCIMValue(TCIMChar16(std::to_string(static_cast<Pegasus::Uint16>(element))));
+}
+
+TCIMValue ToHost(const Pegasus::CIMDateTime& element)
+{
+    return TCIMValue(TCIMDateTime(ToStdString(element.toString())));
+}
+
+// In an array a string takes the way through the stream, which is not UTF-8.
+TCIMValue ToHost(const Pegasus::String& element)
+{
+    std::ostringstream text;
+    text << element;
+    return TCIMValue(text.str());
+}
+
+template <typename TPlain> TCIMValue ToHost(TPlain element)
+{
+    return TCIMValue(element);
+}
+
+template <typename TPeg> TPeg Get(const Pegasus::CIMValue& value)
+{
+    TPeg held{};
+    value.get(held);
+    return held;
+}
+
+template <typename TPeg> TCIMValue ScalarToHost(const Pegasus::CIMValue& value)
+{
+    return ToHost(Get<TPeg>(value));
+}
+
+TCIMValue ReferenceToHost(const Pegasus::CIMValue& value, const ICIMClass& forClass)
+{
+    TCIMReference reference((boost::shared_ptr<ICIMNamespace>()), TCIMContext());
+    reference.SetNamespace(forClass.GetNamespace({}));
+    reference.SetPath(ToStdString(Get<Pegasus::CIMObjectPath>(value).toString()));
+    return TCIMValue(reference);
+}
+
+template <typename TPeg> TCIMValue ArrayToHost(const Pegasus::CIMValue& value, TType::ECIMType elementType)
+{
+    const auto held = Get<Pegasus::Array<TPeg>>(value);
+    std::vector<TCIMValue> elements;
+    elements.reserve(held.size());
+    for (Pegasus::Uint32 i = 0; i < held.size(); ++i)
+        elements.push_back(ToHost(held[i]));
+    return TCIMValue(elementType, 0, elements);
+}
+
+void ScalarFromPegasus(const Pegasus::CIMValue& value, Pegasus::CIMType type, TCIMValue& out,
+                       const boost::shared_ptr<ICIMClass>& forClass)
+{
+    switch (type) {
+    case Pegasus::CIMTYPE_BOOLEAN:
+        out = TCIMValue(value == Pegasus::CIMValue(true));
+        break;
+    case Pegasus::CIMTYPE_UINT8:
+        out = ScalarToHost<Pegasus::Uint8>(value);
+        break;
+    case Pegasus::CIMTYPE_SINT8:
+        out = ScalarToHost<Pegasus::Sint8>(value);
+        break;
+    case Pegasus::CIMTYPE_UINT16:
+        out = ScalarToHost<Pegasus::Uint16>(value);
+        break;
+    case Pegasus::CIMTYPE_SINT16:
+        out = ScalarToHost<Pegasus::Sint16>(value);
+        break;
+    case Pegasus::CIMTYPE_UINT32:
+        out = ScalarToHost<Pegasus::Uint32>(value);
+        break;
+    case Pegasus::CIMTYPE_SINT32:
+        out = ScalarToHost<Pegasus::Sint32>(value);
+        break;
+    case Pegasus::CIMTYPE_UINT64:
+        out = ScalarToHost<Pegasus::Uint64>(value);
+        break;
+    case Pegasus::CIMTYPE_SINT64:
+        out = ScalarToHost<Pegasus::Sint64>(value);
+        break;
+    case Pegasus::CIMTYPE_REAL32:
+        out = ScalarToHost<Pegasus::Real32>(value);
+        break;
+    case Pegasus::CIMTYPE_REAL64:
+        out = ScalarToHost<Pegasus::Real64>(value);
+        break;
+    case Pegasus::CIMTYPE_CHAR16:
+        out = ScalarToHost<Pegasus::Char16>(value);
+        break;
+    case Pegasus::CIMTYPE_STRING:
+        out = TCIMValue(ToStdString(Get<Pegasus::String>(value)));
+        break;
+    case Pegasus::CIMTYPE_DATETIME:
+        out = ScalarToHost<Pegasus::CIMDateTime>(value);
+        break;
+    case Pegasus::CIMTYPE_REFERENCE:
+        out = ReferenceToHost(value, *forClass);
+        break;
+    default:
+        break;
+    }
+}
+
+void ArrayFromPegasus(const Pegasus::CIMValue& value, Pegasus::CIMType type, TCIMValue& out)
+{
+    switch (type) {
+    case Pegasus::CIMTYPE_BOOLEAN:
+        out = ArrayToHost<Pegasus::Boolean>(value, TType::kBoolean);
+        break;
+    case Pegasus::CIMTYPE_UINT8:
+        out = ArrayToHost<Pegasus::Uint8>(value, TType::kUint8);
+        break;
+    case Pegasus::CIMTYPE_SINT8:
+        out = ArrayToHost<Pegasus::Sint8>(value, TType::kSint8);
+        break;
+    case Pegasus::CIMTYPE_UINT16:
+        out = ArrayToHost<Pegasus::Uint16>(value, TType::kUint16);
+        break;
+    case Pegasus::CIMTYPE_SINT16:
+        out = ArrayToHost<Pegasus::Sint16>(value, TType::kSint16);
+        break;
+    case Pegasus::CIMTYPE_UINT32:
+        out = ArrayToHost<Pegasus::Uint32>(value, TType::kUint32);
+        break;
+    case Pegasus::CIMTYPE_SINT32:
+        out = ArrayToHost<Pegasus::Sint32>(value, TType::kSint32);
+        break;
+    case Pegasus::CIMTYPE_UINT64:
+        out = ArrayToHost<Pegasus::Uint64>(value, TType::kUint64);
+        break;
+    case Pegasus::CIMTYPE_SINT64:
+        out = ArrayToHost<Pegasus::Sint64>(value, TType::kSint64);
+        break;
+    case Pegasus::CIMTYPE_REAL32:
+        out = ArrayToHost<Pegasus::Real32>(value, TType::kReal32);
+        break;
+    case Pegasus::CIMTYPE_REAL64:
+        out = ArrayToHost<Pegasus::Real64>(value, TType::kReal64);
+        break;
+    case Pegasus::CIMTYPE_CHAR16:
+        out = ArrayToHost<Pegasus::Char16>(value, TType::kChar16);
+        break;
+    case Pegasus::CIMTYPE_STRING:
+        out = ArrayToHost<Pegasus::String>(value, TType::kString);
+        break;
+    case Pegasus::CIMTYPE_DATETIME:
+        out = ArrayToHost<Pegasus::CIMDateTime>(value, TType::kDatetime);
+        break;
+    default:
+        break;
+    }
+}
+
+Pegasus::String DecimalText(const TCIMValue& value)
+{
+    return Pegasus::String(value.ToString(kDecimal).c_str());
+}
+
+void ScalarToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
+{
+    switch (in.GetType()) {
+    case TType::kBoolean:
+        out = Pegasus::CIMValue(static_cast<Pegasus::Boolean>(static_cast<bool>(in)));
+        break;
+    case TType::kUint8:
+        out.set(static_cast<Pegasus::Uint8>(static_cast<unsigned char>(in)));
+        break;
+    case TType::kSint8:
+        out.set(static_cast<Pegasus::Sint8>(static_cast<signed char>(in)));
+        break;
+    case TType::kUint16:
+        out.set(static_cast<Pegasus::Uint16>(static_cast<unsigned short>(in)));
+        break;
+    case TType::kSint16:
+        out.set(static_cast<Pegasus::Sint16>(static_cast<short>(in)));
+        break;
+    case TType::kUint32:
+        out.set(static_cast<Pegasus::Uint32>(static_cast<unsigned int>(in)));
+        break;
+    case TType::kSint32:
+        out.set(static_cast<Pegasus::Sint32>(static_cast<int>(in)));
+        break;
+    case TType::kUint64:
+        out.set(static_cast<Pegasus::Uint64>(static_cast<unsigned long>(in)));
+        break;
+    case TType::kSint64:
+        out.set(static_cast<Pegasus::Sint64>(static_cast<long>(in)));
+        break;
+    case TType::kReal32:
+        out.set(static_cast<Pegasus::Real32>(static_cast<float>(in)));
+        break;
+    case TType::kReal64:
+        out.set(static_cast<Pegasus::Real64>(static_cast<double>(in)));
+        break;
+    case TType::kChar16:
+        out.set(Pegasus::Char16(static_cast<unsigned short>(in)));
+        break;
+    case TType::kString:
+        out.set(DecimalText(in));
+        break;
+    case TType::kDatetime:
+        out.set(Pegasus::CIMDateTime(DecimalText(in)));
+        break;
+    case TType::kReference:
+        out.set(Pegasus::CIMObjectPath(DecimalText(in)));
+        break;
+    default:
+        break;
+    }
+}
+
+void StringArrayToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
+{
+    Pegasus::Array<Pegasus::String> elements;
+    for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(in))
+        elements.append(Pegasus::String(static_cast<std::string>(element).c_str()));
+    out.set(elements);
+}
+
+void DatetimeArrayToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
+{
+    Pegasus::Array<Pegasus::CIMDateTime> elements;
+    for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(in))
+        elements.append(Pegasus::CIMDateTime(DecimalText(element)));
+    out.set(elements);
+}
+
+void ArrayToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
+{
+    switch (in.GetType()) {
+    case TType::kBoolean:
+        vrxArrayToPeg(in, out, bool(), Pegasus::Boolean());
+        break;
+    case TType::kUint8:
+        vrxArrayToPeg(in, out, static_cast<unsigned char>(0), Pegasus::Uint8());
+        break;
+    case TType::kSint8:
+        vrxArrayToPeg(in, out, static_cast<signed char>(0), Pegasus::Sint8());
+        break;
+    case TType::kUint16: // servers of this kind are sent 8-bit arrays; they rely on it
+        vrxArrayToPeg(in, out, static_cast<unsigned short>(0), Pegasus::Uint8());
+        break;
+    case TType::kSint16: // as above
+        vrxArrayToPeg(in, out, short(), Pegasus::Sint8());
+        break;
+    case TType::kUint32:
+        vrxArrayToPeg(in, out, 0U, Pegasus::Uint32());
+        break;
+    case TType::kSint32:
+        vrxArrayToPeg(in, out, 0, Pegasus::Sint32());
+        break;
+    case TType::kUint64:
+        vrxArrayToPeg(in, out, 0UL, Pegasus::Uint64());
+        break;
+    case TType::kSint64:
+        vrxArrayToPeg(in, out, 0L, Pegasus::Sint64());
+        break;
+    case TType::kReal32:
+        vrxArrayToPeg(in, out, 0.0F, Pegasus::Real32());
+        break;
+    case TType::kReal64:
+        vrxArrayToPeg(in, out, 0.0, Pegasus::Real64());
+        break;
+    case TType::kChar16:
+        vrxArrayToPeg(in, out, static_cast<unsigned short>(0), Pegasus::Char16());
+        break;
+    case TType::kString:
+        StringArrayToPegasus(in, out);
+        break;
+    case TType::kDatetime:
+        DatetimeArrayToPegasus(in, out);
+        break;
+    default:
+        break;
+    }
+}
+
+} // namespace
+
+void pegValToVRX(std::string, Pegasus::CIMValue value, Pegasus::CIMType type, bool isArray, TCIMValue& out,
+                 boost::shared_ptr<ICIMClass> forClass)
+{
+    if (isArray)
+        ArrayFromPegasus(value, type, out);
+    else
+        ScalarFromPegasus(value, type, out, forClass);
+}
+
+void vrxValToPeg(const TCIMValue& in, Pegasus::CIMValue& out)
+{
+    if (in.IsArray())
+        ArrayToPegasus(in, out);
+    else
+        ScalarToPegasus(in, out);
+}
+
+TCIMValue::TCIMType pegTypeToVRXType(Pegasus::CIMType type, bool isArray)
+{
+    const int code = type >= Pegasus::CIMTYPE_BOOLEAN && type <= Pegasus::CIMTYPE_REFERENCE ? int(type) + 1 : 0;
+    return TType::ECIMType(code + (isArray ? int(TType::kArrayOffset) : 0));
+}
+
+} // namespace NKOLVRX20

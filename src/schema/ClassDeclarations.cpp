@@ -1,0 +1,174 @@
+// The properties and methods that a class declares, and the rules for adding one.
+#include <boost/make_shared.hpp>
+
+#include "src/common/CoreLog.h"
+#include "src/namespace/TPEGASUSNamespace.h"
+#include "src/schema/TPEGASUSClass.h"
+#include "src/schema/TPEGASUSMethodDecl.h"
+#include "src/schema/TPEGASUSProperty.h"
+#include "src/schema/TPEGASUSPropertyDecl.h"
+#include "src/schema/VisitInOrder.h"
+
+namespace NKOLVRX20 {
+
+namespace {
+
+// The host asks every class for this one, in this spelling, and takes null for an answer.
+constexpr char kCollectionTimeProperty[] = "DateTimeOfCollection";
+// Vendors declare this one twice; the later declaration holds.
+constexpr char kRepeatableName[] = "PortType";
+constexpr char kOverrideQualifier[] = "OVERRIDE";
+constexpr char kKeyQualifier[] = "KEY";
+
+template <typename TMap> typename TMap::mapped_type FindDeclared(const TMap& map, const std::string& name)
+{
+    const auto entry = map.find(TPEGASUSNamespace::NormalizeName(name));
+    return entry == map.end() ? nullptr : entry->second;
+}
+
+} // namespace
+
+void TPEGASUSClass::EnumerateKeyNames(TKeyNameVisitor visitor, TCIMContext context) const
+{
+    VisitInOrder(fPropertyDecls, [&](const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration) {
+        const std::string name = declaration->GetName(context);
+        return !HasTrueQualifier(*declaration, kKeyQualifier) || visitor(&name);
+    });
+}
+
+boost::shared_ptr<ICIMPropertyDecl> TPEGASUSClass::AllocatePropertyDecl(const std::string& name, TCIMValue value,
+                                                                        TCIMContext)
+{
+    return boost::make_shared<TPEGASUSPropertyDecl>(shared_from_this(), name, value);
+}
+
+boost::shared_ptr<ICIMPropertyDecl> TPEGASUSClass::GetPropertyDecl(const std::string& name, TCIMContext) const
+{
+    const auto declaration = FindDeclared(fPropertyDecls, name);
+    if (!declaration && name != kCollectionTimeProperty)
+        throw TVRXException(TVRXStatusCode::kUnknownProperty);
+    return declaration;
+}
+
+void TPEGASUSClass::EnumeratePropertyDecls(TPropertyDeclVisitor visitor, TCIMContext) const
+{
+    VisitInOrder(fPropertyDecls, visitor);
+}
+
+boost::shared_ptr<ICIMProperty> TPEGASUSClass::GetProperty(const std::string& name, TCIMContext) const
+{
+    const auto property = FindDeclared(fProperties, name);
+    if (!property)
+        throw TVRXException(TVRXStatusCode::kUnknownProperty);
+    return property;
+}
+
+void TPEGASUSClass::EnumerateStaticProperties(TPropertyVisitor visitor, TCIMContext) const
+{
+    VisitInOrder(fProperties, visitor);
+}
+
+boost::shared_ptr<ICIMMethodDecl> TPEGASUSClass::AllocateMethodDecl(const std::string& name,
+                                                                    TCIMValue::TCIMType returnType, TCIMContext)
+{
+    return boost::make_shared<TPEGASUSMethodDecl>(shared_from_this(), name, returnType);
+}
+
+boost::shared_ptr<ICIMMethodDecl> TPEGASUSClass::GetMethodDecl(const std::string& name, TCIMContext) const
+{
+    return FindDeclared(fMethodDecls, name);
+}
+
+void TPEGASUSClass::EnumerateMethodDecls(TMethodDeclVisitor visitor, TCIMContext) const
+{
+    VisitInOrder(fMethodDecls, visitor);
+}
+
+void TPEGASUSClass::AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declaration)
+{
+    const auto own = boost::dynamic_pointer_cast<TPEGASUSPropertyDecl>(declaration);
+    if (!own)
+        throw TVRXException(TVRXStatusCode::kTypeMismatch);
+    const std::string name = own->GetName({});
+    if (own->GetType({}) == TCIMValue::TCIMType::kReference && !IsAssociation({})) {
+        LogFailure("TPEGASUS: Attempt to add reference property ", name, " to non-association class ", fName);
+        throw TVRXException(TVRXStatusCode::kReferenceInNonAssociation);
+    }
+    const std::string key = TPEGASUSNamespace::NormalizeName(name);
+    if (!own->GetQualifier(kOverrideQualifier, {})) {
+        AddNewPropertyDecl(key, own);
+        return;
+    }
+    try {
+        OverridePropertyDecl(key, own);
+    } catch (const TVRXException& exception) {
+        if (exception.GetStatusCode() == TVRXStatusCode::kUnknownProperty)
+            throw;
+        LogFailure("TPEGASUS: Attempt define property ", name, " in class ", fName,
+                   "failed. Reason = ", exception.what());
+        throw TVRXException(exception.GetStatusCode());
+    }
+}
+
+void TPEGASUSClass::OverridePropertyDecl(const std::string& key,
+                                         const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration)
+{
+    const std::string name = declaration->GetName({});
+    const auto existing = fPropertyDecls.find(key);
+    if (existing == fPropertyDecls.end()) {
+        LogFailure("TPEGASUS: Attempt to override property ", name, " in class ", fName,
+                   ": property doesn't exist in base class");
+        AddNewPropertyDecl(key, declaration);
+        return;
+    }
+    if (existing->second->GetType({}) != declaration->GetType({}))
+        RefuseOverride(name, ": different types", TVRXStatusCode::kTypeMismatch);
+    if (existing->second->GetClass({}) == shared_from_this())
+        RefuseOverride(name, ": original was defined in this class", TVRXStatusCode::kAlreadyExists);
+    existing->second = declaration;
+}
+
+void TPEGASUSClass::RefuseOverride(const std::string& name, const char* reason, unsigned int status) const
+{
+    LogFailure("TPEGASUS: Attempt to override property ", name, " in class ", fName, reason);
+    throw TVRXException(status);
+}
+
+void TPEGASUSClass::AddNewPropertyDecl(const std::string& key,
+                                       const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration)
+{
+    const std::string name = declaration->GetName({});
+    const bool isRepeatable = name.find(kRepeatableName) != std::string::npos;
+    if (!isRepeatable && fPropertyDecls.count(key) != 0) {
+        LogFailure("TPEGASUS: Attempt to add property ", name, " to class ", fName, ": already exists");
+        throw TVRXException(TVRXStatusCode::kAlreadyExists);
+    }
+    fPropertyDecls[key] = declaration;
+}
+
+void TPEGASUSClass::AdoptPropertyDecl(const std::string& name)
+{
+    const auto superClass = fSuperClass.lock();
+    const auto inherited = superClass ? FindDeclared(superClass->fPropertyDecls, name) : nullptr;
+    if (inherited)
+        fPropertyDecls.emplace(TPEGASUSNamespace::NormalizeName(name), inherited);
+}
+
+void TPEGASUSClass::EnterProperty(const boost::shared_ptr<ICIMPropertyDecl>& declaration, const TCIMValue& value)
+{
+    fProperties[TPEGASUSNamespace::NormalizeName(declaration->GetName({}))] =
+        boost::make_shared<TPEGASUSProperty>(value, declaration, shared_from_this());
+}
+
+void TPEGASUSClass::EnterMethodDecl(const boost::shared_ptr<TPEGASUSMethodDecl>& declaration)
+{
+    fMethodDecls[TPEGASUSNamespace::NormalizeName(declaration->GetName({}))] = declaration;
+}
+
+void TPEGASUSClass::RemovePropertyDecl(boost::shared_ptr<ICIMPropertyDecl>) {}
+
+void TPEGASUSClass::AddMethodDecl(boost::shared_ptr<ICIMMethodDecl>) {}
+
+void TPEGASUSClass::RemoveMethodDecl(boost::shared_ptr<ICIMMethodDecl>) {}
+
+} // namespace NKOLVRX20

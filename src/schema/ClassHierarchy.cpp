@@ -1,0 +1,101 @@
+// A class among its superclasses, subclasses and associations.
+#include <algorithm>
+
+#include "src/common/ConnectedClient.h"
+#include "src/common/Constants.h"
+#include "src/common/CoreLog.h"
+#include "src/namespace/TPEGASUSNamespace.h"
+#include "src/schema/TPEGASUSClass.h"
+
+namespace NKOLVRX20 {
+
+bool TPEGASUSClass::IsAssociation(TCIMContext) const
+{
+    return HasTrueQualifier(*this, "ASSOCIATION");
+}
+
+bool TPEGASUSClass::IsAbstract(TCIMContext) const
+{
+    return HasTrueQualifier(*this, "ABSTRACT");
+}
+
+bool TPEGASUSClass::IsRootClass(TCIMContext) const
+{
+    const auto ns = LockNamespace();
+    return ns->isConnected() && ns->GetRootClass().get() == this;
+}
+
+boost::shared_ptr<ICIMClass> TPEGASUSClass::GetSuperClass(TCIMContext context) const
+{
+    const auto ns = LockNamespace();
+    if (!ns->isConnected())
+        return nullptr;
+    std::string superName;
+    try {
+        const Pegasus::CIMClass answer =
+            ConnectedClient(*ns).getClass(fPegasusNsp, Pegasus::CIMName(fName.c_str()), true, true, false);
+        superName = ToStdString(answer.getSuperClassName().getString());
+    } catch (const Pegasus::Exception& exception) {
+        LogFailure("TPEGASUSClass::GetSuperClass from Pegasus for: ", fName,
+                   " returned exception: ", ToStdString(exception.getMessage()));
+        throw TVRXException(TVRXStatusCode::kServerConnectionFailed);
+    }
+    return ns->GetClass(superName, context);
+}
+
+// A walk on a copy: the visitor may make the namespace fetch more classes. The visitor is wrapped, so that a child's
+// own walk can tell that it was ended.
+void TPEGASUSClass::EnumerateSubClasses(TClassVisitor visitor, bool deep, TCIMContext context) const
+{
+    bool goesOn = true;
+    const TClassVisitor remembered = [&](boost::shared_ptr<ICIMClass> child) { return goesOn = visitor(child); };
+    const auto children = fChildClasses;
+    for (const auto& child : children) {
+        try {
+            remembered(child);
+        } catch (const std::exception& exception) {
+            LogFailure("TPEGASUSClass::EnumerateSubClasses : ", fName, "  ", exception.what());
+            continue;
+        }
+        if (goesOn && deep)
+            child->EnumerateSubClasses(remembered, deep, context);
+        if (!goesOn)
+            return;
+    }
+}
+
+bool TPEGASUSClass::IsSubclassOf(boost::shared_ptr<const ICIMClass> other, TCIMContext context) const
+{
+    if (!other)
+        return false;
+    const std::string wanted = other->GetName(context);
+    if (fName == wanted)
+        return true;
+    for (auto ancestor = fSuperClass.lock(); ancestor; ancestor = ancestor->fSuperClass.lock()) {
+        if (ancestor->fName == wanted)
+            return wanted != kRootClassName;
+    }
+    return false;
+}
+
+void TPEGASUSClass::EnumerateAssociatedClasses(TClassVisitor, const std::string&, const std::string&,
+                                               const std::string&, const std::string&, TCIMContext)
+{
+}
+
+void TPEGASUSClass::EnumerateAssociationClasses(TClassVisitor, const std::string&, const std::string&, TCIMContext) {}
+
+void TPEGASUSClass::AddChildClass(boost::shared_ptr<ICIMClass> child)
+{
+    const auto hasName = [name = child->GetName({})](const auto& other) { return other->GetName({}) == name; };
+    if (std::none_of(fChildClasses.begin(), fChildClasses.end(), hasName))
+        fChildClasses.push_back(child);
+}
+
+void TPEGASUSClass::RemoveChildClass(boost::shared_ptr<ICIMClass>) {}
+
+void TPEGASUSClass::AddAssociationClass(boost::shared_ptr<ICIMClass>) {}
+
+void TPEGASUSClass::RemoveAssociationClass(boost::shared_ptr<ICIMClass>) {}
+
+} // namespace NKOLVRX20

@@ -1,0 +1,50 @@
+// How a new class gets its settings and its declarations from the server.
+#include <cstdlib>
+
+#include "src/common/ConnectedClient.h"
+#include "src/common/Constants.h"
+#include "src/common/CoreLog.h"
+#include "src/namespace/TPEGASUSNamespace.h"
+#include "src/schema/ClassMirror.h"
+#include "src/schema/TPEGASUSClass.h"
+
+namespace NKOLVRX20 {
+
+namespace {
+
+constexpr int kDecimal = 10;
+constexpr unsigned long kMsPerSecond = 1000;
+
+// Wraps at 32 bits; a text that is no number gives 0.
+unsigned int MillisecondsFromText(const std::string& seconds)
+{
+    const auto number = static_cast<unsigned long>(std::strtol(seconds.c_str(), nullptr, kDecimal));
+    return static_cast<unsigned int>(number * kMsPerSecond);
+}
+
+} // namespace
+
+void TPEGASUSClass::Initialize(const std::string& cimNamespace, const std::string& timeout,
+                               const boost::shared_ptr<TPEGASUSClass>& superClass)
+{
+    fTimeout = timeout;
+    fDefaultTimeoutMs = MillisecondsFromText(timeout);
+    fPegasusNspText = cimNamespace;
+    fSuperClass = superClass;
+    try {
+        fPegasusNsp = Pegasus::CIMNamespaceName(cimNamespace.c_str());
+        if (fName == kRootClassName)
+            return;
+        const auto ns = LockNamespace();
+        TClassMirror(*this, *ns)
+            .Mirror(ConnectedClient(*ns).getClass(fPegasusNsp, Pegasus::CIMName(fName.c_str()), false, true, false));
+    } catch (const Pegasus::Exception& exception) {
+        LogFailure("TPEGASUSClass::Initialize - Unable to retrieve class: ", fName,
+                   "\tdetail: ", ToStdString(exception.getMessage()));
+        throw TVRXException(TVRXStatusCode::kServerConnectionFailed);
+    }
+    if (superClass)
+        superClass->AddChildClass(shared_from_this());
+}
+
+} // namespace NKOLVRX20

@@ -1,0 +1,56 @@
+#ifndef SRC_SCHEMA_CLASSMIRROR_H
+#define SRC_SCHEMA_CLASSMIRROR_H
+
+#include <set>
+#include <string>
+
+#include <Pegasus/Client/CIMClient.h>
+#include <host/ICIMNamedElement.h>
+
+namespace NKOLVRX20 {
+
+class TPEGASUSClass;
+class TPEGASUSMethodDecl;
+class TPEGASUSNamespace;
+class TPEGASUSQualifierDecl;
+
+// Carries the declarations of a server's class over into the host's image of it: qualifiers first, because a reference
+// property is only welcome in an association, then properties, then methods. What fails is logged and left out.
+//
+// The declaration of a qualifier is asked for once a namespace, and after a failure once a class.
+class TClassMirror
+{
+  public:
+    TClassMirror(TPEGASUSClass& target, TPEGASUSNamespace& ns) : fTarget(target), fNamespace(ns) {}
+
+    // Throws: Pegasus::UninitializedObjectException when the source holds no class.
+    // Blocks: up to the client's time-out for each qualifier that is new.
+    void Mirror(const Pegasus::CIMClass& source);
+
+  private:
+    // Where the qualifiers of an element go, and how the log names it.
+    struct TElement
+    {
+        ICIMNamedElement& fElement;
+        const char* fFailureText;
+        std::string fName;
+    };
+
+    template <typename TSource> void MirrorQualifiers(const TSource& source, const TElement& element);
+    void MirrorQualifier(const Pegasus::CIMConstQualifier& source, ICIMNamedElement& element);
+    void MirrorProperty(const Pegasus::CIMConstProperty& source, const std::string& name);
+    void MirrorMethod(const Pegasus::CIMConstMethod& source, const std::string& name);
+    void MirrorParameter(const Pegasus::CIMConstParameter& source, TPEGASUSMethodDecl& method);
+    TCIMValue::TCIMType PropertyType(const Pegasus::CIMConstProperty& source, const std::string& name) const;
+    template <typename TSource> TCIMValue ValueOf(const TSource& source, const std::string& name) const;
+    boost::shared_ptr<ICIMQualifierDecl> DeclarationOf(const Pegasus::CIMName& qualifier);
+    boost::shared_ptr<ICIMQualifierDecl> FetchDeclaration(const Pegasus::CIMName& qualifier, const std::string& name);
+
+    TPEGASUSClass& fTarget;
+    TPEGASUSNamespace& fNamespace;
+    std::set<std::string> fUnknownQualifiers;
+};
+
+} // namespace NKOLVRX20
+
+#endif

@@ -1,0 +1,77 @@
+#include "src/schema/TPEGASUSMethodDecl.h"
+
+#include <utility>
+
+#include "src/namespace/TPEGASUSNamespace.h"
+#include "src/schema/TPEGASUSClass.h"
+#include "src/schema/TPEGASUSParameterDecl.h"
+#include "src/schema/VisitInOrder.h"
+
+namespace NKOLVRX20 {
+
+TPEGASUSMethodDecl::TPEGASUSMethodDecl(const boost::shared_ptr<TPEGASUSClass>& owner, std::string name,
+                                       TCIMValue::TCIMType returnType)
+    : fOwner(owner), fName(std::move(name)), fReturnType(returnType)
+{
+}
+
+void TPEGASUSMethodDecl::Validate(TCIMContext) {}
+
+void TPEGASUSMethodDecl::AddToClass(TCIMContext)
+{
+    boost::shared_ptr<TPEGASUSClass>(fOwner)->AddMethodDecl(shared_from_this());
+}
+
+std::string TPEGASUSMethodDecl::GetName(TCIMContext) const
+{
+    return fName;
+}
+
+boost::shared_ptr<ICIMClass> TPEGASUSMethodDecl::GetClass(TCIMContext) const
+{
+    return fOwner.lock();
+}
+
+TCIMValue::TCIMType TPEGASUSMethodDecl::GetReturnType(TCIMContext) const
+{
+    return fReturnType;
+}
+
+boost::shared_ptr<ICIMParameterDecl> TPEGASUSMethodDecl::AllocateParameterDecl(const std::string& name,
+                                                                               TCIMValue::TCIMType type, TCIMContext)
+{
+    return boost::make_shared<TPEGASUSParameterDecl>(shared_from_this(), name, type);
+}
+
+boost::shared_ptr<ICIMParameterDecl> TPEGASUSMethodDecl::GetParameterDecl(const std::string& name, TCIMContext) const
+{
+    const auto entry = fParameters.find(TPEGASUSNamespace::NormalizeName(name));
+    return entry == fParameters.end() ? nullptr : entry->second;
+}
+
+void TPEGASUSMethodDecl::EnumerateParameterDecls(TParameterDeclVisitor visitor, TCIMContext) const
+{
+    VisitInOrder(fParameters, visitor);
+}
+
+bool TPEGASUSMethodDecl::operator==(const ICIMMethodDecl& other) const
+{
+    return fName == other.GetName({});
+}
+
+bool TPEGASUSMethodDecl::operator<(const ICIMMethodDecl& other) const
+{
+    return fName < other.GetName({});
+}
+
+ICIMMethodDecl& TPEGASUSMethodDecl::operator=(const ICIMMethodDecl&)
+{
+    return *this;
+}
+
+void TPEGASUSMethodDecl::AddParameterDecl(const boost::shared_ptr<TPEGASUSParameterDecl>& declaration)
+{
+    fParameters[TPEGASUSNamespace::NormalizeName(declaration->GetName({}))] = declaration;
+}
+
+} // namespace NKOLVRX20

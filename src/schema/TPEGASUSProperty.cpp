@@ -1,0 +1,107 @@
+#include "src/schema/TPEGASUSProperty.h"
+
+#include <utility>
+
+#include <host/ICIMPropertyDecl.h>
+
+#include "src/schema/DeclaredType.h"
+#include "src/schema/PropertyDisplay.h"
+
+namespace NKOLVRX20 {
+
+TPEGASUSProperty::TPEGASUSProperty(TCIMValue value, const boost::shared_ptr<ICIMPropertyDecl>& declaration,
+                                   const boost::shared_ptr<ICIMClass>& owner)
+    : fValue(std::move(value)), fDeclaration(declaration), fOwner(owner)
+{
+}
+
+TCIMValue::TCIMType TPEGASUSProperty::GetType(TCIMContext context) const
+{
+    const auto declaration = fDeclaration.lock();
+    return declaration ? declaration->GetType(context) : DeclaredType(fValue);
+}
+
+bool TPEGASUSProperty::IsArray(TCIMContext context) const
+{
+    return GetType(context).IsArray();
+}
+
+bool TPEGASUSProperty::IsDefaultValue(TCIMContext context) const
+{
+    const auto declaration = fDeclaration.lock();
+    return declaration && declaration->GetDefaultValue(context) == fValue;
+}
+
+TCIMValue TPEGASUSProperty::GetValue(TCIMContext) const
+{
+    return fValue;
+}
+
+void TPEGASUSProperty::SetValue(TCIMValue value, TCIMContext)
+{
+    fValue = std::move(value);
+}
+
+bool TPEGASUSProperty::GetPropagated(TCIMContext context) const
+{
+    const auto declaration = fDeclaration.lock();
+    return declaration && declaration->GetClass(context) != fOwner.lock();
+}
+
+boost::shared_ptr<ICIMPropertyDecl> TPEGASUSProperty::GetDeclaration(TCIMContext) const
+{
+    return fDeclaration.lock();
+}
+
+bool TPEGASUSProperty::operator==(const ICIMProperty& other) const
+{
+    return fValue == other.GetValue({});
+}
+
+bool TPEGASUSProperty::operator<(const ICIMProperty& other) const
+{
+    return fValue < other.GetValue({});
+}
+
+ICIMProperty& TPEGASUSProperty::operator=(const ICIMProperty& other)
+{
+    fValue = other.GetValue({});
+    return *this;
+}
+
+TCIMValue TPEGASUSProperty::GetPrevValue() const
+{
+    return fPrevValue;
+}
+
+void TPEGASUSProperty::SetPrevValue(TCIMValue value)
+{
+    fPrevValue = std::move(value);
+}
+
+void TPEGASUSProperty::SetPrevValue()
+{
+    fPrevValue = fValue;
+}
+
+bool TPEGASUSProperty::IsPrevValueDifferent() const
+{
+    return fPrevValue != fValue;
+}
+
+std::string TPEGASUSProperty::ToString() const
+{
+    return JoinDisplayTexts(DisplayTexts(fValue, fDeclaration.lock()));
+}
+
+std::string TPEGASUSProperty::PrevValueToString() const
+{
+    return JoinDisplayTexts(DisplayTexts(fPrevValue, fDeclaration.lock()));
+}
+
+std::vector<std::string> TPEGASUSProperty::ToStringVector() const
+{
+    return DisplayTexts(fValue, fDeclaration.lock());
+}
+
+} // namespace NKOLVRX20

@@ -1,0 +1,73 @@
+#include "src/schema/TPEGASUSPropertyDecl.h"
+
+#include <utility>
+
+#include "src/schema/DeclaredType.h"
+#include "src/schema/TPEGASUSClass.h"
+
+namespace NKOLVRX20 {
+
+TPEGASUSPropertyDecl::TPEGASUSPropertyDecl(const boost::shared_ptr<TPEGASUSClass>& owner, std::string name,
+                                           TCIMValue defaultValue)
+    : fOwner(owner), fName(std::move(name)), fType(DeclaredType(defaultValue)), fDefaultValue(std::move(defaultValue))
+{
+}
+
+void TPEGASUSPropertyDecl::Validate(TCIMContext) {}
+
+void TPEGASUSPropertyDecl::AddToClass(TCIMContext)
+{
+    boost::shared_ptr<TPEGASUSClass>(fOwner)->AddPropertyDecl(shared_from_this());
+}
+
+void TPEGASUSPropertyDecl::RemoveFromClass(TCIMContext)
+{
+    throw TVRXException(TVRXStatusCode::kNotSupported);
+}
+
+std::string TPEGASUSPropertyDecl::GetName(TCIMContext) const
+{
+    return fName;
+}
+
+boost::shared_ptr<ICIMClass> TPEGASUSPropertyDecl::GetClass(TCIMContext) const
+{
+    return fOwner.lock();
+}
+
+TCIMValue::TCIMType TPEGASUSPropertyDecl::GetType(TCIMContext) const
+{
+    return fType;
+}
+
+bool TPEGASUSPropertyDecl::IsArray(TCIMContext) const
+{
+    return fType.IsArray();
+}
+
+TCIMValue TPEGASUSPropertyDecl::GetDefaultValue(TCIMContext) const
+{
+    return fDefaultValue;
+}
+
+void TPEGASUSPropertyDecl::SetDefaultValue(TCIMValue value, TCIMContext)
+{
+    fDefaultValue = std::move(value);
+}
+
+bool TPEGASUSPropertyDecl::operator==(const ICIMPropertyDecl& other) const
+{
+    return fName == other.GetName({});
+}
+
+bool TPEGASUSPropertyDecl::operator<(const ICIMPropertyDecl& other) const
+{
+    return fName < other.GetName({});
+}
+
+ICIMPropertyDecl& TPEGASUSPropertyDecl::operator=(const ICIMPropertyDecl&)
+{
+    return *this;
+}
+
+} // namespace NKOLVRX20

@@ -1,0 +1,97 @@
+#include "src/schema/TPEGASUSQualifierDecl.h"
+
+#include <utility>
+
+#include <host/TVRXException.h>
+
+#include "src/namespace/TPEGASUSNamespace.h"
+#include "src/schema/DeclaredType.h"
+#include "src/schema/QualifierBits.h"
+
+namespace NKOLVRX20 {
+
+TPEGASUSQualifierDecl::TPEGASUSQualifierDecl(const boost::shared_ptr<TPEGASUSNamespace>& ns, std::string name,
+                                             TCIMValue defaultValue, EScope scope, EFlavor flavor)
+    : fName(std::move(name)), fType(DeclaredType(defaultValue)), fDefaultValue(std::move(defaultValue)), fScope(scope),
+      fFlavor(flavor), fNamespace(ns)
+{
+}
+
+void TPEGASUSQualifierDecl::Validate(TCIMContext) {}
+
+void TPEGASUSQualifierDecl::AddToNamespace(TCIMContext)
+{
+    boost::shared_ptr<TPEGASUSNamespace>(fNamespace)->AddQualifierDecl(shared_from_this());
+}
+
+void TPEGASUSQualifierDecl::RemoveQualifierDecl(TCIMContext)
+{
+    throw TVRXException(TVRXStatusCode::kNotSupported);
+}
+
+std::string TPEGASUSQualifierDecl::GetName(TCIMContext) const
+{
+    return fName;
+}
+
+boost::shared_ptr<ICIMNamespace> TPEGASUSQualifierDecl::GetNamespace(TCIMContext) const
+{
+    return fNamespace.lock();
+}
+
+TCIMValue::TCIMType TPEGASUSQualifierDecl::GetType(TCIMContext) const
+{
+    return fType;
+}
+
+bool TPEGASUSQualifierDecl::IsArray(TCIMContext) const
+{
+    return fType.IsArray();
+}
+
+TCIMValue TPEGASUSQualifierDecl::GetDefaultValue(TCIMContext) const
+{
+    return fDefaultValue;
+}
+
+void TPEGASUSQualifierDecl::SetDefaultValue(TCIMValue value, TCIMContext)
+{
+    fDefaultValue = std::move(value);
+}
+
+ICIMQualifierDecl::EScope TPEGASUSQualifierDecl::GetScope(TCIMContext) const
+{
+    return fScope;
+}
+
+void TPEGASUSQualifierDecl::SetFlavor(EFlavor flavor, TCIMContext)
+{
+    fFlavor = WithBits(fFlavor, flavor);
+}
+
+void TPEGASUSQualifierDecl::UnsetFlavor(EFlavor flavor, TCIMContext)
+{
+    fFlavor = WithoutBits(fFlavor, flavor);
+}
+
+ICIMQualifierDecl::EFlavor TPEGASUSQualifierDecl::GetFlavor(TCIMContext) const
+{
+    return fFlavor;
+}
+
+bool TPEGASUSQualifierDecl::operator==(const ICIMQualifierDecl& other) const
+{
+    return fName == other.GetName({});
+}
+
+bool TPEGASUSQualifierDecl::operator<(const ICIMQualifierDecl& other) const
+{
+    return fName < other.GetName({});
+}
+
+ICIMQualifierDecl& TPEGASUSQualifierDecl::operator=(const ICIMQualifierDecl&)
+{
+    return *this;
+}
+
+} // namespace NKOLVRX20

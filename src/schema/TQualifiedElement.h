@@ -1,0 +1,71 @@
+#ifndef SRC_SCHEMA_TQUALIFIEDELEMENT_H
+#define SRC_SCHEMA_TQUALIFIEDELEMENT_H
+
+#include <string>
+
+#include <boost/enable_shared_from_this.hpp>
+#include <boost/make_shared.hpp>
+
+#include <host/ICIMNamedElement.h>
+#include <host/TVRXException.h>
+
+#include "src/schema/TPEGASUSQualifier.h"
+#include "src/schema/TQualifierSet.h"
+
+namespace NKOLVRX20 {
+
+// The qualifier half of every named element: TSelf is the element's class, TInterface the host's interface to it.
+// Ownership: TSelf is always held by boost::shared_ptr; its qualifiers point back weakly.
+template <typename TSelf, typename TInterface>
+class TQualifiedElement : public TInterface, public boost::enable_shared_from_this<TSelf>
+{
+  public:
+    using TInterface::operator=;
+
+    void AddQualifier(boost::shared_ptr<ICIMQualifier> qualifier, TCIMContext) override { fQualifiers.Add(qualifier); }
+
+    // Throws: TVRXException 14 for a null declaration.
+    boost::shared_ptr<ICIMQualifier> AllocateQualifier(boost::shared_ptr<const ICIMQualifierDecl> declaration,
+                                                       TCIMValue value, ICIMQualifierDecl::EFlavor flavor,
+                                                       TCIMContext) override
+    {
+        if (!declaration)
+            throw TVRXException(TVRXStatusCode::kTypeMismatch);
+        return boost::make_shared<TPEGASUSQualifier>(this->shared_from_this(), declaration, value, flavor);
+    }
+
+    boost::shared_ptr<ICIMQualifier> AllocateQualifier(boost::shared_ptr<const ICIMQualifierDecl> declaration,
+                                                       TCIMValue value, TCIMContext context) override
+    {
+        const auto flavor = declaration ? declaration->GetFlavor(context) : ICIMQualifierDecl::kFlavorNone;
+        return AllocateQualifier(declaration, value, flavor, context);
+    }
+
+    boost::shared_ptr<ICIMQualifier> GetQualifier(const std::string& name, TCIMContext) const override
+    {
+        return fQualifiers.Find(name);
+    }
+
+    boost::shared_ptr<ICIMQualifier> GetQualifier(const std::string& name, bool& found, TCIMContext) const override
+    {
+        const auto qualifier = fQualifiers.Find(name);
+        found = qualifier != nullptr;
+        return qualifier;
+    }
+
+    void EnumerateQualifiers(TQualifierVisitor visitor, TCIMContext) const override { fQualifiers.Enumerate(visitor); }
+
+  private:
+    TQualifierSet fQualifiers;
+};
+
+// Returns: whether the element carries the qualifier with the boolean value true.
+inline bool HasTrueQualifier(const ICIMNamedElement& element, const std::string& name)
+{
+    const auto qualifier = element.GetQualifier(name, {});
+    return qualifier && qualifier->GetValue({}) == TCIMValue(true);
+}
+
+} // namespace NKOLVRX20
+
+#endif
