@@ -1,21 +1,17 @@
 #include "TChildProcess.h"
 
-#include "TProcessControl.h"
-
 #include <algorithm>
 #include <cerrno>
 #include <csignal>
 
-#include <fcntl.h>
 #include <poll.h>
-#include <spawn.h>
 #include <sys/wait.h>
 
 extern "C" {
 #include <sys/pidfd.h> // C only in glibc 2.36
 }
 
-extern char** environ;
+#include "TProcessControl.h"
 
 namespace NKOLVRX20 {
 namespace {
@@ -26,87 +22,6 @@ constexpr std::chrono::milliseconds kExitPollInterval{20};
 // Read at a time: more than a pipe holds, so that nothing is missed after the exit, but bounded, so that a program that
 // never stops writing cannot keep the deadline from being looked at.
 constexpr int kMaxReadsAtOnce = 16;
-
-// RAII for the two plain structures of posix_spawn.
-struct TSpawnSettings
-{
-    posix_spawnattr_t fAttributes;
-    posix_spawn_file_actions_t fActions;
-
-    TSpawnSettings()
-    {
-        posix_spawnattr_init(&fAttributes);
-        posix_spawn_file_actions_init(&fActions);
-    }
-    ~TSpawnSettings()
-    {
-        posix_spawn_file_actions_destroy(&fActions);
-        posix_spawnattr_destroy(&fAttributes);
-    }
-    TSpawnSettings(const TSpawnSettings&) = delete;
-    TSpawnSettings& operator=(const TSpawnSettings&) = delete;
-};
-
-void SetFreshSignalsAndGroup(posix_spawnattr_t& attributes)
-{
-    sigset_t all, none;
-    sigfillset(&all);
-    sigemptyset(&none);
-    posix_spawnattr_setsigdefault(&attributes, &all);
-    posix_spawnattr_setsigmask(&attributes, &none);
-    posix_spawnattr_setpgroup(&attributes, 0);
-    posix_spawnattr_setflags(&attributes, POSIX_SPAWN_SETSIGDEF | POSIX_SPAWN_SETSIGMASK | POSIX_SPAWN_SETPGROUP);
-}
-
-int SetStandardStreams(posix_spawn_file_actions_t& actions, int output, int errorOutput)
-{
-    int error = posix_spawn_file_actions_addopen(&actions, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
-    if (!error)
-        error = posix_spawn_file_actions_adddup2(&actions, output, STDOUT_FILENO);
-    if (!error)
-        error = posix_spawn_file_actions_adddup2(&actions, errorOutput, STDERR_FILENO);
-    if (!error)
-        error = posix_spawn_file_actions_addclosefrom_np(&actions, STDERR_FILENO + 1);
-    return error;
-}
-
-std::vector<char*> ToPointers(const std::vector<std::string>& texts)
-{
-    std::vector<char*> pointers;
-    pointers.reserve(texts.size() + 1);
-    for (const std::string& text : texts)
-        pointers.push_back(const_cast<char*>(text.c_str()));
-    pointers.push_back(nullptr);
-    return pointers;
-}
-
-// In a process whose standard streams are closed, a pipe could land on 0 to 2 and be overwritten in the child.
-int MoveAboveStandardStreams(UniqueFd& fd)
-{
-    if (fd.Get() > STDERR_FILENO)
-        return 0;
-    UniqueFd moved(::fcntl(fd.Get(), F_DUPFD_CLOEXEC, STDERR_FILENO + 1));
-    if (!moved)
-        return errno;
-    fd = std::move(moved);
-    return 0;
-}
-
-int OpenPipe(UniqueFd& readEnd, UniqueFd& writeEnd)
-{
-    int ends[2];
-    if (::pipe2(ends, O_CLOEXEC) != 0)
-        return errno;
-    readEnd = UniqueFd(ends[0]);
-    writeEnd = UniqueFd(ends[1]);
-    int error = MoveAboveStandardStreams(readEnd);
-    if (!error)
-        error = MoveAboveStandardStreams(writeEnd);
-    // Only our end: the child's stays as a program expects it.
-    if (!error && ::fcntl(readEnd.Get(), F_SETFL, O_NONBLOCK) != 0)
-        error = errno;
-    return error;
-}
 
 } // namespace
 
@@ -141,25 +56,12 @@ int TChildProcess::Start()
     if (!error)
         error = OpenPipe(fErrorPipe.fRead, fErrorPipe.fWrite);
     if (!error)
-        error = Spawn();
+        error = SpawnChild(fRequest, fOutputPipe.fWrite.Get(), fErrorPipe.fWrite.Get(), fPid);
     fOutputPipe.fWrite.Reset();
     fErrorPipe.fWrite.Reset();
     if (!error)
         fPidFd = UniqueFd(::pidfd_open(fPid, 0));
     return error;
-}
-
-int TChildProcess::Spawn()
-{
-    TSpawnSettings settings;
-    SetFreshSignalsAndGroup(settings.fAttributes);
-    if (const int error = SetStandardStreams(settings.fActions, fOutputPipe.fWrite.Get(), fErrorPipe.fWrite.Get()))
-        return error;
-    const auto arguments = ToPointers(fRequest.fArguments);
-    const auto environment = ToPointers(fRequest.fEnvironment);
-    const auto spawn = fRequest.fSearchPath ? posix_spawnp : posix_spawn;
-    return spawn(&fPid, fRequest.fProgram.c_str(), &settings.fActions, &settings.fAttributes, arguments.data(),
-                 fRequest.fInheritEnvironment ? environ : environment.data());
 }
 
 bool TChildProcess::AwaitExit(TClock::time_point deadline)

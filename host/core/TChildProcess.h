@@ -8,19 +8,10 @@
 
 #include <sys/types.h>
 
+#include "SpawnChild.h"
 #include "UniqueFd.h"
 
 namespace NKOLVRX20 {
-
-// What to run.
-struct TProcessRequest
-{
-    std::string fProgram;                  // a path, or a name to be searched in PATH
-    bool fSearchPath = false;              // PATH of this process
-    std::vector<std::string> fArguments;   // argv, the program's name first
-    std::vector<std::string> fEnvironment; // "NAME=value"
-    bool fInheritEnvironment = false;      // instead of fEnvironment
-};
 
 // What became of it.
 struct TProcessOutcome
@@ -48,8 +39,7 @@ struct TProcessOutcome
 constexpr std::size_t kMaxOutputBytes = 16 * 1024 * 1024;
 constexpr std::size_t kMaxErrorOutputBytes = 64 * 1024;
 
-// One run of a child process: started with default signal dispositions, an empty mask, its own process group, standard
-// input from /dev/null and no descriptor above 2; standard output and error are captured.
+// One run of a child process, started as SpawnChild says; standard output and error are captured.
 // Thread: one at a time; several objects may be used at once.
 class TChildProcess
 {
@@ -72,7 +62,6 @@ class TChildProcess
     };
 
     int Start();
-    int Spawn();
     bool AwaitExit(TClock::time_point deadline);
     bool PollOnce(TClock::time_point deadline);
     bool HasExited() const;

@@ -1,0 +1,147 @@
+#include "Run.h"
+
+#include <cerrno>
+#include <cstring>
+
+#include <core/TProcessControl.h>
+#include <host/TConfig.h>
+#include <host/TRootObject.h>
+
+#include "Collector.h"
+#include "Guard.h"
+#include "Render.h"
+#include "Say.h"
+#include "Session.h"
+
+namespace vrxhost {
+
+using NKOLVRX20::TConfig;
+using NKOLVRX20::TProcessControl;
+using NKOLVRX20::TRootObject;
+
+Run::Run(const TOptions& options)
+    : fOptions(options), fConsumer(options.fConsumer.empty() ? kDefaultConsumer : options.fConsumer),
+      fServer(options.fRoot, fConsumer), fStop([this] { Interrupt(); }), fLosses(options.fRoot)
+{
+    TRootObject::SetCoreLogger(&fLosses);
+    fDocument.fCommand = options.fCommand;
+}
+
+Run::~Run()
+{
+    TRootObject::SetCoreLogger(nullptr);
+}
+
+EExitStatus Run::Execute()
+{
+    try {
+        LoadSettings();
+        SetConsumer();
+        if (!fStop.IsStopped())
+            UsePlugin();
+    } catch (const TPluginError& e) {
+        Fail(e.what());
+    }
+    return GetStatus();
+}
+
+// On the signal thread: waiting programs end, waiting calls fail, and the main thread finds its way out.
+void Run::Interrupt()
+{
+    TProcessControl::Instance().Cancel();
+    fServer.End();
+}
+
+void Run::LoadSettings() const
+{
+    if (!fOptions.fConfigFile.empty()) {
+        const std::string error = Guarded([&] { TConfig::GetInstance()->Load(fOptions.fConfigFile); });
+        if (!error.empty())
+            throw TPluginError("the settings file " + fOptions.fConfigFile + " could not be read: " + error);
+    }
+    for (const auto& setting : fOptions.fSettings)
+        TConfig::GetInstance()->setValue(setting.first, setting.second);
+}
+
+// A server of some other make need not know the setting; that matters only when a name was asked for.
+void Run::SetConsumer() const
+{
+    const std::string error = fServer.SetConsumer();
+    if (!error.empty() && !fOptions.fConsumer.empty())
+        throw TPluginError("the consumer " + fOptions.fConsumer + " could not be set, cimconfig: " + error);
+}
+
+void Run::UsePlugin()
+{
+    Session session(fOptions.fPlugin, fConsumer);
+    Show(session.GetNamespace());
+    const std::string problem = session.Close();
+    if (fStop.IsStopped())
+        return;
+    if (!problem.empty())
+        fLosses.Add(problem);
+    TellLosses(); // of the shutdown
+}
+
+void Run::Show(NKOLVRX20::ICIMNamespace& ns)
+{
+    const std::string error = Guarded([&] {
+        Collector collector(ns, fLosses, [this] { return fStop.IsStopped(); });
+        fDocument.fProviders = collector.Collect(fOptions.fCommand, fOptions.fClassName);
+    });
+    if (!error.empty())
+        fLosses.Add("the inventory is incomplete: " + error);
+    if (fOptions.fCommand == ECommand::kInstances && fDocument.fProviders.empty())
+        Fail("there is no class " + fOptions.fClassName);
+    else
+        Write();
+}
+
+void Run::Write()
+{
+    if (fStop.IsStopped())
+        return;
+    TellLosses();
+    fDocument.fLosses = fLosses.GetSentences();
+    fDocument.fComplete = fDocument.fLosses.empty();
+    const std::string text = fOptions.fFormat == EFormat::kJson ? RenderJson(fDocument) : RenderTable(fDocument);
+    fWriteError = fOutput.Write(text, fStop.GetFd());
+    // A reader that has seen enough is no failure worth a word.
+    if (fWriteError != 0 && fWriteError != EPIPE && fWriteError != ECANCELED)
+        Say(std::string("the document could not be written: ") + std::strerror(fWriteError));
+}
+
+// There is no inventory; a reader of JSON still gets a document.
+void Run::Fail(const std::string& reason)
+{
+    if (fStop.IsStopped())
+        return;
+    fFailed = true;
+    fLosses.Add(reason);
+    if (fOptions.fFormat == EFormat::kJson)
+        Write();
+    else
+        TellLosses();
+}
+
+// Says those that were not said yet.
+void Run::TellLosses()
+{
+    fLosses.AddFailedPrograms(!fFailed);
+    const auto sentences = fLosses.GetSentences();
+    for (; fToldCount < sentences.size(); ++fToldCount)
+        Say(sentences[fToldCount]);
+}
+
+EExitStatus Run::GetStatus() const
+{
+    if (fStop.IsStopped()) {
+        Say("interrupted");
+        return kInterrupted;
+    }
+    if (fFailed || fWriteError != 0)
+        return kFailed;
+    return fToldCount == 0 ? kComplete : kPartial;
+}
+
+} // namespace vrxhost

@@ -1,0 +1,54 @@
+#ifndef VRX_CLI_RUN_H
+#define VRX_CLI_RUN_H
+
+#include <cstddef>
+#include <string>
+
+#include <host/ICIMNamespace.h>
+
+#include "Document.h"
+#include "DocumentOutput.h"
+#include "LossLog.h"
+#include "Options.h"
+#include "PrivateServer.h"
+#include "StopSignals.h"
+
+namespace vrxhost {
+
+// One run of the program after the command line: everything between the signals' set-up and the exit status.
+// Thread: made before any other thread of the process, used by the one that made it.
+class Run
+{
+  public:
+    // The options outlive the object.
+    explicit Run(const TOptions& options);
+    ~Run();
+
+    EExitStatus Execute();
+
+  private:
+    void Interrupt();
+    void LoadSettings() const;
+    void SetConsumer() const;
+    void UsePlugin();
+    void Show(NKOLVRX20::ICIMNamespace& ns);
+    void Write();
+    void Fail(const std::string& reason);
+    void TellLosses();
+    EExitStatus GetStatus() const;
+
+    const TOptions& fOptions;
+    const std::string fConsumer;
+    const PrivateServer fServer;
+    StopSignals fStop; // before every other thread
+    DocumentOutput fOutput;
+    LossLog fLosses;
+    TDocument fDocument;
+    bool fFailed = false;
+    std::size_t fToldCount = 0; // of the losses
+    int fWriteError = 0;
+};
+
+} // namespace vrxhost
+
+#endif

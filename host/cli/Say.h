@@ -1,0 +1,13 @@
+#ifndef VRX_CLI_SAY_H
+#define VRX_CLI_SAY_H
+
+#include <string>
+
+namespace vrxhost {
+
+// Tells the user a sentence of the host's own, on standard error.
+void Say(const std::string& sentence);
+
+} // namespace vrxhost
+
+#endif

@@ -1,0 +1,34 @@
+#ifndef VRX_SPAWNCHILD_H
+#define VRX_SPAWNCHILD_H
+
+#include <string>
+#include <vector>
+
+#include <sys/types.h>
+
+#include "UniqueFd.h"
+
+namespace NKOLVRX20 {
+
+// What to run.
+struct TProcessRequest
+{
+    std::string fProgram;                  // a path, or a name to be searched in PATH
+    bool fSearchPath = false;              // PATH of this process
+    std::vector<std::string> fArguments;   // argv, the program's name first
+    std::vector<std::string> fEnvironment; // "NAME=value"
+    bool fInheritEnvironment = false;      // instead of fEnvironment
+};
+
+// Opens a close-on-exec pipe above the standard streams whose read end does not block.
+// Returns: an errno, 0 for success.
+int OpenPipe(UniqueFd& readEnd, UniqueFd& writeEnd);
+
+// Starts a child with default signal dispositions, an empty mask, its own process group, standard input from /dev/null,
+// the two descriptors as standard output and error, and no other descriptor.
+// Returns: an errno, also of a failed exec; 0 for success, pid is then the child's.
+int SpawnChild(const TProcessRequest& request, int output, int errorOutput, pid_t& pid);
+
+} // namespace NKOLVRX20
+
+#endif
