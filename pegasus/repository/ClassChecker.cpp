@@ -1,5 +1,6 @@
 #include "pegasus/repository/ClassChecker.h"
 
+#include "pegasus/repository/EmbeddedTypes.h"
 #include "pegasus/repository/Failure.h"
 
 namespace Pegasus::repository {
@@ -61,13 +62,25 @@ template <class Element> void checkOverrides(const Element& element, const Eleme
     }
 }
 
+/// A string may become one that holds embedded objects (the standard schema does so).
+bool isSameKind(const CIMConstProperty& property, const CIMConstProperty& inherited)
+{
+    const auto travelsAsString = [](const CIMConstProperty& any) {
+        const CIMType type = any.getType();
+        return type == CIMTYPE_STRING || type == CIMTYPE_OBJECT || type == CIMTYPE_INSTANCE;
+    };
+    const bool isSameType =
+        property.getType() == inherited.getType() || (travelsAsString(property) && travelsAsString(inherited));
+    return isSameType && property.isArray() == inherited.isArray();
+}
+
 void checkOverriddenProperty(const CIMConstProperty& property, const CIMConstClass& superClass)
 {
     const Uint32 index = superClass.findProperty(property.getName());
     if (index == PEG_NOT_FOUND)
         return;
     const CIMConstProperty inherited = superClass.getProperty(index);
-    if (property.getType() != inherited.getType() || property.isArray() != inherited.isArray())
+    if (!isSameKind(property, inherited))
         fail(CIM_ERR_FAILED, "type mismatch");
     checkOverrides(property, inherited);
 }
@@ -90,7 +103,7 @@ CIMProperty Checker::checkProperty(const CIMConstProperty& property, bool isAsso
         fail(CIM_ERR_INVALID_PARAMETER, "Non-association class contains reference property");
     if (property.isArray() && isTrue(property, kKey))
         fail(CIM_ERR_INVALID_PARAMETER, "key property " + utf8(property.getName()) + " is an array");
-    CIMProperty checked(property.getName(), property.getValue(), property.getArraySize(),
+    CIMProperty checked(property.getName(), embeddedValue(property), property.getArraySize(),
                         property.getReferenceClassName());
     checkQualifiers(checked, property, isReference ? CIMScope::REFERENCE : CIMScope::PROPERTY);
     if (!fSuperClass.isUninitialized())

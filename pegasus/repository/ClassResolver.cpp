@@ -13,9 +13,10 @@ template <class To, class From> void shareQualifiers(To& to, From& from)
         to.addQualifier(from.getQualifier(i));
 }
 
+/// Backwards, as OpenPegasus gives them out.
 template <class To, class From, class Local> void inheritQualifiers(To& to, From& from, Local& local)
 {
-    for (Uint32 i = 0; i < from.getQualifierCount(); ++i) {
+    for (Uint32 i = from.getQualifierCount(); i-- > 0;) {
         const CIMQualifier inherited = from.getQualifier(i);
         if (inherited.getFlavor().hasFlavor(CIMFlavor::TOSUBCLASS) &&
             local.findQualifier(inherited.getName()) == PEG_NOT_FOUND)

@@ -3,6 +3,7 @@
 #include "pegasus/repository/ClassChecker.h"
 #include "pegasus/repository/ClassFilter.h"
 #include "pegasus/repository/ClassResolver.h"
+#include "pegasus/repository/EmbeddedTypes.h"
 #include "pegasus/repository/Failure.h"
 #include "pegasus/repository/Names.h"
 
@@ -23,7 +24,7 @@ CIMClass ClassStore::resolved(NamespaceId nameSpace, const CIMName& name)
     const std::optional<std::string> text = fStorage.findClass(nameSpace, key);
     if (!text)
         return CIMClass();
-    const CIMClass local = fTexts.toClass(*text);
+    const CIMClass local = withEmbeddedTypes(fTexts.toClass(*text));
     const CIMName superName = local.getSuperClassName();
     const CIMClass whole = resolveClass(local, superName.isNull() ? CIMClass() : resolved(nameSpace, superName));
     fCache.insert(nameSpace, key, whole);

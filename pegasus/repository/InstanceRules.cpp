@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "pegasus/repository/ClassFilter.h"
+#include "pegasus/repository/EmbeddedTypes.h"
 #include "pegasus/repository/Failure.h"
 #include "pegasus/repository/Names.h"
 
@@ -27,7 +28,7 @@ CIMProperty propertyOf(const CIMConstProperty& declared, const CIMValue& value, 
 CIMProperty givenProperty(const CIMConstProperty& given, const CIMConstClass& itsClass)
 {
     const CIMConstProperty declared = declaredProperty(itsClass, given.getName());
-    if (given.getType() != declared.getType() || given.isArray() != declared.isArray())
+    if (!isStorableAs(given, declared))
         fail(CIM_ERR_FAILED, "type mismatch");
     return propertyOf(declared, given.getValue(), false);
 }

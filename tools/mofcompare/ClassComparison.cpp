@@ -16,9 +16,16 @@ std::string utf8(const CIMName& name)
     return name.isNull() ? std::string("(none)") : utf8(name.getString());
 }
 
+/// Embedded objects are declared, and travel, as strings.
+std::string shown(CIMType type)
+{
+    const bool isEmbedded = type == CIMTYPE_OBJECT || type == CIMTYPE_INSTANCE;
+    return cimTypeToString(isEmbedded ? CIMTYPE_STRING : type);
+}
+
 std::string shown(const CIMValue& value)
 {
-    return std::string(cimTypeToString(value.getType())) + (value.isArray() ? "[] " : " ") +
+    return shown(value.getType()) + (value.isArray() ? "[] " : " ") +
            (value.isNull() ? "null" : "\"" + utf8(value.toString()) + "\"");
 }
 
@@ -99,7 +106,7 @@ void Comparison::compareParameter(const std::string& where, const CIMConstParame
                                   const CIMConstParameter& readBack)
 {
     expectEqual(where, utf8(source.getName()), utf8(readBack.getName()));
-    expectEqual(where, cimTypeToString(source.getType()), cimTypeToString(readBack.getType()));
+    expectEqual(where, shown(source.getType()), shown(readBack.getType()));
     expectEqual(where + " array", std::to_string(source.isArray()), std::to_string(readBack.isArray()));
     expectEqual(where + " array size", std::to_string(source.getArraySize()), std::to_string(readBack.getArraySize()));
     expectEqual(where + " reference class", utf8(source.getReferenceClassName()),
@@ -110,7 +117,7 @@ void Comparison::compareParameter(const std::string& where, const CIMConstParame
 void Comparison::compareMethod(const std::string& where, const CIMConstMethod& source, const CIMConstMethod& readBack)
 {
     expectEqual(where, utf8(source.getName()), utf8(readBack.getName()));
-    expectEqual(where, cimTypeToString(source.getType()), cimTypeToString(readBack.getType()));
+    expectEqual(where, shown(source.getType()), shown(readBack.getType()));
     compareQualifiers(where, source, readBack);
     expectEqual(where + " parameters", std::to_string(source.getParameterCount()),
                 std::to_string(readBack.getParameterCount()));

@@ -1,0 +1,78 @@
+#include "pegasus/repository/EmbeddedTypes.h"
+
+namespace Pegasus::repository {
+
+namespace {
+
+bool isEmbedded(CIMType type)
+{
+    return type == CIMTYPE_OBJECT || type == CIMTYPE_INSTANCE;
+}
+
+bool hasQualifier(const CIMConstProperty& property, const char* name)
+{
+    return property.findQualifier(CIMName(name)) != PEG_NOT_FOUND;
+}
+
+bool changesType(const CIMConstProperty& property)
+{
+    return embeddedType(property) != property.getType();
+}
+
+CIMProperty retyped(CIMProperty property)
+{
+    CIMProperty result(property.getName(), embeddedValue(property), property.getArraySize(),
+                       property.getReferenceClassName(), property.getClassOrigin(), property.getPropagated());
+    for (Uint32 i = 0; i < property.getQualifierCount(); ++i)
+        result.addQualifier(property.getQualifier(i));
+    return result;
+}
+
+} // namespace
+
+CIMType embeddedType(const CIMConstProperty& property)
+{
+    const CIMType type = property.getType();
+    if (type != CIMTYPE_STRING && !isEmbedded(type))
+        return type;
+    if (hasQualifier(property, "EmbeddedInstance"))
+        return property.isArray() ? CIMTYPE_STRING : CIMTYPE_INSTANCE;
+    return hasQualifier(property, "EmbeddedObject") ? CIMTYPE_STRING : type;
+}
+
+CIMValue embeddedValue(const CIMConstProperty& property)
+{
+    const CIMType type = embeddedType(property);
+    return type == property.getType() ? property.getValue()
+                                      : CIMValue(type, property.isArray(), property.getArraySize());
+}
+
+CIMClass withEmbeddedTypes(CIMClass decoded)
+{
+    bool isAsIs = true;
+    for (Uint32 i = 0; i < decoded.getPropertyCount(); ++i)
+        isAsIs = isAsIs && !changesType(decoded.getProperty(i));
+    if (isAsIs)
+        return decoded;
+    CIMClass result(decoded.getClassName(), decoded.getSuperClassName());
+    for (Uint32 i = 0; i < decoded.getQualifierCount(); ++i)
+        result.addQualifier(decoded.getQualifier(i));
+    for (Uint32 i = 0; i < decoded.getPropertyCount(); ++i)
+        result.addProperty(retyped(decoded.getProperty(i)));
+    for (Uint32 i = 0; i < decoded.getMethodCount(); ++i)
+        result.addMethod(decoded.getMethod(i));
+    return result;
+}
+
+bool isStorableAs(const CIMConstProperty& given, const CIMConstProperty& declared)
+{
+    if (given.isArray() != declared.isArray())
+        return false;
+    if (given.getType() == declared.getType())
+        return true;
+    const bool holdsEmbedded = isEmbedded(declared.getType()) || hasQualifier(declared, "EmbeddedObject") ||
+                               hasQualifier(declared, "EmbeddedInstance");
+    return holdsEmbedded && (isEmbedded(given.getType()) || given.getValue().isNull());
+}
+
+} // namespace Pegasus::repository
