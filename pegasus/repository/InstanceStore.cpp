@@ -9,6 +9,7 @@ namespace {
 
 /// Enough to spread the cost of a query, little enough to keep memory flat.
 constexpr std::size_t kBatchSize = 64;
+constexpr std::size_t kBatchBytes = 1u << 20;
 
 CIMObjectPath withoutNamespace(CIMObjectPath path)
 {
@@ -59,7 +60,7 @@ std::vector<CIMInstance> InstanceStore::nextBatch(NamespaceId nameSpace, const C
 {
     const CIMClass itsClass = classOf(nameSpace, className);
     std::vector<CIMInstance> batch;
-    for (const InstanceRow& row : fStorage.listInstances(nameSpace, utf8(className), after, kBatchSize)) {
+    for (const InstanceRow& row : fStorage.listInstances(nameSpace, utf8(className), after, kBatchSize, kBatchBytes)) {
         after = row.sequence;
         batch.push_back(withPath(nameSpace, row.body));
         filterInstance(batch.back(), options.deepInheritance ? CIMClass() : itsClass, options);

@@ -199,13 +199,16 @@ void Storage::deleteInstance(std::int64_t sequence)
 }
 
 std::vector<InstanceRow> Storage::listInstances(NamespaceId id, const std::string& className, std::int64_t after,
-                                                std::size_t limit)
+                                                std::size_t limit, std::size_t maxBytes)
 {
     std::vector<InstanceRow> found;
     Rows rows =
         fStatements->listInstances.run(id, std::string_view(className), after, static_cast<std::int64_t>(limit));
-    while (rows.next())
+    std::size_t bytes = 0;
+    while (bytes < maxBytes && rows.next()) {
         found.push_back(InstanceRow{rows.integer(0), std::string(rows.text(1))});
+        bytes += found.back().body.size();
+    }
     return found;
 }
 

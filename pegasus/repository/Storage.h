@@ -54,9 +54,10 @@ class Storage
     void insertInstance(NamespaceId id, const std::string& className, const std::string& path, const std::string& body);
     void updateInstance(std::int64_t sequence, const std::string& body);
     void deleteInstance(std::int64_t sequence);
-    /// Instances of the class and of all below it that were created behind `after`, at most limit of them.
+    /// Instances of the class and of all below it that were created behind `after`: at most limit of them, and no
+    /// further one when maxBytes are reached.
     std::vector<InstanceRow> listInstances(NamespaceId id, const std::string& className, std::int64_t after,
-                                           std::size_t limit);
+                                           std::size_t limit, std::size_t maxBytes);
 
   private:
     struct Statements;

@@ -127,6 +127,27 @@ TEST(Durability, IsThereAgainAfterReopening)
     EXPECT_EQ(utf8(repository.enumerateInstanceNames(kNamespace, CIMName("C0")).at(1).toString()), "C1.id=\"i\"");
 }
 
+TEST(Durability, KeepsTextsThatAreHardToWriteDown)
+{
+    const TemporaryDirectory directory;
+    const char* const texts[] = {
+        "a\\x1\\x8\\x1fb", "\\xD800", "\\xDC00\\xD800", "\\xFFFE\\xFFFF",    " lead and trail ",
+        "a\\n\\r\\tb",     "",        "]]>&<\\\"'",     "\\xD83D\\xDE00 é名"};
+    std::vector<std::string> before;
+    const auto name = [](std::size_t i) { return CIMName(("T" + std::to_string(i)).c_str()); };
+    {
+        Repository repository(directory.path());
+        for (std::size_t i = 0; i < std::size(texts); ++i) {
+            compileText(repository, "root/test",
+                        "class T" + std::to_string(i) + " { string s = \"" + texts[i] + "\"; };");
+            before.push_back(describe(repository.getClass(kNamespace, name(i), {})));
+        }
+    }
+    const Repository repository(directory.path());
+    for (std::size_t i = 0; i < std::size(texts); ++i)
+        EXPECT_EQ(describe(repository.getClass(kNamespace, name(i), {})), before[i]) << texts[i];
+}
+
 TEST(Durability, GoesOnWhenItsDirectoryIsDeleted)
 {
     const TemporaryDirectory tree;
