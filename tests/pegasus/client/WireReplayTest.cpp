@@ -125,7 +125,7 @@ test::PeerAnswer recordedAnswer(const WireCase& wireCase, const test::PeerReques
     answer.closesAfterwards = true;
     answer.neverAnswers = answer.bytes.empty() && wireCase.name == "fault-silent";
     if (wireCase.name == "fault-drip")
-        answer = answer.bytes.empty() ? answer : test::PeerAnswer{answer.bytes, 1, std::chrono::milliseconds(20)};
+        answer = test::inPieces(answer, 1, std::chrono::milliseconds(20));
     if (wireCase.name == "fault-400-nolength-hold")
         answer.closesAfterwards = false;
     return answer;

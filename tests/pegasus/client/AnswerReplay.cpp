@@ -1,0 +1,182 @@
+#include "AnswerReplay.h"
+
+#include "pegasus/client/HttpResponse.h"
+#include "pegasus/client/ResponseReader.h"
+#include "pegasus/common/ElementEncoder.h"
+#include "support/PeerAnswers.h"
+
+#include <Pegasus/Common/CIMDateTime.h>
+
+#include <cxxabi.h>
+#include <memory>
+
+using namespace Pegasus;
+
+namespace test {
+namespace {
+
+std::string nameOf(const std::type_info& type)
+{
+    const std::unique_ptr<char, decltype(&std::free)> name(abi::__cxa_demangle(type.name(), nullptr, nullptr, nullptr),
+                                                           &std::free);
+    return name.get();
+}
+
+void encodeAgain(const wire::XmlElement& element, wire::ElementDecoder& decoder, std::string& out)
+{
+    if (element.is("CLASS"))
+        wire::appendClass(out, decoder.decodeClass(element));
+    else if (element.is("VALUE.NAMEDINSTANCE"))
+        wire::appendNamedInstance(out, decoder.decodeNamedInstance(element));
+    else if (element.is("INSTANCE"))
+        wire::appendInstance(out, decoder.decodeInstance(element));
+    else if (element.is("QUALIFIER.DECLARATION"))
+        wire::appendQualifierDeclaration(out, decoder.decodeQualifierDeclaration(element));
+    else if (element.is("CLASSNAME"))
+        wire::appendClassName(out, decoder.decodeClassName(element));
+    else if (element.is("RETURNVALUE"))
+        wire::appendReturnValue(out, decoder.decodeReturnValue(element));
+    else if (element.is("PARAMVALUE"))
+        wire::appendParamValue(out, decoder.decodeParamValue(element));
+    else
+        wire::appendInstanceName(out, decoder.decodeInstanceName(element));
+}
+
+PeerRequest requestFor(const std::string& method)
+{
+    PeerRequest request;
+    request.head = "POST /cimom HTTP/1.1\r\nCIMMethod: " + method + "\r\n";
+    request.body = "<MESSAGE ID=\"1000\"";
+    return request;
+}
+
+CIMClass sampleClass()
+{
+    CIMClass cimClass("T_Fan", "CIM_Fan");
+    cimClass.addQualifier(CIMQualifier("Description", String("a <fan> & more é"), CIMFlavor::DEFAULTS));
+    CIMProperty id("DeviceID", CIMValue(CIMTYPE_STRING, false), 0, CIMName(), "CIM_Fan", true);
+    id.addQualifier(CIMQualifier("Key", CIMValue(true), CIMFlavor::TOSUBCLASS));
+    cimClass.addProperty(id);
+    cimClass.addProperty(CIMProperty("Owner", CIMValue(CIMTYPE_REFERENCE, false), 0, "CIM_System"));
+    cimClass.addProperty(CIMProperty("Speeds", CIMValue(CIMTYPE_UINT32, true, 3), 3));
+    CIMMethod method("Spin", CIMTYPE_UINT32);
+    method.addParameter(CIMParameter("To", CIMTYPE_REFERENCE, true, 0, "CIM_Fan"));
+    method.addParameter(CIMParameter("Speed", CIMTYPE_REAL32));
+    cimClass.addMethod(method);
+    return cimClass;
+}
+
+CIMInstance sampleInstance(const char* id)
+{
+    CIMInstance instance("T_Fan");
+    instance.addProperty(CIMProperty("DeviceID", String(id)));
+    instance.addProperty(CIMProperty("Text", String("  \"a\" <b> & 'c'\n\xF0\x9F\x98\x80 ")));
+    instance.addProperty(
+        CIMProperty("Owner", CIMValue(CIMObjectPath("//h:1/root:CIM_System.Name=\"x\",N=-5")), 0, "CIM_System"));
+    instance.addProperty(CIMProperty("Speed", CIMValue(Uint64(18446744073709551615ull))));
+    instance.addProperty(CIMProperty("Load", CIMValue(Real64(0.1))));
+    instance.addProperty(CIMProperty("On", CIMValue(true)));
+    instance.addProperty(CIMProperty("Since", CIMDateTime("20200102030405.678901+060")));
+    Array<String> names;
+    names.append("a");
+    names.append("");
+    instance.addProperty(CIMProperty("Names", names));
+    instance.addProperty(CIMProperty("Inner", CIMValue(CIMInstance("T_Part"))));
+    instance.addProperty(CIMProperty("None", CIMValue(CIMTYPE_SINT16, false)));
+    Array<CIMKeyBinding> keys;
+    keys.append(CIMKeyBinding("DeviceID", String(id), CIMKeyBinding::STRING));
+    keys.append(CIMKeyBinding("System", "CIM_System.Name=\"x\"", CIMKeyBinding::REFERENCE));
+    instance.setPath(CIMObjectPath(String(), CIMNamespaceName(), "T_Fan", keys));
+    return instance;
+}
+
+AnswerCase sample(const char* name, const char* method, const PeerAnswer& answer, bool isIntrinsic = true)
+{
+    return {name, "1000", method, isIntrinsic, answer.bytes};
+}
+
+} // namespace
+
+std::string readAnswer(const AnswerCase& answer, const std::vector<std::size_t>& cuts,
+                       const client::ClientLimits& limits)
+{
+    const client::ExpectedResponse expected{answer.messageId, answer.method, answer.isIntrinsic};
+    std::string out;
+    client::ResponseReader reader(
+        expected, limits.xml,
+        [&](const wire::XmlElement& element, wire::ElementDecoder& decoder) { encodeAgain(element, decoder, out); });
+    client::HttpResponse response(
+        limits, [](const client::ResponseFields&) {}, [&](std::string_view body) { reader.feed(body); });
+    try {
+        std::size_t at = 0;
+        for (const std::size_t cut : cuts) {
+            response.feed(std::string_view(answer.bytes).substr(at, cut - at));
+            at = cut;
+        }
+        response.feed(std::string_view(answer.bytes).substr(at));
+        if (!response.endOfConnection())
+            return "incomplete";
+        reader.finish();
+    } catch (const Exception& exception) {
+        return "EXC " + nameOf(typeid(exception)) + ": " + std::string(exception.getMessage().getCString());
+    }
+    if (response.fields().hasStatusCode)
+        out += "status " + response.fields().statusCode + " " + response.fields().statusDescription;
+    if (reader.error())
+        out += "error " + std::to_string(reader.error()->getCode()) + " " +
+               std::string(reader.error()->getMessage().getCString());
+    return out;
+}
+
+std::vector<AnswerCase> sampleAnswers()
+{
+    const PeerRequest enumerate = requestFor("EnumerateInstances");
+    const PeerRequest getClass = requestFor("GetClass");
+    const PeerRequest getQualifier = requestFor("GetQualifier");
+    const PeerRequest spin = requestFor("Spin");
+    std::string instances;
+    wire::appendNamedInstance(instances, sampleInstance("one"));
+    wire::appendNamedInstance(instances, sampleInstance("two \"q\""));
+    return {
+        sample("class", "GetClass", classAnswer(getClass, sampleClass())),
+        sample("instances", "EnumerateInstances", httpAnswer(intrinsicBody(enumerate, instances))),
+        sample("instances in chunks", "EnumerateInstances", chunkedAnswer(intrinsicBody(enumerate, instances), 700)),
+        sample("no instances", "EnumerateInstances", httpAnswer(intrinsicBody(enumerate, ""))),
+        sample("qualifier", "GetQualifier",
+               qualifierAnswer(getQualifier, CIMQualifierDecl("Key", CIMValue(false), CIMScope::PROPERTY))),
+        sample("method", "Spin",
+               methodAnswer(spin, CIMValue(Sint16(-3)), {CIMParamValue("Out", CIMValue(Array<Real32>(2, 1.5f)))}),
+               false),
+        sample("error element", "GetClass",
+               httpAnswer("<?xml version=\"1.0\" encoding=\"utf-8\" ?>\n<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">"
+                          "<MESSAGE ID=\"1000\" PROTOCOLVERSION=\"1.0\"><SIMPLERSP><IMETHODRESPONSE NAME=\"GetClass\">"
+                          "<ERROR CODE=\"6\" DESCRIPTION=\"CIM_ERR_NOT_FOUND: &lt;x&gt;\"/>"
+                          "</IMETHODRESPONSE></SIMPLERSP></MESSAGE></CIM>")),
+        sample("error in the trailer", "GetClass", trailerErrorAnswer(getClass, 6, "CIM_ERR_NOT_FOUND: é")),
+    };
+}
+
+std::vector<bool> markupBytes(std::string_view answer)
+{
+    std::vector<bool> marks(answer.size(), false);
+    char quote = 0;
+    bool inTag = false;
+    const std::size_t xml = answer.find("<CIM");
+    for (std::size_t i = xml; i < answer.size(); ++i) {
+        const char c = answer[i];
+        if (!inTag) {
+            inTag = c == '<';
+            marks[i] = inTag;
+        } else if (quote) {
+            marks[i] = c == quote;
+            quote = c == quote ? 0 : quote;
+        } else {
+            marks[i] = true;
+            quote = c == '"' || c == '\'' ? c : 0;
+            inTag = c != '>';
+        }
+    }
+    return marks;
+}
+
+} // namespace test
