@@ -165,7 +165,7 @@ bool CIMClientRep::exchangeOnce(const client::Request& request, const ContentHan
                                                       fAddress->isLocal ? localUser() : std::string());
     if (fConnection.isOpen() && fConnection.isStale())
         fConnection.close();
-    bool mayRepeat = fConnection.isOpen() && request.isRepeatable;
+    bool mayRepeat = fConnection.isOpen() && fConnection.hasReceived() && request.isRepeatable;
     for (;;) {
         ResponseReader reader(expected, fLimits.xml, onContent);
         HttpResponse response(fLimits, checkHeader, [&](std::string_view body) { reader.feed(body); });

@@ -64,6 +64,7 @@ std::string ServerAddress::text() const
 void Connection::open(const ServerAddress& address, const Deadline& deadline)
 {
     close();
+    fHasReceived = false;
     if (address.isLocal)
         openLocal(deadline);
     else
@@ -156,6 +157,7 @@ Connection::Result Connection::receive(char* buffer, std::size_t capacity, const
         const ssize_t count = ::recv(fFd, buffer, capacity, 0);
         if (count >= 0) {
             received = static_cast<std::size_t>(count);
+            fHasReceived = true;
             return count == 0 ? Result::Closed : Result::Done;
         }
         if (!isRetry(errno))

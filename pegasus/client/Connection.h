@@ -43,6 +43,8 @@ class Connection
     void open(const ServerAddress& address, const Deadline& deadline);
     void close();
     bool isOpen() const { return fFd >= 0; }
+    /// Has the server ever sent anything on it?
+    bool hasReceived() const { return fHasReceived; }
     /// Has the server closed the idle connection, or sent what nobody asked for?
     bool isStale() const;
 
@@ -56,6 +58,7 @@ class Connection
     void openLocal(const Deadline& deadline);
 
     int fFd = -1;
+    bool fHasReceived = false;
 };
 
 } // namespace Pegasus::client

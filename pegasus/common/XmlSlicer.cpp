@@ -30,7 +30,12 @@ void XmlSlicer::run()
 {
     while (fScanned < fBuffer.size() && step()) {
     }
-    if (fBuffer.size() - fStart > fLimits.maxElementBytes)
+    checkElementSize(fBuffer.size() - fStart);
+}
+
+void XmlSlicer::checkElementSize(std::size_t size) const
+{
+    if (size > fLimits.maxElementBytes)
         throw XmlError(Kind::TooLarge, fPlace,
                        "an element of more than " + std::to_string(fLimits.maxElementBytes) + " bytes");
 }
@@ -139,6 +144,7 @@ void XmlSlicer::close(std::string_view name)
 
 void XmlSlicer::deliver(std::size_t size)
 {
+    checkElementSize(size);
     char* text = fBuffer.data() + fStart;
     // Counted first: parsing changes the text.
     const XmlPlace end = advance(fPlace, std::string_view(text, size));

@@ -47,8 +47,8 @@ class XmlSlicer
     void open(const XmlToken& token);
     void close(std::string_view name);
     void deliver(std::size_t size);
-    void beginSlice();
     void consume(std::size_t size);
+    void checkElementSize(std::size_t size) const;
     bool isEnvelope(std::string_view name) const;
     std::string_view rest() const;
 

@@ -1,14 +1,26 @@
+// A client and a peer that plays good and bad answers: the exceptions, the deadline, and that the next call works.
 #include "support/PeerAnswers.h"
 
 #include <Pegasus/Client/CIMClient.h>
 
+#include <chrono>
+#include <csignal>
+#include <cxxabi.h>
+#include <fcntl.h>
+#include <filesystem>
 #include <gtest/gtest.h>
+#include <memory>
 
 using namespace Pegasus;
+using test::PeerAnswer;
+using test::PeerRequest;
 
 namespace {
 
 constexpr const char* kNameSpace = "root/cimv2";
+/// Far more than any of these calls needs, far less than a hang.
+constexpr Uint32 kTimeoutMs = 10000;
+constexpr Uint32 kShortTimeoutMs = 200;
 
 CIMClass fanClass()
 {
@@ -29,11 +41,93 @@ CIMInstance fan(const char* id, Uint64 speed)
     return instance;
 }
 
-void connect(CIMClient& client, const test::ScriptedPeer& peer)
+void connect(CIMClient& client, const test::ScriptedPeer& peer, Uint32 timeoutMs = kTimeoutMs)
 {
-    client.setTimeout(5000);
+    client.setTimeout(timeoutMs);
     client.connect("127.0.0.1", peer.port(), String(), String());
 }
+
+/// "Pegasus::X: message" of what the call throws; "ok" when it does not.
+template <class Call> std::string outcome(Call&& call)
+{
+    try {
+        call();
+        return "ok";
+    } catch (const Exception& exception) {
+        const std::unique_ptr<char, decltype(&std::free)> name(
+            abi::__cxa_demangle(typeid(exception).name(), nullptr, nullptr, nullptr), &std::free);
+        return std::string(name.get()) + ": " + std::string(exception.getMessage().getCString());
+    }
+}
+
+PeerAnswer good(const PeerRequest& request)
+{
+    return test::classAnswer(request, fanClass());
+}
+
+std::string getClassOutcome(CIMClient& client)
+{
+    return outcome([&] { client.getClass(kNameSpace, "T_Fan", false); });
+}
+
+struct Fault
+{
+    const char* name;
+    PeerAnswer (*answer)(const PeerRequest&);
+    const char* outcome; ///< how it begins
+};
+
+const Fault kFaults[] = {
+    {"closes without a byte", [](const PeerRequest&) { return test::closedConnection(); },
+     "Pegasus::CIMClientMalformedHTTPException: Connection closed by CIM Server."},
+    {"not HTTP", [](const PeerRequest&) { return test::notHttp(); },
+     "Pegasus::CIMClientMalformedHTTPException: Malformed HTTP response message."},
+    {"closes in the header", [](const PeerRequest& r) { return test::cutAt(good(r), 40); },
+     "Pegasus::CIMClientMalformedHTTPException: Missing CIMOperation HTTP header"},
+    {"closes in the body", [](const PeerRequest& r) { return test::cutAt(good(r), 400); },
+     "Pegasus::CIMClientXmlException: Validation error: on line "},
+    {"a length that is too big", [](const PeerRequest& r) { return test::withWrongLength(good(r), 5); },
+     "Pegasus::CIMClientXmlException: "},
+    {"a length that is too small", [](const PeerRequest& r) { return test::withWrongLength(good(r), -15); },
+     "Pegasus::CIMClientXmlException: "},
+    {"end tag of another element",
+     [](const PeerRequest& r) { return test::withReplaced(good(r), "</CLASS>", "</CLAZZ>"); },
+     "Pegasus::CIMClientXmlException: Not well-formed: on line "},
+    {"an element that nobody knows",
+     [](const PeerRequest& r) { return test::withReplaced(good(r), "PROPERTY", "PROPPETY"); },
+     "Pegasus::CIMClientXmlException: Validation error: on line "},
+    {"a type that is none", [](const PeerRequest& r) { return test::withReplaced(good(r), "uint64", "uint46"); },
+     "Pegasus::CIMClientXmlException: Semantic error: on line "},
+    {"another message's id", [](const PeerRequest& r) { return test::withReplaced(good(r), "ID=\"1", "ID=\"9"); },
+     "Pegasus::CIMClientResponseException: Mismatched response message ID:  Got \"9"},
+    {"another operation's answer",
+     [](const PeerRequest& r) { return test::withReplaced(good(r), "NAME=\"GetClass\"", "NAME=\"GetClasz\""); },
+     "Pegasus::CIMClientXmlException: Validation error: on line "},
+    {"a known operation's answer",
+     [](const PeerRequest& r) {
+         PeerRequest other = r;
+         other.head = "POST /cimom HTTP/1.1\r\nCIMMethod: EnumerateInstances\r\n";
+         return good(other);
+     },
+     "Pegasus::CIMClientResponseException: Mismatched response:  Got an answer to \"EnumerateInstances\""},
+    {"another content type",
+     [](const PeerRequest& r) { return test::withReplaced(good(r), "application", "applicatiom"); },
+     "Pegasus::CIMClientMalformedHTTPException: Bad Content-Type HTTP header; applicatiom/xml; charset=utf-8"},
+    {"status 400",
+     [](const PeerRequest&) {
+         return test::httpErrorAnswer(400, "Bad Request",
+                                      "CIMError: request-not-valid\r\nPGErrorDetail: on%20line%201\r\n");
+     },
+     "Pegasus::CIMClientHTTPErrorException: HTTP Error (400 Bad Request): CIMError = \"request-not-valid\" "
+     "Detail = \"on line 1\"."},
+    {"status 401",
+     [](const PeerRequest&) { return test::httpErrorAnswer(401, "Unauthorized", "WWW-Authenticate: Basic \"x\"\r\n"); },
+     "Pegasus::CIMClientHTTPErrorException: HTTP Error (401 Unauthorized)."},
+    {"CIM error in the body", [](const PeerRequest& r) { return test::errorAnswer(r, 6, "gone"); },
+     "Pegasus::CIMException: gone"},
+    {"CIM error in the trailer", [](const PeerRequest& r) { return test::trailerErrorAnswer(r, 6, "gone é"); },
+     "Pegasus::CIMException: gone é"},
+};
 
 } // namespace
 
@@ -50,4 +144,182 @@ TEST(ClientExchange, ReadsClassesAndInstancesOverOneConnection)
     ASSERT_EQ(fans.size(), 2u);
     EXPECT_TRUE(fans[1].identical(fan("b", 2)));
     EXPECT_EQ(peer.connectionCount(), 1u);
+}
+
+TEST(ClientExchange, EachFaultHasItsExceptionAndTheNextCallWorks)
+{
+    for (const Fault& fault : kFaults) {
+        SCOPED_TRACE(fault.name);
+        test::ServedModel model;
+        model.addClass(kNameSpace, fanClass()).addFault("GetClass", fault.answer);
+        test::ScriptedPeer peer(model.handler());
+        CIMClient client;
+        connect(client, peer);
+        EXPECT_EQ(getClassOutcome(client).rfind(fault.outcome, 0), 0u) << getClassOutcome(client);
+        EXPECT_EQ(getClassOutcome(client), "ok");
+    }
+}
+
+TEST(ClientExchange, ComplaintsAboutXmlNameOperationPlaceAndCause)
+{
+    test::ScriptedPeer peer([](const PeerRequest& r) { return test::withReplaced(good(r), "uint64", "uint46"); });
+    CIMClient client;
+    connect(client, peer);
+    EXPECT_EQ(getClassOutcome(client),
+              "Pegasus::CIMClientXmlException: Semantic error: on line 13: Illegal value for PROPERTY.TYPE attribute "
+              "(GetClass answer, column 1)");
+}
+
+TEST(ClientExchange, PiecesOfOneByteMakeTheSameAnswer)
+{
+    test::ScriptedPeer peer([](const PeerRequest& r) {
+        return test::inPieces(test::chunkedAnswer(test::intrinsicBody(r, "<CLASS NAME=\"T_Fan\"/>"), 5), 1);
+    });
+    CIMClient client;
+    connect(client, peer);
+    EXPECT_EQ(client.getClass(kNameSpace, "T_Fan").getClassName(), CIMName("T_Fan"));
+}
+
+TEST(ClientDeadline, BoundsEveryWaitAndTheNextCallWorks)
+{
+    const Fault waits[] = {
+        {"no answer", [](const PeerRequest&) { return test::noAnswer(); }, ""},
+        {"an answer that drips",
+         [](const PeerRequest& r) { return test::inPieces(good(r), 1, std::chrono::milliseconds(20)); }, ""},
+        {"an answer that never ends",
+         [](const PeerRequest& r) {
+             PeerAnswer endless = test::withWrongLength(good(r), 1000);
+             endless.closesAfterwards = false;
+             return endless;
+         },
+         ""},
+    };
+    for (const Fault& wait : waits) {
+        SCOPED_TRACE(wait.name);
+        test::ServedModel model;
+        model.addClass(kNameSpace, fanClass()).addFault("GetClass", wait.answer);
+        test::ScriptedPeer peer(model.handler());
+        CIMClient client;
+        connect(client, peer, kShortTimeoutMs);
+        const auto start = std::chrono::steady_clock::now();
+        EXPECT_EQ(getClassOutcome(client), "Pegasus::ConnectionTimeoutException: connection timed out");
+        const auto waited = std::chrono::steady_clock::now() - start;
+        EXPECT_GE(waited, std::chrono::milliseconds(kShortTimeoutMs));
+        EXPECT_LT(waited, std::chrono::milliseconds(kTimeoutMs));
+        client.setTimeout(kTimeoutMs);
+        EXPECT_EQ(getClassOutcome(client), "ok");
+        EXPECT_EQ(peer.connectionCount(), 2u);
+    }
+}
+
+TEST(ClientDeadline, OfZeroEndsAtOnce)
+{
+    test::ScriptedPeer peer(good);
+    CIMClient client;
+    connect(client, peer);
+    client.setTimeout(0);
+    EXPECT_EQ(getClassOutcome(client), "Pegasus::ConnectionTimeoutException: connection timed out");
+    EXPECT_TRUE(peer.requests().empty());
+    client.setTimeout(kTimeoutMs);
+    EXPECT_EQ(getClassOutcome(client), "ok");
+}
+
+TEST(ClientConnection, LifeCycle)
+{
+    test::ScriptedPeer peer(good, test::ScriptedPeer::Start::Refusing);
+    CIMClient client;
+    EXPECT_EQ(getClassOutcome(client), "Pegasus::NotConnectedException: not connected");
+    const std::string refused =
+        "Pegasus::CannotConnectException: Cannot connect to 127.0.0.1:" + std::to_string(peer.port()) +
+        ". Connection failed.";
+    EXPECT_EQ(outcome([&] { connect(client, peer); }), refused);
+    peer.listen();
+    connect(client, peer);
+    EXPECT_EQ(outcome([&] { connect(client, peer); }), "Pegasus::AlreadyConnectedException: already connected");
+    EXPECT_EQ(getClassOutcome(client), "ok");
+
+    peer.refuse(); // the server has gone
+    EXPECT_EQ(getClassOutcome(client), refused);
+    EXPECT_EQ(getClassOutcome(client), refused);
+    peer.listen(); // and come back
+    EXPECT_EQ(getClassOutcome(client), "ok");
+
+    client.disconnect();
+    EXPECT_EQ(getClassOutcome(client), "Pegasus::NotConnectedException: not connected");
+}
+
+TEST(ClientConnection, NullNamespaceIsRefusedAndTheClientLives)
+{
+    test::ScriptedPeer peer(good);
+    CIMClient client;
+    connect(client, peer);
+    EXPECT_EQ(outcome([&] { client.getClass(CIMNamespaceName(), "T_Fan"); }),
+              "Pegasus::InvalidNamespaceNameException: invalid CIM namespace name: ");
+    EXPECT_EQ(getClassOutcome(client), "ok");
+}
+
+TEST(ClientConnection, OnlyWhatReadsIsSentAgainAfterALostAnswer)
+{
+    // The second request of each connection finds it closed, as behind a server that gave up an idle one.
+    const auto answer = [](const PeerRequest& request) -> PeerAnswer {
+        static thread_local std::size_t served = 0;
+        if (++served % 2 == 0)
+            return test::closedConnection();
+        return request.method() == "CreateClass" ? test::httpAnswer(test::intrinsicBodyWithout(request))
+                                                 : good(request);
+    };
+    test::ScriptedPeer peer(answer);
+    CIMClient client;
+    connect(client, peer);
+    EXPECT_EQ(getClassOutcome(client), "ok");
+    EXPECT_EQ(getClassOutcome(client), "ok") << "a read is repeated on a new connection";
+    EXPECT_EQ(peer.requests().size(), 3u);
+    EXPECT_EQ(outcome([&] { client.createClass(kNameSpace, fanClass()); }),
+              "Pegasus::CIMClientMalformedHTTPException: Connection closed by CIM Server.");
+    EXPECT_EQ(peer.requests().size(), 4u) << "a write is not";
+}
+
+TEST(ClientConnection, SocketsAreCloseOnExecAndBrokenOnesRaiseNoSignal)
+{
+    std::signal(SIGPIPE, SIG_DFL); // a raised one would end this process
+    test::ScriptedPeer peer([](const PeerRequest&) { return test::closedConnection(); });
+    CIMClient client;
+    connect(client, peer);
+    std::size_t sockets = 0;
+    for (const auto& entry : std::filesystem::directory_iterator("/proc/self/fd")) {
+        const int fd = std::stoi(entry.path().filename());
+        std::error_code gone;
+        const std::string target = std::filesystem::read_symlink(entry.path(), gone);
+        if (target.rfind("socket:", 0) == 0) {
+            ++sockets;
+            EXPECT_NE(::fcntl(fd, F_GETFD) & FD_CLOEXEC, 0) << target;
+        }
+    }
+    EXPECT_GE(sockets, 1u);
+    CIMClass big("T_Big");
+    big.addQualifier(CIMQualifier("Description", String(std::string(8 << 20, 'x').c_str())));
+    for (int call = 0; call < 3; ++call)
+        EXPECT_NE(outcome([&] { client.createClass(kNameSpace, big); }), "ok");
+}
+
+TEST(ClientMethods, OutputsReplaceWhatWasThereAndNullsKeepTheirType)
+{
+    test::ServedModel model;
+    model.addMethod("Spin", [](const PeerRequest& request) {
+        return test::methodAnswer(
+            request, CIMValue(Uint32(7)),
+            {CIMParamValue("a", CIMValue(String("x"))), CIMParamValue("b", CIMValue(CIMTYPE_UINT16, false))});
+    });
+    test::ScriptedPeer peer(model.handler());
+    CIMClient client;
+    connect(client, peer);
+    Array<CIMParamValue> outputs(1, CIMParamValue("old", CIMValue(true)));
+    Array<CIMParamValue> inputs(1, CIMParamValue("speed", CIMValue(Real32(1.5f))));
+    const CIMValue result =
+        client.invokeMethod(kNameSpace, CIMObjectPath("T_Fan.DeviceID=\"a\""), "Spin", inputs, outputs);
+    EXPECT_EQ(result, CIMValue(Uint32(7)));
+    ASSERT_EQ(outputs.size(), 2u);
+    EXPECT_EQ(outputs[0].getValue(), CIMValue(String("x")));
+    EXPECT_EQ(outputs[1].getValue(), CIMValue(CIMTYPE_UINT16, false));
+    EXPECT_EQ(peer.requests().front().object(), "root/cimv2:T_Fan.DeviceID=\"a\"");
 }
