@@ -134,8 +134,15 @@ typedef void CMPIGcStat;
 #define CMPI_MB_PropertyFiltering 0x40001
 #define CMPI_MB_CodepageConversion 0x80000
 
+/* In C++ too, any number may come from the other side of the interface. */
+#ifdef __cplusplus
+#define CMPI_ENUM_BASE : int
+#else
+#define CMPI_ENUM_BASE
+#endif
+
 /* 0 to 17 are the CIM status codes; the others stay between broker and provider. */
-typedef enum CMPIrc
+typedef enum CMPIrc CMPI_ENUM_BASE
 {
     CMPI_RC_OK = 0,
     CMPI_RC_ERR_FAILED = 1,
@@ -167,7 +174,7 @@ typedef enum CMPIrc
     CMPI_RC_ERROR = 200
 } CMPIrc;
 
-typedef enum CMPIPredOp
+typedef enum CMPIPredOp CMPI_ENUM_BASE
 {
     CMPI_PredOp_Equals = 1,
     CMPI_PredOp_NotEquals = 2,
@@ -185,7 +192,7 @@ typedef enum CMPIPredOp
     CMPI_PredOp_Or = 14
 } CMPIPredOp;
 
-typedef enum CMPISeverity
+typedef enum CMPISeverity CMPI_ENUM_BASE
 {
     CMPI_SEV_ERROR = 1,
     CMPI_SEV_INFO = 2,
@@ -193,20 +200,20 @@ typedef enum CMPISeverity
     CMPI_DEV_DEBUG = 4
 } CMPISeverity;
 
-typedef enum CMPILevel
+typedef enum CMPILevel CMPI_ENUM_BASE
 {
     CMPI_LEV_INFO = 1,
     CMPI_LEV_WARNING = 2,
     CMPI_LEV_VERBOSE = 3
 } CMPILevel;
 
-typedef enum CMPISelectCondType
+typedef enum CMPISelectCondType CMPI_ENUM_BASE
 {
     CMPI_COND_DOC = 0,
     CMPI_COND_COD = 1
 } CMPISelectCondType;
 
-typedef enum CMPIErrorType
+typedef enum CMPIErrorType CMPI_ENUM_BASE
 {
     UnknownErrorType = 0,
     OtherErrorType = 1,
@@ -221,7 +228,7 @@ typedef enum CMPIErrorType
     UnsupportedOperationError = 10
 } CMPIErrorType;
 
-typedef enum CMPIErrorSeverity
+typedef enum CMPIErrorSeverity CMPI_ENUM_BASE
 {
     ErrorSevUnknown = 0,
     ErrorSevLow = 2,
@@ -231,20 +238,20 @@ typedef enum CMPIErrorSeverity
 } CMPIErrorSeverity;
 
 /* The numbers of CIM_Error.ProbableCause, 0 to 130; only the first two need a name here. */
-typedef enum CMPIErrorProbableCause
+typedef enum CMPIErrorProbableCause CMPI_ENUM_BASE
 {
     ErrorProbCauseUnknown = 0,
     ErrorProbCauseOther = 1
 } CMPIErrorProbableCause;
 
-typedef enum CMPIErrorSrcFormat
+typedef enum CMPIErrorSrcFormat CMPI_ENUM_BASE
 {
     CMPIErrSrcUnknown = 0,
     CMPIErrSrcOther = 1,
     CIMObjectHandle = 2
 } CMPIErrorSrcFormat;
 
-typedef enum CMPICodepageID
+typedef enum CMPICodepageID CMPI_ENUM_BASE
 {
     CMPI_CPID_SYSTEM = 1,
     CMPI_CPID_USASCII = 2,
