@@ -46,10 +46,13 @@ static void setNumbers(CMPIInstance* instance, CMPIUint32 number)
 static CMPIObjectPath* makePath(const CMPIObjectPath* of, CMPIUint32 number)
 {
     char id[32];
+    CMPIString* nameSpace = of->ft->getNameSpace(of, NULL);
+    CMPIString* className = of->ft->getClassName(of, NULL);
+    CMPIObjectPath* path = gBroker->eft->newObjectPath(gBroker, textOf(nameSpace), textOf(className), NULL);
     snprintf(id, sizeof id, "bulk-%07u", (unsigned)number);
-    CMPIObjectPath* path = gBroker->eft->newObjectPath(gBroker, textOf(of->ft->getNameSpace(of, NULL)),
-                                                       textOf(of->ft->getClassName(of, NULL)), NULL);
     path->ft->addKey(path, "Id", (const CMPIValue*)id, CMPI_chars);
+    nameSpace->ft->release(nameSpace); /* an enumeration without end keeps nothing */
+    className->ft->release(className);
     return path;
 }
 
