@@ -149,9 +149,8 @@ int printCurrent(const std::string& name)
         return 1;
     }
     try {
-        std::cout << "Current value: "
-                  << textOf(client.getInstance(CIMNamespaceName(kNamespace), pathOf(name), false), "CurrentValue")
-                  << "\n";
+        const CIMInstance setting = client.getInstance(CIMNamespaceName(kNamespace), pathOf(name), false);
+        std::cout << "Current value: " << textOf(setting, "CurrentValue") << "\n";
         return 0;
     } catch (const CIMException& error) {
         return reportServerError(error, false);

@@ -28,6 +28,7 @@ void Config::setFromCommandLine(const std::string& name, const std::string& valu
     require(name, value);
     const std::lock_guard<std::mutex> lock(fMutex);
     fValues[name] = value;
+    ++fGeneration;
 }
 
 void Config::setCurrent(const std::string& name, const std::string& value)
@@ -38,6 +39,7 @@ void Config::setCurrent(const std::string& name, const std::string& value)
     require(name, value);
     const std::lock_guard<std::mutex> lock(fMutex);
     fValues[name] = value;
+    ++fGeneration;
     saveLocked();
 }
 

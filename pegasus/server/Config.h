@@ -3,6 +3,7 @@
 #include "pegasus/server/ConfigFile.h"
 #include "pegasus/server/ConfigTable.h"
 
+#include <atomic>
 #include <chrono>
 #include <mutex>
 #include <stdexcept>
@@ -60,6 +61,9 @@ class Config
     std::chrono::seconds seconds(const std::string& name) const;
     std::vector<std::string> directories(const std::string& name) const;
 
+    // Changes with every change of a current value: what was made from the values stays good as long as it is the same.
+    unsigned generation() const { return fGeneration; }
+
     // The planned value, or the default if none is planned. Reads the file: cimconfig may write it beside us.
     std::string planned(const std::string& name) const;
 
@@ -69,6 +73,7 @@ class Config
 
     std::string fHome;
     mutable std::mutex fMutex;
+    std::atomic<unsigned> fGeneration{1};
     ConfigValues fValues; // only what differs from the table's defaults
 };
 

@@ -3,7 +3,7 @@
 #include <boost/beast/http/parser.hpp>
 #include <boost/beast/http/string_body.hpp>
 
-#include <strings.h>
+#include <cstring>
 
 namespace Pegasus::server {
 
@@ -106,36 +106,22 @@ HttpRequest HttpRequestParser::take()
 
 bool HttpRequestReader::fill(Deadline deadline)
 {
-    if (fBegin == fBuffer.size()) {
-        fBuffer.clear();
+    if (fBegin > 0) {
+        std::memmove(fBuffer.data(), fBuffer.data() + fBegin, fEnd - fBegin);
+        fEnd -= fBegin;
         fBegin = 0;
     }
-    const std::size_t size = fBuffer.size();
-    fBuffer.resize(size + kReadBytes);
-    std::size_t n = 0;
-    try {
-        n = fStream.readSome(fBuffer.data() + size, kReadBytes, deadline);
-    } catch (...) {
-        fBuffer.resize(size);
-        throw;
-    }
-    fBuffer.resize(size + n);
+    if (fEnd == fBuffer.size())
+        fBuffer.resize(fBuffer.size() + kReadBytes); // a head larger than the buffer; the parser's limit ends it
+    const std::size_t n = fStream.readSome(fBuffer.data() + fEnd, fBuffer.size() - fEnd, deadline);
+    fEnd += n;
     return n > 0;
-}
-
-void HttpRequestReader::consume(std::size_t count)
-{
-    fBegin += count;
-    if (fBegin > kReadBytes) {
-        fBuffer.erase(0, fBegin);
-        fBegin = 0;
-    }
 }
 
 // Returns: false if there will be none.
 bool HttpRequestReader::waitForRequest(const ReadTimes& times)
 try {
-    return fBegin < fBuffer.size() || fill(deadlineAfter(times.idle));
+    return fBegin < fEnd || fill(deadlineAfter(times.idle));
 } catch (const SocketTimeout&) {
     return false;
 }
@@ -148,7 +134,7 @@ try {
     HttpRequestParser parser(limits);
     bool continued = false;
     for (;;) {
-        consume(parser.put(std::string_view(fBuffer).substr(fBegin)));
+        fBegin += parser.put(std::string_view(fBuffer.data() + fBegin, fEnd - fBegin));
         if (parser.isDone())
             break;
         if (parser.isHeaderDone() && !continued && parser.expectsContinue()) {

@@ -53,11 +53,11 @@ class HttpRequestReader
   private:
     bool waitForRequest(const ReadTimes& times);
     bool fill(Deadline deadline);
-    void consume(std::size_t count);
 
     SocketStream& fStream;
-    std::string fBuffer; // read, not yet parsed
-    std::size_t fBegin = 0;
+    std::vector<char> fBuffer;
+    std::size_t fBegin = 0; // what lies between the two has been read and not been parsed
+    std::size_t fEnd = 0;
 };
 
 } // namespace Pegasus::server

@@ -11,6 +11,7 @@
 #include "pegasus/server/StopSignal.h"
 #include "pegasus/server/TreeLock.h"
 
+#include <mutex>
 #include <system_error>
 
 namespace Pegasus::server {
@@ -49,6 +50,30 @@ AgentSettings agentSettings(const Config& config)
     settings.memoryMegabytes = config.number("agentMemoryMegabytes");
     return settings;
 }
+
+// Settings made from the configuration, made anew only when it has changed: they are asked for at every request.
+template <typename Settings> class SettingsCache
+{
+  public:
+    SettingsCache(const Config& config, Settings (*make)(const Config&)) : fConfig(config), fMake(make) {}
+
+    Settings get()
+    {
+        const std::lock_guard<std::mutex> lock(fMutex);
+        const unsigned generation = fConfig.generation();
+        if (generation != fGeneration)
+            fSettings = fMake(fConfig);
+        fGeneration = generation;
+        return fSettings;
+    }
+
+  private:
+    const Config& fConfig;
+    Settings (*fMake)(const Config&);
+    std::mutex fMutex;
+    unsigned fGeneration = 0;
+    Settings fSettings;
+};
 
 // The files that say that this server runs; taken first, removed last.
 class Presence
@@ -151,10 +176,12 @@ void Server::run(LaunchSignal& signal)
     StopSignal stop;
     repository::Repository repository(repositoryPath(fConfig));
     ProviderRegistry registry(repository);
-    AgentPool agents([&] { return agentSettings(fConfig); });
+    SettingsCache<AgentSettings> agentCache(fConfig, agentSettings);
+    AgentPool agents([&] { return agentCache.get(); });
     ServerCore core = {fConfig, repository, registry, agents, [&] { stop.raise(); }};
     Dispatcher dispatcher(core);
-    const auto settings = [&] { return connectionSettings(fConfig); };
+    SettingsCache<ConnectionSettings> connectionCache(fConfig, connectionSettings);
+    const auto settings = [&] { return connectionCache.get(); };
     ConnectionGroup remote(dispatcher, settings);
     ConnectionGroup local(dispatcher, settings);
     const LocalSocketFile socketFile(fConfig.home());

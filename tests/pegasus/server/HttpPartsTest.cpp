@@ -1,0 +1,207 @@
+// The HTTP layer without a server: bytes in, bytes out.
+#include "pegasus/server/AnswerStream.h"
+#include "pegasus/server/CimAnswer.h"
+#include "pegasus/server/HttpRequestReader.h"
+#include "pegasus/server/Utf8Check.h"
+
+#include <gtest/gtest.h>
+
+#include <sys/socket.h>
+
+#include <thread>
+
+namespace Pegasus::server {
+namespace {
+
+const std::string kRequest =
+    "POST /cimom HTTP/1.1\r\nHost: x\r\nTE: chunked, trailers\r\nContent-Length: 11\r\n\r\n<a>hello</a"
+    "POST";
+
+// The request's parts, from a parser that got the bytes in two pieces.
+HttpRequest parseSplit(const std::string& bytes, std::size_t at, std::size_t& taken)
+{
+    HttpRequestParser parser(HttpLimits{});
+    taken = parser.put(std::string_view(bytes).substr(0, at));
+    while (!parser.isDone()) {
+        const std::size_t n = parser.put(std::string_view(bytes).substr(taken));
+        if (n == 0)
+            throw std::runtime_error("the parser stands still");
+        taken += n;
+    }
+    return parser.take();
+}
+
+TEST(HttpRequestParserTest, takesARequestHoweverItArrives)
+{
+    const std::string chunked =
+        "POST / HTTP/1.1\r\nTransfer-Encoding: chunked\r\n\r\n3\r\n<a>\r\n8;x=y\r\nhello</a\r\n0\r\n"
+        "T: v\r\n\r\nPOST";
+    for (const std::string& bytes : {kRequest, chunked}) {
+        for (std::size_t at = 0; at <= bytes.size(); ++at) {
+            SCOPED_TRACE("split at " + std::to_string(at) + " of " + bytes.substr(0, 60));
+            std::size_t taken = 0;
+            const HttpRequest request = parseSplit(bytes, at, taken);
+            EXPECT_EQ(request.body, "<a>hello</a");
+            EXPECT_EQ(bytes.size() - taken, 4u) << "what follows is the next request's";
+            EXPECT_TRUE(request.hasBodyLength);
+        }
+    }
+}
+
+TEST(HttpRequestParserTest, aCutRequestIsNeverDone)
+{
+    for (std::size_t size = 0; size < kRequest.size() - 4; ++size) {
+        HttpRequestParser parser(HttpLimits{});
+        parser.put(std::string_view(kRequest).substr(0, size));
+        EXPECT_FALSE(parser.isDone()) << size;
+    }
+}
+
+struct WordRow
+{
+    const char* value;
+    bool chunked;
+};
+
+TEST(HttpRequestTest, findsWordsInListHeaders)
+{
+    for (const WordRow& row : {WordRow{"chunked", true},
+                               {"trailers, chunked", true},
+                               {"CHUNKED;q=0.5 , x", true},
+                               {"unchunked", false},
+                               {"chunkedx", false},
+                               {"", false},
+                               {" ,, ", false},
+                               {"x;chunked", false}})
+    {
+        HttpRequest request;
+        request.headers.emplace_back("te", row.value);
+        EXPECT_EQ(request.headerHas("TE", "chunked"), row.chunked) << row.value;
+    }
+}
+
+TEST(HttpRequestTest, percentCodingIsUndone)
+{
+    const std::string text = "a b/c:\"%\xc3\xa9\n~";
+    EXPECT_EQ(percentDecode(percentEncode(text)), text);
+    EXPECT_EQ(percentDecode("%4"), "%4");
+    EXPECT_EQ(percentDecode("%zz%41"), "%zzA");
+}
+
+// What an answer looks like on the wire.
+template <typename Write> std::string sent(AnswerStream::Options options, const Write& write)
+{
+    int ends[2];
+    EXPECT_EQ(::socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, ends), 0);
+    std::string bytes;
+    std::thread reader([&, fd = Descriptor(ends[0])] {
+        char part[65536];
+        for (ssize_t n; (n = ::read(fd.get(), part, sizeof part)) > 0;)
+            bytes.append(part, static_cast<std::size_t>(n));
+    });
+    {
+        SocketStream stream((Descriptor(ends[1])));
+        AnswerStream answer(stream, options);
+        write(answer);
+    }
+    reader.join();
+    return bytes.substr(bytes.find("\r\n\r\n") + 4);
+}
+
+TEST(AnswerStreamTest, framesChunksAndTrailers)
+{
+    EXPECT_EQ(sent({}, [](AnswerStream& answer) { answer.finish(); }), "0\r\n\r\n");
+    EXPECT_EQ(sent({},
+                   [](AnswerStream& answer) {
+                       answer.write("<a>");
+                       answer.write("b");
+                       answer.finish({6, "gone: \xc3\xa9"});
+                   }),
+              "4\r\n<a>b\r\n0\r\nCIMStatusCode: 6\r\nCIMStatusCodeDescription: gone%3A%20%C3%A9\r\n\r\n");
+    const std::string large(AnswerStream::kChunkBytes, 'x');
+    EXPECT_EQ(sent({},
+                   [&](AnswerStream& answer) {
+                       answer.write("<a>");
+                       EXPECT_FALSE(answer.hasStarted());
+                       answer.write(large);
+                       EXPECT_TRUE(answer.hasStarted());
+                       answer.finish();
+                   }),
+              "10003\r\n<a>" + large + "\r\n0\r\n\r\n");
+}
+
+TEST(AnswerStreamTest, keepsWhatNeedsALength)
+{
+    AnswerStream::Options options;
+    options.framing = AnswerStream::Framing::kContentLength;
+    options.maxBufferedBytes = 10;
+    EXPECT_EQ(sent(options,
+                   [](AnswerStream& answer) {
+                       answer.write("12345");
+                       answer.write("67890");
+                       EXPECT_THROW(answer.write("x"), AnswerTooLarge);
+                       answer.finish();
+                   }),
+              "1234567890");
+}
+
+// A peer that takes nothing must not hold the thread.
+TEST(SocketStreamTest, waitsForASlowReaderOnlySoLong)
+{
+    int ends[2];
+    ASSERT_EQ(::socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, ends), 0);
+    const Descriptor reader(ends[0]);
+    SocketStream stream((Descriptor(ends[1])));
+    std::string data(16u << 20, 'x');
+    iovec part = {data.data(), data.size()};
+    EXPECT_THROW(stream.writeAll(&part, 1, std::chrono::milliseconds(50)), SocketTimeout);
+    char byte;
+    EXPECT_THROW(stream.readSome(&byte, 1, deadlineAfter(std::chrono::milliseconds(20))), SocketTimeout);
+}
+
+struct Utf8Row
+{
+    const char* name;
+    std::string bytes;
+    bool valid;
+};
+
+TEST(Utf8CheckTest, acceptsUtf8Only)
+{
+    const Utf8Row rows[] = {{"empty", "", true},
+                            {"ASCII", "0123456789abcdef", true},
+                            {"two", "caf\xc3\xa9", true},
+                            {"three", "\xe5\x90\x8d", true},
+                            {"four", "12345678\xf0\x9f\x98\x80", true},
+                            {"last", "\xf4\x8f\xbf\xbf", true},
+                            {"beyond", "\xf4\x90\x80\x80", false},
+                            {"overlong", "\xc0\xaf", false},
+                            {"overlong three", "\xe0\x80\xaf", false},
+                            {"surrogate", "\xed\xa0\x80", false},
+                            {"lone follower", "ab\x80", false},
+                            {"cut", "\xe5\x90", false},
+                            {"latin 1", "caf\xe9 x", false}};
+    for (const Utf8Row& row : rows)
+        for (std::size_t shift = 0; shift < 9; ++shift) // at every offset in a word
+            EXPECT_EQ(isUtf8(std::string(shift, 'x') + row.bytes), row.valid) << row.name << " at " << shift;
+}
+
+struct StatusRow
+{
+    unsigned code;
+    const char* text;
+    const char* expected;
+};
+
+TEST(CimStatusTest, putsTheSymbolicNameInFront)
+{
+    for (const StatusRow& row : {StatusRow{1, "x", "CIM_ERR_FAILED: x"},
+                                 {7, "", "CIM_ERR_NOT_SUPPORTED"},
+                                 {28, "x", "CIM_ERR_SERVER_IS_SHUTTING_DOWN: x"},
+                                 {99, "x", "Unrecognized CIM status code \"99\": x"},
+                                 {19, "x", "Unrecognized CIM status code \"19\": x"}})
+        EXPECT_EQ(makeStatus(static_cast<CIMStatusCode>(row.code), row.text).text, row.expected);
+}
+
+} // namespace
+} // namespace Pegasus::server

@@ -1,0 +1,314 @@
+// cimserver and cimconfig as people and other programs call them: texts, exit statuses, files.
+#include "pegasus/server/HttpExchange.h"
+#include "pegasus/server/ServerTree.h"
+
+#include <gtest/gtest.h>
+
+#include <arpa/inet.h>
+#include <fcntl.h>
+#include <netinet/in.h>
+#include <signal.h>
+#include <sys/socket.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <fstream>
+
+namespace servertest {
+namespace {
+
+namespace fs = std::filesystem;
+
+struct ProgramRow
+{
+    const char* name;
+    const char* program;
+    std::vector<std::string> arguments;
+    int exitStatus;
+    std::string out;
+    std::string err;
+};
+
+void check(const ServerTree& tree, const std::vector<ProgramRow>& rows)
+{
+    for (const ProgramRow& row : rows) {
+        SCOPED_TRACE(row.name);
+        const ProgramResult result = tree.run(row.program, row.arguments);
+        EXPECT_EQ(result.exitStatus, row.exitStatus);
+        EXPECT_EQ(result.out, row.out);
+        EXPECT_EQ(result.err, row.err);
+    }
+}
+
+std::string contentOf(const std::string& path)
+{
+    std::ifstream file(path);
+    return {std::istreambuf_iterator<char>(file), {}};
+}
+
+unsigned modeOf(const std::string& path)
+{
+    struct stat info = {};
+    return ::lstat(path.c_str(), &info) == 0 ? info.st_mode & 07777 : 0;
+}
+
+const char kHint[] = "cimconfig: Use '--help' to obtain command syntax.\n";
+
+TEST(ProgramTest, withoutAServer)
+{
+    const ServerTree tree;
+    check(tree,
+          {{"version", "cimserver", {"-v"}, 0, "0.1.0\n", ""},
+           {"status", "cimserver", {"--status"}, 2, "The CIM Server is not running.\n", ""},
+           {"stop", "cimserver", {"-s"}, 1, "", "Unable to connect to CIM Server.  CIM Server may not be running.\n"},
+           {"option", "cimserver", {"--nope"}, 1, "", "cimserver not started: Unrecognized command line option. \n"},
+           {"property", "cimserver", {"a=b"}, 1, "", "cimserver not started: Unrecognized config property: a\n"},
+           {"word", "cimserver", {"word"}, 1, "", "cimserver not started: Unrecognized config property: word\n"},
+           {"value",
+            "cimserver",
+            {"httpPort=abc"},
+            1,
+            "",
+            "cimserver not started: Invalid property value: httpPort=abc\n"},
+           {"TLS",
+            "cimserver",
+            {"enableHttpsConnection=true"},
+            1,
+            "",
+            "cimserver not started: Invalid property value: enableHttpsConnection=true\n"},
+           {"consumer",
+            "cimserver",
+            {"consumer=../x"},
+            1,
+            "",
+            "cimserver not started: Invalid property value: consumer=../x\n"},
+           {"home",
+            "cimserver",
+            {"-D", "/nonexistent"},
+            1,
+            "",
+            "cimserver not started: Failed to save configuration properties to file: cannot open file: "
+            "/nonexistent/cimserver_current.conf. Configuration property not set.\n"},
+           {"set",
+            "cimconfig",
+            {"-s", "providerDir=lib"},
+            1,
+            "Current value for the property 'providerDir' can not be set because the CIM server is not running.\n",
+            ""},
+           {"get",
+            "cimconfig",
+            {"-g", "providerDir"},
+            1,
+            "Current value can not be determined because the CIM server is not running.\n",
+            ""},
+           {"default", "cimconfig", {"-g", "providerDir", "-d"}, 0, "Default value: lib\n", ""},
+           {"no arguments", "cimconfig", {}, 1, "", std::string("cimconfig: Required arguments missing.\n") + kHint},
+           {"flag", "cimconfig", {"-x"}, 1, "", std::string("cimconfig: Unknown flag -x\n") + kHint},
+           {"no value",
+            "cimconfig",
+            {"-s", "providerDir"},
+            1,
+            "",
+            std::string("cimconfig: argument \"providerDir\" is not valid for option \"-s\"\n") + kHint},
+           {"plan",
+            "cimconfig",
+            {"-s", "httpPort=1234", "-p"},
+            0,
+            "Planned value for the property httpPort is set to \"1234\" in CIMServer.\n",
+            ""},
+           {"planned", "cimconfig", {"-g", "httpPort", "-p"}, 0, "Planned value: 1234\n", ""},
+           {"plan a missing folder",
+            "cimconfig",
+            {"-s", "providerDir=nope", "-p"},
+            1,
+            "Failed to set the config property.\nInvalid property value: providerDir=nope\n",
+            ""},
+           {"list planned", "cimconfig", {"-l", "-p"}, 0, "consumer=" + tree.consumer() + "\nhttpPort=1234\n", ""}});
+    EXPECT_EQ(modeOf(tree.home() + "/cimserver_planned.conf"), 0600u);
+}
+
+TEST(ProgramTest, withAServer)
+{
+    ServerTree tree;
+    tree.start();
+    fs::create_directories(tree.home() + "/provider/a");
+    const std::string none = "CIM_ERR_INVALID_NAMESPACE: root/PG_Internal";
+    check(tree, {{"set before the schema", "cimconfig", {"-s", "providerDir=provider/a:"}, 1, "", none + "\n"},
+                 {"get before the schema",
+                  "cimconfig",
+                  {"-g", "providerDir"},
+                  1,
+                  "Failed to get the config property." + none + "\n",
+                  ""}});
+    tree.compileBase();
+    check(tree, {{"status", "cimserver", {"--status"}, 0, "The CIM Server is running.\n", ""},
+                 {"again", "cimserver", {}, 1, "", "Unable to start CIMServer. CIMServer is already running.\n"},
+                 {"set",
+                  "cimconfig",
+                  {"-s", "providerDir=provider/a:"},
+                  0,
+                  "Current value for the property providerDir is set to \"provider/a:\" in CIMServer.\n",
+                  ""},
+                 {"get", "cimconfig", {"-g", "providerDir"}, 0, "Current value: provider/a:\n", ""},
+                 {"missing folder",
+                  "cimconfig",
+                  {"-s", "providerDir=provider/b:"},
+                  1,
+                  "Failed to set the config property.CIM_ERR_FAILED: Invalid property value: providerDir=provider/b:\n",
+                  ""},
+                 {"empty list",
+                  "cimconfig",
+                  {"-s", "providerDir="},
+                  1,
+                  "Failed to set the config property.CIM_ERR_FAILED: Invalid property value: providerDir=\n",
+                  ""},
+                 {"unknown",
+                  "cimconfig",
+                  {"-s", "nosuch=1"},
+                  1,
+                  "Specified property name was not found.\n",
+                  "CIM_ERR_NOT_FOUND: Configuration property \"nosuch\"\n"},
+                 {"not while it runs",
+                  "cimconfig",
+                  {"-s", "httpPort=1234"},
+                  1,
+                  "Specified property can not be modified.\n",
+                  "CIM_ERR_NOT_SUPPORTED: NonDynamic config property: httpPort\n"},
+                 {"still", "cimconfig", {"-g", "providerDir"}, 0, "Current value: provider/a:\n", ""},
+                 {"reset",
+                  "cimconfig",
+                  {"-u", "providerDir"},
+                  0,
+                  "Current value for the property providerDir is set to \"lib\" in CIMServer.\n",
+                  ""},
+                 {"stop", "cimserver", {"-s"}, 0, "CIM Server stopped.\n", ""},
+                 {"stopped", "cimserver", {"--status"}, 2, "The CIM Server is not running.\n", ""}});
+    for (const std::string& file : {tree.startFile(), tree.home() + "/cimserver.lock", tree.home() + "/cimxml.socket"})
+        EXPECT_FALSE(fs::exists(file)) << file;
+}
+
+TEST(ProgramTest, everyLimitIsListedWithDefaultAndMeaning)
+{
+    const std::string list = ServerTree().run("cimconfig", {"-l"}).out;
+    for (const char* line : {"maxConnections (default 128) ", "maxHeaderBytes (default 65536) ",
+                             "maxBodyBytes (default 16777216) ", "requestReadTimeout (default 30) "})
+        EXPECT_NE(list.find(line), std::string::npos) << line;
+}
+
+TEST(ProgramTest, stopsByForceWhenTheSchemaIsMissing)
+{
+    ServerTree tree;
+    tree.start();
+    const int server = tree.serverProcess();
+    check(tree, {{"stop",
+                  "cimserver",
+                  {"-s"},
+                  1,
+                  "",
+                  "Error in server shutdown: The repository may be empty.\nForced shutdown initiated.\n"}});
+    EXPECT_FALSE(isRunning(server));
+    EXPECT_FALSE(fs::exists(tree.startFile()));
+}
+
+TEST(ProgramTest, theStartFileNamesTheServerAndIsPrivate)
+{
+    ServerTree tree;
+    const std::string victim = tree.home() + "/victim";
+    std::ofstream(victim) << "untouched";
+    fs::create_symlink(victim, tree.startFile());
+    tree.start();
+    EXPECT_EQ(contentOf(victim), "untouched");
+    EXPECT_EQ(modeOf(tree.startFile()), 0600u);
+    EXPECT_FALSE(fs::is_symlink(tree.startFile()));
+    EXPECT_TRUE(isRunning(tree.serverProcess()));
+    EXPECT_EQ(modeOf(tree.home() + "/cimxml.socket"), 0600u);
+    EXPECT_NE(tree.log().find("Wrote the start file " + tree.startFile()), std::string::npos);
+}
+
+TEST(ProgramTest, endsInOrderOnSignals)
+{
+    for (const int signal : {SIGTERM, SIGHUP, SIGINT}) {
+        SCOPED_TRACE(signal);
+        ServerTree tree;
+        tree.start();
+        const int server = tree.serverProcess();
+        ASSERT_EQ(::kill(server, signal), 0);
+        EXPECT_TRUE(eventually([&] { return !isRunning(server); }));
+        EXPECT_FALSE(fs::exists(tree.startFile()));
+        EXPECT_FALSE(fs::exists(tree.home() + "/cimserver.lock"));
+    }
+}
+
+TEST(ProgramTest, startsAgainOverWhatAKilledServerLeft)
+{
+    ServerTree tree;
+    tree.start();
+    tree.compileBase();
+    const int server = tree.serverProcess();
+    ASSERT_EQ(::kill(server, SIGKILL), 0);
+    ASSERT_TRUE(eventually([&] { return !isRunning(server); }));
+    EXPECT_TRUE(fs::exists(tree.startFile()));
+    tree.start();
+    EXPECT_NE(tree.serverProcess(), server);
+    EXPECT_EQ(tree.run("cimserver", {"-s"}).exitStatus, 0) << "the schema was kept";
+}
+
+TEST(ProgramTest, aTakenPortIsNamed)
+{
+    ServerTree tree;
+    const int taken = ::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0);
+    sockaddr_in address = {};
+    address.sin_family = AF_INET;
+    address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
+    address.sin_port = htons(tree.port());
+    ASSERT_EQ(::bind(taken, reinterpret_cast<const sockaddr*>(&address), sizeof address), 0);
+    ASSERT_EQ(::listen(taken, 1), 0);
+    const std::string port = std::to_string(tree.port());
+    check(tree, {{"start",
+                  "cimserver",
+                  {"httpPort=" + port},
+                  1,
+                  "",
+                  "cimserver not started: Bind failed: Failed to bind socket on port " + port +
+                      ": Address already in use (error code 98).\n"}});
+    EXPECT_FALSE(fs::exists(tree.startFile()));
+    EXPECT_FALSE(fs::exists(tree.home() + "/cimserver.lock"));
+    ::close(taken);
+}
+
+// The launcher's caller may wait for the end of a pipe that the server would otherwise hold open.
+TEST(ProgramTest, theServerKeepsNoneOfItsCallersDescriptors)
+{
+    ServerTree tree;
+    int ends[2];
+    ASSERT_EQ(::pipe(ends), 0); // not close-on-exec: the launcher inherits both
+    tree.start();
+    ::close(ends[1]);
+    char byte;
+    EXPECT_EQ(::read(ends[0], &byte, 1), 0);
+    ::close(ends[0]);
+    const std::string fds = "/proc/" + std::to_string(tree.serverProcess()) + "/fd/";
+    for (const char* fd : {"0", "1", "2"})
+        EXPECT_EQ(fs::read_symlink(fds + fd), "/dev/null");
+}
+
+TEST(ProgramTest, listensOnLoopbackOnly)
+{
+    ServerTree tree;
+    tree.start();
+    char text[16];
+    std::snprintf(text, sizeof text, ":%04X", tree.port());
+    std::ifstream table("/proc/net/tcp");
+    for (std::string line; std::getline(table, line);) {
+        if (line.find(text) == std::string::npos || line.find(" 0A ") == std::string::npos)
+            continue; // not a listener on our port
+        EXPECT_NE(line.find(std::string("0100007F") + text), std::string::npos) << line;
+    }
+    std::ifstream six("/proc/net/tcp6");
+    EXPECT_EQ(std::string(std::istreambuf_iterator<char>(six), {}).find(std::string(text) + " 0000000000000000"),
+              std::string::npos);
+}
+
+} // namespace
+} // namespace servertest

@@ -1,0 +1,403 @@
+// What the server keeps and checks: configuration, files, peers, registrations.
+#include "pegasus/server/Config.h"
+#include "pegasus/server/Listener.h"
+#include "pegasus/server/PeerCheck.h"
+#include "pegasus/server/PrivateFile.h"
+#include "pegasus/server/ProviderRegistry.h"
+#include "pegasus/server/RegistrationChecks.h"
+#include "pegasus/server/StartFile.h"
+#include "pegasus/server/TreeLock.h"
+
+#include <Pegasus/Common/Exception.h>
+
+#include <gtest/gtest.h>
+
+#include <arpa/inet.h>
+#include <netinet/in.h>
+#include <sys/socket.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <fstream>
+
+namespace Pegasus::server {
+namespace {
+
+namespace fs = std::filesystem;
+
+class StateTest : public testing::Test
+{
+  protected:
+    StateTest()
+    {
+        std::string path = (fs::temp_directory_path() / "server-state-XXXXXX").string();
+        fHome = ::mkdtemp(path.data());
+        fs::create_directories(fHome + "/lib");
+    }
+    ~StateTest() override { fs::remove_all(fHome); }
+
+    std::string fHome;
+};
+
+struct ValueRow
+{
+    const char* name;
+    const char* value;
+    bool valid;
+};
+
+TEST_F(StateTest, configurationValuesAreChecked)
+{
+    const ValueRow rows[] = {
+        {"httpPort", "1", true},
+        {"httpPort", "65535", true},
+        {"httpPort", "0", false},
+        {"httpPort", "65536", false},
+        {"httpPort", "80x", false},
+        {"httpPort", "", false},
+        {"httpPort", " 80", false},
+        {"maxConnections", "0", false},
+        {"idleConnectionTimeout", "0", true},
+        {"maxBodyBytes", "-1", false},
+        {"daemon", "yes", false},
+        {"daemon", "false", true},
+        {"consumer", "a+b,c:d@e", true},
+        {"consumer", "a/b", false},
+        {"consumer", "a b", false},
+        {"consumer", "..", false},
+        {"consumer", "$(x)", false},
+        {"consumer", "a\x01", false},
+        {"providerDir", "lib", true},
+        {"providerDir", "lib:", true},
+        {"providerDir", ":", false},
+        {"providerDir", "lib:no", false},
+        {"providerDir", "", false},
+        {"logLevel", "LOUD", false},
+        {"repositoryDir", "x\ny", false},
+        {"enableHttpsConnection", "true", false},
+    };
+    for (const ValueRow& row : rows)
+        EXPECT_EQ(isValidConfigValue(*findConfigProperty(row.name), row.value, fHome), row.valid)
+            << row.name << "=" << row.value;
+    for (const ConfigProperty& property : configTable())
+        EXPECT_TRUE(isValidConfigValue(property, property.defaultValue, fHome)) << property.name;
+}
+
+TEST_F(StateTest, plannedValuesRuleTheNextStartAndCurrentOnesThisRun)
+{
+    {
+        Config config(fHome);
+        config.setPlanned("httpPort", "1234");
+        config.setCurrent("maxConnections", "5");
+        EXPECT_EQ(config.text("httpPort"), "5988");
+        EXPECT_EQ(config.planned("httpPort"), "1234");
+        EXPECT_EQ(config.number("maxConnections"), 5u);
+        EXPECT_THROW(config.setCurrent("httpPort", "80"), ConfigError);
+        EXPECT_THROW(config.setCurrent("maxConnections", "0"), ConfigError);
+        EXPECT_THROW(config.setPlanned("nope", "0"), ConfigError);
+        EXPECT_EQ(readConfigFile(currentConfigPath(fHome)).at("maxConnections"), "5");
+    }
+    Config config(fHome);
+    EXPECT_EQ(config.text("httpPort"), "1234");
+    EXPECT_EQ(config.number("maxConnections"), 128u) << "current values are forgotten";
+    config.setFromCommandLine("httpPort", "99");
+    EXPECT_EQ(config.text("httpPort"), "99");
+    config.resetPlanned("httpPort");
+    EXPECT_EQ(Config(fHome).text("httpPort"), "5988");
+}
+
+TEST_F(StateTest, aPlannedValueThatIsNoLongerValidGivesWay)
+{
+    fs::create_directories(fHome + "/vendor");
+    Config(fHome).setPlanned("providerDir", "vendor");
+    fs::remove(fHome + "/vendor");
+    EXPECT_EQ(Config(fHome).text("providerDir"), "lib");
+    std::ofstream(plannedConfigPath(fHome)) << "# comment\n\nnoequals\nhttpPort=x\nnope=1\nmaxBodyBytes=7\n";
+    EXPECT_EQ(Config(fHome).number("maxBodyBytes"), 7u);
+    EXPECT_EQ(Config(fHome).text("httpPort"), "5988");
+}
+
+TEST_F(StateTest, privateFilesReplaceLinksAndAreReadOnlyIfRegular)
+{
+    const std::string victim = fHome + "/victim";
+    std::ofstream(victim) << "untouched";
+    fs::create_symlink(victim, fHome + "/file");
+    writePrivateFile(fHome + "/file", "new");
+    EXPECT_EQ(readSmallFile(victim, 100), "untouched");
+    EXPECT_EQ(readSmallFile(fHome + "/file", 100), "new");
+    EXPECT_EQ(readSmallFile(fHome + "/file", 2), "ne");
+    fs::create_symlink(victim, fHome + "/link");
+    EXPECT_EQ(readSmallFile(fHome + "/link", 100), "");
+    ASSERT_EQ(::mkfifo((fHome + "/fifo").c_str(), 0600), 0);
+    EXPECT_EQ(readSmallFile(fHome + "/fifo", 100), "");
+    EXPECT_THROW(writePrivateFile(fHome + "/no/file", "x"), std::system_error);
+}
+
+TEST_F(StateTest, aStartFileIsBelievedOnlyOfAServer)
+{
+    const StartFile file(fs::path(fHome).filename().string());
+    for (const char* content : {"", "x", "-5", "0", "99999999", "1 2"}) {
+        std::ofstream(file.path()) << content;
+        EXPECT_FALSE(file.runningServer()) << content;
+    }
+    file.write(::getpid());
+    EXPECT_EQ(file.pid(), ::getpid());
+    EXPECT_FALSE(file.runningServer()) << "this process is not called cimserver";
+    file.removeIfOf(1);
+    EXPECT_TRUE(file.pid());
+    file.removeIfOf(::getpid());
+    EXPECT_FALSE(file.pid());
+}
+
+TEST_F(StateTest, oneLockATree)
+{
+    TreeLock first;
+    TreeLock second;
+    EXPECT_TRUE(first.acquire(fHome));
+    EXPECT_FALSE(second.acquire(fHome));
+    first.release();
+    EXPECT_TRUE(second.acquire(fHome));
+}
+
+// A loopback connection; `server` is the accepted end.
+struct Pair
+{
+    Descriptor client;
+    Descriptor server;
+
+    Pair()
+    {
+        const Descriptor listener = listenOnLoopback(0);
+        sockaddr_in address = {};
+        socklen_t size = sizeof address;
+        ::getsockname(listener.get(), reinterpret_cast<sockaddr*>(&address), &size);
+        client.reset(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0));
+        EXPECT_EQ(::connect(client.get(), reinterpret_cast<const sockaddr*>(&address), size), 0);
+        bool exhausted = false;
+        server = acceptConnection(listener, exhausted);
+    }
+
+    std::string line(const char* state, unsigned uid, unsigned inode) const
+    {
+        sockaddr_in own = {};
+        sockaddr_in peer = {};
+        socklen_t size = sizeof own;
+        ::getsockname(server.get(), reinterpret_cast<sockaddr*>(&own), &size);
+        ::getpeername(server.get(), reinterpret_cast<sockaddr*>(&peer), &size);
+        char text[200];
+        std::snprintf(
+            text, sizeof text, "   0: %08X:%04X %08X:%04X %s 00000000:00000000 00:00000000 00000000 %5u 0 %u 1\n",
+            peer.sin_addr.s_addr, ntohs(peer.sin_port), own.sin_addr.s_addr, ntohs(own.sin_port), state, uid, inode);
+        return text;
+    }
+};
+
+TEST_F(StateTest, theKernelSaysWhoThePeerIs)
+{
+    Pair pair;
+    EXPECT_EQ(tcpPeerUserFromNetlink(pair.server.get()), ::geteuid());
+    EXPECT_EQ(tcpPeerUserFromTable(pair.server.get()), ::geteuid());
+    EXPECT_EQ(tcpPeerUser(pair.server.get()), ::geteuid());
+    pair.client.reset(); // reported as nobody's from now on, which must not pass for root's
+    EXPECT_FALSE(tcpPeerUserFromNetlink(pair.server.get()));
+    EXPECT_FALSE(tcpPeerUserFromTable(pair.server.get()));
+}
+
+struct TableRow
+{
+    const char* name;
+    const char* state;
+    unsigned uid;
+    unsigned inode;
+    bool known;
+};
+
+TEST_F(StateTest, theTableIsReadUnderTheSameRule)
+{
+    const Pair pair;
+    const std::string table = fHome + "/tcp";
+    for (const TableRow& row : {TableRow{"established", "01", 1000, 7, true},
+                                {"close wait", "08", 1000, 7, true},
+                                {"no inode", "01", 0, 0, false},
+                                {"fin wait", "04", 1000, 7, false},
+                                {"time wait", "06", 0, 0, false}})
+    {
+        std::ofstream(table) << "  sl  local_address rem_address\n" << pair.line(row.state, row.uid, row.inode);
+        const std::optional<uid_t> user = tcpPeerUserFromTable(pair.server.get(), table);
+        EXPECT_EQ(user.has_value(), row.known) << row.name;
+        EXPECT_EQ(user.value_or(row.uid), row.uid) << row.name;
+    }
+    std::ofstream(table) << Pair().line("01", 1000, 7); // somebody else's connection
+    EXPECT_FALSE(tcpPeerUserFromTable(pair.server.get(), table));
+    EXPECT_FALSE(tcpPeerUserFromTable(pair.server.get(), fHome + "/missing"));
+}
+
+TEST(PeerTest, onlyRootAndTheServersUserMayConnect)
+{
+    EXPECT_TRUE(mayConnect(0));
+    EXPECT_TRUE(mayConnect(::geteuid()));
+    EXPECT_FALSE(mayConnect(::geteuid() + 4711));
+    EXPECT_FALSE(mayConnect(std::nullopt));
+}
+
+using Properties = std::vector<std::pair<const char*, CIMValue>>;
+
+CIMInstance makeInstance(const char* className, const Properties& properties)
+{
+    CIMInstance instance((CIMName(className)));
+    for (const auto& [name, value] : properties)
+        if (!value.isNull())
+            instance.addProperty(CIMProperty(CIMName(name), value));
+    return instance;
+}
+
+CIMValue text(const char* value)
+{
+    return CIMValue(String(value));
+}
+
+CIMValue texts(const char* value)
+{
+    Array<String> values;
+    values.append(String(value));
+    return CIMValue(values);
+}
+
+CIMValue numbers(Uint16 value)
+{
+    Array<Uint16> values;
+    values.append(value);
+    return CIMValue(values);
+}
+
+CIMInstance module(const char* type = "CMPI", const char* version = "2.0.0", const CIMValue& location = text("x"),
+                   const CIMValue& userContext = CIMValue())
+{
+    return makeInstance(kModuleClass, {{"Name", text("M")},
+                                       {"Vendor", text("V")},
+                                       {"Version", text("1")},
+                                       {"InterfaceType", text(type)},
+                                       {"InterfaceVersion", text(version)},
+                                       {"Location", location},
+                                       {"UserContext", userContext}});
+}
+
+CIMInstance provider(const char* moduleName, const char* name)
+{
+    return makeInstance(kProviderClass, {{"ProviderModuleName", text(moduleName)}, {"Name", text(name)}});
+}
+
+CIMInstance capabilities(const char* name, const char* id, const CIMValue& nameSpaces = texts("root/x"),
+                         Uint16 type = 2)
+{
+    return makeInstance(kCapabilitiesClass, {{"ProviderModuleName", text("M")},
+                                             {"ProviderName", text(name)},
+                                             {"CapabilityID", text(id)},
+                                             {"ClassName", text("C")},
+                                             {"Namespaces", nameSpaces},
+                                             {"ProviderType", numbers(type)}});
+}
+
+void addClass(repository::Repository& repository, const char* name, const std::vector<const char*>& keys,
+              const Properties& others)
+{
+    CIMClass cimClass((CIMName(name)));
+    for (const char* key : keys) {
+        CIMProperty property(CIMName(key), CIMValue(CIMTYPE_STRING, false));
+        property.addQualifier(CIMQualifier(CIMName("Key"), CIMValue(Boolean(true))));
+        cimClass.addProperty(property);
+    }
+    for (const auto& [other, value] : others)
+        cimClass.addProperty(CIMProperty(CIMName(other), value));
+    repository.createClass(CIMNamespaceName(kInteropNamespace), cimClass);
+}
+
+class RegistryTest : public StateTest
+{
+  protected:
+    RegistryTest() : fRepository(fHome + "/repository"), fRegistry(fRepository)
+    {
+        const CIMValue string(CIMTYPE_STRING, false);
+        const CIMValue strings(CIMTYPE_STRING, true);
+        const CIMValue codes(CIMTYPE_UINT16, true);
+        fRepository.createNamespace(CIMNamespaceName(kInteropNamespace));
+        fRepository.setQualifier(CIMNamespaceName(kInteropNamespace),
+                                 CIMQualifierDecl(CIMName("Key"), CIMValue(Boolean(false)), CIMScope::PROPERTY));
+        addClass(fRepository, kModuleClass, {"Name"},
+                 {{"Vendor", string},
+                  {"Version", string},
+                  {"InterfaceType", string},
+                  {"InterfaceVersion", string},
+                  {"Location", string},
+                  {"UserContext", CIMValue(CIMTYPE_UINT16, false)},
+                  {"OperationalStatus", codes}});
+        addClass(fRepository, kProviderClass, {"ProviderModuleName", "Name"}, {});
+        addClass(fRepository, kCapabilitiesClass, {"ProviderModuleName", "ProviderName", "CapabilityID"},
+                 {{"ClassName", string}, {"Namespaces", strings}, {"ProviderType", codes}});
+    }
+
+    std::string errorOf(const CIMInstance& instance)
+    {
+        try {
+            fRegistry.registerInstance(instance);
+            return "";
+        } catch (const CIMException& error) {
+            return std::to_string(error.getCode()) + " " + std::string(error.getMessage().getCString());
+        }
+    }
+
+    repository::Repository fRepository;
+    ProviderRegistry fRegistry;
+};
+
+struct RegistrationRow
+{
+    const char* name;
+    CIMInstance instance;
+    const char* error; // code and text; empty: accepted
+};
+
+TEST_F(RegistryTest, registrationsAreCheckedInOrder)
+{
+    const RegistrationRow rows[] = {
+        {"provider first", provider("M", "P"),
+         "1 PG_ProviderModule class needs to be registered before register the PG_Provider class"},
+        {"no location", module("CMPI", "2.0.0", CIMValue()),
+         "4 Missing Location which is required property in PG_ProviderModule class."},
+        {"type", module("Nonsense"), "7 Unsupported InterfaceType value: \"Nonsense\""},
+        {"version", module("CMPI", "9.9.9"), "7 Unsupported InterfaceVersion value: \"9.9.9\""},
+        {"user context", module("CMPI", "2.0.0", text("x"), CIMValue(Uint16(9))),
+         "7 Unsupported UserContext value: \"9\"."},
+        {"module", module(), ""},
+        {"module again", module(), "11 PG_ProviderModule.Name=\"M\""},
+        {"capabilities first", capabilities("P", "1"),
+         "1 PG_Provider class needs to be registered before register the Provider capabilities class"},
+        {"provider", provider("M", "P"), ""},
+        {"other provider", provider("M", "Q"), ""},
+        {"no namespaces", capabilities("P", "1", CIMValue()),
+         "4 Missing Namespaces which is required property in PG_ProviderCapabilities class."},
+        {"wildcard", capabilities("P", "1", texts("root/cim*")), "1 invalid CIM namespace name: root/cim*"},
+        {"provider type", capabilities("P", "1", texts("root/x"), 9),
+         "7 Unsupported ProviderType value \"9\" in PG_ProviderCapabilities instance."},
+        {"capabilities", capabilities("P", "1"), ""},
+        {"capabilities again", capabilities("P", "1"),
+         "11 PG_ProviderCapabilities.CapabilityID=\"1\",ProviderModuleName=\"M\",ProviderName=\"P\""},
+        {"taken", capabilities("Q", "1"), "1 A provider is already registered for the specified capability."},
+        {"another type of it", capabilities("Q", "2", texts("root/x"), 5), ""},
+        {"another namespace", capabilities("Q", "3", texts("root/y")), ""},
+    };
+    for (const RegistrationRow& row : rows)
+        EXPECT_EQ(errorOf(row.instance), row.error) << row.name;
+
+    const auto found = fRegistry.find(CIMNamespaceName("ROOT/X"), CIMName("c"), ProviderType::kInstance);
+    ASSERT_TRUE(found);
+    EXPECT_EQ(found->module, "M");
+    EXPECT_EQ(found->provider, "P");
+    EXPECT_EQ(found->location, "x");
+    EXPECT_EQ(fRegistry.find(CIMNamespaceName("root/x"), CIMName("C"), ProviderType::kMethod)->provider, "Q");
+    EXPECT_FALSE(fRegistry.find(CIMNamespaceName("root/y"), CIMName("C"), ProviderType::kMethod));
+}
+
+} // namespace
+} // namespace Pegasus::server
