@@ -1,0 +1,66 @@
+// A foreign client, Debian's wbemcli, against our server: every operation that it has.
+#include "pegasus/server/ServerTree.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <cstdlib>
+#include <memory>
+
+namespace servertest {
+namespace {
+
+struct CliRow
+{
+    const char* name;
+    std::string arguments;             // for the shell; %s stands for the server's address
+    std::vector<std::string> expected; // pieces of the output
+};
+
+std::string outputOf(const std::string& command)
+{
+    std::string text;
+    const std::unique_ptr<FILE, int (*)(FILE*)> pipe(::popen(command.c_str(), "r"), ::pclose);
+    char part[4096];
+    for (std::size_t n; (n = std::fread(part, 1, sizeof part, pipe.get())) > 0;)
+        text.append(part, n);
+    return text;
+}
+
+TEST(WbemcliTest, everyOperation)
+{
+    if (std::system("command -v wbemcli >/dev/null") != 0)
+        GTEST_SKIP() << "wbemcli is not installed";
+    ServerTree tree;
+    tree.start();
+    tree.installProbe();
+    const std::string probe = "'http://127.0.0.1:" + std::to_string(tree.port()) + "/root/probe";
+    const CliRow rows[] = {
+        {"GetClass", "-nl gc " + probe + ":Probe_Base'", {"root/probe:Probe_Base", "-Id=", "-T1="}},
+        {"EnumerateClasses", "ec " + probe + ":Probe_Record'", {":Probe_Bulk", ":Probe_Other"}},
+        {"EnumerateClassNames", "ecn " + probe + "'", {":Probe_Base\n", ":Probe_Stored\n"}},
+        {"EnumerateInstances of the repository",
+         "-nl ei " + probe + ":Probe_Stored'",
+         {":Probe_Stored.Id=\"stored-1\"", "-T1=\"one\"", "-Number=7"}},
+        {"EnumerateInstances of a provider", "ei " + probe + ":Probe_Bulk'", {"bulk-0000000", "bulk-0000999"}},
+        {"EnumerateInstanceNames",
+         "ein " + probe + ":Probe_Family'",
+         {":Probe_Provided.Id=\"bulk-0000001\"", "stored-1"}},
+        {"GetInstance",
+         "-nl gi " + probe + ":Probe_Bulk.Id=\"bulk-0000007\"'",
+         {"-Id=\"bulk-0000007\"", "-N1=7000021"}},
+        {"CreateInstance", "ci " + probe + ":Probe_Stored.Id=\"new\"' Id=new,T1=two", {"Probe_Stored.Id=\"new\""}},
+        {"InvokeMethod", "cm " + probe + ":Probe_Bulk' 'Echo.Text=\"hello\"'", {"hello"}},
+        {"an error", "gc " + probe + ":Nope' 2>&1", {"CIM_ERR_NOT_FOUND"}},
+        {"not supported", "di " + probe + ":Probe_Stored.Id=\"new\"' 2>&1", {"CIM_ERR_NOT_SUPPORTED"}},
+    };
+    for (const CliRow& row : rows) {
+        SCOPED_TRACE(row.name);
+        const std::string output = outputOf("wbemcli " + row.arguments);
+        for (const std::string& piece : row.expected)
+            EXPECT_NE(output.find(piece), std::string::npos) << piece << "\nin: " << output.substr(0, 600);
+    }
+}
+
+} // namespace
+} // namespace servertest
