@@ -84,4 +84,12 @@ std::size_t ClassSchema::find(std::string_view name) const
     return kNotFound;
 }
 
+std::size_t ClassSchema::findKey(const CIMName& name) const
+{
+    for (const std::size_t key : fKeys)
+        if (fProperties[key].name.equal(name))
+            return key;
+    return kNotFound;
+}
+
 } // namespace Pegasus::cmpi

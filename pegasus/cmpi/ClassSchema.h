@@ -43,6 +43,8 @@ class ClassSchema
 
     // Returns: the index of the property of that name (case-insensitive), or kNotFound.
     std::size_t find(std::string_view name) const;
+    // The same among the keys; quick for names that come from this schema.
+    std::size_t findKey(const CIMName& name) const;
 
   private:
     void addProperty(const CIMConstProperty& property);

@@ -4,6 +4,7 @@
 #include "pegasus/cmpi/NamedValues.h"
 #include "pegasus/cmpi/PropertyFilter.h"
 #include "pegasus/cmpi/Text.h"
+#include "pegasus/common/ObjectReps.h"
 
 #include <Pegasus/Common/CIMProperty.h>
 
@@ -62,7 +63,7 @@ InstanceObject::InstanceObject(const InstanceObject& other)
 void InstanceObject::takeKeys()
 {
     for (const NamedValue& key : fPath.keys) {
-        const std::size_t at = fPath.schema ? fPath.schema->find(utf8(key.name)) : ClassSchema::kNotFound;
+        const std::size_t at = fPath.schema ? fPath.schema->findKey(key.name) : ClassSchema::kNotFound;
         if (at != ClassSchema::kNotFound)
             store(at, convertKey(key.value, fPath.schema->properties()[at].type));
         else if (fPath.schema == nullptr)
@@ -173,8 +174,9 @@ PathState InstanceObject::completePath() const
         return path;
     for (const std::size_t key : path.schema->keys()) {
         const CIMValue& value = valueAt(key);
-        if (!value.isNull() && path.findKey(path.schema->properties()[key].text) == nullptr)
-            path.keys.push_back({path.schema->properties()[key].name, value});
+        const CIMName& name = path.schema->properties()[key].name;
+        if (!value.isNull() && path.findKey(name) == nullptr)
+            path.keys.push_back({name, value});
     }
     return path;
 }
@@ -192,15 +194,18 @@ void InstanceObject::setPath(const PathState& path)
 CIMInstance InstanceObject::filtered(const PropertyFilter& filter) const
 {
     CIMInstance result(fPath.className);
+    Array<CIMProperty>& properties =
+        ObjectAccess::rep(result).fProperties; // no name can be there twice: no need to look
+    properties.reserveCapacity(static_cast<Uint32>(fSet.size() + fExtra.size()));
     if (fPath.schema != nullptr) {
         const auto& declared = fPath.schema->properties();
         for (std::size_t i = 0; i < declared.size(); ++i)
             if ((fPlaces[i] != 0 || !declared[i].initial.isNull()) && filter.passes(*fPath.schema, i))
-                result.addProperty(propertyOf(declared[i], valueAt(i)));
+                properties.append(propertyOf(declared[i], valueAt(i)));
     }
     for (const NamedValue& extra : fExtra)
         if (filter.passes(extra.name))
-            result.addProperty(CIMProperty(extra.name, extra.value));
+            properties.append(CIMProperty(extra.name, extra.value));
     result.setPath(completePath().withoutNameSpace());
     return result;
 }

@@ -74,7 +74,7 @@ CMPIData getKey(const CMPIObjectPath* self, const char* name, CMPIStatus* rc)
 {
     return answer(rc, kNothing, [&] {
         const ObjectPathObject& path = objectOf<ObjectPathObject>(self);
-        const NamedValue* key = path.state.findKey(requireText(name));
+        const NamedValue* key = path.state.findKey(std::string_view(requireText(name)));
         if (key == nullptr)
             throw SlotError{CMPI_RC_ERR_NOT_FOUND, {}};
         return encodeKey(path.broker, key->value);

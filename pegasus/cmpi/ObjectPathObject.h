@@ -21,7 +21,9 @@ struct PathState
     // Throws: CMPI_RC_ERR_INVALID_DATA_TYPE for arrays, instances and untyped nulls; CMPI_RC_ERR_INVALID_PARAMETER when
     //     the class is known and has no such key.
     void addKey(const char* name, const CMPIValue* value, CMPIType type);
+    // Returns: the key of that name (case-insensitive), or null.
     const NamedValue* findKey(std::string_view name) const;
+    const NamedValue* findKey(const CIMName& name) const;
     // Looks the class up again, after its name or name space changed.
     void lookUp(Broker& broker);
 

@@ -128,6 +128,14 @@ const NamedValue* PathState::findKey(std::string_view name) const
     return nullptr;
 }
 
+const NamedValue* PathState::findKey(const CIMName& name) const
+{
+    for (const NamedValue& key : keys)
+        if (key.name.equal(name))
+            return &key;
+    return nullptr;
+}
+
 CIMObjectPath PathState::withNameSpace() const
 {
     return {host, nameSpace, className, bindings()};
