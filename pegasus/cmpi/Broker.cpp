@@ -17,9 +17,10 @@ Broker::Broker(BrokerServices& services)
 
 Broker& Broker::of(const CMPIBroker* broker)
 {
-    if (broker == nullptr)
+    if (broker == nullptr || broker->hdl == nullptr)
         throw SlotError{CMPI_RC_ERR_INVALID_HANDLE, {}};
-    return const_cast<Broker&>(static_cast<const Broker&>(*broker));
+    return *static_cast<Broker*>(
+        const_cast<void*>(broker->hdl)); // by the handle: some providers keep a copy of the object
 }
 
 void Broker::warnOnce(const std::string& text)

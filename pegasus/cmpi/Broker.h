@@ -27,7 +27,7 @@ class Broker final : public CMPIBroker
     // is bounded; beyond that, mistakes go unlogged.
     void warnOnce(const std::string& text);
 
-    // Requires: the provider passed a broker that it was given.
+    // Requires: the provider passed a broker that it was given, or a copy of it.
     // Throws: CMPI_RC_ERR_INVALID_HANDLE for null.
     static Broker& of(const CMPIBroker* broker);
 

@@ -97,12 +97,14 @@ class ValuePasser
 
     template <class T, class Use> CMPIStatus pass(const std::vector<T>& values, Use&& use) const
     {
+        constexpr CMPIType kElement = std::is_same_v<T, std::string> ? CMPIType{CMPI_string} : typeOf<T>();
         CMPIStatus status{CMPI_RC_OK, nullptr};
-        CMPIArray* array = fBroker.eft->newArray(&fBroker, static_cast<CMPICount>(values.size()), typeOf<T>(), &status);
+        CMPIArray* array = fBroker.eft->newArray(&fBroker, static_cast<CMPICount>(values.size()), kElement, &status);
         for (CMPICount i = 0; array != nullptr && status.rc == CMPI_RC_OK && i < values.size(); ++i)
-            status = array->ft->setElementAt(array, i, pointerTo(values[i]), typeOf<T>());
-        const auto type = std::is_same_v<T, std::string> ? CMPI_stringA : CMPI_ARRAY | typeOf<T>();
-        return usedOnce(array, status, static_cast<CMPIType>(type), use);
+            status = passElement(values[i], [&](const CMPIValue* value, CMPIType type) {
+                return array->ft->setElementAt(array, i, value, type);
+            });
+        return usedOnce(array, status, static_cast<CMPIType>(CMPI_ARRAY | kElement), use);
     }
 
     template <class Object, class Use>
@@ -115,6 +117,15 @@ class ValuePasser
     }
 
   private:
+    // Text in an array is a string object: not every broker takes plain text there.
+    template <class Use> CMPIStatus passElement(const std::string& value, Use&& use) const
+    {
+        CMPIStatus status{CMPI_RC_OK, nullptr};
+        CMPIString* made = fBroker.eft->newString(&fBroker, value.c_str(), &status);
+        return usedOnce(made, status, CMPI_string, use);
+    }
+    template <class T, class Use> CMPIStatus passElement(const T& value, Use&& use) const { return pass(value, use); }
+
     const CMPIBroker& fBroker;
 };
 
