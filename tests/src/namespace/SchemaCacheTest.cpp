@@ -12,6 +12,7 @@
 #include "src/schema/TPEGASUSClass.h"
 #include "src/schema/TPEGASUSQualifierDecl.h"
 #include "src/support/NamespaceRig.h"
+#include "support/PeerAnswers.h"
 
 namespace NKOLVRX20 {
 namespace {
@@ -167,7 +168,7 @@ TEST_F(SchemaCacheTest, AnErrorOfTheServerIsANullClass)
 
 TEST_F(SchemaCacheTest, AnAnswerThatIsNoHttpLeavesAsTheLibrarysOwnException)
 {
-    fServer.AnswerRaw("GetClass A", "");
+    fServer.AnswerWith("GetClass A", [](const test::PeerRequest&) { return test::closedConnection(); });
     EXPECT_THROW(fNamespace->GetClass("A", {}), Pegasus::UninitializedObjectException);
     EXPECT_EQ("3|Pegasus::CIMClientMalformedHTTPException -- Connection closed by CIM Server.",
               fRig.fLog.Take().back());

@@ -2,6 +2,7 @@
 #include <algorithm>
 #include <cstdio>
 #include <filesystem>
+#include <memory>
 #include <set>
 
 #include <dlfcn.h>
@@ -87,19 +88,25 @@ class ModuleTest : public ::testing::Test
     ModuleTest()
     {
         std::filesystem::current_path(fRoot.Path());
-        fWorld.fBindForReal = false;
-        fWorld.fIsPortFree = [this](unsigned short port) { return port == fServer.Port(); };
         fWorld.fFiles["/lsi_mr.conf"] = "";
-        fServer.AnswerClass("A_Top", "");
-        fServer.AnswerClass("A_Leaf", "A_Top", "<PROPERTY NAME=\"Name\" TYPE=\"string\"></PROPERTY>");
-        fServer.Answer("EnumerateInstances A_Leaf",
+    }
+    ~ModuleTest() override { std::filesystem::current_path("/"); }
+
+    std::unique_ptr<TFakeCimServer> StartServer()
+    {
+        auto server = std::make_unique<TFakeCimServer>();
+        server->AnswerClass("A_Top", "");
+        server->AnswerClass("A_Leaf", "A_Top", "<PROPERTY NAME=\"Name\" TYPE=\"string\"></PROPERTY>");
+        server->Answer("EnumerateInstances A_Leaf",
                        "<VALUE.NAMEDINSTANCE><INSTANCENAME CLASSNAME=\"A_Leaf\"><KEYBINDING NAME=\"Name\"><KEYVALUE "
                        "VALUETYPE=\"string\">one</KEYVALUE></KEYBINDING></INSTANCENAME><INSTANCE CLASSNAME=\"A_Leaf\">"
                        "<PROPERTY NAME=\"Name\" TYPE=\"string\"><VALUE>one</VALUE></PROPERTY></INSTANCE>"
                        "</VALUE.NAMEDINSTANCE>");
-        fServer.Listen();
+        server->Listen();
+        fWorld.fBindForReal = false;
+        fWorld.fIsPortFree = [port = server->Port()](unsigned short candidate) { return candidate == port; };
+        return server;
     }
-    ~ModuleTest() override { std::filesystem::current_path("/"); }
 
     // Goes the whole way from a namespace to its instances. Returns: how many there were.
     static int CountInstances(const TDeployedModule& module)
@@ -119,7 +126,6 @@ class ModuleTest : public ::testing::Test
         return count;
     }
 
-    TFakeCimServer fServer;
     TTempTree fRoot;
     TCapturedLog fLog;
     TOutsideWorld fWorld;
@@ -158,15 +164,15 @@ TEST_F(ModuleTest, LeavesNothingBehindHoweverOftenItIsLoaded)
     TDeployedModule module("acme");
     for (int round = 0; round < 50; ++round) {
         SCOPED_TRACE(round);
+        auto server = StartServer();
         module.Load();
         ASSERT_EQ(1, CountInstances(module));
         module.Clear();
         module.Unload();
         ASSERT_FALSE(module.IsStillLoaded());
+        server.reset();
         fLog.Take();
         fWorld.Forget();
-        fServer.ForgetRequests();
-        fServer.WaitUntilIdle();
         if (round == 9) { // whatever libraries keep for good, they have by now
             descriptors = CountEntries("/proc/self/fd");
             threads = CountEntries("/proc/self/task");
@@ -182,6 +188,7 @@ TEST_F(ModuleTest, LeavesNothingBehindHoweverOftenItIsLoaded)
 
 TEST_F(ModuleTest, TwoCopiesDoNotMeet)
 {
+    const auto server = StartServer();
     TDeployedModule first("acme"), second("beta");
     first.Load();
     ASSERT_EQ(1, CountInstances(first));

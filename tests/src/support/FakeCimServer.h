@@ -1,12 +1,13 @@
 #ifndef TESTS_SRC_SUPPORT_FAKECIMSERVER_H
 #define TESTS_SRC_SUPPORT_FAKECIMSERVER_H
 
-#include <condition_variable>
+#include <functional>
 #include <map>
 #include <mutex>
 #include <string>
-#include <thread>
 #include <vector>
+
+#include "support/ScriptedPeer.h"
 
 namespace NKOLVRX20 {
 
@@ -19,72 +20,30 @@ class TFakeCimServer
 {
   public:
     TFakeCimServer();
-    ~TFakeCimServer();
 
-    TFakeCimServer(const TFakeCimServer&) = delete;
-    TFakeCimServer& operator=(const TFakeCimServer&) = delete;
-
-    unsigned short Port() const { return fPort; }
-    void Listen();
-    // Refuses further connections; those that stand go on.
-    void Refuse();
+    unsigned short Port() const { return fPeer.port(); }
+    void Listen() { fPeer.listen(); }
+    // Ends the connections that stand, and refuses further ones.
+    void Refuse() { fPeer.refuse(); }
 
     // The content of the answer's IRETURNVALUE.
     void Answer(const std::string& request, const std::string& returnValue);
-    // A class without elements of its own, or with these.
+    // A class with these elements.
     void AnswerClass(const std::string& name, const std::string& superClass, const std::string& elements = "");
-    // The whole answer, byte for byte; then the connection is closed.
-    void AnswerRaw(const std::string& request, const std::string& bytes);
-    // Never answers.
-    void KeepSilentOn(const std::string& request);
+    void AnswerWith(const std::string& request, test::PeerHandler handler);
 
-    // Blocks: until all connections have ended, five seconds at most.
-    void WaitUntilIdle() const;
-    void ForgetRequests();
     std::vector<std::string> Requests() const;
     // Returns: how often this was asked.
     long Count(const std::string& request) const;
-    // Returns: the body of the last request of that name.
+    // Returns: the body of the last request of that name; empty when there was none.
     std::string LastBody(const std::string& request) const;
 
   private:
-    struct TReply
-    {
-        enum EKind
-        {
-            kReturnValue,
-            kRaw,
-            kSilence
-        } fKind;
-        std::string fText;
-    };
-    struct TConnection
-    {
-        int fDescriptor;
-        std::string fReceived;
-    };
+    test::PeerAnswer Respond(const test::PeerRequest& request);
 
-    void BindListener();
-    void Wish(char wish);
-    void Grant(char wish);
-    void Serve();
-    void CountConnections();
-    void Accept();
-    bool Receive(TConnection& connection);
-    bool Respond(int descriptor, const std::string& body);
-
-    int fListener = -1;
-    bool fIsListening = false; // the thread's own
-    int fWishes = 0;
-    int fWakeUp[2] = {-1, -1};
-    unsigned short fPort = 0;
     mutable std::mutex fMutex;
-    std::map<std::string, TReply> fReplies;
-    std::vector<std::pair<std::string, std::string>> fRequests; // name and body
-    std::vector<TConnection> fConnections;                      // the thread's own
-    int fConnectionCount = 0;
-    mutable std::condition_variable fChanged;
-    std::thread fThread;
+    std::map<std::string, test::PeerHandler> fHandlers; // by request name
+    test::ScriptedPeer fPeer;
 };
 
 } // namespace NKOLVRX20

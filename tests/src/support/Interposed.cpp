@@ -42,6 +42,15 @@ std::FILE* OpenFile(const char* function, const char* path, const char* mode)
     return next(redirected->second.c_str(), mode);
 }
 
+// Returns: whether a thread with this start belongs to Boost, as the plug-in's do and the tests' own do not.
+bool IsBoostThread(void* (*start)(void*))
+{
+    Dl_info library = {};
+    const auto next = Next<int(const void*, Dl_info*)>("dladdr");
+    return next(reinterpret_cast<void*>(start), &library) != 0 && library.dli_fname &&
+           std::string(library.dli_fname).find("boost_thread") != std::string::npos;
+}
+
 // Returns: whether the socket is one of the tests' own; the plug-in's probe sets no options.
 bool IsReusingAddresses(int descriptor)
 {
@@ -122,7 +131,7 @@ int dladdr(const void* address, Dl_info* info) noexcept
 int pthread_create(pthread_t* thread, const pthread_attr_t* attributes, void* (*start)(void*), void* argument) noexcept
 {
     TOutsideWorld* world = TOutsideWorld::Current();
-    if (world && !world->TakeThread())
+    if (world && IsBoostThread(start) && !world->TakeThread())
         return EAGAIN;
     return Next<int(pthread_t*, const pthread_attr_t*, void* (*)(void*), void*)>("pthread_create")(thread, attributes,
                                                                                                    start, argument);
