@@ -101,6 +101,9 @@ class TPEGASUSNamespace : public ICIMNamespace, public boost::enable_shared_from
     // Copies nothing.
     virtual ICIMNamespace& operator=(const ICIMNamespace& other);
 
+    // Returns: the name that it was built with.
+    const std::string& GetName() const { return fName; }
+
     // --- start-up ---
 
     // Starts a server and connects, with up to six attempts; then builds the root class, compiles the base schema and
