@@ -22,7 +22,7 @@ class PrivateServer
 
     /// Throws std::runtime_error with the server's words if it does not start.
     void start();
-    /// In good order. Throws std::runtime_error.
+    /// In good order. Requires: the schema of root/PG_Internal is compiled. Throws std::runtime_error.
     void stop();
     /// As a crash would; returns when the process is gone.
     void kill();

@@ -27,11 +27,7 @@ class Cimmof : public testing::Test
         server = std::make_unique<PrivateServer>();
         server->start();
     }
-    static void TearDownTestSuite()
-    {
-        server->stop();
-        server.reset();
-    }
+    static void TearDownTestSuite() { server.reset(); }
 
     /// Compiles a text as "t.mof" into a namespace.
     ProgramResult compile(const std::string& nameSpace, const std::string& text) const
