@@ -8,6 +8,7 @@
 namespace vrxhost {
 namespace {
 
+constexpr char kConnected[] = "TPEGASUSNamespace::connect succeeded";
 constexpr char kLoading[] = "Loading... ";
 // Every message about a provider description begins thus; those on names that the description's reader does not know
 // are routine, the root element's own name among them.
@@ -33,12 +34,15 @@ void LossLog::Log(EVRXLogSeverity severity, const std::string& text)
 {
     NKOLVRX20::TCoreLogger::Instance().Log(severity, text);
     const std::lock_guard<std::mutex> lock(fMutex);
+    LearnFromPrograms();
     Learn(severity, text);
 }
 
 void LossLog::Learn(EVRXLogSeverity severity, const std::string& text)
 {
-    if (BeginsWith(text, kLoading))
+    if (BeginsWith(text, kConnected))
+        fHeldBack.clear();
+    else if (BeginsWith(text, kLoading))
         fLoadedFile = text.substr(sizeof kLoading - 1);
     else if (const auto sentence = LossOfLine(text))
         Enter(*sentence);
@@ -56,11 +60,33 @@ void LossLog::Add(const std::string& sentence)
     Enter(sentence);
 }
 
-void LossLog::AddFailedPrograms(bool serverIsUp)
+// The line of a failed program comes right after the program was kept, so the sentences stay in order.
+void LossLog::LearnFromPrograms()
 {
-    for (const auto& program : NKOLVRX20::TProcessLog::Instance().Take())
-        if (const auto sentence = LossOfProgram(program, fRoot, serverIsUp))
-            Add(*sentence);
+    for (const auto& program : NKOLVRX20::TProcessLog::Instance().Take()) {
+        const auto sentence = LossOfProgram(program, fRoot);
+        if (!sentence)
+            continue;
+        if (IsServerStart(program)) {
+            fHeldBack = *sentence;
+            continue;
+        }
+        Release(); // a cause goes before its consequences
+        Enter(*sentence);
+    }
+}
+
+void LossLog::AddHeldBack()
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    Release();
+}
+
+void LossLog::Release()
+{
+    if (!fHeldBack.empty())
+        Enter(fHeldBack);
+    fHeldBack.clear();
 }
 
 std::vector<std::string> LossLog::GetSentences() const

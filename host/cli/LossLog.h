@@ -23,9 +23,8 @@ class LossLog : public NKOLVRX20::ILogger
     // Enters what the host itself found out.
     void Add(const std::string& sentence);
 
-    // Takes the programs that failed since the last call into account.
-    // serverIsUp: failed attempts to start the server are no loss then.
-    void AddFailedPrograms(bool serverIsUp);
+    // Enters what was held back in case that another attempt would succeed.
+    void AddHeldBack();
 
     // Returns: the sentences so far, in the order in which things were lost.
     std::vector<std::string> GetSentences() const;
@@ -33,10 +32,13 @@ class LossLog : public NKOLVRX20::ILogger
   private:
     void Enter(const std::string& sentence);
     void Learn(EVRXLogSeverity severity, const std::string& text);
+    void LearnFromPrograms();
+    void Release();
 
     const std::string fRoot;
     mutable std::mutex fMutex;
     std::string fLoadedFile; // the provider description being read
+    std::string fHeldBack;   // why the server did not start, at the latest attempt
     std::vector<std::string> fSentences;
     std::set<std::string> fKnown;
 };

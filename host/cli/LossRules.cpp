@@ -1,7 +1,8 @@
 #include "LossRules.h"
 
-#include <algorithm>
 #include <filesystem>
+#include <sstream>
+#include <vector>
 
 #include <host/TVRXStatusCode.h>
 
@@ -40,14 +41,28 @@ bool BeginsWith(const std::string& text, const std::string& begin)
     return text.compare(0, begin.size(), begin) == 0;
 }
 
-// On one line and without blanks at its ends; programs write several lines.
+std::string Trimmed(const std::string& text)
+{
+    const std::size_t begin = text.find_first_not_of(" \t\r\n");
+    return begin == std::string::npos ? "" : text.substr(begin, text.find_last_not_of(" \t\r\n") - begin + 1);
+}
+
+// Programs write several lines; a compiler's quotation of a source line, with a caret below, is left out.
 std::string OneLine(const std::string& text)
 {
-    std::string line = text;
-    while (!line.empty() && std::isspace(static_cast<unsigned char>(line.back())))
-        line.pop_back();
-    std::replace(line.begin(), line.end(), '\n', ' ');
-    return line;
+    std::vector<std::string> lines;
+    std::istringstream stream(text);
+    for (std::string line; std::getline(stream, line);) {
+        line = Trimmed(line);
+        if (line == "^" && !lines.empty())
+            lines.pop_back();
+        else if (!line.empty())
+            lines.push_back(line);
+    }
+    std::string joined;
+    for (const std::string& line : lines)
+        joined += (joined.empty() ? "" : " ") + line;
+    return joined;
 }
 
 std::optional<std::string> Apply(const TRule& rule, const std::string& line)
@@ -94,19 +109,25 @@ bool IsHarmless(const std::string& errorLine)
     if (BeginsWith(errorLine, "TPEGASUSNamespace::connect failed: "))
         return true;
     // A program that could not be run has a sentence of its own, with the cause.
-    return errorLine == NKOLVRX20::TVRXStatusCode(NKOLVRX20::TVRXStatusCode::kProcessFailed).TranslateStatusCode();
+    const std::string failed =
+        NKOLVRX20::TVRXStatusCode(NKOLVRX20::TVRXStatusCode::kProcessFailed).TranslateStatusCode();
+    return errorLine.size() >= failed.size() &&
+           errorLine.compare(errorLine.size() - failed.size(), failed.size(), failed) == 0;
 }
 
-std::optional<std::string> LossOfProgram(const NKOLVRX20::TFailedProgram& program, const std::string& root,
-                                         bool serverIsUp)
+bool IsServerStart(const NKOLVRX20::TFailedProgram& program)
+{
+    return program.fName == "cimserver" && (program.fArguments.empty() || program.fArguments.front() != "-s");
+}
+
+std::optional<std::string> LossOfProgram(const NKOLVRX20::TFailedProgram& program, const std::string& root)
 {
     if (program.fName == "cimmof")
         return LossOfCompilation(program);
-    if (program.fName == "cimserver") {
-        const bool isStop = !program.fArguments.empty() && program.fArguments.front() == "-s";
-        return isStop || serverIsUp ? std::nullopt
-                                    : std::optional("the server did not start, cimserver: " + Cause(program));
-    }
+    if (IsServerStart(program))
+        return "the server did not start, cimserver: " + Cause(program);
+    if (program.fName == "cimserver") // a server that does not run cannot be stopped
+        return std::nullopt;
     // Looks for a leftover server; without it none is found.
     if (program.fName == "ps")
         return std::nullopt;

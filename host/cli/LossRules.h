@@ -17,8 +17,10 @@ bool IsHarmless(const std::string& errorLine);
 
 // Returns: the sentence for a failed program; nothing when nothing was lost by it.
 // root: see LossLog.
-std::optional<std::string> LossOfProgram(const NKOLVRX20::TFailedProgram& program, const std::string& root,
-                                         bool serverIsUp);
+std::optional<std::string> LossOfProgram(const NKOLVRX20::TFailedProgram& program, const std::string& root);
+
+// Returns: true for a start of the server, which the plug-in attempts several times.
+bool IsServerStart(const NKOLVRX20::TFailedProgram& program);
 
 } // namespace vrxhost
 

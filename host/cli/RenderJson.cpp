@@ -1,5 +1,6 @@
 #include <charconv>
 
+#include <inmem/CharacterText.h>
 #include <nlohmann/json.hpp>
 
 #include "Render.h"
@@ -7,23 +8,9 @@
 namespace vrxhost {
 namespace {
 
-using NKOLVRX20::TCIMChar16;
 using NKOLVRX20::TCIMValue;
 typedef nlohmann::ordered_json TJson;
 typedef TCIMValue::TCIMType TType;
-
-// One UTF-16 code unit as UTF-8; half of a surrogate pair is no character.
-std::string CharacterText(unsigned short code)
-{
-    const auto byte = [](unsigned int value) { return static_cast<char>(value); };
-    if (code >= 0xd800 && code < 0xe000)
-        code = 0xfffd;
-    if (code < 0x80)
-        return {byte(code)};
-    if (code < 0x800)
-        return {byte(0xc0u | code >> 6), byte(0x80u | (code & 0x3fu))};
-    return {byte(0xe0u | code >> 12), byte(0x80u | (code >> 6 & 0x3fu)), byte(0x80u | (code & 0x3fu))};
-}
 
 // Through the shortest text, so that a real32 of 0.1 is shown as 0.1 and not as the double beside it.
 TJson RealValue(const TCIMValue& value)
@@ -56,7 +43,7 @@ TJson ScalarValue(const TCIMValue& value)
     case TType::kReal64:
         return RealValue(value);
     case TType::kChar16:
-        return CharacterText(static_cast<TCIMChar16>(value).GetCode());
+        return NKOLVRX20::CharacterText(static_cast<NKOLVRX20::TCIMChar16>(value));
     default:
         return value.ToString(10);
     }

@@ -83,8 +83,8 @@ void AppendClass(std::string& out, const TClassRecord& each, ECommand command)
 
 void AppendProvider(std::string& out, const TProviderRecord& provider, ECommand command)
 {
-    out += "Provider " + Printable(provider.fName) + " (" + Printable(provider.fModule) +
-           "): " + Counted(provider.fClasses.size(), "class") + "\n";
+    out += "Provider " + (provider.fName.empty() ? "without a name" : Printable(provider.fName)) + " (" +
+           Printable(provider.fModule) + "): " + Counted(provider.fClasses.size(), "class") + "\n";
     for (const auto& each : provider.fClasses)
         AppendClass(out, each, command);
 }

@@ -23,7 +23,6 @@ Run::Run(const TOptions& options)
     : fOptions(options), fConsumer(options.fConsumer.empty() ? kDefaultConsumer : options.fConsumer),
       fServer(options.fRoot, fConsumer), fStop([this] { Interrupt(); }), fLosses(options.fRoot)
 {
-    TRootObject::SetCoreLogger(&fLosses);
     fDocument.fCommand = options.fCommand;
 }
 
@@ -73,6 +72,7 @@ void Run::SetConsumer() const
 
 void Run::UsePlugin()
 {
+    TRootObject::SetCoreLogger(&fLosses);
     Session session(fOptions.fPlugin, fConsumer);
     Show(session.GetNamespace());
     const std::string problem = session.Close();
@@ -117,6 +117,7 @@ void Run::Fail(const std::string& reason)
     if (fStop.IsStopped())
         return;
     fFailed = true;
+    fLosses.AddHeldBack();
     fLosses.Add(reason);
     if (fOptions.fFormat == EFormat::kJson)
         Write();
@@ -127,7 +128,6 @@ void Run::Fail(const std::string& reason)
 // Says those that were not said yet.
 void Run::TellLosses()
 {
-    fLosses.AddFailedPrograms(!fFailed);
     const auto sentences = fLosses.GetSentences();
     for (; fToldCount < sentences.size(); ++fToldCount)
         Say(sentences[fToldCount]);

@@ -4,6 +4,7 @@
 
 #include <core/TProcessControl.h>
 #include <host/TCIMValue.h>
+#include <host/TVRXStatusCode.h>
 #include <inmem/TInmemNamespace.h>
 
 #include "Guard.h"
@@ -17,6 +18,12 @@ namespace {
 // The name that is asked for; this kind of plug-in has one namespace, whatever the name.
 constexpr char kNamespaceName[] = "root/cimv2";
 
+// Where a plug-in looks for its vendors: beside itself.
+std::string ProviderTree(const std::string& pluginPath)
+{
+    return pluginPath.substr(0, pluginPath.rfind('/')) + "/pegasus/provider";
+}
+
 TCIMValue AddressOf(const boost::shared_ptr<ICIMNamespace>& ns)
 {
     return TCIMValue(static_cast<unsigned long>(reinterpret_cast<std::uintptr_t>(&ns)));
@@ -28,8 +35,10 @@ Session::Session(const std::string& pluginPath, const std::string& consumer)
     : fRepository(boost::make_shared<TInmemNamespace>()), fUpcall(boost::make_shared<TInmemNamespace>()),
       fPlugin(pluginPath)
 {
-    const std::string error = Guarded([&] { Allocate(consumer); });
+    std::string error = Guarded([&] { Allocate(consumer); });
     if (!error.empty()) {
+        if (error.find(TVRXStatusCode(TVRXStatusCode::kDirectoryNotOpened).TranslateStatusCode()) == 0)
+            error += ": " + ProviderTree(pluginPath) + " or a folder in it";
         Close();
         throw TPluginError("the namespace could not be opened: " + error);
     }

@@ -65,9 +65,13 @@ void TProcessLog::Add(const TProcessRequest& request, const TProcessOutcome& out
     if (outcome.IsSuccess() && outcome.fErrorOutput.empty() && outcome.fDroppedBytes == 0)
         return;
     const TFailedProgram program = Describe(request, outcome);
+    if (!outcome.IsSuccess() && outcome.fEnd != TProcessOutcome::kCancelled)
+        Keep(program);
     TRootObject::GetCoreLogger()->Log(ILogger::kInfo, LogLine(program, outcome));
-    if (outcome.IsSuccess() || outcome.fEnd == TProcessOutcome::kCancelled)
-        return;
+}
+
+void TProcessLog::Keep(const TFailedProgram& program)
+{
     const std::lock_guard<std::mutex> lock(fMutex);
     if (fEntries.size() == kMaxEntries)
         fEntries.pop_front();

@@ -34,13 +34,16 @@ class TProcessLog
 
     static TProcessLog& Instance();
 
-    // Logs a program that failed, or that wrote to standard error, as one line of severity 3, and keeps a failed one.
+    // Keeps a program that failed, then logs it, or one that wrote to standard error, as one line of severity 3; so a
+    // logger can take what its line is about.
     void Add(const TProcessRequest& request, const TProcessOutcome& outcome);
 
     // Returns: the failed programs since the last call, in the order in which they ended.
     std::vector<TFailedProgram> Take();
 
   private:
+    void Keep(const TFailedProgram& program);
+
     std::mutex fMutex;
     std::deque<TFailedProgram> fEntries;
 };

@@ -6,6 +6,8 @@
 
 #include <host/ICIMQualifier.h>
 
+#include "CharacterText.h"
+
 namespace NKOLVRX20 {
 namespace {
 
@@ -113,8 +115,12 @@ class TTextRules
 
 std::string PlainText(const TCIMValue& value)
 {
-    if (value.GetType() == TType::kDatetime && !value.IsNull())
+    if (value.IsNull())
+        return "";
+    if (value.GetType() == TType::kDatetime)
         return static_cast<TCIMDateTime>(value).ToUIString();
+    if (value.GetType() == TType::kChar16)
+        return CharacterText(static_cast<TCIMChar16>(value));
     return value.ToString(10);
 }
 

@@ -141,6 +141,8 @@ class TFakeNamespace : public TInmemNamespace
   public:
     ~TFakeNamespace() override
     {
+        for (const auto& each : fClasses)
+            each->ClearInstances(); // a class and its instances hold each other
         std::ofstream("cleared") << "cleared";
         if (HasFault("program-at-shutdown"))
             TOSSpecific::SpawnProcess("touch shut-down-program-ran", 10);
@@ -148,8 +150,8 @@ class TFakeNamespace : public TInmemNamespace
 
     void Fill(const boost::shared_ptr<ICIMNamespace>& self)
     {
-        fProviders.push_back(boost::make_shared<TFakeProvider>(
-            std::vector<boost::shared_ptr<ICIMClass>>{EveryTypeClass(self), BrokenClass(), ManyClass()}));
+        fClasses = {EveryTypeClass(self), BrokenClass(), ManyClass()};
+        fProviders.push_back(boost::make_shared<TFakeProvider>(fClasses));
         if (HasFault("threads"))
             fProviders.insert(fProviders.end(), 7, fProviders.front());
     }
@@ -169,6 +171,7 @@ class TFakeNamespace : public TInmemNamespace
     }
 
   private:
+    std::vector<boost::shared_ptr<ICIMClass>> fClasses;
     std::vector<boost::shared_ptr<IProvider>> fProviders;
 };
 
@@ -233,6 +236,8 @@ boost::shared_ptr<ICIMNamespace> TPEGASUSNamespaceProvider::AllocateNamespace(TC
         throw std::runtime_error("out of luck");
     if (HasFault("throws-status"))
         throw TVRXException(TVRXStatusCode::kServerConnectionFailed);
+    if (HasFault("throws-directory"))
+        throw TVRXException(TVRXStatusCode::kDirectoryNotOpened);
     if (HasFault("throws-int"))
         throw 5;
     if (HasFault("returns-null"))

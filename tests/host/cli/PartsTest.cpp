@@ -8,8 +8,11 @@
 
 #include <gtest/gtest.h>
 
+#include <cli/LossLog.h>
 #include <cli/LossRules.h>
 #include <cli/PrivateServer.h>
+#include <host/TOSSpecific.h>
+#include <host/TRootObject.h>
 
 extern char** environ;
 
@@ -56,7 +59,6 @@ struct TProgramRow
 {
     const char* fName;
     TFailedProgram fProgram;
-    bool fServerIsUp;
     const char* fSentence; // null: no loss
 };
 
@@ -68,31 +70,50 @@ const TProgramRow kPrograms[] = {
       9,
       "",
       ""},
-     true,
      "MOF file /r/pegasus/pegSchema/PG_InterOp/PG_InterOp.mof did not compile, cimmof: signal 9 (Killed)"},
-    {"failed start that was repeated",
-     {"cimserver", {"httpPort=1"}, TProcessOutcome::kExited, 1, "", "in use"},
-     true,
-     nullptr},
+    {"quotation in the error",
+     {"cimmof", {"/r/provider/x/a.mof"}, TProcessOutcome::kExited, 250, "", "a.mof:3:1: expected ';'\nuint32 b;\n^\n"},
+     "MOF file /r/provider/x/a.mof of provider x did not compile, cimmof: exit status 250: a.mof:3:1: expected ';'"},
     {"failed start",
      {"cimserver", {"httpPort=1"}, TProcessOutcome::kExited, 1, "\n", "in use\n"},
-     false,
      "the server did not start, cimserver: exit status 1: in use"},
-    {"stop of a stopped server", {"cimserver", {"-s"}, TProcessOutcome::kExited, 1, "", "x"}, false, nullptr},
+    {"stop of a stopped server", {"cimserver", {"-s"}, TProcessOutcome::kExited, 1, "", "x"}, nullptr},
     {"text on standard output",
      {"cimconfig", {"-s", "providerDir="}, TProcessOutcome::kExited, 1, "Failed\n", ""},
-     true,
      "cimconfig -s providerDir= failed: exit status 1: Failed"},
-    {"no adapter tool, no adapter", {"bcu", {"-v"}, TProcessOutcome::kNotRun, 2, "", ""}, true, nullptr},
-    {"process list", {"ps", {"-e"}, TProcessOutcome::kNotRun, 2, "", ""}, true, nullptr},
+    {"no adapter tool, no adapter", {"bcu", {"-v"}, TProcessOutcome::kNotRun, 2, "", ""}, nullptr},
+    {"process list", {"ps", {"-e"}, TProcessOutcome::kNotRun, 2, "", ""}, nullptr},
 };
 
 TEST(LossRules, Programs)
 {
     for (const TProgramRow& row : kPrograms) {
-        const auto sentence = LossOfProgram(row.fProgram, "/nonexistent", row.fServerIsUp);
+        const auto sentence = LossOfProgram(row.fProgram, "/nonexistent");
         EXPECT_EQ(sentence.value_or("none"), row.fSentence ? row.fSentence : "none") << row.fName;
     }
+}
+
+// A failed attempt to start the server is a loss only when none succeeds, and then it is the cause that comes first.
+TEST(LossLog, FailedServerStartsCountWhenTheServerIsNeeded)
+{
+    const auto run = [](const std::string& name) {
+        std::string output;
+        NKOLVRX20::TOSSpecific::SpawnProcess(name, {"-c", "exit 1"}, "/bin/sh", {}, output, 20);
+    };
+    const std::string start = "the server did not start, cimserver: exit status 1";
+    const std::string config = "cimconfig -c exit 1 failed: exit status 1";
+    LossLog retried("/"), failed("/");
+    NKOLVRX20::TRootObject::SetCoreLogger(&retried);
+    run("cimserver");
+    retried.Log(NKOLVRX20::ILogger::kInfo, "TPEGASUSNamespace::connect succeeded \n");
+    run("cimconfig");
+    NKOLVRX20::TRootObject::SetCoreLogger(&failed);
+    run("cimserver");
+    run("cimserver");
+    run("cimconfig");
+    NKOLVRX20::TRootObject::SetCoreLogger(nullptr);
+    EXPECT_EQ(retried.GetSentences(), (std::vector<std::string>{config}));
+    EXPECT_EQ(failed.GetSentences(), (std::vector<std::string>{start, config}));
 }
 
 // A tree whose "server" is a copy of a program that waits, and its start file.

@@ -95,7 +95,7 @@ TEST_F(Vrxhost, InventoryAsTable)
   Fake_EveryType: 1 instance
     #1
       Boolean    true
-      Character  8364
+      Character  €
       Date       2026-11-21 04:15:00 +01:00
       Empty      
       ID         one "two"\x1b[31m
@@ -188,6 +188,7 @@ const TFaultRow kFaults[] = {
     {"registers-nothing", 1, "registered no provider named \"pegasus\""},
     {"throws-standard", 1, "the namespace could not be opened: out of luck"},
     {"throws-status", 1, "the namespace could not be opened: The connection to the CIM server failed (status 42)"},
+    {"throws-directory", 1, "The directory could not be opened (status 11): "},
     {"throws-int", 1, "the namespace could not be opened: an exception of type int"},
     {"returns-null", 1, "the namespace could not be opened: the plug-in returned none"},
     {"class-throws", 3, "instances of Fake_Broken could not be fetched: an exception of type int"},

@@ -70,7 +70,7 @@ struct TEndRow
 const TEndRow kEnds[] = {
     {"exit 0", {"exit", "0"}, TProcessOutcome::kExited, 0, "exit status 0"},
     {"exit 250", {"exit", "250"}, TProcessOutcome::kExited, 250, "exit status 250"},
-    {"segmentation fault", {"signal", "11"}, TProcessOutcome::kSignaled, 11, "signal 11 (Segmentation fault)"},
+    {"aborted", {"signal", "6"}, TProcessOutcome::kSignaled, 6, "signal 6 (Aborted)"},
     {"killed", {"signal", "9"}, TProcessOutcome::kSignaled, 9, "signal 9 (Killed)"},
 };
 

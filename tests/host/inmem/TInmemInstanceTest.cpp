@@ -129,6 +129,12 @@ const TTextRow kTexts[] = {
     {"programmatic unit", TCIMValue(1.5), {{"PUnit", TCIMValue("hertz")}}, {"1.5 hertz"}},
     {"unit of a string", TCIMValue("5"), {{"Units", TCIMValue("Bytes")}}, {"5"}},
     {"array", TCIMValue(TType(TType::kSint32), 0, {TCIMValue(0), TCIMValue(2)}), kRanges, {"Unknown", "Low"}},
+    {"characters",
+     TCIMValue(TType(TType::kChar16), 0,
+               {TCIMValue(TCIMChar16(0x53)), TCIMValue(TCIMChar16(0xe9)), TCIMValue(TCIMChar16(0x20ac)),
+                TCIMValue(TCIMChar16(0xd800))}),
+     {},
+     {"S", "\xc3\xa9", "\xe2\x82\xac", "\xef\xbf\xbd"}},
     {"datetime", TCIMValue(TCIMDateTime("00000003040506.000000:000")), {}, {"3 days 04:05:06"}},
 };
 
