@@ -1,0 +1,250 @@
+// What a new class takes over from the server, what it asks for, and what it does without.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <host/ICIMMethodDecl.h>
+#include <host/ICIMParameterDecl.h>
+#include <host/ICIMProperty.h>
+#include <host/ICIMPropertyDecl.h>
+#include <host/ICIMQualifier.h>
+#include <host/TVRXException.h>
+
+#include "src/schema/QualifierBits.h"
+#include "src/schema/ServedNamespace.h"
+#include "src/schema/TPEGASUSQualifierDecl.h"
+
+namespace NKOLVRX20 {
+namespace {
+
+using Pegasus::CIMName;
+using Pegasus::CIMValue;
+using ::testing::Contains;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+
+typedef TCIMValue::TCIMType TType;
+typedef ICIMQualifierDecl TDecl;
+
+class ClassMirrorTest : public ::testing::Test
+{
+  protected:
+    // Returns: the failures among the log's lines.
+    std::vector<std::string> Failures() const { return fServed.fRig.fLog.LinesWith("0|"); }
+
+    TServedNamespace fServed;
+};
+
+TEST_F(ClassMirrorTest, TakesOverEveryDeclaration)
+{
+    Pegasus::CIMClass source(CIMName("CIM_Disk"));
+    source.addQualifier(TrueQualifier("Abstract"));
+    source.addProperty(Property("Id", CIMValue(Pegasus::String("")), "Key"));
+    source.addProperty(Property("Sizes", CIMValue(Pegasus::CIMTYPE_UINT64, true)));
+    source.addProperty(Property("Count", CIMValue(Pegasus::Uint16(7))));
+    Pegasus::CIMMethod method(CIMName("Format"), Pegasus::CIMTYPE_UINT32);
+    Pegasus::CIMParameter parameter(CIMName("Label"), Pegasus::CIMTYPE_STRING, true);
+    parameter.addQualifier(TrueQualifier("In"));
+    method.addParameter(parameter);
+    source.addMethod(method);
+    fServed.fModel.addClass(kNsp, source);
+
+    const auto mirrored = fServed.Class("cim_disk", "120");
+    EXPECT_THAT(Failures(), IsEmpty());
+    ASSERT_TRUE(mirrored);
+    EXPECT_THAT(fServed.TakeRequests(), ElementsAre("GetClass cim_disk", "GetClass CIM_Disk", "GetQualifier Abstract",
+                                                    "GetQualifier Key", "GetQualifier In"));
+    EXPECT_EQ("CIM_Disk", mirrored->GetName({}));
+    EXPECT_EQ("root/cimv2", mirrored->GetPegasusNSPStr());
+    EXPECT_EQ(120000U, mirrored->GetDefaultTimeoutMs());
+    EXPECT_TRUE(mirrored->IsAbstract({}));
+    EXPECT_FALSE(mirrored->IsAssociation({}));
+    EXPECT_EQ(TType::kString, mirrored->GetPropertyDecl("ID", {})->GetType({}));
+    EXPECT_EQ("Id", mirrored->GetPropertyDecl("ID", {})->GetName({}));
+    const auto sizes = mirrored->GetPropertyDecl("sizes", {});
+    EXPECT_EQ(TType::kUint64Array, sizes->GetType({}));
+    EXPECT_TRUE(sizes->IsArray({}));
+    EXPECT_TRUE(sizes->GetDefaultValue({}).IsNull());
+    EXPECT_EQ(mirrored, sizes->GetClass({}));
+    EXPECT_EQ(TCIMValue(static_cast<unsigned short>(7)), mirrored->GetProperty("count", {})->GetValue({}));
+    EXPECT_EQ(15U, StatusOf([&] { mirrored->GetProperty("Sizes", {}); }));
+    const auto format = mirrored->GetMethodDecl("FORMAT", {});
+    ASSERT_TRUE(format);
+    EXPECT_EQ(TType::kUint32, format->GetReturnType({}));
+    const auto label = format->GetParameterDecl("label", {});
+    ASSERT_TRUE(label);
+    EXPECT_EQ(TType::kStringArray, label->GetType({}));
+    EXPECT_TRUE(label->GetQualifier("IN", {}));
+    EXPECT_FALSE(format->GetParameterDecl("Other", {}));
+}
+
+TEST_F(ClassMirrorTest, KeepsTheTimeoutInMillisecondsOf32Bits)
+{
+    struct
+    {
+        const char* fText;
+        unsigned int fMs;
+    } const rows[] = {{"60", 60000}, {"0", 0},           {"", 0},         {"soon", 0},
+                      {"5x", 5000},  {"-1", 4294966296}, {"4294968", 704}};
+    int number = 0;
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.fText);
+        const std::string name = "CIM_T" + std::to_string(number++);
+        fServed.fModel.addClass(kNsp, Pegasus::CIMClass(CIMName(name.c_str())));
+        EXPECT_EQ(row.fMs, fServed.Class(name, row.fText)->GetDefaultTimeoutMs());
+    }
+}
+
+TEST_F(ClassMirrorTest, AQualifierIsAskedForOnceANamespaceAndAfterAFailureOnceAClass)
+{
+    Pegasus::CIMClass first(CIMName("CIM_A"));
+    Pegasus::CIMProperty unknown = Property("B", CIMValue(true), "Unheard");
+    unknown.addQualifier(TrueQualifier("Key"));
+    first.addProperty(Property("A", CIMValue(true), "Unheard"));
+    first.addProperty(unknown);
+    Pegasus::CIMClass second(CIMName("CIM_B"));
+    second.addProperty(Property("A", CIMValue(true), "key"));
+    fServed.fModel.addClass(kNsp, first).addClass(kNsp, second);
+
+    const auto mirrored = fServed.Class("CIM_A");
+    EXPECT_THAT(fServed.TakeRequests(),
+                ElementsAre("GetClass CIM_A", "GetClass CIM_A", "GetQualifier Unheard", "GetQualifier Key"));
+    EXPECT_THAT(Failures(), ElementsAre("0|TPEGASUSClass::Initialize - Unable to retrieve qualifier: "
+                                        "Unheard\tdetail: CIM_ERR_NOT_FOUND: Unheard"));
+    EXPECT_FALSE(mirrored->GetPropertyDecl("A", {})->GetQualifier("Unheard", {}));
+    EXPECT_TRUE(mirrored->GetPropertyDecl("B", {})->GetQualifier("Key", {}));
+    fServed.Class("CIM_B");
+    EXPECT_THAT(fServed.TakeRequests(), ElementsAre("GetClass CIM_B", "GetClass CIM_B"));
+    EXPECT_TRUE(fServed.fNamespace->FindQualifierDecl("KEY"));
+}
+
+TEST_F(ClassMirrorTest, AQualifierKeepsItsValueFlavorAndOrigin)
+{
+    Pegasus::CIMClass source(CIMName("CIM_A"));
+    source.addQualifier(Pegasus::CIMQualifier(CIMName("Override"), CIMValue(Pegasus::String("x")),
+                                              Pegasus::CIMFlavor::OVERRIDABLE + Pegasus::CIMFlavor::RESTRICTED, true));
+    fServed.fModel.addClass(kNsp, source);
+    const auto qualifier = fServed.Class("CIM_A")->GetQualifier("OVERRIDE", {});
+    ASSERT_TRUE(qualifier);
+    EXPECT_EQ("x", qualifier->GetValue({}).ToString(10));
+    EXPECT_EQ(TDecl::kFlavorOverridable | TDecl::kFlavorRestricted, qualifier->GetFlavor({}));
+    EXPECT_TRUE(qualifier->GetPropagated({}));
+    const auto declaration = qualifier->GetDeclaration({});
+    EXPECT_EQ(TType::kString, declaration->GetType({}));
+    EXPECT_TRUE(declaration->GetDefaultValue({}).IsNull());
+    EXPECT_EQ(TDecl::kScopeProperty | TDecl::kScopeMethod, declaration->GetScope({}));
+}
+
+TEST_F(ClassMirrorTest, WhatCannotBeMirroredIsLoggedAndLeftOut)
+{
+    Pegasus::CIMClass source(CIMName("CIM_A"));
+    source.addProperty(Property("Gr\xC3\xB6\xC3\x9F"
+                                "e",
+                                CIMValue(Pegasus::Uint8(1))));
+    source.addProperty(
+        Pegasus::CIMProperty(CIMName("Ref"), CIMValue(Pegasus::CIMTYPE_REFERENCE, false), 0, CIMName("CIM_A")));
+    source.addProperty(Property("Good", CIMValue(Pegasus::Uint8(1))));
+    Pegasus::CIMMethod method(CIMName("M\xC3\xA4"), Pegasus::CIMTYPE_UINT32);
+    source.addMethod(method);
+    fServed.fModel.addClass(kNsp, source);
+    const auto mirrored = fServed.Class("CIM_A");
+    ASSERT_TRUE(mirrored);
+    const std::string invalid = TVRXStatusCode(25).TranslateStatusCode();
+    const std::string reference = TVRXStatusCode(22).TranslateStatusCode();
+    EXPECT_THAT(Failures(),
+                ElementsAre("0|PEGASUS: CIM name 'Gr\xC3\xB6\xC3\x9F"
+                            "e' is invalid",
+                            "0| - error when Adding Qualifiers for property: Gr\xC3\xB6\xC3\x9F"
+                            "e\tdetail: " +
+                                invalid,
+                            "0|TPEGASUS: Attempt to add reference property Ref to non-association class CIM_A",
+                            "0| - error when Adding Qualifiers for property: Ref\tdetail: " + reference,
+                            "0|PEGASUS: CIM name 'M\xC3\xA4' is invalid",
+                            "0| - error when Adding Qualifiers for method: M\xC3\xA4\tdetail: " + invalid));
+    EXPECT_TRUE(mirrored->GetPropertyDecl("Good", {}));
+    EXPECT_EQ(15U, StatusOf([&] { mirrored->GetPropertyDecl("Ref", {}); }));
+}
+
+TEST_F(ClassMirrorTest, APropertyOfATypeThatTheHostLacksIsDeclaredAsText)
+{
+    Pegasus::CIMClass source(CIMName("CIM_A"));
+    source.addProperty(Property("Inner", CIMValue(Pegasus::CIMTYPE_OBJECT, false)));
+    fServed.fModel.addClass(kNsp, source);
+    const auto mirrored = fServed.Class("CIM_A");
+    EXPECT_THAT(Failures(),
+                ElementsAre("0|Not supported type of property Inner in class CIM_A: 15, default to string."));
+    EXPECT_EQ(TType::kString, mirrored->GetPropertyDecl("Inner", {})->GetType({}));
+}
+
+TEST_F(ClassMirrorTest, ReferencesAreWelcomeInAnAssociation)
+{
+    Pegasus::CIMClass source(CIMName("CIM_A"));
+    source.addQualifier(TrueQualifier("Association"));
+    source.addProperty(
+        Pegasus::CIMProperty(CIMName("Ref"), CIMValue(Pegasus::CIMTYPE_REFERENCE, false), 0, CIMName("CIM_A")));
+    fServed.fModel.addClass(kNsp, source);
+    EXPECT_EQ(TType::kReference, fServed.Class("CIM_A")->GetPropertyDecl("ref", {})->GetType({}));
+    EXPECT_THAT(Failures(), IsEmpty());
+}
+
+TEST_F(ClassMirrorTest, AnOverrideReplacesWhatTheSuperclassDeclares)
+{
+    const auto override = [](const char* name, const CIMValue& value) {
+        Pegasus::CIMProperty property{CIMName(name), value};
+        property.addQualifier(TextQualifier("Override", name));
+        return property;
+    };
+    Pegasus::CIMClass base(CIMName("CIM_Base"));
+    base.addProperty(Property("Same", CIMValue(Pegasus::Uint8(1))));
+    base.addProperty(Property("Other", CIMValue(Pegasus::Uint8(1))));
+    Pegasus::CIMClass derived(CIMName("CIM_Derived"), CIMName("CIM_Base"));
+    derived.addProperty(override("Same", CIMValue(Pegasus::Uint8(2))));
+    derived.addProperty(override("Other", CIMValue(Pegasus::Uint16(2))));
+    derived.addProperty(override("New", CIMValue(Pegasus::Uint8(2))));
+    fServed.fModel.addClass(kNsp, base).addClass(kNsp, derived);
+    const auto mirrored = fServed.Class("CIM_Derived");
+    const std::string mismatch = TVRXStatusCode(14).TranslateStatusCode();
+    EXPECT_THAT(
+        Failures(),
+        ElementsAre("0|TPEGASUS: Attempt to override property Other in class CIM_Derived: different types",
+                    "0|TPEGASUS: Attempt define property Other in class CIM_Derivedfailed. Reason = " + mismatch,
+                    "0| - error when Adding Qualifiers for property: Other\tdetail: " + mismatch,
+                    "0|TPEGASUS: Attempt to override property New in class CIM_Derived: property doesn't exist in "
+                    "base class"));
+    EXPECT_EQ(mirrored, mirrored->GetPropertyDecl("Same", {})->GetClass({}));
+    EXPECT_TRUE(mirrored->GetPropertyDecl("New", {}));
+}
+
+TEST_F(ClassMirrorTest, AServerThatDoesNotGiveTheClassASecondTimeMakesItNull)
+{
+    fServed.fModel.addClass(kNsp, Pegasus::CIMClass(CIMName("CIM_A")));
+    const auto pass = [&](const test::PeerRequest& request) {
+        return test::classAnswer(request, Pegasus::CIMClass(CIMName("CIM_A")));
+    };
+    fServed.fModel.addFault("GetClass", pass);
+    fServed.fModel.addFault("GetClass", [](const test::PeerRequest& request) {
+        return test::errorAnswer(request, 1, "CIM_ERR_FAILED: gone");
+    });
+    EXPECT_FALSE(fServed.Class("CIM_A"));
+    EXPECT_THAT(Failures(), ElementsAre("0|TPEGASUSClass::Initialize - Unable to retrieve class: CIM_A\tdetail: "
+                                        "CIM_ERR_FAILED: gone"));
+    EXPECT_THAT(fServed.fRig.fLog.LinesWith("3|Catching exeption"),
+                ElementsAre(std::string("3|Catching exeption: AllocateClass  --- CIM_A  \twith reason: ") +
+                            TVRXStatusCode(42).TranslateStatusCode()));
+    EXPECT_THAT(fServed.fNamespace->GetRootClass()->GetChildClasses(), IsEmpty());
+    EXPECT_TRUE(fServed.Class("CIM_A")); // the next try is not spoilt
+}
+
+TEST(QualifierBitsTest, WordsBecomeBits)
+{
+    EXPECT_EQ(TDecl::kFlavorNone, FlavorFromText(""));
+    EXPECT_EQ(TDecl::kFlavorOverridable | TDecl::kFlavorToSubclass | TDecl::kFlavorTranslatable,
+              FlavorFromText("OVERRIDABLE TOSUBCLASS TRANSLATABLE"));
+    EXPECT_EQ(TDecl::kFlavorToInstance | TDecl::kFlavorDisableOverride | TDecl::kFlavorRestricted,
+              FlavorFromText("TOINSTANCE DISABLEOVERRIDE RESTRICTED UNHEARDOF"));
+    const Pegasus::CString any = Pegasus::CIMScope::ANY.toString().getCString();
+    EXPECT_EQ(TDecl::kScopeAny, ScopeFromText(static_cast<const char*>(any)));
+    EXPECT_EQ(TDecl::kScopeReference, ScopeFromText("REFERENCE"));
+}
+
+} // namespace
+} // namespace NKOLVRX20

@@ -1,0 +1,244 @@
+// The declaration elements and their qualifiers, and the texts of a property.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <boost/make_shared.hpp>
+
+#include <host/ICIMMethodDecl.h>
+#include <host/ICIMParameterDecl.h>
+#include <host/ICIMProperty.h>
+#include <host/ICIMPropertyDecl.h>
+#include <host/ICIMQualifier.h>
+
+#include "src/schema/ServedNamespace.h"
+#include "src/schema/TPEGASUSProperty.h"
+#include "src/schema/TPEGASUSQualifierDecl.h"
+
+namespace NKOLVRX20 {
+namespace {
+
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+
+typedef TCIMValue::TCIMType TType;
+typedef ICIMQualifierDecl TDecl;
+
+class DeclarationTest : public ::testing::Test
+{
+  protected:
+    DeclarationTest() : fClass(boost::make_shared<TPEGASUSClass>(fNamespace, "CIM_A", nullptr)) {}
+
+    boost::shared_ptr<ICIMQualifierDecl> QualifierDecl(const char* name, const TCIMValue& value)
+    {
+        return fNamespace->AllocateQualifierDecl(name, value, TDecl::kScopeAny, TDecl::kFlavorOverridable, {});
+    }
+
+    void Qualify(ICIMNamedElement& element, const char* name, const TCIMValue& value)
+    {
+        element.AllocateQualifier(QualifierDecl(name, value), value, {})->AddToClassOrProperty({});
+    }
+
+    static TCIMValue Texts(const std::vector<std::string>& texts)
+    {
+        return TCIMValue(TType::kString, 0, std::vector<TCIMValue>(texts.begin(), texts.end()));
+    }
+
+    TNamespaceRig fRig;
+    boost::shared_ptr<TPEGASUSNamespace> fNamespace = fRig.MakeNamespace();
+    boost::shared_ptr<TPEGASUSClass> fClass;
+};
+
+TEST_F(DeclarationTest, EveryElementHoldsItsQualifiersByNameWithoutCase)
+{
+    const auto property = fClass->AllocatePropertyDecl("P", 1, {});
+    const auto method = fClass->AllocateMethodDecl("M", TType::kUint8, {});
+    const auto parameter = method->AllocateParameterDecl("X", TType::kUint8Array, {});
+    ICIMNamedElement* const elements[] = {property.get(), method.get(), parameter.get()};
+    for (ICIMNamedElement* element : elements) {
+        Qualify(*element, "Second", std::string("2"));
+        Qualify(*element, "First", std::string("1"));
+        bool found = false;
+        const auto first = element->GetQualifier("FIRST", found, {});
+        ASSERT_TRUE(found);
+        EXPECT_EQ("First", first->GetName({}));
+        EXPECT_EQ(element, first->GetClassOrProperty({}).get());
+        EXPECT_EQ(TDecl::kFlavorOverridable, first->GetFlavor({}));
+        EXPECT_FALSE(element->GetQualifier("Third", found, {}));
+        EXPECT_FALSE(found);
+        EXPECT_EQ(14U, StatusOf([&] { element->AllocateQualifier(nullptr, 1, {}); }));
+        EXPECT_EQ(14U, StatusOf([&] { element->AddQualifier(nullptr, {}); }));
+        EXPECT_EQ(25U, StatusOf([&] { element->GetQualifier("1", {}); }));
+        std::vector<std::string> names;
+        element->EnumerateQualifiers(
+            [&](const auto& qualifier) {
+                names.push_back(qualifier->GetName({}));
+                return true;
+            },
+            {});
+        EXPECT_THAT(names, ElementsAre("First", "Second"));
+    }
+    parameter->AddToMethod({});
+    EXPECT_EQ(parameter, method->GetParameterDecl("x", {}));
+    EXPECT_TRUE(parameter->IsArray({}));
+    EXPECT_EQ(method, parameter->GetMethodDecl({}));
+    int visits = 0;
+    method->EnumerateParameterDecls([&](const auto&) { return ++visits != 0; }, {});
+    EXPECT_EQ(1, visits);
+    EXPECT_EQ(fClass, method->GetClass({}));
+    EXPECT_EQ(31U, StatusOf([&] { property->RemoveFromClass({}); }));
+}
+
+TEST_F(DeclarationTest, ElementsCompareByNameAndAssignNothing)
+{
+    const auto a = fClass->AllocatePropertyDecl("A", 1, {});
+    const auto b = fClass->AllocatePropertyDecl("B", 1, {});
+    EXPECT_TRUE(*a < *b && !(*a == *b));
+    *a = *b;
+    EXPECT_EQ("A", a->GetName({}));
+    const auto m = fClass->AllocateMethodDecl("A", TType::kUint8, {});
+    const auto n = fClass->AllocateMethodDecl("B", TType::kUint8, {});
+    EXPECT_TRUE(*m < *n && !(*m == *n));
+    *m = *n;
+    EXPECT_EQ("A", m->GetName({}));
+    const auto x = m->AllocateParameterDecl("A", TType::kUint8, {});
+    const auto y = m->AllocateParameterDecl("B", TType::kUint8, {});
+    EXPECT_TRUE(*x < *y && !(*x == *y));
+    *x = *y;
+    EXPECT_EQ("A", x->GetName({}));
+    const auto q = QualifierDecl("A", true);
+    const auto r = QualifierDecl("B", true);
+    EXPECT_TRUE(*q < *r && !(*q == *r));
+    *q = *r;
+    EXPECT_EQ("A", q->GetName({}));
+    for (const auto& validate : {boost::function<void()>([&] { a->Validate({}); }),
+                                 {[&] { m->Validate({}); }},
+                                 {[&] { x->Validate({}); }},
+                                 {[&] { q->Validate({}); }}})
+        EXPECT_NO_THROW(validate());
+}
+
+TEST_F(DeclarationTest, AQualifierAndItsDeclarationKeepValueAndFlavorApart)
+{
+    const auto declaration = QualifierDecl("Q", TCIMValue(TType::kStringArray, 0));
+    EXPECT_EQ(TType::kStringArray, declaration->GetType({}));
+    EXPECT_TRUE(declaration->IsArray({}));
+    const auto qualifier = fClass->AllocateQualifier(declaration, Texts({"a"}), TDecl::kFlavorToSubclass, {});
+    qualifier->Validate({});
+    EXPECT_EQ(TType::kStringArray, qualifier->GetType({}));
+    EXPECT_TRUE(qualifier->IsArray({}));
+    EXPECT_FALSE(qualifier->GetPropagated({}));
+    qualifier->SetFlavor(TDecl::kFlavorRestricted, {});
+    qualifier->UnsetFlavor(TDecl::kFlavorToSubclass, {});
+    EXPECT_EQ(TDecl::kFlavorRestricted, qualifier->GetFlavor({}));
+    declaration->SetFlavor(TDecl::kFlavorRestricted, {});
+    declaration->UnsetFlavor(TDecl::kFlavorOverridable, {});
+    EXPECT_EQ(TDecl::kFlavorRestricted, declaration->GetFlavor({}));
+    declaration->SetDefaultValue(Texts({"d"}), {});
+    EXPECT_EQ("d", declaration->GetDefaultValue({}).ToString(10));
+    EXPECT_EQ("a", qualifier->GetValue({}).ToString(10));
+    const auto other = fClass->AllocateQualifier(declaration, Texts({"b"}), {});
+    EXPECT_TRUE(*qualifier < *other && !(*qualifier == *other));
+    *qualifier = *other;
+    EXPECT_TRUE(*qualifier == *other);
+    qualifier->SetValue(Texts({"c"}), {});
+    EXPECT_EQ("c", qualifier->GetValue({}).ToString(10));
+    const auto later = fClass->AllocateQualifier(QualifierDecl("R", true), false, {});
+    EXPECT_TRUE(*qualifier < *later && !(*later < *qualifier));
+    EXPECT_EQ(31U, StatusOf([&] { qualifier->RemoveFromClassOrProperty({}); }));
+    EXPECT_EQ(31U, StatusOf([&] { declaration->RemoveQualifierDecl({}); }));
+    EXPECT_EQ(fNamespace, declaration->GetNamespace({}));
+    declaration->AddToNamespace({});
+    EXPECT_EQ(declaration, fNamespace->FindQualifierDecl("q"));
+}
+
+TEST_F(DeclarationTest, PropertyTextsFollowTheDeclaration)
+{
+    struct TQualifier
+    {
+        const char* fName;
+        TCIMValue fValue;
+    };
+    const TCIMValue map = Texts({"0", "1..5", "..", "7", "9..", "-3..-1", "x..y"});
+    const TCIMValue values = Texts({"zero", "few", "rest", "seven", "many", "below", "never"});
+    const std::vector<TQualifier> mapped = {{"ValueMap", map}, {"Values", values}};
+    struct
+    {
+        const char* fName;
+        TCIMValue fValue;
+        std::vector<TQualifier> fQualifiers;
+        const char* fText;
+    } const rows[] = {
+        {"plain", 5, {}, "5"},
+        {"single", 0, mapped, "zero"},
+        {"range start", 1, mapped, "few"},
+        {"range end", 5, mapped, "few"},
+        {"all the rest", 6, mapped, "rest"},
+        {"single before range", 7, mapped, "seven"},
+        {"open end", 10, mapped, "many"},
+        {"negative range", -2, mapped, "below"},
+        {"beyond 63 bits", 18446744073709551615UL, mapped, "many"},
+        {"array", TCIMValue(TType::kSint32, 0, {0, 3, 6}), mapped, "zero, few, rest"},
+        {"not in the map",
+         8,
+         {{"ValueMap", Texts({"1"})}, {"Values", Texts({"one"})}, {"Units", std::string("MB")}},
+         "8 MB"},
+        {"more map than values", 7, {{"ValueMap", map}, {"Values", Texts({"zero"})}}, "7"},
+        {"no map: the place", 1, {{"Values", Texts({"a", "b"})}}, "b"},
+        {"no map: no such place", -1, {{"Values", Texts({"a", "b"})}}, "-1"},
+        {"text map", std::string("k"), {{"ValueMap", Texts({"j", "k"})}, {"Values", Texts({"J", "K"})}}, "K"},
+        {"text not in the map", std::string("z"), {{"ValueMap", Texts({"j"})}, {"Values", Texts({"J"})}}, "z"},
+        {"bits",
+         5,
+         {{"BitMap", Texts({"0", "1", "2", "x", "99"})}, {"BitValues", Texts({"a", "b", "c", "d", "e"})}},
+         "a | c"},
+        {"bits without a map", 2, {{"BitValues", Texts({"a", "b"})}}, "b"},
+        {"units", 1500, {{"Units", std::string("MegaBytes")}, {"PUnit", std::string("byte")}}, "1500 MegaBytes"},
+        {"punit", 2.5, {{"PUnit", std::string("hertz")}}, "2.5 hertz"},
+        {"no unit after text", std::string("t"), {{"Units", std::string("MB")}}, "t"},
+        {"datetime", TCIMDateTime("00000003040506.000000:000"), {}, "3 days 04:05:06"},
+        {"null", TCIMValue(), mapped, ""},
+    };
+    int number = 0;
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.fName);
+        const auto declaration = fClass->AllocatePropertyDecl("P" + std::to_string(number++), row.fValue, {});
+        for (const TQualifier& qualifier : row.fQualifiers)
+            Qualify(*declaration, qualifier.fName, qualifier.fValue);
+        const TPEGASUSProperty property(row.fValue, declaration, fClass);
+        EXPECT_EQ(row.fText, property.ToString());
+        EXPECT_EQ(row.fValue.IsNull() ? 0U : row.fValue.IsArray() ? 3U : 1U, property.ToStringVector().size());
+    }
+}
+
+TEST_F(DeclarationTest, APropertyKeepsItsPreviousValueAndLosesItsDeclarationQuietly)
+{
+    auto declaration = fClass->AllocatePropertyDecl("P", 1, {});
+    TPEGASUSProperty property(1, declaration, fClass);
+    EXPECT_TRUE(property.IsDefaultValue({}));
+    EXPECT_FALSE(property.GetPropagated({}));
+    EXPECT_EQ(TType::kSint32, property.GetType({}));
+    EXPECT_TRUE(property.IsPrevValueDifferent());
+    property.SetPrevValue();
+    EXPECT_FALSE(property.IsPrevValueDifferent());
+    property.SetValue(2, {});
+    EXPECT_TRUE(property.IsPrevValueDifferent());
+    EXPECT_FALSE(property.IsDefaultValue({}));
+    EXPECT_EQ("1", property.PrevValueToString());
+    property.SetPrevValue(3);
+    EXPECT_EQ(TCIMValue(3), property.GetPrevValue());
+    const auto otherClass = boost::make_shared<TPEGASUSClass>(fNamespace, "CIM_B", nullptr);
+    TPEGASUSProperty inherited(1, declaration, otherClass);
+    EXPECT_TRUE(inherited.GetPropagated({}));
+    EXPECT_TRUE(inherited < property && !(inherited == property));
+    ICIMProperty& target = inherited;
+    target = property;
+    EXPECT_TRUE(inherited == property);
+    declaration.reset();
+    EXPECT_FALSE(property.GetDeclaration({}));
+    EXPECT_FALSE(property.IsArray({}));
+    EXPECT_FALSE(property.IsDefaultValue({}));
+    EXPECT_EQ("2", property.ToString());
+}
+
+} // namespace
+} // namespace NKOLVRX20
