@@ -37,7 +37,8 @@ class TDeployedModule
         fFile = fTree.Path() + "/libpegasus.nsp.so";
         std::filesystem::copy_file(VRX_PLUGIN_FILE, fFile);
         fTree.Write("pegasus/provider/" + vendor + "/a.classes.xml",
-                    "<vrx><nsp name='root/cimv2'/><module name='" + vendor + "'/><class name='A_Leaf'/></vrx>");
+                    "<vrx><timeout value='60'/><nsp name='root/cimv2'/><module name='" + vendor +
+                        "'/><class name='A_Leaf'/></vrx>");
     }
     ~TDeployedModule() { Unload(); }
 
@@ -166,7 +167,7 @@ TEST_F(ModuleTest, LeavesNothingBehindHoweverOftenItIsLoaded)
         SCOPED_TRACE(round);
         auto server = StartServer();
         module.Load();
-        ASSERT_EQ(1, CountInstances(module));
+        ASSERT_EQ(1, CountInstances(module)) << ::testing::PrintToString(fLog.Lines());
         module.Clear();
         module.Unload();
         ASSERT_FALSE(module.IsStillLoaded());
@@ -191,12 +192,12 @@ TEST_F(ModuleTest, TwoCopiesDoNotMeet)
     const auto server = StartServer();
     TDeployedModule first("acme"), second("beta");
     first.Load();
-    ASSERT_EQ(1, CountInstances(first));
+    ASSERT_EQ(1, CountInstances(first)) << ::testing::PrintToString(fLog.Lines());
     first.Clear();
     second.Load();
     EXPECT_NE(first.Provider(), second.Provider());
     fLog.Take();
-    ASSERT_EQ(1, CountInstances(second));
+    ASSERT_EQ(1, CountInstances(second)) << ::testing::PrintToString(fLog.Lines());
     EXPECT_EQ(1U, fLog.LinesWith("3|TPEGASUSProvider::EnumerateClassesProvided Asking plugin beta for A_Leaf").size());
     second.Clear();
 }
