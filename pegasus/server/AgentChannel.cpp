@@ -62,7 +62,7 @@ try {
     iovec parts[] = {{head.data(), head.size()}, {const_cast<char*>(request.body.data()), request.body.size()}};
     fStream.writeAll(parts, std::size(parts), patience);
 } catch (const std::system_error& error) {
-    throw AgentLost(error.what());
+    throw AgentGone(error.what());
 } catch (const SocketTimeout&) {
     throw AgentSilent();
 }

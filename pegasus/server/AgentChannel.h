@@ -14,6 +14,13 @@ class AgentLost : public std::runtime_error
     using std::runtime_error::runtime_error;
 };
 
+// The same, before the agent could take the request: another agent may be asked.
+class AgentGone : public AgentLost
+{
+  public:
+    using AgentLost::AgentLost;
+};
+
 // The agent sent nothing for the whole patience.
 class AgentSilent : public std::runtime_error
 {
@@ -42,7 +49,7 @@ class AgentChannel
     explicit AgentChannel(Descriptor socket) : fStream(std::move(socket)) {}
 
     // Passes the answer's elements to the sink as they come. Returns: the operation's status.
-    // Throws: AgentLost; AgentSilent when nothing comes for `patience` (zero: any time). After an exception,
+    // Throws: AgentLost, AgentGone; AgentSilent when nothing comes for `patience` (zero: any time). After an exception,
     // the sink's own included, the channel is out of step and must be dropped.
     CimStatus request(const AgentRequest& request, ElementSink& sink, std::chrono::milliseconds patience);
 

@@ -56,20 +56,38 @@ CimStatus AgentPool::request(const ProviderReference& provider, AgentRequest req
     const AgentSettings settings = fMakeSettings();
     request.provider = provider.provider;
     request.library = cmpi::findProviderLibrary(settings.providerDirectories, provider.location, provider.module);
-    const std::shared_ptr<AgentProcess> process = acquire(provider.module);
-    const AtEnd releaser([&] { release(provider.module); });
+    try {
+        return requestOnce(provider.module, request, sink, settings.patience);
+    } catch (const AgentGone&) {
+        // It died while idle and nobody had noticed yet; the request never reached it.
+    }
+    try {
+        return requestOnce(provider.module, request, sink, settings.patience);
+    } catch (const AgentGone& error) {
+        fail("Lost connection with cimprovagt \"" + provider.module + "\". " + error.what());
+    }
+}
+
+CimStatus AgentPool::requestOnce(const std::string& module, const AgentRequest& request, ElementSink& sink,
+                                 std::chrono::milliseconds patience)
+{
+    const std::shared_ptr<AgentProcess> process = acquire(module);
+    const AtEnd releaser([&] { release(module); });
     try {
         std::unique_ptr<AgentChannel> channel = process->takeChannel();
-        const CimStatus status = channel->request(request, sink, settings.patience);
+        const CimStatus status = channel->request(request, sink, patience);
         process->giveBack(std::move(channel));
-        succeeded(provider.module);
+        succeeded(module);
         return status;
+    } catch (const AgentGone&) {
+        process->kill();
+        process->waitForEnd(Clock::now() + kWaitForCause);
+        throw;
     } catch (const AgentLost& error) {
-        lost(provider.module, process, error.what());
+        lost(module, process, error.what());
     } catch (const AgentSilent&) {
         process->kill();
-        lost(provider.module, process,
-             "ended after " + std::to_string(settings.patience.count() / 1000) + " s without an answer");
+        lost(module, process, "ended after " + std::to_string(patience.count() / 1000) + " s without an answer");
     }
 }
 

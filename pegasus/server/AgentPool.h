@@ -67,6 +67,9 @@ class AgentPool
         Deadline lastUse;
     };
 
+    // Throws: AgentGone, besides what request() throws.
+    CimStatus requestOnce(const std::string& module, const AgentRequest& request, ElementSink& sink,
+                          std::chrono::milliseconds patience);
     std::shared_ptr<AgentProcess> acquire(const std::string& module);
     void release(const std::string& module);
     void succeeded(const std::string& module);

@@ -153,7 +153,7 @@ std::unique_ptr<AgentChannel> AgentProcess::takeChannel()
     }
     SocketPair pair = makeSocketPair();
     if (!sendDescriptor(fControl.get(), pair.theirs.get()))
-        throw AgentLost("the agent takes no request");
+        throw AgentGone("the agent takes no request");
     return std::make_unique<AgentChannel>(std::move(pair.ours));
 }
 

@@ -29,7 +29,7 @@ class AgentProcess
     AgentProcess(const AgentProcess&) = delete;
     AgentProcess& operator=(const AgentProcess&) = delete;
 
-    // An idle channel, or a new one. Throws: AgentLost.
+    // An idle channel, or a new one. Throws: AgentGone; std::system_error without descriptors.
     std::unique_ptr<AgentChannel> takeChannel();
     void giveBack(std::unique_ptr<AgentChannel> channel);
 

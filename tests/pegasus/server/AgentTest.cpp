@@ -199,6 +199,26 @@ TEST_F(AgentTest, aHangIsEnded)
     EXPECT_NE(call(fClient, "Probe_Bulk", "ProcessId"), agent);
 }
 
+#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__) // which need more than any limit allows
+TEST_F(AgentTest, memoryIsLimited)
+{
+    start({"agentMemoryMegabytes=300"});
+    EXPECT_EQ(errorOf([&] { call(fClient, "Probe_Bulk", "Grow"); }), "CIM_ERR_FAILED: no more memory");
+    EXPECT_EQ(countOf("Probe_Bulk"), 1000u);
+}
+#endif
+
+TEST_F(AgentTest, anAgentKilledWhileIdleIsReplacedUnseen)
+{
+    start();
+    for (int i = 0; i < 5; ++i) {
+        const int agent = static_cast<int>(call(fClient, "Probe_Bulk", "ProcessId"));
+        ASSERT_EQ(::kill(agent, SIGKILL), 0);
+        ASSERT_TRUE(eventually([&] { return childrenOf(fTree.serverProcess()).empty(); })) << "it stays a zombie";
+        EXPECT_NE(static_cast<int>(call(fClient, "Probe_Bulk", "ProcessId")), agent);
+    }
+}
+
 TEST_F(AgentTest, killedInTheMiddleOfAnEnumeration)
 {
     start();

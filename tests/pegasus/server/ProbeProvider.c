@@ -189,6 +189,29 @@ static CMPIStatus countByUpcall(const CMPIContext* context, const CMPIResult* re
     return returnNumber(result, count);
 }
 
+/* Takes memory until there is none. */
+static CMPIStatus grow(void)
+{
+    enum
+    {
+        kBlock = 1 << 20
+    };
+    for (void** last = NULL;;) {
+        void** block = malloc(kBlock);
+        if (block == NULL) {
+            while (last != NULL) {
+                block = *last;
+                free(last);
+                last = block;
+            }
+            return failure(CMPI_RC_ERR_FAILED, "no more memory");
+        }
+        memset(block, 1, kBlock);
+        *block = last;
+        last = block;
+    }
+}
+
 static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, const CMPIResult* result,
                                const CMPIObjectPath* path, const char* method, const CMPIArgs* in, CMPIArgs* out)
 {
@@ -201,6 +224,8 @@ static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, con
         return countByUpcall(context, result, path);
     if (strcasecmp(method, "ProcessId") == 0)
         return returnNumber(result, (CMPIUint32)getpid());
+    if (strcasecmp(method, "Grow") == 0)
+        return grow();
     if (strcasecmp(method, "Crash") == 0)
         raise(SIGSEGV);
     if (strcasecmp(method, "Exit") == 0)

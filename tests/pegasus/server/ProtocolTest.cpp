@@ -5,13 +5,13 @@
 #include <gtest/gtest.h>
 
 #include <sys/socket.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
 #include <memory>
 
 namespace servertest {
 namespace {
-
-constexpr std::chrono::milliseconds kMoment{300};
 
 std::string getClassBody(const std::string& cim = "CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"",
                          const std::string& version = "1.0", const std::string& parameters = classNameParameter("C"))
@@ -254,6 +254,41 @@ TEST_F(ProtocolTest, unknownAndUnsupportedOperations)
         const HttpAnswer answer = exchange(fgTree->port(), intrinsicRequest(method, "root", ""));
         EXPECT_EQ(answer.trailers.at("cimstatuscode"), "7");
     }
+}
+
+// Runs `action` as another user. Returns: its exit status.
+template <typename Action> int asNobody(const Action& action)
+{
+    const pid_t pid = ::fork();
+    if (pid == 0)
+        ::_exit(::setgid(65534) == 0 && ::setuid(65534) == 0 ? action() : 99);
+    int status = 0;
+    ::waitpid(pid, &status, 0);
+    return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+}
+
+TEST_F(ProtocolTest, anotherUserIsNotServed)
+{
+    if (::geteuid() != 0)
+        GTEST_SKIP() << "needs root, to become somebody else";
+    const std::string create = intrinsicRequest(
+        "CreateInstance", "root",
+        "<IPARAMVALUE NAME=\"NewInstance\">\n<INSTANCE CLASSNAME=\"__Namespace\">\n<PROPERTY NAME=\"Name\" "
+        "TYPE=\"string\">\n<VALUE>intruder</VALUE>\n</PROPERTY>\n</INSTANCE>\n</IPARAMVALUE>\n");
+    EXPECT_EQ(asNobody([&] { return exchange(fgTree->port(), create).status; }), 0);
+    // One that closes at once leaves a socket of which the kernel reports no owner, which must not pass for root.
+    for (int i = 0; i < 50; ++i)
+        EXPECT_EQ(asNobody([&] {
+                      RawConnection connection(fgTree->port());
+                      return connection.send(create) ? 0 : 0;
+                  }),
+                  0);
+    EXPECT_TRUE(
+        eventually([] { return fgTree->log().find("Refused a connection of user 65534.") != std::string::npos; }));
+    const HttpAnswer names =
+        exchange(fgTree->port(), intrinsicRequest("EnumerateInstanceNames", "root", classNameParameter("__Namespace")));
+    EXPECT_EQ(names.status, 200);
+    EXPECT_EQ(names.body.find("intruder"), std::string::npos);
 }
 
 // Tiny limits, so that each can be met.
