@@ -38,9 +38,10 @@ std::string read(std::string_view xml, std::size_t cut, bool isIntrinsic)
 {
     const client::ExpectedResponse expected{"1000", isIntrinsic ? "EnumerateInstances" : "M", isIntrinsic};
     std::string out;
-    client::ResponseReader reader(
-        expected, wire::XmlLimits(),
-        [&](const wire::XmlElement& element, wire::ElementDecoder& decoder) { readContent(element, decoder, out); });
+    wire::ElementDecoder decoder;
+    client::ResponseReader reader(expected, decoder, [&](const wire::XmlElement& element, wire::ElementDecoder&) {
+        readContent(element, decoder, out);
+    });
     try {
         reader.feed(xml.substr(0, cut));
         reader.feed(xml.substr(cut));

@@ -167,7 +167,7 @@ bool CIMClientRep::exchangeOnce(const client::Request& request, const ContentHan
         fConnection.close();
     bool mayRepeat = fConnection.isOpen() && fConnection.hasReceived() && request.isRepeatable;
     for (;;) {
-        ResponseReader reader(expected, fLimits.xml, onContent);
+        ResponseReader reader(expected, fDecoder, onContent);
         HttpResponse response(fLimits, checkHeader, [&](std::string_view body) { reader.feed(body); });
         if (sendAndReceive(message, response, deadline) == Outcome::NothingReceived) {
             if (!mayRepeat)

@@ -23,7 +23,7 @@ class CIMClientRep
     using ContentHandler = client::ResponseReader::ContentHandler;
 
     CIMClientRep() = default;
-    explicit CIMClientRep(const client::ClientLimits& limits) : fLimits(limits) {}
+    explicit CIMClientRep(const client::ClientLimits& limits) : fLimits(limits), fDecoder(limits.xml) {}
 
     Uint32 timeoutMs() const { return fTimeoutMs; }
     void setTimeoutMs(Uint32 timeoutMs) { fTimeoutMs = timeoutMs; }
@@ -51,6 +51,7 @@ class CIMClientRep
     Outcome receive(client::HttpResponse& response, const client::Deadline& deadline);
 
     client::ClientLimits fLimits;
+    wire::ElementDecoder fDecoder{fLimits.xml}; ///< kept, so that the names of all answers share their texts
     std::optional<client::ServerAddress> fAddress;
     client::Connection fConnection;
     std::vector<char> fReceiveBuffer;

@@ -68,10 +68,11 @@ std::string_view required(const XmlElement& tag, std::string_view attribute, std
 
 } // namespace
 
-ResponseReader::ResponseReader(const ExpectedResponse& expected, const wire::XmlLimits& limits,
+ResponseReader::ResponseReader(const ExpectedResponse& expected, wire::ElementDecoder& decoder,
                                ContentHandler onContent)
-    : fExpected(expected), fDecoder(limits), fOnContent(std::move(onContent)),
-      fSlicer({"CIM", "MESSAGE", "SIMPLERSP", "IMETHODRESPONSE", "METHODRESPONSE", "IRETURNVALUE"}, *this, limits)
+    : fExpected(expected), fDecoder(decoder), fOnContent(std::move(onContent)),
+      fSlicer({"CIM", "MESSAGE", "SIMPLERSP", "IMETHODRESPONSE", "METHODRESPONSE", "IRETURNVALUE"}, *this,
+              decoder.limits())
 {
 }
 

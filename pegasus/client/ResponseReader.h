@@ -31,7 +31,8 @@ class ResponseReader : private wire::XmlSliceHandler
     /// Gets each element of the result: the children of IRETURNVALUE, or of METHODRESPONSE.
     using ContentHandler = std::function<void(const wire::XmlElement&, wire::ElementDecoder&)>;
 
-    ResponseReader(const ExpectedResponse& expected, const wire::XmlLimits& limits, ContentHandler onContent);
+    /// Both references must outlive the reader.
+    ResponseReader(const ExpectedResponse& expected, wire::ElementDecoder& decoder, ContentHandler onContent);
 
     void feed(std::string_view bytes) { fSlicer.feed(bytes); }
     /// The body has ended as it should. Throws: XmlError when the answer has not.
@@ -51,7 +52,7 @@ class ResponseReader : private wire::XmlSliceHandler
     void readError(const wire::XmlElement& element);
 
     const ExpectedResponse& fExpected;
-    wire::ElementDecoder fDecoder;
+    wire::ElementDecoder& fDecoder;
     ContentHandler fOnContent;
     std::size_t fDepth = 0;
     bool fHasResponse = false;

@@ -45,6 +45,17 @@ Uint32 leadingSlash(const String& name)
     return name.size() > 0 && name[0] == '/' ? 1 : 0;
 }
 
+bool sameNoCase(const StringRep& x, const StringRep& y)
+{
+    if (x.fSize != y.fSize)
+        return false;
+    for (Uint32 i = 0; i < x.fSize; ++i) {
+        if (lowerAscii(x.units()[i]) != lowerAscii(y.units()[i]))
+            return false;
+    }
+    return true;
+}
+
 String checkedName(const String& name)
 {
     if (!CIMName::legal(name))
@@ -72,7 +83,11 @@ CIMName& CIMName::operator=(const String& name)
 
 Boolean CIMName::equal(const CIMName& name) const
 {
-    return NameAccess::shareText(*this, name) || String::equalNoCase(fName, name.fName);
+    const StringRep* x = StringAccess::rep(fName);
+    const StringRep* y = StringAccess::rep(name.fName);
+    if (x == y)
+        return true; // equal names of one message share their text
+    return x && y ? sameNoCase(*x, *y) : isNull() && name.isNull();
 }
 
 Boolean CIMName::legal(const String& name)

@@ -9,6 +9,8 @@ namespace {
 
 /// More than a message of one class uses; a power of two.
 constexpr std::size_t kSlots = 1024;
+/// Longer names are converted each time.
+constexpr std::size_t kMaxKeptBytes = 128;
 
 std::size_t hashOf(std::string_view text)
 {
@@ -31,6 +33,10 @@ NameCache::~NameCache() = default;
 
 const CIMName& NameCache::name(std::string_view utf8)
 {
+    if (utf8.size() > kMaxKeptBytes) {
+        fLongName = StringAccess::fromUtf8(utf8);
+        return fLongName;
+    }
     if (fEntries.empty())
         fEntries.resize(kSlots);
     Entry& entry = fEntries[hashOf(utf8) % kSlots];

@@ -17,13 +17,14 @@ class NameCache
     NameCache();
     ~NameCache();
 
-    /// Throws: InvalidNameException; Exception when it is not UTF-8.
+    /// Returns: the name; valid until the next call. Throws: InvalidNameException; Exception when it is not UTF-8.
     const CIMName& name(std::string_view utf8);
 
   private:
     struct Entry;
 
     std::vector<Entry> fEntries;
+    CIMName fLongName;
 };
 
 } // namespace Pegasus::wire

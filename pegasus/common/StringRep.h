@@ -33,6 +33,8 @@ struct StringAccess
     static void appendUtf8(std::string& out, const Char16* units, std::size_t count);
     static void appendUtf8(std::string& out, const String& text) { appendUtf8(out, text.getChar16Data(), text.size()); }
     static std::string toUtf8(const String& text);
+    /// Null for an empty text, perhaps.
+    static const StringRep* rep(const String& text) noexcept { return text.fRep.get(); }
 };
 
 /// ASCII letters only.

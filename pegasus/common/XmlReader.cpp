@@ -190,6 +190,14 @@ std::string_view XmlElement::name() const
     return nodeOf(fNode).name();
 }
 
+bool XmlElement::is(std::string_view expectedName) const
+{
+    if (!fNode)
+        return false;
+    const char* actual = nodeOf(fNode).name();
+    return std::strncmp(actual, expectedName.data(), expectedName.size()) == 0 && actual[expectedName.size()] == '\0';
+}
+
 XmlElement XmlElement::firstChild() const
 {
     const pugi::xml_node node = nodeOf(fNode);

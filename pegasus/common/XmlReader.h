@@ -28,7 +28,7 @@ class XmlElement
     /// False behind the last sibling, and for the child of an empty element.
     explicit operator bool() const { return fNode != nullptr; }
     std::string_view name() const;
-    bool is(std::string_view expectedName) const { return fNode && name() == expectedName; }
+    bool is(std::string_view expectedName) const;
 
     /// The children that are elements. Text beside them is an error.
     XmlElement firstChild() const;

@@ -119,9 +119,31 @@ std::string_view XmlScanner::tagName(std::string_view tag)
     return tag.substr(0, tag.find_first_of(" \t\r\n/>"));
 }
 
+namespace {
+
+std::size_t countLineFeeds(std::string_view bytes)
+{
+    const __m128i lineFeed = _mm_set1_epi8('\n');
+    const __m128i zero = _mm_setzero_si128();
+    __m128i sums = zero;
+    std::size_t at = 0;
+    for (; at + sizeof(__m128i) <= bytes.size(); at += sizeof(__m128i)) {
+        const __m128i block = _mm_loadu_si128(reinterpret_cast<const __m128i*>(bytes.data() + at));
+        const __m128i ones = _mm_sub_epi8(zero, _mm_cmpeq_epi8(block, lineFeed));
+        sums = _mm_add_epi64(sums, _mm_sad_epu8(ones, zero));
+    }
+    std::size_t count =
+        static_cast<std::size_t>(_mm_cvtsi128_si64(sums) + _mm_cvtsi128_si64(_mm_unpackhi_epi64(sums, sums)));
+    for (; at < bytes.size(); ++at)
+        count += bytes[at] == '\n' ? 1 : 0;
+    return count;
+}
+
+} // namespace
+
 XmlPlace advance(XmlPlace place, std::string_view bytes)
 {
-    const auto lines = static_cast<std::size_t>(std::count(bytes.begin(), bytes.end(), '\n'));
+    const std::size_t lines = countLineFeeds(bytes);
     if (lines == 0)
         return {place.line, place.column + bytes.size()};
     return {place.line + lines, bytes.size() - bytes.rfind('\n')};

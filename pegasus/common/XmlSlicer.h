@@ -46,8 +46,12 @@ class XmlSlicer
     void takeInEnvelope(const XmlToken& token);
     void open(const XmlToken& token);
     void close(std::string_view name);
-    void deliver(std::size_t size);
+    void beginSlice(const XmlToken& token);
+    void endSlice();
+    void flush();
     void consume(std::size_t size);
+    XmlPlace here() const;
+    XmlToken nextToken() const;
     void checkElementSize(std::size_t size) const;
     bool isEnvelope(std::string_view name) const;
     std::string_view rest() const;
@@ -63,7 +67,10 @@ class XmlSlicer
     std::size_t fScanned = 0; ///< in the buffer: how far tokens were found
     XmlPlace fPlace{1, 1};    ///< of fStart
     std::vector<std::string> fOpen;
-    std::size_t fSliceDepth = 0; ///< elements open in the slice that begins at fStart; 0 outside
+    std::size_t fSliceDepth = 0; ///< elements open in the element that begins at fSliceStart; 0 outside
+    std::size_t fSliceStart = 0;
+    std::size_t fSlicesEnd = 0; ///< end of the whole elements that begin at fStart and were not delivered yet
+    bool fHasSlices = false;    ///< are there any?
     bool fHasDeclaration = false;
     bool fHasRoot = false;
 };

@@ -102,9 +102,10 @@ std::string readAnswer(const AnswerCase& answer, const std::vector<std::size_t>&
 {
     const client::ExpectedResponse expected{answer.messageId, answer.method, answer.isIntrinsic};
     std::string out;
-    client::ResponseReader reader(
-        expected, limits.xml,
-        [&](const wire::XmlElement& element, wire::ElementDecoder& decoder) { encodeAgain(element, decoder, out); });
+    wire::ElementDecoder decoder(limits.xml);
+    client::ResponseReader reader(expected, decoder, [&](const wire::XmlElement& element, wire::ElementDecoder&) {
+        encodeAgain(element, decoder, out);
+    });
     client::HttpResponse response(
         limits, [](const client::ResponseFields&) {}, [&](std::string_view body) { reader.feed(body); });
     try {
