@@ -33,6 +33,12 @@ constexpr TRule kRules[] = {
     {"DEBUG2:TPEGASUSClass::EI VRX Error for: ", "", "an instance could not be built, ", ""},
     {"4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: ", "", "property ",
      " could not be converted and is missing from its instance"},
+    {"TPEGASUSClass::Initialize - Unable to retrieve qualifier: ", "\tdetail: ", "qualifier ",
+     " could not be fetched: "},
+    {"- error when Adding Qualifiers for class: ", "\tdetail: ", "qualifiers of class ", " could not be added: "},
+    {" - error when Adding Qualifiers for property: ", "\tdetail: ", "qualifiers of property ",
+     " could not be added: "},
+    {" - error when Adding Qualifiers for method: ", "\tdetail: ", "qualifiers of method ", " could not be added: "},
     {"TPEGASUSProvider::EnumerateClassesProvided catch exection : ", "", "a class could not be listed: ", ""},
 };
 

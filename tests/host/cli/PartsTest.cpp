@@ -44,6 +44,8 @@ const TLineRow kLines[] = {
      "an instance could not be built, A, pegInst 2: x"},
     {"property", "4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: speed",
      "property speed could not be converted and is missing from its instance"},
+    {"qualifiers", " - error when Adding Qualifiers for property: Speed\tdetail: x",
+     "qualifiers of property Speed could not be added: x"},
     {"progress", "before reg...", nullptr},
 };
 
