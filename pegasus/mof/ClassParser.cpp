@@ -61,7 +61,7 @@ CIMProperty ClassParser::parseProperty(const CIMName& name, ValueType type, cons
         fCursor.failAt(suffix, "a reference property cannot be an array");
     CIMValue value(type.type, type.isArray, type.arraySize);
     if (fCursor.skipPunctuation('='))
-        value = buildValue(fCursor, fSession.aliases, parseInitializer(fCursor), type);
+        value = buildValue(fCursor, fCompilation.aliases, parseInitializer(fCursor), type);
     fCursor.expectPunctuation(';');
     return CIMProperty(name, value, type.arraySize, referenceClass);
 }
@@ -105,9 +105,9 @@ void ClassParser::addProperty(CIMClass& owner, const CIMProperty& property, std:
     if (owner.findProperty(property.getName()) == PEG_NOT_FOUND)
         owner.addProperty(property);
     else
-        fSession.handler.warn(fCursor.place(offset).text(), "Property " + utf8(property.getName()) +
-                                                                " already exists in class " +
-                                                                utf8(owner.getClassName()));
+        fCompilation.handler.warn(fCursor.place(offset).text(), "Property " + utf8(property.getName()) +
+                                                                    " already exists in class " +
+                                                                    utf8(owner.getClassName()));
 }
 
 void ClassParser::addMethod(CIMClass& owner, const CIMMethod& method, std::size_t offset)

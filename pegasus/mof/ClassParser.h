@@ -21,8 +21,8 @@ struct ParsedClass
 class ClassParser
 {
   public:
-    ClassParser(TokenCursor& cursor, Session& session)
-        : fCursor(cursor), fSession(session), fQualifiers(cursor, session)
+    ClassParser(TokenCursor& cursor, Compilation& compilation)
+        : fCursor(cursor), fCompilation(compilation), fQualifiers(cursor, compilation)
     {
     }
 
@@ -39,7 +39,7 @@ class ClassParser
     void checkMemberCount(std::size_t count);
 
     TokenCursor& fCursor;
-    Session& fSession;
+    Compilation& fCompilation;
     QualifierParser fQualifiers;
 };
 

@@ -7,10 +7,10 @@ namespace {
 
 void compile(const SourceText& source, const CompileOptions& options, DefinitionHandler& handler)
 {
-    Session session(options, handler);
+    Compilation compilation(options, handler);
     handler.useNamespace(options.nameSpace);
-    FileCompiler(source, session).run();
-    session.instances.finish();
+    FileCompiler(source, compilation).run();
+    compilation.instances.finish();
 }
 
 } // namespace

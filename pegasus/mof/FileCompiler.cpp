@@ -43,8 +43,8 @@ bool isVersion(const std::string& text)
 
 } // namespace
 
-FileCompiler::FileCompiler(const SourceText& source, Session& session)
-    : fSource(source), fSession(session), fCursor(source, session.options.limits)
+FileCompiler::FileCompiler(const SourceText& source, Compilation& compilation)
+    : fSource(source), fCompilation(compilation), fCursor(source, compilation.options.limits)
 {
 }
 
@@ -66,7 +66,7 @@ void FileCompiler::definition()
         obeyPragma();
         return;
     }
-    const Qualifiers qualifiers = QualifierParser(fCursor, fSession).parseList();
+    const Qualifiers qualifiers = QualifierParser(fCursor, fCompilation).parseList();
     if (fCursor.skipWord("class"))
         defineClass(qualifiers);
     else if (fCursor.skipWord("instance"))
@@ -80,12 +80,12 @@ void FileCompiler::definition()
 void FileCompiler::defineClass(const Qualifiers& qualifiers)
 {
     fSubject = fCursor.current().offset;
-    const ParsedClass parsed = ClassParser(fCursor, fSession).parse(qualifiers);
+    const ParsedClass parsed = ClassParser(fCursor, fCompilation).parse(qualifiers);
     const CIMName name = parsed.itsClass.getClassName();
-    if (isWelcome(parsed.itsClass) && !fSession.handler.createClass(parsed.itsClass))
+    if (isWelcome(parsed.itsClass) && !fCompilation.handler.createClass(parsed.itsClass))
         warn("Class " + utf8(name.getString()) + " already exists in the repository");
     if (!parsed.alias.empty() &&
-        !fSession.aliases.define(parsed.alias, CIMObjectPath(String(), CIMNamespaceName(), name)))
+        !fCompilation.aliases.define(parsed.alias, CIMObjectPath(String(), CIMNamespaceName(), name)))
         fCursor.failAt(fSubject, "alias $" + parsed.alias + " is already defined");
 }
 
@@ -94,8 +94,9 @@ bool FileCompiler::isWelcome(const CIMClass& newClass)
 {
     const std::string start = "Class " + utf8(newClass.getClassName().getString()) + " was not added or updated: ";
     Boolean isExperimental = false;
-    if (!fSession.options.allowExperimental && qualifierValue(newClass, "Experimental", isExperimental) &&
-        isExperimental) {
+    if (!fCompilation.options.allowExperimental && qualifierValue(newClass, "Experimental", isExperimental) &&
+        isExperimental)
+    {
         warn(start + "Experimental update not allowed (set appropriate compiler option)");
         return false;
     }
@@ -109,7 +110,7 @@ bool FileCompiler::isWelcome(const CIMClass& newClass)
 
 void FileCompiler::defineInstance()
 {
-    fSession.instances.submit(InstanceParser(fCursor, fSession).parse());
+    fCompilation.instances.submit(InstanceParser(fCursor, fCompilation).parse());
 }
 
 void FileCompiler::defineQualifier(const Qualifiers& qualifiers)
@@ -117,7 +118,7 @@ void FileCompiler::defineQualifier(const Qualifiers& qualifiers)
     if (!qualifiers.empty())
         fCursor.failAt(fSubject, "a qualifier declaration cannot have qualifiers");
     fSubject = fCursor.current().offset;
-    fSession.handler.declareQualifier(QualifierParser(fCursor, fSession).parseDeclaration());
+    fCompilation.handler.declareQualifier(QualifierParser(fCursor, fCompilation).parseDeclaration());
 }
 
 void FileCompiler::obeyPragma()
@@ -138,21 +139,21 @@ void FileCompiler::obeyPragma()
 
 void FileCompiler::include(const std::string& name)
 {
-    const Limits& limits = fSession.options.limits;
-    if (fSession.includeDepth == limits.includeDepth)
+    const Limits& limits = fCompilation.options.limits;
+    if (fCompilation.includeDepth == limits.includeDepth)
         fCursor.failAt(fSubject, "include is nested deeper than the limit includeDepth (" +
                                      std::to_string(limits.includeDepth) + ")");
-    if (++fSession.includeCount > limits.includeCount)
+    if (++fCompilation.includeCount > limits.includeCount)
         fCursor.failAt(fSubject,
                        "more includes than the limit includeCount (" + std::to_string(limits.includeCount) + ")");
-    const std::string path = findInclude(name, fSource.directory(), fSession.options.includeDirectories);
+    const std::string path = findInclude(name, fSource.directory(), fCompilation.options.includeDirectories);
     if (path.empty())
         fCursor.failAt(fSubject, "Could not open include file " + name);
     try {
         const SourceText source = SourceText::read(path, limits.fileBytes);
-        ++fSession.includeDepth;
-        FileCompiler(source, fSession).run();
-        --fSession.includeDepth;
+        ++fCompilation.includeDepth;
+        FileCompiler(source, fCompilation).run();
+        --fCompilation.includeDepth;
     } catch (const FileError& error) {
         fCursor.failAt(fSubject, error.what());
     }
@@ -164,13 +165,13 @@ void FileCompiler::changeNamespace(const std::string& name)
         warn("Pragma \"namespace\": " + name + " is not a namespace name. Ignored");
         return;
     }
-    fSession.nameSpace = CIMNamespaceName(name.c_str());
-    fSession.handler.useNamespace(fSession.nameSpace);
+    fCompilation.nameSpace = CIMNamespaceName(name.c_str());
+    fCompilation.handler.useNamespace(fCompilation.nameSpace);
 }
 
 void FileCompiler::warn(const std::string& text)
 {
-    fSession.handler.warn(fCursor.place(fSubject).text(), text);
+    fCompilation.handler.warn(fCursor.place(fSubject).text(), text);
 }
 
 } // namespace Pegasus::mof

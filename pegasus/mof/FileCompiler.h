@@ -1,6 +1,6 @@
 #pragma once
 
-#include "pegasus/mof/Session.h"
+#include "pegasus/mof/Compilation.h"
 #include "pegasus/mof/TokenCursor.h"
 
 #include <Pegasus/Common/CIMQualifier.h>
@@ -9,11 +9,11 @@
 
 namespace Pegasus::mof {
 
-/// Compiles the definitions of one file in order; an include is a further FileCompiler of the same session.
+/// Compiles the definitions of one file in order; an include is a further FileCompiler of the same compilation.
 class FileCompiler
 {
   public:
-    FileCompiler(const SourceText& source, Session& session);
+    FileCompiler(const SourceText& source, Compilation& compilation);
 
     /// Throws MofError.
     void run();
@@ -30,7 +30,7 @@ class FileCompiler
     void warn(const std::string& text);
 
     const SourceText& fSource;
-    Session& fSession;
+    Compilation& fCompilation;
     TokenCursor fCursor;
     std::size_t fSubject = 0; ///< offset of what an error of the current definition is about, unless it knows better
 };

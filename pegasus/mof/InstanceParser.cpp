@@ -37,9 +37,9 @@ CIMClass InstanceParser::parseClass()
 {
     const Token name = fCursor.expect(TokenKind::Identifier, "a class name");
     CIMClass found;
-    if (!fSession.handler.findClass(CIMName(name.text.c_str()), found))
+    if (!fCompilation.handler.findClass(CIMName(name.text.c_str()), found))
         fCursor.failAt(name.offset, "Error getting class " + name.text + " from namespace " +
-                                        std::string(fSession.nameSpace.getString().getCString()) +
+                                        std::string(fCompilation.nameSpace.getString().getCString()) +
                                         ": CIM_ERR_NOT_FOUND: " + name.text);
     return found;
 }
@@ -67,14 +67,15 @@ void InstanceParser::setValue(ParsedInstance& parsed, const CIMConstProperty& de
     const Initializer initializer = parseInitializer(fCursor);
     const Literal& first = initializer.elements.front();
     if (declared.getType() == CIMTYPE_REFERENCE && first.kind == Literal::Kind::Alias &&
-        !fSession.aliases.find(first.text)) {
+        !fCompilation.aliases.find(first.text))
+    {
         parsed.open.push_back({declared.getName(), first.text, fCursor.place(first.offset)});
         return;
     }
     const ValueType type{declared.getType(), declared.isArray(), declared.getArraySize()};
-    parsed.instance.addProperty(CIMProperty(declared.getName(),
-                                            buildValue(fCursor, fSession.aliases, initializer, type), type.arraySize,
-                                            declared.getReferenceClassName(), declared.getClassOrigin()));
+    parsed.instance.addProperty(
+        CIMProperty(declared.getName(), buildValue(fCursor, fCompilation.aliases, initializer, type), type.arraySize,
+                    declared.getReferenceClassName(), declared.getClassOrigin()));
 }
 
 } // namespace Pegasus::mof

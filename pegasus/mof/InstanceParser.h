@@ -8,8 +8,8 @@ namespace Pegasus::mof {
 class InstanceParser
 {
   public:
-    InstanceParser(TokenCursor& cursor, Session& session)
-        : fCursor(cursor), fSession(session), fQualifiers(cursor, session)
+    InstanceParser(TokenCursor& cursor, Compilation& compilation)
+        : fCursor(cursor), fCompilation(compilation), fQualifiers(cursor, compilation)
     {
     }
 
@@ -22,7 +22,7 @@ class InstanceParser
     void setValue(ParsedInstance& parsed, const CIMConstProperty& declared);
 
     TokenCursor& fCursor;
-    Session& fSession;
+    Compilation& fCompilation;
     QualifierParser fQualifiers;
 };
 

@@ -77,7 +77,7 @@ CIMQualifier QualifierParser::parseUse()
 CIMQualifierDecl QualifierParser::declarationOf(const Token& name)
 {
     CIMQualifierDecl declaration;
-    if (!fSession.handler.findQualifier(CIMName(name.text.c_str()), declaration))
+    if (!fCompilation.handler.findQualifier(CIMName(name.text.c_str()), declaration))
         fCursor.failAt(name.offset, "Could not find declaration for Qualifier named " + name.text);
     return declaration;
 }
@@ -87,11 +87,11 @@ CIMValue QualifierParser::parseParameter(const CIMQualifierDecl& declaration)
 {
     const ValueType type{declaration.getType(), declaration.isArray(), declaration.getArraySize()};
     if (fCursor.atPunctuation('{'))
-        return buildValue(fCursor, fSession.aliases, parseArrayInitializer(fCursor), type);
+        return buildValue(fCursor, fCompilation.aliases, parseArrayInitializer(fCursor), type);
     if (fCursor.skipPunctuation('(')) {
         const Initializer initializer = parseInitializer(fCursor);
         fCursor.expectPunctuation(')');
-        return buildValue(fCursor, fSession.aliases, initializer, type);
+        return buildValue(fCursor, fCompilation.aliases, initializer, type);
     }
     if (type.type == CIMTYPE_BOOLEAN && !type.isArray)
         return CIMValue(Boolean(true));
@@ -109,7 +109,7 @@ CIMQualifierDecl QualifierParser::parseDeclaration()
     parseArraySuffix(fCursor, type);
     CIMValue value(type.type, type.isArray, type.arraySize);
     if (fCursor.skipPunctuation('='))
-        value = buildValue(fCursor, fSession.aliases, parseInitializer(fCursor), type);
+        value = buildValue(fCursor, fCompilation.aliases, parseInitializer(fCursor), type);
 
     CIMScope scope;
     CIMFlavor flavor(CIMFlavor::DEFAULTS);

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "pegasus/mof/Session.h"
+#include "pegasus/mof/Compilation.h"
 #include "pegasus/mof/TokenCursor.h"
 
 #include <Pegasus/Common/CIMQualifier.h>
@@ -16,7 +16,7 @@ using Qualifiers = std::vector<CIMQualifier>;
 class QualifierParser
 {
   public:
-    QualifierParser(TokenCursor& cursor, Session& session) : fCursor(cursor), fSession(session) {}
+    QualifierParser(TokenCursor& cursor, Compilation& compilation) : fCursor(cursor), fCompilation(compilation) {}
 
     /// A list in brackets, or nothing. A use without flavors of its own has the flavor NONE; its declaration decides.
     Qualifiers parseList();
@@ -33,7 +33,7 @@ class QualifierParser
     bool applyFlavorWord(CIMFlavor& flavor);
 
     TokenCursor& fCursor;
-    Session& fSession;
+    Compilation& fCompilation;
 };
 
 /// Adds a parsed list to a class, property, method or parameter.

@@ -7,9 +7,9 @@
 namespace Pegasus::mof {
 
 /// What the files of one compilation share.
-struct Session
+struct Compilation
 {
-    Session(const CompileOptions& given, DefinitionHandler& target)
+    Compilation(const CompileOptions& given, DefinitionHandler& target)
         : options(given), handler(target), nameSpace(given.nameSpace), instances(target, aliases)
     {
     }
