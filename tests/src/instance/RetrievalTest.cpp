@@ -230,6 +230,7 @@ TEST_F(RetrievalTest, AReferenceKnowsItsClassWhenThePathSpellsItOut)
     } const rows[] = {
         {"spelt out", "CIM_L.Antecedent=" + reference, "CIM_Y"},
         {"two keys", "CIM_L.Antecedent=" + reference + ",Z=\"a:b.c\"", "CIM_Y"},
+        {"a colon before it", "CIM_L.Aa=\"x:y\",Antecedent=" + reference, "CIM_Y"},
         {"property not in the path", "CIM_L.Dependent=" + reference, nullptr},
         {"no colon behind it", "CIM_L.Antecedent=\"CIM_Y\"", nullptr},
         {"no dot behind it", "CIM_L.Antecedent=\"root/cimv2:CIM_Y\"", nullptr},
