@@ -43,8 +43,8 @@ class ICIMClass : public ICIMElement, public ICIMNamedElement
     virtual void EnumerateStaticProperties(TPropertyVisitor visitor, TCIMContext context) const = 0;
     virtual boost::shared_ptr<ICIMInstance> AllocateInstance(TCIMContext context) = 0;
     virtual void EnumerateInstances(TInstanceVisitor visitor, bool deep, TCIMContext context) = 0;
-    virtual boost::shared_ptr<ICIMMethodDecl> AllocateMethodDecl(const std::string& name, TCIMValue::TCIMType returnType,
-                                                                 TCIMContext context) = 0;
+    virtual boost::shared_ptr<ICIMMethodDecl>
+    AllocateMethodDecl(const std::string& name, TCIMValue::TCIMType returnType, TCIMContext context) = 0;
     virtual boost::shared_ptr<ICIMMethodDecl> GetMethodDecl(const std::string& name, TCIMContext context) const = 0;
     virtual void EnumerateMethodDecls(TMethodDeclVisitor visitor, TCIMContext context) const = 0;
     virtual TCIMValue InvokeMethod(const std::string& name, TCIMContext& parameters, TCIMContext context) = 0;
