@@ -1,0 +1,163 @@
+"""The main job on a real tree: what a user sees when all is well, and when something is broken.
+
+Usage: main_job.py BUILD_DIRECTORY [CLASS[.TEST]...]
+"""
+import glob
+import os
+import re
+import signal
+import subprocess
+import sys
+import unittest
+
+from tree import Tree, wait_until
+
+BUILD = sys.argv[1] if len(sys.argv) > 1 else None
+COMPLETE, FAILED, PARTIAL, INTERRUPTED = 0, 1, 3, 130
+
+
+def instances(document, class_name):
+    return [instance["properties"] for provider in document["providers"] for each in provider["classes"]
+            if each["name"] == class_name for instance in each["instances"]]
+
+
+def interfaces():
+    """name -> hardware address, as the kernel shows them."""
+    found = {}
+    for path in glob.glob("/sys/class/net/*/address"):
+        with open(path, encoding="ascii") as file:
+            found[path.split("/")[-2]] = file.read().strip()
+    return found
+
+
+def replace_in(path, old, new):
+    with open(path, encoding="utf-8") as file:
+        text = file.read()
+    assert old in text, f"{path} does not hold {old!r}"
+    with open(path, "w", encoding="utf-8") as file:
+        file.write(text.replace(old, new))
+
+
+class TreeTest(unittest.TestCase):
+    def setUp(self):
+        self.tree = Tree(BUILD)
+        self.addCleanup(self.tree.remove)
+
+    def assert_nothing_left(self):
+        self.assertEqual(self.tree.leftovers(), [])
+
+
+class HealthyTree(TreeTest):
+    def test_json_shows_this_machine(self):
+        status, document, err = self.tree.inventory()
+        self.assertEqual((status, err.strip()), (COMPLETE, ""))
+        self.assertTrue(document["complete"])
+        ports = {port["Name"]: port["MACAddress"] for port in instances(document, "LNX_NetworkPort")}
+        self.assertEqual(ports, interfaces())
+        with open("/proc/cpuinfo", encoding="ascii") as file:
+            processors = len(re.findall(r"^processor\s*:", file.read(), re.MULTILINE))
+        self.assertEqual(len(instances(document, "LNX_Processor")), processors)
+        self.assert_types(instances(document, "LNX_OperatingSystem")[0])
+        self.assert_nothing_left()
+
+    def assert_types(self, system):
+        self.assertIsInstance(system["NumberOfProcesses"], int)
+        self.assertRegex(system["LastBootUpTime"], r"^\d{14}\.\d{6}[+-]\d{3}$")
+
+    def test_table_into_a_pipe(self):
+        command = f'./vrxhost inventory --consumer {self.tree.consumer} | cat'
+        shown = subprocess.run(command, shell=True, cwd=self.tree.root, capture_output=True, text=True, timeout=120,
+                               check=True).stdout
+        for name, address in interfaces().items():
+            self.assertIn(name, shown)
+            self.assertIn(address, shown)
+        self.assert_nothing_left()
+
+    def test_threads_give_the_same_inventory(self):
+        status, document, _ = self.tree.inventory("--set", "pegasus_multi_thread=on")
+        self.assertEqual(status, COMPLETE)
+        self.assertEqual(len(instances(document, "LNX_NetworkPort")), len(interfaces()))
+        self.assert_nothing_left()
+
+
+class Interrupted(TreeTest):
+    def interrupt_once(self, condition, what):
+        process = self.tree.start("inventory")
+        try:
+            wait_until(condition, 60, what)
+            process.send_signal(signal.SIGINT)
+            process.communicate(timeout=60)
+        finally:
+            process.kill()
+        self.assertEqual(process.returncode, INTERRUPTED)
+        self.assert_nothing_left()
+
+    def test_while_the_server_is_up(self):
+        self.interrupt_once(lambda: os.path.exists(self.tree.start_file), "the server's start")
+
+
+class BrokenTree(TreeTest):
+    def expect(self, status, sentence, *arguments):
+        got, document, err = self.tree.inventory(*arguments)
+        self.assertEqual(got, status, err)
+        self.assertRegex(err, sentence)
+        self.assert_nothing_left()
+        return document
+
+    def test_library_that_does_not_load(self):
+        with open(self.tree.vendor("liblinuxinventory.so"), "w", encoding="ascii") as file:
+            file.write("no library")
+        document = self.expect(PARTIAL, "liblinuxinventory.so")
+        self.assertEqual(instances(document, "LNX_Processor"), [])
+
+    def test_class_list_that_is_no_xml(self):
+        with open(self.tree.vendor("linux.classes.xml"), "w", encoding="ascii") as file:
+            file.write("<vrx><class name=")
+        self.expect(PARTIAL, "line 1")
+
+    def test_mof_with_an_error(self):
+        replace_in(self.tree.vendor("linux.registration.mof"), "instance of PG_Provider\n", "instance off PG_Provider\n")
+        self.expect(PARTIAL, r"linux\.registration\.mof.*:\d+:\d+: error: ")
+
+    def test_class_that_the_server_does_not_know(self):
+        replace_in(self.tree.vendor("linux.classes.xml"), '<class name="LNX_Processor"/>',
+                   '<class name="LNX_Procesor"/><class name="LNX_Processor"/>')
+        document = self.expect(PARTIAL, "LNX_Procesor")
+        self.assertNotEqual(instances(document, "LNX_Processor"), [])
+
+    def test_no_provider_folder(self):
+        self.remove_tree("pegasus", "provider")
+        got, _, err = self.tree.inventory()
+        self.assertEqual(got, FAILED, err)
+        self.assertRegex(err, "provider")
+        self.assert_nothing_left()
+
+    def test_no_server_program(self):
+        os.unlink(self.tree.path("pegasus", "bin", "cimserver"))
+        got, _, err = self.tree.inventory()
+        self.assertEqual(got, FAILED, err)
+        self.assertIn("cimserver", err)
+        self.assert_nothing_left()
+
+    def remove_tree(self, *parts):
+        subprocess.run(["rm", "-r", self.tree.path(*parts)], check=True)
+
+
+class VendorExample(TreeTest):
+    """The commands of docs/vendors.md, as they stand there."""
+
+    def test_worked_example(self):
+        source = os.path.dirname(os.path.dirname(os.path.dirname(os.path.abspath(__file__))))
+        with open(os.path.join(source, "docs", "vendors.md"), encoding="utf-8") as file:
+            commands = re.search(r"```sh\n(.*?)```", file.read(), re.DOTALL).group(1)
+        commands = commands.replace("cmake --install build/release --prefix build/example", ":")
+        commands = commands.replace("build/example", self.tree.root).replace("lamps-example", self.tree.consumer)
+        shown = subprocess.run(commands, shell=True, cwd=source, capture_output=True, text=True, timeout=120, check=False)
+        self.assertEqual((shown.returncode, shown.stderr), (0, ""))
+        self.assertIn("power", shown.stdout)
+        self.assertIn("disk", shown.stdout)
+        self.assert_nothing_left()
+
+
+if __name__ == "__main__":
+    unittest.main(argv=[sys.argv[0], *sys.argv[2:]], verbosity=2)
