@@ -19,8 +19,7 @@ class ICIMNamespace
     // Ownership: the namespace keeps the upcall namespace weakly.
     virtual void SetUpcallNamespace(boost::shared_ptr<ICIMNamespace> upcall, TCIMContext context) = 0;
     virtual void AddUnderlyingNamespace(boost::shared_ptr<ICIMNamespace> underlying, TCIMContext context) = 0;
-    virtual boost::shared_ptr<ICIMClass> AllocateClass(const std::string& name,
-                                                       boost::shared_ptr<ICIMClass> superClass,
+    virtual boost::shared_ptr<ICIMClass> AllocateClass(const std::string& name, boost::shared_ptr<ICIMClass> superClass,
                                                        TCIMContext context) = 0;
     // Returns: the class of that name, case ignored; possibly null.
     virtual boost::shared_ptr<ICIMClass> GetClass(const std::string& name, TCIMContext context) = 0;
