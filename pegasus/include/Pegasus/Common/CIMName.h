@@ -39,8 +39,6 @@ class PEGASUS_COMMON_LINKAGE CIMName
     static Boolean legal(const String& name);
 
   private:
-    friend struct NameAccess;
-
     String fName;
 };
 
