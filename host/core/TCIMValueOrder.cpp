@@ -24,7 +24,7 @@ template <typename Value> int Compare(const Value& left, const Value& right)
 // The type as one code, arrays after all scalars.
 int TypeCode(const TCIMValue& value)
 {
-    return value.GetType() + (value.IsArray() ? int(TCIMValue::TCIMType::kArrayOffset) : 0);
+    return int(value.GetType()) + (value.IsArray() ? int(TCIMValue::TCIMType::kArrayOffset) : 0);
 }
 
 } // namespace

@@ -102,7 +102,7 @@ bool TChildProcess::HasExited() const
 void TChildProcess::Drain(UniqueFd& from, std::string& into, std::size_t limit)
 {
     char buffer[64 * 1024];
-    while (from) {
+    for (int reads = 0; from && reads < kMaxReadsAtOnce; ++reads) {
         const ssize_t count = ::read(from.Get(), buffer, sizeof buffer);
         if (count > 0) {
             const auto bytes = static_cast<std::size_t>(count);
