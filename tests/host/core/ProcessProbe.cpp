@@ -27,7 +27,8 @@ int PrintArguments(int argc, char** argv)
 int PrintEnvironment()
 {
     for (char** entry = environ; *entry; ++entry)
-        std::printf("[%s]", *entry);
+        if (std::strncmp(*entry, "__LLVM_PROFILE", 14) != 0) // set by the coverage runtime itself
+            std::printf("[%s]", *entry);
     return 0;
 }
 
