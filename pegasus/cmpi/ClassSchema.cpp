@@ -20,10 +20,18 @@ bool isTrue(const CIMConstProperty& property, const char* qualifier)
     return result;
 }
 
-bool isEmbedded(const CIMConstProperty& property)
+// The wire tells an embedded type by an attribute of the property, or by a qualifier alone.
+bool isEmbeddedObject(const CIMConstProperty& property)
 {
-    return property.getType() == CIMTYPE_STRING &&
-           (isTrue(property, "EmbeddedObject") || property.findQualifier(CIMName("EmbeddedInstance")) != PEG_NOT_FOUND);
+    return property.getType() == CIMTYPE_OBJECT ||
+           (property.getType() == CIMTYPE_STRING && isTrue(property, "EmbeddedObject"));
+}
+
+bool isEmbeddedInstance(const CIMConstProperty& property)
+{
+    return property.getType() == CIMTYPE_INSTANCE ||
+           (property.getType() == CIMTYPE_STRING &&
+            property.findQualifier(CIMName("EmbeddedInstance")) != PEG_NOT_FOUND);
 }
 
 std::size_t hashOf(std::string_view name)
@@ -53,7 +61,8 @@ void ClassSchema::addProperty(const CIMConstProperty& property)
     added.type = property.getType();
     added.isArray = property.isArray();
     added.isKey = isTrue(property, "Key");
-    added.isEmbedded = isEmbedded(property);
+    added.isEmbeddedObject = isEmbeddedObject(property);
+    added.isEmbedded = added.isEmbeddedObject || isEmbeddedInstance(property);
     added.referenceClass = property.getReferenceClassName();
     added.initial = property.getValue();
     if (added.isKey)

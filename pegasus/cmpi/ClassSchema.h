@@ -20,7 +20,8 @@ struct PropertySchema
     CIMType type;
     bool isArray;
     bool isKey;
-    bool isEmbedded; // a string that stands for an embedded object or instance
+    bool isEmbedded;       // an embedded object or instance, or a string that stands for one
+    bool isEmbeddedObject; // the former
     CIMName referenceClass;
     CIMValue initial; // null of the declared type, or the class's default
 };

@@ -6,6 +6,7 @@
 #include "pegasus/cmpi/Text.h"
 #include "pegasus/common/ObjectReps.h"
 
+#include <Pegasus/Common/CIMObject.h>
 #include <Pegasus/Common/CIMProperty.h>
 
 #include <utility>
@@ -27,13 +28,32 @@ bool accepts(const PropertySchema& property, const CIMValue& value)
     if (property.isArray != value.isArray())
         return false;
     const CIMType type = value.getType();
-    return type == property.type || (property.isEmbedded && (type == CIMTYPE_INSTANCE || type == CIMTYPE_OBJECT));
+    return type == property.type ||
+           (property.isEmbedded && (type == CIMTYPE_INSTANCE || type == CIMTYPE_OBJECT || type == CIMTYPE_STRING));
+}
+
+// CMPI has one type for embedded objects of either kind; the class tells which one its property is.
+CIMValue asDeclared(const PropertySchema& property, const CIMValue& value)
+{
+    if (!property.isEmbeddedObject || value.getType() != CIMTYPE_INSTANCE || value.isNull())
+        return value;
+    if (!value.isArray()) {
+        CIMInstance instance;
+        value.get(instance);
+        return CIMValue(CIMObject(instance));
+    }
+    Array<CIMInstance> instances;
+    value.get(instances);
+    Array<CIMObject> objects;
+    for (Uint32 i = 0; i < instances.size(); ++i)
+        objects.append(CIMObject(instances[i]));
+    return CIMValue(objects);
 }
 
 CIMProperty propertyOf(const PropertySchema& declared, const CIMValue& value)
 {
     const bool isReference = declared.type == CIMTYPE_REFERENCE && !declared.isArray;
-    return {declared.name, value, 0, isReference ? declared.referenceClass : CIMName()};
+    return {declared.name, asDeclared(declared, value), 0, isReference ? declared.referenceClass : CIMName()};
 }
 
 } // namespace

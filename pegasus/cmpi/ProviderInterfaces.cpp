@@ -60,26 +60,39 @@ template <class Interface> Interface* ProviderInterfaces::make(const char* kind,
     return fLibrary.create<Interface>(kind, provider, fBroker, context);
 }
 
+// Returns: null when the library has no factory of that kind.
+template <class Interface>
+Interface* ProviderInterfaces::obtain(Interface* Provider::*kept, const char* kind, const std::string& provider)
+{
+    const auto madeBefore = [&] {
+        const std::lock_guard lock(fMakeMutex);
+        return fProviders[provider].*kept;
+    };
+    if (Interface* mi = madeBefore())
+        return mi;
+    const std::lock_guard factoryLock(fFactoryMutex);
+    if (Interface* mi = madeBefore())
+        return mi;
+    Interface* mi = make<Interface>(kind, provider);
+    const std::lock_guard lock(fMakeMutex);
+    fProviders[provider].*kept = mi;
+    return mi;
+}
+
 CMPIInstanceMI& ProviderInterfaces::instance(const std::string& provider)
 {
-    const std::lock_guard lock(fMakeMutex);
-    Provider& made = fProviders[provider];
-    if (made.instance == nullptr)
-        made.instance = make<CMPIInstanceMI>("Instance", provider);
-    if (made.instance == nullptr)
+    CMPIInstanceMI* mi = obtain(&Provider::instance, "Instance", provider);
+    if (mi == nullptr)
         throw noInterface(provider, "instance", CIM_ERR_NOT_SUPPORTED);
-    return *made.instance;
+    return *mi;
 }
 
 CMPIMethodMI& ProviderInterfaces::method(const std::string& provider)
 {
-    const std::lock_guard lock(fMakeMutex);
-    Provider& made = fProviders[provider];
-    if (made.method == nullptr)
-        made.method = make<CMPIMethodMI>("Method", provider);
-    if (made.method == nullptr)
+    CMPIMethodMI* mi = obtain(&Provider::method, "Method", provider);
+    if (mi == nullptr)
         throw noInterface(provider, "method", CIM_ERR_METHOD_NOT_AVAILABLE);
-    return *made.method;
+    return *mi;
 }
 
 CMPIrc ProviderInterfaces::cleanup(Provider& provider, bool terminating)

@@ -54,6 +54,8 @@ class ProviderInterfaces
         CMPIMethodMI* method = nullptr;
     };
 
+    template <class Interface>
+    Interface* obtain(Interface* Provider::*kept, const char* kind, const std::string& provider);
     template <class Interface> Interface* make(const char* kind, const std::string& provider) const;
     CMPIrc cleanup(Provider& provider, bool terminating);
 
@@ -63,9 +65,10 @@ class ProviderInterfaces
     std::condition_variable fCleaned;
     unsigned fUses = 0;
     bool fIsCleaning = false;
-    std::mutex fMakeMutex; // guards the map, and keeps factories from running twice
+    std::mutex fFactoryMutex; // one factory at a time: those of one provider may share what they make
+    std::mutex fMakeMutex; // guards the next two; not held while a factory runs, so that interfaces already made serve
     std::map<std::string, Provider> fProviders;
-    bool fNeverUnload = false; // guarded by fMakeMutex
+    bool fNeverUnload = false;
 };
 
 } // namespace Pegasus::cmpi

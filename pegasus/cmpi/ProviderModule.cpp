@@ -11,6 +11,9 @@
 
 #include <Pegasus/Common/Exception.h>
 
+#include <cxxabi.h>
+
+#include <exception>
 #include <optional>
 
 namespace Pegasus::cmpi {
@@ -81,14 +84,29 @@ class Call
     const CMPIObjectPath* path() const { return &fPath; }
     const CMPIResult* result() const { return &fResult; }
 
-    // What the sink threw goes before what the provider made of it.
-    void finish(const CMPIStatus& status) const
+    // Runs the provider's function. What the sink threw goes before what the provider made of it.
+    template <class Function, class... Arguments> void run(Function* function, Arguments... arguments) const
     {
+        const CMPIStatus status = guarded([&] { return function(arguments...); });
         fResult.rethrow();
         throwUnlessOk(status);
     }
 
   private:
+    // An exception that a provider in C++ lets out ends its request, not its process.
+    template <class Body> static CMPIStatus guarded(Body&& body)
+    {
+        try {
+            return body();
+        } catch (const abi::__forced_unwind&) { // a thread that is cancelled
+            throw;
+        } catch (const std::exception& error) {
+            throw CIMException(CIM_ERR_FAILED, fromUtf8(error.what()));
+        } catch (...) {
+            throw CIMException(CIM_ERR_FAILED, String("Unknown error."));
+        }
+    }
+
     static CIMObjectPath placed(CIMObjectPath path, const CIMNamespaceName& nameSpace)
     {
         path.setNameSpace(nameSpace);
@@ -130,7 +148,7 @@ void ProviderModule::enumerateInstances(const ProviderRequest& request, const CI
     CMPIInstanceMI& mi = fImpl->interfaces.instance(request.provider);
     if (mi.ft->enumerateInstances == nullptr)
         throw notServed(request, CIM_ERR_NOT_SUPPORTED, "enumerateInstances");
-    call.finish(mi.ft->enumerateInstances(&mi, call.context(), call.result(), call.path(), filter.names()));
+    call.run(mi.ft->enumerateInstances, &mi, call.context(), call.result(), call.path(), filter.names());
 }
 
 void ProviderModule::enumerateInstanceNames(const ProviderRequest& request, const CIMName& className,
@@ -142,7 +160,7 @@ void ProviderModule::enumerateInstanceNames(const ProviderRequest& request, cons
     CMPIInstanceMI& mi = fImpl->interfaces.instance(request.provider);
     if (mi.ft->enumerateInstanceNames == nullptr)
         throw notServed(request, CIM_ERR_NOT_SUPPORTED, "enumerateInstanceNames");
-    call.finish(mi.ft->enumerateInstanceNames(&mi, call.context(), call.result(), call.path()));
+    call.run(mi.ft->enumerateInstanceNames, &mi, call.context(), call.result(), call.path());
 }
 
 CIMInstance ProviderModule::getInstance(const ProviderRequest& request, const CIMObjectPath& path,
@@ -160,7 +178,7 @@ CIMInstance ProviderModule::getInstance(const ProviderRequest& request, const CI
     CMPIInstanceMI& mi = fImpl->interfaces.instance(request.provider);
     if (mi.ft->getInstance == nullptr)
         throw notServed(request, CIM_ERR_NOT_SUPPORTED, "getInstance");
-    call.finish(mi.ft->getInstance(&mi, call.context(), call.result(), call.path(), filter.names()));
+    call.run(mi.ft->getInstance, &mi, call.context(), call.result(), call.path(), filter.names());
     if (!found)
         throw CIMException(CIM_ERR_NOT_FOUND, path.toString());
     return *found;
@@ -186,7 +204,8 @@ CIMValue ProviderModule::invokeMethod(const ProviderRequest& request, const CIMO
     if (mi.ft->invokeMethod == nullptr)
         throw notServed(request, CIM_ERR_METHOD_NOT_AVAILABLE, "invokeMethod");
     const std::string name = utf8(method);
-    call.finish(mi.ft->invokeMethod(&mi, call.context(), call.result(), call.path(), name.c_str(), &input, &output));
+    call.run(mi.ft->invokeMethod, &mi, call.context(), call.result(), call.path(), name.c_str(),
+             static_cast<const CMPIArgs*>(&input), static_cast<CMPIArgs*>(&output));
     if (!hasReturned || returned.isNull())
         throw CIMException(CIM_ERR_FAILED, String("The object is not initialized."));
     out = output.parameters();

@@ -91,13 +91,15 @@ void CimAnswer::finish()
     fStream.finish();
 }
 
-void CimAnswer::fail(const CimStatus& status, bool inBody)
+void CimAnswer::fail(const CimStatus& status, ErrorPlace place)
 {
-    if (!fStream.hasStarted()) {
+    const bool inTrailer = fStream.isChunked() && place != ErrorPlace::kBody;
+    const bool keeps = inTrailer && place == ErrorPlace::kBehindElements;
+    if (!fStream.hasStarted() && !keeps) {
         fStream.discard();
         fOpen = fReturnValueOpen = false;
     }
-    if (fStream.isChunked() && !inBody) {
+    if (inTrailer) {
         close();
         fStream.finish(status);
         return;

@@ -37,9 +37,14 @@ class CimAnswer : public ElementSink
 
     // Ends a good answer.
     void finish();
-    // Ends the answer with an error. What was written is taken back if none of it has left yet.
-    // `inBody` puts the ERROR element into the message although the client could read a trailer.
-    void fail(const CimStatus& status, bool inBody = false);
+    enum class ErrorPlace
+    {
+        kTrailer,        // behind nothing: what was written is taken back if none of it has left yet
+        kBehindElements, // in the trailer, behind what was written
+        kBody            // an ERROR element in the message, although the client could read a trailer
+    };
+    // Ends the answer with an error. A client that reads no trailer finds it in the body, and nothing else.
+    void fail(const CimStatus& status, ErrorPlace place = ErrorPlace::kTrailer);
 
   private:
     void open();
@@ -53,15 +58,20 @@ class CimAnswer : public ElementSink
     bool fReturnValueOpen = false;
 };
 
-// An operation failed with a status whose text is complete already: an agent's.
+// An operation failed with a status whose text is complete already: an agent's. What other agents gave may stay.
 class OperationFailed : public std::runtime_error
 {
   public:
-    explicit OperationFailed(const CimStatus& status) : std::runtime_error(status.text), fStatus(status) {}
+    explicit OperationFailed(const CimStatus& status, CimAnswer::ErrorPlace place = CimAnswer::ErrorPlace::kTrailer)
+        : std::runtime_error(status.text), fStatus(status), fPlace(place)
+    {
+    }
     const CimStatus& status() const { return fStatus; }
+    CimAnswer::ErrorPlace place() const { return fPlace; }
 
   private:
     CimStatus fStatus;
+    CimAnswer::ErrorPlace fPlace;
 };
 
 // The status that clients see: the symbolic name before the text.

@@ -90,7 +90,8 @@ void Connection::answer(const HttpRequest& http)
     AnswerStream stream(fStream, answerOptions(http, fSettings));
     CimAnswer answer(stream, request, fEnvelope);
     if (!fHandler.knowsMethod(request)) {
-        answer.fail(makeStatus(CIM_ERR_NOT_SUPPORTED, "Unrecognized intrinsic method: " + request.method), true);
+        answer.fail(makeStatus(CIM_ERR_NOT_SUPPORTED, "Unrecognized intrinsic method: " + request.method),
+                    CimAnswer::ErrorPlace::kBody);
         return;
     }
     try {
@@ -109,7 +110,7 @@ try {
 } catch (const CIMException& error) {
     answer.fail(statusOf(error));
 } catch (const OperationFailed& error) {
-    answer.fail(error.status());
+    answer.fail(error.status(), error.place());
 } catch (const wire::XmlError&) {
     throw;
 } catch (const AnswerTooLarge& error) {

@@ -33,7 +33,7 @@ class FirstError
     void rethrow() const
     {
         if (fStatus.code != 0)
-            throw OperationFailed(fStatus);
+            throw OperationFailed(fStatus, CimAnswer::ErrorPlace::kBehindElements);
     }
 
   private:

@@ -1,0 +1,183 @@
+#include "pegasus/server/RecordedExchange.h"
+
+#include "pegasus/common/XmlReader.h"
+#include "pegasus/server/HttpRequest.h"
+
+#include <algorithm>
+#include <cstdlib>
+#include <fstream>
+#include <sstream>
+#include <stdexcept>
+
+namespace servertest {
+
+using Pegasus::wire::XmlDocument;
+using Pegasus::wire::XmlElement;
+
+namespace {
+
+std::string contentOf(const std::string& path)
+{
+    std::ifstream file(path, std::ios::binary);
+    if (!file)
+        throw std::runtime_error("no recording " + path);
+    return {std::istreambuf_iterator<char>(file), {}};
+}
+
+// A recorded answer, in the form that a live one has.
+HttpAnswer parseAnswer(const std::string& bytes)
+{
+    HttpAnswer answer;
+    const std::size_t head = bytes.find("\r\n\r\n");
+    std::istringstream lines(bytes.substr(0, head));
+    std::getline(lines, answer.statusLine);
+    answer.statusLine = answer.statusLine.substr(0, answer.statusLine.find('\r'));
+    answer.status = answer.statusLine.size() > 9 ? std::atoi(answer.statusLine.c_str() + 9) : 0;
+    const auto readFields = [](std::istream& from, std::map<std::string, std::string>& to) {
+        for (std::string line; std::getline(from, line);) {
+            const std::size_t colon = line.find(": ");
+            if (colon == std::string::npos)
+                continue;
+            std::string name = line.substr(0, colon);
+            std::transform(name.begin(), name.end(), name.begin(), [](unsigned char c) { return std::tolower(c); });
+            to[name] = line.substr(colon + 2, line.find('\r') - colon - 2);
+        }
+    };
+    readFields(lines, answer.headers);
+    std::size_t at = head == std::string::npos ? bytes.size() : head + 4;
+    if (answer.headers.count("transfer-encoding") == 0) {
+        answer.body = bytes.substr(at);
+        return answer;
+    }
+    for (std::size_t size; (size = std::strtoul(bytes.c_str() + at, nullptr, 16)) != 0;) {
+        at = bytes.find("\r\n", at) + 2;
+        answer.body += bytes.substr(at, size);
+        at += size + 2;
+    }
+    std::istringstream trailers(bytes.substr(at));
+    readFields(trailers, answer.trailers);
+    return answer;
+}
+
+void appendCanonical(std::string& out, const XmlElement& element, int depth, Order order);
+
+// The text of a VALUE; an embedded instance is taken apart where order does not matter, for it does not there either.
+std::string canonicalText(std::string text, int depth, Order order)
+{
+    if (order == Order::kAsSent || text.rfind("<INSTANCE ", 0) != 0)
+        return ": " + text;
+    XmlDocument document;
+    std::string out = "\n";
+    appendCanonical(out, document.parseFragment(text.data(), text.size()), depth + 1, order);
+    return out;
+}
+
+void appendCanonical(std::string& out, const XmlElement& element, int depth, Order order)
+{
+    static constexpr std::string_view kNames[] = {"ARRAYSIZE",   "ASSOCIATION",     "CIMVERSION",     "CLASS",
+                                                  "CLASSNAME",   "CLASSORIGIN",     "CODE",           "DESCRIPTION",
+                                                  "DTDVERSION",  "EmbeddedObject",  "EMBEDDEDOBJECT", "ID",
+                                                  "INDICATION",  "ISARRAY",         "METHOD",         "NAME",
+                                                  "OVERRIDABLE", "PARAMETER",       "PARAMTYPE",      "PROPAGATED",
+                                                  "PROPERTY",    "PROTOCOLVERSION", "REFERENCE",      "REFERENCECLASS",
+                                                  "SUPERCLASS",  "TOINSTANCE",      "TOSUBCLASS",     "TRANSLATABLE",
+                                                  "TYPE",        "VALUETYPE",       "VERSION"};
+    std::string_view values[std::size(kNames)];
+    std::string scratch;
+    element.attributes(kNames, values);
+    out += std::string(static_cast<std::size_t>(depth), ' ') + std::string(element.name());
+    for (std::size_t i = 0; i < std::size(kNames); ++i)
+        if (values[i].data() != nullptr)
+            out += " " + std::string(kNames[i]) + "=" + std::string(element.resolved(values[i], scratch));
+    if (element.is("VALUE") || element.is("KEYVALUE") || element.is("HOST"))
+        out += canonicalText(std::string(element.text(scratch)), depth, order);
+    out += "\n";
+    if (element.is("VALUE") || element.is("KEYVALUE") || element.is("HOST"))
+        return;
+    std::vector<std::string> children;
+    for (XmlElement child = element.firstChild(); child; child = child.nextSibling())
+        appendCanonical(children.emplace_back(), child, depth + 1, order);
+    if (order == Order::kSorted && (element.is("IRETURNVALUE") || element.is("INSTANCE")))
+        std::sort(children.begin(), children.end());
+    for (const std::string& child : children)
+        out += child;
+}
+
+} // namespace
+
+std::string canonicalBody(std::string body, Order order)
+{
+    if (body.find("<?xml") != 0)
+        return body;
+    XmlDocument document;
+    std::string out;
+    appendCanonical(out, document.parseMessage(body.data(), body.size()), 0, order);
+    return out;
+}
+
+std::string recordingsFolder()
+{
+    return std::string(VECTORS_DIRECTORY).empty() ? "" : std::string(VECTORS_DIRECTORY) + "/wire/";
+}
+
+RecordedExchange::RecordedExchange(const std::string& name)
+    : request(contentOf(recordingsFolder() + name + "/request.http")),
+      answer(parseAnswer(contentOf(recordingsFolder() + name + "/response.http")))
+{
+}
+
+std::vector<std::string> elementsOf(const std::string& body, const std::string& element)
+{
+    std::vector<std::string> found;
+    const std::string close = "</" + element + ">\n";
+    for (std::size_t at = 0; (at = body.find("<" + element, at)) != std::string::npos;) {
+        const char behind = body[at + element.size() + 1];
+        if (behind != ' ' && behind != '>') {
+            ++at;
+            continue;
+        }
+        const std::size_t end = body.find(close, at) + close.size();
+        found.push_back(body.substr(at, end - at));
+        at = end;
+    }
+    return found;
+}
+
+std::string canonical(const HttpAnswer& answer, Order order)
+{
+    std::string text = answer.statusLine + "\n";
+    for (const char* name : {"cimoperation", "cimerror", "pgerrordetail"})
+        if (answer.headers.count(name) != 0)
+            text += std::string(name) + ": " + header(answer, name) + "\n";
+    for (const auto& [name, value] : answer.trailers)
+        text += name + ": " + Pegasus::server::percentDecode(value) + "\n";
+    return text + canonicalBody(answer.body, order);
+}
+
+std::string firstDifference(const std::string& ours, const std::string& recorded)
+{
+    constexpr int kLines = 6;
+    std::istringstream left(ours);
+    std::istringstream right(recorded);
+    std::string a;
+    std::string b;
+    int number = 1;
+    do {
+        a = b = "(end)";
+        std::getline(left, a);
+        std::getline(right, b);
+        if (!left && !right)
+            return "";
+        ++number;
+    } while (a == b);
+    std::string text = "line " + std::to_string(number - 1);
+    std::string more = "\nours:     " + a;
+    for (int i = 0; i < kLines && std::getline(left, a); ++i)
+        more += "\n          " + a;
+    more += "\nrecorded: " + b;
+    for (int i = 0; i < kLines && std::getline(right, b); ++i)
+        more += "\n          " + b;
+    return text + more;
+}
+
+} // namespace servertest

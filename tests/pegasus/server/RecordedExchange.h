@@ -1,0 +1,43 @@
+#pragma once
+
+#include "pegasus/server/HttpExchange.h"
+
+#include <string>
+#include <vector>
+
+namespace servertest {
+
+// A request and its answer as they once went over the wire, from the folder of recordings.
+struct RecordedExchange
+{
+    // Throws: std::runtime_error when there is none of that name.
+    explicit RecordedExchange(const std::string& name);
+
+    std::string request;
+    HttpAnswer answer;
+};
+
+// The recordings' folder, with a slash behind it; empty when the build knows of none.
+std::string recordingsFolder();
+
+// The elements of one name in a body, each as text with the line feed behind it. They do not nest.
+std::vector<std::string> elementsOf(const std::string& body, const std::string& element);
+
+enum class Order
+{
+    kAsSent,
+    // Instances and their properties by their texts: providers answer in any order, and a CMPI instance has the order
+    // of its class.
+    kSorted
+};
+
+// A body without what does not matter: blanks between tags, the order of attributes, how a character is escaped.
+std::string canonicalBody(std::string body, Order order);
+// Status, CIM headers, trailer and body of an answer, one a line, without what does not matter: blanks between tags,
+// the order of attributes, how a character is escaped.
+std::string canonical(const HttpAnswer& answer, Order order = Order::kAsSent);
+
+// The line where two texts part, with a few that follow; empty if they are equal.
+std::string firstDifference(const std::string& ours, const std::string& recorded);
+
+} // namespace servertest
