@@ -1,5 +1,6 @@
 #include "pegasus/repository/ClassCache.h"
 
+#include "pegasus/common/ElementEncoder.h"
 #include "pegasus/repository/ClassFilter.h"
 
 namespace Pegasus::repository {
@@ -45,15 +46,27 @@ void ClassCache::insert(NamespaceId nameSpace, const std::string& foldedName, co
     }
 }
 
-CIMClass ClassCache::filtered(NamespaceId nameSpace, const std::string& foldedName, const ClassOptions& options)
+std::shared_ptr<const std::string> ClassCache::text(NamespaceId nameSpace, const std::string& foldedName,
+                                                    const ClassOptions& options)
 {
-    Entry* entry = touch(keyOf(nameSpace, foldedName));
-    if (!entry)
-        return CIMClass();
-    CIMClass& form = entry->forms[formIndex(options)];
-    if (form.isUninitialized())
-        form = filterClass(entry->resolved, options);
-    return form;
+    Entry& entry = *touch(keyOf(nameSpace, foldedName));
+    std::shared_ptr<const std::string>& kept = entry.texts[formIndex(options)];
+    if (kept)
+        return kept;
+    auto made = std::make_shared<std::string>();
+    wire::appendClass(*made, filterClass(entry.resolved, options));
+    fTextBytes += made->size();
+    if (fTextBytes > kMaxTextBytes) {
+        forgetTexts();
+        fTextBytes = made->size();
+    }
+    return kept = made;
+}
+
+void ClassCache::forgetTexts()
+{
+    for (Entry& entry : fEntries)
+        entry.texts = {};
 }
 
 void ClassCache::remove(NamespaceId nameSpace, const std::string& foldedName)

@@ -5,12 +5,13 @@
 
 #include <array>
 #include <list>
+#include <memory>
 #include <string>
 #include <unordered_map>
 
 namespace Pegasus::repository {
 
-/// Resolved classes and the filtered forms that were asked for, the least recently used ones dropped first.
+/// Resolved classes, the least recently used ones dropped first, and the encoded forms that were asked for.
 /// Thread: one thread at a time.
 class ClassCache
 {
@@ -20,8 +21,10 @@ class ClassCache
     /// Uninitialised if it is not held.
     CIMClass find(NamespaceId nameSpace, const std::string& foldedName);
     void insert(NamespaceId nameSpace, const std::string& foldedName, const CIMClass& resolved);
-    /// The form of a held class without a property list: made once, then kept. Uninitialised if the class is not held.
-    CIMClass filtered(NamespaceId nameSpace, const std::string& foldedName, const ClassOptions& options);
+    /// A held class as a CLASS element: made once, then kept for a while.
+    /// Requires: the class is held; no property list.
+    std::shared_ptr<const std::string> text(NamespaceId nameSpace, const std::string& foldedName,
+                                            const ClassOptions& options);
     void remove(NamespaceId nameSpace, const std::string& foldedName);
 
   private:
@@ -29,13 +32,17 @@ class ClassCache
     {
         std::string key;
         CIMClass resolved;
-        std::array<CIMClass, 8> forms; ///< by the three switches of ClassOptions; uninitialised: not asked for yet
+        std::array<std::shared_ptr<const std::string>, 8> texts; ///< by the three switches of ClassOptions
     };
 
+    static constexpr std::size_t kMaxTextBytes = 8u << 20;
+
     Entry* touch(const std::string& key);
+    void forgetTexts();
 
     std::size_t fCapacity;
-    std::list<Entry> fEntries; ///< most recently used first
+    std::size_t fTextBytes = 0; ///< at least what is held: a class that goes takes its texts along uncounted
+    std::list<Entry> fEntries;  ///< most recently used first
     std::unordered_map<std::string, std::list<Entry>::iterator> fByKey;
 };
 

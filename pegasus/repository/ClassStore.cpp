@@ -1,5 +1,6 @@
 #include "pegasus/repository/ClassStore.h"
 
+#include "pegasus/common/ElementEncoder.h"
 #include "pegasus/repository/ClassChecker.h"
 #include "pegasus/repository/ClassFilter.h"
 #include "pegasus/repository/ClassResolver.h"
@@ -31,13 +32,28 @@ CIMClass ClassStore::resolved(NamespaceId nameSpace, const CIMName& name)
     return whole;
 }
 
-CIMClass ClassStore::get(NamespaceId nameSpace, const CIMName& name, const ClassOptions& options)
+CIMClass ClassStore::existing(NamespaceId nameSpace, const CIMName& name)
 {
     const CIMClass whole = resolved(nameSpace, name);
     if (whole.isUninitialized())
         fail(CIM_ERR_NOT_FOUND, utf8(name));
-    return options.propertyList.isNull() ? fCache.filtered(nameSpace, folded(name), options)
-                                         : filterClass(whole, options);
+    return whole;
+}
+
+CIMClass ClassStore::get(NamespaceId nameSpace, const CIMName& name, const ClassOptions& options)
+{
+    return filterClass(existing(nameSpace, name), options);
+}
+
+std::shared_ptr<const std::string> ClassStore::text(NamespaceId nameSpace, const CIMName& name,
+                                                    const ClassOptions& options)
+{
+    const CIMClass whole = existing(nameSpace, name);
+    if (options.propertyList.isNull())
+        return fCache.text(nameSpace, folded(name), options);
+    auto made = std::make_shared<std::string>();
+    wire::appendClass(*made, filterClass(whole, options));
+    return made;
 }
 
 bool ClassStore::has(NamespaceId nameSpace, const CIMName& name)

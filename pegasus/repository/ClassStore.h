@@ -14,6 +14,8 @@ class ClassStore
     /// With everything inherited. Uninitialised if there is none.
     CIMClass resolved(NamespaceId nameSpace, const CIMName& name);
     CIMClass get(NamespaceId nameSpace, const CIMName& name, const ClassOptions& options);
+    /// The same as a CLASS element.
+    std::shared_ptr<const std::string> text(NamespaceId nameSpace, const CIMName& name, const ClassOptions& options);
     bool has(NamespaceId nameSpace, const CIMName& name);
     CIMName superClass(NamespaceId nameSpace, const CIMName& name);
     std::vector<CIMName> listNames(NamespaceId nameSpace, const CIMName& name, bool isDeep);
@@ -23,6 +25,7 @@ class ClassStore
     void remove(NamespaceId nameSpace, const CIMName& name);
 
   private:
+    CIMClass existing(NamespaceId nameSpace, const CIMName& name);
     void put(NamespaceId nameSpace, const CIMConstClass& newClass);
     CIMClass resolvedSuperClass(NamespaceId nameSpace, const CIMConstClass& newClass);
     void checkDepth(NamespaceId nameSpace, const CIMConstClass& newClass);

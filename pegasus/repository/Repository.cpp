@@ -123,6 +123,13 @@ CIMConstClass Repository::getClass(const CIMNamespaceName& nameSpace, const CIMN
     return fState->classes.get(fState->namespaces.id(nameSpace), className, options);
 }
 
+std::shared_ptr<const std::string> Repository::getClassText(const CIMNamespaceName& nameSpace, const CIMName& className,
+                                                            const ClassOptions& options) const
+{
+    const Lock lock(fState->mutex);
+    return fState->classes.text(fState->namespaces.id(nameSpace), className, options);
+}
+
 bool Repository::hasClass(const CIMNamespaceName& nameSpace, const CIMName& className) const
 {
     const Lock lock(fState->mutex);

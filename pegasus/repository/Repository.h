@@ -91,6 +91,9 @@ class Repository
     /// Throws CIM_ERR_NOT_FOUND.
     CIMConstClass getClass(const CIMNamespaceName& nameSpace, const CIMName& className,
                            const ClassOptions& options) const;
+    /// The same as a CLASS element (DSP0201): what clients ask for again and again is encoded once.
+    std::shared_ptr<const std::string> getClassText(const CIMNamespaceName& nameSpace, const CIMName& className,
+                                                    const ClassOptions& options) const;
     bool hasClass(const CIMNamespaceName& nameSpace, const CIMName& className) const;
     /// The null name if the class has none. Throws CIM_ERR_NOT_FOUND.
     CIMName superClass(const CIMNamespaceName& nameSpace, const CIMName& className) const;

@@ -29,10 +29,7 @@ void getClass(ServerCore& core, const CimRequest& request, ElementSink& answer)
 {
     repository::ClassOptions options = classOptions(request);
     options.propertyList = request.parameters.propertyList();
-    std::string text;
-    wire::appendClass(text,
-                      core.repository.getClass(request.nameSpace, request.parameters.className("ClassName"), options));
-    answer.write(text);
+    answer.write(*core.repository.getClassText(request.nameSpace, request.parameters.className("ClassName"), options));
 }
 
 void enumerateClasses(ServerCore& core, const CimRequest& request, ElementSink& answer)

@@ -2,13 +2,15 @@
 #include "pegasus/repository/Repository.h"
 #include "support/PrivateServer.h"
 
-#include <atomic>
-#include <chrono>
+#include <climits>
 #include <random>
 #include <thread>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <poll.h>
+#include <sys/inotify.h>
+#include <unistd.h>
 
 using mof_test::TemporaryDirectory;
 using test::PrivateServer;
@@ -37,6 +39,33 @@ class Cimmof : public testing::Test
 
     TemporaryDirectory directory;
     static std::unique_ptr<PrivateServer> server;
+};
+
+/// Counts writes into the files of a directory. A burst that nobody has read yet may count as one.
+class WriteCounter
+{
+  public:
+    explicit WriteCounter(const std::string& directory) : fWatch(::inotify_init1(IN_CLOEXEC))
+    {
+        EXPECT_GE(::inotify_add_watch(fWatch, directory.c_str(), IN_MODIFY), 0) << directory;
+    }
+    ~WriteCounter() { ::close(fWatch); }
+    WriteCounter(const WriteCounter&) = delete;
+    WriteCounter& operator=(const WriteCounter&) = delete;
+
+    /// Returns: false if so many do not come.
+    bool waitFor(unsigned count)
+    {
+        pollfd wait = {fWatch, POLLIN, 0};
+        alignas(inotify_event) char event[sizeof(inotify_event) + NAME_MAX + 1];
+        for (unsigned seen = 0; seen < count; ++seen)
+            if (::poll(&wait, 1, 20000) != 1 || ::read(fWatch, event, sizeof event) <= 0)
+                return false;
+        return true;
+    }
+
+  private:
+    int fWatch;
 };
 
 std::unique_ptr<PrivateServer> Cimmof::server;
@@ -182,23 +211,27 @@ TEST(CimmofAlone, LeavesAWholeRepositoryWhenTheServerIsKilled)
                 std::to_string(i) + "; };\n";
     const TemporaryDirectory directory;
     const std::string file = directory.write("many.mof", text);
-    std::mt19937 random(5);
+    const unsigned seed = std::random_device()();
+    SCOPED_TRACE("seed " + std::to_string(seed));
+    std::mt19937 random(seed);
     PrivateServer server;
     std::size_t before = 0;
     for (int round = 0; round < kRounds; ++round) {
         server.start();
+        WriteCounter writes(server.home() + "/repository");
         ProgramResult result;
         std::thread compiler([&] { result = server.run("cimmof", {"-w", "-n", "root/k", file}); });
-        // The moment of death is what varies here, not something to wait for.
-        std::this_thread::sleep_for(std::chrono::milliseconds(20 + random() % 150));
+        EXPECT_TRUE(writes.waitFor(std::uniform_int_distribution<unsigned>(1, 80)(random)));
         server.kill();
         compiler.join();
         EXPECT_THAT(result.exitStatus, testing::AnyOf(0, 246, 250)) << result.err;
 
         const Pegasus::repository::Repository repository(server.home() + "/repository");
         const Pegasus::CIMNamespaceName nameSpace("root/k");
-        if (!repository.hasNamespace(nameSpace))
+        if (!repository.hasNamespace(nameSpace)) {
+            EXPECT_EQ(before, 0u);
             continue;
+        }
         const auto names = repository.enumerateClassNames(nameSpace, Pegasus::CIMName(), true);
         EXPECT_GE(names.size(), before) << "an acknowledged class is gone";
         before = names.size();

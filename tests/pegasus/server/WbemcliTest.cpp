@@ -1,4 +1,5 @@
-// A foreign client, Debian's wbemcli, against our server: every operation that it has.
+// A foreign client, Debian's wbemcli, against our server: every verb that it has. It has none for qualifier
+// declarations (GetQualifier, EnumerateQualifiers, SetQualifier) and none for CreateClass.
 #include "pegasus/server/ServerTree.h"
 
 #include <gtest/gtest.h>
@@ -37,6 +38,9 @@ TEST(WbemcliTest, everyOperation)
     const std::string probe = "'http://127.0.0.1:" + std::to_string(tree.port()) + "/root/probe";
     const CliRow rows[] = {
         {"GetClass", "-nl gc " + probe + ":Probe_Base'", {"root/probe:Probe_Base", "-Id=", "-T1="}},
+        {"GetClass with its declarations",
+         "-dx gcd " + probe + ":Probe_Stored'",
+         {"<CLASS NAME=\"Probe_Stored\"  SUPERCLASS=\"Probe_Family\""}},
         {"EnumerateClasses", "ec " + probe + ":Probe_Record'", {":Probe_Bulk", ":Probe_Other"}},
         {"EnumerateClassNames", "ecn " + probe + "'", {":Probe_Base\n", ":Probe_Stored\n"}},
         {"EnumerateInstances of the repository",
@@ -51,9 +55,19 @@ TEST(WbemcliTest, everyOperation)
          {"-Id=\"bulk-0000007\"", "-N1=7000021"}},
         {"CreateInstance", "ci " + probe + ":Probe_Stored.Id=\"new\"' Id=new,T1=two", {"Probe_Stored.Id=\"new\""}},
         {"InvokeMethod", "cm " + probe + ":Probe_Bulk' 'Echo.Text=\"hello\"'", {"hello"}},
+        {"InvokeMethod, outputs shown",
+         "cmx " + probe + ":Probe_Bulk' 'Echo.Text=\"hello\"'",
+         {"<PARAMVALUE NAME=\"Back\"", "hello"}},
         {"an error", "gc " + probe + ":Nope' 2>&1", {"CIM_ERR_NOT_FOUND"}},
-        {"not supported", "di " + probe + ":Probe_Stored.Id=\"new\"' 2>&1", {"CIM_ERR_NOT_SUPPORTED"}},
     };
+    const std::string stored = probe + ":Probe_Stored.Id=\"stored-1\"' ";
+    for (const std::string& notSupported : std::vector<std::string>{
+             "di " + stored, "mi " + stored + "T1=three", "ai " + stored, "ain " + stored, "ri " + stored,
+             "rin " + stored, "gp " + stored + "T1", "sp " + stored + "T1=three", "dc " + probe + ":Probe_Stored' "})
+    {
+        const std::string output = outputOf("wbemcli " + notSupported + " 2>&1");
+        EXPECT_NE(output.find("CIM_ERR_NOT_SUPPORTED"), std::string::npos) << notSupported << ": " << output;
+    }
     for (const CliRow& row : rows) {
         SCOPED_TRACE(row.name);
         const std::string output = outputOf("wbemcli " + row.arguments);
