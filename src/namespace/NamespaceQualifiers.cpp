@@ -4,6 +4,7 @@
 #include "src/namespace/DefinitionSlot.h"
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSQualifierDecl.h"
+#include "src/schema/VisitInOrder.h"
 
 namespace NKOLVRX20 {
 
@@ -35,10 +36,7 @@ boost::shared_ptr<ICIMQualifierDecl> TPEGASUSNamespace::GetQualifierDecl(const s
 
 void TPEGASUSNamespace::EnumerateQualifierDecls(TQualifierDeclVisitor visitor, TCIMContext)
 {
-    for (const auto& entry : fQualifierDecls) {
-        if (!visitor(entry.second))
-            return;
-    }
+    VisitInOrder(fQualifierDecls, visitor);
 }
 
 } // namespace NKOLVRX20

@@ -143,9 +143,11 @@ void TPEGASUSNamespace::EnumerateProviders(TProviderVisitor visitor, TCIMContext
     LogProgress("after inventory pegasus NSP");
 }
 
+// A walk on a copy: the visitor may drop the namespace.
 void TPEGASUSNamespace::VisitProvidersInOrder(const TProviderVisitor& visitor)
 {
-    for (const auto& provider : fProviders) {
+    const auto providers = fProviders;
+    for (const auto& provider : providers) {
         if (!visitor(provider))
             return;
     }

@@ -70,18 +70,22 @@ boost::shared_ptr<ICIMNamespace> TPEGASUSProvider::GetNamespace(TCIMContext) con
     throw TVRXException(TVRXStatusCode::kNotSupported);
 }
 
+// A walk on copies: the visitor may drop the namespace, and this provider with it.
 void TPEGASUSProvider::EnumerateClassesProvided(TClassVisitor visitor, TCIMContext)
 {
-    for (const auto& collected : fCollectedClasses) {
+    const auto collectedClasses = fCollectedClasses;
+    const std::string providerName = fName;
+    for (const auto& collected : collectedClasses) {
         try {
-            OfferClass(collected, visitor);
+            OfferClass(collected, providerName, visitor);
         } catch (const TVRXException& exception) {
             LogFailure("TPEGASUSProvider::EnumerateClassesProvided catch exection : ", exception.what());
         }
     }
 }
 
-void TPEGASUSProvider::OfferClass(const boost::shared_ptr<ICIMClass>& collected, const TClassVisitor& visitor) const
+void TPEGASUSProvider::OfferClass(const boost::shared_ptr<ICIMClass>& collected, const std::string& providerName,
+                                  const TClassVisitor& visitor)
 {
     const std::string className = collected->GetName({});
     if (IsTaggedCdm(collected)) {
@@ -90,7 +94,7 @@ void TPEGASUSProvider::OfferClass(const boost::shared_ptr<ICIMClass>& collected,
     }
     if (IsNotToBeCollected(*collected))
         return;
-    LogProgress("TPEGASUSProvider::EnumerateClassesProvided Asking plugin ", fName, " for ", className);
+    LogProgress("TPEGASUSProvider::EnumerateClassesProvided Asking plugin ", providerName, " for ", className);
     visitor(collected);
 }
 

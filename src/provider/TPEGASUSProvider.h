@@ -84,7 +84,8 @@ class TPEGASUSProvider : public IProvider
     bool IsInitialized() const { return fInitialized; }
 
   private:
-    void OfferClass(const boost::shared_ptr<ICIMClass>& collected, const TClassVisitor& visitor) const;
+    static void OfferClass(const boost::shared_ptr<ICIMClass>& collected, const std::string& providerName,
+                           const TClassVisitor& visitor);
 
     std::string fType;
     std::string fPath;

@@ -43,10 +43,11 @@ boost::shared_ptr<ICIMClass> TPEGASUSClass::GetSuperClass(TCIMContext context) c
     return ns->GetClass(superName, context);
 }
 
-// A walk on a copy: the visitor may make the namespace fetch more classes. The visitor is wrapped, so that a child's
-// own walk can tell that it was ended.
+// A walk on a copy that keeps this class: the visitor may make the namespace fetch more classes, or drop it. The
+// visitor is wrapped, so that a child's own walk can tell that it was ended.
 void TPEGASUSClass::EnumerateSubClasses(TClassVisitor visitor, bool deep, TCIMContext context) const
 {
+    const auto self = shared_from_this();
     bool goesOn = true;
     const TClassVisitor remembered = [&](boost::shared_ptr<ICIMClass> child) { return goesOn = visitor(child); };
     const auto children = fChildClasses;

@@ -207,6 +207,7 @@ std::string TPEGASUSClass::RetrievalNamespaceName() const
 
 void TPEGASUSClass::EnumerateInstances(TInstanceVisitor visitor, bool deep, TCIMContext)
 {
+    const auto self = shared_from_this(); // the visitor may drop the namespace, and this class with it
     const TRetrieval retrieval{*this, "EnumerateInstances", true};
     LogProgress("TPEGASUSClass::EnumerateInstances ", fName);
     retrieval.LogCallingNamespace();

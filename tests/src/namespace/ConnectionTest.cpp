@@ -2,11 +2,29 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <dlfcn.h>
+
 #include <Pegasus/Client/CIMClient.h>
 #include <host/TVRXException.h>
 
 #include "src/provider/TPEGASUSProvider.h"
 #include "src/support/NamespaceRig.h"
+
+namespace {
+
+bool gSettingsFail = false;
+
+} // namespace
+
+// In front of the client library's own.
+void Pegasus::CIMClient::setTimeout(Uint32 timeoutMs)
+{
+    if (gSettingsFail)
+        throw Exception("no memory");
+    typedef void (*TFunction)(CIMClient*, Uint32);
+    static const auto fgNext = reinterpret_cast<TFunction>(::dlsym(RTLD_NEXT, "_ZN7Pegasus9CIMClient10setTimeoutEj"));
+    fgNext(this, timeoutMs);
+}
 
 namespace NKOLVRX20 {
 namespace {
@@ -105,6 +123,18 @@ TEST_F(ConnectionTest, InitMakesOneClientAndGivesItTheShortTimeOut)
     ns->Init();
     EXPECT_EQ(client, ns->getPegClient());
     EXPECT_EQ(10000U, client->getTimeout());
+}
+
+TEST_F(ConnectionTest, AClientThatCannotBeSetUpIsAConnectionFailure)
+{
+    TPEGASUSProvider provider;
+    const auto ns = fRig.MakeNamespace();
+    gSettingsFail = true;
+    EXPECT_EQ(42U, StatusOf([&] { ns->Init(); }));
+    EXPECT_EQ(42U, StatusOf([&] { provider.initPegasusClient(); }));
+    gSettingsFail = false;
+    EXPECT_THAT(fRig.fLog.Lines(), ElementsAre("3|TPEGASUSNamespace:Pegasus Client Creation Fail: no memory",
+                                               "3|TPEGASUSProvider: Pegasus Client Creation Fail: no memory"));
 }
 
 TEST_F(ConnectionTest, SucceedsAtWhicheverAttemptTheServerAppears)

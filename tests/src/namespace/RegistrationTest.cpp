@@ -1,6 +1,7 @@
 // From a provider on disk to one that the host is offered: compilation, collection, connection, enumeration.
 #include <algorithm>
 #include <atomic>
+#include <mutex>
 #include <stdexcept>
 #include <thread>
 
@@ -10,6 +11,8 @@
 #include <boost/thread/exceptions.hpp>
 
 #include <host/ICIMClass.h>
+#include <host/ICIMInstance.h>
+#include <host/ICIMProperty.h>
 #include <host/TConfig.h>
 #include <host/TVRXException.h>
 
@@ -309,6 +312,40 @@ TEST_F(ThreadedRegistrationTest, AVisitorThatThrowsOnAThreadCostsOneLine)
         ElementsAre("3|TPEGASUSNamespace::EnumerateProviders: fProviders.size() = 3", "3|before inventory pegasus NSP",
                     "0|TPEGASUSNamespace::EnumerateProviders failed for provider " + PathOf("beta") + ": no beta",
                     "3|after inventory pegasus NSP"));
+}
+
+TEST_F(ThreadedRegistrationTest, EachThreadMayFetchItsOwnProvidersInstances)
+{
+    SetThreads("on");
+    for (const std::string vendor : {"acme", "beta", "gamma"}) {
+        const std::string name = vendor + "_Disk";
+        AddProvider(vendor, {name});
+        fServer.AnswerClass(name, "", kDoCollect);
+        fServer.Answer("EnumerateInstances " + name,
+                       "<VALUE.NAMEDINSTANCE><INSTANCENAME CLASSNAME=\"" + name + "\"/><INSTANCE CLASSNAME=\"" + name +
+                           "\"><PROPERTY NAME=\"Vendor\" TYPE=\"string\"><VALUE>" + vendor +
+                           "</VALUE></PROPERTY></INSTANCE></VALUE.NAMEDINSTANCE>");
+    }
+    const auto ns = fRig.MakeConnectedNamespace(fServer);
+    ns->FindProviders();
+    std::mutex mutex;
+    std::vector<std::string> vendors;
+    const auto ofInstance = [&](const boost::shared_ptr<ICIMInstance>& instance) {
+        const std::lock_guard<std::mutex> lock(mutex);
+        vendors.push_back(instance->GetProperty("Vendor", {})->GetValue({}).ToString(10));
+        return true;
+    };
+    const auto ofClass = [&](const boost::shared_ptr<ICIMClass>& offered) {
+        offered->EnumerateInstances(ofInstance, true, {});
+        return true;
+    };
+    ns->EnumerateProviders(
+        [&](const boost::shared_ptr<IProvider>& provider) {
+            provider->EnumerateClassesProvided(ofClass, {});
+            return true;
+        },
+        {});
+    EXPECT_THAT(vendors, UnorderedElementsAre("acme", "beta", "gamma"));
 }
 
 TEST_F(ThreadedRegistrationTest, AThreadThatCannotBeMadeLeavesAfterTheOthersHaveEnded)

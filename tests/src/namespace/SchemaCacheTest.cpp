@@ -1,4 +1,6 @@
 // Names, and the classes that the namespace mirrors from its server.
+#include <atomic>
+
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -182,6 +184,51 @@ TEST_F(SchemaCacheTest, WithoutItsSuperclassAClassStandsBelowTheRoot)
     const auto leaf = boost::dynamic_pointer_cast<TPEGASUSClass>(fNamespace->GetClass("A_Leaf", {}));
     ASSERT_NE(nullptr, leaf);
     EXPECT_THAT(fNamespace->GetRootClass()->GetChildClasses(), ElementsAre(leaf));
+}
+
+TEST_F(SchemaCacheTest, AChainBreaksAtTheLinkThatFailsAndStandsAboveAndBelowIt)
+{
+    struct
+    {
+        const char* fFailing;
+        int fQuestion; // which of the two questions about that class fails
+        std::vector<std::string> fTree;
+    } const rows[] = {
+        {"Top", 1, {"Middle", "Leaf"}},
+        {"Top", 2, {"Middle", "Leaf"}},
+        {"Middle", 1, {"Leaf"}},
+        {"Middle", 2, {"Top", "Leaf"}},
+        {"Leaf", 1, {}},
+        {"Leaf", 2, {"Top", "Middle"}},
+    };
+    const std::pair<const char*, const char*> chain[] = {{"Top", ""}, {"Middle", "Top"}, {"Leaf", "Middle"}};
+    for (const auto& row : rows) {
+        SCOPED_TRACE(std::string(row.fFailing) + ", question " + std::to_string(row.fQuestion));
+        std::atomic<int> asked{0};
+        for (const auto& [name, super] : chain) {
+            const std::string attribute = *super ? std::string(" SUPERCLASS=\"") + super + "\"" : "";
+            const std::string answer = std::string("<CLASS NAME=\"") + name + "\"" + attribute + "/>";
+            const bool fails = row.fFailing == std::string(name);
+            fServer.AnswerWith(std::string("GetClass ") + name, [=, &asked, &row](const test::PeerRequest& request) {
+                return fails && ++asked == row.fQuestion ? test::errorAnswer(request, 1, "CIM_ERR_FAILED: link")
+                                                         : test::httpAnswer(test::intrinsicBody(request, answer));
+            });
+        }
+        const auto ns = fRig.MakeConnectedNamespace(fServer);
+        ::testing::internal::CaptureStdout();
+        const auto leaf = ns->GetClass("Leaf", {});
+        ::testing::internal::GetCapturedStdout();
+        EXPECT_EQ(row.fFailing == std::string("Leaf"), leaf == nullptr);
+        std::vector<std::string> tree;
+        ns->EnumerateRootClasses(
+            [&tree](boost::shared_ptr<ICIMClass> below) {
+                tree.push_back(below->GetName({}));
+                return true;
+            },
+            {});
+        EXPECT_EQ(row.fTree, tree);
+        ASSERT_NE(nullptr, ns->GetClass("Leaf", {})); // nothing of the failure is kept
+    }
 }
 
 TEST_F(SchemaCacheTest, AClassUnderAnotherNameIsNotFound)

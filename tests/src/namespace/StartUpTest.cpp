@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <boost/make_shared.hpp>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <host/TCIMReference.h>
@@ -249,6 +250,57 @@ TEST_F(StartUpTest, KeepsTheBrocadeLibraryOnlyForItsAdapterVersion)
         EXPECT_EQ(log, fRig.fLog.Lines());
     }
     fRig.fWorld.fRun = nullptr;
+}
+
+TEST_F(StartUpTest, AsksTheAdapterToolOnThePathForItsVersion)
+{
+    struct
+    {
+        const char* fName;
+        const char* fScript; // null: there is no such program
+        mode_t fMode;
+        bool fRemoved;
+        std::size_t fFailures;
+    } const rows[] = {
+        {"the version", "test $1 = -v && echo bcu 3.0.0", 0700, false, 0},
+        {"a status that says failure", "echo 3.0.0; exit 1", 0700, false, 0},
+        {"another version", "echo bcu 3.1.0", 0700, true, 0},
+        {"the version as an error", "echo 3.0.0 >&2", 0700, true, 0},
+        {"no program", nullptr, 0, true, 1},
+        {"no right to run it", "echo 3.0.0", 0600, true, 1},
+    };
+    const std::string oldPath = ::getenv("PATH");
+    const auto ns = fRig.MakeNamespaceWithConsumer();
+    fRig.fWorld.fRun = [](const TSpawnCall& call, std::string& output) {
+        if (call.fName == "bcu -v")
+            TOutsideWorld::RunByPathForReal(call, output);
+    };
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.fName);
+        const TTempTree tree;
+        if (row.fScript) {
+            const std::string tool = tree.Write("bcu", std::string("#!/bin/sh\n") + row.fScript + "\n");
+            ASSERT_EQ(0, ::chmod(tool.c_str(), row.fMode));
+        }
+        ASSERT_EQ(0, ::setenv("PATH", tree.Path().c_str(), 1));
+        fRig.fWorld.Take();
+        fRig.fLog.Take();
+        ns->preConfig();
+        ASSERT_EQ(0, ::setenv("PATH", oldPath.c_str(), 1));
+        EXPECT_EQ(row.fRemoved ? 2U : 1U, fRig.fWorld.Traced("system").size());
+        EXPECT_EQ(row.fFailures, fRig.fLog.LinesWith("0|").size());
+    }
+    fRig.fWorld.fRun = nullptr;
+}
+
+TEST_F(StartUpTest, WithoutAPathTheServersOwnDirectoriesRemain)
+{
+    const std::string oldPath = ::getenv("PATH");
+    ASSERT_EQ(0, ::unsetenv("PATH"));
+    const auto ns = fRig.MakeNamespace();
+    ASSERT_EQ(0, ::setenv("PATH", oldPath.c_str(), 1));
+    ns->callCimconfig();
+    EXPECT_EQ("PATH=:R:R/pegasus/provider/mellanox", fRig.Abbreviate(fRig.fWorld.Runs().back().fEnvironment.at(2)));
 }
 
 TEST_F(StartUpTest, WritesTheLsiConfigurationWhereItCan)

@@ -161,7 +161,7 @@ long CountEntries(const char* directory)
 TEST_F(ModuleTest, LeavesNothingBehindHoweverOftenItIsLoaded)
 {
     long descriptors = 0, threads = 0;
-    std::size_t bytes = 0;
+    [[maybe_unused]] std::size_t bytes = 0;
     TDeployedModule module("acme");
     for (int round = 0; round < 50; ++round) {
         SCOPED_TRACE(round);

@@ -283,6 +283,9 @@ TEST_F(ClassObjectTest, TheSuperclassIsAskedForAnewAndComesFromTheCache)
     EXPECT_EQ(42U, StatusOf([&] { derived->GetSuperClass({}); }));
     EXPECT_THAT(fServed.Log(), ElementsAre("0|TPEGASUSClass::GetSuperClass from Pegasus for: A1 returned exception: "
                                            "CIM_ERR_FAILED: gone"));
+    const auto unconnected = fServed.fRig.MakeNamespace();
+    EXPECT_FALSE(boost::make_shared<TPEGASUSClass>(unconnected, "A1", nullptr)->GetSuperClass({}));
+    EXPECT_FALSE(boost::make_shared<TPEGASUSClass>(unconnected, "<root>", nullptr)->IsRootClass({}));
 }
 
 TEST_F(ClassObjectTest, ClearingReachesTheWholeSubtreeAndForeignOwners)

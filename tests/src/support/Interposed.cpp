@@ -173,14 +173,19 @@ constexpr char kRunByPath[] =
 
 } // namespace
 
+void TOutsideWorld::RunByPathForReal(const TSpawnCall& call, std::string& output)
+{
+    Next<void(const std::string&, const std::vector<std::string>&, std::string&, int)>(kRunByPath)(
+        call.fName, call.fArguments, output, call.fTimeoutSeconds);
+}
+
 void TOSSpecific::SpawnProcess(const std::string& commandLine, const std::vector<std::string>& arguments,
                                std::string& output, int timeoutSeconds)
 {
     if (TOutsideWorld* world = TOutsideWorld::Current())
         world->Run({commandLine, arguments, "", {}, timeoutSeconds}, output);
     else
-        Next<void(const std::string&, const std::vector<std::string>&, std::string&, int)>(kRunByPath)(
-            commandLine, arguments, output, timeoutSeconds);
+        TOutsideWorld::RunByPathForReal({commandLine, arguments, "", {}, timeoutSeconds}, output);
 }
 
 void TOSSpecific::SpawnProcess(const std::string& name, const std::vector<std::string>& arguments,

@@ -49,6 +49,8 @@ class TOutsideWorld
     std::function<void(unsigned int seconds)> fOnSleep;
     // Gives a program's output, and may throw as the process service would; without it the output is empty.
     std::function<void(const TSpawnCall&, std::string& output)> fRun;
+    // For fRun: hands a call without a program path to the host's own process service after all.
+    static void RunByPathForReal(const TSpawnCall& call, std::string& output);
     // Decides about a port; without it every bind is real. Asked only for ports other than 0.
     std::function<bool(unsigned short port)> fIsPortFree;
     bool fBindForReal = true; // false: a free port is only said to be bound

@@ -1,0 +1,113 @@
+// The values of an instance: names, the two special properties, references.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "src/instance/RetrievalFixture.h"
+
+namespace NKOLVRX20 {
+namespace {
+
+using Pegasus::CIMName;
+using Pegasus::CIMObjectPath;
+using Pegasus::CIMValue;
+using ::testing::ElementsAre;
+
+class InstanceValuesTest : public TRetrievalFixture
+{
+};
+
+TEST_F(InstanceValuesTest, NamesAreTestedInTheServersSpelling)
+{
+    const CIMValue null(Pegasus::CIMTYPE_STRING, false);
+    const auto target = Serve(
+        "CIM_A",
+        {Instance("CIM_A", "CIM_A.K=1",
+                  {Property("InstanceID", null), Property("MyInstanceIDs", null), Property("instanceid2", null),
+                   Property("InstanceID3", Pegasus::String("x")), Property("InstanceID4", CIMValue(Pegasus::Uint8(4))),
+                   Property("Number", CIMValue(Pegasus::Uint32(70000)))})});
+    const auto instances = Enumerate(*target);
+    ASSERT_EQ(1U, instances.size());
+    const ICIMInstance& got = *instances[0];
+    for (const char* name : {"InstanceID", "MyInstanceIDs"}) {
+        EXPECT_EQ(TCIMValue(std::string()), ValueOf(got, name)) << name;
+    }
+    EXPECT_TRUE(ValueOf(got, "instanceid2").IsNull());
+    EXPECT_EQ(TCIMValue(std::string("x")), ValueOf(got, "InstanceID3"));
+    EXPECT_EQ(TCIMValue(static_cast<unsigned char>(4)), ValueOf(got, "InstanceID4"));
+    EXPECT_EQ(TCIMValue(70000U), ValueOf(got, "Number")); // only of slots
+}
+
+TEST_F(InstanceValuesTest, ASlotsNumberIsAlways16BitsWide)
+{
+    const auto slot = [](const char* name, const CIMValue& value) {
+        return Instance("OMC_ProcessorSlot", "OMC_ProcessorSlot.K=1", {Property(name, value)});
+    };
+    const auto target = Serve("OMC_ProcessorSlot", {slot("Number", CIMValue(Pegasus::Uint32(70000))),
+                                                    slot("Number", CIMValue(Pegasus::Uint8(3))),
+                                                    slot("number", CIMValue(Pegasus::Uint32(70000))),
+                                                    slot("Number", CIMValue(Pegasus::CIMTYPE_UINT32, false))});
+    const auto instances = Enumerate(*target);
+    ASSERT_EQ(4U, instances.size());
+    EXPECT_EQ(TCIMValue(static_cast<unsigned short>(4464)), ValueOf(*instances[0], "Number"));
+    EXPECT_EQ(TCIMValue(static_cast<unsigned short>(3)), ValueOf(*instances[1], "Number"));
+    EXPECT_EQ(TCIMValue(70000U), ValueOf(*instances[2], "Number"));
+    EXPECT_TRUE(ValueOf(*instances[3], "Number").IsNull());
+    EXPECT_THAT(fServed.fRig.fLog.LinesWith("3|4"),
+                ElementsAre("3|4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: number"));
+}
+
+TEST_F(InstanceValuesTest, AReferenceKnowsItsClassWhenThePathSpellsItOut)
+{
+    fServed.fModel.addClass(kNsp, Pegasus::CIMClass(CIMName("CIM_Y")));
+    const std::string reference = "\"root/cimv2:CIM_Y.Key=\\\"1\\\"\"";
+    struct
+    {
+        const char* fName;
+        std::string fPath;
+        const char* fClass; // null: none
+    } const rows[] = {
+        {"spelt out", "CIM_L.Antecedent=" + reference, "CIM_Y"},
+        {"two keys", "CIM_L.Antecedent=" + reference + ",Z=\"a:b.c\"", "CIM_Y"},
+        {"a colon before it", "CIM_L.Aa=\"x:y\",Antecedent=" + reference, "CIM_Y"},
+        {"property not in the path", "CIM_L.Dependent=" + reference, nullptr},
+        {"no colon behind it", "CIM_L.Antecedent=\"CIM_Y\"", nullptr},
+        {"no dot behind it", "CIM_L.Antecedent=\"root/cimv2:CIM_Y\"", nullptr},
+        {"other case in the path", "CIM_L.antecedent=" + reference, nullptr},
+        {"class not on the server", "CIM_L.Antecedent=\"root/cimv2:CIM_Gone.Key=\\\"1\\\"\"", nullptr},
+    };
+    const CIMObjectPath value("root/other:CIM_Y.Key=\"1\"");
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.fName);
+        const auto target = Serve("CIM_L", {});
+        fServed.fModel.addFault("EnumerateInstances", [&](const test::PeerRequest& request) {
+            return test::instancesAnswer(request, {Instance("CIM_L", row.fPath, {Property("Antecedent", value)})});
+        });
+        const auto instances = Enumerate(*target);
+        ASSERT_EQ(1U, instances.size());
+        const TCIMValue got = ValueOf(*instances[0], "Antecedent");
+        const auto referenced = got.GetReferencedClass();
+        EXPECT_EQ(row.fClass ? row.fClass : "", referenced ? referenced->GetName({}) : "");
+        EXPECT_EQ("root/other:CIM_Y.Key=\"1\"", static_cast<TCIMReference>(got).GetPath());
+        EXPECT_EQ(fServed.fNamespace, static_cast<TCIMReference>(got).GetNamespace());
+    }
+}
+
+TEST_F(InstanceValuesTest, AReferenceToAClassWithABadNameCostsOnlyItself)
+{
+    const auto target = Serve("CIM_L", {});
+    fServed.fModel.addFault("EnumerateInstances", [&](const test::PeerRequest& request) {
+        return test::instancesAnswer(
+            request, {Instance("CIM_L", "CIM_L.Antecedent=\"a:1b.c\"",
+                               {Property("Antecedent", CIMObjectPath("CIM_Y.Key=\"1\"")),
+                                Property("Gr\xC3\xB6n", CIMValue(true)), Property("Other", CIMValue(true))})});
+    });
+    const auto instances = Enumerate(*target);
+    ASSERT_EQ(1U, instances.size());
+    EXPECT_EQ(15U, StatusOf([&] { ValueOf(*instances[0], "Antecedent"); }));
+    EXPECT_EQ(TCIMValue(true), ValueOf(*instances[0], "Other"));
+    const std::string line = "3|4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: ";
+    EXPECT_THAT(fServed.fRig.fLog.LinesWith("3|4"), ElementsAre(line + "antecedent", line + "Gr\xC3\xB6n"));
+}
+
+} // namespace
+} // namespace NKOLVRX20
