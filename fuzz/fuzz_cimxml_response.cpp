@@ -1,7 +1,7 @@
 // The CIM-XML of an answer, cut at a place that the input chooses: the objects are the same however it arrives, and
 // what was decoded can be encoded and decoded again.
 #include "pegasus/client/ResponseReader.h"
-#include "pegasus/common/ElementEncoder.h"
+#include "support/ContentReader.h"
 
 #include <Pegasus/Client/CIMClientException.h>
 
@@ -14,25 +14,6 @@ using namespace Pegasus;
 
 namespace {
 
-/// Every kind of content, decoded and encoded; the text stands for the objects.
-void readContent(const wire::XmlElement& element, wire::ElementDecoder& decoder, std::string& out)
-{
-    if (element.is("CLASS"))
-        wire::appendClass(out, decoder.decodeClass(element));
-    else if (element.is("VALUE.NAMEDINSTANCE"))
-        wire::appendNamedInstance(out, decoder.decodeNamedInstance(element));
-    else if (element.is("INSTANCE"))
-        wire::appendInstance(out, decoder.decodeInstance(element));
-    else if (element.is("QUALIFIER.DECLARATION"))
-        wire::appendQualifierDeclaration(out, decoder.decodeQualifierDeclaration(element));
-    else if (element.is("RETURNVALUE"))
-        wire::appendReturnValue(out, decoder.decodeReturnValue(element));
-    else if (element.is("PARAMVALUE"))
-        wire::appendParamValue(out, decoder.decodeParamValue(element));
-    else
-        wire::appendInstanceName(out, decoder.decodeInstanceName(element));
-}
-
 /// The encoded result, or "error".
 std::string read(std::string_view xml, std::size_t cut, bool isIntrinsic)
 {
@@ -40,7 +21,7 @@ std::string read(std::string_view xml, std::size_t cut, bool isIntrinsic)
     std::string out;
     wire::ElementDecoder decoder;
     client::ResponseReader reader(expected, decoder, [&](const wire::XmlElement& element, wire::ElementDecoder&) {
-        readContent(element, decoder, out);
+        test::encodeAgain(element, decoder, out);
     });
     try {
         reader.feed(xml.substr(0, cut));

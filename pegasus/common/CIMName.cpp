@@ -45,12 +45,13 @@ Uint32 leadingSlash(const String& name)
     return name.size() > 0 && name[0] == '/' ? 1 : 0;
 }
 
+/// From the end: the names in one class begin alike more often than they end alike.
 bool sameNoCase(const StringRep& x, const StringRep& y)
 {
     if (x.fSize != y.fSize)
         return false;
-    for (Uint32 i = 0; i < x.fSize; ++i) {
-        if (lowerAscii(x.units()[i]) != lowerAscii(y.units()[i]))
+    for (Uint32 i = x.fSize; i > 0; --i) {
+        if (lowerAscii(x.units()[i - 1]) != lowerAscii(y.units()[i - 1]))
             return false;
     }
     return true;

@@ -47,6 +47,27 @@ template <class T> Array<T> passed(const Array<T>& x)
     }
 }
 
+RepPointer<CIMValueRep> makeNull(CIMType type, Boolean isArray, Uint32 arraySize)
+{
+    RepPointer<CIMValueRep> rep(new CIMValueRep());
+    rep->fType = static_cast<Uint8>(type);
+    rep->fIsArray = isArray;
+    rep->fNullArraySize = isArray ? arraySize : 0;
+    return rep;
+}
+
+/// Scalar nulls say nothing but their type, and classes are full of them. A representation is never changed, only
+/// replaced, so all nulls of a type can have the same.
+struct SharedNulls
+{
+    SharedNulls()
+    {
+        for (int type = CIMTYPE_BOOLEAN; type <= CIMTYPE_INSTANCE; ++type)
+            ofType[type] = makeNull(CIMType(type), false, 0);
+    }
+    RepPointer<CIMValueRep> ofType[CIMTYPE_INSTANCE + 1];
+};
+
 template <class T> void getScalar(const RepPointer<CIMValueRep>& rep, T& x)
 {
     const CIMType type = rep ? CIMType(rep->fType) : CIMTYPE_BOOLEAN;
@@ -203,11 +224,9 @@ CIMType CIMValue::getType() const
 
 void CIMValue::setNullValue(CIMType type, Boolean isArray, Uint32 arraySize)
 {
-    RepPointer<CIMValueRep> rep(new CIMValueRep());
-    rep->fType = static_cast<Uint8>(type);
-    rep->fIsArray = isArray;
-    rep->fNullArraySize = isArray ? arraySize : 0;
-    fRep = rep;
+    static const SharedNulls shared;
+    const bool isPlain = !isArray && type >= CIMTYPE_BOOLEAN && type <= CIMTYPE_INSTANCE;
+    fRep = isPlain ? shared.ofType[type] : makeNull(type, isArray, arraySize);
 }
 
 #define PEGASUS_VALUE_SET_GET(PARAMETER, T)                                                                            \

@@ -12,9 +12,9 @@ namespace {
 using Kind = XmlError::Kind;
 
 /// The attributes that DSP0201 gives each element; the language of texts is not kept.
-constexpr std::string_view kPropertyAttributes[] = {"NAME",           "TYPE",           "CLASSORIGIN", "PROPAGATED",
-                                                    "EmbeddedObject", "EMBEDDEDOBJECT", "ARRAYSIZE",   "xml:lang"};
-constexpr std::string_view kReferenceAttributes[] = {"NAME", "REFERENCECLASS", "CLASSORIGIN", "PROPAGATED"};
+constexpr std::string_view kPropertyAttributes[] = {"NAME",           "CLASSORIGIN",    "PROPAGATED", "TYPE",
+                                                    "EmbeddedObject", "EMBEDDEDOBJECT", "ARRAYSIZE",  "xml:lang"};
+constexpr std::string_view kReferenceAttributes[] = {"NAME", "CLASSORIGIN", "PROPAGATED", "REFERENCECLASS"};
 constexpr std::string_view kQualifierAttributes[] = {"NAME",       "TYPE",       "PROPAGATED",   "OVERRIDABLE",
                                                      "TOSUBCLASS", "TOINSTANCE", "TRANSLATABLE", "xml:lang"};
 constexpr std::string_view kDeclarationAttributes[] = {"NAME",       "TYPE",       "ISARRAY",      "OVERRIDABLE",
@@ -71,11 +71,13 @@ template <class Item> void addNew(const XmlElement& element, Array<Item>& items,
 /// A string property whose qualifiers say so holds embedded objects, also where the attribute is missing.
 CIMType embeddedByQualifier(CIMType type, const Array<CIMQualifier>& qualifiers)
 {
+    static const CIMName embeddedObject("EmbeddedObject");
+    static const CIMName embeddedInstance("EmbeddedInstance");
     if (type != CIMTYPE_STRING || qualifiers.size() == 0)
         return type;
-    if (ObjectAccess::isTrue(qualifiers, "EmbeddedObject"))
+    if (ObjectAccess::isTrue(qualifiers, embeddedObject))
         return CIMTYPE_OBJECT;
-    const Uint32 index = ObjectAccess::find(qualifiers, "EmbeddedInstance");
+    const Uint32 index = ObjectAccess::find(qualifiers, embeddedInstance);
     return index != PEG_NOT_FOUND && qualifiers[index].getType() == CIMTYPE_STRING ? CIMTYPE_INSTANCE : type;
 }
 
@@ -238,75 +240,47 @@ CIMQualifierDecl ElementDecoder::decodeQualifierDeclaration(const XmlElement& el
 
 CIMProperty ElementDecoder::decodeProperty(const XmlElement& element)
 {
-    if (element.is("PROPERTY"))
-        return decodeScalarProperty(element);
-    return element.is("PROPERTY.ARRAY") ? decodeArrayProperty(element) : decodeReferenceProperty(element);
-}
-
-CIMProperty ElementDecoder::decodeScalarProperty(const XmlElement& element)
-{
-    std::string_view values[std::size(kPropertyAttributes)];
-    element.attributes(kPropertyAttributes, values);
     const CIMProperty property = ObjectAccess::wrap<CIMProperty>(new CIMPropertyRep());
     CIMPropertyRep& rep = ObjectAccess::rep(property);
-    rep.fName = nameAttribute(element, "NAME", values[0]);
-    const CIMType declared = embeddedType(element, typeAttribute(element, "TYPE", values[1]), values[4], values[5]);
-    rep.fClassOrigin = optionalName(element, "CLASSORIGIN", values[2]);
-    rep.fPropagated = boolAttribute(element, "PROPAGATED", values[3], false);
-    XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
-    const CIMType type = embeddedByQualifier(declared, rep.fQualifiers);
-    if (child.is("VALUE")) {
-        rep.fValue = decodeValue(child, type);
-        child = child.nextSibling();
-    } else {
-        rep.fValue = CIMValue(type, false);
-    }
-    expectEnd(element, child);
+    if (element.is("PROPERTY.REFERENCE"))
+        readReferenceProperty(element, rep);
+    else
+        readTypedProperty(element, element.is("PROPERTY.ARRAY"), rep);
     return property;
 }
 
-CIMProperty ElementDecoder::decodeArrayProperty(const XmlElement& element)
+/// `values` begin with NAME, CLASSORIGIN, PROPAGATED. Returns: the first child that is no qualifier.
+XmlElement ElementDecoder::beginProperty(const XmlElement& element, const std::string_view* values, CIMPropertyRep& rep)
+{
+    rep.fName = nameAttribute(element, "NAME", values[0]);
+    rep.fClassOrigin = optionalName(element, "CLASSORIGIN", values[1]);
+    rep.fPropagated = boolAttribute(element, "PROPAGATED", values[2], false);
+    return decodeQualifiers(element.firstChild(), rep.fQualifiers);
+}
+
+void ElementDecoder::readTypedProperty(const XmlElement& element, bool isArray, CIMPropertyRep& rep)
 {
     std::string_view values[std::size(kPropertyAttributes)];
     element.attributes(kPropertyAttributes, values);
-    const CIMProperty property = ObjectAccess::wrap<CIMProperty>(new CIMPropertyRep());
-    CIMPropertyRep& rep = ObjectAccess::rep(property);
-    rep.fName = nameAttribute(element, "NAME", values[0]);
-    const CIMType declared = embeddedType(element, typeAttribute(element, "TYPE", values[1]), values[4], values[5]);
-    rep.fClassOrigin = optionalName(element, "CLASSORIGIN", values[2]);
-    rep.fPropagated = boolAttribute(element, "PROPAGATED", values[3], false);
-    rep.fArraySize = sizeAttribute(element, values[6]);
-    XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
+    const XmlElement child = beginProperty(element, values, rep);
+    const CIMType declared = embeddedType(element, typeAttribute(element, "TYPE", values[3]), values[4], values[5]);
     const CIMType type = embeddedByQualifier(declared, rep.fQualifiers);
-    if (child.is("VALUE.ARRAY")) {
-        rep.fValue = decodeValue(child, type);
-        child = child.nextSibling();
-    } else {
-        rep.fValue = CIMValue(type, true, rep.fArraySize);
-    }
-    expectEnd(element, child);
-    return property;
+    if (isArray)
+        rep.fArraySize = sizeAttribute(element, values[6]);
+    const bool hasValue = child.is(isArray ? "VALUE.ARRAY" : "VALUE");
+    rep.fValue = hasValue ? decodeValue(child, type) : CIMValue(type, isArray, rep.fArraySize);
+    expectEnd(element, hasValue ? child.nextSibling() : child);
 }
 
-CIMProperty ElementDecoder::decodeReferenceProperty(const XmlElement& element)
+void ElementDecoder::readReferenceProperty(const XmlElement& element, CIMPropertyRep& rep)
 {
     std::string_view values[std::size(kReferenceAttributes)];
     element.attributes(kReferenceAttributes, values);
-    const CIMProperty property = ObjectAccess::wrap<CIMProperty>(new CIMPropertyRep());
-    CIMPropertyRep& rep = ObjectAccess::rep(property);
-    rep.fName = nameAttribute(element, "NAME", values[0]);
-    rep.fReferenceClassName = optionalName(element, "REFERENCECLASS", values[1]);
-    rep.fClassOrigin = optionalName(element, "CLASSORIGIN", values[2]);
-    rep.fPropagated = boolAttribute(element, "PROPAGATED", values[3], false);
-    XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
-    if (child.is("VALUE.REFERENCE")) {
-        rep.fValue = CIMValue(decodeReference(child));
-        child = child.nextSibling();
-    } else {
-        rep.fValue = CIMValue(CIMTYPE_REFERENCE, false);
-    }
-    expectEnd(element, child);
-    return property;
+    const XmlElement child = beginProperty(element, values, rep);
+    rep.fReferenceClassName = optionalName(element, "REFERENCECLASS", values[3]);
+    const bool hasValue = child.is("VALUE.REFERENCE");
+    rep.fValue = hasValue ? CIMValue(decodeReference(child)) : CIMValue(CIMTYPE_REFERENCE, false);
+    expectEnd(element, hasValue ? child.nextSibling() : child);
 }
 
 /// Returns: the first child that is no property.

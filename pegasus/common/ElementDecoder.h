@@ -62,9 +62,9 @@ class ElementDecoder
   private:
     // ElementDecoder.cpp
     CIMProperty decodeProperty(const XmlElement& element);
-    CIMProperty decodeScalarProperty(const XmlElement& element);
-    CIMProperty decodeArrayProperty(const XmlElement& element);
-    CIMProperty decodeReferenceProperty(const XmlElement& element);
+    XmlElement beginProperty(const XmlElement& element, const std::string_view* values, CIMPropertyRep& rep);
+    void readTypedProperty(const XmlElement& element, bool isArray, CIMPropertyRep& rep);
+    void readReferenceProperty(const XmlElement& element, CIMPropertyRep& rep);
     CIMQualifier decodeQualifier(const XmlElement& element);
     CIMMethod decodeMethod(const XmlElement& element);
     CIMParameter decodeParameter(const XmlElement& element);

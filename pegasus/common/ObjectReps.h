@@ -136,7 +136,7 @@ struct ObjectAccess
     }
 
     /// Is there a qualifier of this name, boolean and true?
-    static bool isTrue(const Array<CIMQualifier>& qualifiers, const char* name)
+    static bool isTrue(const Array<CIMQualifier>& qualifiers, const CIMName& name)
     {
         const Uint32 index = find(qualifiers, name);
         return index != PEG_NOT_FOUND && qualifiers[index].getValue() == CIMValue(true);

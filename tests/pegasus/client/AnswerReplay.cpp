@@ -2,7 +2,7 @@
 
 #include "pegasus/client/HttpResponse.h"
 #include "pegasus/client/ResponseReader.h"
-#include "pegasus/common/ElementEncoder.h"
+#include "support/ContentReader.h"
 #include "support/PeerAnswers.h"
 
 #include <Pegasus/Common/CIMDateTime.h>
@@ -20,26 +20,6 @@ std::string nameOf(const std::type_info& type)
     const std::unique_ptr<char, decltype(&std::free)> name(abi::__cxa_demangle(type.name(), nullptr, nullptr, nullptr),
                                                            &std::free);
     return name.get();
-}
-
-void encodeAgain(const wire::XmlElement& element, wire::ElementDecoder& decoder, std::string& out)
-{
-    if (element.is("CLASS"))
-        wire::appendClass(out, decoder.decodeClass(element));
-    else if (element.is("VALUE.NAMEDINSTANCE"))
-        wire::appendNamedInstance(out, decoder.decodeNamedInstance(element));
-    else if (element.is("INSTANCE"))
-        wire::appendInstance(out, decoder.decodeInstance(element));
-    else if (element.is("QUALIFIER.DECLARATION"))
-        wire::appendQualifierDeclaration(out, decoder.decodeQualifierDeclaration(element));
-    else if (element.is("CLASSNAME"))
-        wire::appendClassName(out, decoder.decodeClassName(element));
-    else if (element.is("RETURNVALUE"))
-        wire::appendReturnValue(out, decoder.decodeReturnValue(element));
-    else if (element.is("PARAMVALUE"))
-        wire::appendParamValue(out, decoder.decodeParamValue(element));
-    else
-        wire::appendInstanceName(out, decoder.decodeInstanceName(element));
 }
 
 PeerRequest requestFor(const std::string& method)
