@@ -56,6 +56,12 @@ void readNothing(CIMClientRep& rep, const client::Request& request)
     rep.exchange(request, [](const XmlElement& element, ElementDecoder&) { failUnexpected(element); });
 }
 
+/// OpenPegasus's client gives a null output without its type, whatever type the answer names.
+CIMParamValue asOutput(const CIMParamValue& output)
+{
+    return output.getValue().isNull() ? CIMParamValue(output.getParameterName(), CIMValue(), false) : output;
+}
+
 constexpr bool kReads = true;
 constexpr bool kWrites = false;
 
@@ -213,7 +219,7 @@ CIMValue CIMClient::invokeMethod(const CIMNamespaceName& nameSpace, const CIMObj
                        if (isFirst && element.is("RETURNVALUE"))
                            returnValue = decoder.decodeReturnValue(element);
                        else
-                           outputs.append(decoder.decodeParamValue(element));
+                           outputs.append(asOutput(decoder.decodeParamValue(element)));
                        isFirst = false;
                    });
     outParameters = outputs;

@@ -137,13 +137,41 @@ std::vector<AnswerCase> sampleAnswers()
     };
 }
 
+namespace {
+
+/// Where the bytes of the body are: all behind the header, or what the chunks hold. Requires: sound framing.
+std::vector<std::size_t> bodyBytes(std::string_view answer)
+{
+    std::vector<std::size_t> places;
+    std::size_t at = answer.find("\r\n\r\n") + 4;
+    const bool isChunked = answer.substr(0, at).find("chunked\r\n") != std::string_view::npos;
+    std::size_t size = answer.size() - at;
+    do {
+        if (isChunked) {
+            size = std::stoul(std::string(answer.substr(at, 16)), nullptr, 16);
+            at = answer.find("\r\n", at) + 2;
+        }
+        for (const std::size_t end = at + size; at < end; ++at)
+            places.push_back(at);
+        at += 2;
+    } while (isChunked && size > 0);
+    return places;
+}
+
+} // namespace
+
 std::vector<bool> markupBytes(std::string_view answer)
 {
     std::vector<bool> marks(answer.size(), false);
+    const std::vector<std::size_t> body = bodyBytes(answer);
+    if (body.empty())
+        return marks;
+    // Between the pieces of a body there is nothing but framing, which may not change either.
+    std::fill(marks.begin() + static_cast<std::ptrdiff_t>(body.front()),
+              marks.begin() + static_cast<std::ptrdiff_t>(body.back()), true);
     char quote = 0;
     bool inTag = false;
-    const std::size_t xml = answer.find("<CIM");
-    for (std::size_t i = xml; i < answer.size(); ++i) {
+    for (const std::size_t i : body) {
         const char c = answer[i];
         if (!inTag) {
             inTag = c == '<';

@@ -27,8 +27,8 @@ std::string readAnswer(const AnswerCase& answer, const std::vector<std::size_t>&
 /// Answers with every kind of element, chunks, trailers and errors.
 std::vector<AnswerCase> sampleAnswers();
 
-/// For each byte of the answer: does it belong to the XML's markup (tags without the values of attributes)?
-/// Elsewhere a changed byte may be other data, which nobody can tell.
+/// For each byte of the answer: does it belong to the XML's markup (tags without the values of attributes) or to the
+/// framing of chunks? Elsewhere a changed byte may be other data, which nobody can tell.
 std::vector<bool> markupBytes(std::string_view answer);
 
 } // namespace test

@@ -35,8 +35,6 @@ const std::map<std::string, Deviation>& deviations()
         {"fault-trailer-raw8bit",
          {"EXC Pegasus::CIMException code=1 msg=caf\xC3\xA9", "non-ASCII status text hides the status"}},
         {"fault-401", {"EXC Pegasus::CIMClientHTTPErrorException http=401", "waits for an answer that has come"}},
-        {"invoke-nullin",
-         {"ret uint32 0\n  out both string NULL typed=1\n  out must string ", "forgets the type of a null parameter"}},
         {"fault-p-valuenull-num", {"1 instances", "refuses a null in an array, which the standard has"}},
         {"fault-p-real-inf", {"1 instances", "refuses an infinity, which the standard has"}},
         {"fault-p-real-nan", {"1 instances", "refuses a NaN, which the standard has"}},
@@ -145,6 +143,11 @@ void expectSameRequest(const test::PeerRequest& sent, const test::PeerRequest& r
     EXPECT_EQ(test::canonicalXml(withoutId(sent)), test::canonicalXml(withoutId(recorded)));
 }
 
+int failureCount()
+{
+    return testing::UnitTest::GetInstance()->current_test_info()->result()->total_part_count();
+}
+
 std::string withRecordedId(const std::string& result, const WireCase& wireCase,
                            const std::vector<test::PeerRequest>& requests)
 {
@@ -163,6 +166,7 @@ TEST(WireReplay, EveryRecordedExchangeGivesTheRecordedResult)
     const std::vector<WireCase> cases = test::loadWireCases();
     if (cases.empty())
         GTEST_SKIP() << "no recorded exchanges: configure with -DVRX_VECTORS_DIR=<folder>";
+    std::size_t passed = 0;
     std::size_t replayed = 0;
     std::size_t unsupported = 0;
     for (const WireCase& wireCase : cases) {
@@ -175,13 +179,16 @@ TEST(WireReplay, EveryRecordedExchangeGivesTheRecordedResult)
             continue;
         }
         ++replayed;
+        const int failuresBefore = failureCount();
         const std::vector<test::PeerRequest> requests = peer.requests();
         ASSERT_FALSE(requests.empty()) << result;
         expectSameRequest(requests.front(), wireCase.request);
         if (!wireCase.printed.empty())
             expectPrinted(wireCase, withRecordedId(result, wireCase, requests));
+        passed += failureCount() == failuresBefore ? 1 : 0;
     }
-    std::printf("recorded exchanges: %zu replayed (%zu of them with a listed deviation), %zu of other operations\n",
-                replayed, deviations().size(), unsupported);
-    RecordProperty("replayed", static_cast<int>(replayed));
+    std::printf(
+        "counted: %zu of %zu recorded exchanges give the same objects or exception and the same request (%zu of "
+        "them a listed better one); %zu are of operations that the client does not have\n",
+        passed, replayed, deviations().size(), unsupported);
 }

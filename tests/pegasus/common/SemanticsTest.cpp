@@ -149,8 +149,8 @@ TEST(Semantics, EveryRecordedAnswerIsGivenHereToo)
         EXPECT_EQ(actual, entry.at("expected")) << vector.id << ": " << vector.input;
         passed += actual == entry.at("expected") ? 1 : 0;
     }
-    std::printf("recorded answers: %zu of %zu given here too, %zu not imitated\n", passed, vectors.size(),
-                notImitated().size());
+    std::printf("counted: %zu of %zu recorded answers of the library are given here too; %zu are listed as faults\n",
+                passed, vectors.size(), notImitated().size());
 }
 
 } // namespace test
