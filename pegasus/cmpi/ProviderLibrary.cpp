@@ -1,6 +1,7 @@
 #include "pegasus/cmpi/ProviderLibrary.h"
 
 #include "pegasus/cmpi/Frame.h"
+#include "pegasus/cmpi/Guarded.h"
 #include "pegasus/cmpi/ProviderModule.h"
 #include "pegasus/cmpi/Text.h"
 
@@ -73,23 +74,27 @@ void* ProviderLibrary::createAny(const std::string& kind, const std::string& pro
     using Specific = void* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
     using Generic = void* (*)(const CMPIBroker*, const CMPIContext*, const char*, CMPIStatus*);
 
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    void* made = nullptr;
     std::string name = factoryOf(provider, kind);
-    if (void* specific = symbol(name)) {
-        made = reinterpret_cast<Specific>(specific)(&broker, &context, &status);
-    } else {
+    void* const specific = symbol(name);
+    if (specific == nullptr)
         name = factoryOf(kGeneric, kind);
-        void* generic = symbol(name);
-        if (generic == nullptr)
-            return nullptr;
-        made = reinterpret_cast<Generic>(generic)(&broker, &context, provider.c_str(), &status);
-    }
-    if (made != nullptr && status.rc == CMPI_RC_OK)
-        return made;
+    void* const generic = specific == nullptr ? symbol(name) : nullptr;
+    if (specific == nullptr && generic == nullptr)
+        return nullptr;
+    const auto fail = [&](const char* words) {
+        throw failure("ProviderInitFailure: Error initializing " + fPath + ", provider " + provider + ", " + name +
+                      ": " + words);
+    };
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    const auto create = [&] {
+        return specific != nullptr ? reinterpret_cast<Specific>(specific)(&broker, &context, &status)
+                                   : reinterpret_cast<Generic>(generic)(&broker, &context, provider.c_str(), &status);
+    };
+    void* const made = guarded(create, fail);
     const bool hasText = status.rc != CMPI_RC_OK && status.msg != nullptr && status.msg->hdl != nullptr;
-    throw failure("ProviderInitFailure: Error initializing " + fPath + ", provider " + provider + ", " + name + ": " +
-                  (hasText ? static_cast<const char*>(status.msg->hdl) : "the factory gave no interface"));
+    if (made == nullptr || status.rc != CMPI_RC_OK)
+        fail(hasText ? static_cast<const char*>(status.msg->hdl) : "the factory gave no interface");
+    return made;
 }
 
 std::string findProviderLibrary(const std::vector<std::string>& directories, const std::string& location,

@@ -3,6 +3,7 @@
 #include "pegasus/cmpi/ArgsObject.h"
 #include "pegasus/cmpi/Broker.h"
 #include "pegasus/cmpi/ContextObject.h"
+#include "pegasus/cmpi/Guarded.h"
 #include "pegasus/cmpi/ObjectPathObject.h"
 #include "pegasus/cmpi/ProviderInterfaces.h"
 #include "pegasus/cmpi/ProviderLibrary.h"
@@ -11,9 +12,6 @@
 
 #include <Pegasus/Common/Exception.h>
 
-#include <cxxabi.h>
-
-#include <exception>
 #include <optional>
 
 namespace Pegasus::cmpi {
@@ -87,26 +85,14 @@ class Call
     // Runs the provider's function. What the sink threw goes before what the provider made of it.
     template <class Function, class... Arguments> void run(Function* function, Arguments... arguments) const
     {
-        const CMPIStatus status = guarded([&] { return function(arguments...); });
+        const CMPIStatus status =
+            guarded([&] { return function(arguments...); },
+                    [](const char* words) { throw CIMException(CIM_ERR_FAILED, fromUtf8(words)); });
         fResult.rethrow();
         throwUnlessOk(status);
     }
 
   private:
-    // An exception that a provider in C++ lets out ends its request, not its process.
-    template <class Body> static CMPIStatus guarded(Body&& body)
-    {
-        try {
-            return body();
-        } catch (const abi::__forced_unwind&) { // a thread that is cancelled
-            throw;
-        } catch (const std::exception& error) {
-            throw CIMException(CIM_ERR_FAILED, fromUtf8(error.what()));
-        } catch (...) {
-            throw CIMException(CIM_ERR_FAILED, String("Unknown error."));
-        }
-    }
-
     static CIMObjectPath placed(CIMObjectPath path, const CIMNamespaceName& nameSpace)
     {
         path.setNameSpace(nameSpace);

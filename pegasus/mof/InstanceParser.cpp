@@ -1,6 +1,8 @@
 #include "pegasus/mof/InstanceParser.h"
 #include "pegasus/mof/ValueBuilder.h"
 
+#include <Pegasus/Common/CIMObject.h>
+
 #include <algorithm>
 
 namespace Pegasus::mof {
@@ -12,6 +14,20 @@ bool isGiven(const ParsedInstance& parsed, const CIMName& name)
     const auto isSame = [&name](const OpenReference& reference) { return reference.property.equal(name); };
     return parsed.instance.findProperty(name) != PEG_NOT_FOUND ||
            std::any_of(parsed.open.begin(), parsed.open.end(), isSame);
+}
+
+/// A class that comes from a server may have the types already.
+bool isEmbeddedObject(const CIMConstProperty& declared)
+{
+    return declared.getType() == CIMTYPE_OBJECT ||
+           (declared.getType() == CIMTYPE_STRING && declared.findQualifier(CIMName("EmbeddedObject")) != PEG_NOT_FOUND);
+}
+
+bool isEmbeddedInstance(const CIMConstProperty& declared)
+{
+    return declared.getType() == CIMTYPE_INSTANCE ||
+           (declared.getType() == CIMTYPE_STRING &&
+            declared.findQualifier(CIMName("EmbeddedInstance")) != PEG_NOT_FOUND);
 }
 
 } // namespace
@@ -72,10 +88,54 @@ void InstanceParser::setValue(ParsedInstance& parsed, const CIMConstProperty& de
         parsed.open.push_back({declared.getName(), first.text, fCursor.place(first.offset)});
         return;
     }
+    if (!initializer.isNull() && (isEmbeddedObject(declared) || isEmbeddedInstance(declared))) {
+        parsed.instance.addProperty(CIMProperty(declared.getName(), embeddedValue(initializer, declared), 0, CIMName(),
+                                                declared.getClassOrigin()));
+        return;
+    }
     const ValueType type{declared.getType(), declared.isArray(), declared.getArraySize()};
     parsed.instance.addProperty(
         CIMProperty(declared.getName(), buildValue(fCursor, fCompilation.aliases, initializer, type), type.arraySize,
                     declared.getReferenceClassName(), declared.getClassOrigin()));
+}
+
+CIMValue InstanceParser::embeddedValue(const Initializer& initializer, const CIMConstProperty& declared)
+{
+    if (initializer.isArray != declared.isArray())
+        fCursor.failAt(initializer.offset,
+                       declared.isArray() ? "expected an array" : "expected one value, not an array");
+    Array<CIMInstance> instances;
+    Array<CIMObject> objects;
+    for (const Literal& element : initializer.elements) {
+        instances.append(parseEmbedded(element));
+        objects.append(CIMObject(instances[instances.size() - 1]));
+    }
+    if (isEmbeddedObject(declared))
+        return declared.isArray() ? CIMValue(objects) : CIMValue(objects[0]);
+    return declared.isArray() ? CIMValue(instances) : CIMValue(instances[0]);
+}
+
+/// An embedded instance is a string that holds its MOF (DSP0004, EmbeddedInstance). Each nesting takes longer escapes
+/// for the quotes within, so the length of a string bounds the depth.
+CIMInstance InstanceParser::parseEmbedded(const Literal& literal)
+{
+    if (literal.kind != Literal::Kind::String)
+        fCursor.failAt(literal.offset, "expected a string with the MOF of an instance instead of " + literal.shown());
+    const SourceText text("embedded instance", literal.text);
+    try {
+        TokenCursor cursor(text, fCursor.limits());
+        if (!cursor.skipWord("instance"))
+            cursor.failExpected("'instance'");
+        const ParsedInstance parsed = InstanceParser(cursor, fCompilation).parse();
+        if (!parsed.alias.empty() || !parsed.open.empty())
+            cursor.failAt(0, "an embedded instance has no alias and uses none that is not defined yet");
+        if (cursor.current().kind != TokenKind::End)
+            cursor.failExpected("the end of the string");
+        return parsed.instance;
+    } catch (const MofError& error) {
+        fCursor.failAt(literal.offset, "in the embedded instance, line " + std::to_string(error.place().line) +
+                                           ", column " + std::to_string(error.place().column) + ": " + error.cause());
+    }
 }
 
 } // namespace Pegasus::mof

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "pegasus/mof/Literal.h"
 #include "pegasus/mof/QualifierParser.h"
 
 namespace Pegasus::mof {
@@ -20,6 +21,8 @@ class InstanceParser
     CIMClass parseClass();
     void parseValue(ParsedInstance& parsed);
     void setValue(ParsedInstance& parsed, const CIMConstProperty& declared);
+    CIMValue embeddedValue(const Initializer& initializer, const CIMConstProperty& declared);
+    CIMInstance parseEmbedded(const Literal& literal);
 
     TokenCursor& fCursor;
     Compilation& fCompilation;

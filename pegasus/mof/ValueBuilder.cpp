@@ -200,7 +200,7 @@ CIMValue assembleOther(const TokenCursor& cursor, const Initializer& initializer
     case CIMTYPE_REFERENCE:
         return CIMValue(c.reference(initializer.elements.front()));
     default:
-        cursor.failAt(initializer.offset, "the value of an embedded object cannot be given in MOF");
+        cursor.failAt(initializer.offset, "an embedded object has no default value");
     }
 }
 

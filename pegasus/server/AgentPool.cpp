@@ -53,6 +53,9 @@ AgentPool::~AgentPool()
 
 CimStatus AgentPool::request(const ProviderReference& provider, AgentRequest request, ElementSink& sink)
 {
+    if (provider.interfaceType != "CMPI")
+        fail("Provider module \"" + provider.module + "\" has the interface type " + provider.interfaceType +
+             "; this server loads CMPI modules only.");
     const AgentSettings settings = fMakeSettings();
     request.provider = provider.provider;
     request.library = cmpi::findProviderLibrary(settings.providerDirectories, provider.location, provider.module);

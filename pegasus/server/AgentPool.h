@@ -39,9 +39,9 @@ class AgentPool
     // Carries a request to the provider's agent and its answer's elements to the sink. `request.provider` and
     // `request.library` are filled in here.
     // Returns: the status that the provider gave.
-    // Throws: CIMException with CIM_ERR_FAILED: library not found, agent lost or silent (each names module and cause);
-    // whatever the sink throws.
-    // Blocks: as long as the provider keeps sending, and for the patience of silence.
+    // Throws: CIMException with CIM_ERR_FAILED: no CMPI module, library not found, agent lost or silent (each names
+    // module and cause); whatever the sink throws. Blocks: as long as the provider keeps sending, and for the patience
+    // of silence.
     CimStatus request(const ProviderReference& provider, AgentRequest request, ElementSink& sink);
 
     // Makes every running and future request fail.

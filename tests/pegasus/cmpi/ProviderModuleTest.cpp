@@ -386,6 +386,16 @@ TEST_F(Module, TriesAFailedFactoryAgain)
     EXPECT_EQ(errorOf([&] { invoke("Any", "X", CIMValue(Uint8{1})); }), "16: provider Faulty has no method interface");
 }
 
+TEST_F(Module, SurvivesWhatProvidersInCppThrow)
+{
+    load(FACTORY_LIBRARY, "Exact");
+    EXPECT_EQ(items().size(), 0U);
+    load(FACTORY_LIBRARY, "Throwing");
+    EXPECT_THAT(errorOf([&] { items(); }), HasSubstr("Throwing_Create_InstanceMI: no device: the factory throws"));
+    load(FACTORY_LIBRARY, "Late");
+    EXPECT_EQ(errorOf([&] { items(); }), "1: Unknown error.");
+}
+
 TEST_F(Module, GenericFactoriesGetTheProvidersName)
 {
     load(FAULT_LIBRARY(GENERIC), "AnyName");

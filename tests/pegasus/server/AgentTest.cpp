@@ -153,6 +153,8 @@ TEST_F(AgentTest, anErrorLeavesNothingDelivered)
     EXPECT_EQ(errorOf([&] { countOf("Probe_FailAfter"); }), "CIM_ERR_ACCESS_DENIED: the probe says no: \xc3\xa9");
     EXPECT_EQ(errorOf([&] { countOf("Probe_NoLibrary"); }),
               "CIM_ERR_FAILED: File \"libNoSuchLibrary.so\" was not found for provider module \"NoLibModule\".");
+    EXPECT_EQ(errorOf([&] { countOf("Probe_Cpp"); }), "CIM_ERR_FAILED: Provider module \"CppModule\" has the interface "
+                                                      "type C++Default; this server loads CMPI modules only.");
     const HttpAnswer answer = exchange(
         fTree.port(), intrinsicRequest("EnumerateInstances", "root/probe", classNameParameter("Probe_FailAfter")));
     EXPECT_EQ(answer.body.find("IRETURNVALUE"), std::string::npos);
