@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <regex>
+#include <set>
 
 namespace servertest {
 
@@ -80,6 +81,24 @@ void ReplayFixture::send(const std::string& method, const std::string& nameSpace
     EXPECT_EQ(answer.status, 200) << method << header(answer, "pgerrordetail") << parameters.substr(0, 300);
     EXPECT_EQ(answer.trailers.count("cimstatuscode"), 0u)
         << method << " " << answer.trailers.begin()->second << " " << answer.trailers.rbegin()->second;
+}
+
+void ReplayFixture::declareUsedQualifiers(const std::string& nameSpace, const std::string& body) const
+{
+    static const std::regex use(
+        "<QUALIFIER NAME=\"(\\w+)\" TYPE=\"(\\w+)\"(?: PROPAGATED=\"true\")?([^>]*)>\n(<VALUE.ARRAY>)?");
+    std::set<std::string> declared;
+    for (std::sregex_iterator at(body.begin(), body.end(), use), end; at != end; ++at) {
+        const std::smatch& match = *at;
+        if (declared.insert(match[1]).second)
+            send("SetQualifier", nameSpace,
+                 "<IPARAMVALUE NAME=\"QualifierDeclaration\">\n<QUALIFIER.DECLARATION NAME=\"" + match[1].str() +
+                     "\" TYPE=\"" + match[2].str() + "\" ISARRAY=\"" + (match[4].matched ? "true" : "false") + "\"" +
+                     match[3].str() +
+                     ">\n<SCOPE CLASS=\"true\" ASSOCIATION=\"true\" REFERENCE=\"true\" PROPERTY=\"true\" "
+                     "METHOD=\"true\" "
+                     "PARAMETER=\"true\" INDICATION=\"true\"/>\n</QUALIFIER.DECLARATION>\n</IPARAMVALUE>\n");
+    }
 }
 
 void ReplayFixture::createNamespace(const std::string& name) const

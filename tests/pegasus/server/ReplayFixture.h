@@ -29,6 +29,8 @@ class ReplayFixture : public testing::Test
     void createNamespace(const std::string& name) const;
     // With the recordings' declarations.
     void declareQualifiers(const std::string& nameSpace) const;
+    // As the uses in a body have them.
+    void declareUsedQualifiers(const std::string& nameSpace, const std::string& body) const;
     // From the text of a CLASS element.
     void createClass(const std::string& nameSpace, const std::string& cimClass) const;
     void createClasses(const std::string& nameSpace, const std::string& recordedAnswer,

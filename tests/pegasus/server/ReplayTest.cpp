@@ -41,15 +41,40 @@ TEST_F(ReplayTest, compilations)
 TEST_F(ReplayTest, schema)
 {
     createRecordedSchema();
-    for (const char* name :
-         {"enumclasses",        "enumclasses-deep",     "enumclassnames-deep",    "enumqualifiers",
-          "getclass-alltypes",  "getclass-badns",       "getclass-base",          "getclass-case",
-          "getclass-embedded",  "getclass-localonly",   "getclass-methods",       "getclass-noqual",
-          "getclass-plugin",    "getclass-proplist",    "getclass-unknown",       "getqualifier",
-          "getqualifier-case",  "getqualifier-unknown", "getqualifier-values",    "enuminst-unknown",
-          "enuminst-unreg",     "invoke-badns",         "invoke-noprovider",      "createclass-nokeysuper",
-          "createclass-exists", "createinstance-repo",  "createinstance-badprop", "enumqualifiers-empty",
-          "execquery"})
+    createNamespace("test/TestProvider");
+    declareUsedQualifiers("test/TestProvider", RecordedExchange("getclass-dmtf-assoc").answer.body);
+    createClasses("test/TestProvider", "getclass-dmtf-assoc");
+    expectRecorded("getclass-dmtf-assoc");
+    for (const char* name : {"enumclasses",
+                             "enumclasses-deep",
+                             "enumclassnames-deep",
+                             "enumqualifiers",
+                             "getclass-alltypes",
+                             "getclass-badns",
+                             "getclass-base",
+                             "getclass-case",
+                             "getclass-embedded",
+                             "getclass-localonly",
+                             "getclass-methods",
+                             "getclass-noqual",
+                             "getclass-plugin",
+                             "getclass-proplist",
+                             "getclass-unknown",
+                             "getqualifier",
+                             "getqualifier-case",
+                             "getqualifier-unknown",
+                             "getqualifier-values",
+                             "enuminst-unknown",
+                             "enuminst-unreg",
+                             "invoke-badns",
+                             "invoke-noprovider",
+                             "createclass",
+                             "createclass-nokeysuper",
+                             "createclass-exists",
+                             "createinstance-repo",
+                             "createinstance-badprop",
+                             "enumqualifiers-empty",
+                             "execquery"})
         expectRecorded(name);
 }
 
