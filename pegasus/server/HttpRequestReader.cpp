@@ -12,6 +12,8 @@ namespace http = boost::beast::http;
 struct HttpRequestParser::Impl
 {
     http::request_parser<http::string_body> parser;
+    std::size_t maxHeadBytes = 0;
+    std::size_t headBytes = 0; // parsed so far
 };
 
 namespace {
@@ -57,20 +59,39 @@ void resolveExtension(HttpRequest& request)
 
 HttpRequestParser::HttpRequestParser(const HttpLimits& limits) : fImpl(std::make_unique<Impl>())
 {
-    fImpl->parser.eager(true);
+    fImpl->maxHeadBytes = limits.maxHeaderBytes;
     fImpl->parser.header_limit(static_cast<std::uint32_t>(std::min<std::size_t>(limits.maxHeaderBytes, 1u << 30)));
     fImpl->parser.body_limit(limits.maxBodyBytes);
 }
 
 HttpRequestParser::~HttpRequestParser() = default;
 
-std::size_t HttpRequestParser::put(std::string_view bytes)
+std::size_t HttpRequestParser::parse(std::string_view bytes)
 {
     boost::system::error_code error;
     const std::size_t taken = fImpl->parser.put(boost::asio::const_buffer(bytes.data(), bytes.size()), error);
     if (error && error != http::error::need_more)
         failFor(error);
     return taken;
+}
+
+// The head is parsed by itself and counted: Beast's own limit starts anew with every piece in which a head arrives.
+std::size_t HttpRequestParser::putHead(std::string_view bytes)
+{
+    const std::size_t taken = parse(bytes);
+    fImpl->headBytes += taken;
+    if (fImpl->headBytes + (isHeaderDone() ? 0 : bytes.size() - taken) > fImpl->maxHeadBytes)
+        failFor(http::error::header_limit);
+    fImpl->parser.eager(isHeaderDone());
+    return taken;
+}
+
+std::size_t HttpRequestParser::put(std::string_view bytes)
+{
+    const std::size_t head = isHeaderDone() ? 0 : putHead(bytes);
+    if (!isHeaderDone() || isDone() || head == bytes.size())
+        return head;
+    return head + parse(bytes.substr(head));
 }
 
 bool HttpRequestParser::isHeaderDone() const

@@ -36,6 +36,9 @@ class HttpRequestParser
     HttpRequest take();
 
   private:
+    std::size_t parse(std::string_view bytes);
+    std::size_t putHead(std::string_view bytes);
+
     struct Impl;
     std::unique_ptr<Impl> fImpl;
 };
