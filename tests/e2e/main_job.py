@@ -13,6 +13,7 @@ import unittest
 from tree import Tree, wait_until
 
 BUILD = sys.argv[1] if len(sys.argv) > 1 else None
+SOURCE = os.path.dirname(os.path.dirname(os.path.dirname(os.path.abspath(__file__))))
 COMPLETE, FAILED, PARTIAL, INTERRUPTED = 0, 1, 3, 130
 
 
@@ -147,15 +148,32 @@ class VendorExample(TreeTest):
     """The commands of docs/vendors.md, as they stand there."""
 
     def test_worked_example(self):
-        source = os.path.dirname(os.path.dirname(os.path.dirname(os.path.abspath(__file__))))
-        with open(os.path.join(source, "docs", "vendors.md"), encoding="utf-8") as file:
+        with open(os.path.join(SOURCE, "docs", "vendors.md"), encoding="utf-8") as file:
             commands = re.search(r"```sh\n(.*?)```", file.read(), re.DOTALL).group(1)
         commands = commands.replace("cmake --install build/release --prefix build/example", ":")
         commands = commands.replace("build/example", self.tree.root).replace("lamps-example", self.tree.consumer)
-        shown = subprocess.run(commands, shell=True, cwd=source, capture_output=True, text=True, timeout=120, check=False)
+        shown = subprocess.run(commands, shell=True, cwd=SOURCE, capture_output=True, text=True, timeout=120, check=False)
         self.assertEqual((shown.returncode, shown.stderr), (0, ""))
         self.assertIn("power", shown.stdout)
         self.assertIn("disk", shown.stdout)
+        self.assert_nothing_left()
+
+
+class Consumer(TreeTest):
+    """A host of its own project, built against the installed headers, runs the main job."""
+
+    def test_tiny_host(self):
+        build = self.tree.path("tiny-host")
+        subprocess.run(["cmake", "-S", os.path.join(SOURCE, "tests", "consumer"), "-B", build, "-G", "Ninja",
+                        f"-DCMAKE_PREFIX_PATH={self.tree.root}"], check=True, stdout=subprocess.DEVNULL, timeout=120)
+        subprocess.run(["cmake", "--build", build], check=True, stdout=subprocess.DEVNULL, timeout=300)
+        subprocess.run([self.tree.path("pegasus", "bin", "cimconfig"), "-s", f"consumer={self.tree.consumer}", "-p"],
+                       check=True, stdout=subprocess.DEVNULL, timeout=60)
+        shown = subprocess.run([os.path.join(build, "tiny_host"), self.tree.consumer], cwd=self.tree.root,
+                               capture_output=True, text=True, timeout=120, check=False)
+        self.assertEqual(shown.returncode, 0, shown.stderr)
+        counts = dict(line.rsplit(" ", 1) for line in shown.stdout.splitlines())
+        self.assertEqual(int(counts["LNX_NetworkPort"]), len(interfaces()))
         self.assert_nothing_left()
 
 

@@ -1,0 +1,74 @@
+"""The commands of README.md: each line of its sh blocks is run as it stands, in this tree, or skipped with a reason.
+
+Usage: papers.py BUILD_DIRECTORY
+"""
+import os
+import re
+import subprocess
+import sys
+import unittest
+
+from tree import Tree
+
+BUILD = sys.argv[1] if len(sys.argv) > 1 else None
+SOURCE = os.path.dirname(os.path.dirname(os.path.dirname(os.path.abspath(__file__))))
+RUN_SECONDS = 300
+
+SKIPPED = {
+    "./tools/test": "this test is part of it",
+    "cpack --config build/release/CPackConfig.cmake": "tools/check package runs it",
+    "dpkg -i build/release/package/pegasus-nsp_0.1.0_amd64.deb": "needs root; tools/check package looks into the package",
+}
+
+
+def commands():
+    with open(os.path.join(SOURCE, "README.md"), encoding="utf-8") as file:
+        for block in re.findall(r"```sh\n(.*?)```", file.read(), re.DOTALL):
+            for line in block.splitlines():
+                yield re.sub(r"\s+#.*", "", line)
+
+
+class Readme(unittest.TestCase):
+    def setUp(self):
+        self.tree = Tree(BUILD)
+        self.addCleanup(self.tree.remove)
+        if os.path.realpath(BUILD) != os.path.join(SOURCE, "build", "release"):
+            self.skipTest("README.md is about build/release")
+
+    def installed_pegasus(self):
+        """What an installed OpenPegasus looks like to the build, of the embedded stack's parts."""
+        root = self.tree.path("installed")
+        os.mkdir(root)
+        os.symlink(os.path.join(SOURCE, "pegasus", "include"), os.path.join(root, "include"))
+        for name in ("lib", "bin"):
+            os.symlink(self.tree.path("pegasus", name), os.path.join(root, name))
+        return root
+
+    def runnable(self, command):
+        if command.startswith("cmake --install"):
+            return command.replace("--prefix R", "--prefix " + self.tree.path("R"))
+        if "/opt/pegasus" in command:
+            return command.replace("/opt/pegasus", self.installed_pegasus()) + " -B " + self.tree.path("build")
+        if command == "./tools/run":
+            return command + " --consumer " + self.tree.consumer
+        return command
+
+    def test_commands(self):
+        seen = list(commands())
+        self.assertLessEqual({"./tools/run", *SKIPPED}, set(seen))
+        for command in seen:
+            if command in SKIPPED:
+                print(f"skipped: {command}: {SKIPPED[command]}", file=sys.stderr)
+                continue
+            with self.subTest(command):
+                done = subprocess.run(self.runnable(command), shell=True, cwd=SOURCE, capture_output=True, text=True,
+                                      timeout=RUN_SECONDS, check=False)
+                self.assertEqual(done.returncode, 0, done.stdout + done.stderr)
+                if command == "./tools/run":
+                    self.assertIn("LNX_Processor", done.stdout)
+        self.assertTrue(os.path.exists(self.tree.path("R", "libpegasus.nsp.so")))
+        self.assertEqual(self.tree.leftovers(), [])
+
+
+if __name__ == "__main__":
+    unittest.main(argv=[sys.argv[0], *sys.argv[2:]], verbosity=2)
