@@ -103,7 +103,7 @@ class TPropertyTransfer
 boost::shared_ptr<TPEGASUSInstance> BuildInstance(TPEGASUSClass& instanceClass, const Pegasus::CIMInstance& source,
                                                   const std::string& operation)
 {
-    const auto target = boost::dynamic_pointer_cast<TPEGASUSInstance>(instanceClass.AllocateInstance({}));
+    auto target = boost::dynamic_pointer_cast<TPEGASUSInstance>(instanceClass.AllocateInstance({}));
     for (Pegasus::Uint32 i = 0; i < source.getPropertyCount(); ++i) {
         const Pegasus::CIMConstProperty property = source.getProperty(i);
         TPropertyTransfer transfer(instanceClass, source, property);

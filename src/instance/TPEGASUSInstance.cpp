@@ -22,7 +22,7 @@ boost::shared_ptr<ICIMParameterDecl> ParameterDeclOf(const ICIMClass& instanceCl
                                                      const std::string& parameter)
 {
     const auto methodDecl = instanceClass.GetMethodDecl(method, {});
-    const auto parameterDecl = methodDecl ? methodDecl->GetParameterDecl(parameter, {}) : nullptr;
+    auto parameterDecl = methodDecl ? methodDecl->GetParameterDecl(parameter, {}) : nullptr;
     if (!parameterDecl)
         throw TVRXException(TVRXStatusCode::kNotFound);
     return parameterDecl;
@@ -86,7 +86,7 @@ TCIMValue TPEGASUSInstance::InvokeMethod(const std::string& name, TCIMContext& p
         LogProgress("pegClient->invokeMethod returned exception: ", ToStdString(exception.getMessage()));
         return TCIMValue();
     }
-    const TCIMValue result = MethodValueToHost(name, returned, instanceClass);
+    TCIMValue result = MethodValueToHost(name, returned, instanceClass);
     const auto logOutput = [](const std::string& output) { LogProgress("adding output param : ", output); };
     AddOutputs(outputs, instanceClass, logOutput, parameters);
     return result;

@@ -116,7 +116,7 @@ std::string TPEGASUSNamespace::filterTag4classes(const std::string& entry, std::
     const auto rightBracket = entry.find(']');
     const auto tagStart = entry.find("%^");
     const auto tagEnd = entry.find("^%");
-    const std::string name = entry.substr(0, std::min(leftBracket, tagStart));
+    std::string name = entry.substr(0, std::min(leftBracket, tagStart));
     if (rightBracket != kNone && leftBracket < rightBracket)
         tags[kTimeOutTag] = entry.substr(leftBracket + 1, rightBracket - leftBracket - 1);
     if (tagEnd != kNone && tagStart != kNone && tagStart + 2 < tagEnd) {

@@ -52,6 +52,8 @@ boost::shared_ptr<ICIMNamespace> NamespaceFromContext(const TCIMContext& context
         entry->second.GetType() != TCIMValue::TCIMType::kUint64)
         return nullptr;
     const unsigned long address = entry->second;
+    // The host passes a pointer as a number.
+    // NOLINTNEXTLINE(performance-no-int-to-ptr)
     const auto* pointer = reinterpret_cast<const boost::shared_ptr<ICIMNamespace>*>(address);
     return pointer ? *pointer : nullptr;
 }

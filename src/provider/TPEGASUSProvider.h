@@ -13,8 +13,8 @@
 #include "src/common/ClientConnection.h"
 
 // CMPI's own names for a broker and a call context.
-struct _CMPIBroker;
-struct _CMPIContext;
+struct _CMPIBroker;  // NOLINT(bugprone-reserved-identifier)
+struct _CMPIContext; // NOLINT(bugprone-reserved-identifier)
 
 namespace NKOLVRX20 {
 

@@ -57,7 +57,7 @@ void TPEGASUSClass::EnumeratePropertyDecls(TPropertyDeclVisitor visitor, TCIMCon
 
 boost::shared_ptr<ICIMProperty> TPEGASUSClass::GetProperty(const std::string& name, TCIMContext) const
 {
-    const auto property = FindDeclared(fProperties, name);
+    auto property = FindDeclared(fProperties, name);
     if (!property)
         throw TVRXException(TVRXStatusCode::kUnknownProperty);
     return property;

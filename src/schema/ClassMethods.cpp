@@ -26,7 +26,7 @@ TCIMValue TPEGASUSClass::InvokeMethod(const TCIMReference& target, const std::st
     Pegasus::Array<Pegasus::CIMParamValue> pegOutputs;
     const Pegasus::CIMValue returned =
         ConnectedClient(*LockNamespace()).invokeMethod(fPegasusNsp, path, method, pegInputs, pegOutputs);
-    const TCIMValue result = MethodValueToHost(name, returned, shared_from_this());
+    TCIMValue result = MethodValueToHost(name, returned, shared_from_this());
     AddOutputs(
         pegOutputs, shared_from_this(), [](const std::string&) {}, outputs);
     return result;

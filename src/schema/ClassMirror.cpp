@@ -99,7 +99,7 @@ boost::shared_ptr<ICIMQualifierDecl> TClassMirror::FetchDeclaration(const Pegasu
         const TCIMValue defaultValue = source.getValue().isNull()
                                            ? TCIMValue(pegTypeToVRXType(source.getType(), source.isArray()), 0)
                                            : ValueOf(source, name);
-        const auto declaration = fNamespace.AllocateQualifierDecl(
+        auto declaration = fNamespace.AllocateQualifierDecl(
             NameOf(source), defaultValue, ScopeFromText(ToStdString(source.getScope().toString())),
             FlavorFromText(ToStdString(source.getFlavor().toString())), {});
         fNamespace.AddQualifierDecl(boost::dynamic_pointer_cast<TPEGASUSQualifierDecl>(declaration));

@@ -120,7 +120,7 @@ class TDisplayRules
         const auto place = Place(value);
         if (place && *place < fValues.size())
             return fValues[*place];
-        const std::string bits = IsInteger(value) ? BitText(value) : "";
+        std::string bits = IsInteger(value) ? BitText(value) : "";
         if (!bits.empty())
             return bits;
         return fUnit.empty() || !IsNumber(value) ? PlainText(value) : PlainText(value) + " " + fUnit;
@@ -194,6 +194,7 @@ std::vector<std::string> DisplayTexts(const TCIMValue& value, const boost::share
     if (declaration)
         rules.emplace(*declaration);
     std::vector<std::string> texts;
+    texts.reserve(elements.size());
     for (const TCIMValue& element : elements)
         texts.push_back(rules && !element.IsNull() ? rules->Text(element) : PlainText(element));
     return texts;

@@ -48,7 +48,7 @@ class TQualifiedElement : public TInterface, public boost::enable_shared_from_th
 
     boost::shared_ptr<ICIMQualifier> GetQualifier(const std::string& name, bool& found, TCIMContext) const override
     {
-        const auto qualifier = fQualifiers.Find(name);
+        auto qualifier = fQualifiers.Find(name);
         found = qualifier != nullptr;
         return qualifier;
     }
