@@ -1,0 +1,37 @@
+#ifndef VRX_SOAK_FAULTS_H
+#define VRX_SOAK_FAULTS_H
+
+#include <chrono>
+#include <functional>
+
+#include <sys/types.h>
+
+namespace soak {
+
+// What is done to a process of the tree, and when.
+enum class EFault
+{
+    kNone,
+    kAgentKilled,     // between two calls
+    kAgentKilledBusy, // during an enumeration
+    kAgentSlow,       // stands still for a while, within the class's time-out
+    kAgentStalled,    // stands still for longer than that
+    kServerKilled,
+    kServerKilledBusy
+};
+constexpr EFault kFaults[] = {
+    EFault::kNone,         EFault::kAgentKilled,     EFault::kAgentSlow,       EFault::kServerKilled,
+    EFault::kAgentStalled, EFault::kAgentKilledBusy, EFault::kServerKilledBusy};
+
+const char* NameOf(EFault fault);
+bool IsServerFault(EFault fault);
+// Whether the call that it hits must give the whole answer all the same.
+bool IsHarmless(EFault fault);
+
+// Does it to the process (the agent, or the server for a server's fault) while the call runs or just before it.
+// Blocks: until both have ended.
+void Inject(EFault fault, pid_t process, const std::function<void()>& call);
+
+} // namespace soak
+
+#endif

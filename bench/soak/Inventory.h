@@ -1,0 +1,49 @@
+#ifndef VRX_SOAK_INVENTORY_H
+#define VRX_SOAK_INVENTORY_H
+
+#include <map>
+#include <string>
+
+#include <boost/shared_ptr.hpp>
+#include <host/ICIMNamespace.h>
+
+#include <sys/types.h>
+
+namespace soak {
+
+enum class EAnswer
+{
+    kRight,
+    kLess, // nothing, or a part of it: what a fault may cost
+    kWrong
+};
+
+// What a host asks of a namespace, and whether the answers are those that the vendors of the soak give.
+// Lets go of everything that came from the plug-in when it is destroyed.
+// Thread: one at a time.
+class TInventory
+{
+  public:
+    explicit TInventory(NKOLVRX20::ICIMNamespace& ns);
+
+    // The instances of the probe: every one once, with its values.
+    EAnswer EnumerateProbe();
+    // A text through the probe and back.
+    EAnswer InvokeEcho(const std::string& text);
+    // This machine's processors.
+    EAnswer EnumerateProcessors();
+
+    // Returns: the process that runs the probe's library; 0 when it does not answer.
+    pid_t ProbeProcess();
+
+  private:
+    boost::shared_ptr<NKOLVRX20::ICIMClass> FindClass(const std::string& name);
+
+    NKOLVRX20::ICIMNamespace& fNamespace;
+    std::map<std::string, boost::shared_ptr<NKOLVRX20::ICIMClass>> fClasses;
+    boost::shared_ptr<NKOLVRX20::ICIMInstance> fProbe; // one of those enumerated; methods are called on it
+};
+
+} // namespace soak
+
+#endif
