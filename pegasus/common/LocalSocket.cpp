@@ -1,5 +1,6 @@
 #include "pegasus/common/LocalSocket.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdio>
 #include <cstdlib>
@@ -92,7 +93,8 @@ int connectLocalSocket(const std::string& home, int timeoutMs)
 {
     const Descriptor folder(openHome(home));
     Descriptor socket(newSocket(home));
-    const timeval limit{timeoutMs / 1000, (timeoutMs % 1000) * 1000};
+    const int bound = std::max(timeoutMs, 1); // 0 would mean for ever
+    const timeval limit{bound / 1000, (bound % 1000) * 1000};
     if (::setsockopt(socket.get(), SOL_SOCKET, SO_SNDTIMEO, &limit, sizeof(limit)) < 0)
         fail("cannot set the time-out of", home);
     if (connectRetrying(socket.get(), addressIn(folder.get())) < 0)

@@ -1,5 +1,5 @@
-// Every public name used as a user's program would use it, through the public headers only. That it compiles and links
-// is most of the test.
+// The public classes as a user's program sees them: what is derived from what, values of every type, handles that are
+// shared. ApiNames.cpp has every name.
 #include <Pegasus/Client/CIMClient.h>
 
 #include <gtest/gtest.h>
@@ -37,31 +37,6 @@ static_assert(kIsDirectException<IndexOutOfBoundsException> && kIsDirectExceptio
 static_assert(!is_copy_constructible_v<CIMClient> && !is_polymorphic_v<CIMClient>);
 static_assert(!is_constructible_v<CIMClass, CIMConstClass> && is_constructible_v<CIMConstClass, CIMClass>);
 static_assert(!is_convertible_v<CIMObject, CIMInstance> && is_constructible_v<CIMInstance, CIMObject>);
-
-// ---- the operations, with their default arguments; never called
-
-[[maybe_unused]] void useOperations(CIMClient& client)
-{
-    client.connect("localhost", 5988, String::EMPTY, String::EMPTY);
-    client.connectLocal();
-    client.setTimeout(client.getTimeout());
-    const CIMClass cimClass = client.getClass("root/cimv2", "CIM_X");
-    client.getClass("root/cimv2", "CIM_X", false, true, false, CIMPropertyList());
-    const CIMInstance instance = client.getInstance("root/cimv2", CIMObjectPath("CIM_X.K=1"));
-    const Array<CIMInstance> instances = client.enumerateInstances("root/cimv2", "CIM_X");
-    client.enumerateInstances("root/cimv2", "CIM_X", false, true, false, false, CIMPropertyList());
-    const Array<CIMObjectPath> paths = client.enumerateInstanceNames("root/cimv2", "CIM_X");
-    const Array<CIMClass> classes = client.enumerateClasses("root/cimv2");
-    const Array<CIMName> names = client.enumerateClassNames("root/cimv2", CIMName(), true);
-    const CIMQualifierDecl declaration = client.getQualifier("root/cimv2", "Key");
-    const Array<CIMQualifierDecl> declarations = client.enumerateQualifiers("root/cimv2");
-    client.setQualifier("root/cimv2", declaration);
-    client.createClass("root/cimv2", cimClass);
-    const CIMObjectPath created = client.createInstance("root/cimv2", instance);
-    Array<CIMParamValue> outputs;
-    const CIMValue result = client.invokeMethod("root/cimv2", created, "M", Array<CIMParamValue>(), outputs);
-    client.disconnect();
-}
 
 // ---- every kind of value there and back
 

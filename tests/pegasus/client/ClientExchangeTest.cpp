@@ -10,6 +10,11 @@
 #include <filesystem>
 #include <gtest/gtest.h>
 #include <memory>
+#include <netinet/in.h>
+#include <poll.h>
+#include <stdexcept>
+#include <sys/socket.h>
+#include <unistd.h>
 
 using namespace Pegasus;
 using test::PeerAnswer;
@@ -58,6 +63,17 @@ template <class Call> std::string outcome(Call&& call)
             abi::__cxa_demangle(typeid(exception).name(), nullptr, nullptr, nullptr), &std::free);
         return std::string(name.get()) + ": " + std::string(exception.getMessage().getCString());
     }
+}
+
+/// What the call throws, when it takes the time-out's time.
+template <class Call> std::string outcomeInTime(Call&& call)
+{
+    const auto start = std::chrono::steady_clock::now();
+    const std::string result = outcome(call);
+    const auto took = std::chrono::steady_clock::now() - start;
+    EXPECT_GE(took, std::chrono::milliseconds(kShortTimeoutMs));
+    EXPECT_LT(took, std::chrono::milliseconds(kTimeoutMs));
+    return result;
 }
 
 PeerAnswer good(const PeerRequest& request)
@@ -201,15 +217,83 @@ TEST(ClientDeadline, BoundsEveryWaitAndTheNextCallWorks)
         test::ScriptedPeer peer(model.handler());
         CIMClient client;
         connect(client, peer, kShortTimeoutMs);
-        const auto start = std::chrono::steady_clock::now();
-        EXPECT_EQ(getClassOutcome(client), "Pegasus::ConnectionTimeoutException: connection timed out");
-        const auto waited = std::chrono::steady_clock::now() - start;
-        EXPECT_GE(waited, std::chrono::milliseconds(kShortTimeoutMs));
-        EXPECT_LT(waited, std::chrono::milliseconds(kTimeoutMs));
+        EXPECT_EQ(outcomeInTime([&] { client.getClass(kNameSpace, "T_Fan"); }),
+                  "Pegasus::ConnectionTimeoutException: connection timed out");
         client.setTimeout(kTimeoutMs);
         EXPECT_EQ(getClassOutcome(client), "ok");
         EXPECT_EQ(peer.connectionCount(), 2u);
     }
+}
+
+namespace {
+
+/// A server that is there but never accepts: the kernel takes as many connections and bytes as it keeps room for.
+class DeafServer
+{
+  public:
+    DeafServer()
+    {
+        sockaddr_in address{};
+        address.sin_family = AF_INET;
+        address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
+        socklen_t size = sizeof(address);
+        auto* generic = reinterpret_cast<sockaddr*>(&address);
+        if (::bind(fListener, generic, size) < 0 || ::getsockname(fListener, generic, &size) < 0 ||
+            ::listen(fListener, 0) < 0)
+            throw std::runtime_error("cannot listen");
+        fAddress = address;
+    }
+    ~DeafServer()
+    {
+        for (const int fd : fWaiting)
+            ::close(fd);
+        ::close(fListener);
+    }
+    DeafServer(const DeafServer&) = delete;
+    DeafServer& operator=(const DeafServer&) = delete;
+
+    Uint32 port() const { return ntohs(fAddress.sin_port); }
+    /// Connects until a connection is not taken any more. Returns: whether it came to that.
+    bool fill()
+    {
+        for (int tries = 0; tries < 16; ++tries) {
+            const int fd = ::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0);
+            fWaiting.push_back(fd);
+            (void)::connect(fd, reinterpret_cast<const sockaddr*>(&fAddress), sizeof(fAddress));
+            pollfd entry{fd, POLLOUT, 0};
+            if (::poll(&entry, 1, 100) == 0)
+                return true;
+        }
+        return false;
+    }
+
+  private:
+    int fListener = ::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0);
+    sockaddr_in fAddress{};
+    std::vector<int> fWaiting;
+};
+
+} // namespace
+
+TEST(ClientDeadline, BoundsConnectingAndSendingToo)
+{
+    DeafServer server;
+    CIMClient client;
+    client.setTimeout(kShortTimeoutMs);
+    client.connect("127.0.0.1", server.port(), String(), String());
+    CIMClass big("T_Big");
+    big.addQualifier(CIMQualifier("Description", String(std::string(16 << 20, 'x').c_str())));
+    EXPECT_EQ(outcomeInTime([&] { client.createClass(kNameSpace, big); }),
+              "Pegasus::ConnectionTimeoutException: connection timed out");
+
+    ASSERT_TRUE(server.fill());
+    const std::string refused =
+        "Pegasus::CannotConnectException: Cannot connect to 127.0.0.1:" + std::to_string(server.port()) +
+        ". Connection failed.";
+    EXPECT_EQ(outcomeInTime([&] { client.getClass(kNameSpace, "T_Fan"); }), refused) << "reconnecting";
+    CIMClient other;
+    other.setTimeout(kShortTimeoutMs);
+    EXPECT_EQ(outcomeInTime([&] { other.connect("127.0.0.1", server.port(), String(), String()); }), refused);
 }
 
 TEST(ClientDeadline, OfZeroEndsAtOnce)

@@ -9,8 +9,10 @@
 #include <poll.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
+#include <system_error>
 #include <thread>
 #include <unistd.h>
+#include <vector>
 
 using namespace Pegasus;
 
@@ -79,6 +81,24 @@ TEST_F(LocalSocketTest, ClientReachesItAndNamesItsUser)
     } catch (const CannotConnectException& exception) {
         EXPECT_EQ(exception.getMessage(), "Cannot connect to local CIM server. Connection failed.");
     }
+}
+
+TEST_F(LocalSocketTest, ConnectingIsBoundedWithNoTimeLeftToo)
+{
+    const int listener = wire::listenLocalSocket(fHome, 0);
+    std::vector<int> waiting;
+    for (bool isFull = false; !isFull;) { // the kernel takes a few that nobody accepts
+        try {
+            waiting.push_back(wire::connectLocalSocket(fHome, waiting.empty() ? 1000 : 0));
+        } catch (const std::system_error&) {
+            isFull = true;
+        }
+        ASSERT_LT(waiting.size(), 100u);
+    }
+    EXPECT_FALSE(waiting.empty());
+    for (const int fd : waiting)
+        ::close(fd);
+    ::close(listener);
 }
 
 TEST_F(LocalSocketTest, SocketFileLeftOverIsReplaced)
