@@ -278,7 +278,8 @@ void benchOverlap()
     address.host = "127.0.0.1";
     address.port = peer.port();
     client::Connection connection;
-    connection.open(address, client::Deadline(10000));
+    connection.setAddress(address);
+    connection.open(client::Deadline(10000));
     client::Request request = client::IntrinsicRequest("EnumerateInstances", kNameSpace, true).finish();
     const std::string message = client::encodeMessage(request, "1000", address.text(), {});
     Cost overlapped;

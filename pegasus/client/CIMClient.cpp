@@ -10,12 +10,6 @@ using client::IntrinsicRequest;
 using wire::ElementDecoder;
 using wire::XmlElement;
 
-[[noreturn]] void failMissing(const char* method, const char* element)
-{
-    throw CIMClientXmlException(String("Validation error: expected ERROR or IRETURNVALUE element with ") + element +
-                                " (" + method + " answer)");
-}
-
 void failUnexpected(const XmlElement& element)
 {
     element.fail(wire::XmlError::Kind::Invalid,
@@ -24,19 +18,18 @@ void failUnexpected(const XmlElement& element)
 
 /// An operation whose result is one object. An answer that says success without a result gives an uninitialised one.
 template <class T>
-T readOne(CIMClientRep& rep, const client::Request& request, const char* elementName,
+T readOne(CIMClientRep& rep, client::Request request, const char* elementName,
           T (ElementDecoder::*decode)(const XmlElement&))
 {
     T result;
     bool found = false;
-    const bool saidSuccess = rep.exchange(request, [&](const XmlElement& element, ElementDecoder& decoder) {
+    request.result = elementName;
+    rep.exchange(request, [&](const XmlElement& element, ElementDecoder& decoder) {
         if (found)
             failUnexpected(element);
         result = (decoder.*decode)(element);
         found = true;
     });
-    if (!found && !saidSuccess)
-        failMissing(request.method.c_str(), elementName);
     return result;
 }
 

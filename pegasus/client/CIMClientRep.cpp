@@ -125,7 +125,9 @@ void CIMClientRep::connect(const client::ServerAddress& address)
 {
     if (fAddress)
         throw AlreadyConnectedException();
-    fConnection.open(address, Deadline(fTimeoutMs));
+    const Deadline deadline(fTimeoutMs);
+    fConnection.setAddress(address);
+    fConnection.open(deadline);
     fAddress = address;
 }
 
@@ -135,12 +137,12 @@ void CIMClientRep::disconnect()
     fAddress.reset();
 }
 
-bool CIMClientRep::exchange(const client::Request& request, const ContentHandler& onContent)
+void CIMClientRep::exchange(const client::Request& request, const ContentHandler& onContent)
 {
     if (!fAddress)
         throw NotConnectedException();
     try {
-        return exchangeOnce(request, onContent);
+        exchangeOnce(request, onContent);
     } catch (const CIMException&) {
         throw; // an answer like any other; the connection is still good
     } catch (const wire::XmlError& error) {
@@ -155,12 +157,12 @@ bool CIMClientRep::exchange(const client::Request& request, const ContentHandler
     }
 }
 
-bool CIMClientRep::exchangeOnce(const client::Request& request, const ContentHandler& onContent)
+void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHandler& onContent)
 {
     const Deadline deadline(fTimeoutMs);
     if (fTimeoutMs == 0)
         throw ConnectionTimeoutException();
-    const client::ExpectedResponse expected{nextMessageId(), request.method, request.isIntrinsic};
+    const client::ExpectedResponse expected{nextMessageId(), request.method, request.isIntrinsic, request.result};
     const std::string message = client::encodeMessage(request, expected.messageId, fAddress->text(),
                                                       fAddress->isLocal ? localUser() : std::string());
     if (fConnection.isOpen() && fConnection.isStale())
@@ -184,7 +186,7 @@ bool CIMClientRep::exchangeOnce(const client::Request& request, const ContentHan
         reader.finish();
         if (reader.error() && reader.error()->getCode() != CIM_ERR_SUCCESS)
             throw *reader.error();
-        return reader.error().has_value();
+        return;
     }
 }
 
@@ -192,7 +194,7 @@ CIMClientRep::Outcome CIMClientRep::sendAndReceive(const std::string& message, H
                                                    const Deadline& deadline)
 {
     if (!fConnection.isOpen())
-        fConnection.open(*fAddress, deadline);
+        fConnection.open(deadline);
     // A server that closes while it is sent to may have answered all the same.
     if (fConnection.send(message, deadline) == Result::TimedOut)
         throw ConnectionTimeoutException();

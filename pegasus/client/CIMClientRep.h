@@ -34,9 +34,9 @@ class CIMClientRep
 
     /// Sends the request and gives each element of the result to `onContent`. Whatever goes wrong, the connection is
     /// closed and the next call opens a new one.
-    /// Returns: whether an ERROR element said success, so that there is no result.
+    /// An ERROR element that says success is an answer without a result.
     /// Throws: what CIMClient's operations throw.
-    bool exchange(const client::Request& request, const ContentHandler& onContent);
+    void exchange(const client::Request& request, const ContentHandler& onContent);
 
   private:
     enum class Outcome
@@ -45,7 +45,7 @@ class CIMClientRep
         NothingReceived ///< the server closed the connection before it answered
     };
 
-    bool exchangeOnce(const client::Request& request, const ContentHandler& onContent);
+    void exchangeOnce(const client::Request& request, const ContentHandler& onContent);
     Outcome sendAndReceive(const std::string& message, client::HttpResponse& response,
                            const client::Deadline& deadline);
     Outcome receive(client::HttpResponse& response, const client::Deadline& deadline);

@@ -18,18 +18,12 @@
 namespace Pegasus::client {
 namespace {
 
-struct FreeAddresses
-{
-    void operator()(addrinfo* list) const { ::freeaddrinfo(list); }
-};
-using Addresses = std::unique_ptr<addrinfo, FreeAddresses>;
-
 String toString(const std::string& text)
 {
     return String(text.c_str());
 }
 
-Addresses resolve(const ServerAddress& address)
+std::shared_ptr<addrinfo> lookUp(const ServerAddress& address)
 {
     addrinfo hints{};
     hints.ai_family = AF_UNSPEC;
@@ -38,7 +32,7 @@ Addresses resolve(const ServerAddress& address)
     addrinfo* list = nullptr;
     if (::getaddrinfo(address.host.c_str(), std::to_string(address.port).c_str(), &hints, &list) != 0)
         throw InvalidLocatorException(toString(address.text()));
-    return Addresses(list);
+    return {list, ::freeaddrinfo};
 }
 
 /// Returns: the result of the connection attempt that is under way, 0 or an errno.
@@ -61,20 +55,25 @@ std::string ServerAddress::text() const
     return isLocal ? std::string() : host + ":" + std::to_string(port);
 }
 
-void Connection::open(const ServerAddress& address, const Deadline& deadline)
+void Connection::setAddress(const ServerAddress& address)
+{
+    fCandidates = address.isLocal ? nullptr : lookUp(address);
+    fAddress = address;
+}
+
+void Connection::open(const Deadline& deadline)
 {
     close();
     fHasReceived = false;
-    if (address.isLocal)
+    if (fAddress.isLocal)
         openLocal(deadline);
     else
-        openTcp(address, deadline);
+        openTcp(deadline);
 }
 
-void Connection::openTcp(const ServerAddress& address, const Deadline& deadline)
+void Connection::openTcp(const Deadline& deadline)
 {
-    const Addresses addresses = resolve(address);
-    for (const addrinfo* candidate = addresses.get(); candidate; candidate = candidate->ai_next) {
+    for (const addrinfo* candidate = fCandidates.get(); candidate; candidate = candidate->ai_next) {
         fFd = ::socket(candidate->ai_family, candidate->ai_socktype | SOCK_CLOEXEC | SOCK_NONBLOCK, 0);
         if (fFd < 0)
             continue;
@@ -88,7 +87,7 @@ void Connection::openTcp(const ServerAddress& address, const Deadline& deadline)
         }
         close();
     }
-    throw CannotConnectException(toString("Cannot connect to " + address.text() + ". Connection failed."));
+    throw CannotConnectException(toString("Cannot connect to " + fAddress.text() + ". Connection failed."));
 }
 
 void Connection::openLocal(const Deadline& deadline)

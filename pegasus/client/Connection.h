@@ -6,8 +6,11 @@
 #include <Pegasus/Common/String.h>
 
 #include <cstddef>
+#include <memory>
 #include <string>
 #include <string_view>
+
+struct addrinfo;
 
 namespace Pegasus::client {
 
@@ -38,9 +41,11 @@ class Connection
     Connection(const Connection&) = delete;
     Connection& operator=(const Connection&) = delete;
 
-    /// Throws: InvalidLocatorException, CannotConnectException, ConnectionTimeoutException (the deadline had passed
-    /// before a connection was tried). Looking up a host name is bounded by the resolver's own settings.
-    void open(const ServerAddress& address, const Deadline& deadline);
+    /// Where open() goes from now on. A host name is looked up here and not again, because nothing but the resolver's
+    /// own settings bounds that. Throws: InvalidLocatorException.
+    void setAddress(const ServerAddress& address);
+    /// Throws: CannotConnectException, also when the deadline passes. Requires: setAddress().
+    void open(const Deadline& deadline);
     void close();
     bool isOpen() const { return fFd >= 0; }
     /// Has the server ever sent anything on it?
@@ -54,9 +59,11 @@ class Connection
 
   private:
     Result waitFor(short events, const Deadline& deadline) const;
-    void openTcp(const ServerAddress& address, const Deadline& deadline);
+    void openTcp(const Deadline& deadline);
     void openLocal(const Deadline& deadline);
 
+    ServerAddress fAddress;
+    std::shared_ptr<addrinfo> fCandidates; ///< what a host name was looked up to; null for the private socket
     int fFd = -1;
     bool fHasReceived = false;
 };

@@ -21,6 +21,7 @@ struct Request
     bool isIntrinsic = true;
     /// May it be sent again when the answer was lost? True for what only reads.
     bool isRepeatable = false;
+    std::string_view result; ///< the element that an answer without an error has; empty when it may have none
 };
 
 /// An intrinsic operation, parameter by parameter (DSP0200). Parameters with their default value are left out.

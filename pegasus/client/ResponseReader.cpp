@@ -149,6 +149,7 @@ void ResponseReader::slice(const XmlElement& element)
             element.fail(Kind::Invalid, "Expected open of " + std::string(kLevels[fDepth]) + " element");
         element.fail(Kind::Invalid, "unexpected " + std::string(element.name()) + " element");
     }
+    fHasContent = true;
     fOnContent(element, fDecoder);
 }
 
@@ -173,6 +174,9 @@ void ResponseReader::finish()
     fSlicer.finish();
     if (!fHasResponse)
         throw wire::XmlError(Kind::Invalid, fSlicer.place(), "expected IMETHODRESPONSE or METHODRESPONSE element");
+    if (!fExpected.result.empty() && !fHasContent && !fError)
+        throw wire::XmlError(Kind::Invalid, fSlicer.place(),
+                             "expected ERROR or IRETURNVALUE element with " + std::string(fExpected.result));
 }
 
 } // namespace Pegasus::client

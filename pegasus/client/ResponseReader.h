@@ -20,6 +20,7 @@ struct ExpectedResponse
     std::string messageId;
     std::string method;
     bool isIntrinsic = true;
+    std::string_view result{}; ///< the element that must be in it; empty when there may be none
 };
 
 /// Reads the CIM-XML answer to one request while it arrives.
@@ -57,6 +58,7 @@ class ResponseReader : private wire::XmlSliceHandler
     std::size_t fDepth = 0;
     bool fHasResponse = false;
     bool fHasReturnValue = false;
+    bool fHasContent = false;
     std::optional<CIMException> fError;
     wire::XmlSlicer fSlicer;
 };
