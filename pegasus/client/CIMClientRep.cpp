@@ -1,5 +1,6 @@
 #include "pegasus/client/CIMClientRep.h"
 
+#include "pegasus/common/AsciiCase.h"
 #include "pegasus/common/NumberText.h"
 #include "pegasus/common/StringRep.h"
 
@@ -7,7 +8,6 @@
 
 #include <atomic>
 #include <pwd.h>
-#include <strings.h>
 #include <unistd.h>
 
 namespace Pegasus {
@@ -49,11 +49,6 @@ std::string localUser()
     if (::getpwuid_r(::geteuid(), &entry, buffer, sizeof(buffer), &found) != 0 || !found)
         return std::to_string(::geteuid());
     return found->pw_name;
-}
-
-bool equalNoCase(std::string_view x, std::string_view y)
-{
-    return x.size() == y.size() && ::strncasecmp(x.data(), y.data(), x.size()) == 0;
 }
 
 /// The next word of a Content-Type: a token, a quoted text without its quotes, or one of the separators.

@@ -1,11 +1,11 @@
 #include "pegasus/client/HttpResponse.h"
 
+#include "pegasus/common/AsciiCase.h"
+
 #include <Pegasus/Client/CIMClientException.h>
 
 #include <boost/asio/buffer.hpp>
 #include <boost/beast/http/basic_parser.hpp>
-
-#include <strings.h>
 
 namespace Pegasus::client {
 namespace {
@@ -23,7 +23,7 @@ std::string toStd(BeastView text)
 
 bool isNamed(BeastView name, std::string_view expected)
 {
-    return name.size() == expected.size() && ::strncasecmp(name.data(), expected.data(), expected.size()) == 0;
+    return equalNoCase(std::string_view(name.data(), name.size()), expected);
 }
 
 [[noreturn]] void throwMalformed(const std::string& cause = std::string())

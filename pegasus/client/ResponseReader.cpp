@@ -1,12 +1,12 @@
 #include "pegasus/client/ResponseReader.h"
 
+#include "pegasus/common/AsciiCase.h"
 #include "pegasus/common/NumberText.h"
 #include "pegasus/common/StringRep.h"
 
 #include <Pegasus/Client/CIMClientException.h>
 
 #include <algorithm>
-#include <strings.h>
 
 namespace Pegasus::client {
 namespace {
@@ -34,11 +34,6 @@ constexpr std::string_view kIntrinsicMethods[] = {
     "References",          "SetProperty",
     "SetQualifier",
 };
-
-bool equalNoCase(std::string_view x, std::string_view y)
-{
-    return x.size() == y.size() && ::strncasecmp(x.data(), y.data(), x.size()) == 0;
-}
 
 [[noreturn]] void throwResponse(const std::string& text)
 {

@@ -1,10 +1,9 @@
 #include "pegasus/common/ElementDecoder.h"
 
+#include "pegasus/common/AsciiCase.h"
 #include "pegasus/common/NumberText.h"
 #include "pegasus/common/ObjectReps.h"
 #include "pegasus/common/StringRep.h"
-
-#include <strings.h>
 
 namespace Pegasus::wire {
 namespace {
@@ -117,9 +116,9 @@ bool ElementDecoder::boolAttribute(const XmlElement& element, std::string_view a
 {
     if (value.data() == nullptr)
         return ifMissing;
-    if (value.size() == 4 && ::strncasecmp(value.data(), "true", 4) == 0)
+    if (equalNoCase(value, "true"))
         return true;
-    if (value.size() == 5 && ::strncasecmp(value.data(), "false", 5) == 0)
+    if (equalNoCase(value, "false"))
         return false;
     failIllegal(element, attribute);
 }

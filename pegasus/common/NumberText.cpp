@@ -1,5 +1,7 @@
 #include "pegasus/common/NumberText.h"
 
+#include "pegasus/common/AsciiCase.h"
+
 #include <charconv>
 #include <cmath>
 #include <limits>
@@ -53,17 +55,6 @@ bool isRealShape(std::string_view text)
     text.remove_prefix(1);
     takeSign(text);
     return !takeDigits(text).empty() && text.empty();
-}
-
-bool equalNoCase(std::string_view text, std::string_view lower)
-{
-    if (text.size() != lower.size())
-        return false;
-    for (std::size_t i = 0; i < text.size(); ++i) {
-        if ((text[i] | 0x20) != lower[i])
-            return false;
-    }
-    return true;
 }
 
 template <class Real> std::optional<Real> parseNamed(std::string_view text)

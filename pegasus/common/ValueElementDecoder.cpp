@@ -1,20 +1,15 @@
+#include "pegasus/common/AsciiCase.h"
 #include "pegasus/common/CIMValueRep.h"
 #include "pegasus/common/ElementDecoder.h"
 #include "pegasus/common/NumberText.h"
 #include "pegasus/common/StringRep.h"
 
 #include <limits>
-#include <strings.h>
 
 namespace Pegasus::wire {
 namespace {
 
 using Kind = XmlError::Kind;
-
-bool equalNoCase(std::string_view text, std::string_view word)
-{
-    return text.size() == word.size() && ::strncasecmp(text.data(), word.data(), word.size()) == 0;
-}
 
 /// "Uint8", from "uint8".
 template <class T> std::string typeWord()

@@ -1,10 +1,10 @@
 #include "pegasus/common/XmlText.h"
 
+#include "pegasus/common/AsciiCase.h"
 #include "pegasus/common/Utf8.h"
 
 #include <algorithm>
 #include <cstdint>
-#include <strings.h>
 
 namespace Pegasus::wire {
 namespace {
@@ -91,11 +91,6 @@ std::string_view pseudoAttribute(std::string_view declaration, std::string_view 
         return std::string_view();
     const std::size_t end = declaration.find(declaration[at], at + 1);
     return end == std::string_view::npos ? std::string_view() : declaration.substr(at + 1, end - at - 1);
-}
-
-bool equalNoCase(std::string_view x, std::string_view y)
-{
-    return x.size() == y.size() && ::strncasecmp(x.data(), y.data(), x.size()) == 0;
 }
 
 } // namespace
