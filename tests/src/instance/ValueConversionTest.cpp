@@ -108,8 +108,18 @@ std::vector<TRow> Rows()
     same("string[]", PegArray<String>({String("a"), String()}),
          HostArray(TType::kString, {std::string("a"), std::string()}));
     same("datetime[]", PegArray<CIMDateTime>({CIMDateTime(kTime)}), HostArray(TType::kDatetime, {TCIMDateTime(kTime)}));
-    same("uint32[] empty", PegArray<Uint32>({}), HostArray(TType::kUint32, {}));
+    same("boolean[] empty", PegArray<Boolean>({}), HostArray(TType::kBoolean, {}));
+    same("uint8[] empty", PegArray<Uint8>({}), HostArray(TType::kUint8, {}));
+    same("sint8[] empty", PegArray<Sint8>({}), HostArray(TType::kSint8, {}));
     add("uint16[] empty", PegArray<Uint16>({}), HostArray(TType::kUint16, {}), PegArray<Uint8>({}));
+    add("sint16[] empty", PegArray<Sint16>({}), HostArray(TType::kSint16, {}), PegArray<Sint8>({}));
+    same("uint32[] empty", PegArray<Uint32>({}), HostArray(TType::kUint32, {}));
+    same("sint32[] empty", PegArray<Sint32>({}), HostArray(TType::kSint32, {}));
+    same("uint64[] empty", PegArray<Uint64>({}), HostArray(TType::kUint64, {}));
+    same("sint64[] empty", PegArray<Sint64>({}), HostArray(TType::kSint64, {}));
+    same("real32[] empty", PegArray<Real32>({}), HostArray(TType::kReal32, {}));
+    same("real64[] empty", PegArray<Real64>({}), HostArray(TType::kReal64, {}));
+    same("char16[] empty", PegArray<Char16>({}), HostArray(TType::kChar16, {}));
     same("string[] empty", PegArray<String>({}), HostArray(TType::kString, {}));
     same("datetime[] empty", PegArray<CIMDateTime>({}), HostArray(TType::kDatetime, {}));
     return rows;

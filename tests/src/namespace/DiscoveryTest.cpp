@@ -144,8 +144,12 @@ TEST_F(DiscoveryTest, ATooLargeFileCostsItsOwnProviderOnly)
     const std::string large = fRig.WriteProvider("acme", "a.classes.xml", "<vrx/>");
     ASSERT_EQ(0, ::truncate(large.c_str(), static_cast<off_t>(kMaxRequestedClassFileBytes) + 1));
     const std::string good = fRig.WriteProvider("acme", "b.classes.xml", "<vrx/>");
-    const auto ns = fRig.MakeNamespaceWithConsumer();
-    EXPECT_EQ(42U, StatusOf([&] { ns->FindProviders(); })); // no server to connect the good one to
+    const TFakeCimServer refusing;
+    fRig.OfferPortOf(refusing);
+    const auto ns = fRig.MakeNamespace();
+    ns->Initialize(fRig.Context());
+    fRig.fLog.Take();
+    EXPECT_EQ(42U, StatusOf([&] { ns->FindProviders(); })); // nothing to connect the good one to
     ASSERT_EQ(1U, ns->GetProvidersContainer().size());
     EXPECT_EQ(good, ns->GetProvidersContainer().front()->GetPath());
     EXPECT_THAT(fRig.fLog.LinesWith("0|").front(), "0|" + std::string(TVRXException(4).what()));
@@ -176,6 +180,7 @@ TEST_F(DiscoveryTest, SplitsARequestedEntry)
         {"CIM_Foo[1[2]3]", "CIM_Foo", "1[2", nullptr},
         {"CIM_Foo[1][2]", "CIM_Foo", "1", nullptr},
         {"CIM_Foo%^^%", "CIM_Foo", "-", nullptr},
+        {"CIM_Foo%^a%^b^%c^%", "CIM_Foo", "-", "a%^b"},
         {"CIM_Foo%^%", "CIM_Foo", "-", nullptr},
         {"CIM_Foo^%CDM%^", "CIM_Foo^%CDM", "-", nullptr},
         {"CIM_Foo%^CDM", "CIM_Foo", "-", nullptr},

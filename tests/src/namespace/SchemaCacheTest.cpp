@@ -123,11 +123,14 @@ TEST_F(SchemaCacheTest, AsksForAllPropertiesWithQualifiers)
 {
     fServer.AnswerClass("A", "");
     fNamespace->GetClass("A", {{"nsp", "root/acme"}});
-    const std::string body = fServer.LastBody("GetClass A");
-    EXPECT_NE(std::string::npos, body.find("<IPARAMVALUE NAME=\"LocalOnly\">\n<VALUE>FALSE</VALUE>")) << body;
-    EXPECT_EQ(std::string::npos, body.find("IncludeQualifiers")) << "true is the default: " << body;
-    EXPECT_EQ(std::string::npos, body.find("PropertyList")) << body;
-    EXPECT_NE(std::string::npos, body.find("<NAMESPACE NAME=\"acme\"/>")) << body;
+    const auto bodies = fServer.Bodies("GetClass A");
+    EXPECT_EQ(2U, bodies.size()); // for the cache, and for the class itself
+    for (const std::string& body : bodies) {
+        EXPECT_NE(std::string::npos, body.find("<IPARAMVALUE NAME=\"LocalOnly\">\n<VALUE>FALSE</VALUE>")) << body;
+        for (const char* byDefault : {"IncludeQualifiers", "IncludeClassOrigin", "PropertyList"}) // true, false, all
+            EXPECT_EQ(std::string::npos, body.find(byDefault)) << body;
+        EXPECT_NE(std::string::npos, body.find("<NAMESPACE NAME=\"acme\"/>")) << body;
+    }
 }
 
 TEST_F(SchemaCacheTest, AnswersTheRootWordAndTheEmptyNameBeforeAnythingElse)
@@ -252,6 +255,13 @@ TEST_F(SchemaCacheTest, AClassThatCannotBeEnteredIsANullClass)
                 ElementsAre("3|TPEGASUSNamespace: class B already defined"));
     EXPECT_EQ("3|Catching exeption: AllocateClass  --- B  \twith reason: " + std::string(TVRXException(16).what()),
               fRig.fLog.Take().back());
+    fServer.AnswerClass("C", ""); // an exception of another family costs the same
+    fRig.fLog.FailOn("AllocateClass  --> C");
+    ::testing::internal::CaptureStdout();
+    EXPECT_EQ(nullptr, fNamespace->GetClass("C", {}));
+    ::testing::internal::GetCapturedStdout();
+    EXPECT_THAT(fRig.fLog.Take().back(),
+                ::testing::StartsWith("3|Catching exeption: AllocateClass  --- C  \twith reason: "));
 }
 
 TEST_F(SchemaCacheTest, AServerWhoseClassesInheritInACircleIsAnsweredInTheEnd)

@@ -158,6 +158,9 @@ TEST_F(StartUpTest, AnUnconnectedNamespaceAnswersEveryQuestion)
     EXPECT_EQ(nullptr, ns->AllocateClass("CIM_Any", boost::shared_ptr<ICIMClass>(), {}));
     EXPECT_THROW(ns->GetQualifierDecl("Key", {}), boost::bad_weak_ptr);
     EXPECT_EQ(TPEGASUSNamespaceProvider::GetInstance(), ns->GetNamespaceProvider({}));
+    const ICIMNamespace& same = *ns; // copies nothing
+    EXPECT_EQ(ns.get(), &(*ns = same));
+    EXPECT_EQ("root/cimv2", ns->GetName());
 }
 
 TEST_F(StartUpTest, ExceptionsOfOtherFamiliesLeaveAtOnce)

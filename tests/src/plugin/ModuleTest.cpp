@@ -18,6 +18,7 @@
 #include <host/INamespaceProviderManager.h>
 #include <host/IProvider.h>
 #include <host/PluginSymbols.h>
+#include <host/TConfig.h>
 #include <host/TRootObject.h>
 
 #include "src/support/CapturedLog.h"
@@ -91,7 +92,11 @@ class ModuleTest : public ::testing::Test
         std::filesystem::current_path(fRoot.Path());
         fWorld.fFiles["/lsi_mr.conf"] = "";
     }
-    ~ModuleTest() override { std::filesystem::current_path("/"); }
+    ~ModuleTest() override
+    {
+        std::filesystem::current_path("/");
+        TConfig::GetInstance()->Clear();
+    }
 
     std::unique_ptr<TFakeCimServer> StartServer()
     {
@@ -165,6 +170,7 @@ TEST_F(ModuleTest, LeavesNothingBehindHoweverOftenItIsLoaded)
     TDeployedModule module("acme");
     for (int round = 0; round < 50; ++round) {
         SCOPED_TRACE(round);
+        TConfig::GetInstance()->setValue("pegasus_multi_thread", round % 2 == 0 ? "on" : "off");
         auto server = StartServer();
         module.Load();
         ASSERT_EQ(1, CountInstances(module)) << ::testing::PrintToString(fLog.Lines());

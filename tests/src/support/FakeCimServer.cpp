@@ -61,12 +61,14 @@ long TFakeCimServer::Count(const std::string& request) const
     return std::count(names.begin(), names.end(), request);
 }
 
-std::string TFakeCimServer::LastBody(const std::string& request) const
+std::vector<std::string> TFakeCimServer::Bodies(const std::string& request) const
 {
-    const std::vector<test::PeerRequest> requests = fPeer.requests();
-    const auto last = std::find_if(requests.rbegin(), requests.rend(),
-                                   [&request](const auto& candidate) { return NameOf(candidate) == request; });
-    return last == requests.rend() ? "" : last->body;
+    std::vector<std::string> bodies;
+    for (const test::PeerRequest& asked : fPeer.requests()) {
+        if (NameOf(asked) == request)
+            bodies.push_back(asked.body);
+    }
+    return bodies;
 }
 
 test::PeerAnswer TFakeCimServer::Respond(const test::PeerRequest& request)

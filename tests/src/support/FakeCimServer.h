@@ -35,8 +35,8 @@ class TFakeCimServer
     std::vector<std::string> Requests() const;
     // Returns: how often this was asked.
     long Count(const std::string& request) const;
-    // Returns: the body of the last request of that name; empty when there was none.
-    std::string LastBody(const std::string& request) const;
+    // Returns: the bodies of the requests of that name.
+    std::vector<std::string> Bodies(const std::string& request) const;
 
   private:
     test::PeerAnswer Respond(const test::PeerRequest& request);
