@@ -3,6 +3,7 @@
 
 #include <Pegasus/Client/CIMClient.h>
 
+#include <atomic>
 #include <chrono>
 #include <csignal>
 #include <cxxabi.h>
@@ -14,7 +15,9 @@
 #include <poll.h>
 #include <stdexcept>
 #include <sys/socket.h>
+#include <thread>
 #include <unistd.h>
+#include <vector>
 
 using namespace Pegasus;
 using test::PeerAnswer;
@@ -388,6 +391,31 @@ TEST(ClientConnection, SocketsAreCloseOnExecAndBrokenOnesRaiseNoSignal)
     big.addQualifier(CIMQualifier("Description", String(std::string(8 << 20, 'x').c_str())));
     for (int call = 0; call < 3; ++call)
         EXPECT_NE(outcome([&] { client.createClass(kNameSpace, big); }), "ok");
+}
+
+TEST(ClientThreads, ClientsOfTheirOwnAndObjectsInCommon)
+{
+    test::ServedModel model;
+    model.addClass(kNameSpace, fanClass());
+    test::ScriptedPeer peer(model.handler());
+    const CIMClass common = fanClass();
+    const CIMValue null(CIMTYPE_STRING, false);
+    std::atomic<unsigned> equal{0};
+    std::vector<std::thread> threads;
+    for (int thread = 0; thread < 4; ++thread) {
+        threads.emplace_back([&, copy = common] {
+            CIMClient client;
+            connect(client, peer);
+            for (int call = 0; call < 50; ++call) {
+                const CIMClass read = client.getClass(kNameSpace, "T_Fan", false);
+                equal += read.identical(copy) && read.getProperty(0).getValue() == null ? 1 : 0;
+            }
+        });
+    }
+    for (std::thread& thread : threads)
+        thread.join();
+    EXPECT_EQ(equal, 200u);
+    EXPECT_EQ(peer.connectionCount(), 4u);
 }
 
 TEST(ClientMethods, OutputsReplaceWhatWasThereAndNullsHaveNoType)
