@@ -29,6 +29,8 @@ constexpr const char* kNameSpace = "root/cimv2";
 /// Far more than any of these calls needs, far less than a hang.
 constexpr Uint32 kTimeoutMs = 10000;
 constexpr Uint32 kShortTimeoutMs = 200;
+/// Even a busy machine and a sanitizer do not make a call last that long.
+constexpr std::chrono::minutes kHang(2);
 
 CIMClass fanClass()
 {
@@ -75,7 +77,7 @@ template <class Call> std::string outcomeInTime(Call&& call)
     const std::string result = outcome(call);
     const auto took = std::chrono::steady_clock::now() - start;
     EXPECT_GE(took, std::chrono::milliseconds(kShortTimeoutMs));
-    EXPECT_LT(took, std::chrono::milliseconds(kTimeoutMs));
+    EXPECT_LT(took, kHang);
     return result;
 }
 
@@ -289,7 +291,7 @@ TEST(ClientDeadline, BoundsConnectingAndSendingToo)
     client.setTimeout(kShortTimeoutMs);
     client.connect("127.0.0.1", server.port(), String(), String());
     CIMClass big("T_Big");
-    big.addQualifier(CIMQualifier("Description", String(std::string(16 << 20, 'x').c_str())));
+    big.addQualifier(CIMQualifier("Description", String(std::string(8 << 20, 'x').c_str())));
     EXPECT_EQ(outcomeInTime([&] { client.createClass(kNameSpace, big); }),
               "Pegasus::ConnectionTimeoutException: connection timed out");
 
