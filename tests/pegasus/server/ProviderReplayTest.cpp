@@ -13,7 +13,7 @@
 namespace servertest {
 namespace {
 
-// An exchange whose provider has the instances of another one's answer, or that fails.
+// An exchange, and where its provider's instances come from.
 struct ExchangeRow
 {
     const char* name;
