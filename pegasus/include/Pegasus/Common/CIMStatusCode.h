@@ -6,7 +6,8 @@
 PEGASUS_NAMESPACE_BEGIN
 
 /// Status codes of CIM operations (DSP0200); 18 and 19 are not used.
-enum CIMStatusCode
+// The type is given so that a server's code that is none of these can be held, too.
+enum CIMStatusCode : Uint32
 {
     CIM_ERR_SUCCESS = 0,
     CIM_ERR_FAILED = 1,
