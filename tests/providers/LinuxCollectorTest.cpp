@@ -50,84 +50,58 @@ std::string shown(const Record& record, const std::string& name)
     return value == nullptr ? "<null>" : std::visit(Shown(), *value);
 }
 
-struct Expected
+std::vector<std::pair<std::string, std::string>> pairs(const std::string& text)
 {
-    const char* property;
-    const char* value;
-};
-
-void expectProperties(const Record& record, const std::vector<Expected>& expected)
-{
-    for (const Expected& row : expected)
-        EXPECT_EQ(shown(record, row.property), row.value) << record.className() << '.' << row.property;
+    std::vector<std::pair<std::string, std::string>> found;
+    std::istringstream lines(text);
+    for (std::string line; std::getline(lines, line, '|');)
+        found.emplace_back(line.substr(0, line.find('=')), line.substr(line.find('=') + 1));
+    return found;
 }
 
-void addPort(FixtureTree& fixture, const std::string& name,
-             const std::vector<std::pair<std::string, std::string>>& files)
+// Expected is "Property=value|Property=value...".
+void expectProperties(const Record& record, const std::string& expected)
 {
-    for (const auto& [file, text] : files)
-        fixture.file("/sys/class/net/" + name + "/" + file, text);
+    for (const auto& [name, value] : pairs(expected))
+        EXPECT_EQ(shown(record, name), value) << record.className() << '.' << name;
+}
+
+// Files is "name=line|name=line...".
+void addFiles(FixtureTree& fixture, const std::string& folder, const std::string& files)
+{
+    for (const auto& [file, text] : pairs(files))
+        fixture.file(folder + "/" + file, text + "\n");
 }
 
 TEST(NetworkPorts, ReadWhatTheKernelShows)
 {
     FixtureTree fixture;
-    addPort(fixture, "eth0",
-            {{"address", "02:fc:00:aa:bb:01\n"},
-             {"mtu", "1400\n"},
-             {"operstate", "up\n"},
-             {"speed", "10000\n"},
-             {"duplex", "full\n"},
-             {"type", "1\n"},
-             {"carrier", "1\n"},
-             {"flags", "0x1003\n"},
-             {"ifindex", "4\n"},
-             {"statistics/rx_bytes", "18446744073709551615\n"},
-             {"statistics/tx_errors", "7\n"}});
-    addPort(fixture, "lo",
-            {{"address", "00:00:00:00:00:00\n"},
-             {"mtu", "65536\n"},
-             {"operstate", "unknown\n"},
-             {"type", "772\n"},
-             {"flags", "0x8\n"},
-             {"speed", "-1\n"}});
+    addFiles(fixture, "/sys/class/net/eth0",
+             "address=02:fc:00:aa:bb:01|mtu=1400|operstate=up|speed=10000|duplex=full|type=1|carrier=1|flags=0x1003|"
+             "ifindex=4|statistics/rx_bytes=18446744073709551615|statistics/tx_errors=7");
+    addFiles(fixture, "/sys/class/net/lo",
+             "address=00:00:00:00:00:00|mtu=65536|operstate=unknown|type=772|flags=0x8|speed=-1");
     fixture.file("/sys/class/net/bonding_masters", "bond0\n");
 
     const std::vector<Record> ports = networkPorts(fixture.tree());
     ASSERT_EQ(ports.size(), 2U);
-    expectProperties(ports[0], {{"DeviceID", "eth0"},
-                                {"MACAddress", "02:fc:00:aa:bb:01"},
-                                {"MACOctets", "2,252,0,170,187,1"},
-                                {"PermanentAddress", "02FC00AABB01"},
-                                {"NetworkAddresses", "02FC00AABB01"},
-                                {"ActiveMaximumTransmissionUnit", "1400"},
-                                {"LinkState", "6"},
-                                {"LinkTechnology", "2"},
-                                {"CarrierDetected", "true"},
-                                {"EnabledState", "2"},
-                                {"NegotiatedSpeed", "10000"},
-                                {"Speed", "10000000000"},
-                                {"FullDuplex", "true"},
-                                {"InterfaceFlags", "4099"},
-                                {"BytesReceived", "18446744073709551615"},
-                                {"TransmitErrors", "7"},
-                                {"BytesTransmitted", "<null>"}});
-    expectProperties(ports[1], {{"DeviceID", "lo"},
-                                {"OtherLinkTechnology", "loopback"},
-                                {"LinkState", "0"},
-                                {"CarrierDetected", "<null>"},
-                                {"EnabledState", "3"},
-                                {"NegotiatedSpeed", "-1"},
-                                {"Speed", "<null>"}});
+    expectProperties(
+        ports[0],
+        "DeviceID=eth0|MACAddress=02:fc:00:aa:bb:01|MACOctets=2,252,0,170,187,1|PermanentAddress=02FC00AABB01|"
+        "NetworkAddresses=02FC00AABB01|ActiveMaximumTransmissionUnit=1400|LinkState=6|LinkTechnology=2|CarrierDetected="
+        "true|EnabledState=2|NegotiatedSpeed=10000|Speed=10000000000|FullDuplex=true|InterfaceFlags=4099|BytesReceived="
+        "18446744073709551615|TransmitErrors=7|BytesTransmitted=<null>");
+    expectProperties(ports[1], "DeviceID=lo|OtherLinkTechnology=loopback|LinkState=0|CarrierDetected=<null>|"
+                               "EnabledState=3|NegotiatedSpeed=-1|Speed=<null>");
 }
 
 TEST(NetworkPorts, OddAddressesStayText)
 {
     for (const char* address : {"0", "02:fc:0", "02:fc:00:", "zz:00:00:00:00:00", "02-fc-00-00-00-01", ":::::"}) {
         FixtureTree fixture;
-        addPort(fixture, "x0", {{"address", address}});
+        addFiles(fixture, "/sys/class/net/x0", std::string("address=") + address);
         expectProperties(networkPorts(fixture.tree()).at(0),
-                         {{"MACAddress", address}, {"MACOctets", "<null>"}, {"PermanentAddress", "<null>"}});
+                         std::string("MACAddress=") + address + "|MACOctets=<null>|PermanentAddress=<null>");
     }
 }
 
@@ -147,20 +121,11 @@ TEST(Processors, OneForEachListed)
 
     const std::vector<Record> all = processors(fixture.tree());
     ASSERT_EQ(all.size(), 12U);
-    expectProperties(all[11], {{"DeviceID", "CPU11"},
-                               {"Name", "Some Processor @ 2.50GHz"},
-                               {"CurrentClockSpeed", "2500"},
-                               {"MaxClockSpeed", "3900"},
-                               {"BogoMips", "4999.99"},
-                               {"VendorFamily", "6"},
-                               {"VendorModel", "85"},
-                               {"PackageID", "1"},
-                               {"CoreID", "3"},
-                               {"AddressWidth", "64"},
-                               {"Features", "fpu,vme,lm"},
-                               {"CacheSizes", "32,1024"},
-                               {"NumaNode", "1"}});
-    expectProperties(all[0], {{"CacheSizes", "<null>"}, {"MaxClockSpeed", "<null>"}, {"NumaNode", "-1"}});
+    expectProperties(all[11],
+                     "DeviceID=CPU11|Name=Some Processor @ "
+                     "2.50GHz|CurrentClockSpeed=2500|MaxClockSpeed=3900|BogoMips=4999.99|VendorFamily=6|VendorModel=85|"
+                     "PackageID=1|CoreID=3|AddressWidth=64|Features=fpu,vme,lm|CacheSizes=32,1024|NumaNode=1");
+    expectProperties(all[0], "CacheSizes=<null>|MaxClockSpeed=<null>|NumaNode=-1");
 }
 
 TEST(Processors, OtherArchitecturesAndOddFiles)
@@ -192,47 +157,28 @@ TEST(Memories, CommitHeadroomMayBeNegative)
     FixtureTree fixture;
     fixture.file("/proc/meminfo", "MemTotal:        1000 kB\nMemFree:          100 kB\nMemAvailable:     250 kB\n"
                                   "Cached:            50 kB\nCommitLimit:      500 kB\nCommitted_AS:     700 kB\n");
-    expectProperties(memories(fixture.tree()).at(0), {{"BlockSize", "1024"},
-                                                      {"NumberOfBlocks", "1000"},
-                                                      {"ConsumableBlocks", "250"},
-                                                      {"TotalBytes", "1024000"},
-                                                      {"FreeBytes", "102400"},
-                                                      {"UsedPercentage", "75"},
-                                                      {"CommitHeadroom", "-204800"}});
+    expectProperties(memories(fixture.tree()).at(0),
+                     "BlockSize=1024|NumberOfBlocks=1000|ConsumableBlocks=250|TotalBytes=1024000|FreeBytes=102400|"
+                     "UsedPercentage=75|CommitHeadroom=-204800");
 }
 
 TEST(BlockDevices, ThoseWithASize)
 {
     FixtureTree fixture;
-    fixture.file("/sys/block/nvme0n1/size", "2000\n")
-        .file("/sys/block/nvme0n1/dev", "259:0\n")
-        .file("/sys/block/nvme0n1/ro", "1\n")
-        .file("/sys/block/nvme0n1/removable", "0\n")
-        .file("/sys/block/nvme0n1/queue/logical_block_size", "4096\n")
-        .file("/sys/block/nvme0n1/queue/physical_block_size", "4096\n")
-        .file("/sys/block/nvme0n1/queue/rotational", "0\n")
-        .file("/sys/block/nvme0n1/queue/scheduler", "[none] mq-deadline kyber\n")
-        .file("/sys/block/nvme0n1/stat", "  10 0 200 5 30 0 400 5 0 1 2\n")
-        .file("/sys/block/nvme0n1/device/model", "Some Disk                \n")
-        .file("/sys/block/loop0/size", "0\n")
-        .directory("/sys/block/broken");
+    addFiles(fixture, "/sys/block/nvme0n1",
+             "size=2000|dev=259:0|ro=1|removable=0|queue/logical_block_size=4096|queue/physical_block_size=4096|queue/"
+             "rotational=0|queue/scheduler=[none] mq-deadline kyber|stat=  10 0 200 5 30 0 400 5 0 1 "
+             "2|device/model=Some Disk                ");
+    addFiles(fixture, "/sys/block/loop0", "size=0");
+    fixture.directory("/sys/block/broken");
 
     const std::vector<Record> all = blockDevices(fixture.tree());
     ASSERT_EQ(all.size(), 1U);
-    expectProperties(all[0], {{"DeviceID", "nvme0n1"},
-                              {"Name", "/dev/nvme0n1"},
-                              {"TotalBytes", "1024000"},
-                              {"BlockSize", "4096"},
-                              {"NumberOfBlocks", "250"},
-                              {"PhysicalBlockSize", "4096"},
-                              {"Access", "1"},
-                              {"Removable", "false"},
-                              {"Rotational", "false"},
-                              {"Scheduler", "none"},
-                              {"Model", "Some Disk"},
-                              {"Vendor", "<null>"},
-                              {"ReadsCompleted", "10"},
-                              {"SectorsWritten", "400"}});
+    expectProperties(
+        all[0],
+        "DeviceID=nvme0n1|Name=/dev/"
+        "nvme0n1|TotalBytes=1024000|BlockSize=4096|NumberOfBlocks=250|PhysicalBlockSize=4096|Access=1|Removable=false|"
+        "Rotational=false|Scheduler=none|Model=Some Disk|Vendor=<null>|ReadsCompleted=10|SectorsWritten=400");
 }
 
 FixtureTree& addProcess(FixtureTree& fixture, const std::string& id, const std::string& command, char state)
@@ -256,19 +202,11 @@ TEST(OperatingSystems, ReadReleaseTimesAndProcesses)
         .file("/proc/meminfo", "MemTotal: 1000 kB\nSwapTotal: 500 kB\n");
 
     const Record system = operatingSystems(fixture.tree()).at(0);
-    expectProperties(system, {{"CSName", "box"},
-                              {"Name", "some"},
-                              {"Caption", "Some Linux 1"},
-                              {"Version", "6.1.0"},
-                              {"LastBootUpTime", "1700000000000000"},
-                              {"UpTime", "123500000 long"},
-                              {"UpTimeSeconds", "123.5"},
-                              {"LoadAverages", "0.5,1.25,2"},
-                              {"NumberOfProcesses", "3"},
-                              {"ProcessStates", "R,S"},
-                              {"ProcessStateCounts", "1,2"},
-                              {"InitProcessState", "S"},
-                              {"TotalVirtualMemorySize", "1500"}});
+    expectProperties(
+        system,
+        "CSName=box|Name=some|Caption=Some Linux 1|Version=6.1.0|LastBootUpTime=1700000000000000|UpTime=123500000 "
+        "long|UpTimeSeconds=123.5|LoadAverages=0.5,1.25,2|NumberOfProcesses=3|ProcessStates=R,S|ProcessStateCounts=1,2|"
+        "InitProcessState=S|TotalVirtualMemorySize=1500");
     EXPECT_EQ(countProcesses(fixture.tree(), std::nullopt), 3U);
     EXPECT_EQ(countProcesses(fixture.tree(), std::string("worker")), 1U);
     EXPECT_EQ(countProcesses(fixture.tree(), std::string("nobody")), 0U);
@@ -307,13 +245,14 @@ TEST(AllClasses, SurviveAMachineWithoutFiles)
 TEST(SystemDevices, LinkTheSystemWithEveryDevice)
 {
     FixtureTree fixture;
-    addPort(fixture, "eth0", {{"address", "02:fc:00:00:00:01"}});
+    addFiles(fixture, "/sys/class/net/eth0", "address=02:fc:00:00:00:01");
     fixture.file("/proc/sys/kernel/hostname", "box\n").file("/proc/cpuinfo", "processor: 0\n");
     const std::vector<Record> links = systemDevices(fixture.tree());
     ASSERT_EQ(links.size(), 2U);
-    expectProperties(links[1], {{"GroupComponent", "LNX_ComputerSystem CreationClassName=LNX_ComputerSystem Name=box"},
-                                {"PartComponent", "LNX_NetworkPort SystemCreationClassName=LNX_ComputerSystem "
-                                                  "SystemName=box CreationClassName=LNX_NetworkPort DeviceID=eth0"}});
+    expectProperties(
+        links[1],
+        "GroupComponent=LNX_ComputerSystem CreationClassName=LNX_ComputerSystem Name=box|PartComponent=LNX_NetworkPort "
+        "SystemCreationClassName=LNX_ComputerSystem SystemName=box CreationClassName=LNX_NetworkPort DeviceID=eth0");
 }
 
 TEST(SystemTree, ReadsNoMoreThanItsLimit)

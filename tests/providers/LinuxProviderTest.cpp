@@ -110,27 +110,6 @@ TEST_F(LinuxProvider, DeclaresAndDeliversEveryCimType)
         EXPECT_TRUE(delivered.count({type, true})) << cimTypeToString(type) << "[]";
 }
 
-TEST_F(LinuxProvider, AssociationNamesSystemAndDevice)
-{
-    const std::vector<CIMInstance> links = all("LNX_SystemDevice");
-    ASSERT_FALSE(links.empty());
-    CIMObjectPath system;
-    links[0].getProperty(links[0].findProperty(CIMName("GroupComponent"))).getValue().get(system);
-    EXPECT_EQ(text(system.getClassName().getString()), "LNX_ComputerSystem");
-    EXPECT_EQ(text(system.getNameSpace().getString()), "root/cimv2");
-    EXPECT_EQ(system.getKeyBindings().size(), 2U);
-}
-
-TEST_F(LinuxProvider, PropertyListCutsInstances)
-{
-    Array<CIMName> names;
-    names.append(CIMName("macaddress"));
-    const std::vector<CIMInstance> ports = all("LNX_NetworkPort", CIMPropertyList(names));
-    ASSERT_FALSE(ports.empty());
-    EXPECT_EQ(ports[0].getPropertyCount(), 1U);
-    EXPECT_EQ(ports[0].getPath().getKeyBindings().size(), 4U);
-}
-
 TEST_F(LinuxProvider, CountsProcesses)
 {
     const CIMObjectPath path = all("LNX_OperatingSystem").at(0).getPath();

@@ -14,6 +14,8 @@
 
 #include <filesystem>
 #include <fstream>
+#include <iterator>
+#include <sstream>
 
 namespace servertest {
 namespace {
@@ -23,8 +25,7 @@ namespace fs = std::filesystem;
 struct ProgramRow
 {
     const char* name;
-    const char* program;
-    std::vector<std::string> arguments;
+    std::string command; // a program and its arguments, apart by a blank
     int exitStatus;
     std::string out;
     std::string err;
@@ -34,7 +35,11 @@ void check(const ServerTree& tree, const std::vector<ProgramRow>& rows)
 {
     for (const ProgramRow& row : rows) {
         SCOPED_TRACE(row.name);
-        const ProgramResult result = tree.run(row.program, row.arguments);
+        std::istringstream command(row.command);
+        std::vector<std::string> words{std::istream_iterator<std::string>(command), {}};
+        const std::string program = words.front();
+        words.erase(words.begin());
+        const ProgramResult result = tree.run(program, words);
         EXPECT_EQ(result.exitStatus, row.exitStatus);
         EXPECT_EQ(result.out, row.out);
         EXPECT_EQ(result.err, row.err);
@@ -59,72 +64,35 @@ TEST(ProgramTest, withoutAServer)
 {
     const ServerTree tree;
     check(tree,
-          {{"version", "cimserver", {"-v"}, 0, "0.1.0\n", ""},
-           {"status", "cimserver", {"--status"}, 2, "The CIM Server is not running.\n", ""},
-           {"stop", "cimserver", {"-s"}, 1, "", "Unable to connect to CIM Server.  CIM Server may not be running.\n"},
-           {"option", "cimserver", {"--nope"}, 1, "", "cimserver not started: Unrecognized command line option. \n"},
-           {"property", "cimserver", {"a=b"}, 1, "", "cimserver not started: Unrecognized config property: a\n"},
-           {"word", "cimserver", {"word"}, 1, "", "cimserver not started: Unrecognized config property: word\n"},
-           {"value",
-            "cimserver",
-            {"httpPort=abc"},
-            1,
-            "",
-            "cimserver not started: Invalid property value: httpPort=abc\n"},
-           {"TLS",
-            "cimserver",
-            {"enableHttpsConnection=true"},
-            1,
-            "",
+          {{"version", "cimserver -v", 0, "0.1.0\n", ""},
+           {"status", "cimserver --status", 2, "The CIM Server is not running.\n", ""},
+           {"stop", "cimserver -s", 1, "", "Unable to connect to CIM Server.  CIM Server may not be running.\n"},
+           {"option", "cimserver --nope", 1, "", "cimserver not started: Unrecognized command line option. \n"},
+           {"property", "cimserver a=b", 1, "", "cimserver not started: Unrecognized config property: a\n"},
+           {"word", "cimserver word", 1, "", "cimserver not started: Unrecognized config property: word\n"},
+           {"value", "cimserver httpPort=abc", 1, "", "cimserver not started: Invalid property value: httpPort=abc\n"},
+           {"TLS", "cimserver enableHttpsConnection=true", 1, "",
             "cimserver not started: Invalid property value: enableHttpsConnection=true\n"},
-           {"consumer",
-            "cimserver",
-            {"consumer=../x"},
-            1,
-            "",
+           {"consumer", "cimserver consumer=../x", 1, "",
             "cimserver not started: Invalid property value: consumer=../x\n"},
-           {"home",
-            "cimserver",
-            {"-D", "/nonexistent"},
-            1,
-            "",
+           {"home", "cimserver -D /nonexistent", 1, "",
             "cimserver not started: Failed to save configuration properties to file: cannot open file: "
             "/nonexistent/cimserver_current.conf. Configuration property not set.\n"},
-           {"set",
-            "cimconfig",
-            {"-s", "providerDir=lib"},
-            1,
-            "Current value for the property 'providerDir' can not be set because the CIM server is not running.\n",
-            ""},
-           {"get",
-            "cimconfig",
-            {"-g", "providerDir"},
-            1,
-            "Current value can not be determined because the CIM server is not running.\n",
-            ""},
-           {"default", "cimconfig", {"-g", "providerDir", "-d"}, 0, "Default value: lib\n", ""},
-           {"no arguments", "cimconfig", {}, 1, "", std::string("cimconfig: Required arguments missing.\n") + kHint},
-           {"flag", "cimconfig", {"-x"}, 1, "", std::string("cimconfig: Unknown flag -x\n") + kHint},
-           {"no value",
-            "cimconfig",
-            {"-s", "providerDir"},
-            1,
-            "",
+           {"set", "cimconfig -s providerDir=lib", 1,
+            "Current value for the property 'providerDir' can not be set because the CIM server is not running.\n", ""},
+           {"get", "cimconfig -g providerDir", 1,
+            "Current value can not be determined because the CIM server is not running.\n", ""},
+           {"default", "cimconfig -g providerDir -d", 0, "Default value: lib\n", ""},
+           {"no arguments", "cimconfig", 1, "", std::string("cimconfig: Required arguments missing.\n") + kHint},
+           {"flag", "cimconfig -x", 1, "", std::string("cimconfig: Unknown flag -x\n") + kHint},
+           {"no value", "cimconfig -s providerDir", 1, "",
             std::string("cimconfig: argument \"providerDir\" is not valid for option \"-s\"\n") + kHint},
-           {"plan",
-            "cimconfig",
-            {"-s", "httpPort=1234", "-p"},
-            0,
-            "Planned value for the property httpPort is set to \"1234\" in CIMServer.\n",
-            ""},
-           {"planned", "cimconfig", {"-g", "httpPort", "-p"}, 0, "Planned value: 1234\n", ""},
-           {"plan a missing folder",
-            "cimconfig",
-            {"-s", "providerDir=nope", "-p"},
-            1,
-            "Failed to set the config property.\nInvalid property value: providerDir=nope\n",
-            ""},
-           {"list planned", "cimconfig", {"-l", "-p"}, 0, "consumer=" + tree.consumer() + "\nhttpPort=1234\n", ""}});
+           {"plan", "cimconfig -s httpPort=1234 -p", 0,
+            "Planned value for the property httpPort is set to \"1234\" in CIMServer.\n", ""},
+           {"planned", "cimconfig -g httpPort -p", 0, "Planned value: 1234\n", ""},
+           {"plan a missing folder", "cimconfig -s providerDir=nope -p", 1,
+            "Failed to set the config property.\nInvalid property value: providerDir=nope\n", ""},
+           {"list planned", "cimconfig -l -p", 0, "consumer=" + tree.consumer() + "\nhttpPort=1234\n", ""}});
     EXPECT_EQ(modeOf(tree.home() + "/cimserver_planned.conf"), 0600u);
 }
 
@@ -134,56 +102,29 @@ TEST(ProgramTest, withAServer)
     tree.start();
     fs::create_directories(tree.home() + "/provider/a");
     const std::string none = "CIM_ERR_INVALID_NAMESPACE: root/PG_Internal";
-    check(tree, {{"set before the schema", "cimconfig", {"-s", "providerDir=provider/a:"}, 1, "", none + "\n"},
-                 {"get before the schema",
-                  "cimconfig",
-                  {"-g", "providerDir"},
-                  1,
-                  "Failed to get the config property." + none + "\n",
-                  ""}});
+    check(tree, {{"set before the schema", "cimconfig -s providerDir=provider/a:", 1, "", none + "\n"},
+                 {"get before the schema", "cimconfig -g providerDir", 1,
+                  "Failed to get the config property." + none + "\n", ""}});
     tree.compileBase();
-    check(tree, {{"status", "cimserver", {"--status"}, 0, "The CIM Server is running.\n", ""},
-                 {"again", "cimserver", {}, 1, "", "Unable to start CIMServer. CIMServer is already running.\n"},
-                 {"set",
-                  "cimconfig",
-                  {"-s", "providerDir=provider/a:"},
-                  0,
-                  "Current value for the property providerDir is set to \"provider/a:\" in CIMServer.\n",
-                  ""},
-                 {"get", "cimconfig", {"-g", "providerDir"}, 0, "Current value: provider/a:\n", ""},
-                 {"missing folder",
-                  "cimconfig",
-                  {"-s", "providerDir=provider/b:"},
-                  1,
-                  "Failed to set the config property.CIM_ERR_FAILED: Invalid property value: providerDir=provider/b:\n",
-                  ""},
-                 {"empty list",
-                  "cimconfig",
-                  {"-s", "providerDir="},
-                  1,
-                  "Failed to set the config property.CIM_ERR_FAILED: Invalid property value: providerDir=\n",
-                  ""},
-                 {"unknown",
-                  "cimconfig",
-                  {"-s", "nosuch=1"},
-                  1,
-                  "Specified property name was not found.\n",
-                  "CIM_ERR_NOT_FOUND: Configuration property \"nosuch\"\n"},
-                 {"not while it runs",
-                  "cimconfig",
-                  {"-s", "httpPort=1234"},
-                  1,
-                  "Specified property can not be modified.\n",
-                  "CIM_ERR_NOT_SUPPORTED: NonDynamic config property: httpPort\n"},
-                 {"still", "cimconfig", {"-g", "providerDir"}, 0, "Current value: provider/a:\n", ""},
-                 {"reset",
-                  "cimconfig",
-                  {"-u", "providerDir"},
-                  0,
-                  "Current value for the property providerDir is set to \"lib\" in CIMServer.\n",
-                  ""},
-                 {"stop", "cimserver", {"-s"}, 0, "CIM Server stopped.\n", ""},
-                 {"stopped", "cimserver", {"--status"}, 2, "The CIM Server is not running.\n", ""}});
+    check(tree,
+          {{"status", "cimserver --status", 0, "The CIM Server is running.\n", ""},
+           {"again", "cimserver", 1, "", "Unable to start CIMServer. CIMServer is already running.\n"},
+           {"set", "cimconfig -s providerDir=provider/a:", 0,
+            "Current value for the property providerDir is set to \"provider/a:\" in CIMServer.\n", ""},
+           {"get", "cimconfig -g providerDir", 0, "Current value: provider/a:\n", ""},
+           {"missing folder", "cimconfig -s providerDir=provider/b:", 1,
+            "Failed to set the config property.CIM_ERR_FAILED: Invalid property value: providerDir=provider/b:\n", ""},
+           {"empty list", "cimconfig -s providerDir=", 1,
+            "Failed to set the config property.CIM_ERR_FAILED: Invalid property value: providerDir=\n", ""},
+           {"unknown", "cimconfig -s nosuch=1", 1, "Specified property name was not found.\n",
+            "CIM_ERR_NOT_FOUND: Configuration property \"nosuch\"\n"},
+           {"not while it runs", "cimconfig -s httpPort=1234", 1, "Specified property can not be modified.\n",
+            "CIM_ERR_NOT_SUPPORTED: NonDynamic config property: httpPort\n"},
+           {"still", "cimconfig -g providerDir", 0, "Current value: provider/a:\n", ""},
+           {"reset", "cimconfig -u providerDir", 0,
+            "Current value for the property providerDir is set to \"lib\" in CIMServer.\n", ""},
+           {"stop", "cimserver -s", 0, "CIM Server stopped.\n", ""},
+           {"stopped", "cimserver --status", 2, "The CIM Server is not running.\n", ""}});
     for (const std::string& file : {tree.startFile(), tree.home() + "/cimserver.lock", tree.home() + "/cimxml.socket"})
         EXPECT_FALSE(fs::exists(file)) << file;
 }
@@ -201,11 +142,7 @@ TEST(ProgramTest, stopsByForceWhenTheSchemaIsMissing)
     ServerTree tree;
     tree.start();
     const int server = tree.serverProcess();
-    check(tree, {{"stop",
-                  "cimserver",
-                  {"-s"},
-                  1,
-                  "",
+    check(tree, {{"stop", "cimserver -s", 1, "",
                   "Error in server shutdown: The repository may be empty.\nForced shutdown initiated.\n"}});
     EXPECT_FALSE(isRunning(server));
     EXPECT_FALSE(fs::exists(tree.startFile()));
@@ -265,11 +202,7 @@ TEST(ProgramTest, aTakenPortIsNamed)
     ASSERT_EQ(::bind(taken, reinterpret_cast<const sockaddr*>(&address), sizeof address), 0);
     ASSERT_EQ(::listen(taken, 1), 0);
     const std::string port = std::to_string(tree.port());
-    check(tree, {{"start",
-                  "cimserver",
-                  {"httpPort=" + port},
-                  1,
-                  "",
+    check(tree, {{"start", "cimserver httpPort=" + port, 1, "",
                   "cimserver not started: Bind failed: Failed to bind socket on port " + port +
                       ": Address already in use (error code 98).\n"}});
     EXPECT_FALSE(fs::exists(tree.startFile()));
