@@ -135,7 +135,7 @@ void useDateTimes(CIMDateTime& x)
     x.set(x.toString());
     x = ((x + x) - x) * 2 / 2;
     x += x;
-    x -= x;
+    x -= CIMDateTime(x);
     x *= x / x;
     x /= 2;
     (void)(x.equal(x) || x < x || x <= x || x > x || x >= x || x == x || x != x);
@@ -326,8 +326,8 @@ void useExceptions(const String& text)
     useException<CIMException>(CIM_ERR_FAILED, text, CIMInstance());
     useException<CIMException>(CIM_ERR_FAILED, text, Array<CIMInstance>());
     useException<CIMClientMalformedHTTPException>(text);
-    useException<CIMClientHTTPErrorException>(400, text, text);
-    useException<CIMClientHTTPErrorException>(400, text, text, text);
+    useException<CIMClientHTTPErrorException>(400U, text, text);
+    useException<CIMClientHTTPErrorException>(400U, text, text, text);
     useException<CIMClientXmlException>(text);
     useException<CIMClientResponseException>(text);
     const CIMClientHTTPErrorException http(400, text, text);
