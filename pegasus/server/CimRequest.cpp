@@ -1,20 +1,11 @@
 #include "pegasus/server/CimRequest.h"
 
-#include <strings.h>
+#include "pegasus/common/AsciiCase.h"
 
 namespace Pegasus::server {
 
 using wire::XmlElement;
 using wire::XmlError;
-
-namespace {
-
-bool equalsNoCase(std::string_view a, std::string_view b)
-{
-    return a.size() == b.size() && ::strncasecmp(a.data(), b.data(), a.size()) == 0;
-}
-
-} // namespace
 
 void IntrinsicParameters::add(std::string_view name, XmlElement value)
 {
@@ -24,7 +15,7 @@ void IntrinsicParameters::add(std::string_view name, XmlElement value)
 XmlElement IntrinsicParameters::find(std::string_view parameter) const
 {
     for (const Parameter& candidate : fParameters)
-        if (equalsNoCase(candidate.name, parameter))
+        if (equalNoCase(candidate.name, parameter))
             return candidate.value;
     return {};
 }
