@@ -20,10 +20,10 @@ namespace {
 const CIMNamespaceName kNamespace("root/probe");
 
 // One server with the probe provider for all benchmarks but the launch.
-class ProbeServer
+class TProbeServer
 {
   public:
-    ProbeServer()
+    TProbeServer()
     {
         fTree.start();
         fTree.installProbe();
@@ -31,10 +31,10 @@ class ProbeServer
         fClient.connect("127.0.0.1", fTree.port(), String(), String());
     }
 
-    static ProbeServer& get()
+    static TProbeServer& get()
     {
-        static ProbeServer server;
-        return server;
+        static TProbeServer fgServer;
+        return fgServer;
     }
 
     CIMClient& client() { return fClient; }
@@ -74,7 +74,7 @@ double peakMegabytes(int pid)
 
 void enumerateInstances(benchmark::State& state)
 {
-    ProbeServer& server = ProbeServer::get();
+    TProbeServer& server = TProbeServer::get();
     server.setCount(static_cast<Uint32>(state.range(0)));
     const std::size_t bytes = server.enumerationBytes().size();
     for (auto _ : state)
@@ -90,7 +90,7 @@ void enumerateInstances(benchmark::State& state)
 
 void bareExpat(benchmark::State& state)
 {
-    ProbeServer& server = ProbeServer::get();
+    TProbeServer& server = TProbeServer::get();
     server.setCount(static_cast<Uint32>(state.range(0)));
     const std::string bytes = server.enumerationBytes();
     for (auto _ : state) {
@@ -107,7 +107,7 @@ void bareExpat(benchmark::State& state)
 
 void getClass(benchmark::State& state)
 {
-    ProbeServer& server = ProbeServer::get();
+    TProbeServer& server = TProbeServer::get();
     for (auto _ : state)
         benchmark::DoNotOptimize(server.client().getClass(kNamespace, "Probe_Bulk", false));
     state.SetItemsProcessed(state.iterations());
@@ -115,7 +115,7 @@ void getClass(benchmark::State& state)
 
 void invokeMethod(benchmark::State& state)
 {
-    ProbeServer& server = ProbeServer::get();
+    TProbeServer& server = TProbeServer::get();
     Array<CIMParamValue> in;
     in.append(CIMParamValue("Text", CIMValue(String("some words"))));
     for (auto _ : state) {

@@ -45,7 +45,7 @@ double wallSeconds()
 }
 
 /// The least of several runs: what the work costs when nothing disturbs it.
-struct Cost
+struct TCost
 {
     double cpu = 1e300;
     double wall = 1e300;
@@ -137,7 +137,7 @@ std::string classBody()
 }
 
 /// How an answer is sent.
-struct Sending
+struct TSending
 {
     std::size_t chunkBytes = 0; ///< 0: with a length
     std::size_t pieceBytes = 0; ///< so many in one send; 0: all at once
@@ -145,10 +145,10 @@ struct Sending
 };
 
 /// The answer to whatever is asked: prepared once, with the id of the request put in.
-class PreparedAnswer
+class TPreparedAnswer
 {
   public:
-    PreparedAnswer(const std::string& body, const Sending& sending = Sending())
+    TPreparedAnswer(const std::string& body, const TSending& sending = TSending())
         : fAnswer(sending.chunkBytes ? test::chunkedAnswer(body, sending.chunkBytes) : test::httpAnswer(body)),
           fSending(sending), fIdAt(fAnswer.bytes.find("0000"))
     {
@@ -167,7 +167,7 @@ class PreparedAnswer
 
   private:
     test::PeerAnswer fAnswer;
-    Sending fSending;
+    TSending fSending;
     std::size_t fIdAt;
 };
 
@@ -175,15 +175,15 @@ void XMLCALL onStart(void*, const XML_Char*, const XML_Char**) {}
 void XMLCALL onEnd(void*, const XML_Char*) {}
 void XMLCALL onText(void*, const XML_Char*, int) {}
 
-Cost bareExpat(const std::string& xml)
+TCost bareExpat(const std::string& xml)
 {
-    Cost cost;
+    TCost cost;
     for (int run = 0; run < kRuns; ++run) {
         cost.measure([&] {
             XML_Parser parser = XML_ParserCreate(nullptr);
             XML_SetElementHandler(parser, onStart, onEnd);
             XML_SetCharacterDataHandler(parser, onText);
-            constexpr std::size_t kPiece = 64 * 1024;
+            constexpr std::size_t kPiece = 64UL * 1024;
             for (std::size_t at = 0; at < xml.size(); at += kPiece) {
                 const std::size_t size = std::min(kPiece, xml.size() - at);
                 XML_Parse(parser, xml.data() + at, static_cast<int>(size), at + size == xml.size());
@@ -195,9 +195,9 @@ Cost bareExpat(const std::string& xml)
 }
 
 /// The other parser, the whole text in place: what choosing it is based on.
-Cost barePugixml(const std::string& xml)
+TCost barePugixml(const std::string& xml)
 {
-    Cost cost;
+    TCost cost;
     for (int run = 0; run < kRuns; ++run) {
         std::string copy = xml;
         cost.measure([&] {
@@ -208,21 +208,21 @@ Cost barePugixml(const std::string& xml)
     return cost;
 }
 
-void benchInstances(unsigned count, const char* how, const Sending& sending = Sending())
+void benchInstances(unsigned count, const char* how, const TSending& sending = TSending())
 {
     std::string body = instancesBody(count);
     const double bytes = double(body.size());
     const double megabytes = bytes / 1e6;
-    PreparedAnswer prepared(body, sending);
-    const Cost expat = bareExpat(body);
-    const Cost pugixml = barePugixml(body);
+    TPreparedAnswer prepared(body, sending);
+    const TCost expat = bareExpat(body);
+    const TCost pugixml = barePugixml(body);
     body = std::string();
 
     test::ScriptedPeer peer([&](const test::PeerRequest& request) { return prepared.answer(request); });
     CIMClient client;
     client.setTimeout(600000);
     client.connect("127.0.0.1", peer.port(), String(), String());
-    Cost cost;
+    TCost cost;
     long growth = 0;
     for (int run = 0; run < kRuns; ++run) {
         ::malloc_trim(0);
@@ -248,7 +248,7 @@ Array<CIMInstance> readThenDecode(client::Connection& connection, const std::str
     std::string text;
     client::HttpResponse response(
         client::ClientLimits(), [](const client::ResponseFields&) {}, [&](std::string_view body) { text += body; });
-    std::vector<char> buffer(64 * 1024);
+    std::vector<char> buffer(64UL * 1024);
     while (!response.isComplete()) {
         std::size_t received = 0;
         connection.receive(buffer.data(), buffer.size(), deadline, received);
@@ -269,7 +269,7 @@ Array<CIMInstance> readThenDecode(client::Connection& connection, const std::str
 void benchOverlap()
 {
     constexpr unsigned kCount = 10000;
-    PreparedAnswer prepared(instancesBody(kCount), {0, 64 * 1024, std::chrono::milliseconds(1)});
+    TPreparedAnswer prepared(instancesBody(kCount), {0, 64UL * 1024, std::chrono::milliseconds(1)});
     test::ScriptedPeer peer([&](const test::PeerRequest& request) { return prepared.answer(request); });
     CIMClient client;
     client.setTimeout(600000);
@@ -282,8 +282,8 @@ void benchOverlap()
     connection.open(client::Deadline(10000));
     client::Request request = client::IntrinsicRequest("EnumerateInstances", kNameSpace, true).finish();
     const std::string message = client::encodeMessage(request, "1000", address.text(), {});
-    Cost overlapped;
-    Cost inTurn;
+    TCost overlapped;
+    TCost inTurn;
     for (int run = 0; run < kRuns; ++run) {
         overlapped.measure([&] { (void)client.enumerateInstances(kNameSpace, "Bench_Device"); });
         inTurn.measure([&] { (void)readThenDecode(connection, message); });
@@ -297,12 +297,12 @@ void benchGetClass()
 {
     constexpr int kCalls = 2000;
     const std::string body = classBody();
-    PreparedAnswer prepared(body);
-    const Cost expat = bareExpat(body);
+    TPreparedAnswer prepared(body);
+    const TCost expat = bareExpat(body);
     test::ScriptedPeer peer([&](const test::PeerRequest& request) { return prepared.answer(request); });
     CIMClient client;
     client.connect("127.0.0.1", peer.port(), String(), String());
-    Cost cost;
+    TCost cost;
     for (int run = 0; run < 4; ++run) {
         cost.measure([&] {
             for (int call = 0; call < kCalls; ++call)

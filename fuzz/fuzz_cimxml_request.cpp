@@ -36,7 +36,7 @@ void readParameters(const IntrinsicParameters& parameters)
 std::string takeLine(std::string& text)
 {
     const std::size_t end = std::min(text.find('\n'), text.size());
-    const std::string line = text.substr(0, end);
+    std::string line = text.substr(0, end);
     text.erase(0, end + 1);
     return line;
 }

@@ -15,7 +15,7 @@ std::string read(std::string_view bytes, std::size_t cut)
 {
     client::ClientLimits limits;
     limits.maxHeaderBytes = 4096;
-    limits.maxBodyBytes = 64 * 1024;
+    limits.maxBodyBytes = 64UL * 1024;
     std::string body;
     client::HttpResponse response(
         limits, [](const client::ResponseFields&) {}, [&](std::string_view piece) { body.append(piece); });

@@ -13,8 +13,8 @@
 #include <unistd.h>
 
 #include <cli/Guard.h>
-#include <cli/PrivateServer.h>
-#include <cli/Session.h>
+#include <cli/TPrivateServer.h>
+#include <cli/TSession.h>
 #include <core/TProcessLog.h>
 #include <host/TConfig.h>
 #include <host/TRootObject.h>
@@ -146,7 +146,7 @@ void TSoak::Cycle(EFault fault)
     ::alarm(kHungSeconds);
     TConfig::GetInstance()->setValue("pegasus_multi_thread", fCounts.fCycles % 2 == 0 ? "off" : "on");
     const std::string error = vrxhost::Guarded([&] {
-        vrxhost::Session session(fRoot + "/libpegasus.nsp.so", fConsumer);
+        vrxhost::TSession session(fRoot + "/libpegasus.nsp.so", fConsumer);
         UseNamespace(session.GetNamespace(), fault);
         const std::string problem = session.Close();
         if (!problem.empty())
@@ -189,7 +189,7 @@ void TSoak::Run(std::chrono::minutes duration)
 {
     TQuietLog log;
     TRootObject::SetCoreLogger(&log);
-    const std::string error = vrxhost::PrivateServer(fRoot, fConsumer).SetConsumer();
+    const std::string error = vrxhost::TPrivateServer(fRoot, fConsumer).SetConsumer();
     if (!error.empty()) {
         std::fprintf(stderr, "soak: the consumer's name could not be set: %s\n", error.c_str());
         std::exit(2);

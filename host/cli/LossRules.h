@@ -16,7 +16,7 @@ std::optional<std::string> LossOfLine(const std::string& line);
 bool IsHarmless(const std::string& errorLine);
 
 // Returns: the sentence for a failed program; nothing when nothing was lost by it.
-// root: see LossLog.
+// root: see TLossLog.
 std::optional<std::string> LossOfProgram(const NKOLVRX20::TFailedProgram& program, const std::string& root);
 
 // Returns: true for a start of the server, which the plug-in attempts several times.

@@ -9,13 +9,13 @@
 #include <unistd.h>
 
 #include <core/TCoreLogger.h>
-#include <core/UniqueFd.h>
+#include <core/TUniqueFd.h>
 #include <host/TVRXException.h>
 
 #include "Options.h"
-#include "PluginLibrary.h"
-#include "Run.h"
 #include "Say.h"
+#include "TPluginLibrary.h"
+#include "TRun.h"
 
 namespace vrxhost {
 namespace {
@@ -41,9 +41,9 @@ void OpenLog(const TOptions& options)
 
 // Enters the root and keeps every other vrxhost out of it: two hosts would stop each other's server.
 // Returns: the lock, none when it failed and was told.
-NKOLVRX20::UniqueFd EnterRoot(const std::string& root)
+NKOLVRX20::TUniqueFd EnterRoot(const std::string& root)
 {
-    NKOLVRX20::UniqueFd directory(::open(root.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    NKOLVRX20::TUniqueFd directory(::open(root.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
     if (!directory || ::fchdir(directory.Get()) != 0)
         Say("the root directory " + root + " could not be entered: " + std::strerror(errno));
     else if (::flock(directory.Get(), LOCK_EX | LOCK_NB) != 0)
@@ -51,7 +51,7 @@ NKOLVRX20::UniqueFd EnterRoot(const std::string& root)
                                  : "the root directory " + root + " could not be locked: " + std::strerror(errno));
     else
         return directory;
-    return NKOLVRX20::UniqueFd();
+    return NKOLVRX20::TUniqueFd();
 }
 
 int Main(int argc, const char* const* argv)
@@ -60,14 +60,14 @@ int Main(int argc, const char* const* argv)
     const int status = ParseOptions(argc, argv, options);
     if (status >= 0)
         return status;
-    const NKOLVRX20::UniqueFd rootLock = EnterRoot(options.fRoot);
+    const NKOLVRX20::TUniqueFd rootLock = EnterRoot(options.fRoot);
     if (!rootLock)
         return kFailed;
     std::signal(SIGPIPE, SIG_IGN); // a reader that has gone is a write error here
     OpenLog(options);
-    Run run(options);
+    TRun run(options);
     const EExitStatus result = run.Execute();
-    if (PluginLibrary::HasLeftThreads())
+    if (TPluginLibrary::HasLeftThreads())
         ::_exit(result);
     return result;
 }

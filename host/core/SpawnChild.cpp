@@ -15,8 +15,8 @@ namespace {
 // RAII for the two plain structures of posix_spawn.
 struct TSpawnSettings
 {
-    posix_spawnattr_t fAttributes;
-    posix_spawn_file_actions_t fActions;
+    posix_spawnattr_t fAttributes{};
+    posix_spawn_file_actions_t fActions{};
 
     TSpawnSettings()
     {
@@ -66,11 +66,11 @@ std::vector<char*> ToPointers(const std::vector<std::string>& texts)
 }
 
 // In a process whose standard streams are closed, a pipe could land on 0 to 2 and be overwritten in the child.
-int MoveAboveStandardStreams(UniqueFd& fd)
+int MoveAboveStandardStreams(TUniqueFd& fd)
 {
     if (fd.Get() > STDERR_FILENO)
         return 0;
-    UniqueFd moved(::fcntl(fd.Get(), F_DUPFD_CLOEXEC, STDERR_FILENO + 1));
+    TUniqueFd moved(::fcntl(fd.Get(), F_DUPFD_CLOEXEC, STDERR_FILENO + 1));
     if (!moved)
         return errno;
     fd = std::move(moved);
@@ -79,13 +79,13 @@ int MoveAboveStandardStreams(UniqueFd& fd)
 
 } // namespace
 
-int OpenPipe(UniqueFd& readEnd, UniqueFd& writeEnd)
+int OpenPipe(TUniqueFd& readEnd, TUniqueFd& writeEnd)
 {
     int ends[2];
     if (::pipe2(ends, O_CLOEXEC) != 0)
         return errno;
-    readEnd = UniqueFd(ends[0]);
-    writeEnd = UniqueFd(ends[1]);
+    readEnd = TUniqueFd(ends[0]);
+    writeEnd = TUniqueFd(ends[1]);
     int error = MoveAboveStandardStreams(readEnd);
     if (!error)
         error = MoveAboveStandardStreams(writeEnd);

@@ -6,7 +6,7 @@
 
 #include <sys/types.h>
 
-#include "UniqueFd.h"
+#include "TUniqueFd.h"
 
 namespace NKOLVRX20 {
 
@@ -22,7 +22,7 @@ struct TProcessRequest
 
 // Opens a close-on-exec pipe above the standard streams whose read end does not block.
 // Returns: an errno, 0 for success.
-int OpenPipe(UniqueFd& readEnd, UniqueFd& writeEnd);
+int OpenPipe(TUniqueFd& readEnd, TUniqueFd& writeEnd);
 
 // Starts a child with default signal dispositions, an empty mask, its own process group, standard input from /dev/null,
 // the two descriptors as standard output and error, and no other descriptor.

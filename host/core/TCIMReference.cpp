@@ -66,8 +66,8 @@ std::string TCIMReference::GetClassName() const
 
 const TCIMContext& TCIMReference::GetKeys() const
 {
-    static const TCIMContext none;
-    return fKeys ? *fKeys : none;
+    static const TCIMContext fgNone;
+    return fKeys ? *fKeys : fgNone;
 }
 
 bool TCIMReference::operator==(const TCIMReference& other) const

@@ -154,9 +154,9 @@ std::string TCIMValue::ToString(unsigned char radix) const
 
 const char* TCIMValue::TCIMType::GetName() const noexcept
 {
-    static const char* const kNames[] = {"none",   "boolean", "uint8",    "sint8",    "uint16", "sint16",
-                                         "uint32", "sint32",  "uint64",   "sint64",   "real32", "real64",
-                                         "char16", "string",  "datetime", "reference"};
+    static constexpr const char* kNames[] = {"none",   "boolean", "uint8",    "sint8",    "uint16", "sint16",
+                                             "uint32", "sint32",  "uint64",   "sint64",   "real32", "real64",
+                                             "char16", "string",  "datetime", "reference"};
     const ECIMType element = GetElementType();
     return element <= kReference ? kNames[element] : kNames[kNone];
 }

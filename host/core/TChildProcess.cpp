@@ -60,7 +60,7 @@ int TChildProcess::Start()
     fOutputPipe.fWrite.Reset();
     fErrorPipe.fWrite.Reset();
     if (!error)
-        fPidFd = UniqueFd(::pidfd_open(fPid, 0));
+        fPidFd = TUniqueFd(::pidfd_open(fPid, 0));
     return error;
 }
 
@@ -86,7 +86,7 @@ bool TChildProcess::PollOnce(TClock::time_point deadline)
                     {fErrorPipe.fRead.Get(), POLLIN, 0},
                     {fPidFd.Get(), POLLIN, 0},
                     {TProcessControl::Instance().GetWakeFd(), POLLIN, 0}};
-    constexpr long kMaxWaitMs = 60 * 60 * 1000; // poll takes an int
+    constexpr long kMaxWaitMs = 60L * 60 * 1000; // poll takes an int
     ::poll(fds, std::size(fds), static_cast<int>(std::min<long>(wait.count(), kMaxWaitMs)));
     return true;
 }
@@ -99,7 +99,7 @@ bool TChildProcess::HasExited() const
     return result == 0 ? info.si_pid == fPid : errno == ECHILD;
 }
 
-void TChildProcess::Drain(UniqueFd& from, std::string& into, std::size_t limit)
+void TChildProcess::Drain(TUniqueFd& from, std::string& into, std::size_t limit)
 {
     char buffer[64 * 1024];
     for (int reads = 0; from && reads < kMaxReadsAtOnce; ++reads) {
@@ -109,11 +109,9 @@ void TChildProcess::Drain(UniqueFd& from, std::string& into, std::size_t limit)
             const std::size_t kept = std::min(bytes, limit - into.size());
             into.append(buffer, kept);
             fOutcome.fDroppedBytes += bytes - kept;
-        } else if (count == 0)
-            from.Reset();
-        else if (errno == EAGAIN)
+        } else if (count < 0 && errno == EAGAIN)
             return;
-        else if (errno != EINTR)
+        else if (count == 0 || errno != EINTR)
             from.Reset();
     }
 }
@@ -137,7 +135,7 @@ void TChildProcess::Kill()
 void TChildProcess::Reap()
 {
     int status = 0;
-    pid_t reaped;
+    pid_t reaped = -1;
     do
         reaped = ::waitpid(fPid, &status, 0);
     while (reaped < 0 && errno == EINTR);

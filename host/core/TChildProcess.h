@@ -9,7 +9,7 @@
 #include <sys/types.h>
 
 #include "SpawnChild.h"
-#include "UniqueFd.h"
+#include "TUniqueFd.h"
 
 namespace NKOLVRX20 {
 
@@ -36,8 +36,8 @@ struct TProcessOutcome
 };
 
 // Captured beyond these, output is read and dropped, so that the child does not stall.
-constexpr std::size_t kMaxOutputBytes = 16 * 1024 * 1024;
-constexpr std::size_t kMaxErrorOutputBytes = 64 * 1024;
+constexpr std::size_t kMaxOutputBytes = 16UL * 1024 * 1024;
+constexpr std::size_t kMaxErrorOutputBytes = 64UL * 1024;
 
 // One run of a child process, started as SpawnChild says; standard output and error are captured.
 // Thread: one at a time; several objects may be used at once.
@@ -57,15 +57,15 @@ class TChildProcess
 
     struct TPipe
     {
-        UniqueFd fRead;
-        UniqueFd fWrite;
+        TUniqueFd fRead;
+        TUniqueFd fWrite;
     };
 
     int Start();
     bool AwaitExit(TClock::time_point deadline);
     bool PollOnce(TClock::time_point deadline);
     bool HasExited() const;
-    void Drain(UniqueFd& from, std::string& into, std::size_t limit);
+    void Drain(TUniqueFd& from, std::string& into, std::size_t limit);
     void DrainBoth();
     void Kill();
     void Reap();
@@ -74,7 +74,7 @@ class TChildProcess
     TPipe fOutputPipe;
     TPipe fErrorPipe;
     pid_t fPid = -1;
-    UniqueFd fPidFd; // readable when the child has exited; none on kernels before 5.3
+    TUniqueFd fPidFd; // readable when the child has exited; none on kernels before 5.3
     TProcessOutcome fOutcome;
 };
 

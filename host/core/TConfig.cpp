@@ -9,11 +9,11 @@
 namespace NKOLVRX20 {
 namespace {
 
-constexpr std::size_t kMaxFileBytes = 1024 * 1024;
+constexpr std::size_t kMaxFileBytes = 1024UL * 1024;
 
 std::string Trimmed(const std::string& text)
 {
-    static const char kBlanks[] = " \t\r";
+    static constexpr char kBlanks[] = " \t\r";
     const std::size_t begin = text.find_first_not_of(kBlanks);
     if (begin == std::string::npos)
         return "";
@@ -52,8 +52,8 @@ std::map<std::string, std::string> ParseLines(const std::string& text)
 
 TConfig* TConfig::GetInstance()
 {
-    static TConfig instance;
-    return &instance;
+    static TConfig fgInstance;
+    return &fgInstance;
 }
 
 std::string TConfig::getValue(const std::string& key) const

@@ -38,8 +38,8 @@ spdlog::level::level_enum ToLevel(ILogger::EVRXLogSeverity severity)
 TCoreLogger& TCoreLogger::Instance()
 {
     // Never destroyed: a plug-in's static destructors may still log.
-    static TCoreLogger* instance = new TCoreLogger;
-    return *instance;
+    static TCoreLogger* fgInstance = new TCoreLogger;
+    return *fgInstance;
 }
 
 TCoreLogger::TCoreLogger()

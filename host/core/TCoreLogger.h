@@ -30,9 +30,10 @@ class TCoreLogger : public ILogger
 
     void Log(EVRXLogSeverity severity, const std::string& text) override;
 
+    ~TCoreLogger() override;
+
   private:
     TCoreLogger();
-    ~TCoreLogger() override;
 
     struct TSinks;
     std::shared_ptr<TSinks> Current() const;

@@ -70,7 +70,7 @@ void TOSSpecific::SpawnProcess(const std::string& name, const std::vector<std::s
 
 std::size_t TOSSpecific::GetFileSize(const std::string& path)
 {
-    struct stat status;
+    struct stat status = {};
     if (::stat(path.c_str(), &status) != 0 || !S_ISREG(status.st_mode))
         return 0;
     return static_cast<std::size_t>(status.st_size);

@@ -13,8 +13,8 @@ const char* TProgramsCancelled::what() const noexcept
 
 TProcessControl& TProcessControl::Instance()
 {
-    static TProcessControl* instance = new TProcessControl; // outlives every plug-in
-    return *instance;
+    static TProcessControl* fgInstance = new TProcessControl; // outlives every plug-in
+    return *fgInstance;
 }
 
 TProcessControl::TProcessControl() : fWake(::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK)) {}
@@ -33,7 +33,7 @@ void TProcessControl::Resume()
     const std::lock_guard<std::mutex> lock(fMutex);
     fResumed = true;
     fCancelled = false;
-    eventfd_t ignored;
+    eventfd_t ignored = 0;
     ::eventfd_read(fWake.Get(), &ignored);
 }
 

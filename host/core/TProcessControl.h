@@ -5,7 +5,7 @@
 #include <exception>
 #include <mutex>
 
-#include "UniqueFd.h"
+#include "TUniqueFd.h"
 
 namespace NKOLVRX20 {
 
@@ -40,7 +40,7 @@ class TProcessControl
     std::mutex fMutex; // orders Cancel and Resume
     bool fResumed = false;
     std::atomic<bool> fCancelled{false};
-    UniqueFd fWake;
+    TUniqueFd fWake;
 };
 
 } // namespace NKOLVRX20

@@ -56,8 +56,8 @@ std::string TFailedProgram::GetReason() const
 
 TProcessLog& TProcessLog::Instance()
 {
-    static TProcessLog* instance = new TProcessLog; // outlives every plug-in
-    return *instance;
+    static TProcessLog* fgInstance = new TProcessLog; // outlives every plug-in
+    return *fgInstance;
 }
 
 void TProcessLog::Add(const TProcessRequest& request, const TProcessOutcome& outcome)

@@ -16,8 +16,8 @@ struct TFailedProgram
 {
     std::string fName;                   // argv[0]
     std::vector<std::string> fArguments; // without argv[0]
-    TProcessOutcome::EEnd fEnd;
-    int fStatus;
+    TProcessOutcome::EEnd fEnd = TProcessOutcome::kUnknown;
+    int fStatus = 0;
     std::string fOutput; // its beginning: some programs tell their failures here
     std::string fErrorOutput;
 

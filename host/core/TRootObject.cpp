@@ -27,8 +27,9 @@ ILogger* TRootObject::SetCoreLogger(ILogger* logger)
 
 boost::shared_ptr<INamespaceProviderManager> TRootObject::GetNamespaceProviderManager()
 {
-    static const boost::shared_ptr<INamespaceProviderManager> manager = boost::make_shared<TNamespaceProviderManager>();
-    return manager;
+    static const boost::shared_ptr<INamespaceProviderManager> fgManager =
+        boost::make_shared<TNamespaceProviderManager>();
+    return fgManager;
 }
 
 } // namespace NKOLVRX20

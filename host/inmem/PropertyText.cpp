@@ -136,6 +136,7 @@ std::vector<std::string> PropertyTexts(const TCIMValue& value, const boost::shar
     if (declaration)
         rules.emplace(*declaration);
     std::vector<std::string> texts;
+    texts.reserve(elements.size());
     for (const TCIMValue& element : elements)
         texts.push_back(rules && !element.IsNull() ? rules->Text(element, PlainText(element)) : PlainText(element));
     return texts;

@@ -9,7 +9,7 @@
 namespace NKOLVRX20 {
 namespace {
 
-constexpr std::size_t kMaxDocumentBytes = 16 * 1024 * 1024;
+constexpr std::size_t kMaxDocumentBytes = 16UL * 1024 * 1024;
 constexpr unsigned int kMaxDepth = 64;
 
 constexpr char kTooLarge[] = "the document is larger than 16 MiB";

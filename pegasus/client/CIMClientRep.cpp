@@ -19,13 +19,13 @@ using client::ResponseFields;
 using client::ResponseReader;
 using Result = client::Connection::Result;
 
-constexpr std::size_t kReceiveBytes = 64 * 1024;
+constexpr std::size_t kReceiveBytes = 64UL * 1024;
 constexpr const char* kClosed = "Connection closed by CIM Server.";
 
 std::string nextMessageId()
 {
-    static std::atomic<Uint32> next{1000};
-    return std::to_string(next.fetch_add(1, std::memory_order_relaxed));
+    static std::atomic<Uint32> fgNext{1000};
+    return std::to_string(fgNext.fetch_add(1, std::memory_order_relaxed));
 }
 
 /// Text of a peer: UTF-8 if it is, else each byte a character.

@@ -110,7 +110,7 @@ void Connection::close()
 
 bool Connection::isStale() const
 {
-    char byte;
+    char byte = 0;
     const ssize_t count = ::recv(fFd, &byte, 1, MSG_PEEK | MSG_DONTWAIT);
     return count >= 0 || !isRetry(errno);
 }

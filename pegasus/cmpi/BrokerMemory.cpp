@@ -7,8 +7,8 @@
 #include "pegasus/cmpi/StringObject.h"
 
 #include <algorithm>
-#include <cstdlib>
 #include <cstring>
+#include <new>
 
 // Memory that ends with the provider's function, and frames that the provider opens itself.
 namespace Pegasus::cmpi {
@@ -20,7 +20,8 @@ class alignas(std::max_align_t) MemoryBlock final : public Owned
   public:
     static MemoryBlock* make(std::size_t size)
     {
-        void* memory = size > SIZE_MAX - sizeof(MemoryBlock) ? nullptr : std::malloc(sizeof(MemoryBlock) + size);
+        void* memory =
+            size > SIZE_MAX - sizeof(MemoryBlock) ? nullptr : ::operator new(sizeof(MemoryBlock) + size, std::nothrow);
         if (memory == nullptr)
             return nullptr;
         auto* block = new (memory) MemoryBlock(size);
@@ -32,7 +33,7 @@ class alignas(std::max_align_t) MemoryBlock final : public Owned
     void* bytes() { return this + 1; }
     std::size_t size() const { return fSize; }
 
-    static void operator delete(void* memory) { std::free(memory); }
+    static void operator delete(void* memory) { ::operator delete(memory); }
 
   private:
     explicit MemoryBlock(std::size_t size) : fSize(size) {}

@@ -34,6 +34,7 @@ CMPIThread newThread(CMPIThreadFunc start, void* parm, int detached)
     pthread_t thread{};
     const int failed = ::pthread_create(&thread, &attributes, start, parm);
     ::pthread_attr_destroy(&attributes);
+    // NOLINTNEXTLINE(performance-no-int-to-ptr): a pthread_t is a number here, a CMPIThread a pointer
     return failed != 0 ? nullptr : reinterpret_cast<CMPIThread>(thread);
 }
 

@@ -17,11 +17,11 @@ struct PropertySchema
 {
     CIMName name;
     std::string text; // the name in UTF-8
-    CIMType type;
-    bool isArray;
-    bool isKey;
-    bool isEmbedded;       // an embedded object or instance, or a string that stands for one
-    bool isEmbeddedObject; // the former
+    CIMType type = CIMTYPE_STRING;
+    bool isArray = false;
+    bool isKey = false;
+    bool isEmbedded = false;       // an embedded object or instance, or a string that stands for one
+    bool isEmbeddedObject = false; // the former
     CIMName referenceClass;
     CIMValue initial; // null of the declared type, or the class's default
 };

@@ -35,8 +35,8 @@ Frame::~Frame()
 Frame& Frame::current()
 {
     if (tCurrent == nullptr) {
-        static thread_local Frame root;
-        tCurrent = &root;
+        static thread_local Frame fgRoot;
+        tCurrent = &fgRoot;
     }
     return *tCurrent;
 }

@@ -41,7 +41,7 @@ CMPIStatus setHostname(const CMPIObjectPath* self, const char* text)
 {
     return perform([&] {
         const String host = fromUtf8(requireText(text));
-        CIMObjectPath(host, CIMNamespaceName(), CIMName("Any")); // throws for what is no host
+        const CIMObjectPath path(host, CIMNamespaceName(), CIMName("Any")); // throws for what is no host
         stateOf(self).host = host;
     });
 }

@@ -60,11 +60,11 @@ CIMValue valueOfBinding(const CIMKeyBinding& binding)
 // The binding as the class types its key; as it stands where the class is unknown or the text does not fit.
 CIMValue typedKey(const ClassSchema* schema, const CIMKeyBinding& binding)
 {
-    const CIMValue value = valueOfBinding(binding);
+    CIMValue value = valueOfBinding(binding);
     const std::size_t at = schema ? schema->find(utf8(binding.getName())) : ClassSchema::kNotFound;
     if (at == ClassSchema::kNotFound)
         return value;
-    const CIMValue converted = convertKey(value, schema->properties()[at].type);
+    CIMValue converted = convertKey(value, schema->properties()[at].type);
     return converted.isNull() ? value : converted;
 }
 

@@ -88,6 +88,7 @@ template <class Object, class Face> CMPIStatus releaseObject(Face* face) noexcep
 template <class Object, class Face> Face* cloneObject(const Face* face, CMPIStatus* rc) noexcept
 {
     return answer(rc, static_cast<Face*>(nullptr), [&]() -> Face* {
+        // NOLINTNEXTLINE(bugprone-unhandled-exception-at-new): answer() handles it
         auto* copy = new Object(objectOf<Object>(face));
         copy->lifetime = Lifetime::kClone;
         return copy;

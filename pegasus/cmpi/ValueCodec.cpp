@@ -40,7 +40,7 @@ constexpr std::array kTypes{
 template <class T> T read(const CMPIValue* value)
 {
     T result;
-    std::memcpy(&result, value, sizeof(T));
+    std::memcpy(&result, value, sizeof(T)); // NOLINT(bugprone-sizeof-expression): pointers are meant too
     return result;
 }
 
@@ -186,7 +186,7 @@ template <class Visitor> auto visitType(CIMType type, Visitor&& visit)
 template <class T> CMPIData plainData(CMPIType type, T value)
 {
     CMPIData data{type, CMPI_goodValue, {}};
-    std::memcpy(&data.value, &value, sizeof(T));
+    std::memcpy(&data.value, &value, sizeof(T)); // NOLINT(bugprone-sizeof-expression): pointers are meant too
     return data;
 }
 

@@ -169,7 +169,7 @@ template <class T> T* Array<T>::makeRoom(Uint32 index, Uint32 count)
 
 template <class T> void Array<T>::grow(Uint32 size, const T& x)
 {
-    const T copy(x);
+    const T copy(x); // NOLINT(performance-unnecessary-copy-initialization): x may be one of ours
     T* gap = makeRoom(this->size(), size);
     for (Uint32 i = 0; i < size; ++i)
         gap[i] = copy;
@@ -199,7 +199,7 @@ template <class T> void Array<T>::append(const T* x, Uint32 size)
 
 template <class T> void Array<T>::appendArray(const Array<T>& x)
 {
-    const Array<T> kept(x);
+    const Array<T> kept(x); // NOLINT(performance-unnecessary-copy-initialization): x may be *this
     insert(size(), kept.getData(), kept.size());
 }
 

@@ -134,7 +134,7 @@ Boolean CIMConstClass::identical(const CIMConstClass& cimClass) const
 CIMClass CIMConstClass::clone() const
 {
     auto* copy = new CIMClassRep(fRep.checked());
-    const CIMClass cimClass = ObjectAccess::wrap<CIMClass>(copy);
+    CIMClass cimClass = ObjectAccess::wrap<CIMClass>(copy);
     copy->fQualifiers = ObjectAccess::clone(copy->fQualifiers);
     copy->fProperties = ObjectAccess::clone(copy->fProperties);
     copy->fMethods = ObjectAccess::clone(copy->fMethods);

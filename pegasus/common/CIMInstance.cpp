@@ -106,7 +106,7 @@ Boolean CIMConstInstance::identical(const CIMConstInstance& instance) const
 CIMInstance CIMConstInstance::clone() const
 {
     auto* copy = new CIMInstanceRep(fRep.checked());
-    const CIMInstance instance = ObjectAccess::wrap<CIMInstance>(copy);
+    CIMInstance instance = ObjectAccess::wrap<CIMInstance>(copy);
     copy->fQualifiers = ObjectAccess::clone(copy->fQualifiers);
     copy->fProperties = ObjectAccess::clone(copy->fProperties);
     return instance;

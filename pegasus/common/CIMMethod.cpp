@@ -77,7 +77,7 @@ Boolean CIMConstParameter::identical(const CIMConstParameter& parameter) const
 CIMParameter CIMConstParameter::clone() const
 {
     auto* copy = new CIMParameterRep(fRep.checked());
-    const CIMParameter parameter = ObjectAccess::wrap<CIMParameter>(copy);
+    CIMParameter parameter = ObjectAccess::wrap<CIMParameter>(copy);
     copy->fQualifiers = ObjectAccess::clone(copy->fQualifiers);
     return parameter;
 }
@@ -181,7 +181,7 @@ Boolean CIMConstMethod::identical(const CIMConstMethod& method) const
 CIMMethod CIMConstMethod::clone() const
 {
     auto* copy = new CIMMethodRep(fRep.checked());
-    const CIMMethod method = ObjectAccess::wrap<CIMMethod>(copy);
+    CIMMethod method = ObjectAccess::wrap<CIMMethod>(copy);
     copy->fQualifiers = ObjectAccess::clone(copy->fQualifiers);
     copy->fParameters = ObjectAccess::clone(copy->fParameters);
     return method;

@@ -101,7 +101,7 @@ Boolean CIMConstProperty::identical(const CIMConstProperty& property) const
 CIMProperty CIMConstProperty::clone() const
 {
     auto* copy = new CIMPropertyRep(fRep.checked());
-    const CIMProperty property = ObjectAccess::wrap<CIMProperty>(copy);
+    CIMProperty property = ObjectAccess::wrap<CIMProperty>(copy);
     copy->fQualifiers = ObjectAccess::clone(copy->fQualifiers);
     return property;
 }

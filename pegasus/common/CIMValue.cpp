@@ -224,9 +224,9 @@ CIMType CIMValue::getType() const
 
 void CIMValue::setNullValue(CIMType type, Boolean isArray, Uint32 arraySize)
 {
-    static const SharedNulls shared;
+    static const SharedNulls kShared;
     const bool isPlain = !isArray && type >= CIMTYPE_BOOLEAN && type <= CIMTYPE_INSTANCE;
-    fRep = isPlain ? shared.ofType[type] : makeNull(type, isArray, arraySize);
+    fRep = isPlain ? kShared.ofType[type] : makeNull(type, isArray, arraySize);
 }
 
 #define PEGASUS_VALUE_SET_GET(PARAMETER, T)                                                                            \
@@ -238,7 +238,7 @@ void CIMValue::setNullValue(CIMType type, Boolean isArray, Uint32 arraySize)
     {                                                                                                                  \
         *this = CIMValue(x);                                                                                           \
     }                                                                                                                  \
-    void CIMValue::get(T& x) const                                                                                     \
+    void CIMValue::get(T& x) const /* NOLINT(bugprone-macro-parentheses) */                                            \
     {                                                                                                                  \
         getScalar(fRep, x);                                                                                            \
     }                                                                                                                  \

@@ -45,7 +45,7 @@ struct CIMValueRep : RefCounted
     bool fIsArray = false;
     bool fIsNull = true;
     Uint32 fNullArraySize = 0; ///< the size given with a null array
-    alignas(8) unsigned char fStorage[8];
+    alignas(8) unsigned char fStorage[8] = {};
 
     CIMValueRep() = default;
     CIMValueRep(const CIMValueRep&) = delete;

@@ -70,13 +70,13 @@ template <class Item> void addNew(const XmlElement& element, Array<Item>& items,
 /// A string property whose qualifiers say so holds embedded objects, also where the attribute is missing.
 CIMType embeddedByQualifier(CIMType type, const Array<CIMQualifier>& qualifiers)
 {
-    static const CIMName embeddedObject("EmbeddedObject");
-    static const CIMName embeddedInstance("EmbeddedInstance");
+    static const CIMName kEmbeddedObject("EmbeddedObject");
+    static const CIMName kEmbeddedInstance("EmbeddedInstance");
     if (type != CIMTYPE_STRING || qualifiers.size() == 0)
         return type;
-    if (ObjectAccess::isTrue(qualifiers, embeddedObject))
+    if (ObjectAccess::isTrue(qualifiers, kEmbeddedObject))
         return CIMTYPE_OBJECT;
-    const Uint32 index = ObjectAccess::find(qualifiers, embeddedInstance);
+    const Uint32 index = ObjectAccess::find(qualifiers, kEmbeddedInstance);
     return index != PEG_NOT_FOUND && qualifiers[index].getType() == CIMTYPE_STRING ? CIMTYPE_INSTANCE : type;
 }
 
@@ -239,7 +239,7 @@ CIMQualifierDecl ElementDecoder::decodeQualifierDeclaration(const XmlElement& el
 
 CIMProperty ElementDecoder::decodeProperty(const XmlElement& element)
 {
-    const CIMProperty property = ObjectAccess::wrap<CIMProperty>(new CIMPropertyRep());
+    CIMProperty property = ObjectAccess::wrap<CIMProperty>(new CIMPropertyRep());
     CIMPropertyRep& rep = ObjectAccess::rep(property);
     if (element.is("PROPERTY.REFERENCE"))
         readReferenceProperty(element, rep);
@@ -298,7 +298,7 @@ CIMParameter ElementDecoder::decodeParameter(const XmlElement& element)
     std::string_view values[std::size(kParameterAttributes)];
     element.attributes(kParameterAttributes, values);
     const bool isReference = isOneOf(element, {"PARAMETER.REFERENCE", "PARAMETER.REFARRAY"});
-    const CIMParameter parameter = ObjectAccess::wrap<CIMParameter>(new CIMParameterRep());
+    CIMParameter parameter = ObjectAccess::wrap<CIMParameter>(new CIMParameterRep());
     CIMParameterRep& rep = ObjectAccess::rep(parameter);
     rep.fName = nameAttribute(element, "NAME", values[0]);
     rep.fIsArray = isOneOf(element, {"PARAMETER.ARRAY", "PARAMETER.REFARRAY"});
@@ -314,7 +314,7 @@ CIMMethod ElementDecoder::decodeMethod(const XmlElement& element)
 {
     std::string_view values[std::size(kMethodAttributes)];
     element.attributes(kMethodAttributes, values);
-    const CIMMethod method = ObjectAccess::wrap<CIMMethod>(new CIMMethodRep());
+    CIMMethod method = ObjectAccess::wrap<CIMMethod>(new CIMMethodRep());
     CIMMethodRep& rep = ObjectAccess::rep(method);
     rep.fName = nameAttribute(element, "NAME", values[0]);
     rep.fType = embeddedType(element, typeAttribute(element, "TYPE", values[1]), values[4], values[5]);
@@ -334,7 +334,7 @@ CIMClass ElementDecoder::decodeClass(const XmlElement& element)
     std::string_view values[2];
     element.attributes({"NAME", "SUPERCLASS"}, values);
     const CIMName name = nameAttribute(element, "NAME", values[0]);
-    const CIMClass cimClass(name, optionalName(element, "SUPERCLASS", values[1]));
+    CIMClass cimClass(name, optionalName(element, "SUPERCLASS", values[1]));
     CIMClassRep& rep = ObjectAccess::rep(cimClass);
     XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
     child = decodeProperties(child, rep.fProperties);

@@ -74,7 +74,7 @@ sockaddr_un addressIn(int homeFd)
 
 int connectRetrying(int fd, const sockaddr_un& address)
 {
-    int result;
+    int result = -1;
     do
         result = ::connect(fd, reinterpret_cast<const sockaddr*>(&address), sizeof(address));
     while (result < 0 && errno == EINTR);
@@ -94,7 +94,7 @@ int connectLocalSocket(const std::string& home, int timeoutMs)
     const Descriptor folder(openHome(home));
     Descriptor socket(newSocket(home));
     const int bound = std::max(timeoutMs, 1); // 0 would mean for ever
-    const timeval limit{bound / 1000, (bound % 1000) * 1000};
+    const timeval limit{bound / 1000, (bound % 1000) * 1000L};
     if (::setsockopt(socket.get(), SOL_SOCKET, SO_SNDTIMEO, &limit, sizeof(limit)) < 0)
         fail("cannot set the time-out of", home);
     if (connectRetrying(socket.get(), addressIn(folder.get())) < 0)

@@ -291,7 +291,7 @@ String& String::append(const String& str)
 {
     if (size() == 0)
         return *this = str;
-    const String kept(str);
+    const String kept(str); // NOLINT(performance-unnecessary-copy-initialization): str may be *this
     return append(kept.getChar16Data(), kept.size());
 }
 

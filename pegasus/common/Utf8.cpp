@@ -18,7 +18,7 @@ std::size_t copyAsciiBlocks(const char* from, std::size_t size, Char16* to) noex
 {
     std::size_t done = 0;
     for (; size - done >= kBlock; done += kBlock) {
-        std::uint64_t block;
+        std::uint64_t block = 0;
         std::memcpy(&block, from + done, kBlock);
         if (block & 0x8080808080808080u)
             break;

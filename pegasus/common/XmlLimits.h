@@ -13,13 +13,13 @@ struct XmlLimits
     /// Attributes of one element.
     std::size_t maxAttributes = 32;
     /// Bytes of one tag, comment or processing instruction.
-    std::size_t maxTagBytes = 64 * 1024;
+    std::size_t maxTagBytes = 64UL * 1024;
     /// Bytes of character data in one element, as they stand in the message.
-    std::size_t maxTextBytes = 16 * 1024 * 1024;
+    std::size_t maxTextBytes = 16UL * 1024 * 1024;
     /// Bytes of one element that is decoded as a whole (an instance, a class).
-    std::size_t maxElementBytes = 64 * 1024 * 1024;
+    std::size_t maxElementBytes = 64UL * 1024 * 1024;
     /// Elements of one array value.
-    std::size_t maxArrayElements = 1024 * 1024;
+    std::size_t maxArrayElements = 1024UL * 1024;
     /// Key bindings of one object path, nested ones not counted.
     std::size_t maxKeyBindings = 256;
     /// Embedded objects in embedded objects.

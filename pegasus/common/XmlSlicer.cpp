@@ -11,7 +11,7 @@ using Kind = XmlError::Kind;
 using Type = XmlToken::Type;
 
 /// Elements are delivered when so much of them is there, or when the bytes at hand are used up.
-constexpr std::size_t kBatchBytes = 64 * 1024;
+constexpr std::size_t kBatchBytes = 64UL * 1024;
 
 } // namespace
 

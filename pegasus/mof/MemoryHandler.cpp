@@ -56,7 +56,7 @@ bool MemoryHandler::createClass(const CIMClass& newClass)
     if (fWholeClasses.count(key) != 0)
         return false;
     CIMClass whole = newClass.clone();
-    const CIMName superName = newClass.getSuperClassName();
+    const CIMName& superName = newClass.getSuperClassName();
     if (!superName.isNull()) {
         CIMClass superClass;
         if (!findClass(superName, superClass))

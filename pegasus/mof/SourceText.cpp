@@ -34,7 +34,7 @@ class Descriptor
 
 ssize_t readSome(int descriptor, char* buffer, std::size_t size)
 {
-    ssize_t count;
+    ssize_t count = -1;
     do
         count = ::read(descriptor, buffer, size);
     while (count < 0 && errno == EINTR);

@@ -19,22 +19,22 @@ ClassStore::ClassStore(Storage& storage, ObjectText& texts, QualifierStore& qual
 CIMClass ClassStore::resolved(NamespaceId nameSpace, const CIMName& name)
 {
     const std::string key = folded(name);
-    const CIMClass cached = fCache.find(nameSpace, key);
+    CIMClass cached = fCache.find(nameSpace, key);
     if (!cached.isUninitialized())
         return cached;
     const std::optional<std::string> text = fStorage.findClass(nameSpace, key);
     if (!text)
         return CIMClass();
     const CIMClass local = withEmbeddedTypes(fTexts.toClass(*text));
-    const CIMName superName = local.getSuperClassName();
-    const CIMClass whole = resolveClass(local, superName.isNull() ? CIMClass() : resolved(nameSpace, superName));
+    const CIMName& superName = local.getSuperClassName();
+    CIMClass whole = resolveClass(local, superName.isNull() ? CIMClass() : resolved(nameSpace, superName));
     fCache.insert(nameSpace, key, whole);
     return whole;
 }
 
 CIMClass ClassStore::existing(NamespaceId nameSpace, const CIMName& name)
 {
-    const CIMClass whole = resolved(nameSpace, name);
+    CIMClass whole = resolved(nameSpace, name);
     if (whole.isUninitialized())
         fail(CIM_ERR_NOT_FOUND, utf8(name));
     return whole;
@@ -48,7 +48,7 @@ CIMClass ClassStore::get(NamespaceId nameSpace, const CIMName& name, const Class
 std::shared_ptr<const std::string> ClassStore::text(NamespaceId nameSpace, const CIMName& name,
                                                     const ClassOptions& options)
 {
-    const CIMClass whole = existing(nameSpace, name);
+    CIMClass whole = existing(nameSpace, name);
     if (options.propertyList.isNull())
         return fCache.text(nameSpace, folded(name), options);
     auto made = std::make_shared<std::string>();
@@ -103,7 +103,7 @@ void ClassStore::remove(NamespaceId nameSpace, const CIMName& name)
 void ClassStore::put(NamespaceId nameSpace, const CIMConstClass& newClass)
 {
     checkDepth(nameSpace, newClass);
-    const CIMClass superClass = resolvedSuperClass(nameSpace, newClass);
+    CIMClass superClass = resolvedSuperClass(nameSpace, newClass);
     const CIMClass local = checkClass(newClass, superClass, fQualifiers.lookupIn(nameSpace));
     const std::string text = fTexts.fromClass(local);
     fStorage.putClass(nameSpace, utf8(local.getClassName()), utf8(local.getSuperClassName()), text);
@@ -112,10 +112,10 @@ void ClassStore::put(NamespaceId nameSpace, const CIMConstClass& newClass)
 
 CIMClass ClassStore::resolvedSuperClass(NamespaceId nameSpace, const CIMConstClass& newClass)
 {
-    const CIMName superName = newClass.getSuperClassName();
+    const CIMName& superName = newClass.getSuperClassName();
     if (superName.isNull())
         return CIMClass();
-    const CIMClass superClass = resolved(nameSpace, superName);
+    CIMClass superClass = resolved(nameSpace, superName);
     if (superClass.isUninitialized() || superName.equal(newClass.getClassName()))
         fail(CIM_ERR_INVALID_SUPERCLASS, utf8(superName));
     return superClass;

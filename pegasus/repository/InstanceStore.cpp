@@ -24,7 +24,7 @@ CIMObjectPath InstanceStore::create(NamespaceId nameSpace, const CIMConstInstanc
 {
     const CIMClass itsClass = classOf(nameSpace, newInstance.getClassName());
     const CIMInstance completed = completeInstance(newInstance, itsClass);
-    const CIMObjectPath path = instancePath(completed, itsClass);
+    CIMObjectPath path = instancePath(completed, itsClass);
     const std::string key = pathKey(path);
     if (fStorage.findInstance(nameSpace, key))
         fail(CIM_ERR_ALREADY_EXISTS, utf8(path.toString()));
@@ -70,7 +70,7 @@ std::vector<CIMInstance> InstanceStore::nextBatch(NamespaceId nameSpace, const C
 
 CIMClass InstanceStore::classOf(NamespaceId nameSpace, const CIMName& name)
 {
-    const CIMClass itsClass = fClasses.resolved(nameSpace, name);
+    CIMClass itsClass = fClasses.resolved(nameSpace, name);
     if (itsClass.isUninitialized())
         fail(CIM_ERR_INVALID_CLASS, utf8(name));
     return itsClass;

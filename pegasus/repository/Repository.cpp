@@ -92,7 +92,7 @@ std::vector<CIMNamespaceName> Repository::namespaces() const
 CIMQualifierDecl Repository::getQualifier(const CIMNamespaceName& nameSpace, const CIMName& name) const
 {
     const Lock lock(fState->mutex);
-    const CIMQualifierDecl found = fState->qualifiers.find(fState->namespaces.id(nameSpace), name);
+    CIMQualifierDecl found = fState->qualifiers.find(fState->namespaces.id(nameSpace), name);
     if (found.isUninitialized())
         fail(CIM_ERR_NOT_FOUND, utf8(name));
     return found;

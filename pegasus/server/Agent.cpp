@@ -85,7 +85,7 @@ Descriptor receiveChannel()
     message.msg_iovlen = 1;
     message.msg_control = space;
     message.msg_controllen = sizeof space;
-    ssize_t n;
+    ssize_t n = -1;
     do
         n = ::recvmsg(kControlFd, &message, MSG_CMSG_CLOEXEC);
     while (n < 0 && errno == EINTR);

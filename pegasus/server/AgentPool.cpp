@@ -78,7 +78,7 @@ CimStatus AgentPool::requestOnce(const std::string& module, const AgentRequest& 
     const AtEnd releaser([&] { release(module); });
     try {
         std::unique_ptr<AgentChannel> channel = process->takeChannel();
-        const CimStatus status = channel->request(request, sink, patience);
+        CimStatus status = channel->request(request, sink, patience);
         process->giveBack(std::move(channel));
         succeeded(module);
         return status;

@@ -38,8 +38,8 @@ SocketPair makeSocketPair()
 // What posix_spawn needs; freed with it.
 struct SpawnPlan
 {
-    posix_spawn_file_actions_t actions;
-    posix_spawnattr_t attributes;
+    posix_spawn_file_actions_t actions{};
+    posix_spawnattr_t attributes{};
 
     explicit SpawnPlan(int control)
     {
@@ -96,7 +96,7 @@ bool sendDescriptor(int control, int fd)
     header->cmsg_type = SCM_RIGHTS;
     header->cmsg_len = CMSG_LEN(sizeof fd);
     std::memcpy(CMSG_DATA(header), &fd, sizeof fd);
-    ssize_t n;
+    ssize_t n = -1;
     do
         n = ::sendmsg(control, &message, MSG_NOSIGNAL);
     while (n < 0 && errno == EINTR);

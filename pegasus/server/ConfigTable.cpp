@@ -12,7 +12,7 @@ namespace Pegasus::server {
 const std::vector<ConfigProperty>& configTable()
 {
     using Kind = ConfigProperty::Kind;
-    static const std::vector<ConfigProperty> table = {
+    static const std::vector<ConfigProperty> kTable = {
         {"httpPort", "5988", Kind::kPort, false, "TCP port on 127.0.0.1"},
         {"enableHttpConnection", "true", Kind::kBoolean, false, "listen on the TCP port at all"},
         {"enableHttpsConnection", "false", Kind::kFalse, false, "TLS; not offered by this server"},
@@ -36,7 +36,7 @@ const std::vector<ConfigProperty>& configTable()
         {"agentIdleTimeout", "300", Kind::kCountOrZero, true, "seconds after which an idle agent is ended; 0: never"},
         {"agentMemoryMegabytes", "4096", Kind::kCountOrZero, true, "memory that an agent may take; 0: any"},
     };
-    return table;
+    return kTable;
 }
 
 const ConfigProperty* findConfigProperty(const std::string& name)

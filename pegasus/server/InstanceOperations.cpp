@@ -146,7 +146,7 @@ void enumerateInstanceNames(ServerCore& core, const CimRequest& request, Element
 void createInstance(ServerCore& core, const CimRequest& request, ElementSink& answer)
 {
     const CIMInstance instance = request.parameters.instance("NewInstance");
-    const CIMName className = instance.getClassName();
+    const CIMName& className = instance.getClassName();
     CIMObjectPath path;
     if (isNamespaceClass(className)) {
         path = createNamespace(core, request.nameSpace, instance);

@@ -25,8 +25,8 @@ struct LogState
 
 LogState& state()
 {
-    static LogState instance;
-    return instance;
+    static LogState fgInstance;
+    return fgInstance;
 }
 
 void reopen(LogState& log)

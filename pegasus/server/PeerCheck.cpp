@@ -111,7 +111,7 @@ std::optional<uid_t> tcpPeerUserFromNetlink(int fd)
     if (::send(netlink.get(), &request, sizeof request, 0) != static_cast<ssize_t>(sizeof request))
         return std::nullopt;
     char answer[4096];
-    ssize_t size;
+    ssize_t size = -1;
     do
         size = ::recv(netlink.get(), answer, sizeof answer, 0);
     while (size < 0 && errno == EINTR);

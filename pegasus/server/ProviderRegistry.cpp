@@ -114,7 +114,7 @@ CIMObjectPath ProviderRegistry::registerInstance(const CIMInstance& instance)
         if (!isStored(fRepository, capabilitiesPath(registration))) // else the repository says that it exists
             checkNotTaken(registration);
     }
-    const CIMObjectPath path = fRepository.createInstance(interop(), registration);
+    CIMObjectPath path = fRepository.createInstance(interop(), registration);
     const std::lock_guard<std::mutex> lock(fMutex);
     fLoaded = false;
     return path;

@@ -17,8 +17,8 @@ namespace lnx {
 class SystemTree
 {
   public:
-    static constexpr std::size_t kMaxFileBytes = 4U * 1024 * 1024; // /proc/cpuinfo of a machine with 1,000 processors
-    static constexpr std::size_t kMaxEntries = 100'000;            // of one directory; more are not looked at
+    static constexpr std::size_t kMaxFileBytes = 4UL * 1024 * 1024; // /proc/cpuinfo of a machine with 1,000 processors
+    static constexpr std::size_t kMaxEntries = 100'000;             // of one directory; more are not looked at
 
     explicit SystemTree(std::string root = "/") : fRoot(std::move(root)) {}
 

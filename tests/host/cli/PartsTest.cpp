@@ -8,9 +8,9 @@
 
 #include <gtest/gtest.h>
 
-#include <cli/LossLog.h>
 #include <cli/LossRules.h>
-#include <cli/PrivateServer.h>
+#include <cli/TLossLog.h>
+#include <cli/TPrivateServer.h>
 #include <host/TOSSpecific.h>
 #include <host/TRootObject.h>
 
@@ -96,7 +96,7 @@ TEST(LossRules, Programs)
 }
 
 // A failed attempt to start the server is a loss only when none succeeds, and then it is the cause that comes first.
-TEST(LossLog, FailedServerStartsCountWhenTheServerIsNeeded)
+TEST(TLossLog, FailedServerStartsCountWhenTheServerIsNeeded)
 {
     const auto run = [](const std::string& name) {
         std::string output;
@@ -104,7 +104,7 @@ TEST(LossLog, FailedServerStartsCountWhenTheServerIsNeeded)
     };
     const std::string start = "the server did not start, cimserver: exit status 1";
     const std::string config = "cimconfig -c exit 1 failed: exit status 1";
-    LossLog retried("/"), failed("/");
+    TLossLog retried("/"), failed("/");
     NKOLVRX20::TRootObject::SetCoreLogger(&retried);
     run("cimserver");
     retried.Log(NKOLVRX20::ILogger::kInfo, "TPEGASUSNamespace::connect succeeded \n");
@@ -158,14 +158,14 @@ class PrivateServerTest : public testing::Test
 TEST_F(PrivateServerTest, EndsTheServerOfItsOwnTree)
 {
     const pid_t pid = Start(fRoot + "/pegasus/bin/cimserver");
-    PrivateServer(fRoot, fConsumer).End();
+    TPrivateServer(fRoot, fConsumer).End();
     EXPECT_EQ(WTERMSIG(Reap(pid)), SIGTERM);
 }
 
 TEST_F(PrivateServerTest, LeavesAnyOtherProcessAlone)
 {
     const pid_t pid = Start("/bin/sleep");
-    const PrivateServer server(fRoot, fConsumer);
+    const TPrivateServer server(fRoot, fConsumer);
     server.End();
     for (const char* text : {"", "none", "0", "1", "-1", "99999999999999999999"}) {
         std::ofstream(fStartFile) << text;

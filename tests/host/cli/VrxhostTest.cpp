@@ -13,7 +13,7 @@
 #include <nlohmann/json.hpp>
 
 #include <core/TChildProcess.h>
-#include <core/UniqueFd.h>
+#include <core/TUniqueFd.h>
 
 namespace {
 
@@ -345,7 +345,7 @@ TEST_F(Vrxhost, SecondInterruptionEndsAtOnce)
 TEST_F(Vrxhost, SecondHostInOneRootIsRefused)
 {
     std::ofstream(fRoot / "vrxhost.log") << "of the first";
-    const NKOLVRX20::UniqueFd root(::open(fRoot.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    const NKOLVRX20::TUniqueFd root(::open(fRoot.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
     ASSERT_EQ(::flock(root.Get(), LOCK_EX | LOCK_NB), 0);
     const auto outcome = Run({"inventory"});
     EXPECT_TRUE(HasStatus(outcome, 1));

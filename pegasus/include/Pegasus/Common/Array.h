@@ -20,7 +20,7 @@ template <class T> class PEGASUS_COMMON_LINKAGE Array
     Array(Uint32 size, const T& x);
     Array(const T* items, Uint32 size);
     ~Array();
-    Array<T>& operator=(const Array<T>& x) noexcept;
+    Array<T>& operator=(const Array<T>& x) noexcept; // NOLINT(bugprone-unhandled-self-assignment): copies, then swaps
     Array<T>& operator=(Array<T>&& x) noexcept
     {
         swap(x);

@@ -1,4 +1,4 @@
-#include "StopSignals.h"
+#include "TStopSignals.h"
 
 #include <cerrno>
 
@@ -10,7 +10,7 @@
 
 namespace vrxhost {
 
-StopSignals::StopSignals(std::function<void()> onFirst)
+TStopSignals::TStopSignals(std::function<void()> onFirst)
     : fOnFirst(std::move(onFirst)), fEvent(::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK))
 {
     sigemptyset(&fSignals);
@@ -21,16 +21,16 @@ StopSignals::StopSignals(std::function<void()> onFirst)
     fFirstThread = std::thread([this] { AwaitFirst(); });
 }
 
-StopSignals::~StopSignals()
+TStopSignals::~TStopSignals()
 {
     fEnding = true;
     ::eventfd_write(fEvent.Get(), 1);
-    pthread_kill(fSignalThread.native_handle(), SIGTERM);
+    pthread_kill(fSignalThread.native_handle(), SIGHUP); // any of the three wakes it
     fSignalThread.join();
     fFirstThread.join();
 }
 
-void StopSignals::AwaitSignals()
+void TStopSignals::AwaitSignals()
 {
     for (int number = 0; sigwait(&fSignals, &number) == 0 && !fEnding;) {
         if (fStopped.exchange(true))
@@ -40,7 +40,7 @@ void StopSignals::AwaitSignals()
 }
 
 // On a thread of its own, so that the second signal is heard while this is under way.
-void StopSignals::AwaitFirst()
+void TStopSignals::AwaitFirst()
 {
     pollfd event = {fEvent.Get(), POLLIN, 0};
     while (::poll(&event, 1, -1) < 0 && errno == EINTR)

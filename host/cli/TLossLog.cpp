@@ -1,4 +1,4 @@
-#include "LossLog.h"
+#include "TLossLog.h"
 
 #include <core/TCoreLogger.h>
 #include <core/TProcessLog.h>
@@ -28,9 +28,9 @@ std::string WithoutLineFeed(const std::string& text)
 
 } // namespace
 
-LossLog::LossLog(const std::string& root) : fRoot(root) {}
+TLossLog::TLossLog(const std::string& root) : fRoot(root) {}
 
-void LossLog::Log(EVRXLogSeverity severity, const std::string& text)
+void TLossLog::Log(EVRXLogSeverity severity, const std::string& text)
 {
     NKOLVRX20::TCoreLogger::Instance().Log(severity, text);
     const std::lock_guard<std::mutex> lock(fMutex);
@@ -38,7 +38,7 @@ void LossLog::Log(EVRXLogSeverity severity, const std::string& text)
     Learn(severity, text);
 }
 
-void LossLog::Learn(EVRXLogSeverity severity, const std::string& text)
+void TLossLog::Learn(EVRXLogSeverity severity, const std::string& text)
 {
     if (BeginsWith(text, kConnected))
         fHeldBack.clear();
@@ -54,14 +54,14 @@ void LossLog::Learn(EVRXLogSeverity severity, const std::string& text)
         Enter("provider description " + fLoadedFile + ", line " + text.substr(sizeof kDescription - 1));
 }
 
-void LossLog::Add(const std::string& sentence)
+void TLossLog::Add(const std::string& sentence)
 {
     const std::lock_guard<std::mutex> lock(fMutex);
     Enter(sentence);
 }
 
 // The line of a failed program comes right after the program was kept, so the sentences stay in order.
-void LossLog::LearnFromPrograms()
+void TLossLog::LearnFromPrograms()
 {
     for (const auto& program : NKOLVRX20::TProcessLog::Instance().Take()) {
         const auto sentence = LossOfProgram(program, fRoot);
@@ -76,26 +76,26 @@ void LossLog::LearnFromPrograms()
     }
 }
 
-void LossLog::AddHeldBack()
+void TLossLog::AddHeldBack()
 {
     const std::lock_guard<std::mutex> lock(fMutex);
     Release();
 }
 
-void LossLog::Release()
+void TLossLog::Release()
 {
     if (!fHeldBack.empty())
         Enter(fHeldBack);
     fHeldBack.clear();
 }
 
-std::vector<std::string> LossLog::GetSentences() const
+std::vector<std::string> TLossLog::GetSentences() const
 {
     const std::lock_guard<std::mutex> lock(fMutex);
     return fSentences;
 }
 
-void LossLog::Enter(const std::string& sentence)
+void TLossLog::Enter(const std::string& sentence)
 {
     if (fKnown.insert(sentence).second)
         fSentences.push_back(sentence);

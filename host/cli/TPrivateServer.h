@@ -1,15 +1,15 @@
-#ifndef VRX_CLI_PRIVATESERVER_H
-#define VRX_CLI_PRIVATESERVER_H
+#ifndef VRX_CLI_TPRIVATESERVER_H
+#define VRX_CLI_TPRIVATESERVER_H
 
 #include <string>
 
 namespace vrxhost {
 
 // The private server as the host sees it: programs below the root, and a start file that names its process.
-class PrivateServer
+class TPrivateServer
 {
   public:
-    PrivateServer(const std::string& root, const std::string& consumer);
+    TPrivateServer(const std::string& root, const std::string& consumer);
 
     // Plans the consumer's name for the server's next start.
     // Returns: empty, or why it could not be done.

@@ -1,5 +1,5 @@
-#ifndef VRX_UNIQUEFD_H
-#define VRX_UNIQUEFD_H
+#ifndef VRX_TUNIQUEFD_H
+#define VRX_TUNIQUEFD_H
 
 #include <utility>
 
@@ -8,18 +8,18 @@
 namespace NKOLVRX20 {
 
 // Owns one file descriptor.
-class UniqueFd
+class TUniqueFd
 {
   public:
-    UniqueFd() noexcept : fFd(-1) {}
-    explicit UniqueFd(int fd) noexcept : fFd(fd) {}
-    UniqueFd(UniqueFd&& other) noexcept : fFd(std::exchange(other.fFd, -1)) {}
-    UniqueFd& operator=(UniqueFd&& other) noexcept
+    TUniqueFd() noexcept : fFd(-1) {}
+    explicit TUniqueFd(int fd) noexcept : fFd(fd) {}
+    TUniqueFd(TUniqueFd&& other) noexcept : fFd(std::exchange(other.fFd, -1)) {}
+    TUniqueFd& operator=(TUniqueFd&& other) noexcept
     {
         std::swap(fFd, other.fFd);
         return *this;
     }
-    ~UniqueFd() { Reset(); }
+    ~TUniqueFd() { Reset(); }
 
     int Get() const noexcept { return fFd; }
     explicit operator bool() const noexcept { return fFd >= 0; }

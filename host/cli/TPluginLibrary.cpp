@@ -1,4 +1,4 @@
-#include "PluginLibrary.h"
+#include "TPluginLibrary.h"
 
 #include <atomic>
 #include <chrono>
@@ -45,7 +45,7 @@ bool AwaitThreadCount(std::size_t count)
 
 } // namespace
 
-PluginLibrary::PluginLibrary(const std::string& path) : fPath(path), fThreadCountBefore(ThreadCount())
+TPluginLibrary::TPluginLibrary(const std::string& path) : fPath(path), fThreadCountBefore(ThreadCount())
 {
     const std::string error = Guarded([this] { fHandle = ::dlopen(fPath.c_str(), RTLD_NOW | RTLD_LOCAL); });
     if (!error.empty())
@@ -60,18 +60,18 @@ PluginLibrary::PluginLibrary(const std::string& path) : fPath(path), fThreadCoun
     }
 }
 
-PluginLibrary::~PluginLibrary()
+TPluginLibrary::~TPluginLibrary()
 {
     if (fHandle)
         Unload();
 }
 
-bool PluginLibrary::HasLeftThreads()
+bool TPluginLibrary::HasLeftThreads()
 {
     return gHasLeftThreads;
 }
 
-PluginLibrary::TEntryPoint PluginLibrary::Symbol(const char* name) const
+TPluginLibrary::TEntryPoint TPluginLibrary::Symbol(const char* name) const
 {
     void* const symbol = ::dlsym(fHandle, name);
     if (!symbol)
@@ -79,7 +79,7 @@ PluginLibrary::TEntryPoint PluginLibrary::Symbol(const char* name) const
     return reinterpret_cast<TEntryPoint>(symbol);
 }
 
-void PluginLibrary::Register()
+void TPluginLibrary::Register()
 {
     const TEntryPoint initialize = Symbol(NKOLVRX20::kInitializeSymbol);
     fClearNamespace = Symbol(NKOLVRX20::kClearNamespaceSymbol);
@@ -94,13 +94,13 @@ void PluginLibrary::Register()
         throw TPluginError("the plug-in " + fPath + " registered no provider named \"" + kProviderName + "\"");
 }
 
-void PluginLibrary::Unregister()
+void TPluginLibrary::Unregister()
 {
     TRootObject::GetNamespaceProviderManager()->UnregisterNamespaceProvider(fProvider);
     fProvider.reset();
 }
 
-std::string PluginLibrary::Unload()
+std::string TPluginLibrary::Unload()
 {
     std::string problems = Guarded([this] { fClearNamespace(); });
     if (!problems.empty())

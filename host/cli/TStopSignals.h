@@ -1,5 +1,5 @@
-#ifndef VRX_CLI_STOPSIGNALS_H
-#define VRX_CLI_STOPSIGNALS_H
+#ifndef VRX_CLI_TSTOPSIGNALS_H
+#define VRX_CLI_TSTOPSIGNALS_H
 
 #include <atomic>
 #include <functional>
@@ -7,21 +7,21 @@
 
 #include <signal.h>
 
-#include <core/UniqueFd.h>
+#include <core/TUniqueFd.h>
 
 namespace vrxhost {
 
 // ^C and its relatives (SIGINT, SIGTERM, SIGHUP): the first calls a function on a thread of its own, the second ends
 // the process at once. Must be made before any other thread starts, so that all inherit the blocked signals.
-class StopSignals
+class TStopSignals
 {
   public:
-    explicit StopSignals(std::function<void()> onFirst);
+    explicit TStopSignals(std::function<void()> onFirst);
     // Ends the threads; the signals stay blocked.
-    ~StopSignals();
+    ~TStopSignals();
 
-    StopSignals(const StopSignals&) = delete;
-    StopSignals& operator=(const StopSignals&) = delete;
+    TStopSignals(const TStopSignals&) = delete;
+    TStopSignals& operator=(const TStopSignals&) = delete;
 
     bool IsStopped() const { return fStopped; }
 
@@ -32,11 +32,11 @@ class StopSignals
     void AwaitSignals();
     void AwaitFirst();
 
-    sigset_t fSignals;
+    sigset_t fSignals{};
     std::function<void()> fOnFirst;
     std::atomic<bool> fStopped{false};
     std::atomic<bool> fEnding{false};
-    NKOLVRX20::UniqueFd fEvent;
+    NKOLVRX20::TUniqueFd fEvent;
     // Both run from the start: while a plug-in is loaded, the host's own threads never become more.
     std::thread fSignalThread;
     std::thread fFirstThread;

@@ -1,5 +1,5 @@
-#ifndef VRX_CLI_RUN_H
-#define VRX_CLI_RUN_H
+#ifndef VRX_CLI_TRUN_H
+#define VRX_CLI_TRUN_H
 
 #include <cstddef>
 #include <string>
@@ -7,22 +7,22 @@
 #include <host/ICIMNamespace.h>
 
 #include "Document.h"
-#include "DocumentOutput.h"
-#include "LossLog.h"
 #include "Options.h"
-#include "PrivateServer.h"
-#include "StopSignals.h"
+#include "TDocumentOutput.h"
+#include "TLossLog.h"
+#include "TPrivateServer.h"
+#include "TStopSignals.h"
 
 namespace vrxhost {
 
 // One run of the program after the command line: everything between the signals' set-up and the exit status.
 // Thread: made before any other thread of the process, used by the one that made it.
-class Run
+class TRun
 {
   public:
     // The options outlive the object.
-    explicit Run(const TOptions& options);
-    ~Run();
+    explicit TRun(const TOptions& options);
+    ~TRun();
 
     EExitStatus Execute();
 
@@ -39,10 +39,10 @@ class Run
 
     const TOptions& fOptions;
     const std::string fConsumer;
-    const PrivateServer fServer;
-    StopSignals fStop; // before every other thread
-    DocumentOutput fOutput;
-    LossLog fLosses;
+    const TPrivateServer fServer;
+    TStopSignals fStop; // before every other thread
+    TDocumentOutput fOutput;
+    TLossLog fLosses;
     TDocument fDocument;
     bool fFailed = false;
     std::size_t fToldCount = 0; // of the losses

@@ -1,4 +1,4 @@
-#include "Run.h"
+#include "TRun.h"
 
 #include <cerrno>
 #include <cstring>
@@ -7,11 +7,11 @@
 #include <host/TConfig.h>
 #include <host/TRootObject.h>
 
-#include "Collector.h"
 #include "Guard.h"
 #include "Render.h"
 #include "Say.h"
-#include "Session.h"
+#include "TCollector.h"
+#include "TSession.h"
 
 namespace vrxhost {
 
@@ -19,19 +19,19 @@ using NKOLVRX20::TConfig;
 using NKOLVRX20::TProcessControl;
 using NKOLVRX20::TRootObject;
 
-Run::Run(const TOptions& options)
+TRun::TRun(const TOptions& options)
     : fOptions(options), fConsumer(options.fConsumer.empty() ? kDefaultConsumer : options.fConsumer),
       fServer(options.fRoot, fConsumer), fStop([this] { Interrupt(); }), fLosses(options.fRoot)
 {
     fDocument.fCommand = options.fCommand;
 }
 
-Run::~Run()
+TRun::~TRun()
 {
     TRootObject::SetCoreLogger(nullptr);
 }
 
-EExitStatus Run::Execute()
+EExitStatus TRun::Execute()
 {
     try {
         LoadSettings();
@@ -45,13 +45,13 @@ EExitStatus Run::Execute()
 }
 
 // On the signal thread: waiting programs end, waiting calls fail, and the main thread finds its way out.
-void Run::Interrupt()
+void TRun::Interrupt()
 {
     TProcessControl::Instance().Cancel();
     fServer.End();
 }
 
-void Run::LoadSettings() const
+void TRun::LoadSettings() const
 {
     if (!fOptions.fConfigFile.empty()) {
         const std::string error = Guarded([&] { TConfig::GetInstance()->Load(fOptions.fConfigFile); });
@@ -63,17 +63,17 @@ void Run::LoadSettings() const
 }
 
 // A server of some other make need not know the setting; that matters only when a name was asked for.
-void Run::SetConsumer() const
+void TRun::SetConsumer() const
 {
     const std::string error = fServer.SetConsumer();
     if (!error.empty() && !fOptions.fConsumer.empty())
         throw TPluginError("the consumer " + fOptions.fConsumer + " could not be set, cimconfig: " + error);
 }
 
-void Run::UsePlugin()
+void TRun::UsePlugin()
 {
     TRootObject::SetCoreLogger(&fLosses);
-    Session session(fOptions.fPlugin, fConsumer);
+    TSession session(fOptions.fPlugin, fConsumer);
     Show(session.GetNamespace());
     const std::string problem = session.Close();
     if (fStop.IsStopped())
@@ -83,10 +83,10 @@ void Run::UsePlugin()
     TellLosses(); // of the shutdown
 }
 
-void Run::Show(NKOLVRX20::ICIMNamespace& ns)
+void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
 {
     const std::string error = Guarded([&] {
-        Collector collector(ns, fLosses, [this] { return fStop.IsStopped(); });
+        TCollector collector(ns, fLosses, [this] { return fStop.IsStopped(); });
         fDocument.fProviders = collector.Collect(fOptions.fCommand, fOptions.fClassName);
     });
     if (!error.empty())
@@ -97,7 +97,7 @@ void Run::Show(NKOLVRX20::ICIMNamespace& ns)
         Write();
 }
 
-void Run::Write()
+void TRun::Write()
 {
     if (fStop.IsStopped())
         return;
@@ -112,7 +112,7 @@ void Run::Write()
 }
 
 // There is no inventory; a reader of JSON still gets a document.
-void Run::Fail(const std::string& reason)
+void TRun::Fail(const std::string& reason)
 {
     if (fStop.IsStopped())
         return;
@@ -126,14 +126,14 @@ void Run::Fail(const std::string& reason)
 }
 
 // Says those that were not said yet.
-void Run::TellLosses()
+void TRun::TellLosses()
 {
     const auto sentences = fLosses.GetSentences();
     for (; fToldCount < sentences.size(); ++fToldCount)
         Say(sentences[fToldCount]);
 }
 
-EExitStatus Run::GetStatus() const
+EExitStatus TRun::GetStatus() const
 {
     if (fStop.IsStopped()) {
         Say("interrupted");

@@ -1,4 +1,4 @@
-#include "Collector.h"
+#include "TCollector.h"
 
 #include <mutex>
 #include <set>
@@ -85,12 +85,12 @@ std::set<std::string> KeyNames(const ICIMClass& each)
 
 } // namespace
 
-Collector::Collector(ICIMNamespace& ns, LossLog& losses, std::function<bool()> isStopped)
+TCollector::TCollector(ICIMNamespace& ns, TLossLog& losses, std::function<bool()> isStopped)
     : fNamespace(ns), fLosses(losses), fIsStopped(std::move(isStopped))
 {
 }
 
-std::vector<TProviderRecord> Collector::Collect(ECommand command, const std::string& className)
+std::vector<TProviderRecord> TCollector::Collect(ECommand command, const std::string& className)
 {
     std::vector<TProviderRecord> records;
     if (command == ECommand::kInstances) {
@@ -104,7 +104,7 @@ std::vector<TProviderRecord> Collector::Collect(ECommand command, const std::str
     return records;
 }
 
-void Collector::Ask(const std::string& what, const std::function<void()>& question)
+void TCollector::Ask(const std::string& what, const std::function<void()>& question)
 {
     const std::string error = Guarded(question);
     if (!error.empty() && !fIsStopped())
@@ -112,7 +112,7 @@ void Collector::Ask(const std::string& what, const std::function<void()>& questi
 }
 
 // The plug-in may call back on several threads at once, so the callback only collects.
-std::vector<Collector::TProviderPtr> Collector::ListProviders()
+std::vector<TCollector::TProviderPtr> TCollector::ListProviders()
 {
     std::mutex mutex;
     std::vector<TProviderPtr> providers;
@@ -130,7 +130,7 @@ std::vector<Collector::TProviderPtr> Collector::ListProviders()
     return providers;
 }
 
-std::vector<Collector::TClassPtr> Collector::ListClasses(IProvider& provider, const std::string& name)
+std::vector<TCollector::TClassPtr> TCollector::ListClasses(IProvider& provider, const std::string& name)
 {
     std::vector<TClassPtr> classes;
     Ask("the classes of provider " + name + " could not be listed", [&] {
@@ -145,7 +145,7 @@ std::vector<Collector::TClassPtr> Collector::ListClasses(IProvider& provider, co
 }
 
 // First among the classes that the providers serve, which know their provider; then any class of the namespace.
-Collector::TClassPtr Collector::FindClass(const std::string& name)
+TCollector::TClassPtr TCollector::FindClass(const std::string& name)
 {
     for (const TProviderPtr& provider : ListProviders())
         for (const TClassPtr& each : ListClasses(*provider, provider->GetName(kNoContext)))
@@ -156,7 +156,7 @@ Collector::TClassPtr Collector::FindClass(const std::string& name)
     return found;
 }
 
-TProviderRecord Collector::ReadProvider(IProvider& provider, ECommand command)
+TProviderRecord TCollector::ReadProvider(IProvider& provider, ECommand command)
 {
     TProviderRecord record;
     Ask("a provider could not be described", [&] {
@@ -170,7 +170,7 @@ TProviderRecord Collector::ReadProvider(IProvider& provider, ECommand command)
     return record;
 }
 
-TClassRecord Collector::ReadClass(ICIMClass& each, ECommand command)
+TClassRecord TCollector::ReadClass(ICIMClass& each, ECommand command)
 {
     TClassRecord record;
     Ask("a class could not be named", [&] { record.fName = each.GetName(kNoContext); });
@@ -181,7 +181,7 @@ TClassRecord Collector::ReadClass(ICIMClass& each, ECommand command)
     return record;
 }
 
-void Collector::ReadDeclarations(ICIMClass& each, TClassRecord& record)
+void TCollector::ReadDeclarations(ICIMClass& each, TClassRecord& record)
 {
     const auto superClass = each.GetSuperClass(kNoContext);
     record.fSuperClass = superClass && !superClass->IsRootClass(kNoContext) ? superClass->GetName(kNoContext) : "";
@@ -201,7 +201,7 @@ void Collector::ReadDeclarations(ICIMClass& each, TClassRecord& record)
         kNoContext);
 }
 
-void Collector::ReadInstances(ICIMClass& each, TClassRecord& record)
+void TCollector::ReadInstances(ICIMClass& each, TClassRecord& record)
 {
     each.EnumerateInstances(
         [&](boost::shared_ptr<ICIMInstance> instance) {
@@ -212,7 +212,7 @@ void Collector::ReadInstances(ICIMClass& each, TClassRecord& record)
         false, kNoContext);
 }
 
-TInstanceRecord Collector::ReadInstance(ICIMInstance& instance)
+TInstanceRecord TCollector::ReadInstance(ICIMInstance& instance)
 {
     TInstanceRecord record;
     record.fPath = instance.BuildPath(kNoContext).GetPath();

@@ -1,4 +1,4 @@
-#include "PrivateServer.h"
+#include "TPrivateServer.h"
 
 #include <cerrno>
 #include <climits>
@@ -15,7 +15,7 @@ extern "C" {
 }
 
 #include <core/TProcessLog.h>
-#include <core/UniqueFd.h>
+#include <core/TUniqueFd.h>
 #include <host/TOSSpecific.h>
 
 #include "Guard.h"
@@ -23,7 +23,7 @@ extern "C" {
 namespace vrxhost {
 namespace {
 
-using NKOLVRX20::UniqueFd;
+using NKOLVRX20::TUniqueFd;
 
 constexpr int kConfigTimeoutSeconds = 30;
 constexpr int kOrderlyEndMs = 2000;
@@ -37,7 +37,7 @@ std::string RealPath(const std::string& path)
 // Returns: the first token of the file as a process id, 0 for none.
 pid_t ReadProcessId(const std::string& path)
 {
-    const UniqueFd file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW));
+    const TUniqueFd file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW));
     char text[32] = "";
     if (!file || ::read(file.Get(), text, sizeof text - 1) <= 0)
         return 0;
@@ -45,7 +45,7 @@ pid_t ReadProcessId(const std::string& path)
     return id > 1 && id <= INT_MAX ? static_cast<pid_t>(id) : 0;
 }
 
-bool HasExited(const UniqueFd& process, int timeoutMs)
+bool HasExited(const TUniqueFd& process, int timeoutMs)
 {
     pollfd fd = {process.Get(), POLLIN, 0};
     return ::poll(&fd, 1, timeoutMs) > 0;
@@ -53,9 +53,11 @@ bool HasExited(const UniqueFd& process, int timeoutMs)
 
 } // namespace
 
-PrivateServer::PrivateServer(const std::string& root, const std::string& consumer) : fRoot(root), fConsumer(consumer) {}
+TPrivateServer::TPrivateServer(const std::string& root, const std::string& consumer) : fRoot(root), fConsumer(consumer)
+{
+}
 
-std::string PrivateServer::SetConsumer() const
+std::string TPrivateServer::SetConsumer() const
 {
     const std::vector<std::string> environment = {"PEGASUS_HOME=" + fRoot + "/pegasus",
                                                   "LD_LIBRARY_PATH=" + fRoot + "/pegasus/lib:" + fRoot,
@@ -72,11 +74,11 @@ std::string PrivateServer::SetConsumer() const
     return reason;
 }
 
-void PrivateServer::End() const
+void TPrivateServer::End() const
 {
     const pid_t id = ReadProcessId("/var/tmp/cimserverkol_tc_" + fConsumer + "_start.conf");
     // The descriptor first: what is checked through it afterwards is about this very process.
-    const UniqueFd process(id ? ::pidfd_open(id, 0) : -1);
+    const TUniqueFd process(id ? ::pidfd_open(id, 0) : -1);
     if (!process)
         return;
     const std::string program = RealPath("/proc/" + std::to_string(id) + "/exe");

@@ -1,4 +1,4 @@
-#include "DocumentOutput.h"
+#include "TDocumentOutput.h"
 
 #include <algorithm>
 #include <cerrno>
@@ -19,7 +19,7 @@ namespace {
 
 } // namespace
 
-DocumentOutput::DocumentOutput() : fFd(::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, STDERR_FILENO + 1))
+TDocumentOutput::TDocumentOutput() : fFd(::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, STDERR_FILENO + 1))
 {
     if (!fFd)
         ThrowErrno("copying standard output");
@@ -27,12 +27,12 @@ DocumentOutput::DocumentOutput() : fFd(::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, S
         ThrowErrno("pointing standard output at standard error");
 }
 
-DocumentOutput::~DocumentOutput()
+TDocumentOutput::~TDocumentOutput()
 {
     ::dup2(fFd.Get(), STDOUT_FILENO);
 }
 
-int DocumentOutput::Write(const std::string& text, int stopFd)
+int TDocumentOutput::Write(const std::string& text, int stopFd)
 {
     for (std::size_t written = 0; written < text.size();) {
         pollfd fds[] = {{fFd.Get(), POLLOUT, 0}, {stopFd, POLLIN, 0}};

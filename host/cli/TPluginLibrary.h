@@ -1,5 +1,5 @@
-#ifndef VRX_CLI_PLUGINLIBRARY_H
-#define VRX_CLI_PLUGINLIBRARY_H
+#ifndef VRX_CLI_TPLUGINLIBRARY_H
+#define VRX_CLI_TPLUGINLIBRARY_H
 
 #include <cstddef>
 #include <stdexcept>
@@ -20,16 +20,16 @@ class TPluginError : public std::runtime_error
 
 // A loaded plug-in: its library, its entry points, and its provider in the host's manager.
 // Thread: one at a time.
-class PluginLibrary
+class TPluginLibrary
 {
   public:
     // Loads the library and has it register its provider.
     // Throws: TPluginError. A library that failed half way stays loaded: it may have left something behind.
-    explicit PluginLibrary(const std::string& path);
-    ~PluginLibrary();
+    explicit TPluginLibrary(const std::string& path);
+    ~TPluginLibrary();
 
-    PluginLibrary(const PluginLibrary&) = delete;
-    PluginLibrary& operator=(const PluginLibrary&) = delete;
+    TPluginLibrary(const TPluginLibrary&) = delete;
+    TPluginLibrary& operator=(const TPluginLibrary&) = delete;
 
     const boost::shared_ptr<NKOLVRX20::INamespaceProvider>& GetProvider() const { return fProvider; }
 

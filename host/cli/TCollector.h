@@ -1,22 +1,22 @@
-#ifndef VRX_CLI_COLLECTOR_H
-#define VRX_CLI_COLLECTOR_H
+#ifndef VRX_CLI_TCOLLECTOR_H
+#define VRX_CLI_TCOLLECTOR_H
 
 #include <functional>
 
 #include <host/ICIMNamespace.h>
 
 #include "Document.h"
-#include "LossLog.h"
+#include "TLossLog.h"
 
 namespace vrxhost {
 
 // Asks a namespace for what a command shows. Every question is guarded: what fails becomes a loss, the rest goes on.
 // Thread: one at a time; only the list of providers may come in from several threads of the plug-in.
-class Collector
+class TCollector
 {
   public:
     // isStopped: asked between elements; once true, collecting ends early.
-    Collector(NKOLVRX20::ICIMNamespace& ns, LossLog& losses, std::function<bool()> isStopped);
+    TCollector(NKOLVRX20::ICIMNamespace& ns, TLossLog& losses, std::function<bool()> isStopped);
 
     // Returns: the providers, filled to the depth of the command; of kInstances one without a name, with the one class.
     std::vector<TProviderRecord> Collect(ECommand command, const std::string& className);
@@ -38,7 +38,7 @@ class Collector
     void Ask(const std::string& what, const std::function<void()>& question);
 
     NKOLVRX20::ICIMNamespace& fNamespace;
-    LossLog& fLosses;
+    TLossLog& fLosses;
     std::function<bool()> fIsStopped;
 };
 

@@ -1,5 +1,5 @@
-#ifndef VRX_CLI_LOSSLOG_H
-#define VRX_CLI_LOSSLOG_H
+#ifndef VRX_CLI_TLOSSLOG_H
+#define VRX_CLI_TLOSSLOG_H
 
 #include <mutex>
 #include <set>
@@ -12,11 +12,11 @@ namespace vrxhost {
 
 // The host's core logger while vrxhost runs: hands every line on to the host's own logger, and learns from the
 // plug-in's lines what was lost. Each loss becomes one sentence, told once. Thread: safe.
-class LossLog : public NKOLVRX20::ILogger
+class TLossLog : public NKOLVRX20::ILogger
 {
   public:
     // root: the directory below which the server's programs and providers lie.
-    explicit LossLog(const std::string& root);
+    explicit TLossLog(const std::string& root);
 
     void Log(EVRXLogSeverity severity, const std::string& text) override;
 

@@ -1,27 +1,27 @@
-#ifndef VRX_CLI_DOCUMENTOUTPUT_H
-#define VRX_CLI_DOCUMENTOUTPUT_H
+#ifndef VRX_CLI_TDOCUMENTOUTPUT_H
+#define VRX_CLI_TDOCUMENTOUTPUT_H
 
 #include <string>
 
-#include <core/UniqueFd.h>
+#include <core/TUniqueFd.h>
 
 namespace vrxhost {
 
 // Standard output, kept for the document alone: while an object lives, descriptor 1 leads to standard error, so that
 // whatever a plug-in prints does not end up inside the document.
-class DocumentOutput
+class TDocumentOutput
 {
   public:
     // Throws: std::system_error when the descriptors cannot be arranged.
-    DocumentOutput();
-    ~DocumentOutput();
+    TDocumentOutput();
+    ~TDocumentOutput();
 
     // Writes all of it, unless stopFd becomes readable first.
     // Returns: an errno (EPIPE when the reader has gone, ECANCELED when stopped), 0 for success.
     int Write(const std::string& text, int stopFd);
 
   private:
-    NKOLVRX20::UniqueFd fFd;
+    NKOLVRX20::TUniqueFd fFd;
 };
 
 } // namespace vrxhost

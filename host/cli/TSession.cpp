@@ -1,4 +1,4 @@
-#include "Session.h"
+#include "TSession.h"
 
 #include <boost/make_shared.hpp>
 
@@ -31,7 +31,7 @@ TCIMValue AddressOf(const boost::shared_ptr<ICIMNamespace>& ns)
 
 } // namespace
 
-Session::Session(const std::string& pluginPath, const std::string& consumer)
+TSession::TSession(const std::string& pluginPath, const std::string& consumer)
     : fRepository(boost::make_shared<TInmemNamespace>()), fUpcall(boost::make_shared<TInmemNamespace>()),
       fPlugin(pluginPath)
 {
@@ -48,12 +48,12 @@ Session::Session(const std::string& pluginPath, const std::string& consumer)
     }
 }
 
-Session::~Session()
+TSession::~TSession()
 {
     Close();
 }
 
-void Session::Allocate(const std::string& consumer)
+void TSession::Allocate(const std::string& consumer)
 {
     TCIMContext context;
     context["repository"] = AddressOf(fRepository);
@@ -62,7 +62,7 @@ void Session::Allocate(const std::string& consumer)
     fNamespace = fPlugin.GetProvider()->AllocateNamespace(context, false, kNamespaceName);
 }
 
-std::string Session::Close()
+std::string TSession::Close()
 {
     if (fClosed)
         return "";

@@ -1,26 +1,26 @@
-#ifndef VRX_CLI_SESSION_H
-#define VRX_CLI_SESSION_H
+#ifndef VRX_CLI_TSESSION_H
+#define VRX_CLI_TSESSION_H
 
 #include <memory>
 #include <string>
 
 #include <host/ICIMNamespace.h>
 
-#include "LossLog.h"
-#include "PluginLibrary.h"
+#include "TLossLog.h"
+#include "TPluginLibrary.h"
 
 namespace vrxhost {
 
 // One use of a plug-in: loaded, its namespace allocated, everything let go in the right order.
 // Thread: one at a time.
-class Session
+class TSession
 {
   public:
     // Throws: TPluginError when there is no plug-in or no namespace.
-    Session(const std::string& pluginPath, const std::string& consumer);
+    TSession(const std::string& pluginPath, const std::string& consumer);
 
     // As Close, its sentences dropped.
-    ~Session();
+    ~TSession();
 
     NKOLVRX20::ICIMNamespace& GetNamespace() { return *fNamespace; }
 
@@ -34,7 +34,7 @@ class Session
     // The host's namespaces outlive the plug-in's use of their addresses.
     boost::shared_ptr<NKOLVRX20::ICIMNamespace> fRepository;
     boost::shared_ptr<NKOLVRX20::ICIMNamespace> fUpcall;
-    PluginLibrary fPlugin;
+    TPluginLibrary fPlugin;
     boost::shared_ptr<NKOLVRX20::ICIMNamespace> fNamespace;
     bool fClosed = false;
 };
