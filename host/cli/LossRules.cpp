@@ -111,9 +111,6 @@ std::optional<std::string> LossOfLine(const std::string& line)
 
 bool IsHarmless(const std::string& errorLine)
 {
-    // Repeated until the server is up; if it never is, the namespace itself fails.
-    if (BeginsWith(errorLine, "TPEGASUSNamespace::connect failed: "))
-        return true;
     // A program that could not be run has a sentence of its own, with the cause.
     const std::string failed =
         NKOLVRX20::TVRXStatusCode(NKOLVRX20::TVRXStatusCode::kProcessFailed).TranslateStatusCode();

@@ -11,8 +11,7 @@ namespace vrxhost {
 // Returns: the sentence for a log line by which the plug-in reports a loss, whatever its severity; nothing for others.
 std::optional<std::string> LossOfLine(const std::string& line);
 
-// Returns: true for a line of severity 0 that is no loss, because the plug-in copes with its cause or because the
-// failed program's own sentence tells it.
+// Returns: true for a line of severity 0 that is no loss of its own: a failed program's sentence tells it.
 bool IsHarmless(const std::string& errorLine);
 
 // Returns: the sentence for a failed program; nothing when nothing was lost by it.

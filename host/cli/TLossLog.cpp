@@ -8,6 +8,7 @@
 namespace vrxhost {
 namespace {
 
+constexpr char kNotConnected[] = "TPEGASUSNamespace::connect failed: ";
 constexpr char kConnected[] = "TPEGASUSNamespace::connect succeeded";
 constexpr char kLoading[] = "Loading... ";
 // Every message about a provider description begins thus; those on names that the description's reader does not know
@@ -40,9 +41,9 @@ void TLossLog::Log(EVRXLogSeverity severity, const std::string& text)
 
 void TLossLog::Learn(EVRXLogSeverity severity, const std::string& text)
 {
-    if (BeginsWith(text, kConnected))
-        fHeldBack.clear();
-    else if (BeginsWith(text, kLoading))
+    if (LearnFromAttempt(text))
+        return;
+    if (BeginsWith(text, kLoading))
         fLoadedFile = text.substr(sizeof kLoading - 1);
     else if (const auto sentence = LossOfLine(text))
         Enter(*sentence);
@@ -52,6 +53,19 @@ void TLossLog::Learn(EVRXLogSeverity severity, const std::string& text)
         Enter(WithoutLineFeed(text));
     else if (text.find(kRoutine) == std::string::npos)
         Enter("provider description " + fLoadedFile + ", line " + text.substr(sizeof kDescription - 1));
+}
+
+// Returns: whether the line ends an attempt to start the server and to connect to it.
+bool TLossLog::LearnFromAttempt(const std::string& text)
+{
+    const bool connected = BeginsWith(text, kConnected);
+    if (!connected && !BeginsWith(text, kNotConnected))
+        return false;
+    fNoServer = !connected || fStartFailed;
+    fStartFailed = false;
+    if (!fNoServer)
+        fHeldBack.clear();
+    return true;
 }
 
 void TLossLog::Add(const std::string& sentence)
@@ -69,6 +83,7 @@ void TLossLog::LearnFromPrograms()
             continue;
         if (IsServerStart(program)) {
             fHeldBack = *sentence;
+            fStartFailed = true;
             continue;
         }
         Release(); // a cause goes before its consequences
@@ -87,6 +102,12 @@ void TLossLog::Release()
     if (!fHeldBack.empty())
         Enter(fHeldBack);
     fHeldBack.clear();
+}
+
+bool TLossLog::HasNoServer() const
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    return fNoServer;
 }
 
 std::vector<std::string> TLossLog::GetSentences() const

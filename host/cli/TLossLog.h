@@ -26,6 +26,10 @@ class TLossLog : public NKOLVRX20::ILogger
     // Enters what was held back in case that another attempt would succeed.
     void AddHeldBack();
 
+    // Returns: true when the latest attempt to start the server and to connect to it failed; also when only the start
+    // did, because it is somebody else's server then that answers on the port.
+    bool HasNoServer() const;
+
     // Returns: the sentences so far, in the order in which things were lost.
     std::vector<std::string> GetSentences() const;
 
@@ -33,12 +37,15 @@ class TLossLog : public NKOLVRX20::ILogger
     void Enter(const std::string& sentence);
     void Learn(EVRXLogSeverity severity, const std::string& text);
     void LearnFromPrograms();
+    bool LearnFromAttempt(const std::string& text);
     void Release();
 
     const std::string fRoot;
     mutable std::mutex fMutex;
-    std::string fLoadedFile; // the provider description being read
-    std::string fHeldBack;   // why the server did not start, at the latest attempt
+    std::string fLoadedFile;   // the provider description being read
+    std::string fHeldBack;     // why the server did not start, when it last failed to
+    bool fStartFailed = false; // in this attempt
+    bool fNoServer = false;
     std::vector<std::string> fSentences;
     std::set<std::string> fKnown;
 };

@@ -74,6 +74,8 @@ void TRun::UsePlugin()
 {
     TRootObject::SetCoreLogger(&fLosses);
     TSession session(fOptions.fPlugin, fConsumer);
+    if (fLosses.HasNoServer())
+        throw TPluginError("the namespace has no server of its own");
     Show(session.GetNamespace());
     const std::string problem = session.Close();
     if (fStop.IsStopped())

@@ -103,16 +103,25 @@ TEST(TLossLog, FailedServerStartsCountWhenTheServerIsNeeded)
         NKOLVRX20::TOSSpecific::SpawnProcess(name, {"-c", "exit 1"}, "/bin/sh", {}, output, 20);
     };
     const std::string start = "the server did not start, cimserver: exit status 1";
+    const std::string connected = "TPEGASUSNamespace::connect succeeded \n";
     const std::string config = "cimconfig -c exit 1 failed: exit status 1";
-    TLossLog retried("/"), failed("/");
+    TLossLog retried("/"), failed("/"), foreign("/");
     NKOLVRX20::TRootObject::SetCoreLogger(&retried);
     run("cimserver");
-    retried.Log(NKOLVRX20::ILogger::kInfo, "TPEGASUSNamespace::connect succeeded \n");
+    retried.Log(NKOLVRX20::ILogger::kError,
+                "TPEGASUSNamespace::connect failed: no program try to restart cimserver 1\n");
+    EXPECT_TRUE(retried.HasNoServer());
+    retried.Log(NKOLVRX20::ILogger::kInfo, connected);
+    EXPECT_FALSE(retried.HasNoServer());
     run("cimconfig");
     NKOLVRX20::TRootObject::SetCoreLogger(&failed);
     run("cimserver");
     run("cimserver");
     run("cimconfig");
+    NKOLVRX20::TRootObject::SetCoreLogger(&foreign);
+    run("cimserver");
+    foreign.Log(NKOLVRX20::ILogger::kInfo, connected);
+    EXPECT_TRUE(foreign.HasNoServer()) << "another host's server answered";
     NKOLVRX20::TRootObject::SetCoreLogger(nullptr);
     EXPECT_EQ(retried.GetSentences(), (std::vector<std::string>{config}));
     EXPECT_EQ(failed.GetSentences(), (std::vector<std::string>{start, config}));
