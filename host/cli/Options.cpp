@@ -47,9 +47,11 @@ bool SplitSetting(const std::string& text, TOptions& options)
 
 void AddOptions(CLI::App& app, TOptions& options, std::vector<std::string>& settings)
 {
-    app.add_option("--format", options.fFormat, "table or json")
-        ->transform(CLI::CheckedTransformer(
-            std::map<std::string, EFormat>{{"table", EFormat::kTable}, {"json", EFormat::kJson}}));
+    app.add_option_function<std::string>(
+           "--format",
+           [&options](const std::string& name) { options.fFormat = name == "json" ? EFormat::kJson : EFormat::kTable; },
+           "Of the document (default table)")
+        ->check(CLI::IsMember({"table", "json"}));
     app.add_option("--consumer", options.fConsumer,
                    "Name that keeps this host's server apart from others' (default quvex)");
     app.add_option("--config", options.fConfigFile, "Settings file, lines \"key = value\" (default ROOT/vrx.conf)")
