@@ -5,6 +5,7 @@
 
 #include <strings.h>
 
+#include <atomic>
 #include <exception>
 #include <functional>
 
@@ -13,13 +14,16 @@
 namespace lnx {
 namespace {
 
-const CMPIBroker* gBroker = nullptr; // the same for all of the library's interfaces, set by their factories
+// The same for all of the library's interfaces. Each factory sets it, and one may run while the other's interface
+// works.
+std::atomic<const CMPIBroker*> gBroker{nullptr};
 
 constexpr CMPIStatus kOk{CMPI_RC_OK, nullptr};
 
 CMPIStatus failure(CMPIrc code, const std::string& text)
 {
-    return {code, gBroker->eft->newString(gBroker, text.c_str(), nullptr)};
+    const CMPIBroker* broker = gBroker;
+    return {code, broker->eft->newString(broker, text.c_str(), nullptr)};
 }
 
 // Nothing may be thrown into the broker.

@@ -10,7 +10,8 @@
 #include <strings.h>
 #include <unistd.h>
 
-static const CMPIBroker* gBroker;
+/* Each factory sets it, maybe while the other one's interface works. */
+static const CMPIBroker* _Atomic gBroker;
 static CMPIUint32 gCount = 1000;
 
 static const CMPIStatus kOk = {CMPI_RC_OK, NULL};

@@ -9,6 +9,7 @@
 
 #include <dlfcn.h>
 
+#include <atomic>
 #include <filesystem>
 #include <fstream>
 #include <functional>
@@ -22,7 +23,7 @@ using Pegasus::wire::ElementDecoder;
 using Pegasus::wire::XmlDocument;
 using Pegasus::wire::XmlElement;
 
-const CMPIBroker* gBroker;
+std::atomic<const CMPIBroker*> gBroker{nullptr}; // set by each factory, maybe while the other's interface works
 
 const char* textOf(const CMPIString* string)
 {
@@ -31,7 +32,8 @@ const char* textOf(const CMPIString* string)
 
 CMPIStatus failure(int code, const std::string& text)
 {
-    return {static_cast<CMPIrc>(code), gBroker->eft->newString(gBroker, text.c_str(), nullptr)};
+    const CMPIBroker* broker = gBroker;
+    return {static_cast<CMPIrc>(code), broker->eft->newString(broker, text.c_str(), nullptr)};
 }
 
 // The content of a file of the library's folder; empty if there is none.
