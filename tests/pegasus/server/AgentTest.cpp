@@ -70,7 +70,7 @@ class AgentTest : public testing::Test
 TEST_F(AgentTest, aLargeAnswerIsPassedOnWhole)
 {
     start();
-    setCount(20'000); // many times the size of any buffer on the way
+    setCount(20'000);           // many times the size of any buffer on the way
     fClient.setTimeout(60'000); // a sanitizer's time
     const Array<CIMInstance> bulk = fClient.enumerateInstances(kNamespace, "Probe_Bulk");
     ASSERT_EQ(bulk.size(), 20'000u);
