@@ -8,7 +8,7 @@
 namespace vrxhost {
 namespace {
 
-constexpr char kNotConnected[] = "TPEGASUSNamespace::connect failed: ";
+constexpr char kRestart[] = " try to restart cimserver ";
 constexpr char kConnected[] = "TPEGASUSNamespace::connect succeeded";
 constexpr char kLoading[] = "Loading... ";
 // Every message about a provider description begins thus; those on names that the description's reader does not know
@@ -59,7 +59,7 @@ void TLossLog::Learn(EVRXLogSeverity severity, const std::string& text)
 bool TLossLog::LearnFromAttempt(const std::string& text)
 {
     const bool connected = BeginsWith(text, kConnected);
-    if (!connected && !BeginsWith(text, kNotConnected))
+    if (!connected && text.find(kRestart) == std::string::npos) // the client's own tries are parts of an attempt
         return false;
     fNoServer = !connected || fStartFailed;
     fStartFailed = false;

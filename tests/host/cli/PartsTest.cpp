@@ -120,6 +120,7 @@ TEST(TLossLog, FailedServerStartsCountWhenTheServerIsNeeded)
     run("cimconfig");
     NKOLVRX20::TRootObject::SetCoreLogger(&foreign);
     run("cimserver");
+    foreign.Log(NKOLVRX20::ILogger::kInfo, "TPEGASUSNamespace::connect failed: refused try to reconnect 1");
     foreign.Log(NKOLVRX20::ILogger::kInfo, connected);
     EXPECT_TRUE(foreign.HasNoServer()) << "another host's server answered";
     NKOLVRX20::TRootObject::SetCoreLogger(nullptr);
