@@ -64,7 +64,7 @@ CIMValue typedKey(const ClassSchema* schema, const CIMKeyBinding& binding)
     const std::size_t at = schema ? schema->find(utf8(binding.getName())) : ClassSchema::kNotFound;
     if (at == ClassSchema::kNotFound)
         return value;
-    CIMValue converted = convertKey(value, schema->properties()[at].type);
+    const CIMValue converted = convertKey(value, schema->properties()[at].type);
     return converted.isNull() ? value : converted;
 }
 

@@ -48,7 +48,7 @@ CIMClass ClassStore::get(NamespaceId nameSpace, const CIMName& name, const Class
 std::shared_ptr<const std::string> ClassStore::text(NamespaceId nameSpace, const CIMName& name,
                                                     const ClassOptions& options)
 {
-    CIMClass whole = existing(nameSpace, name);
+    const CIMClass whole = existing(nameSpace, name);
     if (options.propertyList.isNull())
         return fCache.text(nameSpace, folded(name), options);
     auto made = std::make_shared<std::string>();
@@ -103,7 +103,7 @@ void ClassStore::remove(NamespaceId nameSpace, const CIMName& name)
 void ClassStore::put(NamespaceId nameSpace, const CIMConstClass& newClass)
 {
     checkDepth(nameSpace, newClass);
-    CIMClass superClass = resolvedSuperClass(nameSpace, newClass);
+    const CIMClass superClass = resolvedSuperClass(nameSpace, newClass);
     const CIMClass local = checkClass(newClass, superClass, fQualifiers.lookupIn(nameSpace));
     const std::string text = fTexts.fromClass(local);
     fStorage.putClass(nameSpace, utf8(local.getClassName()), utf8(local.getSuperClassName()), text);
