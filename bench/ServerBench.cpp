@@ -1,7 +1,7 @@
 // The private server as its users meet it: whole programs, an agent, our client, on loopback. The yardstick is a bare
 // expat pass over the same bytes in the same run.
-#include "pegasus/server/HttpExchange.h"
-#include "pegasus/server/ServerTree.h"
+#include "tests/pegasus/server/HttpExchange.h"
+#include "tests/pegasus/server/ServerTree.h"
 
 #include <Pegasus/Client/CIMClient.h>
 
@@ -66,9 +66,11 @@ class TProbeServer
 double peakMegabytes(int pid)
 {
     std::ifstream status("/proc/" + std::to_string(pid) + "/status");
-    for (std::string line; std::getline(status, line);)
-        if (line.rfind("VmHWM:", 0) == 0)
+    for (std::string line; std::getline(status, line);) {
+        if (line.rfind("VmHWM:", 0) == 0) {
             return std::stod(line.substr(6)) / 1024;
+        }
+    }
     return 0;
 }
 
@@ -77,15 +79,18 @@ void enumerateInstances(benchmark::State& state)
     TProbeServer& server = TProbeServer::get();
     server.setCount(static_cast<Uint32>(state.range(0)));
     const std::size_t bytes = server.enumerationBytes().size();
-    for (auto _ : state)
-        if (server.client().enumerateInstances(kNamespace, "Probe_Bulk").size() != state.range(0))
+    for (auto _ : state) {
+        if (server.client().enumerateInstances(kNamespace, "Probe_Bulk").size() != state.range(0)) {
             state.SkipWithError("instances are missing");
+        }
+    }
     state.SetBytesProcessed(static_cast<std::int64_t>(bytes) * state.iterations());
     state.SetItemsProcessed(state.range(0) * state.iterations());
     const int process = server.tree().serverProcess();
     state.counters["server_MB"] = peakMegabytes(process);
-    for (const int agent : servertest::childrenOf(process))
+    for (const int agent : servertest::childrenOf(process)) {
         state.counters["agent_MB"] = peakMegabytes(agent);
+    }
 }
 
 void bareExpat(benchmark::State& state)
@@ -98,8 +103,9 @@ void bareExpat(benchmark::State& state)
         XML_SetElementHandler(
             parser, [](void*, const char*, const char**) {}, [](void*, const char*) {});
         XML_SetCharacterDataHandler(parser, [](void*, const char*, int) {});
-        if (XML_Parse(parser, bytes.data(), static_cast<int>(bytes.size()), 1) != XML_STATUS_OK)
+        if (XML_Parse(parser, bytes.data(), static_cast<int>(bytes.size()), 1) != XML_STATUS_OK) {
             state.SkipWithError("not XML");
+        }
         XML_ParserFree(parser);
     }
     state.SetBytesProcessed(static_cast<std::int64_t>(bytes.size()) * state.iterations());
@@ -108,8 +114,9 @@ void bareExpat(benchmark::State& state)
 void getClass(benchmark::State& state)
 {
     TProbeServer& server = TProbeServer::get();
-    for (auto _ : state)
+    for (auto _ : state) {
         benchmark::DoNotOptimize(server.client().getClass(kNamespace, "Probe_Bulk", false));
+    }
     state.SetItemsProcessed(state.iterations());
 }
 

@@ -6,24 +6,26 @@
 // both also as a ratio to a bare expat pass with empty handlers over the same bytes in the same run, and the growth of
 // the process's memory. Then what decoding during arrival saves, and GetClass calls on one connection. --quick leaves
 // out the biggest answer, --calls all but the calls.
-#include <Pegasus/Client/CIMClient.h>
-
 #include "pegasus/client/Connection.h"
 #include "pegasus/client/HttpResponse.h"
 #include "pegasus/client/RequestEncoder.h"
 #include "pegasus/client/ResponseReader.h"
-#include "pegasus/common/ElementEncoder.h"
-#include "support/PeerAnswers.h"
+#include "pegasus/wire/ElementEncoder.h"
+#include "tests/support/PeerAnswers.h"
+
+#include <Pegasus/Client/CIMClient.h>
+
+#include <expat.h>
+#include <pugixml.hpp>
 
 #include <chrono>
 #include <cstdio>
 #include <cstring>
 #include <ctime>
-#include <expat.h>
 #include <fstream>
-#include <malloc.h>
-#include <pugixml.hpp>
 #include <string>
+
+#include <malloc.h>
 
 using namespace Pegasus;
 
@@ -44,7 +46,7 @@ double wallSeconds()
     return std::chrono::duration<double>(std::chrono::steady_clock::now().time_since_epoch()).count();
 }
 
-/// The least of several runs: what the work costs when nothing disturbs it.
+// The least of several runs: what the work costs when nothing disturbs it.
 struct TCost
 {
     double cpu = 1e300;
@@ -60,13 +62,14 @@ struct TCost
     }
 };
 
-/// In kilobytes.
+// In kilobytes.
 long statusField(const char* name)
 {
     std::ifstream status("/proc/self/status");
     for (std::string line; std::getline(status, line);) {
-        if (line.rfind(name, 0) == 0)
+        if (line.rfind(name, 0) == 0) {
             return std::strtol(line.c_str() + std::strlen(name) + 1, nullptr, 10);
+        }
     }
     return 0;
 }
@@ -76,7 +79,7 @@ void resetPeak()
     std::ofstream("/proc/self/clear_refs") << 5;
 }
 
-/// Twelve properties and 1.2 KB of XML, as an inventory provider's instances have.
+// Twelve properties and 1.2 KB of XML, as an inventory provider's instances have.
 CIMInstance makeInstance(unsigned index)
 {
     const std::string id = "device-" + std::to_string(1000000 + index);
@@ -124,8 +127,9 @@ test::PeerRequest requestFor(const std::string& method)
 std::string instancesBody(unsigned count)
 {
     std::string content;
-    for (unsigned i = 0; i < count; ++i)
+    for (unsigned i = 0; i < count; ++i) {
         wire::appendNamedInstance(content, makeInstance(i));
+    }
     return test::intrinsicBody(requestFor("EnumerateInstances"), content);
 }
 
@@ -136,15 +140,15 @@ std::string classBody()
     return test::intrinsicBody(requestFor("GetClass"), content);
 }
 
-/// How an answer is sent.
+// How an answer is sent.
 struct TSending
 {
-    std::size_t chunkBytes = 0; ///< 0: with a length
-    std::size_t pieceBytes = 0; ///< so many in one send; 0: all at once
+    std::size_t chunkBytes = 0; // 0: with a length
+    std::size_t pieceBytes = 0; // so many in one send; 0: all at once
     std::chrono::milliseconds pause{0};
 };
 
-/// The answer to whatever is asked: prepared once, with the id of the request put in.
+// The answer to whatever is asked: prepared once, with the id of the request put in.
 class TPreparedAnswer
 {
   public:
@@ -194,7 +198,7 @@ TCost bareExpat(const std::string& xml)
     return cost;
 }
 
-/// The other parser, the whole text in place: what choosing it is based on.
+// The other parser, the whole text in place: what choosing it is based on.
 TCost barePugixml(const std::string& xml)
 {
     TCost cost;
@@ -230,8 +234,9 @@ void benchInstances(unsigned count, const char* how, const TSending& sending = T
         const long before = statusField("VmRSS");
         Array<CIMInstance> result;
         cost.measure([&] { result = client.enumerateInstances(kNameSpace, "Bench_Device"); });
-        if (result.size() != count)
+        if (result.size() != count) {
             std::printf("WRONG: %u instances\n", result.size());
+        }
         // Later runs find memory that the allocator kept; the most is what counts.
         growth = std::max(growth, statusField("VmHWM") - before);
     }
@@ -240,7 +245,7 @@ void benchInstances(unsigned count, const char* how, const TSending& sending = T
                 expat.cpu / cost.cpu, expat.cpu / cost.wall, double(growth) * 1024 / bytes);
 }
 
-/// What a client does that reads the whole answer before it decodes it.
+// What a client does that reads the whole answer before it decodes it.
 Array<CIMInstance> readThenDecode(client::Connection& connection, const std::string& request)
 {
     const client::Deadline deadline(600000);
@@ -265,7 +270,7 @@ Array<CIMInstance> readThenDecode(client::Connection& connection, const std::str
     return instances;
 }
 
-/// A server that needs time for its answer: what decoding meanwhile is worth.
+// A server that needs time for its answer: what decoding meanwhile is worth.
 void benchOverlap()
 {
     constexpr unsigned kCount = 10000;
@@ -305,8 +310,9 @@ void benchGetClass()
     TCost cost;
     for (int run = 0; run < 4; ++run) {
         cost.measure([&] {
-            for (int call = 0; call < kCalls; ++call)
+            for (int call = 0; call < kCalls; ++call) {
                 (void)client.getClass(kNameSpace, "Bench_Class", false);
+            }
         });
     }
     std::printf("GetClass, 33 properties, %zu bytes of XML: %.0f calls/s of the client's CPU, %.0f by the clock; one "
@@ -327,8 +333,9 @@ int main(int argc, char** argv)
     std::printf("%8s %-12s %8s %10s %10s %10s %10s %8s %8s %10s\n", "count", "sent", "MB", "expat", "pugixml",
                 "client cpu", "clock", "cpu/exp", "clk/exp", "mem/bytes");
     for (const unsigned count : {1000u, 10000u, 100000u}) {
-        if (option != "--quick" || count < 100000)
+        if (option != "--quick" || count < 100000) {
             benchInstances(count, "with length");
+        }
     }
     benchInstances(10000, "2 KB chunks", {2048, 0, {}});
     benchInstances(10000, "4 KB sends", {2048, 4096, {}});

@@ -4,7 +4,7 @@
 // own; a round starts a fresh one and its start counts.
 #include "pegasus/mof/Compiler.h"
 #include "pegasus/mof/MemoryHandler.h"
-#include "support/PrivateServer.h"
+#include "tests/support/PrivateServer.h"
 
 #include <Pegasus/Client/CIMClient.h>
 
@@ -50,11 +50,12 @@ void parse(const std::string& file)
 void compileInto(const test::PrivateServer& server, const std::string& file)
 {
     const test::ProgramResult result = server.run("cimmof", {"-n", "root/bench", "-aE", file});
-    if (result.exitStatus != 0)
+    if (result.exitStatus != 0) {
         throw std::runtime_error("cimmof: " + result.err);
+    }
 }
 
-/// Classes a second over one connection, the whole class with its qualifiers.
+// Classes a second over one connection, the whole class with its qualifiers.
 double getClassRate(const test::PrivateServer& server)
 {
     CIMClient client;
@@ -62,8 +63,9 @@ double getClassRate(const test::PrivateServer& server)
     const CIMNamespaceName nameSpace("root/bench");
     const Array<CIMName> names = client.enumerateClassNames(nameSpace, CIMName(), true);
     const double seconds = secondsOf([&] {
-        for (int i = 0; i < kGetClassCount; ++i)
+        for (int i = 0; i < kGetClassCount; ++i) {
             client.getClass(nameSpace, names[static_cast<Uint32>(i) % std::min(names.size(), 20u)], false);
+        }
     });
     return kGetClassCount / seconds;
 }

@@ -24,6 +24,6 @@ set(CPACK_DEBIAN_PACKAGE_SECTION admin)
 # The libraries' packages are looked up; ps is a program that the plug-in runs.
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS ${PROJECT_BINARY_DIR}/host/core ${PROJECT_BINARY_DIR}/host/inmem
-  ${PROJECT_BINARY_DIR}/host/xmlparser ${PROJECT_BINARY_DIR}/pegasus/common ${PROJECT_BINARY_DIR}/pegasus/client)
+  ${PROJECT_BINARY_DIR}/host/xmlparser ${PROJECT_BINARY_DIR}/pegasus ${PROJECT_BINARY_DIR}/pegasus/client)
 set(CPACK_DEBIAN_PACKAGE_DEPENDS procps)
 include(CPack)

@@ -31,8 +31,9 @@ int main(int argc, char** argv)
             continue;
         }
         for (const auto& entry : std::filesystem::recursive_directory_iterator(argv[i])) {
-            if (entry.is_regular_file())
+            if (entry.is_regular_file()) {
                 replay(entry.path());
+            }
         }
     }
     std::printf("%zu inputs replayed\n", replayed);

@@ -1,6 +1,6 @@
 // CIM messages in requests: the first two lines are the CIMMethod and CIMObject headers, the rest is the body. A
 // decoded request's parameters are read in every form.
-#include "pegasus/server/RequestDecoder.h"
+#include "pegasus/server/net/RequestDecoder.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -56,8 +56,9 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     RequestDecoder decoder{wire::XmlLimits()};
     try {
         const CimRequest request = decoder.decode(http);
-        if (request.isIntrinsic)
+        if (request.isIntrinsic) {
             readParameters(request.parameters);
+        }
     } catch (const HttpError&) { // the only way out for bad input
     }
     return 0;

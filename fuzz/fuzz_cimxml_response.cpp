@@ -1,7 +1,7 @@
 // The CIM-XML of an answer, cut at a place that the input chooses: the objects are the same however it arrives, and
 // what was decoded can be encoded and decoded again.
 #include "pegasus/client/ResponseReader.h"
-#include "support/ContentReader.h"
+#include "tests/support/ContentReader.h"
 
 #include <Pegasus/Client/CIMClientException.h>
 
@@ -14,7 +14,7 @@ using namespace Pegasus;
 
 namespace {
 
-/// The encoded result, or "error".
+// The encoded result, or "error".
 std::string read(std::string_view xml, std::size_t cut, bool isIntrinsic)
 {
     const client::ExpectedResponse expected{"1000", isIntrinsic ? "EnumerateInstances" : "M", isIntrinsic};
@@ -37,12 +37,14 @@ std::string read(std::string_view xml, std::size_t cut, bool isIntrinsic)
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
-    if (size < 2)
+    if (size < 2) {
         return 0;
+    }
     const bool isIntrinsic = (data[0] & 1) != 0;
     const std::string_view xml(reinterpret_cast<const char*>(data) + 1, size - 1);
     const std::string whole = read(xml, 0, isIntrinsic);
-    if (read(xml, data[0] * xml.size() / 256, isIntrinsic) != whole)
+    if (read(xml, data[0] * xml.size() / 256, isIntrinsic) != whole) {
         std::abort();
+    }
     return 0;
 }

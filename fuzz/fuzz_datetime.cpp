@@ -18,7 +18,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         return 0;
     }
     const CIMDateTime again(value.toString());
-    if (!again.equal(value) || again.toString() != value.toString() || again.isInterval() != value.isInterval())
+    if (!again.equal(value) || again.toString() != value.toString() || again.isInterval() != value.isInterval()) {
         std::abort();
+    }
     return 0;
 }

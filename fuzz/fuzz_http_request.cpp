@@ -1,5 +1,5 @@
 // Requests as a client might send them, in two pieces: the parser takes the same from both, or refuses both alike.
-#include "pegasus/server/HttpRequestReader.h"
+#include "pegasus/server/net/HttpRequestReader.h"
 
 #include <cstdint>
 #include <cstdlib>
@@ -21,8 +21,9 @@ std::string outcome(std::string_view first, std::string_view second)
             pending += second;
             while (!parser.isDone()) {
                 const std::size_t taken = parser.put(pending);
-                if (taken == 0)
+                if (taken == 0) {
                     return "unfinished";
+                }
                 pending.erase(0, taken);
             }
         }
@@ -31,10 +32,12 @@ std::string outcome(std::string_view first, std::string_view second)
     }
     const HttpRequest request = parser.take();
     std::string text = request.method + "\n" + request.body + "\n";
-    for (const auto& [name, value] : request.headers)
+    for (const auto& [name, value] : request.headers) {
         text += name + ": " + value + "\n";
-    if (request.headerHas("TE", "trailers"))
+    }
+    if (request.headerHas("TE", "trailers")) {
         text += "trailers";
+    }
     return text;
 }
 
@@ -42,14 +45,16 @@ std::string outcome(std::string_view first, std::string_view second)
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
-    if (size == 0)
+    if (size == 0) {
         return 0;
+    }
     const std::string_view bytes(reinterpret_cast<const char*>(data) + 1, size - 1);
     const std::size_t split = bytes.size() * data[0] / 255;
     const std::string whole = outcome(bytes, "");
     const std::string halves = outcome(bytes.substr(0, split), bytes.substr(split));
     // A limit may be seen earlier or later, but an accepted request never differs.
-    if (whole != halves && whole != "unfinished" && halves != "unfinished")
+    if (whole != halves && whole != "unfinished" && halves != "unfinished") {
         std::abort();
+    }
     return 0;
 }

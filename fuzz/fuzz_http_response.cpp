@@ -22,8 +22,9 @@ std::string read(std::string_view bytes, std::size_t cut)
     try {
         response.feed(bytes.substr(0, cut));
         response.feed(bytes.substr(cut));
-        if (!response.endOfConnection())
+        if (!response.endOfConnection()) {
             return "incomplete";
+        }
     } catch (const Exception&) {
         return "error";
     }
@@ -36,10 +37,12 @@ std::string read(std::string_view bytes, std::size_t cut)
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
-    if (size < 2)
+    if (size < 2) {
         return 0;
+    }
     const std::string_view bytes(reinterpret_cast<const char*>(data) + 1, size - 1);
-    if (read(bytes, 0) != read(bytes, data[0] * bytes.size() / 256))
+    if (read(bytes, 0) != read(bytes, data[0] * bytes.size() / 256)) {
         std::abort();
+    }
     return 0;
 }

@@ -20,7 +20,7 @@ struct Outcome
     std::size_t instanceCount = 0;
 };
 
-/// Without includes, so that no file of the machine is read, and with limits that an input can reach.
+// Without includes, so that no file of the machine is read, and with limits that an input can reach.
 CompileOptions options()
 {
     CompileOptions result;
@@ -41,8 +41,9 @@ Outcome compile(const std::string& text)
         compileText(text, "fuzz.mof", options(), handler);
     } catch (const MofError& error) {
         const auto lineCount = static_cast<std::size_t>(std::count(text.begin(), text.end(), '\n')) + 1;
-        if (error.place().line > lineCount || error.place().column > text.size() + 1)
+        if (error.place().line > lineCount || error.place().column > text.size() + 1) {
             std::abort();
+        }
         outcome.diagnostic = error.diagnostic();
     }
     outcome.classCount = handler.classes().size();
@@ -59,6 +60,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     const Outcome second = compile(text);
     if (first.diagnostic != second.diagnostic || first.classCount != second.classCount ||
         first.instanceCount != second.instanceCount)
+    {
         std::abort();
+    }
     return 0;
 }

@@ -16,7 +16,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         return 0;
     }
     const CIMObjectPath again(path.toString());
-    if (again != path || again.toString() != path.toString() || again.makeHashCode() != path.makeHashCode())
+    if (again != path || again.toString() != path.toString() || again.makeHashCode() != path.makeHashCode()) {
         std::abort();
+    }
     return 0;
 }

@@ -1,4 +1,4 @@
-#include "Faults.h"
+#include "bench/soak/Faults.h"
 
 #include <csignal>
 #include <random>

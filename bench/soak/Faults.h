@@ -1,5 +1,4 @@
-#ifndef VRX_SOAK_FAULTS_H
-#define VRX_SOAK_FAULTS_H
+#pragma once
 
 #include <chrono>
 #include <functional>
@@ -33,5 +32,3 @@ bool IsHarmless(EFault fault);
 void Inject(EFault fault, pid_t process, const std::function<void()>& call);
 
 } // namespace soak
-
-#endif

@@ -1,17 +1,18 @@
-#include "Inventory.h"
+#include "bench/soak/Inventory.h"
+
+#include "host/cli/Guard.h"
+
+#include <host/ICIMClass.h>
+#include <host/ICIMInstance.h>
+#include <host/ICIMProperty.h>
+#include <host/IProvider.h>
+#include <host/TCIMReference.h>
 
 #include <mutex>
 #include <set>
 #include <vector>
 
 #include <unistd.h>
-
-#include <cli/Guard.h>
-#include <host/ICIMClass.h>
-#include <host/ICIMInstance.h>
-#include <host/ICIMProperty.h>
-#include <host/IProvider.h>
-#include <host/TCIMReference.h>
 
 namespace soak {
 
@@ -74,13 +75,14 @@ TInventory::TInventory(ICIMNamespace& ns) : fNamespace(ns)
                 return true;
             },
             context);
-        for (const auto& provider : providers)
+        for (const auto& provider : providers) {
             provider->EnumerateClassesProvided(
                 [&](boost::shared_ptr<ICIMClass> each) {
                     fClasses[each->GetName({})] = each;
                     return true;
                 },
                 {});
+        }
     });
 }
 
@@ -93,15 +95,19 @@ boost::shared_ptr<ICIMClass> TInventory::FindClass(const std::string& name)
 EAnswer TInventory::EnumerateProbe()
 {
     const auto probe = FindClass("Probe_Bulk");
-    if (!probe)
+    if (!probe) {
         return EAnswer::kLess;
+    }
     const auto instances = InstancesOf(*probe);
     std::set<unsigned long> numbers;
-    for (const auto& instance : instances)
-        if (!HasProbeValues(*instance, numbers))
+    for (const auto& instance : instances) {
+        if (!HasProbeValues(*instance, numbers)) {
             return EAnswer::kWrong;
-    if (!instances.empty())
+        }
+    }
+    if (!instances.empty()) {
         fProbe = instances.front();
+    }
     return numbers.size() == kProbeCount ? EAnswer::kRight : EAnswer::kLess;
 }
 
@@ -109,16 +115,18 @@ EAnswer TInventory::EnumerateProbe()
 EAnswer TInventory::InvokeEcho(const std::string& text)
 {
     const auto probe = FindClass("Probe_Bulk");
-    if (!probe)
+    if (!probe) {
         return EAnswer::kLess;
+    }
     TCIMReference target;
     target.SetPath("Probe_Bulk");
     const TCIMContext inputs = {{"Text", TCIMValue(text)}};
     TCIMContext outputs;
     TCIMValue result;
     Guarded([&] { result = probe->InvokeMethod(target, "Echo", inputs, outputs, {}); });
-    if (result.IsNull())
+    if (result.IsNull()) {
         return EAnswer::kLess;
+    }
     const auto back = outputs.find("Back");
     const bool right = result.ToString(10) == "0" && back != outputs.end() && back->second.ToString(10) == text;
     return right ? EAnswer::kRight : EAnswer::kWrong;
@@ -129,8 +137,9 @@ EAnswer TInventory::EnumerateProcessors()
     const auto processors = FindClass("LNX_Processor");
     const auto expected = static_cast<std::size_t>(::sysconf(_SC_NPROCESSORS_ONLN));
     const std::size_t count = processors ? InstancesOf(*processors).size() : 0;
-    if (count > expected)
+    if (count > expected) {
         return EAnswer::kWrong;
+    }
     return count == expected ? EAnswer::kRight : EAnswer::kLess;
 }
 
@@ -139,8 +148,9 @@ pid_t TInventory::ProbeProcess()
 {
     TCIMContext none;
     TCIMValue result;
-    if (fProbe)
+    if (fProbe) {
         Guarded([&] { result = fProbe->InvokeMethod("ProcessId", none, {}); });
+    }
     return result.IsNull() ? 0 : static_cast<pid_t>(static_cast<unsigned int>(result));
 }
 

@@ -1,11 +1,11 @@
-#ifndef VRX_SOAK_INVENTORY_H
-#define VRX_SOAK_INVENTORY_H
+#pragma once
+
+#include <host/ICIMNamespace.h>
+
+#include <boost/shared_ptr.hpp>
 
 #include <map>
 #include <string>
-
-#include <boost/shared_ptr.hpp>
-#include <host/ICIMNamespace.h>
 
 #include <sys/types.h>
 
@@ -45,5 +45,3 @@ class TInventory
 };
 
 } // namespace soak
-
-#endif

@@ -1,4 +1,4 @@
-#include "Resources.h"
+#include "bench/soak/Resources.h"
 
 #include <algorithm>
 #include <cctype>
@@ -32,7 +32,9 @@ std::vector<pid_t> ProcessesOf(const std::string& root)
         std::error_code gone;
         if (std::all_of(name.begin(), name.end(), [](unsigned char c) { return std::isdigit(c); }) &&
             fs::read_symlink(entry.path() / "exe", gone).string().rfind(root + "/", 0) == 0)
+        {
             found.push_back(static_cast<pid_t>(std::stol(name)));
+        }
     }
     return found;
 }

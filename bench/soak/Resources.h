@@ -1,5 +1,4 @@
-#ifndef VRX_SOAK_RESOURCES_H
-#define VRX_SOAK_RESOURCES_H
+#pragma once
 
 #include <cstddef>
 #include <string>
@@ -28,5 +27,3 @@ pid_t ServerProcess(const std::string& root, const std::string& consumer);
 std::string StartFile(const std::string& consumer);
 
 } // namespace soak
-
-#endif

@@ -2,6 +2,17 @@
 // tree are killed and stopped. Prints a table of counts; the exit status is 0 when every answer was right and nothing
 // leaked. tools/soak stages the tree and runs it.
 // Usage: soak_host ROOT CONSUMER MINUTES
+#include "bench/soak/Faults.h"
+#include "bench/soak/Inventory.h"
+#include "bench/soak/Resources.h"
+#include "host/cli/Guard.h"
+#include "host/cli/TPrivateServer.h"
+#include "host/cli/TSession.h"
+#include "host/core/TProcessLog.h"
+
+#include <host/TConfig.h>
+#include <host/TRootObject.h>
+
 #include <algorithm>
 #include <chrono>
 #include <cstdio>
@@ -11,17 +22,6 @@
 #include <thread>
 
 #include <unistd.h>
-
-#include <cli/Guard.h>
-#include <cli/TPrivateServer.h>
-#include <cli/TSession.h>
-#include <core/TProcessLog.h>
-#include <host/TConfig.h>
-#include <host/TRootObject.h>
-
-#include "Faults.h"
-#include "Inventory.h"
-#include "Resources.h"
 
 namespace soak {
 namespace {
@@ -94,8 +94,9 @@ template <typename TCall> void TSoak::Do(const char* operation, bool healthy, co
         ++fCounts.fWrong;
         std::fprintf(stderr, "soak: cycle %ld: %s: %s answer\n", fCounts.fCycles, operation,
                      answer == EAnswer::kWrong ? "a wrong" : "no whole");
-    } else if (answer == EAnswer::kLess)
+    } else if (answer == EAnswer::kLess) {
         ++fCounts.fLost;
+    }
 }
 
 void TSoak::Note(const char* operation, bool healthy, EAnswer (TInventory::*ask)(), TInventory& inventory)
@@ -117,8 +118,9 @@ void TSoak::Recover(TInventory& inventory)
 {
     const auto deadline = TClock::now() + kRecovery;
     EAnswer answer = EAnswer::kLess;
-    while (answer == EAnswer::kLess && TClock::now() < deadline)
+    while (answer == EAnswer::kLess && TClock::now() < deadline) {
         Do("enumerate 1,000 instances", false, [&] { return answer = inventory.EnumerateProbe(); });
+    }
     Rounds(inventory, true);
 }
 
@@ -135,10 +137,11 @@ void TSoak::UseNamespace(NKOLVRX20::ICIMNamespace& ns, EFault fault)
     Inject(fault, process,
            [&] { Note("enumerate 1,000 instances", IsHarmless(fault), &TInventory::EnumerateProbe, inventory); });
     ++fCounts.fFaults[NameOf(fault)];
-    if (IsServerFault(fault))
+    if (IsServerFault(fault)) {
         Rounds(inventory, false);
-    else
+    } else {
         Recover(inventory);
+    }
 }
 
 void TSoak::Cycle(EFault fault)
@@ -149,8 +152,9 @@ void TSoak::Cycle(EFault fault)
         vrxhost::TSession session(fRoot + "/libpegasus.nsp.so", fConsumer);
         UseNamespace(session.GetNamespace(), fault);
         const std::string problem = session.Close();
-        if (!problem.empty())
+        if (!problem.empty()) {
             throw vrxhost::TPluginError(problem);
+        }
     });
     ++fCounts.fOperations["start and clear"];
     if (!error.empty()) {
@@ -166,20 +170,24 @@ void TSoak::Cycle(EFault fault)
 void TSoak::CheckLeftovers()
 {
     const auto deadline = TClock::now() + 5s;
-    while (!ProcessesOf(fRoot).empty() && TClock::now() < deadline)
+    while (!ProcessesOf(fRoot).empty() && TClock::now() < deadline) {
         std::this_thread::sleep_for(50ms);
+    }
     for (const pid_t process : ProcessesOf(fRoot)) {
-        if (process == ::getpid())
+        if (process == ::getpid()) {
             continue;
+        }
         ++fCounts.fProcesses;
         std::fprintf(stderr, "soak: cycle %ld: process %d is left\n", fCounts.fCycles, process);
     }
-    for (const std::string& path : {StartFile(fConsumer), fRoot + "/pegasus/repository"})
+    for (const std::string& path : {StartFile(fConsumer), fRoot + "/pegasus/repository"}) {
         fCounts.fFiles += std::filesystem::exists(path) ? 1 : 0;
+    }
     NKOLVRX20::TProcessLog::Instance().Take(); // the host remembers failed programs until it is asked
     fLast = TakeResources();
-    if (fCounts.fCycles < kWarmCycles)
+    if (fCounts.fCycles < kWarmCycles) {
         fWarm = fLast;
+    }
     std::fprintf(stderr, "soak: %ld s, cycle %ld, %ld wrong, %zu descriptors, heap %zu bytes, resident %zu kB\n",
                  static_cast<long>(std::chrono::duration_cast<std::chrono::seconds>(TClock::now() - fStart).count()),
                  fCounts.fCycles, fCounts.fWrong, fLast.fDescriptors, fLast.fHeapBytes, fLast.fResidentBytes >> 10);
@@ -194,8 +202,9 @@ void TSoak::Run(std::chrono::minutes duration)
         std::fprintf(stderr, "soak: the consumer's name could not be set: %s\n", error.c_str());
         std::exit(2);
     }
-    while (TClock::now() - fStart < duration)
+    while (TClock::now() - fStart < duration) {
         Cycle(kFaults[static_cast<std::size_t>(fCounts.fCycles) % std::size(kFaults)]);
+    }
     TRootObject::SetCoreLogger(nullptr);
 }
 
@@ -212,10 +221,12 @@ void TSoak::Print() const
     const std::chrono::duration<double> took = TClock::now() - fStart;
     std::printf("| what | count |\n|---|---|\n");
     row("seconds", static_cast<long>(took.count()));
-    for (const auto& [name, count] : fCounts.fOperations)
+    for (const auto& [name, count] : fCounts.fOperations) {
         row("operations: " + name, count);
-    for (const auto& [name, count] : fCounts.fFaults)
+    }
+    for (const auto& [name, count] : fCounts.fFaults) {
         row("faults: " + name, count);
+    }
     row("answers lost to a fault, whole or in part", fCounts.fLost);
     row("longest operation, ms", static_cast<long>(fCounts.fLongestSeconds * 1000));
     row("wrong answers", fCounts.fWrong);

@@ -26,8 +26,9 @@ static CMPIStatus returnLamp(const CMPIResult* results, const char* ns, const La
     CMPIValue value;
 
     path->ft->addKey(path, "Name", (const CMPIValue*)lamp->name, CMPI_chars);
-    if (pathOnly)
+    if (pathOnly) {
         return results->ft->returnObjectPath(results, path);
+    }
     instance = gBroker->eft->newInstance(gBroker, path, NULL);
     instance->ft->setProperty(instance, "Name", (const CMPIValue*)lamp->name, CMPI_chars);
     value.boolean = lamp->lit;
@@ -42,8 +43,9 @@ static CMPIStatus returnLamps(const CMPIResult* results, const CMPIObjectPath* o
     const CMPIString* ns = of->ft->getNameSpace(of, NULL);
     size_t i;
 
-    for (i = 0; i < sizeof kLamps / sizeof kLamps[0]; ++i)
+    for (i = 0; i < sizeof kLamps / sizeof kLamps[0]; ++i) {
         returnLamp(results, ns->ft->getCharPtr(ns, NULL), &kLamps[i], pathOnly);
+    }
     return results->ft->returnDone(results);
 }
 
@@ -123,7 +125,8 @@ CMPIInstanceMI* Lamps_Create_InstanceMI(const CMPIBroker* broker, const CMPICont
 
     (void)context;
     gBroker = broker;
-    if (rc)
+    if (rc) {
         *rc = status(CMPI_RC_OK);
+    }
     return &mi;
 }

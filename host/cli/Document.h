@@ -1,13 +1,12 @@
 // What vrxhost shows: plain data that owes nothing to the plug-in, so that it outlives it.
-#ifndef VRX_CLI_DOCUMENT_H
-#define VRX_CLI_DOCUMENT_H
+#pragma once
 
-#include <string>
-#include <vector>
+#include "host/cli/Options.h"
 
 #include <host/TCIMValue.h>
 
-#include "Options.h"
+#include <string>
+#include <vector>
 
 namespace vrxhost {
 
@@ -70,5 +69,3 @@ struct TDocument
 };
 
 } // namespace vrxhost
-
-#endif

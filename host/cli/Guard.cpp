@@ -1,4 +1,6 @@
-#include "Guard.h"
+#include "host/cli/Guard.h"
+
+#include <host/TVRXException.h>
 
 #include <cstdlib>
 #include <exception>
@@ -6,16 +8,15 @@
 
 #include <cxxabi.h>
 
-#include <host/TVRXException.h>
-
 namespace vrxhost {
 namespace {
 
 std::string CurrentTypeName()
 {
     const std::type_info* type = abi::__cxa_current_exception_type();
-    if (!type)
+    if (!type) {
         return "of a foreign language";
+    }
     const std::unique_ptr<char, void (*)(void*)> name(abi::__cxa_demangle(type->name(), nullptr, nullptr, nullptr),
                                                       std::free);
     return std::string("of type ") + (name ? name.get() : type->name());

@@ -1,5 +1,4 @@
-#ifndef VRX_CLI_GUARD_H
-#define VRX_CLI_GUARD_H
+#pragma once
 
 #include <string>
 
@@ -22,5 +21,3 @@ template <typename Call> std::string Guarded(const Call& call)
 }
 
 } // namespace vrxhost
-
-#endif

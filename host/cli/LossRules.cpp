@@ -1,10 +1,10 @@
-#include "LossRules.h"
+#include "host/cli/LossRules.h"
+
+#include <host/TVRXStatusCode.h>
 
 #include <filesystem>
 #include <sstream>
 #include <vector>
-
-#include <host/TVRXStatusCode.h>
 
 namespace vrxhost {
 namespace {
@@ -60,26 +60,30 @@ std::string OneLine(const std::string& text)
     std::istringstream stream(text);
     for (std::string line; std::getline(stream, line);) {
         line = Trimmed(line);
-        if (line == "^" && !lines.empty())
+        if (line == "^" && !lines.empty()) {
             lines.pop_back();
-        else if (!line.empty())
+        } else if (!line.empty()) {
             lines.push_back(line);
+        }
     }
     std::string joined;
-    for (const std::string& line : lines)
+    for (const std::string& line : lines) {
         joined += (joined.empty() ? "" : " ") + line;
+    }
     return joined;
 }
 
 std::optional<std::string> Apply(const TRule& rule, const std::string& line)
 {
-    if (!BeginsWith(line, rule.fBegin))
+    if (!BeginsWith(line, rule.fBegin)) {
         return std::nullopt;
+    }
     const std::string middle = rule.fMiddle;
     const std::size_t object = std::char_traits<char>::length(rule.fBegin);
     const std::size_t split = middle.empty() ? line.size() : line.find(middle, object);
-    if (split == std::string::npos)
+    if (split == std::string::npos) {
         return std::nullopt;
+    }
     const std::string cause = split < line.size() ? line.substr(split + middle.size()) : "";
     return rule.fSubject + OneLine(line.substr(object, split - object)) + rule.fVerb + OneLine(cause);
 }
@@ -103,9 +107,11 @@ std::string LossOfCompilation(const NKOLVRX20::TFailedProgram& program)
 
 std::optional<std::string> LossOfLine(const std::string& line)
 {
-    for (const TRule& rule : kRules)
-        if (auto sentence = Apply(rule, line))
+    for (const TRule& rule : kRules) {
+        if (auto sentence = Apply(rule, line)) {
             return sentence;
+        }
+    }
     return std::nullopt;
 }
 
@@ -125,23 +131,30 @@ bool IsServerStart(const NKOLVRX20::TFailedProgram& program)
 
 std::optional<std::string> LossOfProgram(const NKOLVRX20::TFailedProgram& program, const std::string& root)
 {
-    if (program.fName == "cimmof")
+    if (program.fName == "cimmof") {
         return LossOfCompilation(program);
-    if (IsServerStart(program))
+    }
+    if (IsServerStart(program)) {
         return "the server did not start, cimserver: " + Cause(program);
+    }
     if (program.fName == "cimserver") // a server that does not run cannot be stopped
+    {
         return std::nullopt;
+    }
     // Looks for a leftover server; without it none is found.
-    if (program.fName == "ps")
+    if (program.fName == "ps") {
         return std::nullopt;
+    }
     // An adapter tool that only machines with the adapter have.
-    if (program.fName == "bcu")
+    if (program.fName == "bcu") {
         return std::filesystem::exists(root + "/pegasus/provider/brocade")
                    ? std::optional("provider brocade is disabled, bcu: " + Cause(program))
                    : std::nullopt;
+    }
     std::string command = program.fName;
-    for (const std::string& argument : program.fArguments)
+    for (const std::string& argument : program.fArguments) {
         command += " " + argument;
+    }
     return command + " failed: " + Cause(program);
 }
 

@@ -1,10 +1,9 @@
-#ifndef VRX_CLI_LOSSRULES_H
-#define VRX_CLI_LOSSRULES_H
+#pragma once
+
+#include "host/core/TProcessLog.h"
 
 #include <optional>
 #include <string>
-
-#include <core/TProcessLog.h>
 
 namespace vrxhost {
 
@@ -22,5 +21,3 @@ std::optional<std::string> LossOfProgram(const NKOLVRX20::TFailedProgram& progra
 bool IsServerStart(const NKOLVRX20::TFailedProgram& program);
 
 } // namespace vrxhost
-
-#endif

@@ -1,9 +1,9 @@
-#include "Options.h"
+#include "host/cli/Options.h"
+
+#include <CLI/CLI.hpp>
 
 #include <filesystem>
 #include <iostream>
-
-#include <CLI/CLI.hpp>
 
 namespace vrxhost {
 namespace {
@@ -32,15 +32,17 @@ std::string DefaultRoot()
 // Paths are the user's, from where the program was started; later the root becomes the working directory.
 void MakeAbsolute(std::string& path)
 {
-    if (!path.empty())
+    if (!path.empty()) {
         path = fs::absolute(path).lexically_normal();
+    }
 }
 
 bool SplitSetting(const std::string& text, TOptions& options)
 {
     const std::size_t equals = text.find('=');
-    if (equals == 0 || equals == std::string::npos)
+    if (equals == 0 || equals == std::string::npos) {
         return false;
+    }
     options.fSettings.emplace_back(text.substr(0, equals), text.substr(equals + 1));
     return true;
 }
@@ -87,19 +89,25 @@ void AddCommands(CLI::App& app, TOptions& options)
 
 void FillDefaults(TOptions& options, const std::vector<std::string>& settings)
 {
-    for (const std::string& setting : settings)
+    for (const std::string& setting : settings) {
         SplitSetting(setting, options);
-    for (std::string* path : {&options.fConfigFile, &options.fLogFile, &options.fPlugin, &options.fRoot})
+    }
+    for (std::string* path : {&options.fConfigFile, &options.fLogFile, &options.fPlugin, &options.fRoot}) {
         MakeAbsolute(*path);
-    if (options.fRoot.empty())
+    }
+    if (options.fRoot.empty()) {
         options.fRoot = DefaultRoot();
-    if (options.fPlugin.empty())
+    }
+    if (options.fPlugin.empty()) {
         options.fPlugin = ProgramDirectory() / kPluginFile;
-    if (options.fLogFile.empty())
+    }
+    if (options.fLogFile.empty()) {
         options.fLogFile = fs::path(options.fRoot) / kLogFile;
+    }
     const fs::path config = fs::path(options.fRoot) / kConfigFile;
-    if (options.fConfigFile.empty() && fs::exists(config))
+    if (options.fConfigFile.empty() && fs::exists(config)) {
         options.fConfigFile = config;
+    }
 }
 
 } // namespace

@@ -1,5 +1,4 @@
-#ifndef VRX_CLI_OPTIONS_H
-#define VRX_CLI_OPTIONS_H
+#pragma once
 
 #include <string>
 #include <utility>
@@ -55,5 +54,3 @@ constexpr char kDefaultConsumer[] = "quvex";
 int ParseOptions(int argc, const char* const* argv, TOptions& options);
 
 } // namespace vrxhost
-
-#endif

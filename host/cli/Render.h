@@ -1,9 +1,8 @@
-#ifndef VRX_CLI_RENDER_H
-#define VRX_CLI_RENDER_H
+#pragma once
+
+#include "host/cli/Document.h"
 
 #include <string>
-
-#include "Document.h"
 
 namespace vrxhost {
 
@@ -16,5 +15,3 @@ std::string RenderTable(const TDocument& document);
 std::string RenderJson(const TDocument& document);
 
 } // namespace vrxhost
-
-#endif

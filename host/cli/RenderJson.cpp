@@ -1,9 +1,9 @@
-#include <charconv>
+#include "host/cli/Render.h"
+#include "host/inmem/CharacterText.h"
 
-#include <inmem/CharacterText.h>
 #include <nlohmann/json.hpp>
 
-#include "Render.h"
+#include <charconv>
 
 namespace vrxhost {
 namespace {
@@ -23,8 +23,9 @@ TJson RealValue(const TCIMValue& value)
 
 TJson ScalarValue(const TCIMValue& value)
 {
-    if (value.IsNull())
+    if (value.IsNull()) {
         return nullptr;
+    }
     const auto type = value.GetType();
     switch (type) {
     case TType::kBoolean:
@@ -51,27 +52,31 @@ TJson ScalarValue(const TCIMValue& value)
 
 TJson Value(const TCIMValue& value)
 {
-    if (!value.IsArray())
+    if (!value.IsArray()) {
         return ScalarValue(value);
+    }
     TJson array = TJson::array();
-    for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(value))
+    for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(value)) {
         array.push_back(ScalarValue(element));
+    }
     return array;
 }
 
 TJson Instance(const TInstanceRecord& instance)
 {
     TJson properties = TJson::object();
-    for (const auto& property : instance.fProperties)
+    for (const auto& property : instance.fProperties) {
         properties[property.fName] = Value(property.fValue);
+    }
     return {{"path", instance.fPath}, {"properties", std::move(properties)}};
 }
 
 TJson Method(const TMethodRecord& method)
 {
     TJson parameters = TJson::array();
-    for (const auto& parameter : method.fParameters)
+    for (const auto& parameter : method.fParameters) {
         parameters.push_back({{"name", parameter.fName}, {"type", parameter.fType}});
+    }
     return {{"name", method.fName}, {"type", method.fReturnType}, {"parameters", std::move(parameters)}};
 }
 
@@ -79,22 +84,26 @@ void AddDeclarations(TJson& json, const TClassRecord& each)
 {
     json["superclass"] = each.fSuperClass.empty() ? TJson() : TJson(each.fSuperClass);
     json["properties"] = TJson::array();
-    for (const auto& property : each.fProperties)
+    for (const auto& property : each.fProperties) {
         json["properties"].push_back({{"name", property.fName}, {"type", property.fType}, {"key", property.fIsKey}});
+    }
     json["methods"] = TJson::array();
-    for (const auto& method : each.fMethods)
+    for (const auto& method : each.fMethods) {
         json["methods"].push_back(Method(method));
+    }
 }
 
 TJson Class(const TClassRecord& each, ECommand command)
 {
     TJson json = {{"name", each.fName}};
-    if (command == ECommand::kClasses)
+    if (command == ECommand::kClasses) {
         AddDeclarations(json, each);
+    }
     if (command == ECommand::kInventory || command == ECommand::kInstances) {
         json["instances"] = TJson::array();
-        for (const auto& instance : each.fInstances)
+        for (const auto& instance : each.fInstances) {
             json["instances"].push_back(Instance(instance));
+        }
     }
     return json;
 }
@@ -103,22 +112,26 @@ TJson Provider(const TProviderRecord& provider, ECommand command)
 {
     TJson json = {{"name", provider.fName}, {"module", provider.fModule}, {"description", provider.fDescription}};
     json["classes"] = TJson::array();
-    for (const auto& each : provider.fClasses)
+    for (const auto& each : provider.fClasses) {
         json["classes"].push_back(Class(each, command));
+    }
     return json;
 }
 
 TJson Body(const TDocument& document)
 {
     if (document.fCommand == ECommand::kInstances) {
-        for (const auto& provider : document.fProviders)
-            for (const auto& each : provider.fClasses)
+        for (const auto& provider : document.fProviders) {
+            for (const auto& each : provider.fClasses) {
                 return Class(each, document.fCommand);
+            }
+        }
         return TJson::object();
     }
     TJson body = {{"providers", TJson::array()}};
-    for (const auto& provider : document.fProviders)
+    for (const auto& provider : document.fProviders) {
         body["providers"].push_back(Provider(provider, document.fCommand));
+    }
     return body;
 }
 

@@ -1,7 +1,7 @@
+#include "host/cli/Render.h"
+
 #include <algorithm>
 #include <cstdio>
-
-#include "Render.h"
 
 namespace vrxhost {
 namespace {
@@ -37,56 +37,66 @@ std::string Padded(const std::string& text, std::size_t width)
 void AppendInstance(std::string& out, const TInstanceRecord& instance, std::size_t number, const std::string& indent)
 {
     std::size_t width = 0;
-    for (const auto& property : instance.fProperties)
-        if (!property.fValue.IsNull())
+    for (const auto& property : instance.fProperties) {
+        if (!property.fValue.IsNull()) {
             width = std::max(width, property.fName.size());
+        }
+    }
     out += indent + "#" + std::to_string(number) + "\n";
-    for (const auto& property : instance.fProperties)
-        if (!property.fValue.IsNull())
+    for (const auto& property : instance.fProperties) {
+        if (!property.fValue.IsNull()) {
             out += indent + "  " + Padded(property.fName, width) + "  " + Printable(property.fText) + "\n";
+        }
+    }
 }
 
 void AppendInstances(std::string& out, const TClassRecord& each, const std::string& indent)
 {
     out += indent + each.fName + ": " + Counted(each.fInstances.size(), "instance") + "\n";
     std::size_t number = 0;
-    for (const auto& instance : each.fInstances)
+    for (const auto& instance : each.fInstances) {
         AppendInstance(out, instance, ++number, indent + "  ");
+    }
 }
 
 std::string ParameterList(const TMethodRecord& method)
 {
     std::string list;
-    for (const auto& parameter : method.fParameters)
+    for (const auto& parameter : method.fParameters) {
         list += (list.empty() ? "" : ", ") + parameter.fType + " " + parameter.fName;
+    }
     return list;
 }
 
 void AppendDeclarations(std::string& out, const TClassRecord& each)
 {
     out += "  " + each.fName + (each.fSuperClass.empty() ? "" : " : " + each.fSuperClass) + "\n";
-    for (const auto& property : each.fProperties)
+    for (const auto& property : each.fProperties) {
         out += "    " + Padded(property.fType, 11) + property.fName + (property.fIsKey ? "  [key]" : "") + "\n";
-    for (const auto& method : each.fMethods)
+    }
+    for (const auto& method : each.fMethods) {
         out += "    " + Padded(method.fReturnType, 11) + method.fName + "(" + ParameterList(method) + ")\n";
+    }
 }
 
 void AppendClass(std::string& out, const TClassRecord& each, ECommand command)
 {
-    if (command == ECommand::kInventory)
+    if (command == ECommand::kInventory) {
         AppendInstances(out, each, "  ");
-    else if (command == ECommand::kClasses)
+    } else if (command == ECommand::kClasses) {
         AppendDeclarations(out, each);
-    else
+    } else {
         out += "  " + each.fName + "\n";
+    }
 }
 
 void AppendProvider(std::string& out, const TProviderRecord& provider, ECommand command)
 {
     out += "Provider " + (provider.fName.empty() ? "without a name" : Printable(provider.fName)) + " (" +
            Printable(provider.fModule) + "): " + Counted(provider.fClasses.size(), "class") + "\n";
-    for (const auto& each : provider.fClasses)
+    for (const auto& each : provider.fClasses) {
         AppendClass(out, each, command);
+    }
 }
 
 } // namespace
@@ -95,13 +105,16 @@ std::string RenderTable(const TDocument& document)
 {
     std::string out;
     for (const auto& provider : document.fProviders) {
-        if (document.fCommand == ECommand::kInstances)
-            for (const auto& each : provider.fClasses)
+        if (document.fCommand == ECommand::kInstances) {
+            for (const auto& each : provider.fClasses) {
                 AppendInstances(out, each, "");
-        else
+            }
+        } else {
             AppendProvider(out, provider, document.fCommand);
-        if (&provider != &document.fProviders.back())
+        }
+        if (&provider != &document.fProviders.back()) {
             out += "\n";
+        }
     }
     return out;
 }

@@ -1,4 +1,4 @@
-#include "Say.h"
+#include "host/cli/Say.h"
 
 #include <iostream>
 

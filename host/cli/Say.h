@@ -1,5 +1,4 @@
-#ifndef VRX_CLI_SAY_H
-#define VRX_CLI_SAY_H
+#pragma once
 
 #include <string>
 
@@ -9,5 +8,3 @@ namespace vrxhost {
 void Say(const std::string& sentence);
 
 } // namespace vrxhost
-
-#endif

@@ -1,9 +1,7 @@
-#include "TCollector.h"
+#include "host/cli/TCollector.h"
 
-#include <mutex>
-#include <set>
-
-#include <strings.h>
+#include "host/cli/Guard.h"
+#include "host/inmem/TInmemProperty.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>
@@ -12,9 +10,11 @@
 #include <host/ICIMProperty.h>
 #include <host/ICIMPropertyDecl.h>
 #include <host/IProvider.h>
-#include <inmem/TInmemProperty.h>
 
-#include "Guard.h"
+#include <mutex>
+#include <set>
+
+#include <strings.h>
 
 namespace vrxhost {
 
@@ -35,8 +35,9 @@ std::string TypeText(TCIMValue::TCIMType type)
 std::string NameOf(const ICIMProperty& property)
 {
     const auto declaration = property.GetDeclaration(kNoContext);
-    if (declaration)
+    if (declaration) {
         return declaration->GetName(kNoContext);
+    }
     const auto* own = dynamic_cast<const TInmemProperty*>(&property);
     return own ? own->GetName() : std::string();
 }
@@ -45,15 +46,19 @@ std::string NameOf(const ICIMProperty& property)
 // library that made it, which is unloaded before the document goes.
 TCIMValue Detached(const TCIMValue& value)
 {
-    if (value.GetType() != TCIMValue::TCIMType::kReference)
+    if (value.GetType() != TCIMValue::TCIMType::kReference) {
         return value;
-    if (value.IsNull())
+    }
+    if (value.IsNull()) {
         return TCIMValue(TCIMValue::TCIMType::kString, 0);
-    if (!value.IsArray())
+    }
+    if (!value.IsArray()) {
         return TCIMValue(value.ToString(10));
+    }
     std::vector<TCIMValue> paths;
-    for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(value))
+    for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(value)) {
         paths.emplace_back(element.ToString(10));
+    }
     return TCIMValue(TCIMValue::TCIMType::kString, 0, paths);
 }
 
@@ -94,21 +99,25 @@ std::vector<TProviderRecord> TCollector::Collect(ECommand command, const std::st
 {
     std::vector<TProviderRecord> records;
     if (command == ECommand::kInstances) {
-        if (const TClassPtr found = FindClass(className))
+        if (const TClassPtr found = FindClass(className)) {
             records.push_back({"", "", "", {ReadClass(*found, command)}});
+        }
         return records;
     }
-    for (const TProviderPtr& provider : ListProviders())
-        if (!fIsStopped())
+    for (const TProviderPtr& provider : ListProviders()) {
+        if (!fIsStopped()) {
             records.push_back(ReadProvider(*provider, command));
+        }
+    }
     return records;
 }
 
 void TCollector::Ask(const std::string& what, const std::function<void()>& question)
 {
     const std::string error = Guarded(question);
-    if (!error.empty() && !fIsStopped())
+    if (!error.empty() && !fIsStopped()) {
         fLosses.Add(what + ": " + error);
+    }
 }
 
 // The plug-in may call back on several threads at once, so the callback only collects.
@@ -147,10 +156,13 @@ std::vector<TCollector::TClassPtr> TCollector::ListClasses(IProvider& provider, 
 // First among the classes that the providers serve, which know their provider; then any class of the namespace.
 TCollector::TClassPtr TCollector::FindClass(const std::string& name)
 {
-    for (const TProviderPtr& provider : ListProviders())
-        for (const TClassPtr& each : ListClasses(*provider, provider->GetName(kNoContext)))
-            if (strcasecmp(each->GetName(kNoContext).c_str(), name.c_str()) == 0)
+    for (const TProviderPtr& provider : ListProviders()) {
+        for (const TClassPtr& each : ListClasses(*provider, provider->GetName(kNoContext))) {
+            if (strcasecmp(each->GetName(kNoContext).c_str(), name.c_str()) == 0) {
                 return each;
+            }
+        }
+    }
     TClassPtr found;
     Ask("class " + name + " could not be fetched", [&] { found = fNamespace.GetClass(name, kNoContext); });
     return found;
@@ -164,9 +176,11 @@ TProviderRecord TCollector::ReadProvider(IProvider& provider, ECommand command)
         record.fModule = provider.GetModuleName(kNoContext);
         record.fDescription = provider.GetDescription(kNoContext);
     });
-    for (const TClassPtr& each : ListClasses(provider, record.fName))
-        if (!fIsStopped())
+    for (const TClassPtr& each : ListClasses(provider, record.fName)) {
+        if (!fIsStopped()) {
             record.fClasses.push_back(ReadClass(*each, command));
+        }
+    }
     return record;
 }
 
@@ -174,10 +188,12 @@ TClassRecord TCollector::ReadClass(ICIMClass& each, ECommand command)
 {
     TClassRecord record;
     Ask("a class could not be named", [&] { record.fName = each.GetName(kNoContext); });
-    if (command == ECommand::kClasses)
+    if (command == ECommand::kClasses) {
         Ask("class " + record.fName + " could not be described", [&] { ReadDeclarations(each, record); });
-    if (command == ECommand::kInventory || command == ECommand::kInstances)
+    }
+    if (command == ECommand::kInventory || command == ECommand::kInstances) {
         Ask("instances of " + record.fName + " could not be fetched", [&] { ReadInstances(each, record); });
+    }
     return record;
 }
 

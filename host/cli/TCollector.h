@@ -1,12 +1,11 @@
-#ifndef VRX_CLI_TCOLLECTOR_H
-#define VRX_CLI_TCOLLECTOR_H
+#pragma once
 
-#include <functional>
+#include "host/cli/Document.h"
+#include "host/cli/TLossLog.h"
 
 #include <host/ICIMNamespace.h>
 
-#include "Document.h"
-#include "TLossLog.h"
+#include <functional>
 
 namespace vrxhost {
 
@@ -43,5 +42,3 @@ class TCollector
 };
 
 } // namespace vrxhost
-
-#endif

@@ -1,4 +1,4 @@
-#include "TDocumentOutput.h"
+#include "host/cli/TDocumentOutput.h"
 
 #include <algorithm>
 #include <cerrno>
@@ -21,10 +21,12 @@ namespace {
 
 TDocumentOutput::TDocumentOutput() : fFd(::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, STDERR_FILENO + 1))
 {
-    if (!fFd)
+    if (!fFd) {
         ThrowErrno("copying standard output");
-    if (::dup2(STDERR_FILENO, STDOUT_FILENO) < 0)
+    }
+    if (::dup2(STDERR_FILENO, STDOUT_FILENO) < 0) {
         ThrowErrno("pointing standard output at standard error");
+    }
 }
 
 TDocumentOutput::~TDocumentOutput()
@@ -37,19 +39,22 @@ int TDocumentOutput::Write(const std::string& text, int stopFd)
     for (std::size_t written = 0; written < text.size();) {
         pollfd fds[] = {{fFd.Get(), POLLOUT, 0}, {stopFd, POLLIN, 0}};
         if (::poll(fds, 2, -1) < 0) {
-            if (errno != EINTR)
+            if (errno != EINTR) {
                 return errno;
+            }
             continue;
         }
-        if (fds[1].revents != 0)
+        if (fds[1].revents != 0) {
             return ECANCELED;
+        }
         // A writable pipe takes this much without blocking.
         const std::size_t count = std::min<std::size_t>(text.size() - written, PIPE_BUF);
         const ssize_t result = ::write(fFd.Get(), text.data() + written, count);
-        if (result >= 0)
+        if (result >= 0) {
             written += static_cast<std::size_t>(result);
-        else if (errno != EINTR && errno != EAGAIN)
+        } else if (errno != EINTR && errno != EAGAIN) {
             return errno;
+        }
     }
     return 0;
 }

@@ -1,9 +1,8 @@
-#ifndef VRX_CLI_TDOCUMENTOUTPUT_H
-#define VRX_CLI_TDOCUMENTOUTPUT_H
+#pragma once
+
+#include "host/core/TUniqueFd.h"
 
 #include <string>
-
-#include <core/TUniqueFd.h>
 
 namespace vrxhost {
 
@@ -25,5 +24,3 @@ class TDocumentOutput
 };
 
 } // namespace vrxhost
-
-#endif

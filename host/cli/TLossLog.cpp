@@ -1,9 +1,8 @@
-#include "TLossLog.h"
+#include "host/cli/TLossLog.h"
 
-#include <core/TCoreLogger.h>
-#include <core/TProcessLog.h>
-
-#include "LossRules.h"
+#include "host/cli/LossRules.h"
+#include "host/core/TCoreLogger.h"
+#include "host/core/TProcessLog.h"
 
 namespace vrxhost {
 namespace {
@@ -41,18 +40,20 @@ void TLossLog::Log(EVRXLogSeverity severity, const std::string& text)
 
 void TLossLog::Learn(EVRXLogSeverity severity, const std::string& text)
 {
-    if (LearnFromAttempt(text))
+    if (LearnFromAttempt(text)) {
         return;
-    if (BeginsWith(text, kLoading))
+    }
+    if (BeginsWith(text, kLoading)) {
         fLoadedFile = text.substr(sizeof kLoading - 1);
-    else if (const auto sentence = LossOfLine(text))
+    } else if (const auto sentence = LossOfLine(text)) {
         Enter(*sentence);
-    else if (severity != kError || IsHarmless(text))
+    } else if (severity != kError || IsHarmless(text)) {
         return;
-    else if (!BeginsWith(text, kDescription))
+    } else if (!BeginsWith(text, kDescription)) {
         Enter(WithoutLineFeed(text));
-    else if (text.find(kRoutine) == std::string::npos)
+    } else if (text.find(kRoutine) == std::string::npos) {
         Enter("provider description " + fLoadedFile + ", line " + text.substr(sizeof kDescription - 1));
+    }
 }
 
 // Returns: whether the line ends an attempt to start the server and to connect to it.
@@ -60,11 +61,14 @@ bool TLossLog::LearnFromAttempt(const std::string& text)
 {
     const bool connected = BeginsWith(text, kConnected);
     if (!connected && text.find(kRestart) == std::string::npos) // the client's own tries are parts of an attempt
+    {
         return false;
+    }
     fNoServer = !connected || fStartFailed;
     fStartFailed = false;
-    if (!fNoServer)
+    if (!fNoServer) {
         fHeldBack.clear();
+    }
     return true;
 }
 
@@ -79,8 +83,9 @@ void TLossLog::LearnFromPrograms()
 {
     for (const auto& program : NKOLVRX20::TProcessLog::Instance().Take()) {
         const auto sentence = LossOfProgram(program, fRoot);
-        if (!sentence)
+        if (!sentence) {
             continue;
+        }
         if (IsServerStart(program)) {
             fHeldBack = *sentence;
             fStartFailed = true;
@@ -99,8 +104,9 @@ void TLossLog::AddHeldBack()
 
 void TLossLog::Release()
 {
-    if (!fHeldBack.empty())
+    if (!fHeldBack.empty()) {
         Enter(fHeldBack);
+    }
     fHeldBack.clear();
 }
 
@@ -118,8 +124,9 @@ std::vector<std::string> TLossLog::GetSentences() const
 
 void TLossLog::Enter(const std::string& sentence)
 {
-    if (fKnown.insert(sentence).second)
+    if (fKnown.insert(sentence).second) {
         fSentences.push_back(sentence);
+    }
 }
 
 } // namespace vrxhost

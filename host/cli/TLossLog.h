@@ -1,12 +1,11 @@
-#ifndef VRX_CLI_TLOSSLOG_H
-#define VRX_CLI_TLOSSLOG_H
+#pragma once
+
+#include <host/ILogger.h>
 
 #include <mutex>
 #include <set>
 #include <string>
 #include <vector>
-
-#include <host/ILogger.h>
 
 namespace vrxhost {
 
@@ -51,5 +50,3 @@ class TLossLog : public NKOLVRX20::ILogger
 };
 
 } // namespace vrxhost
-
-#endif

@@ -1,4 +1,10 @@
-#include "TPluginLibrary.h"
+#include "host/cli/TPluginLibrary.h"
+
+#include "host/cli/Guard.h"
+
+#include <host/INamespaceProviderManager.h>
+#include <host/PluginSymbols.h>
+#include <host/TRootObject.h>
 
 #include <atomic>
 #include <chrono>
@@ -7,12 +13,6 @@
 #include <thread>
 
 #include <dlfcn.h>
-
-#include <host/INamespaceProviderManager.h>
-#include <host/PluginSymbols.h>
-#include <host/TRootObject.h>
-
-#include "Guard.h"
 
 namespace vrxhost {
 namespace {
@@ -36,8 +36,9 @@ bool AwaitThreadCount(std::size_t count)
 {
     const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(1);
     while (ThreadCount() > count) {
-        if (std::chrono::steady_clock::now() > deadline)
+        if (std::chrono::steady_clock::now() > deadline) {
             return false;
+        }
         std::this_thread::sleep_for(std::chrono::milliseconds(5));
     }
     return true;
@@ -48,10 +49,12 @@ bool AwaitThreadCount(std::size_t count)
 TPluginLibrary::TPluginLibrary(const std::string& path) : fPath(path), fThreadCountBefore(ThreadCount())
 {
     const std::string error = Guarded([this] { fHandle = ::dlopen(fPath.c_str(), RTLD_NOW | RTLD_LOCAL); });
-    if (!error.empty())
+    if (!error.empty()) {
         throw TPluginError("the plug-in " + fPath + " could not be loaded: " + error);
-    if (!fHandle)
+    }
+    if (!fHandle) {
         throw TPluginError(std::string("the plug-in could not be loaded: ") + ::dlerror());
+    }
     try {
         Register();
     } catch (const TPluginError&) {
@@ -62,8 +65,9 @@ TPluginLibrary::TPluginLibrary(const std::string& path) : fPath(path), fThreadCo
 
 TPluginLibrary::~TPluginLibrary()
 {
-    if (fHandle)
+    if (fHandle) {
         Unload();
+    }
 }
 
 bool TPluginLibrary::HasLeftThreads()
@@ -74,8 +78,9 @@ bool TPluginLibrary::HasLeftThreads()
 TPluginLibrary::TEntryPoint TPluginLibrary::Symbol(const char* name) const
 {
     void* const symbol = ::dlsym(fHandle, name);
-    if (!symbol)
+    if (!symbol) {
         throw TPluginError(fPath + " is no namespace-provider plug-in: it has no symbol " + name);
+    }
     return reinterpret_cast<TEntryPoint>(symbol);
 }
 
@@ -84,14 +89,17 @@ void TPluginLibrary::Register()
     const TEntryPoint initialize = Symbol(NKOLVRX20::kInitializeSymbol);
     fClearNamespace = Symbol(NKOLVRX20::kClearNamespaceSymbol);
     std::string error = Guarded([&] { initialize(); });
-    if (!error.empty())
+    if (!error.empty()) {
         throw TPluginError("the plug-in " + fPath + " could not be initialised: " + error);
+    }
     error =
         Guarded([&] { fProvider = TRootObject::GetNamespaceProviderManager()->GetNamespaceProvider(kProviderName); });
-    if (!error.empty())
+    if (!error.empty()) {
         throw TPluginError("the plug-in " + fPath + " could not be asked for its name: " + error);
-    if (!fProvider)
+    }
+    if (!fProvider) {
         throw TPluginError("the plug-in " + fPath + " registered no provider named \"" + kProviderName + "\"");
+    }
 }
 
 void TPluginLibrary::Unregister()
@@ -103,13 +111,14 @@ void TPluginLibrary::Unregister()
 std::string TPluginLibrary::Unload()
 {
     std::string problems = Guarded([this] { fClearNamespace(); });
-    if (!problems.empty())
+    if (!problems.empty()) {
         problems = "the plug-in could not shut its namespace down: " + problems;
+    }
     Unregister();
     void* const handle = std::exchange(fHandle, nullptr);
-    if (AwaitThreadCount(fThreadCountBefore))
+    if (AwaitThreadCount(fThreadCountBefore)) {
         ::dlclose(handle);
-    else {
+    } else {
         gHasLeftThreads = true;
         problems += std::string(problems.empty() ? "" : "; ") + "the plug-in left threads behind and stays loaded";
     }

@@ -1,13 +1,12 @@
-#ifndef VRX_CLI_TPLUGINLIBRARY_H
-#define VRX_CLI_TPLUGINLIBRARY_H
+#pragma once
+
+#include <host/INamespaceProvider.h>
+
+#include <boost/shared_ptr.hpp>
 
 #include <cstddef>
 #include <stdexcept>
 #include <string>
-
-#include <boost/shared_ptr.hpp>
-
-#include <host/INamespaceProvider.h>
 
 namespace vrxhost {
 
@@ -56,5 +55,3 @@ class TPluginLibrary
 };
 
 } // namespace vrxhost
-
-#endif

@@ -1,4 +1,4 @@
-#include "TPrivateServer.h"
+#include "host/cli/TPrivateServer.h"
 
 #include <cerrno>
 #include <climits>
@@ -14,11 +14,11 @@ extern "C" {
 #include <sys/pidfd.h> // C only in glibc 2.36
 }
 
-#include <core/TProcessLog.h>
-#include <core/TUniqueFd.h>
-#include <host/TOSSpecific.h>
+#include "host/cli/Guard.h"
+#include "host/core/TProcessLog.h"
+#include "host/core/TUniqueFd.h"
 
-#include "Guard.h"
+#include <host/TOSSpecific.h>
 
 namespace vrxhost {
 namespace {
@@ -39,8 +39,9 @@ pid_t ReadProcessId(const std::string& path)
 {
     const TUniqueFd file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW));
     char text[32] = "";
-    if (!file || ::read(file.Get(), text, sizeof text - 1) <= 0)
+    if (!file || ::read(file.Get(), text, sizeof text - 1) <= 0) {
         return 0;
+    }
     const long id = std::strtol(text, nullptr, 10);
     return id > 1 && id <= INT_MAX ? static_cast<pid_t>(id) : 0;
 }
@@ -69,8 +70,9 @@ std::string TPrivateServer::SetConsumer() const
                                              kConfigTimeoutSeconds);
     });
     std::string reason = error;
-    for (const auto& failed : NKOLVRX20::TProcessLog::Instance().Take())
+    for (const auto& failed : NKOLVRX20::TProcessLog::Instance().Take()) {
         reason = failed.GetReason() + (failed.fErrorOutput.empty() ? "" : ": " + failed.fErrorOutput);
+    }
     return reason;
 }
 
@@ -79,14 +81,17 @@ void TPrivateServer::End() const
     const pid_t id = ReadProcessId("/var/tmp/cimserverkol_tc_" + fConsumer + "_start.conf");
     // The descriptor first: what is checked through it afterwards is about this very process.
     const TUniqueFd process(id ? ::pidfd_open(id, 0) : -1);
-    if (!process)
+    if (!process) {
         return;
+    }
     const std::string program = RealPath("/proc/" + std::to_string(id) + "/exe");
-    if (program.empty() || program != RealPath(fRoot + "/pegasus/bin/cimserver"))
+    if (program.empty() || program != RealPath(fRoot + "/pegasus/bin/cimserver")) {
         return;
+    }
     ::pidfd_send_signal(process.Get(), SIGTERM, nullptr, 0);
-    if (!HasExited(process, kOrderlyEndMs))
+    if (!HasExited(process, kOrderlyEndMs)) {
         ::pidfd_send_signal(process.Get(), SIGKILL, nullptr, 0);
+    }
 }
 
 } // namespace vrxhost

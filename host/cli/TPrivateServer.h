@@ -1,5 +1,4 @@
-#ifndef VRX_CLI_TPRIVATESERVER_H
-#define VRX_CLI_TPRIVATESERVER_H
+#pragma once
 
 #include <string>
 
@@ -27,5 +26,3 @@ class TPrivateServer
 };
 
 } // namespace vrxhost
-
-#endif

@@ -1,17 +1,17 @@
-#include "TRun.h"
+#include "host/cli/TRun.h"
 
-#include <cerrno>
-#include <cstring>
+#include "host/cli/Guard.h"
+#include "host/cli/Render.h"
+#include "host/cli/Say.h"
+#include "host/cli/TCollector.h"
+#include "host/cli/TSession.h"
+#include "host/core/TProcessControl.h"
 
-#include <core/TProcessControl.h>
 #include <host/TConfig.h>
 #include <host/TRootObject.h>
 
-#include "Guard.h"
-#include "Render.h"
-#include "Say.h"
-#include "TCollector.h"
-#include "TSession.h"
+#include <cerrno>
+#include <cstring>
 
 namespace vrxhost {
 
@@ -36,8 +36,9 @@ EExitStatus TRun::Execute()
     try {
         LoadSettings();
         SetConsumer();
-        if (!fStop.IsStopped())
+        if (!fStop.IsStopped()) {
             UsePlugin();
+        }
     } catch (const TPluginError& e) {
         Fail(e.what());
     }
@@ -55,33 +56,39 @@ void TRun::LoadSettings() const
 {
     if (!fOptions.fConfigFile.empty()) {
         const std::string error = Guarded([&] { TConfig::GetInstance()->Load(fOptions.fConfigFile); });
-        if (!error.empty())
+        if (!error.empty()) {
             throw TPluginError("the settings file " + fOptions.fConfigFile + " could not be read: " + error);
+        }
     }
-    for (const auto& setting : fOptions.fSettings)
+    for (const auto& setting : fOptions.fSettings) {
         TConfig::GetInstance()->setValue(setting.first, setting.second);
+    }
 }
 
 // A server of some other make need not know the setting; that matters only when a name was asked for.
 void TRun::SetConsumer() const
 {
     const std::string error = fServer.SetConsumer();
-    if (!error.empty() && !fOptions.fConsumer.empty())
+    if (!error.empty() && !fOptions.fConsumer.empty()) {
         throw TPluginError("the consumer " + fOptions.fConsumer + " could not be set, cimconfig: " + error);
+    }
 }
 
 void TRun::UsePlugin()
 {
     TRootObject::SetCoreLogger(&fLosses);
     TSession session(fOptions.fPlugin, fConsumer);
-    if (fLosses.HasNoServer())
+    if (fLosses.HasNoServer()) {
         throw TPluginError("the namespace has no server of its own");
+    }
     Show(session.GetNamespace());
     const std::string problem = session.Close();
-    if (fStop.IsStopped())
+    if (fStop.IsStopped()) {
         return;
-    if (!problem.empty())
+    }
+    if (!problem.empty()) {
         fLosses.Add(problem);
+    }
     TellLosses(); // of the shutdown
 }
 
@@ -91,48 +98,55 @@ void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
         TCollector collector(ns, fLosses, [this] { return fStop.IsStopped(); });
         fDocument.fProviders = collector.Collect(fOptions.fCommand, fOptions.fClassName);
     });
-    if (!error.empty())
+    if (!error.empty()) {
         fLosses.Add("the inventory is incomplete: " + error);
-    if (fOptions.fCommand == ECommand::kInstances && fDocument.fProviders.empty())
+    }
+    if (fOptions.fCommand == ECommand::kInstances && fDocument.fProviders.empty()) {
         Fail("there is no class " + fOptions.fClassName);
-    else
+    } else {
         Write();
+    }
 }
 
 void TRun::Write()
 {
-    if (fStop.IsStopped())
+    if (fStop.IsStopped()) {
         return;
+    }
     TellLosses();
     fDocument.fLosses = fLosses.GetSentences();
     fDocument.fComplete = fDocument.fLosses.empty();
     const std::string text = fOptions.fFormat == EFormat::kJson ? RenderJson(fDocument) : RenderTable(fDocument);
     fWriteError = fOutput.Write(text, fStop.GetFd());
     // A reader that has seen enough is no failure worth a word.
-    if (fWriteError != 0 && fWriteError != EPIPE && fWriteError != ECANCELED)
+    if (fWriteError != 0 && fWriteError != EPIPE && fWriteError != ECANCELED) {
         Say(std::string("the document could not be written: ") + std::strerror(fWriteError));
+    }
 }
 
 // There is no inventory; a reader of JSON still gets a document.
 void TRun::Fail(const std::string& reason)
 {
-    if (fStop.IsStopped())
+    if (fStop.IsStopped()) {
         return;
+    }
     fFailed = true;
     fLosses.AddHeldBack();
     fLosses.Add(reason);
-    if (fOptions.fFormat == EFormat::kJson)
+    if (fOptions.fFormat == EFormat::kJson) {
         Write();
-    else
+    } else {
         TellLosses();
+    }
 }
 
 // Says those that were not said yet.
 void TRun::TellLosses()
 {
     const auto sentences = fLosses.GetSentences();
-    for (; fToldCount < sentences.size(); ++fToldCount)
+    for (; fToldCount < sentences.size(); ++fToldCount) {
         Say(sentences[fToldCount]);
+    }
 }
 
 EExitStatus TRun::GetStatus() const
@@ -141,8 +155,9 @@ EExitStatus TRun::GetStatus() const
         Say("interrupted");
         return kInterrupted;
     }
-    if (fFailed || fWriteError != 0)
+    if (fFailed || fWriteError != 0) {
         return kFailed;
+    }
     return fToldCount == 0 ? kComplete : kPartial;
 }
 

@@ -1,17 +1,16 @@
-#ifndef VRX_CLI_TRUN_H
-#define VRX_CLI_TRUN_H
+#pragma once
 
-#include <cstddef>
-#include <string>
+#include "host/cli/Document.h"
+#include "host/cli/Options.h"
+#include "host/cli/TDocumentOutput.h"
+#include "host/cli/TLossLog.h"
+#include "host/cli/TPrivateServer.h"
+#include "host/cli/TStopSignals.h"
 
 #include <host/ICIMNamespace.h>
 
-#include "Document.h"
-#include "Options.h"
-#include "TDocumentOutput.h"
-#include "TLossLog.h"
-#include "TPrivateServer.h"
-#include "TStopSignals.h"
+#include <cstddef>
+#include <string>
 
 namespace vrxhost {
 
@@ -50,5 +49,3 @@ class TRun
 };
 
 } // namespace vrxhost
-
-#endif

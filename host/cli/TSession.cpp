@@ -1,13 +1,13 @@
-#include "TSession.h"
+#include "host/cli/TSession.h"
 
-#include <boost/make_shared.hpp>
+#include "host/cli/Guard.h"
+#include "host/core/TProcessControl.h"
+#include "host/inmem/TInmemNamespace.h"
 
-#include <core/TProcessControl.h>
 #include <host/TCIMValue.h>
 #include <host/TVRXStatusCode.h>
-#include <inmem/TInmemNamespace.h>
 
-#include "Guard.h"
+#include <boost/make_shared.hpp>
 
 namespace vrxhost {
 
@@ -37,8 +37,9 @@ TSession::TSession(const std::string& pluginPath, const std::string& consumer)
 {
     std::string error = Guarded([&] { Allocate(consumer); });
     if (!error.empty()) {
-        if (error.find(TVRXStatusCode(TVRXStatusCode::kDirectoryNotOpened).TranslateStatusCode()) == 0)
+        if (error.find(TVRXStatusCode(TVRXStatusCode::kDirectoryNotOpened).TranslateStatusCode()) == 0) {
             error += ": " + ProviderTree(pluginPath) + " or a folder in it";
+        }
         Close();
         throw TPluginError("the namespace could not be opened: " + error);
     }
@@ -64,8 +65,9 @@ void TSession::Allocate(const std::string& consumer)
 
 std::string TSession::Close()
 {
-    if (fClosed)
+    if (fClosed) {
         return "";
+    }
     fClosed = true;
     // The shutdown itself runs programs, also after an interruption.
     TProcessControl::Instance().Resume();

@@ -1,13 +1,12 @@
-#ifndef VRX_CLI_TSESSION_H
-#define VRX_CLI_TSESSION_H
+#pragma once
 
-#include <memory>
-#include <string>
+#include "host/cli/TLossLog.h"
+#include "host/cli/TPluginLibrary.h"
 
 #include <host/ICIMNamespace.h>
 
-#include "TLossLog.h"
-#include "TPluginLibrary.h"
+#include <memory>
+#include <string>
 
 namespace vrxhost {
 
@@ -40,5 +39,3 @@ class TSession
 };
 
 } // namespace vrxhost
-
-#endif

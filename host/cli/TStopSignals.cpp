@@ -1,4 +1,6 @@
-#include "TStopSignals.h"
+#include "host/cli/TStopSignals.h"
+
+#include "host/cli/Options.h"
 
 #include <cerrno>
 
@@ -6,16 +8,15 @@
 #include <sys/eventfd.h>
 #include <unistd.h>
 
-#include "Options.h"
-
 namespace vrxhost {
 
 TStopSignals::TStopSignals(std::function<void()> onFirst)
     : fOnFirst(std::move(onFirst)), fEvent(::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK))
 {
     sigemptyset(&fSignals);
-    for (const int number : {SIGINT, SIGTERM, SIGHUP})
+    for (const int number : {SIGINT, SIGTERM, SIGHUP}) {
         sigaddset(&fSignals, number);
+    }
     pthread_sigmask(SIG_BLOCK, &fSignals, nullptr);
     fSignalThread = std::thread([this] { AwaitSignals(); });
     fFirstThread = std::thread([this] { AwaitFirst(); });
@@ -33,8 +34,9 @@ TStopSignals::~TStopSignals()
 void TStopSignals::AwaitSignals()
 {
     for (int number = 0; sigwait(&fSignals, &number) == 0 && !fEnding;) {
-        if (fStopped.exchange(true))
+        if (fStopped.exchange(true)) {
             ::_exit(kInterrupted);
+        }
         ::eventfd_write(fEvent.Get(), 1);
     }
 }
@@ -43,10 +45,12 @@ void TStopSignals::AwaitSignals()
 void TStopSignals::AwaitFirst()
 {
     pollfd event = {fEvent.Get(), POLLIN, 0};
-    while (::poll(&event, 1, -1) < 0 && errno == EINTR)
+    while (::poll(&event, 1, -1) < 0 && errno == EINTR) {
         continue;
-    if (fStopped)
+    }
+    if (fStopped) {
         fOnFirst();
+    }
 }
 
 } // namespace vrxhost

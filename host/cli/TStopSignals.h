@@ -1,13 +1,12 @@
-#ifndef VRX_CLI_TSTOPSIGNALS_H
-#define VRX_CLI_TSTOPSIGNALS_H
+#pragma once
+
+#include "host/core/TUniqueFd.h"
 
 #include <atomic>
 #include <functional>
 #include <thread>
 
 #include <signal.h>
-
-#include <core/TUniqueFd.h>
 
 namespace vrxhost {
 
@@ -43,5 +42,3 @@ class TStopSignals
 };
 
 } // namespace vrxhost
-
-#endif

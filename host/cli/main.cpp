@@ -1,4 +1,13 @@
 // vrxhost: a command-line host for a namespace-provider plug-in.
+#include "host/cli/Options.h"
+#include "host/cli/Say.h"
+#include "host/cli/TPluginLibrary.h"
+#include "host/cli/TRun.h"
+#include "host/core/TCoreLogger.h"
+#include "host/core/TUniqueFd.h"
+
+#include <host/TVRXException.h>
+
 #include <cerrno>
 #include <csignal>
 #include <cstring>
@@ -7,15 +16,6 @@
 #include <fcntl.h>
 #include <sys/file.h>
 #include <unistd.h>
-
-#include <core/TCoreLogger.h>
-#include <core/TUniqueFd.h>
-#include <host/TVRXException.h>
-
-#include "Options.h"
-#include "Say.h"
-#include "TPluginLibrary.h"
-#include "TRun.h"
 
 namespace vrxhost {
 namespace {
@@ -44,13 +44,14 @@ void OpenLog(const TOptions& options)
 NKOLVRX20::TUniqueFd EnterRoot(const std::string& root)
 {
     NKOLVRX20::TUniqueFd directory(::open(root.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
-    if (!directory || ::fchdir(directory.Get()) != 0)
+    if (!directory || ::fchdir(directory.Get()) != 0) {
         Say("the root directory " + root + " could not be entered: " + std::strerror(errno));
-    else if (::flock(directory.Get(), LOCK_EX | LOCK_NB) != 0)
+    } else if (::flock(directory.Get(), LOCK_EX | LOCK_NB) != 0) {
         Say(errno == EWOULDBLOCK ? "another vrxhost is at work in " + root
                                  : "the root directory " + root + " could not be locked: " + std::strerror(errno));
-    else
+    } else {
         return directory;
+    }
     return NKOLVRX20::TUniqueFd();
 }
 
@@ -58,17 +59,20 @@ int Main(int argc, const char* const* argv)
 {
     TOptions options;
     const int status = ParseOptions(argc, argv, options);
-    if (status >= 0)
+    if (status >= 0) {
         return status;
+    }
     const NKOLVRX20::TUniqueFd rootLock = EnterRoot(options.fRoot);
-    if (!rootLock)
+    if (!rootLock) {
         return kFailed;
+    }
     std::signal(SIGPIPE, SIG_IGN); // a reader that has gone is a write error here
     OpenLog(options);
     TRun run(options);
     const EExitStatus result = run.Execute();
-    if (TPluginLibrary::HasLeftThreads())
+    if (TPluginLibrary::HasLeftThreads()) {
         ::_exit(result);
+    }
     return result;
 }
 

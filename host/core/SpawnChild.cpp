@@ -1,4 +1,4 @@
-#include "SpawnChild.h"
+#include "host/core/SpawnChild.h"
 
 #include <cerrno>
 #include <csignal>
@@ -46,12 +46,15 @@ void SetFreshSignalsAndGroup(posix_spawnattr_t& attributes)
 int SetStandardStreams(posix_spawn_file_actions_t& actions, int output, int errorOutput)
 {
     int error = posix_spawn_file_actions_addopen(&actions, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
-    if (!error)
+    if (!error) {
         error = posix_spawn_file_actions_adddup2(&actions, output, STDOUT_FILENO);
-    if (!error)
+    }
+    if (!error) {
         error = posix_spawn_file_actions_adddup2(&actions, errorOutput, STDERR_FILENO);
-    if (!error)
+    }
+    if (!error) {
         error = posix_spawn_file_actions_addclosefrom_np(&actions, STDERR_FILENO + 1);
+    }
     return error;
 }
 
@@ -59,8 +62,9 @@ std::vector<char*> ToPointers(const std::vector<std::string>& texts)
 {
     std::vector<char*> pointers;
     pointers.reserve(texts.size() + 1);
-    for (const std::string& text : texts)
+    for (const std::string& text : texts) {
         pointers.push_back(const_cast<char*>(text.c_str()));
+    }
     pointers.push_back(nullptr);
     return pointers;
 }
@@ -68,11 +72,13 @@ std::vector<char*> ToPointers(const std::vector<std::string>& texts)
 // In a process whose standard streams are closed, a pipe could land on 0 to 2 and be overwritten in the child.
 int MoveAboveStandardStreams(TUniqueFd& fd)
 {
-    if (fd.Get() > STDERR_FILENO)
+    if (fd.Get() > STDERR_FILENO) {
         return 0;
+    }
     TUniqueFd moved(::fcntl(fd.Get(), F_DUPFD_CLOEXEC, STDERR_FILENO + 1));
-    if (!moved)
+    if (!moved) {
         return errno;
+    }
     fd = std::move(moved);
     return 0;
 }
@@ -82,16 +88,19 @@ int MoveAboveStandardStreams(TUniqueFd& fd)
 int OpenPipe(TUniqueFd& readEnd, TUniqueFd& writeEnd)
 {
     int ends[2];
-    if (::pipe2(ends, O_CLOEXEC) != 0)
+    if (::pipe2(ends, O_CLOEXEC) != 0) {
         return errno;
+    }
     readEnd = TUniqueFd(ends[0]);
     writeEnd = TUniqueFd(ends[1]);
     int error = MoveAboveStandardStreams(readEnd);
-    if (!error)
+    if (!error) {
         error = MoveAboveStandardStreams(writeEnd);
+    }
     // Only our end: the child's stays as a program expects it.
-    if (!error && ::fcntl(readEnd.Get(), F_SETFL, O_NONBLOCK) != 0)
+    if (!error && ::fcntl(readEnd.Get(), F_SETFL, O_NONBLOCK) != 0) {
         error = errno;
+    }
     return error;
 }
 
@@ -99,8 +108,9 @@ int SpawnChild(const TProcessRequest& request, int output, int errorOutput, pid_
 {
     TSpawnSettings settings;
     SetFreshSignalsAndGroup(settings.fAttributes);
-    if (const int error = SetStandardStreams(settings.fActions, output, errorOutput))
+    if (const int error = SetStandardStreams(settings.fActions, output, errorOutput)) {
         return error;
+    }
     const auto arguments = ToPointers(request.fArguments);
     const auto environment = ToPointers(request.fEnvironment);
     const auto spawn = request.fSearchPath ? posix_spawnp : posix_spawn;

@@ -1,12 +1,11 @@
-#ifndef VRX_SPAWNCHILD_H
-#define VRX_SPAWNCHILD_H
+#pragma once
+
+#include "host/core/TUniqueFd.h"
 
 #include <string>
 #include <vector>
 
 #include <sys/types.h>
-
-#include "TUniqueFd.h"
 
 namespace NKOLVRX20 {
 
@@ -30,5 +29,3 @@ int OpenPipe(TUniqueFd& readEnd, TUniqueFd& writeEnd);
 int SpawnChild(const TProcessRequest& request, int output, int errorOutput, pid_t& pid);
 
 } // namespace NKOLVRX20
-
-#endif

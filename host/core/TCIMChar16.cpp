@@ -1,8 +1,7 @@
 #include <host/TCIMChar16.h>
+#include <host/TVRXException.h>
 
 #include <charconv>
-
-#include <host/TVRXException.h>
 
 namespace NKOLVRX20 {
 
@@ -10,8 +9,9 @@ TCIMChar16::TCIMChar16(const std::string& decimalText) : fCode(0)
 {
     const char* end = decimalText.data() + decimalText.size();
     const auto result = std::from_chars(decimalText.data(), end, fCode);
-    if (result.ec != std::errc() || result.ptr != end)
+    if (result.ec != std::errc() || result.ptr != end) {
         throw TVRXException(TVRXStatusCode::kTypeMismatch);
+    }
 }
 
 } // namespace NKOLVRX20

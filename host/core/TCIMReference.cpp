@@ -1,6 +1,5 @@
-#include <host/TCIMReference.h>
-
 #include <host/ICIMNamespace.h>
+#include <host/TCIMReference.h>
 #include <host/TCIMValue.h>
 
 namespace NKOLVRX20 {
@@ -18,8 +17,9 @@ std::size_t ClassNameAt(const std::string& path, std::size_t from)
 // A host name has dots and colons of its own; it ends at the next slash.
 std::size_t AfterHost(const std::string& path)
 {
-    if (path.compare(0, 2, "//") != 0)
+    if (path.compare(0, 2, "//") != 0) {
         return 0;
+    }
     const std::size_t slash = path.find('/', 2);
     return slash == std::string::npos ? path.size() : slash + 1;
 }

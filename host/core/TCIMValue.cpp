@@ -1,10 +1,9 @@
+#include "host/core/TCIMValueRep.h"
+
 #include <host/TCIMValue.h>
-
-#include <boost/make_shared.hpp>
-
 #include <host/TVRXException.h>
 
-#include "TCIMValueRep.h"
+#include <boost/make_shared.hpp>
 
 namespace NKOLVRX20 {
 namespace {
@@ -41,23 +40,29 @@ TCIMValue::TCIMValue(const TCIMReference& value) : fRep(boost::make_shared<TRep>
 
 TCIMValue::TCIMValue(TCIMType type, unsigned int)
 {
-    if (type > TCIMType::kReferenceArray)
+    if (type > TCIMType::kReferenceArray) {
         ThrowTypeMismatch();
-    if (type == TCIMType::kNone)
+    }
+    if (type == TCIMType::kNone) {
         return;
+    }
     TRep::TData data;
-    if (type.IsArray())
+    if (type.IsArray()) {
         data = std::vector<TCIMValue>();
+    }
     fRep = boost::make_shared<TRep>(type.GetElementType(), std::move(data));
 }
 
 TCIMValue::TCIMValue(TCIMType elementType, unsigned int, const std::vector<TCIMValue>& elements)
 {
-    if (!IsElementCode(elementType))
+    if (!IsElementCode(elementType)) {
         ThrowTypeMismatch();
-    for (const TCIMValue& element : elements)
-        if (element.IsArray() || element.GetType() != elementType)
+    }
+    for (const TCIMValue& element : elements) {
+        if (element.IsArray() || element.GetType() != elementType) {
             ThrowTypeMismatch();
+        }
+    }
     fRep = boost::make_shared<TRep>(elementType, TRep::TData(elements));
 }
 
@@ -70,13 +75,15 @@ TCIMValue::TCIMValue(TCIMValue&& other) noexcept = default;
 
 TCIMValue& TCIMValue::operator=(const TCIMValue& other)
 {
-    if (this == &other)
+    if (this == &other) {
         return *this;
+    }
     if (other.fRep && other.fRep->fLent) {
         fRep = boost::make_shared<TRep>(*other.fRep);
         fRep->fLent = false;
-    } else
+    } else {
         fRep = other.fRep;
+    }
     return *this;
 }
 
@@ -101,15 +108,17 @@ bool TCIMValue::IsNull() const
 
 TCIMValue::operator const std::vector<TCIMValue>&() const
 {
-    if (!IsArray())
+    if (!IsArray()) {
         ThrowTypeMismatch();
+    }
     return std::get<std::vector<TCIMValue>>(fRep->fData);
 }
 
 TCIMValue::operator std::vector<TCIMValue>&()
 {
-    if (!IsArray())
+    if (!IsArray()) {
         ThrowTypeMismatch();
+    }
     if (!fRep->fLent) {
         fRep = boost::make_shared<TRep>(*fRep);
         fRep->fLent = true;

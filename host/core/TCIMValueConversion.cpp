@@ -1,12 +1,12 @@
 // TCIMValue's conversion operators.
-#include <cmath>
-#include <limits>
-#include <type_traits>
+#include "host/core/TCIMValueRep.h"
 
 #include <host/TCIMValue.h>
 #include <host/TVRXException.h>
 
-#include "TCIMValueRep.h"
+#include <cmath>
+#include <limits>
+#include <type_traits>
 
 namespace NKOLVRX20 {
 namespace {
@@ -19,36 +19,41 @@ namespace {
 // A real outside the integer's range is undefined behaviour in C++; here it saturates, and no number is 0.
 template <typename To, typename From> To SaturatingCast(From value)
 {
-    if (std::isnan(value))
+    if (std::isnan(value)) {
         return 0;
+    }
     // The lowest value is a power of two or 0 and so exact in From; one above the highest is exact too.
-    if (value <= static_cast<From>(std::numeric_limits<To>::lowest()))
+    if (value <= static_cast<From>(std::numeric_limits<To>::lowest())) {
         return std::numeric_limits<To>::lowest();
-    if (value >= std::ldexp(From(1), std::numeric_limits<To>::digits))
+    }
+    if (value >= std::ldexp(From(1), std::numeric_limits<To>::digits)) {
         return std::numeric_limits<To>::max();
+    }
     return static_cast<To>(value);
 }
 
 template <typename To, typename From> To ConvertNumber(From value)
 {
-    if constexpr (std::is_same_v<To, bool>)
+    if constexpr (std::is_same_v<To, bool>) {
         return value != From(0);
-    else if constexpr (std::is_floating_point_v<From> && std::is_integral_v<To>)
+    } else if constexpr (std::is_floating_point_v<From> && std::is_integral_v<To>) {
         return SaturatingCast<To>(value);
-    else
+    } else {
         return static_cast<To>(value);
+    }
 }
 
 struct TNumberReader
 {
     template <typename To, typename From> static To Read(const From& value)
     {
-        if constexpr (std::is_arithmetic_v<From>)
+        if constexpr (std::is_arithmetic_v<From>) {
             return ConvertNumber<To>(value);
-        else if constexpr (std::is_same_v<From, TCIMChar16>)
+        } else if constexpr (std::is_same_v<From, TCIMChar16>) {
             return ConvertNumber<To>(value.GetCode());
-        else
+        } else {
             ThrowTypeMismatch();
+        }
     }
 };
 
@@ -60,15 +65,17 @@ template <typename To, typename Data> To ReadNumber(const Data& data)
 template <typename To, typename Data> const To& ReadExact(const Data& data)
 {
     const To* value = std::get_if<To>(&data);
-    if (!value)
+    if (!value) {
         ThrowTypeMismatch();
+    }
     return *value;
 }
 
 template <typename Rep> const auto& DataOf(const boost::shared_ptr<Rep>& rep)
 {
-    if (!rep)
+    if (!rep) {
         ThrowTypeMismatch();
+    }
     return rep->fData;
 }
 

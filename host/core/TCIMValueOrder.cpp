@@ -1,11 +1,11 @@
 // TCIMValue's equality and order: both from one three-way comparison, so that they never disagree.
-#include <algorithm>
-#include <cmath>
-#include <type_traits>
+#include "host/core/TCIMValueRep.h"
 
 #include <host/TCIMValue.h>
 
-#include "TCIMValueRep.h"
+#include <algorithm>
+#include <cmath>
+#include <type_traits>
 
 namespace NKOLVRX20 {
 namespace {
@@ -15,8 +15,9 @@ template <typename Value> int Compare(const Value& left, const Value& right)
     if constexpr (std::is_floating_point_v<Value>) {
         // Not-a-number is equal to itself and before every number; else sorting would be undefined.
         const bool leftNan = std::isnan(left), rightNan = std::isnan(right);
-        if (leftNan || rightNan)
+        if (leftNan || rightNan) {
             return int(rightNan) - int(leftNan);
+        }
     }
     return left < right ? -1 : right < left ? 1 : 0;
 }
@@ -31,26 +32,30 @@ int TypeCode(const TCIMValue& value)
 
 bool TCIMValue::operator==(const TCIMValue& other) const
 {
-    if (fRep == other.fRep)
+    if (fRep == other.fRep) {
         return true;
+    }
     return !(*this < other) && !(other < *this);
 }
 
 bool TCIMValue::operator<(const TCIMValue& other) const
 {
     const int type = TypeCode(*this), otherType = TypeCode(other);
-    if (type != otherType)
+    if (type != otherType) {
         return type < otherType;
-    if (IsNull() || other.IsNull())
+    }
+    if (IsNull() || other.IsNull()) {
         return IsNull() && !other.IsNull();
+    }
     return std::visit(
         [&other](const auto& value) {
             typedef std::decay_t<decltype(value)> TAlternative;
             const auto& otherValue = std::get<TAlternative>(other.fRep->fData);
-            if constexpr (std::is_same_v<TAlternative, std::monostate>)
+            if constexpr (std::is_same_v<TAlternative, std::monostate>) {
                 return false;
-            else
+            } else {
                 return Compare(value, otherValue) < 0;
+            }
         },
         fRep->fData);
 }

@@ -1,11 +1,10 @@
-#ifndef VRX_TCIMVALUEREP_H
-#define VRX_TCIMVALUEREP_H
+#pragma once
 
-#include <variant>
+#include <host/TCIMValue.h>
 
 #include <boost/weak_ptr.hpp>
 
-#include <host/TCIMValue.h>
+#include <variant>
 
 namespace NKOLVRX20 {
 
@@ -33,5 +32,3 @@ struct TCIMValue::TRep
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,15 +1,15 @@
 // TCIMValue's text forms, locale-free in both directions.
-#include <charconv>
-#include <type_traits>
-
-#include <strings.h>
-
-#include <boost/make_shared.hpp>
+#include "host/core/TCIMValueRep.h"
 
 #include <host/TCIMValue.h>
 #include <host/TVRXException.h>
 
-#include "TCIMValueRep.h"
+#include <boost/make_shared.hpp>
+
+#include <charconv>
+#include <type_traits>
+
+#include <strings.h>
 
 namespace NKOLVRX20 {
 namespace {
@@ -24,17 +24,20 @@ template <typename Number> Number ParseNumber(const std::string& text)
     Number number{};
     const char* end = text.data() + text.size();
     const auto result = std::from_chars(text.data(), end, number);
-    if (result.ec != std::errc() || result.ptr != end)
+    if (result.ec != std::errc() || result.ptr != end) {
         ThrowTypeMismatch();
+    }
     return number;
 }
 
 bool ParseBoolean(const std::string& text)
 {
-    if (strcasecmp(text.c_str(), "true") == 0)
+    if (strcasecmp(text.c_str(), "true") == 0) {
         return true;
-    if (strcasecmp(text.c_str(), "false") == 0)
+    }
+    if (strcasecmp(text.c_str(), "false") == 0) {
         return false;
+    }
     ThrowTypeMismatch();
 }
 
@@ -64,10 +67,11 @@ struct TTextWriter
     {
         char text[kNumberChars];
         std::to_chars_result end{};
-        if constexpr (std::is_floating_point_v<Number>)
+        if constexpr (std::is_floating_point_v<Number>) {
             end = std::to_chars(text, text + kNumberChars, value, std::chars_format::general);
-        else
+        } else {
             end = std::to_chars(text, text + kNumberChars, value, fRadix);
+        }
         return std::string(text, end.ptr);
     }
 
@@ -75,8 +79,9 @@ struct TTextWriter
     {
         std::string text;
         for (const TCIMValue& element : elements) {
-            if (&element != &elements.front())
+            if (&element != &elements.front()) {
                 text += ", ";
+            }
             text += element.ToString(static_cast<unsigned char>(fRadix));
         }
         return text;
@@ -88,8 +93,9 @@ struct TTextWriter
 void TCIMValue::Set(const std::string& text)
 {
     if (IsArray()) {
-        if (!text.empty())
+        if (!text.empty()) {
             ThrowTypeMismatch();
+        }
         *this = TCIMValue(TCIMType(TCIMType::ECIMType(GetType() + TCIMType::kArrayOffset)), 0);
         return;
     }
@@ -147,8 +153,9 @@ void TCIMValue::Set(const std::string& text)
 
 std::string TCIMValue::ToString(unsigned char radix) const
 {
-    if (radix < 2 || radix > 36)
+    if (radix < 2 || radix > 36) {
         ThrowTypeMismatch();
+    }
     return fRep ? std::visit(TTextWriter{radix}, fRep->fData) : std::string();
 }
 

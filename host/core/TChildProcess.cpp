@@ -1,4 +1,4 @@
-#include "TChildProcess.h"
+#include "host/core/TChildProcess.h"
 
 #include <algorithm>
 #include <cerrno>
@@ -11,7 +11,7 @@ extern "C" {
 #include <sys/pidfd.h> // C only in glibc 2.36
 }
 
-#include "TProcessControl.h"
+#include "host/core/TProcessControl.h"
 
 namespace NKOLVRX20 {
 namespace {
@@ -40,35 +40,41 @@ TProcessOutcome TChildProcess::Run(std::chrono::milliseconds timeout)
         return std::move(fOutcome);
     }
     const bool exited = AwaitExit(deadline);
-    if (!exited)
+    if (!exited) {
         Kill();
+    }
     Reap();
     DrainBoth();
-    if (!exited)
+    if (!exited) {
         fOutcome.fEnd =
             TProcessControl::Instance().IsCancelled() ? TProcessOutcome::kCancelled : TProcessOutcome::kTimedOut;
+    }
     return std::move(fOutcome);
 }
 
 int TChildProcess::Start()
 {
     int error = OpenPipe(fOutputPipe.fRead, fOutputPipe.fWrite);
-    if (!error)
+    if (!error) {
         error = OpenPipe(fErrorPipe.fRead, fErrorPipe.fWrite);
-    if (!error)
+    }
+    if (!error) {
         error = SpawnChild(fRequest, fOutputPipe.fWrite.Get(), fErrorPipe.fWrite.Get(), fPid);
+    }
     fOutputPipe.fWrite.Reset();
     fErrorPipe.fWrite.Reset();
-    if (!error)
+    if (!error) {
         fPidFd = TUniqueFd(::pidfd_open(fPid, 0));
+    }
     return error;
 }
 
 bool TChildProcess::AwaitExit(TClock::time_point deadline)
 {
     while (!HasExited()) {
-        if (!PollOnce(deadline))
+        if (!PollOnce(deadline)) {
             return HasExited();
+        }
         DrainBoth();
     }
     return true;
@@ -78,8 +84,9 @@ bool TChildProcess::AwaitExit(TClock::time_point deadline)
 bool TChildProcess::PollOnce(TClock::time_point deadline)
 {
     const auto left = std::chrono::ceil<std::chrono::milliseconds>(deadline - TClock::now());
-    if (left.count() <= 0 || TProcessControl::Instance().IsCancelled())
+    if (left.count() <= 0 || TProcessControl::Instance().IsCancelled()) {
         return false;
+    }
     const auto wait = fPidFd ? left : std::min(left, kExitPollInterval);
     // A negative descriptor is skipped, so closed pipes and a missing pid descriptor need no special case.
     pollfd fds[] = {{fOutputPipe.fRead.Get(), POLLIN, 0},
@@ -109,10 +116,11 @@ void TChildProcess::Drain(TUniqueFd& from, std::string& into, std::size_t limit)
             const std::size_t kept = std::min(bytes, limit - into.size());
             into.append(buffer, kept);
             fOutcome.fDroppedBytes += bytes - kept;
-        } else if (count < 0 && errno == EAGAIN)
+        } else if (count < 0 && errno == EAGAIN) {
             return;
-        else if (count == 0 || errno != EINTR)
+        } else if (count == 0 || errno != EINTR) {
             from.Reset();
+        }
     }
 }
 
@@ -126,23 +134,24 @@ void TChildProcess::DrainBoth()
 void TChildProcess::Kill()
 {
     ::killpg(fPid, SIGKILL);
-    if (fPidFd)
+    if (fPidFd) {
         ::pidfd_send_signal(fPidFd.Get(), SIGKILL, nullptr, 0);
-    else
+    } else {
         ::kill(fPid, SIGKILL);
+    }
 }
 
 void TChildProcess::Reap()
 {
     int status = 0;
     pid_t reaped = -1;
-    do
+    do {
         reaped = ::waitpid(fPid, &status, 0);
-    while (reaped < 0 && errno == EINTR);
+    } while (reaped < 0 && errno == EINTR);
 
-    if (reaped != fPid)
+    if (reaped != fPid) {
         fOutcome.fEnd = TProcessOutcome::kUnknown;
-    else if (WIFEXITED(status)) {
+    } else if (WIFEXITED(status)) {
         fOutcome.fEnd = TProcessOutcome::kExited;
         fOutcome.fStatus = WEXITSTATUS(status);
     } else {

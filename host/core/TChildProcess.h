@@ -1,5 +1,7 @@
-#ifndef VRX_TCHILDPROCESS_H
-#define VRX_TCHILDPROCESS_H
+#pragma once
+
+#include "host/core/SpawnChild.h"
+#include "host/core/TUniqueFd.h"
 
 #include <chrono>
 #include <cstddef>
@@ -7,9 +9,6 @@
 #include <vector>
 
 #include <sys/types.h>
-
-#include "SpawnChild.h"
-#include "TUniqueFd.h"
 
 namespace NKOLVRX20 {
 
@@ -79,5 +78,3 @@ class TChildProcess
 };
 
 } // namespace NKOLVRX20
-
-#endif

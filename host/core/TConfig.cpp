@@ -1,10 +1,9 @@
 #include <host/TConfig.h>
+#include <host/TVRXException.h>
 
 #include <cerrno>
 #include <fstream>
 #include <sstream>
-
-#include <host/TVRXException.h>
 
 namespace NKOLVRX20 {
 namespace {
@@ -15,8 +14,9 @@ std::string Trimmed(const std::string& text)
 {
     static constexpr char kBlanks[] = " \t\r";
     const std::size_t begin = text.find_first_not_of(kBlanks);
-    if (begin == std::string::npos)
+    if (begin == std::string::npos) {
         return "";
+    }
     return text.substr(begin, text.find_last_not_of(kBlanks) - begin + 1);
 }
 
@@ -26,8 +26,9 @@ std::string ReadWhole(const std::string& path)
     std::string text(kMaxFileBytes + 1, '\0');
     file.read(&text[0], static_cast<std::streamsize>(text.size()));
     // A directory opens like a file; only reading it fails.
-    if (!file.is_open() || file.bad() || static_cast<std::size_t>(file.gcount()) > kMaxFileBytes)
+    if (!file.is_open() || file.bad() || static_cast<std::size_t>(file.gcount()) > kMaxFileBytes) {
         throw TVRXException(TVRXStatusCode::kBadPath);
+    }
     text.resize(static_cast<std::size_t>(file.gcount()));
     return text;
 }
@@ -38,11 +39,13 @@ std::map<std::string, std::string> ParseLines(const std::string& text)
     std::istringstream lines(text);
     for (std::string line; std::getline(lines, line);) {
         line = Trimmed(line);
-        if (line.empty() || line[0] == '#')
+        if (line.empty() || line[0] == '#') {
             continue;
+        }
         const std::size_t equals = line.find('=');
-        if (equals == std::string::npos)
+        if (equals == std::string::npos) {
             throw TVRXException(TVRXStatusCode::kTypeMismatch);
+        }
         values[Trimmed(line.substr(0, equals))] = Trimmed(line.substr(equals + 1));
     }
     return values;
@@ -61,8 +64,9 @@ std::string TConfig::getValue(const std::string& key) const
     const std::lock_guard<std::mutex> lock(fMutex);
     for (const auto* values : {&fOverrides, &fFileValues}) {
         const auto found = values->find(key);
-        if (found != values->end())
+        if (found != values->end()) {
             return found->second;
+        }
     }
     return "";
 }
@@ -71,8 +75,9 @@ void TConfig::Load(const std::string& path)
 {
     const auto values = ParseLines(ReadWhole(path));
     const std::lock_guard<std::mutex> lock(fMutex);
-    for (const auto& entry : values)
+    for (const auto& entry : values) {
         fFileValues[entry.first] = entry.second;
+    }
 }
 
 void TConfig::setValue(const std::string& key, const std::string& value)

@@ -1,11 +1,11 @@
-#include "TCoreLogger.h"
+#include "host/core/TCoreLogger.h"
 
 #define SPDLOG_PREVENT_CHILD_FD // the file is close-on-exec
+#include <host/TVRXException.h>
+
 #include <spdlog/logger.h>
 #include <spdlog/sinks/basic_file_sink.h>
 #include <spdlog/sinks/stdout_sinks.h>
-
-#include <host/TVRXException.h>
 
 namespace NKOLVRX20 {
 
@@ -56,11 +56,13 @@ void TCoreLogger::Configure(const TOptions& options)
 {
     const auto sinks = std::make_shared<TSinks>();
     try {
-        if (!options.fFile.empty())
+        if (!options.fFile.empty()) {
             sinks->fLogger.sinks().push_back(
                 std::make_shared<spdlog::sinks::basic_file_sink_mt>(options.fFile, options.fTruncate));
-        if (options.fToStandardError)
+        }
+        if (options.fToStandardError) {
             sinks->fLogger.sinks().push_back(std::make_shared<spdlog::sinks::stderr_sink_mt>());
+        }
     } catch (const spdlog::spdlog_ex&) {
         throw TVRXException(TVRXStatusCode::kBadPath);
     }

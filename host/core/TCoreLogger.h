@@ -1,10 +1,9 @@
-#ifndef VRX_TCORELOGGER_H
-#define VRX_TCORELOGGER_H
+#pragma once
+
+#include <host/ILogger.h>
 
 #include <memory>
 #include <string>
-
-#include <host/ILogger.h>
 
 namespace NKOLVRX20 {
 
@@ -42,5 +41,3 @@ class TCoreLogger : public ILogger
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,18 +1,20 @@
-#include "TNamespaceProviderManager.h"
-
-#include <algorithm>
+#include "host/core/TNamespaceProviderManager.h"
 
 #include <host/INamespaceProvider.h>
+
+#include <algorithm>
 
 namespace NKOLVRX20 {
 
 void TNamespaceProviderManager::RegisterNamespaceProvider(boost::shared_ptr<INamespaceProvider> provider)
 {
-    if (!provider)
+    if (!provider) {
         return;
+    }
     const std::lock_guard<std::mutex> lock(fMutex);
-    if (std::find(fProviders.begin(), fProviders.end(), provider) == fProviders.end())
+    if (std::find(fProviders.begin(), fProviders.end(), provider) == fProviders.end()) {
         fProviders.push_back(provider);
+    }
 }
 
 void TNamespaceProviderManager::UnregisterNamespaceProvider(boost::shared_ptr<INamespaceProvider> provider)
@@ -24,9 +26,11 @@ void TNamespaceProviderManager::UnregisterNamespaceProvider(boost::shared_ptr<IN
 boost::shared_ptr<INamespaceProvider> TNamespaceProviderManager::GetNamespaceProvider(const std::string& name) const
 {
     const auto providers = Snapshot();
-    for (auto provider = providers.rbegin(); provider != providers.rend(); ++provider)
-        if ((*provider)->GetName(TCIMContext()) == name)
+    for (auto provider = providers.rbegin(); provider != providers.rend(); ++provider) {
+        if ((*provider)->GetName(TCIMContext()) == name) {
             return *provider;
+        }
+    }
     return boost::shared_ptr<INamespaceProvider>();
 }
 

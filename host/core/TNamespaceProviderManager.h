@@ -1,10 +1,9 @@
-#ifndef VRX_TNAMESPACEPROVIDERMANAGER_H
-#define VRX_TNAMESPACEPROVIDERMANAGER_H
+#pragma once
+
+#include <host/INamespaceProviderManager.h>
 
 #include <mutex>
 #include <vector>
-
-#include <host/INamespaceProviderManager.h>
 
 namespace NKOLVRX20 {
 
@@ -24,5 +23,3 @@ class TNamespaceProviderManager : public INamespaceProviderManager
 };
 
 } // namespace NKOLVRX20
-
-#endif

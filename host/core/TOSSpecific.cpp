@@ -1,15 +1,14 @@
+#include "host/core/TChildProcess.h"
+#include "host/core/TProcessControl.h"
+#include "host/core/TProcessLog.h"
+
 #include <host/TOSSpecific.h>
+#include <host/TVRXException.h>
 
 #include <algorithm>
 #include <sstream>
 
 #include <sys/stat.h>
-
-#include <host/TVRXException.h>
-
-#include "TChildProcess.h"
-#include "TProcessControl.h"
-#include "TProcessLog.h"
 
 namespace NKOLVRX20 {
 namespace {
@@ -18,8 +17,9 @@ std::vector<std::string> SplitAtBlanks(const std::string& line)
 {
     std::istringstream words(line);
     std::vector<std::string> result;
-    for (std::string word; words >> word;)
+    for (std::string word; words >> word;) {
         result.push_back(word);
+    }
     return result;
 }
 
@@ -28,10 +28,12 @@ void RunAndReport(const TProcessRequest& request, std::string& output, int timeo
     TProcessOutcome outcome = TChildProcess(request).Run(std::chrono::seconds(std::max(timeoutSeconds, 1)));
     TProcessLog::Instance().Add(request, outcome);
     output = std::move(outcome.fOutput);
-    if (outcome.fEnd == TProcessOutcome::kCancelled)
+    if (outcome.fEnd == TProcessOutcome::kCancelled) {
         throw TProgramsCancelled();
-    if (outcome.fEnd == TProcessOutcome::kNotRun || outcome.fEnd == TProcessOutcome::kTimedOut)
+    }
+    if (outcome.fEnd == TProcessOutcome::kNotRun || outcome.fEnd == TProcessOutcome::kTimedOut) {
         throw TVRXException(TVRXStatusCode::kProcessFailed);
+    }
 }
 
 } // namespace
@@ -47,8 +49,9 @@ void TOSSpecific::SpawnProcess(const std::string& commandLine, const std::vector
 {
     TProcessRequest request;
     request.fArguments = SplitAtBlanks(commandLine);
-    if (request.fArguments.empty())
+    if (request.fArguments.empty()) {
         throw TVRXException(TVRXStatusCode::kProcessFailed);
+    }
     request.fProgram = request.fArguments.front();
     request.fArguments.insert(request.fArguments.end(), arguments.begin(), arguments.end());
     request.fSearchPath = true;
@@ -71,8 +74,9 @@ void TOSSpecific::SpawnProcess(const std::string& name, const std::vector<std::s
 std::size_t TOSSpecific::GetFileSize(const std::string& path)
 {
     struct stat status = {};
-    if (::stat(path.c_str(), &status) != 0 || !S_ISREG(status.st_mode))
+    if (::stat(path.c_str(), &status) != 0 || !S_ISREG(status.st_mode)) {
         return 0;
+    }
     return static_cast<std::size_t>(status.st_size);
 }
 

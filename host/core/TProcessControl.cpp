@@ -1,4 +1,4 @@
-#include "TProcessControl.h"
+#include "host/core/TProcessControl.h"
 
 #include <sys/eventfd.h>
 
@@ -22,8 +22,9 @@ TProcessControl::TProcessControl() : fWake(::eventfd(0, EFD_CLOEXEC | EFD_NONBLO
 void TProcessControl::Cancel()
 {
     const std::lock_guard<std::mutex> lock(fMutex);
-    if (fResumed)
+    if (fResumed) {
         return;
+    }
     fCancelled = true;
     ::eventfd_write(fWake.Get(), 1);
 }

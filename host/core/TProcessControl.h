@@ -1,11 +1,10 @@
-#ifndef VRX_TPROCESSCONTROL_H
-#define VRX_TPROCESSCONTROL_H
+#pragma once
+
+#include "host/core/TUniqueFd.h"
 
 #include <atomic>
 #include <exception>
 #include <mutex>
-
-#include "TUniqueFd.h"
 
 namespace NKOLVRX20 {
 
@@ -44,5 +43,3 @@ class TProcessControl
 };
 
 } // namespace NKOLVRX20
-
-#endif

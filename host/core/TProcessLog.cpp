@@ -1,9 +1,9 @@
-#include "TProcessLog.h"
+#include "host/core/TProcessLog.h"
+
+#include <host/TRootObject.h>
 
 #include <cstring>
 #include <iterator>
-
-#include <host/TRootObject.h>
 
 namespace NKOLVRX20 {
 namespace {
@@ -23,13 +23,16 @@ TFailedProgram Describe(const TProcessRequest& request, const TProcessOutcome& o
 std::string LogLine(const TFailedProgram& program, const TProcessOutcome& outcome)
 {
     std::string line = "TOSSpecific::SpawnProcess " + program.fName;
-    for (const std::string& argument : program.fArguments)
+    for (const std::string& argument : program.fArguments) {
         line += " " + argument;
+    }
     line += ": " + program.GetReason();
-    if (outcome.fDroppedBytes > 0)
+    if (outcome.fDroppedBytes > 0) {
         line += ", " + std::to_string(outcome.fDroppedBytes) + " bytes of output dropped";
-    if (!outcome.fErrorOutput.empty())
+    }
+    if (!outcome.fErrorOutput.empty()) {
         line += ": " + outcome.fErrorOutput;
+    }
     return line;
 }
 
@@ -62,19 +65,22 @@ TProcessLog& TProcessLog::Instance()
 
 void TProcessLog::Add(const TProcessRequest& request, const TProcessOutcome& outcome)
 {
-    if (outcome.IsSuccess() && outcome.fErrorOutput.empty() && outcome.fDroppedBytes == 0)
+    if (outcome.IsSuccess() && outcome.fErrorOutput.empty() && outcome.fDroppedBytes == 0) {
         return;
+    }
     const TFailedProgram program = Describe(request, outcome);
-    if (!outcome.IsSuccess() && outcome.fEnd != TProcessOutcome::kCancelled)
+    if (!outcome.IsSuccess() && outcome.fEnd != TProcessOutcome::kCancelled) {
         Keep(program);
+    }
     TRootObject::GetCoreLogger()->Log(ILogger::kInfo, LogLine(program, outcome));
 }
 
 void TProcessLog::Keep(const TFailedProgram& program)
 {
     const std::lock_guard<std::mutex> lock(fMutex);
-    if (fEntries.size() == kMaxEntries)
+    if (fEntries.size() == kMaxEntries) {
         fEntries.pop_front();
+    }
     fEntries.push_back(program);
 }
 

@@ -1,13 +1,12 @@
-#ifndef VRX_TPROCESSLOG_H
-#define VRX_TPROCESSLOG_H
+#pragma once
+
+#include "host/core/TChildProcess.h"
 
 #include <cstddef>
 #include <deque>
 #include <mutex>
 #include <string>
 #include <vector>
-
-#include "TChildProcess.h"
 
 namespace NKOLVRX20 {
 
@@ -49,5 +48,3 @@ class TProcessLog
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,11 +1,11 @@
-#include <host/TRootObject.h>
+#include "host/core/TCoreLogger.h"
+#include "host/core/TNamespaceProviderManager.h"
 
-#include <atomic>
+#include <host/TRootObject.h>
 
 #include <boost/make_shared.hpp>
 
-#include "TCoreLogger.h"
-#include "TNamespaceProviderManager.h"
+#include <atomic>
 
 namespace NKOLVRX20 {
 namespace {

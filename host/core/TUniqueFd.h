@@ -1,5 +1,4 @@
-#ifndef VRX_TUNIQUEFD_H
-#define VRX_TUNIQUEFD_H
+#pragma once
 
 #include <utility>
 
@@ -26,8 +25,9 @@ class TUniqueFd
 
     void Reset() noexcept
     {
-        if (fFd >= 0)
+        if (fFd >= 0) {
             ::close(fFd);
+        }
         fFd = -1;
     }
 
@@ -36,5 +36,3 @@ class TUniqueFd
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,4 +1,4 @@
-#include "CharacterText.h"
+#include "host/inmem/CharacterText.h"
 
 namespace NKOLVRX20 {
 
@@ -6,12 +6,15 @@ std::string CharacterText(TCIMChar16 character)
 {
     const auto byte = [](unsigned int value) { return static_cast<char>(value); };
     unsigned int code = character.GetCode();
-    if (code >= 0xd800 && code < 0xe000)
+    if (code >= 0xd800 && code < 0xe000) {
         code = 0xfffd;
-    if (code < 0x80)
+    }
+    if (code < 0x80) {
         return {byte(code)};
-    if (code < 0x800)
+    }
+    if (code < 0x800) {
         return {byte(0xc0u | code >> 6), byte(0x80u | (code & 0x3fu))};
+    }
     return {byte(0xe0u | code >> 12), byte(0x80u | (code >> 6 & 0x3fu)), byte(0x80u | (code & 0x3fu))};
 }
 

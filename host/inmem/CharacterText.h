@@ -1,9 +1,8 @@
-#ifndef VRX_CHARACTERTEXT_H
-#define VRX_CHARACTERTEXT_H
-
-#include <string>
+#pragma once
 
 #include <host/TCIMChar16.h>
+
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -11,5 +10,3 @@ namespace NKOLVRX20 {
 std::string CharacterText(TCIMChar16 character);
 
 } // namespace NKOLVRX20
-
-#endif

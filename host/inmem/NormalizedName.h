@@ -1,5 +1,4 @@
-#ifndef VRX_NORMALIZEDNAME_H
-#define VRX_NORMALIZEDNAME_H
+#pragma once
 
 #include <string>
 
@@ -9,5 +8,3 @@ namespace NKOLVRX20 {
 std::string NormalizedName(const std::string& name);
 
 } // namespace NKOLVRX20
-
-#endif

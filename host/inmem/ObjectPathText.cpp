@@ -1,4 +1,4 @@
-#include "ObjectPathText.h"
+#include "host/inmem/ObjectPathText.h"
 
 namespace NKOLVRX20 {
 namespace {
@@ -7,8 +7,9 @@ std::string Quoted(const std::string& text)
 {
     std::string quoted = "\"";
     for (const char c : text) {
-        if (c == '"' || c == '\\')
+        if (c == '"' || c == '\\') {
             quoted += '\\';
+        }
         quoted += c;
     }
     return quoted + '"';
@@ -17,8 +18,9 @@ std::string Quoted(const std::string& text)
 std::string KeyText(const TCIMValue& value)
 {
     const auto type = value.GetType();
-    if (type == TCIMValue::TCIMType::kBoolean)
+    if (type == TCIMValue::TCIMType::kBoolean) {
         return static_cast<bool>(value) ? "TRUE" : "FALSE";
+    }
     const bool isNumber = type > TCIMValue::TCIMType::kBoolean && type < TCIMValue::TCIMType::kChar16;
     return isNumber ? value.ToString(10) : Quoted(value.ToString(10));
 }

@@ -1,9 +1,8 @@
-#ifndef VRX_OBJECTPATHTEXT_H
-#define VRX_OBJECTPATHTEXT_H
-
-#include <string>
+#pragma once
 
 #include <host/TCIMValue.h>
+
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -12,5 +11,3 @@ namespace NKOLVRX20 {
 std::string ObjectPathText(const std::string& className, const TCIMContext& keys);
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,12 +1,12 @@
-#include "PropertyText.h"
+#include "host/inmem/PropertyText.h"
+
+#include "host/inmem/CharacterText.h"
+
+#include <host/ICIMQualifier.h>
 
 #include <charconv>
 #include <climits>
 #include <optional>
-
-#include <host/ICIMQualifier.h>
-
-#include "CharacterText.h"
 
 namespace NKOLVRX20 {
 namespace {
@@ -32,9 +32,11 @@ std::vector<std::string> QualifierTexts(const ICIMPropertyDecl& declaration, con
 {
     std::vector<std::string> texts;
     const TCIMValue value = QualifierValue(declaration, name);
-    if (value.IsArray())
-        for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(value))
+    if (value.IsArray()) {
+        for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(value)) {
             texts.push_back(element.ToString(10));
+        }
+    }
     return texts;
 }
 
@@ -47,8 +49,9 @@ std::string UnitText(const ICIMPropertyDecl& declaration)
 // A bound of a range; an empty one is open.
 bool ParseBound(const std::string& text, std::optional<long>& bound)
 {
-    if (text.empty())
+    if (text.empty()) {
         return true;
+    }
     long number = 0;
     const char* end = text.data() + text.size();
     const auto result = std::from_chars(text.data(), end, number);
@@ -60,14 +63,17 @@ bool ParseBound(const std::string& text, std::optional<long>& bound)
 bool IsInRange(const TCIMValue& value, const std::string& entry)
 {
     const std::size_t dots = entry.find("..");
-    if (dots == std::string::npos || !IsInteger(value.GetType()))
+    if (dots == std::string::npos || !IsInteger(value.GetType())) {
         return false;
+    }
     std::optional<long> low, high;
-    if (!ParseBound(entry.substr(0, dots), low) || !ParseBound(entry.substr(dots + 2), high))
+    if (!ParseBound(entry.substr(0, dots), low) || !ParseBound(entry.substr(dots + 2), high)) {
         return false;
+    }
     // Maps with bounds beyond 63 bits do not occur.
-    if (value.GetType() == TType::kUint64 && static_cast<unsigned long>(value) > static_cast<unsigned long>(LONG_MAX))
+    if (value.GetType() == TType::kUint64 && static_cast<unsigned long>(value) > static_cast<unsigned long>(LONG_MAX)) {
         return !high;
+    }
     const long number = static_cast<long>(value);
     return (!low || number >= *low) && (!high || number <= *high);
 }
@@ -85,8 +91,9 @@ class TTextRules
     std::string Text(const TCIMValue& value, const std::string& plain) const
     {
         const auto mapped = MapIndex(value, plain);
-        if (mapped && *mapped < fValues.size())
+        if (mapped && *mapped < fValues.size()) {
             return fValues[*mapped];
+        }
         const bool hasUnit = !fUnit.empty() && (IsInteger(value.GetType()) || IsReal(value.GetType()));
         return hasUnit ? plain + " " + fUnit : plain;
     }
@@ -95,16 +102,22 @@ class TTextRules
     // Without a ValueMap an integer is itself the index. An entry for the very value goes before the ranges.
     std::optional<std::size_t> MapIndex(const TCIMValue& value, const std::string& plain) const
     {
-        if (fValueMap.empty())
+        if (fValueMap.empty()) {
             return IsInteger(value.GetType()) ? std::optional<std::size_t>(static_cast<unsigned long>(value))
                                               : std::nullopt;
-        for (std::size_t i = 0; i < fValueMap.size(); ++i)
-            if (fValueMap[i] == plain)
+        }
+        for (std::size_t i = 0; i < fValueMap.size(); ++i) {
+            if (fValueMap[i] == plain) {
                 return i;
-        for (const bool catchAll : {false, true})
-            for (std::size_t i = 0; i < fValueMap.size(); ++i)
-                if ((fValueMap[i] == "..") == catchAll && IsInRange(value, fValueMap[i]))
+            }
+        }
+        for (const bool catchAll : {false, true}) {
+            for (std::size_t i = 0; i < fValueMap.size(); ++i) {
+                if ((fValueMap[i] == "..") == catchAll && IsInRange(value, fValueMap[i])) {
                     return i;
+                }
+            }
+        }
         return std::nullopt;
     }
 
@@ -115,12 +128,15 @@ class TTextRules
 
 std::string PlainText(const TCIMValue& value)
 {
-    if (value.IsNull())
+    if (value.IsNull()) {
         return "";
-    if (value.GetType() == TType::kDatetime)
+    }
+    if (value.GetType() == TType::kDatetime) {
         return static_cast<TCIMDateTime>(value).ToUIString();
-    if (value.GetType() == TType::kChar16)
+    }
+    if (value.GetType() == TType::kChar16) {
         return CharacterText(static_cast<TCIMChar16>(value));
+    }
     return value.ToString(10);
 }
 
@@ -128,17 +144,20 @@ std::string PlainText(const TCIMValue& value)
 
 std::vector<std::string> PropertyTexts(const TCIMValue& value, const boost::shared_ptr<ICIMPropertyDecl>& declaration)
 {
-    if (value.IsNull())
+    if (value.IsNull()) {
         return {};
+    }
     const auto elements =
         value.IsArray() ? static_cast<const std::vector<TCIMValue>&>(value) : std::vector<TCIMValue>{value};
     std::optional<TTextRules> rules;
-    if (declaration)
+    if (declaration) {
         rules.emplace(*declaration);
+    }
     std::vector<std::string> texts;
     texts.reserve(elements.size());
-    for (const TCIMValue& element : elements)
+    for (const TCIMValue& element : elements) {
         texts.push_back(rules && !element.IsNull() ? rules->Text(element, PlainText(element)) : PlainText(element));
+    }
     return texts;
 }
 
@@ -146,8 +165,9 @@ std::string PropertyText(const TCIMValue& value, const boost::shared_ptr<ICIMPro
 {
     std::string joined;
     const auto texts = PropertyTexts(value, declaration);
-    for (std::size_t i = 0; i < texts.size(); ++i)
+    for (std::size_t i = 0; i < texts.size(); ++i) {
         joined += (i ? ", " : "") + texts[i];
+    }
     return joined;
 }
 

@@ -1,10 +1,9 @@
-#ifndef VRX_PROPERTYTEXT_H
-#define VRX_PROPERTYTEXT_H
+#pragma once
+
+#include <host/ICIMPropertyDecl.h>
 
 #include <string>
 #include <vector>
-
-#include <host/ICIMPropertyDecl.h>
 
 namespace NKOLVRX20 {
 
@@ -18,5 +17,3 @@ std::vector<std::string> PropertyTexts(const TCIMValue& value, const boost::shar
 std::string PropertyText(const TCIMValue& value, const boost::shared_ptr<ICIMPropertyDecl>& declaration);
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,15 +1,14 @@
-#include <host/TInmemInstance.h>
-
-#include <boost/make_shared.hpp>
+#include "host/inmem/NormalizedName.h"
+#include "host/inmem/ObjectPathText.h"
+#include "host/inmem/TInmemProperty.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMProperty.h>
 #include <host/ICIMPropertyDecl.h>
+#include <host/TInmemInstance.h>
 #include <host/TVRXException.h>
 
-#include "NormalizedName.h"
-#include "ObjectPathText.h"
-#include "TInmemProperty.h"
+#include <boost/make_shared.hpp>
 
 namespace NKOLVRX20 {
 namespace {
@@ -21,8 +20,9 @@ boost::shared_ptr<ICIMPropertyDecl> FindDeclaration(const boost::shared_ptr<ICIM
     try {
         return instanceClass ? instanceClass->GetPropertyDecl(name, context) : nullptr;
     } catch (const TVRXException& e) {
-        if (e.GetStatusCode() != TVRXStatusCode::kUnknownProperty)
+        if (e.GetStatusCode() != TVRXStatusCode::kUnknownProperty) {
             throw;
+        }
         return nullptr;
     }
 }
@@ -36,8 +36,9 @@ std::string ClassNameOf(const ICIMInstance& instance)
 // The contract's property has no name of its own: it is its declaration's, unless the property is of this library.
 std::string NameOf(const ICIMProperty& property)
 {
-    if (const auto* own = dynamic_cast<const TInmemProperty*>(&property))
+    if (const auto* own = dynamic_cast<const TInmemProperty*>(&property)) {
         return own->GetName();
+    }
     const auto declaration = property.GetDeclaration(TCIMContext());
     return declaration ? declaration->GetName(TCIMContext()) : std::string();
 }
@@ -68,32 +69,37 @@ void TInmemInstance::Validate(TCIMContext) {}
 
 void TInmemInstance::AddToNamespace(TCIMContext)
 {
-    if (fClass)
+    if (fClass) {
         fClass->AddInstance(shared_from_this());
+    }
 }
 
 void TInmemInstance::ModifyInstance(boost::shared_ptr<ICIMInstance> newValues, TCIMContext context)
 {
-    for (const auto& value : ValuesOf(*newValues))
+    for (const auto& value : ValuesOf(*newValues)) {
         SetPropertyValue(value.first, value.second, context);
+    }
 }
 
 void TInmemInstance::Delete(TCIMContext)
 {
-    if (fClass)
+    if (fClass) {
         fClass->RemoveInstance(shared_from_this());
+    }
 }
 
 TCIMReference TInmemInstance::GetReference(TCIMContext context) const
 {
-    if (!fClass)
+    if (!fClass) {
         return TCIMReference();
+    }
     TCIMContext keys;
     fClass->EnumerateKeyNames(
         [&](const std::string* name) {
             const auto found = fProperties.find(NormalizedName(*name));
-            if (found != fProperties.end())
+            if (found != fProperties.end()) {
                 keys[*name] = found->second->GetValue(context);
+            }
             return true;
         },
         context);
@@ -125,8 +131,9 @@ void TInmemInstance::EnumerateAssociationInstances(TInstanceVisitor, const std::
 boost::shared_ptr<ICIMProperty> TInmemInstance::GetProperty(const std::string& name, TCIMContext) const
 {
     const auto found = fProperties.find(NormalizedName(name));
-    if (found == fProperties.end())
+    if (found == fProperties.end()) {
         throw TVRXException(TVRXStatusCode::kUnknownProperty);
+    }
     return found->second;
 }
 
@@ -134,8 +141,9 @@ void TInmemInstance::SetPropertyValue(const std::string& name, TCIMValue value, 
 {
     const std::string key = NormalizedName(name);
     const auto found = fProperties.find(key);
-    if (found != fProperties.end())
+    if (found != fProperties.end()) {
         return found->second->SetValue(std::move(value), context);
+    }
     fProperties[key] =
         boost::make_shared<TInmemProperty>(name, std::move(value), FindDeclaration(fClass, name, context), fClass);
 }
@@ -143,9 +151,11 @@ void TInmemInstance::SetPropertyValue(const std::string& name, TCIMValue value, 
 void TInmemInstance::EnumerateProperties(TPropertyVisitor visitor, TCIMContext) const
 {
     const auto properties = fProperties; // the visitor may set values
-    for (const auto& property : properties)
-        if (!visitor(property.second))
+    for (const auto& property : properties) {
+        if (!visitor(property.second)) {
             return;
+        }
+    }
 }
 
 TCIMValue TInmemInstance::InvokeMethod(const std::string&, TCIMContext&, TCIMContext)
@@ -166,12 +176,14 @@ bool TInmemInstance::operator<(const ICIMInstance& other) const
 
 ICIMInstance& TInmemInstance::operator=(const ICIMInstance& other)
 {
-    if (this == &other)
+    if (this == &other) {
         return *this;
+    }
     fClass = other.GetClass(TCIMContext());
     fProperties.clear();
-    for (const auto& value : ValuesOf(other))
+    for (const auto& value : ValuesOf(other)) {
         SetPropertyValue(value.first, value.second, TCIMContext());
+    }
     return *this;
 }
 

@@ -1,11 +1,11 @@
-#include "TInmemNamespace.h"
+#include "host/inmem/TInmemNamespace.h"
+
+#include "host/inmem/NormalizedName.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>
 #include <host/INamespaceProvider.h>
 #include <host/TVRXException.h>
-
-#include "NormalizedName.h"
 
 namespace NKOLVRX20 {
 namespace {
@@ -25,9 +25,11 @@ boost::shared_ptr<Object> Find(const std::map<std::string, boost::shared_ptr<Obj
 // Visitors may change the namespace, so they are shown a copy's entries.
 template <typename Objects, typename Visitor> void VisitEach(const Objects objects, const Visitor& visitor)
 {
-    for (const auto& object : objects)
-        if (!visitor(object.second))
+    for (const auto& object : objects) {
+        if (!visitor(object.second)) {
             return;
+        }
+    }
 }
 
 } // namespace
@@ -111,17 +113,20 @@ boost::shared_ptr<ICIMInstance> TInmemNamespace::GetInstance(const TCIMReference
 
 void TInmemNamespace::DeleteInstance(const TCIMReference& reference, TCIMContext)
 {
-    if (fInstances.erase(reference.GetPath()) == 0)
+    if (fInstances.erase(reference.GetPath()) == 0) {
         throw TVRXException(TVRXStatusCode::kNotFound);
+    }
 }
 
 void TInmemNamespace::ModifyInstance(const TCIMReference& reference, TCIMContext values, TCIMContext context)
 {
     const auto instance = Find(fInstances, reference.GetPath());
-    if (!instance)
+    if (!instance) {
         throw TVRXException(TVRXStatusCode::kNotFound);
-    for (const auto& value : values)
+    }
+    for (const auto& value : values) {
         instance->SetPropertyValue(value.first, value.second, context);
+    }
 }
 
 void TInmemNamespace::ExecuteQuery(TInstanceVisitor, std::string&, std::string&, TCIMContext)

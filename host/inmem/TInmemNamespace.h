@@ -1,11 +1,10 @@
-#ifndef VRX_TINMEMNAMESPACE_H
-#define VRX_TINMEMNAMESPACE_H
+#pragma once
 
-#include <map>
+#include <host/ICIMNamespace.h>
 
 #include <boost/weak_ptr.hpp>
 
-#include <host/ICIMNamespace.h>
+#include <map>
 
 namespace NKOLVRX20 {
 
@@ -62,5 +61,3 @@ class TInmemNamespace : public ICIMNamespace
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,9 +1,9 @@
-#include "TInmemProperty.h"
+#include "host/inmem/TInmemProperty.h"
+
+#include "host/inmem/PropertyText.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMPropertyDecl.h>
-
-#include "PropertyText.h"
 
 namespace NKOLVRX20 {
 
@@ -22,8 +22,9 @@ std::string TInmemProperty::GetName() const
 
 TCIMValue::TCIMType TInmemProperty::GetType(TCIMContext context) const
 {
-    if (fValue.IsArray())
+    if (fValue.IsArray()) {
         return TCIMValue::TCIMType::ECIMType(fValue.GetType() + TCIMValue::TCIMType::kArrayOffset);
+    }
     const auto declaration = fDeclaration.lock();
     const bool typeless = fValue.GetType() == TCIMValue::TCIMType::kNone;
     return typeless && declaration ? declaration->GetType(context) : fValue.GetType();

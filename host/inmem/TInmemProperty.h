@@ -1,9 +1,8 @@
-#ifndef VRX_TINMEMPROPERTY_H
-#define VRX_TINMEMPROPERTY_H
-
-#include <boost/weak_ptr.hpp>
+#pragma once
 
 #include <host/ICIMProperty.h>
+
+#include <boost/weak_ptr.hpp>
 
 namespace NKOLVRX20 {
 
@@ -48,5 +47,3 @@ class TInmemProperty : public ICIMProperty
 };
 
 } // namespace NKOLVRX20
-
-#endif

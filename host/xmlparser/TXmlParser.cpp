@@ -1,10 +1,10 @@
 #include <host/TXmlParser.h>
 
+#include <expat.h>
+
 #include <exception>
 #include <memory>
 #include <new>
-
-#include <expat.h>
 
 namespace NKOLVRX20 {
 namespace {
@@ -47,8 +47,9 @@ struct TXmlParser::TState
     // expat delivers what it has already tokenised even after it was stopped.
     template <typename Call> void Deliver(Call call)
     {
-        if (fRefusal || fCallbackException)
+        if (fRefusal || fCallbackException) {
             return;
+        }
         try {
             call();
         } catch (...) {
@@ -72,8 +73,9 @@ struct TXmlParser::TState
 void TXmlParser::TState::Install()
 {
     fExpat.reset(XML_ParserCreate(nullptr));
-    if (!fExpat)
+    if (!fExpat) {
         throw std::bad_alloc();
+    }
     XML_SetUserData(fExpat.get(), this);
     XML_SetElementHandler(fExpat.get(), OnStart, OnEnd);
     XML_SetProcessingInstructionHandler(fExpat.get(), OnInstruction);
@@ -85,12 +87,14 @@ void TXmlParser::TState::Install()
 void TXmlParser::TState::OnStart(void* state, const XML_Char* name, const XML_Char** attributes)
 {
     TState& self = From(state);
-    if (++self.fDepth > kMaxDepth)
+    if (++self.fDepth > kMaxDepth) {
         return self.Refuse(kTooDeep);
+    }
     self.Deliver([&] {
         std::map<std::string, std::string> byName;
-        for (; *attributes; attributes += 2)
+        for (; *attributes; attributes += 2) {
             byName[attributes[0]] = attributes[1];
+        }
         self.fOwner.StartElement(name, byName);
     });
 }
@@ -142,18 +146,21 @@ bool TXmlParser::Parse(const char* buffer, std::size_t length)
     }
     fState->Install();
     const XML_Status status = XML_Parse(fState->fExpat.get(), buffer, static_cast<int>(length), XML_TRUE);
-    if (fState->fCallbackException)
+    if (fState->fCallbackException) {
         std::rethrow_exception(fState->fCallbackException);
-    if (status == XML_STATUS_OK)
+    }
+    if (status == XML_STATUS_OK) {
         return true;
+    }
     FatalError(fState->fRefusal ? fState->fRefusal : XML_ErrorString(XML_GetErrorCode(fState->fExpat.get())));
     return false;
 }
 
 unsigned int TXmlParser::GetCurLine() const
 {
-    if (!fState->fExpat)
+    if (!fState->fExpat) {
         return 1;
+    }
     return static_cast<unsigned int>(XML_GetCurrentLineNumber(fState->fExpat.get()));
 }
 

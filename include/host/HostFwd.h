@@ -6,15 +6,14 @@
 // - A visitor is called once per element and returns true to go on, false to stop.
 // - Virtual operations are declared in the host's binary slot order, after the destructor. Order is contract.
 // - Failures are thrown as TVRXException.
-#ifndef HOST_HOSTFWD_H
-#define HOST_HOSTFWD_H
+#pragma once
+
+#include <boost/function.hpp>
+#include <boost/shared_ptr.hpp>
 
 #include <map>
 #include <string>
 #include <vector>
-
-#include <boost/function.hpp>
-#include <boost/shared_ptr.hpp>
 
 namespace NKOLVRX20 {
 
@@ -52,5 +51,3 @@ typedef boost::function<bool(boost::shared_ptr<IProvider>)> TProviderVisitor;
 typedef boost::function<bool(const std::string*)> TKeyNameVisitor;
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef HOST_ICIMCLASS_H
-#define HOST_ICIMCLASS_H
+#pragma once
 
 #include <host/ICIMElement.h>
 #include <host/ICIMNamedElement.h>
@@ -86,5 +85,3 @@ class ICIMClass : public ICIMElement, public ICIMNamedElement
 };
 
 } // namespace NKOLVRX20
-
-#endif

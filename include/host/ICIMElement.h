@@ -1,5 +1,4 @@
-#ifndef HOST_ICIMELEMENT_H
-#define HOST_ICIMELEMENT_H
+#pragma once
 
 namespace NKOLVRX20 {
 
@@ -11,5 +10,3 @@ class ICIMElement
 };
 
 } // namespace NKOLVRX20
-
-#endif

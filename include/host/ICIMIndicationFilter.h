@@ -1,5 +1,4 @@
-#ifndef HOST_ICIMINDICATIONFILTER_H
-#define HOST_ICIMINDICATIONFILTER_H
+#pragma once
 
 namespace NKOLVRX20 {
 
@@ -11,5 +10,3 @@ class ICIMIndicationFilter
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef HOST_ICIMINSTANCE_H
-#define HOST_ICIMINSTANCE_H
+#pragma once
 
 #include <host/HostFwd.h>
 #include <host/ICIMElement.h>
@@ -39,5 +38,3 @@ class ICIMInstance : public ICIMElement
 };
 
 } // namespace NKOLVRX20
-
-#endif

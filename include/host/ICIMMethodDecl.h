@@ -1,5 +1,4 @@
-#ifndef HOST_ICIMMETHODDECL_H
-#define HOST_ICIMMETHODDECL_H
+#pragma once
 
 #include <host/ICIMNamedElement.h>
 
@@ -27,5 +26,3 @@ class ICIMMethodDecl : public ICIMNamedElement
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef HOST_ICIMNAMEDELEMENT_H
-#define HOST_ICIMNAMEDELEMENT_H
+#pragma once
 
 #include <host/HostFwd.h>
 #include <host/ICIMQualifierDecl.h>
@@ -33,5 +32,3 @@ class ICIMNamedElement
 };
 
 } // namespace NKOLVRX20
-
-#endif

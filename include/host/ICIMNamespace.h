@@ -1,5 +1,4 @@
-#ifndef HOST_ICIMNAMESPACE_H
-#define HOST_ICIMNAMESPACE_H
+#pragma once
 
 #include <host/HostFwd.h>
 #include <host/ICIMQualifierDecl.h>
@@ -43,5 +42,3 @@ class ICIMNamespace
 };
 
 } // namespace NKOLVRX20
-
-#endif

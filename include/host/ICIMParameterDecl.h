@@ -1,5 +1,4 @@
-#ifndef HOST_ICIMPARAMETERDECL_H
-#define HOST_ICIMPARAMETERDECL_H
+#pragma once
 
 #include <host/ICIMNamedElement.h>
 
@@ -22,5 +21,3 @@ class ICIMParameterDecl : public ICIMNamedElement
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef HOST_ICIMPROPERTY_H
-#define HOST_ICIMPROPERTY_H
+#pragma once
 
 #include <host/HostFwd.h>
 #include <host/TCIMValue.h>
@@ -40,5 +39,3 @@ class ICIMProperty
 };
 
 } // namespace NKOLVRX20
-
-#endif

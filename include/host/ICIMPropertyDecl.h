@@ -1,5 +1,4 @@
-#ifndef HOST_ICIMPROPERTYDECL_H
-#define HOST_ICIMPROPERTYDECL_H
+#pragma once
 
 #include <host/ICIMNamedElement.h>
 
@@ -26,5 +25,3 @@ class ICIMPropertyDecl : public ICIMNamedElement
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef HOST_ICIMQUALIFIER_H
-#define HOST_ICIMQUALIFIER_H
+#pragma once
 
 #include <host/HostFwd.h>
 #include <host/ICIMQualifierDecl.h>
@@ -35,5 +34,3 @@ class ICIMQualifier
 };
 
 } // namespace NKOLVRX20
-
-#endif

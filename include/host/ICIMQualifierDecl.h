@@ -1,5 +1,4 @@
-#ifndef HOST_ICIMQUALIFIERDECL_H
-#define HOST_ICIMQUALIFIERDECL_H
+#pragma once
 
 #include <host/HostFwd.h>
 #include <host/TCIMValue.h>
@@ -58,5 +57,3 @@ class ICIMQualifierDecl
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef HOST_ILOGGER_H
-#define HOST_ILOGGER_H
+#pragma once
 
 #include <string>
 
@@ -25,5 +24,3 @@ class ILogger
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef HOST_INAMESPACEPROVIDER_H
-#define HOST_INAMESPACEPROVIDER_H
+#pragma once
 
 #include <host/HostFwd.h>
 #include <host/TCIMValue.h>
@@ -23,5 +22,3 @@ class INamespaceProvider
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef HOST_INAMESPACEPROVIDERMANAGER_H
-#define HOST_INAMESPACEPROVIDERMANAGER_H
+#pragma once
 
 #include <host/HostFwd.h>
 
@@ -23,5 +22,3 @@ class INamespaceProviderManager
 };
 
 } // namespace NKOLVRX20
-
-#endif

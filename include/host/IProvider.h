@@ -1,5 +1,4 @@
-#ifndef HOST_IPROVIDER_H
-#define HOST_IPROVIDER_H
+#pragma once
 
 #include <host/HostFwd.h>
 #include <host/TCIMValue.h>
@@ -21,5 +20,3 @@ class IProvider
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,6 +1,5 @@
 // The symbols by which a host finds a namespace-provider plug-in's entry points after dlopen.
-#ifndef HOST_PLUGINSYMBOLS_H
-#define HOST_PLUGINSYMBOLS_H
+#pragma once
 
 namespace NKOLVRX20 {
 
@@ -11,5 +10,3 @@ inline constexpr const char kInitializeSymbol[] = "_ZN9NKOLVRX2025TPEGASUSNamesp
 inline constexpr const char kClearNamespaceSymbol[] = "_ZN9NKOLVRX2025TPEGASUSNamespaceProvider14ClearNamespaceEv";
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef HOST_TCIMCHAR16_H
-#define HOST_TCIMCHAR16_H
+#pragma once
 
 #include <string>
 
@@ -26,5 +25,3 @@ class TCIMChar16
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef HOST_TCIMDATETIME_H
-#define HOST_TCIMDATETIME_H
+#pragma once
 
 #include <string>
 
@@ -37,5 +36,3 @@ class TCIMDateTime
 };
 
 } // namespace NKOLVRX20
-
-#endif

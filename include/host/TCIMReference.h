@@ -1,12 +1,11 @@
-#ifndef HOST_TCIMREFERENCE_H
-#define HOST_TCIMREFERENCE_H
+#pragma once
 
-#include <string>
+#include <host/HostFwd.h>
 
 #include <boost/shared_ptr.hpp>
 #include <boost/weak_ptr.hpp>
 
-#include <host/HostFwd.h>
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -49,5 +48,3 @@ class TCIMReference
 };
 
 } // namespace NKOLVRX20
-
-#endif

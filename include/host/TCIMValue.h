@@ -1,15 +1,14 @@
-#ifndef HOST_TCIMVALUE_H
-#define HOST_TCIMVALUE_H
-
-#include <string>
-#include <vector>
-
-#include <boost/shared_ptr.hpp>
+#pragma once
 
 #include <host/HostFwd.h>
 #include <host/TCIMChar16.h>
 #include <host/TCIMDateTime.h>
 #include <host/TCIMReference.h>
+
+#include <boost/shared_ptr.hpp>
+
+#include <string>
+#include <vector>
 
 namespace NKOLVRX20 {
 
@@ -162,5 +161,3 @@ class TCIMValue
 };
 
 } // namespace NKOLVRX20
-
-#endif

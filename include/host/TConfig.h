@@ -1,5 +1,4 @@
-#ifndef HOST_TCONFIG_H
-#define HOST_TCONFIG_H
+#pragma once
 
 #include <map>
 #include <mutex>
@@ -37,5 +36,3 @@ class TConfig
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,12 +1,11 @@
-#ifndef HOST_TINMEMINSTANCE_H
-#define HOST_TINMEMINSTANCE_H
+#pragma once
 
-#include <map>
+#include <host/ICIMInstance.h>
 
 #include <boost/enable_shared_from_this.hpp>
 #include <boost/shared_ptr.hpp>
 
-#include <host/ICIMInstance.h>
+#include <map>
 
 namespace NKOLVRX20 {
 
@@ -54,5 +53,3 @@ class TInmemInstance : public ICIMInstance, public boost::enable_shared_from_thi
 };
 
 } // namespace NKOLVRX20
-
-#endif

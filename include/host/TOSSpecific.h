@@ -1,5 +1,4 @@
-#ifndef HOST_TOSSPECIFIC_H
-#define HOST_TOSSPECIFIC_H
+#pragma once
 
 #include <cstddef>
 #include <string>
@@ -38,5 +37,3 @@ class TOSSpecific
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef HOST_TPROVIDERINFO_H
-#define HOST_TPROVIDERINFO_H
+#pragma once
 
 #include <string>
 
@@ -13,5 +12,3 @@ struct TProviderInfo
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,11 +1,10 @@
-#ifndef HOST_TROOTOBJECT_H
-#define HOST_TROOTOBJECT_H
-
-#include <boost/shared_ptr.hpp>
+#pragma once
 
 #include <host/HostFwd.h>
 #include <host/ILogger.h>
 #include <host/INamespaceProviderManager.h>
+
+#include <boost/shared_ptr.hpp>
 
 namespace NKOLVRX20 {
 
@@ -25,5 +24,3 @@ class TRootObject
 };
 
 } // namespace NKOLVRX20
-
-#endif

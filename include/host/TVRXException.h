@@ -1,10 +1,9 @@
-#ifndef HOST_TVRXEXCEPTION_H
-#define HOST_TVRXEXCEPTION_H
+#pragma once
+
+#include <host/TVRXStatusCode.h>
 
 #include <cstdint>
 #include <exception>
-
-#include <host/TVRXStatusCode.h>
 
 namespace NKOLVRX20 {
 
@@ -23,5 +22,3 @@ class TVRXException : public std::exception
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef HOST_TVRXSTATUSCODE_H
-#define HOST_TVRXSTATUSCODE_H
+#pragma once
 
 #include <cstdint>
 
@@ -41,5 +40,3 @@ class TVRXStatusCode
 };
 
 } // namespace NKOLVRX20
-
-#endif

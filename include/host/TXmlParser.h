@@ -1,5 +1,4 @@
-#ifndef HOST_TXMLPARSER_H
-#define HOST_TXMLPARSER_H
+#pragma once
 
 #include <cstddef>
 #include <map>
@@ -47,5 +46,3 @@ class TXmlParser
 };
 
 } // namespace NKOLVRX20
-
-#endif

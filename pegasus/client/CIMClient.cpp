@@ -16,7 +16,7 @@ void failUnexpected(const XmlElement& element)
                  "Expected close of IRETURNVALUE element, got " + std::string(element.name()) + " instead");
 }
 
-/// An operation whose result is one object. An answer that says success without a result gives an uninitialised one.
+// An operation whose result is one object. An answer that says success without a result gives an uninitialised one.
 template <class T>
 T readOne(CIMClientRep& rep, client::Request request, const char* elementName,
           T (ElementDecoder::*decode)(const XmlElement&))
@@ -25,15 +25,16 @@ T readOne(CIMClientRep& rep, client::Request request, const char* elementName,
     bool found = false;
     request.result = elementName;
     rep.exchange(request, [&](const XmlElement& element, ElementDecoder& decoder) {
-        if (found)
+        if (found) {
             failUnexpected(element);
+        }
         result = (decoder.*decode)(element);
         found = true;
     });
     return result;
 }
 
-/// An operation whose result is a list.
+// An operation whose result is a list.
 template <class T>
 Array<T> readAll(CIMClientRep& rep, const client::Request& request, T (ElementDecoder::*decode)(const XmlElement&))
 {
@@ -49,7 +50,7 @@ void readNothing(CIMClientRep& rep, const client::Request& request)
     rep.exchange(request, [](const XmlElement& element, ElementDecoder&) { failUnexpected(element); });
 }
 
-/// OpenPegasus's client gives a null output without its type, whatever type the answer names.
+// OpenPegasus's client gives a null output without its type, whatever type the answer names.
 CIMParamValue asOutput(const CIMParamValue& output)
 {
     return output.getValue().isNull() ? CIMParamValue(output.getParameterName(), CIMValue(), false) : output;
@@ -79,8 +80,9 @@ void CIMClient::setTimeout(Uint32 timeoutMilliseconds)
 
 void CIMClient::connect(const String& host, const Uint32 portNumber, const String&, const String&)
 {
-    if (host.size() == 0 && portNumber == 0)
+    if (host.size() == 0 && portNumber == 0) {
         return connectLocal();
+    }
     client::ServerAddress address;
     address.host = host.size() > 0 ? StringAccess::toUtf8(host) : "localhost";
     address.port = portNumber;
@@ -209,10 +211,11 @@ CIMValue CIMClient::invokeMethod(const CIMNamespaceName& nameSpace, const CIMObj
     bool isFirst = true;
     fRep->exchange(client::encodeInvokeMethod(nameSpace, instanceName, methodName, inParameters),
                    [&](const XmlElement& element, ElementDecoder& decoder) {
-                       if (isFirst && element.is("RETURNVALUE"))
+                       if (isFirst && element.is("RETURNVALUE")) {
                            returnValue = decoder.decodeReturnValue(element);
-                       else
+                       } else {
                            outputs.append(asOutput(decoder.decodeParamValue(element)));
+                       }
                        isFirst = false;
                    });
     outParameters = outputs;

@@ -5,20 +5,24 @@
 namespace Pegasus {
 namespace {
 
-/// `HTTP Error (400 Bad Request): CIMError = "..." Detail = "...".` with the parts that there are.
+// `HTTP Error (400 Bad Request): CIMError = "..." Detail = "...".` with the parts that there are.
 String httpErrorText(Uint32 code, const String& reason, const String& cimError, const String& detail)
 {
     String text("HTTP Error (");
     text.append(std::to_string(code).c_str());
-    if (reason.size() > 0)
+    if (reason.size() > 0) {
         text.append(" ").append(reason);
+    }
     text.append(")");
-    if (cimError.size() > 0 || detail.size() > 0)
+    if (cimError.size() > 0 || detail.size() > 0) {
         text.append(":");
-    if (cimError.size() > 0)
+    }
+    if (cimError.size() > 0) {
         text.append(" CIMError = \"").append(cimError).append("\"");
-    if (detail.size() > 0)
+    }
+    if (detail.size() > 0) {
         text.append(" Detail = \"").append(detail).append("\"");
+    }
     return text.append(".");
 }
 

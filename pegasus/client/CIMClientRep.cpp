@@ -1,12 +1,13 @@
 #include "pegasus/client/CIMClientRep.h"
 
-#include "pegasus/common/AsciiCase.h"
-#include "pegasus/common/NumberText.h"
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/NumberText.h"
 #include "pegasus/common/StringRep.h"
 
 #include <Pegasus/Client/CIMClientException.h>
 
 #include <atomic>
+
 #include <pwd.h>
 #include <unistd.h>
 
@@ -28,15 +29,16 @@ std::string nextMessageId()
     return std::to_string(fgNext.fetch_add(1, std::memory_order_relaxed));
 }
 
-/// Text of a peer: UTF-8 if it is, else each byte a character.
+// Text of a peer: UTF-8 if it is, else each byte a character.
 String toString(std::string_view text)
 {
     try {
         return StringAccess::fromUtf8(text);
     } catch (const Exception&) {
         String result;
-        for (const char c : text)
+        for (const char c : text) {
             result.append(Char16(static_cast<unsigned char>(c)));
+        }
         return result;
     }
 }
@@ -46,17 +48,19 @@ std::string localUser()
     char buffer[4096];
     passwd entry{};
     passwd* found = nullptr;
-    if (::getpwuid_r(::geteuid(), &entry, buffer, sizeof(buffer), &found) != 0 || !found)
+    if (::getpwuid_r(::geteuid(), &entry, buffer, sizeof(buffer), &found) != 0 || !found) {
         return std::to_string(::geteuid());
+    }
     return found->pw_name;
 }
 
-/// The next word of a Content-Type: a token, a quoted text without its quotes, or one of the separators.
+// The next word of a Content-Type: a token, a quoted text without its quotes, or one of the separators.
 std::string_view takeWord(std::string_view& text)
 {
     text.remove_prefix(std::min(text.find_first_not_of(" \t"), text.size()));
-    if (text.empty())
+    if (text.empty()) {
         return text;
+    }
     if (text.front() == '"') {
         const std::size_t end = text.find('"', 1);
         const std::string_view word = text.substr(1, end == std::string_view::npos ? end : end - 1);
@@ -69,7 +73,7 @@ std::string_view takeWord(std::string_view& text)
     return word;
 }
 
-/// application/xml or text/xml, with charset utf-8.
+// application/xml or text/xml, with charset utf-8.
 bool isXmlInUtf8(std::string_view contentType)
 {
     const std::string_view type = takeWord(contentType);
@@ -80,34 +84,41 @@ bool isXmlInUtf8(std::string_view contentType)
 
 void checkHeader(const ResponseFields& fields)
 {
-    if (fields.status != 200)
+    if (fields.status != 200) {
         throw CIMClientHTTPErrorException(fields.status, toString(fields.reason), toString(fields.cimError),
                                           toString(client::percentDecoded(fields.errorDetail)));
-    if (!fields.hasCimOperation)
+    }
+    if (!fields.hasCimOperation) {
         throw CIMClientMalformedHTTPException("Missing CIMOperation HTTP header");
-    if (!equalNoCase(fields.cimOperation, "MethodResponse"))
+    }
+    if (!equalNoCase(fields.cimOperation, "MethodResponse")) {
         throw CIMClientMalformedHTTPException("Received CIMOperation HTTP header value \"" +
                                               toString(fields.cimOperation) + "\", expected \"MethodResponse\"");
-    if (fields.hasContentType && !isXmlInUtf8(fields.contentType))
+    }
+    if (fields.hasContentType && !isXmlInUtf8(fields.contentType)) {
         throw CIMClientMalformedHTTPException("Bad Content-Type HTTP header; " + toString(fields.contentType));
+    }
 }
 
-/// The status that a header or trailer field carries.
+// The status that a header or trailer field carries.
 void checkStatusField(const ResponseFields& fields)
 {
-    if (!fields.hasStatusCode)
+    if (!fields.hasStatusCode) {
         return;
+    }
     const auto code = number::parseUnsigned(fields.statusCode);
-    if (!code || *code > 0xFFFF)
+    if (!code || *code > 0xFFFF) {
         throw CIMClientMalformedHTTPException("Bad CIMStatusCode HTTP header; " + toString(fields.statusCode));
-    if (*code == CIM_ERR_SUCCESS)
+    }
+    if (*code == CIM_ERR_SUCCESS) {
         return;
+    }
     const auto status = static_cast<CIMStatusCode>(*code);
     const String description = toString(client::percentDecoded(fields.statusDescription));
     throw CIMException(status, description.size() > 0 ? description : String(cimStatusCodeToString(status)));
 }
 
-/// `on line 2: cause (GetClass answer, column 14)`
+// `on line 2: cause (GetClass answer, column 14)`
 [[noreturn]] void throwXml(const std::string& method, const wire::XmlError& error)
 {
     const std::string place = " (" + method + " answer, column " + std::to_string(error.place().column) + ")";
@@ -118,8 +129,9 @@ void checkStatusField(const ResponseFields& fields)
 
 void CIMClientRep::connect(const client::ServerAddress& address)
 {
-    if (fAddress)
+    if (fAddress) {
         throw AlreadyConnectedException();
+    }
     const Deadline deadline(fTimeoutMs);
     fConnection.setAddress(address);
     fConnection.open(deadline);
@@ -134,8 +146,9 @@ void CIMClientRep::disconnect()
 
 void CIMClientRep::exchange(const client::Request& request, const ContentHandler& onContent)
 {
-    if (!fAddress)
+    if (!fAddress) {
         throw NotConnectedException();
+    }
     try {
         exchangeOnce(request, onContent);
     } catch (const CIMException&) {
@@ -155,32 +168,38 @@ void CIMClientRep::exchange(const client::Request& request, const ContentHandler
 void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHandler& onContent)
 {
     const Deadline deadline(fTimeoutMs);
-    if (fTimeoutMs == 0)
+    if (fTimeoutMs == 0) {
         throw ConnectionTimeoutException();
+    }
     const client::ExpectedResponse expected{nextMessageId(), request.method, request.isIntrinsic, request.result};
     const std::string message = client::encodeMessage(request, expected.messageId, fAddress->text(),
                                                       fAddress->isLocal ? localUser() : std::string());
-    if (fConnection.isOpen() && fConnection.isStale())
+    if (fConnection.isOpen() && fConnection.isStale()) {
         fConnection.close();
+    }
     bool mayRepeat = fConnection.isOpen() && fConnection.hasReceived() && request.isRepeatable;
     for (;;) {
         ResponseReader reader(expected, fDecoder, onContent);
         HttpResponse response(fLimits, checkHeader, [&](std::string_view body) { reader.feed(body); });
         if (sendAndReceive(message, response, deadline) == Outcome::NothingReceived) {
-            if (!mayRepeat)
+            if (!mayRepeat) {
                 throw CIMClientMalformedHTTPException(kClosed);
+            }
             mayRepeat = false; // an idle connection that the server had given up; once more on a new one
             continue;
         }
-        if (!response.isComplete())
+        if (!response.isComplete()) {
             throw wire::XmlError(wire::XmlError::Kind::Invalid, reader.place(),
                                  "the connection was closed inside the answer");
-        if (!response.keepsAlive())
+        }
+        if (!response.keepsAlive()) {
             fConnection.close();
+        }
         checkStatusField(response.fields());
         reader.finish();
-        if (reader.error() && reader.error()->getCode() != CIM_ERR_SUCCESS)
+        if (reader.error() && reader.error()->getCode() != CIM_ERR_SUCCESS) {
             throw *reader.error();
+        }
         return;
     }
 }
@@ -188,11 +207,13 @@ void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHan
 CIMClientRep::Outcome CIMClientRep::sendAndReceive(const std::string& message, HttpResponse& response,
                                                    const Deadline& deadline)
 {
-    if (!fConnection.isOpen())
+    if (!fConnection.isOpen()) {
         fConnection.open(deadline);
+    }
     // A server that closes while it is sent to may have answered all the same.
-    if (fConnection.send(message, deadline) == Result::TimedOut)
+    if (fConnection.send(message, deadline) == Result::TimedOut) {
         throw ConnectionTimeoutException();
+    }
     return receive(response, deadline);
 }
 
@@ -203,14 +224,17 @@ CIMClientRep::Outcome CIMClientRep::receive(HttpResponse& response, const Deadli
     while (!response.isComplete()) {
         std::size_t received = 0;
         const Result result = fConnection.receive(fReceiveBuffer.data(), fReceiveBuffer.size(), deadline, received);
-        if (result == Result::TimedOut)
+        if (result == Result::TimedOut) {
             throw ConnectionTimeoutException();
+        }
         if (result == Result::Closed) {
             fConnection.close();
-            if (isFirst)
+            if (isFirst) {
                 return Outcome::NothingReceived;
-            if (!response.hasHeader())
+            }
+            if (!response.hasHeader()) {
                 throw CIMClientMalformedHTTPException("Missing CIMOperation HTTP header");
+            }
             response.endOfConnection();
             break;
         }

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CLIENT_CIMCLIENTREP_H
-#define PEGASUS_CLIENT_CIMCLIENTREP_H
+#pragma once
 
 #include "pegasus/client/ClientLimits.h"
 #include "pegasus/client/Connection.h"
@@ -15,8 +14,8 @@
 
 namespace Pegasus {
 
-/// What a client is inside: an address, a connection that is opened when it is needed, and the exchange of one request
-/// for its answer within the time-out.
+// What a client is inside: an address, a connection that is opened when it is needed, and the exchange of one request
+// for its answer within the time-out.
 class CIMClientRep
 {
   public:
@@ -28,21 +27,21 @@ class CIMClientRep
     Uint32 timeoutMs() const { return fTimeoutMs; }
     void setTimeoutMs(Uint32 timeoutMs) { fTimeoutMs = timeoutMs; }
 
-    /// Throws: AlreadyConnectedException, and as Connection::open.
+    // Throws: AlreadyConnectedException, and as Connection::open.
     void connect(const client::ServerAddress& address);
     void disconnect();
 
-    /// Sends the request and gives each element of the result to `onContent`. Whatever goes wrong, the connection is
-    /// closed and the next call opens a new one.
-    /// An ERROR element that says success is an answer without a result.
-    /// Throws: what CIMClient's operations throw.
+    // Sends the request and gives each element of the result to `onContent`. Whatever goes wrong, the connection is
+    // closed and the next call opens a new one.
+    // An ERROR element that says success is an answer without a result.
+    // Throws: what CIMClient's operations throw.
     void exchange(const client::Request& request, const ContentHandler& onContent);
 
   private:
     enum class Outcome
     {
         Answered,
-        NothingReceived ///< the server closed the connection before it answered
+        NothingReceived // the server closed the connection before it answered
     };
 
     void exchangeOnce(const client::Request& request, const ContentHandler& onContent);
@@ -51,7 +50,7 @@ class CIMClientRep
     Outcome receive(client::HttpResponse& response, const client::Deadline& deadline);
 
     client::ClientLimits fLimits;
-    wire::ElementDecoder fDecoder{fLimits.xml}; ///< kept, so that the names of all answers share their texts
+    wire::ElementDecoder fDecoder{fLimits.xml}; // kept, so that the names of all answers share their texts
     std::optional<client::ServerAddress> fAddress;
     client::Connection fConnection;
     std::vector<char> fReceiveBuffer;
@@ -59,5 +58,3 @@ class CIMClientRep
 };
 
 } // namespace Pegasus
-
-#endif

@@ -1,18 +1,19 @@
 #include "pegasus/client/Connection.h"
 
-#include "pegasus/common/LocalSocket.h"
+#include "pegasus/base/LocalSocket.h"
 
 #include <Pegasus/Common/Exception.h>
 
 #include <cerrno>
-#include <fcntl.h>
 #include <memory>
+#include <system_error>
+
+#include <fcntl.h>
 #include <netdb.h>
 #include <netinet/in.h>
 #include <netinet/tcp.h>
 #include <poll.h>
 #include <sys/socket.h>
-#include <system_error>
 #include <unistd.h>
 
 namespace Pegasus::client {
@@ -30,12 +31,13 @@ std::shared_ptr<addrinfo> lookUp(const ServerAddress& address)
     hints.ai_socktype = SOCK_STREAM;
     hints.ai_flags = AI_NUMERICSERV;
     addrinfo* list = nullptr;
-    if (::getaddrinfo(address.host.c_str(), std::to_string(address.port).c_str(), &hints, &list) != 0)
+    if (::getaddrinfo(address.host.c_str(), std::to_string(address.port).c_str(), &hints, &list) != 0) {
         throw InvalidLocatorException(toString(address.text()));
+    }
     return {list, ::freeaddrinfo};
 }
 
-/// Returns: the result of the connection attempt that is under way, 0 or an errno.
+// Returns: the result of the connection attempt that is under way, 0 or an errno.
 int pendingError(int fd)
 {
     int error = 0;
@@ -65,18 +67,20 @@ void Connection::open(const Deadline& deadline)
 {
     close();
     fHasReceived = false;
-    if (fAddress.isLocal)
+    if (fAddress.isLocal) {
         openLocal(deadline);
-    else
+    } else {
         openTcp(deadline);
+    }
 }
 
 void Connection::openTcp(const Deadline& deadline)
 {
     for (const addrinfo* candidate = fCandidates.get(); candidate; candidate = candidate->ai_next) {
         fFd = ::socket(candidate->ai_family, candidate->ai_socktype | SOCK_CLOEXEC | SOCK_NONBLOCK, 0);
-        if (fFd < 0)
+        if (fFd < 0) {
             continue;
+        }
         const int started = ::connect(fFd, candidate->ai_addr, candidate->ai_addrlen);
         const bool isPending = started < 0 && (errno == EINPROGRESS || errno == EINTR);
         if (started == 0 || (isPending && waitFor(POLLOUT, deadline) == Result::Done && pendingError(fFd) == 0)) {
@@ -103,8 +107,9 @@ void Connection::openLocal(const Deadline& deadline)
 
 void Connection::close()
 {
-    if (fFd >= 0)
+    if (fFd >= 0) {
         ::close(fFd);
+    }
     fFd = -1;
 }
 
@@ -120,12 +125,15 @@ Connection::Result Connection::waitFor(short events, const Deadline& deadline) c
     for (;;) {
         pollfd entry{fFd, events, 0};
         const int ready = ::poll(&entry, 1, deadline.remainingMs());
-        if (ready > 0)
+        if (ready > 0) {
             return Result::Done;
-        if (ready == 0 && deadline.hasPassed())
+        }
+        if (ready == 0 && deadline.hasPassed()) {
             return Result::TimedOut;
-        if (ready < 0 && errno != EINTR)
+        }
+        if (ready < 0 && errno != EINTR) {
             return Result::Closed;
+        }
     }
 }
 
@@ -137,11 +145,13 @@ Connection::Result Connection::send(std::string_view bytes, const Deadline& dead
             bytes.remove_prefix(static_cast<std::size_t>(count));
             continue;
         }
-        if (!isRetry(errno))
+        if (!isRetry(errno)) {
             return Result::Closed;
+        }
         const Result waited = waitFor(POLLOUT, deadline);
-        if (waited != Result::Done)
+        if (waited != Result::Done) {
             return waited;
+        }
     }
     return Result::Done;
 }
@@ -151,19 +161,22 @@ Connection::Result Connection::receive(char* buffer, std::size_t capacity, const
 {
     for (;;) {
         // Asked before each read: a server that never stops sending must not outlast the deadline.
-        if (deadline.hasPassed())
+        if (deadline.hasPassed()) {
             return Result::TimedOut;
+        }
         const ssize_t count = ::recv(fFd, buffer, capacity, 0);
         if (count >= 0) {
             received = static_cast<std::size_t>(count);
             fHasReceived = true;
             return count == 0 ? Result::Closed : Result::Done;
         }
-        if (!isRetry(errno))
+        if (!isRetry(errno)) {
             return Result::Closed;
+        }
         const Result waited = waitFor(POLLIN, deadline);
-        if (waited != Result::Done)
+        if (waited != Result::Done) {
             return waited;
+        }
     }
 }
 

@@ -1,7 +1,6 @@
-#ifndef PEGASUS_CLIENT_CONNECTION_H
-#define PEGASUS_CLIENT_CONNECTION_H
+#pragma once
 
-#include "pegasus/client/Deadline.h"
+#include "pegasus/base/Deadline.h"
 
 #include <Pegasus/Common/String.h>
 
@@ -14,25 +13,25 @@ struct addrinfo;
 
 namespace Pegasus::client {
 
-/// Where a server is.
+// Where a server is.
 struct ServerAddress
 {
-    bool isLocal = false; ///< the private socket; the rest is not used
+    bool isLocal = false; // the private socket; the rest is not used
     std::string host;
     Uint32 port = 0;
 
-    /// "127.0.0.1:5988" as in the Host field; empty for the private socket.
+    // "127.0.0.1:5988" as in the Host field; empty for the private socket.
     std::string text() const;
 };
 
-/// One socket, close-on-exec and without SIGPIPE. No call lasts beyond the deadline that it is given.
+// One socket, close-on-exec and without SIGPIPE. No call lasts beyond the deadline that it is given.
 class Connection
 {
   public:
     enum class Result
     {
         Done,
-        Closed, ///< by the server, orderly or not
+        Closed, // by the server, orderly or not
         TimedOut
     };
 
@@ -41,20 +40,20 @@ class Connection
     Connection(const Connection&) = delete;
     Connection& operator=(const Connection&) = delete;
 
-    /// Where open() goes from now on. A host name is looked up here and not again, because nothing but the resolver's
-    /// own settings bounds that. Throws: InvalidLocatorException.
+    // Where open() goes from now on. A host name is looked up here and not again, because nothing but the resolver's
+    // own settings bounds that. Throws: InvalidLocatorException.
     void setAddress(const ServerAddress& address);
-    /// Throws: CannotConnectException, also when the deadline passes. Requires: setAddress().
+    // Throws: CannotConnectException, also when the deadline passes. Requires: setAddress().
     void open(const Deadline& deadline);
     void close();
     bool isOpen() const { return fFd >= 0; }
-    /// Has the server ever sent anything on it?
+    // Has the server ever sent anything on it?
     bool hasReceived() const { return fHasReceived; }
-    /// Has the server closed the idle connection, or sent what nobody asked for?
+    // Has the server closed the idle connection, or sent what nobody asked for?
     bool isStale() const;
 
     Result send(std::string_view bytes, const Deadline& deadline);
-    /// Waits for bytes. `received` is how many came.
+    // Waits for bytes. `received` is how many came.
     Result receive(char* buffer, std::size_t capacity, const Deadline& deadline, std::size_t& received);
 
   private:
@@ -63,11 +62,9 @@ class Connection
     void openLocal(const Deadline& deadline);
 
     ServerAddress fAddress;
-    std::shared_ptr<addrinfo> fCandidates; ///< what a host name was looked up to; null for the private socket
+    std::shared_ptr<addrinfo> fCandidates; // what a host name was looked up to; null for the private socket
     int fFd = -1;
     bool fHasReceived = false;
 };
 
 } // namespace Pegasus::client
-
-#endif

@@ -1,6 +1,6 @@
 #include "pegasus/client/HttpResponse.h"
 
-#include "pegasus/common/AsciiCase.h"
+#include "pegasus/base/AsciiCase.h"
 
 #include <Pegasus/Client/CIMClientException.h>
 
@@ -32,26 +32,29 @@ bool isNamed(BeastView name, std::string_view expected)
     throw CIMClientMalformedHTTPException(String(text.c_str()));
 }
 
-/// Where the header ends: behind an empty line, whose line ends may be bare line feeds.
+// Where the header ends: behind an empty line, whose line ends may be bare line feeds.
 std::size_t headerEnd(std::string_view bytes)
 {
     for (std::size_t at = bytes.find('\n'); at != std::string_view::npos; at = bytes.find('\n', at + 1)) {
-        if (bytes.substr(at + 1, 1) == "\n")
+        if (bytes.substr(at + 1, 1) == "\n") {
             return at + 2;
-        if (bytes.substr(at + 1, 2) == "\r\n")
+        }
+        if (bytes.substr(at + 1, 2) == "\r\n") {
             return at + 3;
+        }
     }
     return std::string_view::npos;
 }
 
-/// The parser insists on CRLF; servers' headers with bare line feeds are understood too.
+// The parser insists on CRLF; servers' headers with bare line feeds are understood too.
 std::string withCrLf(std::string_view header)
 {
     std::string out;
     out.reserve(header.size() + 32);
     for (std::size_t i = 0; i < header.size(); ++i) {
-        if (header[i] == '\n' && (i == 0 || header[i - 1] != '\r'))
+        if (header[i] == '\n' && (i == 0 || header[i - 1] != '\r')) {
             out += '\r';
+        }
         out += header[i];
     }
     return out;
@@ -134,54 +137,62 @@ HttpResponse::~HttpResponse() = default;
 
 void HttpResponse::feed(std::string_view bytes)
 {
-    if (!hasHeader())
+    if (!hasHeader()) {
         feedHeader(bytes);
-    if (bytes.empty())
+    }
+    if (bytes.empty()) {
         return;
+    }
     if (isComplete()) {
         fHasSurplus = true;
         return;
     }
-    if (fPending.empty())
+    if (fPending.empty()) {
         return put(bytes);
+    }
     std::string joined;
     joined.swap(fPending);
     joined.append(bytes);
     put(joined);
 }
 
-/// Takes bytes up to the end of the header.
+// Takes bytes up to the end of the header.
 void HttpResponse::feedHeader(std::string_view& bytes)
 {
     const std::size_t before = fPending.size();
     fPending.append(bytes);
     checkStart();
     const std::size_t end = headerEnd(fPending);
-    if (std::min(end, fPending.size()) > fLimits.maxHeaderBytes)
+    if (std::min(end, fPending.size()) > fLimits.maxHeaderBytes) {
         throwMalformed("a header of more than " + std::to_string(fLimits.maxHeaderBytes) + " bytes");
+    }
     bytes.remove_prefix(end == std::string::npos ? bytes.size() : end - before);
-    if (end == std::string::npos)
+    if (end == std::string::npos) {
         return;
+    }
     const std::string header = withCrLf(std::string_view(fPending).substr(0, end));
     fPending.clear();
     put(header);
-    if (!hasHeader())
+    if (!hasHeader()) {
         throwMalformed();
+    }
 }
 
 void HttpResponse::checkStart() const
 {
     const std::string_view start = std::string_view(fPending).substr(0, kProtocol.size());
-    if (start != kProtocol.substr(0, start.size()))
+    if (start != kProtocol.substr(0, start.size())) {
         throwMalformed();
+    }
 }
 
 void HttpResponse::put(std::string_view bytes)
 {
     while (!bytes.empty() && !isComplete()) {
         const std::size_t used = putSome(bytes);
-        if (used == 0)
+        if (used == 0) {
             break;
+        }
         bytes.remove_prefix(used);
     }
     if (isComplete()) {
@@ -189,29 +200,34 @@ void HttpResponse::put(std::string_view bytes)
         return;
     }
     // Only the framing between pieces of a body waits for more.
-    if (bytes.size() > fLimits.maxHeaderBytes)
+    if (bytes.size() > fLimits.maxHeaderBytes) {
         throwMalformed("a trailer of more than " + std::to_string(fLimits.maxHeaderBytes) + " bytes");
+    }
     fPending.assign(bytes.data(), bytes.size());
 }
 
-/// Returns: how many bytes were used; 0 when more are needed.
+// Returns: how many bytes were used; 0 when more are needed.
 std::size_t HttpResponse::putSome(std::string_view bytes)
 {
     error_code error;
     const std::size_t used = fParser->put(boost::asio::buffer(bytes.data(), bytes.size()), error);
-    if (error == http::error::need_more)
+    if (error == http::error::need_more) {
         return used;
-    if (error == http::error::body_limit)
+    }
+    if (error == http::error::body_limit) {
         throwMalformed("a body of more than " + std::to_string(fLimits.maxBodyBytes) + " bytes");
-    if (error)
+    }
+    if (error) {
         throwMalformed();
+    }
     return used;
 }
 
 bool HttpResponse::endOfConnection()
 {
-    if (!hasHeader())
+    if (!hasHeader()) {
         return false;
+    }
     if (!isComplete() && fPending.empty()) {
         error_code error;
         fParser->put_eof(error);

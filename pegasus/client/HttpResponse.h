@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CLIENT_HTTPRESPONSE_H
-#define PEGASUS_CLIENT_HTTPRESPONSE_H
+#pragma once
 
 #include "pegasus/client/ClientLimits.h"
 
@@ -11,8 +10,8 @@
 
 namespace Pegasus::client {
 
-/// The fields of a CIM server's answer that mean something to a client; those of the trailer are entered when they
-/// come.
+// The fields of a CIM server's answer that mean something to a client; those of the trailer are entered when they
+// come.
 struct ResponseFields
 {
     unsigned status = 0;
@@ -22,18 +21,18 @@ struct ResponseFields
     bool hasContentType = false;
     std::string contentType;
     std::string cimError;
-    std::string errorDetail; ///< as sent, percent-encoded
+    std::string errorDetail; // as sent, percent-encoded
     bool hasStatusCode = false;
     std::string statusCode;
-    std::string statusDescription; ///< as sent, percent-encoded
+    std::string statusDescription; // as sent, percent-encoded
 };
 
-/// One HTTP/1.x response, read piece by piece: lengths, chunks and trailers, or up to the end of the connection.
-/// Throws: CIMClientMalformedHTTPException.
+// One HTTP/1.x response, read piece by piece: lengths, chunks and trailers, or up to the end of the connection.
+// Throws: CIMClientMalformedHTTPException.
 class HttpResponse
 {
   public:
-    /// Called when the header is complete; and with each piece of the body.
+    // Called when the header is complete; and with each piece of the body.
     using HeaderHandler = std::function<void(const ResponseFields&)>;
     using BodyHandler = std::function<void(std::string_view)>;
 
@@ -42,15 +41,15 @@ class HttpResponse
     HttpResponse(const HttpResponse&) = delete;
     HttpResponse& operator=(const HttpResponse&) = delete;
 
-    /// The next bytes from the connection, split anywhere. Bytes behind the response are ignored; a connection that has
-    /// them is not used again.
+    // The next bytes from the connection, split anywhere. Bytes behind the response are ignored; a connection that has
+    // them is not used again.
     void feed(std::string_view bytes);
-    /// The connection has ended. Returns: whether the response had, too.
+    // The connection has ended. Returns: whether the response had, too.
     bool endOfConnection();
 
     bool hasHeader() const;
     bool isComplete() const;
-    /// May the connection be used again? Requires: complete.
+    // May the connection be used again? Requires: complete.
     bool keepsAlive() const;
     const ResponseFields& fields() const;
 
@@ -64,10 +63,8 @@ class HttpResponse
 
     ClientLimits fLimits;
     std::unique_ptr<Parser> fParser;
-    std::string fPending; ///< bytes that the parser could not use yet
+    std::string fPending; // bytes that the parser could not use yet
     bool fHasSurplus = false;
 };
 
 } // namespace Pegasus::client
-
-#endif

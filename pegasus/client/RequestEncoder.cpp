@@ -1,7 +1,7 @@
 #include "pegasus/client/RequestEncoder.h"
 
-#include "pegasus/common/ElementEncoder.h"
 #include "pegasus/common/StringRep.h"
+#include "pegasus/wire/ElementEncoder.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -13,15 +13,17 @@ namespace {
 
 const CIMNamespaceName& notNull(const CIMNamespaceName& nameSpace)
 {
-    if (nameSpace.isNull())
+    if (nameSpace.isNull()) {
         throw InvalidNamespaceNameException(String());
+    }
     return nameSpace;
 }
 
 int hexValue(char c)
 {
-    if (c >= '0' && c <= '9')
+    if (c >= '0' && c <= '9') {
         return c - '0';
+    }
     const char lower = static_cast<char>(c | 0x20);
     return lower >= 'a' && lower <= 'f' ? lower - 'a' + 10 : -1;
 }
@@ -62,8 +64,9 @@ void IntrinsicRequest::close()
 
 IntrinsicRequest& IntrinsicRequest::className(std::string_view parameter, const CIMName& name)
 {
-    if (name.isNull())
+    if (name.isNull()) {
         return *this;
+    }
     open(parameter);
     wire::appendClassName(fRequest.call, name);
     close();
@@ -80,8 +83,9 @@ IntrinsicRequest& IntrinsicRequest::instanceName(const CIMObjectPath& path)
 
 IntrinsicRequest& IntrinsicRequest::flag(std::string_view parameter, Boolean value, Boolean ifMissing)
 {
-    if (value == ifMissing)
+    if (value == ifMissing) {
         return *this;
+    }
     open(parameter);
     fRequest.call.append("<VALUE>").append(value ? "TRUE" : "FALSE").append("</VALUE>\n");
     close();
@@ -100,8 +104,9 @@ IntrinsicRequest& IntrinsicRequest::text(std::string_view parameter, const Strin
 
 IntrinsicRequest& IntrinsicRequest::propertyList(const CIMPropertyList& list)
 {
-    if (list.isNull())
+    if (list.isNull()) {
         return *this;
+    }
     open("PropertyList");
     fRequest.call += "<VALUE.ARRAY>\n";
     for (Uint32 i = 0; i < list.size(); ++i) {
@@ -157,12 +162,14 @@ Request encodeInvokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPat
     request.call = "<METHODCALL NAME=\"";
     wire::appendEscaped(request.call, method.getString());
     request.call += "\">\n";
-    if (path.getKeyBindings().size() > 0)
+    if (path.getKeyBindings().size() > 0) {
         wire::appendLocalInstancePath(request.call, nameSpace, path);
-    else
+    } else {
         wire::appendLocalClassPath(request.call, nameSpace, path.getClassName());
-    for (Uint32 i = 0; i < parameters.size(); ++i)
+    }
+    for (Uint32 i = 0; i < parameters.size(); ++i) {
         wire::appendParamValue(request.call, parameters[i]);
+    }
     request.call += "</METHODCALL>\n";
     return request;
 }
@@ -182,8 +189,9 @@ std::string encodeMessage(const Request& request, std::string_view messageId, st
     out.append("CIMOperation: MethodCall\r\n");
     out.append("CIMMethod: ").append(percentEncoded(request.method)).append("\r\n");
     out.append("CIMObject: ").append(request.object).append("\r\n");
-    if (!localUser.empty())
+    if (!localUser.empty()) {
         out.append("PegasusAuthorization: Local \"").append(localUser).append("\"\r\n");
+    }
     return out.append("\r\n").append(content);
 }
 

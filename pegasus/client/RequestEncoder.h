@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CLIENT_REQUESTENCODER_H
-#define PEGASUS_CLIENT_REQUESTENCODER_H
+#pragma once
 
 #include <Pegasus/Common/CIMClass.h>
 #include <Pegasus/Common/CIMObjectPath.h>
@@ -12,23 +11,23 @@
 
 namespace Pegasus::client {
 
-/// One operation as it goes over the wire: the CIM-XML of its call, and what the HTTP header says about it.
+// One operation as it goes over the wire: the CIM-XML of its call, and what the HTTP header says about it.
 struct Request
 {
     std::string method;
-    std::string object; ///< for the CIMObject field, percent-encoded
-    std::string call;   ///< the METHODCALL or IMETHODCALL element
+    std::string object; // for the CIMObject field, percent-encoded
+    std::string call;   // the METHODCALL or IMETHODCALL element
     bool isIntrinsic = true;
-    /// May it be sent again when the answer was lost? True for what only reads.
+    // May it be sent again when the answer was lost? True for what only reads.
     bool isRepeatable = false;
-    std::string_view result; ///< the element that an answer without an error has; empty when it may have none
+    std::string_view result; // the element that an answer without an error has; empty when it may have none
 };
 
-/// An intrinsic operation, parameter by parameter (DSP0200). Parameters with their default value are left out.
+// An intrinsic operation, parameter by parameter (DSP0200). Parameters with their default value are left out.
 class IntrinsicRequest
 {
   public:
-    /// Throws: InvalidNamespaceNameException (null).
+    // Throws: InvalidNamespaceNameException (null).
     IntrinsicRequest(std::string_view method, const CIMNamespaceName& nameSpace, bool isRepeatable);
 
     IntrinsicRequest& className(std::string_view parameter, const CIMName& name);
@@ -40,7 +39,7 @@ class IntrinsicRequest
     IntrinsicRequest& newInstance(const CIMInstance& instance);
     IntrinsicRequest& qualifierDeclaration(const CIMQualifierDecl& declaration);
 
-    /// The finished request; the encoder is empty afterwards.
+    // The finished request; the encoder is empty afterwards.
     Request finish();
 
   private:
@@ -50,19 +49,17 @@ class IntrinsicRequest
     Request fRequest;
 };
 
-/// Throws: InvalidNamespaceNameException (null).
+// Throws: InvalidNamespaceNameException (null).
 Request encodeInvokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPath& path, const CIMName& method,
                            const Array<CIMParamValue>& parameters);
 
-/// The whole HTTP message. `host` is the Host field's text; `localUser` is named to the private socket, empty for TCP.
+// The whole HTTP message. `host` is the Host field's text; `localUser` is named to the private socket, empty for TCP.
 std::string encodeMessage(const Request& request, std::string_view messageId, std::string_view host,
                           std::string_view localUser);
 
-/// Everything but letters, digits and "-_." as %XX.
+// Everything but letters, digits and "-_." as %XX.
 std::string percentEncoded(std::string_view text);
-/// Bytes that are no valid escape stay as they are.
+// Bytes that are no valid escape stay as they are.
 std::string percentDecoded(std::string_view text);
 
 } // namespace Pegasus::client
-
-#endif

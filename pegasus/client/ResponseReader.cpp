@@ -1,7 +1,7 @@
 #include "pegasus/client/ResponseReader.h"
 
-#include "pegasus/common/AsciiCase.h"
-#include "pegasus/common/NumberText.h"
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/NumberText.h"
 #include "pegasus/common/StringRep.h"
 
 #include <Pegasus/Client/CIMClientException.h>
@@ -14,7 +14,7 @@ namespace {
 using wire::XmlElement;
 using Kind = wire::XmlError::Kind;
 
-/// The outer elements from the outside in; on the fourth level one of two.
+// The outer elements from the outside in; on the fourth level one of two.
 constexpr std::string_view kLevels[] = {"CIM", "MESSAGE", "SIMPLERSP", "IMETHODRESPONSE", "IRETURNVALUE"};
 constexpr std::string_view kExtrinsicResponse = "METHODRESPONSE";
 constexpr std::size_t kResponseLevel = 3;
@@ -42,10 +42,12 @@ constexpr std::string_view kIntrinsicMethods[] = {
 
 void expectVersion(const XmlElement& tag, std::string_view attribute, std::string_view value)
 {
-    if (value.data() == nullptr)
+    if (value.data() == nullptr) {
         tag.fail(Kind::Invalid, "missing CIM." + std::string(attribute) + " attribute");
-    if (value.substr(0, 2) != "2.")
+    }
+    if (value.substr(0, 2) != "2.") {
         tag.fail(Kind::Invalid, "CIM." + std::string(attribute) + " is not 2.x");
+    }
 }
 
 bool isProtocolOne(std::string_view version)
@@ -56,8 +58,9 @@ bool isProtocolOne(std::string_view version)
 
 std::string_view required(const XmlElement& tag, std::string_view attribute, std::string_view value)
 {
-    if (value.data() == nullptr)
+    if (value.data() == nullptr) {
         tag.fail(Kind::Invalid, "missing " + std::string(tag.name()) + "." + std::string(attribute) + " attribute");
+    }
     return value;
 }
 
@@ -75,10 +78,11 @@ void ResponseReader::openEnvelope(const XmlElement& tag)
 {
     const bool isAtLevel = fDepth < std::size(kLevels) &&
                            (tag.is(kLevels[fDepth]) || (fDepth == kResponseLevel && tag.is(kExtrinsicResponse)));
-    if (!isAtLevel)
+    if (!isAtLevel) {
         tag.fail(Kind::Invalid, "Expected open of " +
                                     std::string(fDepth < std::size(kLevels) ? kLevels[fDepth] : "content") +
                                     " element, got " + std::string(tag.name()));
+    }
     if (tag.is("CIM")) {
         std::string_view values[2];
         tag.attributes({"CIMVERSION", "DTDVERSION"}, values);
@@ -91,8 +95,9 @@ void ResponseReader::openEnvelope(const XmlElement& tag)
     } else {
         tag.expectNoAttributes();
         if (tag.is("IRETURNVALUE")) {
-            if (!fExpected.isIntrinsic || fHasReturnValue || fError)
+            if (!fExpected.isIntrinsic || fHasReturnValue || fError) {
                 tag.fail(Kind::Invalid, "unexpected IRETURNVALUE element");
+            }
             fHasReturnValue = true;
         }
     }
@@ -105,16 +110,19 @@ void ResponseReader::openMessage(const XmlElement& tag)
     tag.attributes({"ID", "PROTOCOLVERSION"}, values);
     const std::string id(required(tag, "ID", values[0]));
     const std::string version(required(tag, "PROTOCOLVERSION", values[1]));
-    if (!isProtocolOne(version))
+    if (!isProtocolOne(version)) {
         throwResponse("Received unsupported protocol version \"" + version + "\", expected \"1.[0-9]+\"");
-    if (id != fExpected.messageId)
+    }
+    if (id != fExpected.messageId) {
         throwResponse("Mismatched response message ID:  Got \"" + id + "\", expected \"" + fExpected.messageId + "\".");
+    }
 }
 
 void ResponseReader::openMethodResponse(const XmlElement& tag)
 {
-    if (fHasResponse)
+    if (fHasResponse) {
         tag.fail(Kind::Invalid, "a second response in the message");
+    }
     fHasResponse = true;
     std::string_view values[1];
     tag.attributes({"NAME"}, values);
@@ -122,11 +130,13 @@ void ResponseReader::openMethodResponse(const XmlElement& tag)
     const bool isIntrinsic = !tag.is(kExtrinsicResponse);
     const bool isKnown =
         std::find(std::begin(kIntrinsicMethods), std::end(kIntrinsicMethods), name) != std::end(kIntrinsicMethods);
-    if (isIntrinsic && !isKnown)
+    if (isIntrinsic && !isKnown) {
         tag.fail(Kind::Invalid, "Unrecognized IMethodResponse name \"" + name + "\"");
-    if (isIntrinsic != fExpected.isIntrinsic || !equalNoCase(name, fExpected.method))
+    }
+    if (isIntrinsic != fExpected.isIntrinsic || !equalNoCase(name, fExpected.method)) {
         throwResponse("Mismatched response:  Got an answer to \"" + name + "\", expected one to \"" + fExpected.method +
                       "\".");
+    }
 }
 
 void ResponseReader::closeEnvelope(std::string_view)
@@ -137,11 +147,13 @@ void ResponseReader::closeEnvelope(std::string_view)
 void ResponseReader::slice(const XmlElement& element)
 {
     const bool isContent = fDepth == (fExpected.isIntrinsic ? kReturnLevel + 1 : kResponseLevel + 1);
-    if (element.is("ERROR") && fDepth == kResponseLevel + 1 && !fHasReturnValue && !fError)
+    if (element.is("ERROR") && fDepth == kResponseLevel + 1 && !fHasReturnValue && !fError) {
         return readError(element);
+    }
     if (!isContent || fError) {
-        if (fDepth < std::size(kLevels) && fDepth != kResponseLevel + 1)
+        if (fDepth < std::size(kLevels) && fDepth != kResponseLevel + 1) {
             element.fail(Kind::Invalid, "Expected open of " + std::string(kLevels[fDepth]) + " element");
+        }
         element.fail(Kind::Invalid, "unexpected " + std::string(element.name()) + " element");
     }
     fHasContent = true;
@@ -153,25 +165,29 @@ void ResponseReader::readError(const XmlElement& element)
     std::string_view values[2];
     element.attributes({"CODE", "DESCRIPTION"}, values);
     const auto code = number::parseUnsigned(required(element, "CODE", values[0]));
-    if (!code || *code > 0xFFFF)
+    if (!code || *code > 0xFFFF) {
         element.fail(Kind::Invalid, "missing ERROR.CODE attribute");
+    }
     std::string scratch;
     const String description =
         values[1].data() == nullptr ? String() : fDecoder.toString(element, element.resolved(values[1], scratch));
     Array<CIMInstance> instances;
-    for (XmlElement child = element.firstChild(); child; child = child.nextSibling())
+    for (XmlElement child = element.firstChild(); child; child = child.nextSibling()) {
         instances.append(fDecoder.decodeInstance(child));
+    }
     fError = CIMException(static_cast<CIMStatusCode>(*code), description, instances);
 }
 
 void ResponseReader::finish()
 {
     fSlicer.finish();
-    if (!fHasResponse)
+    if (!fHasResponse) {
         throw wire::XmlError(Kind::Invalid, fSlicer.place(), "expected IMETHODRESPONSE or METHODRESPONSE element");
-    if (!fExpected.result.empty() && !fHasContent && !fError)
+    }
+    if (!fExpected.result.empty() && !fHasContent && !fError) {
         throw wire::XmlError(Kind::Invalid, fSlicer.place(),
                              "expected ERROR or IRETURNVALUE element with " + std::string(fExpected.result));
+    }
 }
 
 } // namespace Pegasus::client

@@ -1,9 +1,8 @@
-#ifndef PEGASUS_CLIENT_RESPONSEREADER_H
-#define PEGASUS_CLIENT_RESPONSEREADER_H
+#pragma once
 
 #include "pegasus/client/ClientLimits.h"
-#include "pegasus/common/ElementDecoder.h"
-#include "pegasus/common/XmlSlicer.h"
+#include "pegasus/wire/ElementDecoder.h"
+#include "pegasus/wire/XmlSlicer.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -14,32 +13,32 @@
 
 namespace Pegasus::client {
 
-/// What a request asked, and so what its answer has to be.
+// What a request asked, and so what its answer has to be.
 struct ExpectedResponse
 {
     std::string messageId;
     std::string method;
     bool isIntrinsic = true;
-    std::string_view result{}; ///< the element that must be in it; empty when there may be none
+    std::string_view result{}; // the element that must be in it; empty when there may be none
 };
 
-/// Reads the CIM-XML answer to one request while it arrives.
-/// Throws: wire::XmlError; CIMClientResponseException (an answer to something else);
-/// TypeMismatchException (an instance under another class's name).
+// Reads the CIM-XML answer to one request while it arrives.
+// Throws: wire::XmlError; CIMClientResponseException (an answer to something else);
+// TypeMismatchException (an instance under another class's name).
 class ResponseReader : private wire::XmlSliceHandler
 {
   public:
-    /// Gets each element of the result: the children of IRETURNVALUE, or of METHODRESPONSE.
+    // Gets each element of the result: the children of IRETURNVALUE, or of METHODRESPONSE.
     using ContentHandler = std::function<void(const wire::XmlElement&, wire::ElementDecoder&)>;
 
-    /// Both references must outlive the reader.
+    // Both references must outlive the reader.
     ResponseReader(const ExpectedResponse& expected, wire::ElementDecoder& decoder, ContentHandler onContent);
 
     void feed(std::string_view bytes) { fSlicer.feed(bytes); }
-    /// The body has ended as it should. Throws: XmlError when the answer has not.
+    // The body has ended as it should. Throws: XmlError when the answer has not.
     void finish();
 
-    /// The ERROR element of the answer, if there was one; it may say success.
+    // The ERROR element of the answer, if there was one; it may say success.
     const std::optional<CIMException>& error() const { return fError; }
     wire::XmlPlace place() const { return fSlicer.place(); }
 
@@ -64,5 +63,3 @@ class ResponseReader : private wire::XmlSliceHandler
 };
 
 } // namespace Pegasus::client
-
-#endif

@@ -43,15 +43,17 @@ ArgsObject::ArgsObject(Broker& owner) : CMPIArgs{nullptr, &kArgsTable}, broker(o
 
 ArgsObject::ArgsObject(Broker& owner, const Array<CIMParamValue>& parameters) : ArgsObject(owner)
 {
-    for (Uint32 i = 0; i < parameters.size(); ++i)
+    for (Uint32 i = 0; i < parameters.size(); ++i) {
         values.append(CIMName(parameters[i].getParameterName()), parameters[i].getValue());
+    }
 }
 
 Array<CIMParamValue> ArgsObject::parameters() const
 {
     Array<CIMParamValue> result;
-    for (const NamedValue& held : values.all())
+    for (const NamedValue& held : values.all()) {
         result.append(CIMParamValue(held.name.getString(), held.value, true));
+    }
     return result;
 }
 

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_ARGSOBJECT_H
-#define PEGASUS_CMPI_ARGSOBJECT_H
+#pragma once
 
 #include "pegasus/cmpi/NamedValues.h"
 
@@ -26,5 +25,3 @@ class ArgsObject final : public Owned, public CMPIArgs
 extern const CMPIArgsFT kArgsTable;
 
 } // namespace Pegasus::cmpi
-
-#endif

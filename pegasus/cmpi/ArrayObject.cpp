@@ -33,8 +33,9 @@ CMPIStatus setElementAt(const CMPIArray* self, CMPICount index, const CMPIValue*
 
 std::vector<CIMValue> nulls(CMPICount size, CMPIType type)
 {
-    if (size > kMaxElements)
+    if (size > kMaxElements) {
         throw SlotError{CMPI_RC_ERR_INVALID_PARAMETER, "newArray: more than 16777216 elements"};
+    }
     return std::vector<CIMValue>(size, CIMValue(cimTypeOf(type), false));
 }
 
@@ -64,25 +65,28 @@ CMPIData ArrayObject::at(CMPICount index) const
     requireIndex(index);
     CMPIData data = encodeValue(fBroker, fElements[index]);
     data.type = fType;
-    if (fType == CMPI_chars && data.state == CMPI_goodValue)
+    if (fType == CMPI_chars && data.state == CMPI_goodValue) {
         data.value.chars = static_cast<char*>(data.value.string->hdl);
+    }
     return data;
 }
 
 void ArrayObject::set(CMPICount index, const CMPIValue* value, CMPIType type)
 {
     requireIndex(index);
-    if (type == CMPI_null)
+    if (type == CMPI_null) {
         value = nullptr;
-    else if (cimTypeOf(type) != cimTypeOf(fType) || (type & CMPI_ARRAY) != 0)
+    } else if (cimTypeOf(type) != cimTypeOf(fType) || (type & CMPI_ARRAY) != 0) {
         throw SlotError{CMPI_RC_ERR_TYPE_MISMATCH, {}};
+    }
     fElements[index] = decodeValue(value, type == CMPI_null ? fType : type);
 }
 
 void ArrayObject::requireIndex(CMPICount index) const
 {
-    if (index >= fElements.size())
+    if (index >= fElements.size()) {
         throw SlotError{CMPI_RC_ERR_NO_SUCH_PROPERTY, {}};
+    }
 }
 
 } // namespace Pegasus::cmpi

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_ARRAYOBJECT_H
-#define PEGASUS_CMPI_ARRAYOBJECT_H
+#pragma once
 
 #include "pegasus/cmpi/ValueCodec.h"
 
@@ -38,5 +37,3 @@ class ArrayObject final : public Owned, public CMPIArray
 extern const CMPIArrayFT kArrayTable;
 
 } // namespace Pegasus::cmpi
-
-#endif

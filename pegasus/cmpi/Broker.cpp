@@ -17,8 +17,9 @@ Broker::Broker(BrokerServices& services)
 
 Broker& Broker::of(const CMPIBroker* broker)
 {
-    if (broker == nullptr || broker->hdl == nullptr)
+    if (broker == nullptr || broker->hdl == nullptr) {
         throw SlotError{CMPI_RC_ERR_INVALID_HANDLE, {}};
+    }
     return *static_cast<Broker*>(
         const_cast<void*>(broker->hdl)); // by the handle: some providers keep a copy of the object
 }
@@ -27,8 +28,9 @@ void Broker::warnOnce(const std::string& text)
 {
     {
         const std::lock_guard lock(fMutex);
-        if (fWarnings.size() >= kMaxWarnings || !fWarnings.insert(text).second)
+        if (fWarnings.size() >= kMaxWarnings || !fWarnings.insert(text).second) {
             return;
+        }
     }
     fServices.log(BrokerServices::Severity::kWarning, text);
 }

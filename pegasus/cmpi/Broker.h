@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_BROKER_H
-#define PEGASUS_CMPI_BROKER_H
+#pragma once
 
 #include "pegasus/cmpi/BrokerServices.h"
 #include "pegasus/cmpi/ClassCache.h"
@@ -45,5 +44,3 @@ extern const CMPIBrokerExtFT kThreadTable;
 extern const CMPIBrokerMemFT kMemoryTable;
 
 } // namespace Pegasus::cmpi
-
-#endif

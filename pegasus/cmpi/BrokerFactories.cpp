@@ -32,8 +32,9 @@ template <class Face> Face* notSupported(CMPIStatus* rc)
 CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* path, CMPIStatus* rc)
 {
     return made<CMPIInstance>(rc, [&] {
-        if (path == nullptr)
+        if (path == nullptr) {
             throw SlotError{CMPI_RC_ERR_INVALID_PARAMETER, {}};
+        }
         return Frame::current().make<InstanceObject>(Broker::of(broker), objectOf<ObjectPathObject>(path).state);
     });
 }
@@ -89,18 +90,24 @@ CMPIBoolean classPathIsA(const CMPIBroker* broker, const CMPIObjectPath* path, c
 {
     return answer(rc, CMPIBoolean{0}, [&]() -> CMPIBoolean {
         Broker& owner = Broker::of(broker);
-        if (path == nullptr || className == nullptr)
+        if (path == nullptr || className == nullptr) {
             throw SlotError{CMPI_RC_ERR_INVALID_PARAMETER, {}};
-        if (!CIMName::legal(fromUtf8(className)))
+        }
+        if (!CIMName::legal(fromUtf8(className))) {
             throw SlotError{CMPI_RC_ERR_INVALID_CLASS, {}};
+        }
         const PathState& state = objectOf<ObjectPathObject>(path).state;
-        if (sameName(utf8(state.className), className))
+        if (sameName(utf8(state.className), className)) {
             return 1;
+        }
         const std::string nameSpace = utf8(state.nameSpace.getString());
         for (const ClassSchema* at = state.schema; at != nullptr && !at->superClass().isNull();
              at = owner.classes().find(nameSpace, utf8(at->superClass())))
-            if (sameName(utf8(at->superClass()), className))
+        {
+            if (sameName(utf8(at->superClass()), className)) {
                 return 1;
+            }
+        }
         return 0;
     });
 }
@@ -120,8 +127,9 @@ struct Kind
 
 std::string_view kindOf(const void* object)
 {
-    if (object == nullptr || static_cast<const AnyObject*>(object)->hdl == nullptr)
+    if (object == nullptr || static_cast<const AnyObject*>(object)->hdl == nullptr) {
         throw SlotError{CMPI_RC_ERR_INVALID_HANDLE, {}};
+    }
     const std::array kinds{
         Kind{"CMPIInstance", &kInstanceTable},
         Kind{"CMPIObjectPath", &kObjectPathTable},
@@ -134,9 +142,11 @@ std::string_view kindOf(const void* object)
         Kind{"CMPIEnumeration", &kEnumerationTable},
         Kind{"CMPIBroker", &kUpcallTable},
     };
-    for (const Kind& kind : kinds)
-        if (kind.table == static_cast<const AnyObject*>(object)->ft)
+    for (const Kind& kind : kinds) {
+        if (kind.table == static_cast<const AnyObject*>(object)->ft) {
             return kind.name;
+        }
+    }
     throw SlotError{CMPI_RC_ERR_INVALID_PARAMETER, {}};
 }
 
@@ -147,17 +157,18 @@ std::string describe(const void* object)
     std::array<char, 32> address{};
     std::snprintf(address.data(), address.size(), "%p:", object);
     std::string text = address.data() + std::string(kind);
-    if (kind == "CMPIString")
+    if (kind == "CMPIString") {
         text += ' ' + static_cast<const StringObject*>(static_cast<const CMPIString*>(object))->text();
-    else if (kind == "CMPIObjectPath")
+    } else if (kind == "CMPIObjectPath") {
         text += ' ' + utf8(objectOf<ObjectPathObject>(static_cast<const CMPIObjectPath*>(object)).value().toString());
-    else if (kind == "CMPIInstance")
+    } else if (kind == "CMPIInstance") {
         text += ' ' + utf8(objectOf<InstanceObject>(static_cast<const CMPIInstance*>(object))
                                .completePath()
                                .withNameSpace()
                                .toString());
-    else if (kind == "CMPIDateTime")
+    } else if (kind == "CMPIDateTime") {
         text += ' ' + utf8(objectOf<DateTimeObject>(static_cast<const CMPIDateTime*>(object)).value().toString());
+    }
     return text;
 }
 
@@ -201,10 +212,11 @@ CMPIString* getMessage2(const CMPIBroker*, const char*, CMPIMsgFileHandle, const
 std::string logLine(const char* id, const char* text, const CMPIString* string)
 {
     std::string line = id != nullptr && *id != '\0' ? std::string(id) + ": " : std::string();
-    if (text != nullptr)
+    if (text != nullptr) {
         line += text;
-    else if (string != nullptr)
+    } else if (string != nullptr) {
         line += objectOf<StringObject>(string).text();
+    }
     return line;
 }
 
@@ -235,8 +247,9 @@ CMPIError* newCMPIError(const CMPIBroker*, const char*, const char*, const char*
 
 CMPIStatus openMessageFile(const CMPIBroker*, const char*, CMPIMsgFileHandle* handle)
 {
-    if (handle != nullptr)
+    if (handle != nullptr) {
         *handle = nullptr;
+    }
     return makeStatus(CMPI_RC_ERR_NOT_SUPPORTED, {});
 }
 

@@ -22,8 +22,9 @@ class alignas(std::max_align_t) MemoryBlock final : public Owned
     {
         void* memory =
             size > SIZE_MAX - sizeof(MemoryBlock) ? nullptr : ::operator new(sizeof(MemoryBlock) + size, std::nothrow);
-        if (memory == nullptr)
+        if (memory == nullptr) {
             return nullptr;
+        }
         auto* block = new (memory) MemoryBlock(size);
         Frame::current().adopt(*block);
         return block;
@@ -61,8 +62,9 @@ CMPIStatus release(const CMPIBroker*, const CMPIGcStat* mark)
 {
     return perform([&] {
         const auto* frame = static_cast<const Frame*>(mark);
-        if (mark == nullptr || !Frame::isOpen(frame))
+        if (mark == nullptr || !Frame::isOpen(frame)) {
             throw SlotError{CMPI_RC_ERR_INVALID_HANDLE, {}};
+        }
         delete static_cast<const MarkedFrame*>(frame);
     });
 }
@@ -75,23 +77,26 @@ void* cmpiMalloc(const CMPIBroker*, std::size_t size)
 
 void* cmpiCalloc(const CMPIBroker* broker, std::size_t count, std::size_t size)
 {
-    if (size != 0 && count > SIZE_MAX / size)
+    if (size != 0 && count > SIZE_MAX / size) {
         return nullptr;
+    }
     void* bytes = cmpiMalloc(broker, count * size);
     return bytes == nullptr ? nullptr : std::memset(bytes, 0, count * size);
 }
 
 void cmpiFree(const CMPIBroker*, void* bytes)
 {
-    if (bytes != nullptr)
+    if (bytes != nullptr) {
         delete MemoryBlock::of(bytes);
+    }
 }
 
 void* cmpiRealloc(const CMPIBroker* broker, void* bytes, std::size_t size)
 {
     void* larger = cmpiMalloc(broker, size);
-    if (larger == nullptr || bytes == nullptr)
+    if (larger == nullptr || bytes == nullptr) {
         return larger;
+    }
     std::memcpy(larger, bytes, std::min(size, MemoryBlock::of(bytes)->size()));
     cmpiFree(broker, bytes);
     return larger;
@@ -99,8 +104,9 @@ void* cmpiRealloc(const CMPIBroker* broker, void* bytes, std::size_t size)
 
 char* cmpiStrDup(const CMPIBroker* broker, const char* text)
 {
-    if (text == nullptr)
+    if (text == nullptr) {
         return nullptr;
+    }
     const std::size_t size = std::strlen(text) + 1;
     void* bytes = cmpiMalloc(broker, size);
     return bytes == nullptr ? nullptr : static_cast<char*>(std::memcpy(bytes, text, size));

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_BROKERSERVICES_H
-#define PEGASUS_CMPI_BROKERSERVICES_H
+#pragma once
 
 #include <Pegasus/Common/CIMClass.h>
 #include <Pegasus/Common/CIMInstance.h>
@@ -62,5 +61,3 @@ class BrokerServices
 };
 
 } // namespace Pegasus::cmpi
-
-#endif

@@ -1,13 +1,13 @@
 #include "pegasus/cmpi/Broker.h"
 
-#include <pthread.h>
-#include <time.h>
-
 #include <cerrno>
 #include <cstdlib>
 #include <cstring>
 #include <new>
 #include <string>
+
+#include <pthread.h>
+#include <time.h>
 
 // The platform's threads under CMPI's names. Integer results are 0 or an errno.
 namespace Pegasus::cmpi {
@@ -28,8 +28,9 @@ char* resolveFileName(const char* name)
 CMPIThread newThread(CMPIThreadFunc start, void* parm, int detached)
 {
     pthread_attr_t attributes;
-    if (start == nullptr || ::pthread_attr_init(&attributes) != 0)
+    if (start == nullptr || ::pthread_attr_init(&attributes) != 0) {
         return nullptr;
+    }
     ::pthread_attr_setdetachstate(&attributes, detached != 0 ? PTHREAD_CREATE_DETACHED : PTHREAD_CREATE_JOINABLE);
     pthread_t thread{};
     const int failed = ::pthread_create(&thread, &attributes, start, parm);
@@ -100,8 +101,9 @@ pthread_mutex_t* mutexOf(CMPIMutex mutex)
 CMPIMutex newMutex(int)
 {
     auto* mutex = new (std::nothrow) pthread_mutex_t;
-    if (mutex == nullptr)
+    if (mutex == nullptr) {
         return nullptr;
+    }
     pthread_mutexattr_t attributes;
     ::pthread_mutexattr_init(&attributes);
     ::pthread_mutexattr_settype(&attributes, PTHREAD_MUTEX_RECURSIVE);
@@ -112,11 +114,13 @@ CMPIMutex newMutex(int)
 
 int destroyMutex2(CMPIMutex mutex)
 {
-    if (mutex == nullptr)
+    if (mutex == nullptr) {
         return EINVAL;
+    }
     const int failed = ::pthread_mutex_destroy(mutexOf(mutex));
-    if (failed == 0)
+    if (failed == 0) {
         delete mutexOf(mutex);
+    }
     return failed;
 }
 
@@ -153,18 +157,21 @@ pthread_cond_t* conditionOf(CMPICondition condition)
 CMPICondition newCondition(int)
 {
     auto* condition = new (std::nothrow) pthread_cond_t;
-    if (condition != nullptr)
+    if (condition != nullptr) {
         ::pthread_cond_init(condition, nullptr);
+    }
     return condition;
 }
 
 int destroyCondition2(CMPICondition condition)
 {
-    if (condition == nullptr)
+    if (condition == nullptr) {
         return EINVAL;
+    }
     const int failed = ::pthread_cond_destroy(conditionOf(condition));
-    if (failed == 0)
+    if (failed == 0) {
         delete conditionOf(condition);
+    }
     return failed;
 }
 
@@ -175,16 +182,18 @@ void destroyCondition(CMPICondition condition)
 
 int condWait(CMPICondition condition, CMPIMutex mutex)
 {
-    if (condition == nullptr || mutex == nullptr)
+    if (condition == nullptr || mutex == nullptr) {
         return EINVAL;
+    }
     return ::pthread_cond_wait(conditionOf(condition), mutexOf(mutex));
 }
 
 // `wait` is an absolute time of the real-time clock.
 int timedCondWait(CMPICondition condition, CMPIMutex mutex, timespec* wait)
 {
-    if (condition == nullptr || mutex == nullptr || wait == nullptr)
+    if (condition == nullptr || mutex == nullptr || wait == nullptr) {
         return EINVAL;
+    }
     return ::pthread_cond_timedwait(conditionOf(condition), mutexOf(mutex), wait);
 }
 

@@ -18,14 +18,16 @@ struct Target
 {
     Target(const CMPIContext* context, const CMPIObjectPath* target)
     {
-        if (target == nullptr)
+        if (target == nullptr) {
             throw SlotError{CMPI_RC_ERR_INVALID_PARAMETER, {}};
+        }
         const PathState& state = objectOf<ObjectPathObject>(target).state;
         nameSpace = state.nameSpace;
         if (nameSpace.isNull() && context != nullptr) {
             const std::string text = objectOf<ContextObject>(context).text(CMPIInitNameSpace);
-            if (!text.empty())
+            if (!text.empty()) {
                 nameSpace = CIMNamespaceName(fromUtf8(text.c_str()));
+            }
         }
         path = state.withoutNameSpace();
     }
@@ -38,11 +40,13 @@ struct Target
 
 CIMPropertyList listOf(const char** properties)
 {
-    if (properties == nullptr)
+    if (properties == nullptr) {
         return {};
+    }
     Array<CIMName> names;
-    for (; *properties != nullptr; ++properties)
+    for (; *properties != nullptr; ++properties) {
         names.append(requireName(*properties));
+    }
     return {names};
 }
 
@@ -55,8 +59,9 @@ CMPIStatus attachThread(const CMPIBroker*, const CMPIContext* context)
 {
     return perform([&] {
         ContextObject& prepared = objectOf<ContextObject>(context);
-        if (prepared.threadFrame)
+        if (prepared.threadFrame) {
             throw SlotError{CMPI_RC_ERR_FAILED, "the context's thread is attached already"};
+        }
         prepared.threadFrame = std::make_unique<Frame>();
     });
 }
@@ -66,8 +71,9 @@ CMPIStatus detachThread(const CMPIBroker*, const CMPIContext* context)
     return perform([&] {
         ContextObject& prepared = objectOf<ContextObject>(context);
         prepared.threadFrame.reset();
-        if (prepared.lifetime == Lifetime::kClone)
+        if (prepared.lifetime == Lifetime::kClone) {
             delete &prepared;
+        }
     });
 }
 
@@ -167,8 +173,9 @@ CMPIData invokeMethod(const CMPIBroker* broker, const CMPIContext* context, cons
             owner.services().invokeMethod(target.nameSpace, target.path, requireName(method), input, output);
         if (out != nullptr) {
             const ArgsObject received(owner, output);
-            for (const NamedValue& value : received.values.all())
+            for (const NamedValue& value : received.values.all()) {
                 objectOf<ArgsObject>(out).values.append(value.name, value.value);
+            }
         }
         return encodeValue(owner, result);
     });

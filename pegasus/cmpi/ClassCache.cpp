@@ -14,9 +14,11 @@ std::string keyOf(std::string_view nameSpace, std::string_view className)
     std::string key;
     key.reserve(nameSpace.size() + className.size() + 1);
     key.append(nameSpace).append(1, ':').append(className);
-    for (char& c : key)
-        if (c >= 'A' && c <= 'Z')
+    for (char& c : key) {
+        if (c >= 'A' && c <= 'Z') {
             c = static_cast<char>(c - 'A' + 'a');
+        }
+    }
     return key;
 }
 
@@ -30,8 +32,9 @@ const ClassSchema* ClassCache::find(std::string_view nameSpace, std::string_view
         const std::shared_lock lock(fMutex);
         request = fRequest;
         const auto found = fEntries.find(key);
-        if (found != fEntries.end() && (found->second.schema || found->second.asked == request))
+        if (found != fEntries.end() && (found->second.schema || found->second.asked == request)) {
             return found->second.schema.get();
+        }
     }
     std::unique_ptr<ClassSchema> loaded = load(nameSpace, className);
 
@@ -57,8 +60,9 @@ std::unique_ptr<ClassSchema> ClassCache::load(std::string_view nameSpace, std::s
                                                   CIMName(fromUtf8(std::string(className).c_str())));
         return std::make_unique<ClassSchema>(found);
     } catch (const CIMException& error) {
-        if (error.getCode() == CIM_ERR_NOT_FOUND || error.getCode() == CIM_ERR_INVALID_NAMESPACE)
+        if (error.getCode() == CIM_ERR_NOT_FOUND || error.getCode() == CIM_ERR_INVALID_NAMESPACE) {
             return nullptr;
+        }
         fServices.log(BrokerServices::Severity::kWarning, "GetClass " + std::string(className) + " in " +
                                                               std::string(nameSpace) + ": " + utf8(error.getMessage()));
     } catch (const Exception& error) {

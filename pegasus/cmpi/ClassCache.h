@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_CLASSCACHE_H
-#define PEGASUS_CMPI_CLASSCACHE_H
+#pragma once
 
 #include "pegasus/cmpi/BrokerServices.h"
 #include "pegasus/cmpi/ClassSchema.h"
@@ -44,5 +43,3 @@ class ClassCache
 };
 
 } // namespace Pegasus::cmpi
-
-#endif

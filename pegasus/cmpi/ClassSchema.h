@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_CLASSSCHEMA_H
-#define PEGASUS_CMPI_CLASSSCHEMA_H
+#pragma once
 
 #include <Pegasus/Common/CIMClass.h>
 #include <Pegasus/Common/CIMName.h>
@@ -60,5 +59,3 @@ class ClassSchema
 };
 
 } // namespace Pegasus::cmpi
-
-#endif

@@ -62,8 +62,9 @@ std::string ContextObject::text(const char* name) const
 {
     const CIMValue* found = values.find(name);
     String result;
-    if (found != nullptr && found->getType() == CIMTYPE_STRING && !found->isArray())
+    if (found != nullptr && found->getType() == CIMTYPE_STRING && !found->isArray()) {
         found->get(result);
+    }
     return utf8(result);
 }
 

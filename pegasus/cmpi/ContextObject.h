@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_CONTEXTOBJECT_H
-#define PEGASUS_CMPI_CONTEXTOBJECT_H
+#pragma once
 
 #include "pegasus/cmpi/NamedValues.h"
 
@@ -32,5 +31,3 @@ class ContextObject final : public Owned, public CMPIContext
 extern const CMPIContextFT kContextTable;
 
 } // namespace Pegasus::cmpi
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_DATETIMEOBJECT_H
-#define PEGASUS_CMPI_DATETIMEOBJECT_H
+#pragma once
 
 #include "pegasus/cmpi/Slot.h"
 
@@ -30,5 +29,3 @@ CIMDateTime dateTimeFromBinary(CMPIUint64 microseconds, bool isInterval);
 CIMDateTime dateTimeFromText(const char* text);
 
 } // namespace Pegasus::cmpi
-
-#endif

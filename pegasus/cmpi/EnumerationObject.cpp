@@ -7,8 +7,9 @@ namespace {
 
 CIMObjectPath placed(CIMObjectPath path, const CIMName& className, const CIMNamespaceName& nameSpace)
 {
-    if (path.getClassName().isNull())
+    if (path.getClassName().isNull()) {
         path.setClassName(className);
+    }
     path.setNameSpace(nameSpace);
     return path;
 }
@@ -56,8 +57,9 @@ EnumerationObject::EnumerationObject(Broker& owner, const Array<CIMObjectPath>& 
 {
     hdl = this;
     fElements.reserve(paths.size());
-    for (Uint32 i = 0; i < paths.size(); ++i)
+    for (Uint32 i = 0; i < paths.size(); ++i) {
         fElements.emplace_back(placed(paths[i], CIMName(), nameSpace));
+    }
 }
 
 EnumerationObject::EnumerationObject(const EnumerationObject& other)
@@ -69,8 +71,9 @@ EnumerationObject::EnumerationObject(const EnumerationObject& other)
 
 CMPIData EnumerationObject::next()
 {
-    if (!hasNext())
+    if (!hasNext()) {
         throw SlotError{CMPI_RC_NO_MORE_ELEMENTS, {}};
+    }
     return encodeValue(fBroker, fElements[fNext++]);
 }
 

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_ENUMERATIONOBJECT_H
-#define PEGASUS_CMPI_ENUMERATIONOBJECT_H
+#pragma once
 
 #include "pegasus/cmpi/ValueCodec.h"
 
@@ -36,5 +35,3 @@ class EnumerationObject final : public Owned, public CMPIEnumeration
 extern const CMPIEnumerationFT kEnumerationTable;
 
 } // namespace Pegasus::cmpi
-
-#endif

@@ -9,8 +9,9 @@ thread_local Frame* tCurrent = nullptr;
 
 void Owned::unlink()
 {
-    if (fNext == nullptr)
+    if (fNext == nullptr) {
         return;
+    }
     fPrevious->fNext = fNext;
     fNext->fPrevious = fPrevious;
     fPrevious = fNext = nullptr;
@@ -25,11 +26,13 @@ Frame::Frame() : fOuter(tCurrent)
 Frame::~Frame()
 {
     const bool wasOpen = isOpen(this); // a later frame may have been closed by an earlier one
-    for (; wasOpen && tCurrent != this; tCurrent = tCurrent->fOuter)
+    for (; wasOpen && tCurrent != this; tCurrent = tCurrent->fOuter) {
         tCurrent->drain();
+    }
     drain();
-    if (wasOpen)
+    if (wasOpen) {
         tCurrent = fOuter;
+    }
 }
 
 Frame& Frame::current()
@@ -51,16 +54,19 @@ void Frame::adopt(Owned& object)
 
 bool Frame::isOpen(const Frame* frame)
 {
-    for (const Frame* open = tCurrent; open != nullptr; open = open->fOuter)
-        if (open == frame)
+    for (const Frame* open = tCurrent; open != nullptr; open = open->fOuter) {
+        if (open == frame) {
             return true;
+        }
+    }
     return false;
 }
 
 void Frame::drain()
 {
-    while (fObjects.fNext != &fObjects)
+    while (fObjects.fNext != &fObjects) {
         delete fObjects.fNext;
+    }
 }
 
 } // namespace Pegasus::cmpi

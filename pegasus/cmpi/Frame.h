@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_FRAME_H
-#define PEGASUS_CMPI_FRAME_H
+#pragma once
 
 #include <utility>
 
@@ -62,5 +61,3 @@ class Frame
 };
 
 } // namespace Pegasus::cmpi
-
-#endif

@@ -1,9 +1,8 @@
-#ifndef PEGASUS_CMPI_GUARDED_H
-#define PEGASUS_CMPI_GUARDED_H
-
-#include <cxxabi.h>
+#pragma once
 
 #include <exception>
+
+#include <cxxabi.h>
 
 namespace Pegasus::cmpi {
 
@@ -24,5 +23,3 @@ template <class Body, class Fail> auto guarded(Body&& body, Fail&& fail) -> decl
 }
 
 } // namespace Pegasus::cmpi
-
-#endif

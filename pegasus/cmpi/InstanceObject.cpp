@@ -18,15 +18,17 @@ CIMObjectPath placed(const CIMInstance& instance, const CIMNamespaceName& nameSp
 {
     CIMObjectPath path = instance.getPath();
     path.setClassName(instance.getClassName());
-    if (!nameSpace.isNull())
+    if (!nameSpace.isNull()) {
         path.setNameSpace(nameSpace);
+    }
     return path;
 }
 
 bool accepts(const PropertySchema& property, const CIMValue& value)
 {
-    if (property.isArray != value.isArray())
+    if (property.isArray != value.isArray()) {
         return false;
+    }
     const CIMType type = value.getType();
     return type == property.type ||
            (property.isEmbedded && (type == CIMTYPE_INSTANCE || type == CIMTYPE_OBJECT || type == CIMTYPE_STRING));
@@ -35,8 +37,9 @@ bool accepts(const PropertySchema& property, const CIMValue& value)
 // CMPI has one type for embedded objects of either kind; the class tells which one its property is.
 CIMValue asDeclared(const PropertySchema& property, const CIMValue& value)
 {
-    if (!property.isEmbeddedObject || value.getType() != CIMTYPE_INSTANCE || value.isNull())
+    if (!property.isEmbeddedObject || value.getType() != CIMTYPE_INSTANCE || value.isNull()) {
         return value;
+    }
     if (!value.isArray()) {
         CIMInstance instance;
         value.get(instance);
@@ -45,8 +48,9 @@ CIMValue asDeclared(const PropertySchema& property, const CIMValue& value)
     Array<CIMInstance> instances;
     value.get(instances);
     Array<CIMObject> objects;
-    for (Uint32 i = 0; i < instances.size(); ++i)
+    for (Uint32 i = 0; i < instances.size(); ++i) {
         objects.append(CIMObject(instances[i]));
+    }
     return CIMValue(objects);
 }
 
@@ -62,8 +66,9 @@ InstanceObject::InstanceObject(Broker& owner, const PathState& path)
     : CMPIInstance{nullptr, &kInstanceTable}, broker(owner), fPath(path)
 {
     hdl = this;
-    if (fPath.schema != nullptr)
+    if (fPath.schema != nullptr) {
         fPlaces.assign(fPath.schema->properties().size(), 0);
+    }
     takeKeys();
 }
 
@@ -84,10 +89,11 @@ void InstanceObject::takeKeys()
 {
     for (const NamedValue& key : fPath.keys) {
         const std::size_t at = fPath.schema ? fPath.schema->findKey(key.name) : ClassSchema::kNotFound;
-        if (at != ClassSchema::kNotFound)
+        if (at != ClassSchema::kNotFound) {
             store(at, convertKey(key.value, fPath.schema->properties()[at].type));
-        else if (fPath.schema == nullptr)
+        } else if (fPath.schema == nullptr) {
             storeExtra(key.name, key.value);
+        }
     }
 }
 
@@ -100,8 +106,9 @@ void InstanceObject::takeProperties(const CIMInstance& instance)
             continue;
         }
         const std::size_t at = fPath.schema->find(utf8(property.getName()));
-        if (at != ClassSchema::kNotFound && accepts(fPath.schema->properties()[at], property.getValue()))
+        if (at != ClassSchema::kNotFound && accepts(fPath.schema->properties()[at], property.getValue())) {
             store(at, property.getValue());
+        }
     }
 }
 
@@ -117,11 +124,12 @@ void InstanceObject::store(std::size_t index, CIMValue value)
 
 void InstanceObject::storeExtra(const CIMName& name, CIMValue value)
 {
-    for (NamedValue& held : fExtra)
+    for (NamedValue& held : fExtra) {
         if (held.name.equal(name)) {
             held.value = std::move(value);
             return;
         }
+    }
     fExtra.push_back({name, std::move(value)});
 }
 
@@ -139,8 +147,9 @@ CMPIData InstanceObject::encode(std::size_t index) const
 {
     const CIMValue& value = fPath.schema ? valueAt(index) : fExtra[index].value;
     CMPIData data = encodeValue(broker, value);
-    if (fPath.schema != nullptr && fPath.schema->properties()[index].isKey)
+    if (fPath.schema != nullptr && fPath.schema->properties()[index].isKey) {
         data.state = static_cast<CMPIValueState>(data.state | CMPI_keyValue);
+    }
     return data;
 }
 
@@ -149,21 +158,26 @@ CMPIData InstanceObject::property(const char* name) const
     requireText(name);
     if (fPath.schema != nullptr) {
         const std::size_t at = fPath.schema->find(name);
-        if (at != ClassSchema::kNotFound)
+        if (at != ClassSchema::kNotFound) {
             return encode(at);
+        }
     }
-    for (std::size_t i = 0; i < fExtra.size(); ++i)
-        if (sameName(utf8(fExtra[i].name), name))
+    for (std::size_t i = 0; i < fExtra.size(); ++i) {
+        if (sameName(utf8(fExtra[i].name), name)) {
             return encode(i);
+        }
+    }
     throw SlotError{CMPI_RC_ERR_NO_SUCH_PROPERTY, {}};
 }
 
 CMPIData InstanceObject::propertyAt(CMPICount index, CMPIString** name) const
 {
-    if (index >= propertyCount())
+    if (index >= propertyCount()) {
         throw SlotError{CMPI_RC_ERR_NO_SUCH_PROPERTY, {}};
-    if (name != nullptr)
+    }
+    if (name != nullptr) {
         *name = makeName(fPath.schema ? fPath.schema->properties()[index].name : fExtra[index].name);
+    }
     return encode(index);
 }
 
@@ -181,30 +195,34 @@ void InstanceObject::setProperty(const char* name, const CMPIValue* value, CMPIT
     }
     const PropertySchema& declared = fPath.schema->properties()[at];
     CIMValue decoded = type == CMPI_null ? CIMValue(declared.type, declared.isArray) : decodeValue(value, type);
-    if (!accepts(declared, decoded))
+    if (!accepts(declared, decoded)) {
         throw SlotError{CMPI_RC_ERR_INVALID_DATA_TYPE,
                         "property " + declared.text + " of " + fPath.schema->text() + " has another type"};
+    }
     store(at, std::move(decoded));
 }
 
 PathState InstanceObject::completePath() const
 {
     PathState path = fPath;
-    if (path.schema == nullptr)
+    if (path.schema == nullptr) {
         return path;
+    }
     for (const std::size_t key : path.schema->keys()) {
         const CIMValue& value = valueAt(key);
         const CIMName& name = path.schema->properties()[key].name;
-        if (!value.isNull() && path.findKey(name) == nullptr)
+        if (!value.isNull() && path.findKey(name) == nullptr) {
             path.keys.push_back({name, value});
+        }
     }
     return path;
 }
 
 void InstanceObject::setPath(const PathState& path)
 {
-    if (!path.className.equal(fPath.className))
+    if (!path.className.equal(fPath.className)) {
         throw SlotError{CMPI_RC_ERR_FAILED, "Incompatible ObjectPath"};
+    }
     fPath.nameSpace = path.nameSpace;
     fPath.host = path.host;
     fPath.keys = path.keys;
@@ -219,13 +237,17 @@ CIMInstance InstanceObject::filtered(const PropertyFilter& filter) const
     properties.reserveCapacity(static_cast<Uint32>(fSet.size() + fExtra.size()));
     if (fPath.schema != nullptr) {
         const auto& declared = fPath.schema->properties();
-        for (std::size_t i = 0; i < declared.size(); ++i)
-            if ((fPlaces[i] != 0 || !declared[i].initial.isNull()) && filter.passes(*fPath.schema, i))
+        for (std::size_t i = 0; i < declared.size(); ++i) {
+            if ((fPlaces[i] != 0 || !declared[i].initial.isNull()) && filter.passes(*fPath.schema, i)) {
                 properties.append(propertyOf(declared[i], valueAt(i)));
+            }
+        }
     }
-    for (const NamedValue& extra : fExtra)
-        if (filter.passes(extra.name))
+    for (const NamedValue& extra : fExtra) {
+        if (filter.passes(extra.name)) {
             properties.append(CIMProperty(extra.name, extra.value));
+        }
+    }
     result.setPath(completePath().withoutNameSpace());
     return result;
 }

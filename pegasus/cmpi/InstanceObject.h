@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_INSTANCEOBJECT_H
-#define PEGASUS_CMPI_INSTANCEOBJECT_H
+#pragma once
 
 #include "pegasus/cmpi/ObjectPathObject.h"
 
@@ -62,5 +61,3 @@ class InstanceObject final : public Owned, public CMPIInstance
 extern const CMPIInstanceFT kInstanceTable;
 
 } // namespace Pegasus::cmpi
-
-#endif

@@ -101,10 +101,12 @@ bool readInteger(const CIMValue& value, WideInteger& wide)
 CIMValue valueOfText(const String& text, CIMType type)
 {
     try {
-        if (type == CIMTYPE_DATETIME)
+        if (type == CIMTYPE_DATETIME) {
             return CIMValue(CIMDateTime(text));
-        if (type == CIMTYPE_REFERENCE)
+        }
+        if (type == CIMTYPE_REFERENCE) {
             return CIMValue(CIMObjectPath(text));
+        }
     } catch (const Exception&) {
         // it does not: the null below says so
     }
@@ -115,13 +117,16 @@ CIMValue valueOfText(const String& text, CIMType type)
 
 CIMValue convertKey(const CIMValue& value, CIMType type)
 {
-    if (value.isNull() || value.isArray())
+    if (value.isNull() || value.isArray()) {
         return {type, false};
-    if (value.getType() == type)
+    }
+    if (value.getType() == type) {
         return value;
+    }
     WideInteger wide{};
-    if (readInteger(value, wide))
+    if (readInteger(value, wide)) {
         return integerOf(wide, type);
+    }
     if (value.getType() == CIMTYPE_STRING) {
         String text;
         value.get(text);

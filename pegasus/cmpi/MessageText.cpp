@@ -50,16 +50,18 @@ std::string nextArgument(va_list args)
 std::string formatMessage(const char* text, CMPICount count, va_list args)
 {
     std::vector<std::string> arguments;
-    for (CMPICount i = 0; i < count && i < kMaxArguments; ++i)
+    for (CMPICount i = 0; i < count && i < kMaxArguments; ++i) {
         arguments.push_back(nextArgument(args));
+    }
 
     std::string result;
     for (const char* at = text; at != nullptr && *at != '\0'; ++at) {
         const bool isPlace = at[0] == '$' && at[1] >= '0' && at[1] <= '9';
-        if (isPlace && static_cast<std::size_t>(at[1] - '0') < arguments.size())
+        if (isPlace && static_cast<std::size_t>(at[1] - '0') < arguments.size()) {
             result += arguments[static_cast<std::size_t>(*++at - '0')];
-        else
+        } else {
             result += *at;
+        }
     }
     return result;
 }

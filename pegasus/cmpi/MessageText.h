@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_MESSAGETEXT_H
-#define PEGASUS_CMPI_MESSAGETEXT_H
+#pragma once
 
 #include "pegasus/cmpi/include/cmpi/cmpi.h"
 
@@ -14,5 +13,3 @@ namespace Pegasus::cmpi {
 std::string formatMessage(const char* text, CMPICount count, va_list args);
 
 } // namespace Pegasus::cmpi
-
-#endif

@@ -9,36 +9,42 @@ void NamedValues::set(const char* name, const CMPIValue* value, CMPIType type)
 {
     const CIMName parsed = requireName(name);
     CIMValue decoded = decodeValue(value, type);
-    for (NamedValue& held : fValues)
+    for (NamedValue& held : fValues) {
         if (held.name.equal(parsed)) {
             held.value = decoded;
             return;
         }
+    }
     append(parsed, decoded);
 }
 
 const CIMValue* NamedValues::find(std::string_view name) const
 {
-    for (const NamedValue& held : fValues)
-        if (sameName(utf8(held.name), name))
+    for (const NamedValue& held : fValues) {
+        if (sameName(utf8(held.name), name)) {
             return &held.value;
+        }
+    }
     return nullptr;
 }
 
 CMPIData NamedValues::get(Broker& broker, const char* name) const
 {
     const CIMValue* found = find(requireText(name));
-    if (found == nullptr)
+    if (found == nullptr) {
         throw SlotError{CMPI_RC_ERR_NO_SUCH_PROPERTY, {}};
+    }
     return encodeValue(broker, *found);
 }
 
 CMPIData NamedValues::getAt(Broker& broker, CMPICount index, CMPIString** name) const
 {
-    if (index >= fValues.size())
+    if (index >= fValues.size()) {
         throw SlotError{CMPI_RC_ERR_NO_SUCH_PROPERTY, {}};
-    if (name != nullptr)
+    }
+    if (name != nullptr) {
         *name = makeName(fValues[index].name);
+    }
     return encodeValue(broker, fValues[index].value);
 }
 

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_NAMEDVALUES_H
-#define PEGASUS_CMPI_NAMEDVALUES_H
+#pragma once
 
 #include "pegasus/cmpi/ValueCodec.h"
 
@@ -36,5 +35,3 @@ class NamedValues
 CMPIString* makeName(const CIMName& name);
 
 } // namespace Pegasus::cmpi
-
-#endif

@@ -75,8 +75,9 @@ CMPIData getKey(const CMPIObjectPath* self, const char* name, CMPIStatus* rc)
     return answer(rc, kNothing, [&] {
         const ObjectPathObject& path = objectOf<ObjectPathObject>(self);
         const NamedValue* key = path.state.findKey(std::string_view(requireText(name)));
-        if (key == nullptr)
+        if (key == nullptr) {
             throw SlotError{CMPI_RC_ERR_NOT_FOUND, {}};
+        }
         return encodeKey(path.broker, key->value);
     });
 }
@@ -85,10 +86,12 @@ CMPIData getKeyAt(const CMPIObjectPath* self, CMPICount index, CMPIString** name
 {
     return answer(rc, kNothing, [&] {
         const ObjectPathObject& path = objectOf<ObjectPathObject>(self);
-        if (index >= path.state.keys.size())
+        if (index >= path.state.keys.size()) {
             throw SlotError{CMPI_RC_ERR_NO_SUCH_PROPERTY, {}};
-        if (name != nullptr)
+        }
+        if (name != nullptr) {
             *name = makeName(path.state.keys[index].name);
+        }
         return encodeKey(path.broker, path.state.keys[index].value);
     });
 }

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_OBJECTPATHOBJECT_H
-#define PEGASUS_CMPI_OBJECTPATHOBJECT_H
+#pragma once
 
 #include "pegasus/cmpi/ClassSchema.h"
 #include "pegasus/cmpi/ValueCodec.h"
@@ -58,5 +57,3 @@ class ObjectPathObject final : public Owned, public CMPIObjectPath
 extern const CMPIObjectPathFT kObjectPathTable;
 
 } // namespace Pegasus::cmpi
-
-#endif

@@ -13,8 +13,9 @@ namespace {
 
 CIMNamespaceName nameSpaceOf(const char* text)
 {
-    if (text == nullptr || *text == '\0')
+    if (text == nullptr || *text == '\0') {
         return {};
+    }
     try {
         return {fromUtf8(text)};
     } catch (const Exception& error) {
@@ -36,8 +37,9 @@ CIMValue numberOf(const String& text)
     const bool isHex = digits.find_first_of("xX") != std::string::npos;
     const Uint64 bits = digits[0] == '-' ? static_cast<Uint64>(std::strtoll(begin, &end, 10))
                                          : std::strtoull(begin, &end, isHex ? 16 : 10);
-    if (errno == 0 && end != begin && *end == '\0')
+    if (errno == 0 && end != begin && *end == '\0') {
         return digits[0] == '-' ? CIMValue(static_cast<Sint64>(bits)) : CIMValue(bits);
+    }
     const double real = std::strtod(begin, &end);
     return end != begin && *end == '\0' ? CIMValue(real) : CIMValue(text);
 }
@@ -62,8 +64,9 @@ CIMValue typedKey(const ClassSchema* schema, const CIMKeyBinding& binding)
 {
     CIMValue value = valueOfBinding(binding);
     const std::size_t at = schema ? schema->find(utf8(binding.getName())) : ClassSchema::kNotFound;
-    if (at == ClassSchema::kNotFound)
+    if (at == ClassSchema::kNotFound) {
         return value;
+    }
     const CIMValue converted = convertKey(value, schema->properties()[at].type);
     return converted.isNull() ? value : converted;
 }
@@ -88,8 +91,9 @@ PathState::PathState(Broker& broker, const CIMObjectPath& path)
     lookUp(broker);
     const Array<CIMKeyBinding>& bindings = path.getKeyBindings();
     keys.reserve(bindings.size());
-    for (Uint32 i = 0; i < bindings.size(); ++i)
+    for (Uint32 i = 0; i < bindings.size(); ++i) {
         keys.push_back({bindings[i].getName(), typedKey(schema, bindings[i])});
+    }
 }
 
 void PathState::lookUp(Broker& broker)
@@ -100,13 +104,15 @@ void PathState::lookUp(Broker& broker)
 
 void PathState::addKey(const char* name, const CMPIValue* value, CMPIType type)
 {
-    if (!isKeyType(type))
+    if (!isKeyType(type)) {
         throw SlotError{CMPI_RC_ERR_INVALID_DATA_TYPE, {}};
+    }
     CIMName keyName;
     if (schema != nullptr) {
         const std::size_t at = schema->find(requireText(name));
-        if (at == ClassSchema::kNotFound || !schema->properties()[at].isKey)
+        if (at == ClassSchema::kNotFound || !schema->properties()[at].isKey) {
             throw SlotError{CMPI_RC_ERR_INVALID_PARAMETER, std::string(name) + " is no key of " + schema->text()};
+        }
         keyName = schema->properties()[at].name;
     } else {
         keyName = requireName(name);
@@ -114,25 +120,31 @@ void PathState::addKey(const char* name, const CMPIValue* value, CMPIType type)
     CIMValue decoded = decodeValue(value, type);
     const auto held =
         std::find_if(keys.begin(), keys.end(), [&](const NamedValue& key) { return key.name.equal(keyName); });
-    if (held != keys.end())
+    if (held != keys.end()) {
         keys.erase(held);
-    if (!decoded.isNull())
+    }
+    if (!decoded.isNull()) {
         keys.push_back({std::move(keyName), std::move(decoded)});
+    }
 }
 
 const NamedValue* PathState::findKey(std::string_view name) const
 {
-    for (const NamedValue& key : keys)
-        if (sameName(utf8(key.name), name))
+    for (const NamedValue& key : keys) {
+        if (sameName(utf8(key.name), name)) {
             return &key;
+        }
+    }
     return nullptr;
 }
 
 const NamedValue* PathState::findKey(const CIMName& name) const
 {
-    for (const NamedValue& key : keys)
-        if (key.name.equal(name))
+    for (const NamedValue& key : keys) {
+        if (key.name.equal(name)) {
             return &key;
+        }
+    }
     return nullptr;
 }
 
@@ -149,8 +161,9 @@ CIMObjectPath PathState::withoutNameSpace() const
 Array<CIMKeyBinding> PathState::bindings() const
 {
     Array<CIMKeyBinding> result;
-    for (const NamedValue& key : keys)
+    for (const NamedValue& key : keys) {
         result.append(CIMKeyBinding(key.name, key.value));
+    }
     return result;
 }
 

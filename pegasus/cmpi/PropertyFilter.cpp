@@ -8,14 +8,16 @@ namespace Pegasus::cmpi {
 
 PropertyFilter::PropertyFilter(const CIMPropertyList& list) : fAll(list.isNull())
 {
-    if (fAll)
+    if (fAll) {
         return;
+    }
     for (Uint32 i = 0; i < list.size(); ++i) {
         fList.push_back(list[i]);
         fTexts.push_back(utf8(list[i]));
     }
-    for (const std::string& text : fTexts)
+    for (const std::string& text : fTexts) {
         fNames.push_back(text.c_str());
+    }
     fNames.push_back(nullptr);
 }
 
@@ -26,12 +28,14 @@ bool PropertyFilter::passes(const CIMName& name) const
 
 bool PropertyFilter::passes(const ClassSchema& schema, std::size_t index) const
 {
-    if (fAll)
+    if (fAll) {
         return true;
+    }
     if (fSchema != &schema) {
         fPasses.clear();
-        for (const PropertySchema& property : schema.properties())
+        for (const PropertySchema& property : schema.properties()) {
             fPasses.push_back(passes(property.name));
+        }
         fSchema = &schema;
     }
     return fPasses[index];

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_PROPERTYFILTER_H
-#define PEGASUS_CMPI_PROPERTYFILTER_H
+#pragma once
 
 #include "pegasus/cmpi/ClassSchema.h"
 
@@ -36,5 +35,3 @@ class PropertyFilter
 };
 
 } // namespace Pegasus::cmpi
-
-#endif

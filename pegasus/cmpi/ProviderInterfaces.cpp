@@ -19,13 +19,15 @@ CIMException noInterface(const std::string& provider, const char* kind, CIMStatu
 
 template <class Interface> CMPIrc end(Interface*& mi, const CMPIContext& context, bool terminating)
 {
-    if (mi == nullptr)
+    if (mi == nullptr) {
         return CMPI_RC_OK;
+    }
     const CMPIStatus status = mi->ft->cleanup != nullptr ? mi->ft->cleanup(mi, &context, terminating ? 1 : 0)
                                                          : CMPIStatus{CMPI_RC_OK, nullptr};
     const bool mayStay = !terminating && (status.rc == CMPI_RC_DO_NOT_UNLOAD || status.rc == CMPI_RC_NEVER_UNLOAD);
-    if (mayStay)
+    if (mayStay) {
         return status.rc;
+    }
     mi = nullptr;
     return CMPI_RC_OK;
 }
@@ -47,8 +49,9 @@ ProviderInterfaces::Use::~Use()
 
 ProviderInterfaces::~ProviderInterfaces()
 {
-    for (auto& [name, provider] : fProviders)
+    for (auto& [name, provider] : fProviders) {
         cleanup(provider, true);
+    }
 }
 
 template <class Interface> Interface* ProviderInterfaces::make(const char* kind, const std::string& provider) const
@@ -68,11 +71,13 @@ Interface* ProviderInterfaces::obtain(Interface* Provider::*kept, const char* ki
         const std::lock_guard lock(fMakeMutex);
         return fProviders[provider].*kept;
     };
-    if (Interface* mi = madeBefore())
+    if (Interface* mi = madeBefore()) {
         return mi;
+    }
     const std::lock_guard factoryLock(fFactoryMutex);
-    if (Interface* mi = madeBefore())
+    if (Interface* mi = madeBefore()) {
         return mi;
+    }
     Interface* mi = make<Interface>(kind, provider);
     const std::lock_guard lock(fMakeMutex);
     fProviders[provider].*kept = mi;
@@ -82,16 +87,18 @@ Interface* ProviderInterfaces::obtain(Interface* Provider::*kept, const char* ki
 CMPIInstanceMI& ProviderInterfaces::instance(const std::string& provider)
 {
     CMPIInstanceMI* mi = obtain(&Provider::instance, "Instance", provider);
-    if (mi == nullptr)
+    if (mi == nullptr) {
         throw noInterface(provider, "instance", CIM_ERR_NOT_SUPPORTED);
+    }
     return *mi;
 }
 
 CMPIMethodMI& ProviderInterfaces::method(const std::string& provider)
 {
     CMPIMethodMI* mi = obtain(&Provider::method, "Method", provider);
-    if (mi == nullptr)
+    if (mi == nullptr) {
         throw noInterface(provider, "method", CIM_ERR_METHOD_NOT_AVAILABLE);
+    }
     return *mi;
 }
 
@@ -109,16 +116,19 @@ ProviderModule::Cleanup ProviderInterfaces::cleanupWhenIdle()
 {
     {
         const std::lock_guard lock(fUseMutex);
-        if (fUses != 0 || fIsCleaning)
+        if (fUses != 0 || fIsCleaning) {
             return ProviderModule::Cleanup::kBusy;
+        }
         fIsCleaning = true;
     }
     CMPIrc worst = CMPI_RC_OK;
     {
         const std::lock_guard lock(fMakeMutex);
-        if (!fNeverUnload)
-            for (auto& [name, provider] : fProviders)
+        if (!fNeverUnload) {
+            for (auto& [name, provider] : fProviders) {
                 worst = std::max(worst, cleanup(provider, false));
+            }
+        }
         fNeverUnload = fNeverUnload || worst == CMPI_RC_NEVER_UNLOAD;
         worst = fNeverUnload ? CMPI_RC_NEVER_UNLOAD : worst;
     }

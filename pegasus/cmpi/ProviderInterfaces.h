@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_PROVIDERINTERFACES_H
-#define PEGASUS_CMPI_PROVIDERINTERFACES_H
+#pragma once
 
 #include "pegasus/cmpi/ProviderModule.h"
 #include "pegasus/cmpi/include/cmpi/cmpi.h"
@@ -72,5 +71,3 @@ class ProviderInterfaces
 };
 
 } // namespace Pegasus::cmpi
-
-#endif

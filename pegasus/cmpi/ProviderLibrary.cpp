@@ -7,11 +7,11 @@
 
 #include <Pegasus/Common/Exception.h>
 
-#include <dlfcn.h>
-#include <unistd.h>
-
 #include <algorithm>
 #include <array>
+
+#include <dlfcn.h>
+#include <unistd.h>
 
 namespace Pegasus::cmpi {
 namespace {
@@ -35,8 +35,9 @@ const std::string kGeneric = "_Generic";
 ProviderLibrary::ProviderLibrary(const std::string& path)
     : fPath(path), fHandle(::dlopen(path.c_str(), RTLD_LAZY | RTLD_GLOBAL))
 {
-    if (fHandle != nullptr)
+    if (fHandle != nullptr) {
         return;
+    }
     const char* reason = ::dlerror();
     throw failure("ProviderLoadFailure: (" + path +
                   ") Cannot load library, error: " + (reason == nullptr ? "unknown" : reason));
@@ -60,12 +61,14 @@ void ProviderLibrary::requireProvider(const std::string& provider) const
     };
     const bool isSpecific = hasAny(provider);
     const bool isGeneric = hasAny(kGeneric);
-    if (isSpecific && isGeneric)
+    if (isSpecific && isGeneric) {
         throw failure("ProviderLoadFailure: (" + fPath + ") has both generic and " + provider +
                       " entry points: which ones are meant is not clear.");
-    if (!isSpecific && !isGeneric)
+    }
+    if (!isSpecific && !isGeneric) {
         throw failure("ProviderLoadFailure: (" + fPath + ") Provider is not a CMPI style provider. Cannot find " +
                       provider + "_Create<mi-type>MI symbol.");
+    }
 }
 
 void* ProviderLibrary::createAny(const std::string& kind, const std::string& provider, const CMPIBroker& broker,
@@ -76,11 +79,13 @@ void* ProviderLibrary::createAny(const std::string& kind, const std::string& pro
 
     std::string name = factoryOf(provider, kind);
     void* const specific = symbol(name);
-    if (specific == nullptr)
+    if (specific == nullptr) {
         name = factoryOf(kGeneric, kind);
+    }
     void* const generic = specific == nullptr ? symbol(name) : nullptr;
-    if (specific == nullptr && generic == nullptr)
+    if (specific == nullptr && generic == nullptr) {
         return nullptr;
+    }
     const auto fail = [&](const char* words) {
         throw failure("ProviderInitFailure: Error initializing " + fPath + ", provider " + provider + ", " + name +
                       ": " + words);
@@ -92,8 +97,9 @@ void* ProviderLibrary::createAny(const std::string& kind, const std::string& pro
     };
     void* const made = guarded(create, fail);
     const bool hasText = status.rc != CMPI_RC_OK && status.msg != nullptr && status.msg->hdl != nullptr;
-    if (made == nullptr || status.rc != CMPI_RC_OK)
+    if (made == nullptr || status.rc != CMPI_RC_OK) {
         fail(hasText ? static_cast<const char*>(status.msg->hdl) : "the factory gave no interface");
+    }
     return made;
 }
 
@@ -103,8 +109,9 @@ std::string findProviderLibrary(const std::vector<std::string>& directories, con
     const std::string file = "lib" + location + ".so";
     for (const std::string& directory : directories) {
         std::string path = directory + "/" + file;
-        if (::access(path.c_str(), F_OK) == 0)
+        if (::access(path.c_str(), F_OK) == 0) {
             return path;
+        }
     }
     throw failure("File \"" + file + "\" was not found for provider module \"" + moduleName + "\".");
 }

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_PROVIDERLIBRARY_H
-#define PEGASUS_CMPI_PROVIDERLIBRARY_H
+#pragma once
 
 #include "pegasus/cmpi/include/cmpi/cmpi.h"
 
@@ -44,5 +43,3 @@ class ProviderLibrary
 };
 
 } // namespace Pegasus::cmpi
-
-#endif

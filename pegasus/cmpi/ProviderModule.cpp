@@ -28,8 +28,9 @@ CIMStatusCode statusCodeOf(CMPIrc code)
 // Requires: the frame of the call that gave the status is still open, since the message lives in it.
 void throwUnlessOk(const CMPIStatus& status)
 {
-    if (status.rc == CMPI_RC_OK)
+    if (status.rc == CMPI_RC_OK) {
         return;
+    }
     const bool hasText = status.msg != nullptr && status.msg->hdl != nullptr;
     throw CIMException(statusCodeOf(status.rc),
                        hasText ? fromUtf8(static_cast<const char*>(status.msg->hdl)) : String::EMPTY);
@@ -132,8 +133,9 @@ void ProviderModule::enumerateInstances(const ProviderRequest& request, const CI
     ResultObject result(filter, sink, nullptr, nullptr);
     const Call call(fImpl->broker, fImpl->interfaces, request, classPath(className), result);
     CMPIInstanceMI& mi = fImpl->interfaces.instance(request.provider);
-    if (mi.ft->enumerateInstances == nullptr)
+    if (mi.ft->enumerateInstances == nullptr) {
         throw notServed(request, CIM_ERR_NOT_SUPPORTED, "enumerateInstances");
+    }
     call.run(mi.ft->enumerateInstances, &mi, call.context(), call.result(), call.path(), filter.names());
 }
 
@@ -144,8 +146,9 @@ void ProviderModule::enumerateInstanceNames(const ProviderRequest& request, cons
     ResultObject result(filter, nullptr, sink, nullptr);
     const Call call(fImpl->broker, fImpl->interfaces, request, classPath(className), result);
     CMPIInstanceMI& mi = fImpl->interfaces.instance(request.provider);
-    if (mi.ft->enumerateInstanceNames == nullptr)
+    if (mi.ft->enumerateInstanceNames == nullptr) {
         throw notServed(request, CIM_ERR_NOT_SUPPORTED, "enumerateInstanceNames");
+    }
     call.run(mi.ft->enumerateInstanceNames, &mi, call.context(), call.result(), call.path());
 }
 
@@ -154,19 +157,22 @@ CIMInstance ProviderModule::getInstance(const ProviderRequest& request, const CI
 {
     std::optional<CIMInstance> found;
     const auto takeOne = [&found](const CIMInstance& instance) {
-        if (found)
+        if (found) {
             throw SlotError{CMPI_RC_ERR_FAILED, "getInstance returns one instance"};
+        }
         found = instance;
     };
     PropertyFilter filter(properties);
     ResultObject result(filter, takeOne, nullptr, nullptr);
     const Call call(fImpl->broker, fImpl->interfaces, request, path, result);
     CMPIInstanceMI& mi = fImpl->interfaces.instance(request.provider);
-    if (mi.ft->getInstance == nullptr)
+    if (mi.ft->getInstance == nullptr) {
         throw notServed(request, CIM_ERR_NOT_SUPPORTED, "getInstance");
+    }
     call.run(mi.ft->getInstance, &mi, call.context(), call.result(), call.path(), filter.names());
-    if (!found)
+    if (!found) {
         throw CIMException(CIM_ERR_NOT_FOUND, path.toString());
+    }
     return *found;
 }
 
@@ -187,13 +193,15 @@ CIMValue ProviderModule::invokeMethod(const ProviderRequest& request, const CIMO
     asArgument(input);
     asArgument(output);
     CMPIMethodMI& mi = fImpl->interfaces.method(request.provider);
-    if (mi.ft->invokeMethod == nullptr)
+    if (mi.ft->invokeMethod == nullptr) {
         throw notServed(request, CIM_ERR_METHOD_NOT_AVAILABLE, "invokeMethod");
+    }
     const std::string name = utf8(method);
     call.run(mi.ft->invokeMethod, &mi, call.context(), call.result(), call.path(), name.c_str(),
              static_cast<const CMPIArgs*>(&input), static_cast<CMPIArgs*>(&output));
-    if (!hasReturned || returned.isNull())
+    if (!hasReturned || returned.isNull()) {
         throw CIMException(CIM_ERR_FAILED, String("The object is not initialized."));
+    }
     out = output.parameters();
     return returned;
 }

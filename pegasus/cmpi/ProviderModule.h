@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_PROVIDERMODULE_H
-#define PEGASUS_CMPI_PROVIDERMODULE_H
+#pragma once
 
 #include "pegasus/cmpi/BrokerServices.h"
 
@@ -88,5 +87,3 @@ std::string findProviderLibrary(const std::vector<std::string>& directories, con
                                 const std::string& moduleName);
 
 } // namespace Pegasus::cmpi
-
-#endif

@@ -57,10 +57,12 @@ ResultObject::ResultObject(const PropertyFilter& filter, InstanceSink instances,
 
 template <class Sink, class Make> void ResultObject::deliver(const Sink& sink, Make&& make)
 {
-    if (!sink)
+    if (!sink) {
         throw SlotError{CMPI_RC_ERR_NOT_SUPPORTED, "the operation does not return this kind of result"};
-    if (fDone || fFailure)
+    }
+    if (fDone || fFailure) {
         throw SlotError{CMPI_RC_ERR_FAILED, "the result is complete"};
+    }
     const auto element = make();
     try {
         sink(element);
@@ -85,16 +87,18 @@ void ResultObject::returnPath(const CMPIObjectPath* path)
 void ResultObject::returnData(const CMPIValue* value, CMPIType type)
 {
     deliver(fData, [&] {
-        if (value == nullptr)
+        if (value == nullptr) {
             throw SlotError{CMPI_RC_ERR_INVALID_PARAMETER, {}};
+        }
         return decodeValue(value, type);
     });
 }
 
 void ResultObject::rethrow() const
 {
-    if (fFailure)
+    if (fFailure) {
         std::rethrow_exception(fFailure);
+    }
 }
 
 } // namespace Pegasus::cmpi

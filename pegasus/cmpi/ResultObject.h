@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_RESULTOBJECT_H
-#define PEGASUS_CMPI_RESULTOBJECT_H
+#pragma once
 
 #include "pegasus/cmpi/PropertyFilter.h"
 #include "pegasus/cmpi/Slot.h"
@@ -51,5 +50,3 @@ class ResultObject final : public Owned, public CMPIResult
 extern const CMPIResultFT kResultTable;
 
 } // namespace Pegasus::cmpi
-
-#endif

@@ -13,8 +13,9 @@ namespace Pegasus::cmpi {
 CMPIStatus makeStatus(CMPIrc code, const std::string& text) noexcept
 {
     try {
-        if (!text.empty())
+        if (!text.empty()) {
             return {code, Frame::current().make<StringObject>(text)};
+        }
     } catch (const std::bad_alloc&) {
         // the code alone has to do
     }
@@ -40,8 +41,9 @@ CMPIStatus currentFailure() noexcept
 
 const char* requireText(const char* text)
 {
-    if (text == nullptr)
+    if (text == nullptr) {
         throw SlotError{CMPI_RC_ERR_INVALID_PARAMETER, {}};
+    }
     return text;
 }
 

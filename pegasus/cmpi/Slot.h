@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_SLOT_H
-#define PEGASUS_CMPI_SLOT_H
+#pragma once
 
 #include "pegasus/cmpi/Frame.h"
 #include "pegasus/cmpi/include/cmpi/cmpi.h"
@@ -50,8 +49,9 @@ template <class Result, class Body> Result answer(CMPIStatus* rc, Result otherwi
 {
     CMPIStatus status{CMPI_RC_OK, nullptr};
     const auto leave = [&](const Result& result) {
-        if (rc != nullptr)
+        if (rc != nullptr) {
             *rc = status;
+        }
         return result;
     };
     try {
@@ -66,8 +66,9 @@ template <class Result, class Body> Result answer(CMPIStatus* rc, Result otherwi
 // Throws: CMPI_RC_ERR_INVALID_HANDLE for a null pointer or handle.
 template <class Object, class Face> Object& objectOf(const Face* face)
 {
-    if (face == nullptr || face->hdl == nullptr)
+    if (face == nullptr || face->hdl == nullptr) {
         throw SlotError{CMPI_RC_ERR_INVALID_HANDLE, {}};
+    }
     return static_cast<Object&>(const_cast<Face&>(*face));
 }
 
@@ -79,8 +80,9 @@ template <class Object, class Face> CMPIStatus releaseObject(Face* face) noexcep
 {
     return perform([&] {
         Object& object = objectOf<Object>(face);
-        if (object.lifetime != Lifetime::kArgument)
+        if (object.lifetime != Lifetime::kArgument) {
             delete &object;
+        }
     });
 }
 
@@ -99,5 +101,3 @@ template <class Object, class Face> Face* cloneObject(const Face* face, CMPIStat
 constexpr CMPIData kNothing{CMPI_null, CMPI_nullValue | CMPI_notFound, {}};
 
 } // namespace Pegasus::cmpi
-
-#endif

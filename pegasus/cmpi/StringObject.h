@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_STRINGOBJECT_H
-#define PEGASUS_CMPI_STRINGOBJECT_H
+#pragma once
 
 #include "pegasus/cmpi/Slot.h"
 
@@ -25,5 +24,3 @@ class StringObject final : public Owned, public CMPIString
 extern const CMPIStringFT kStringTable;
 
 } // namespace Pegasus::cmpi
-
-#endif

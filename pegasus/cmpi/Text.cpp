@@ -14,14 +14,18 @@ namespace {
 std::size_t sequenceLength(const unsigned char* at, const unsigned char* end)
 {
     const unsigned char lead = *at;
-    if (lead < 0x80)
+    if (lead < 0x80) {
         return 1;
+    }
     const std::size_t length = lead >= 0xF0 && lead <= 0xF4 ? 4 : lead >= 0xE0 ? 3 : lead >= 0xC2 ? 2 : 0;
-    if (length == 0 || lead > 0xF4 || static_cast<std::size_t>(end - at) < length)
+    if (length == 0 || lead > 0xF4 || static_cast<std::size_t>(end - at) < length) {
         return 0;
-    for (std::size_t i = 1; i < length; ++i)
-        if ((at[i] & 0xC0) != 0x80)
+    }
+    for (std::size_t i = 1; i < length; ++i) {
+        if ((at[i] & 0xC0) != 0x80) {
             return 0;
+        }
+    }
     const bool overlong = (lead == 0xE0 && at[1] < 0xA0) || (lead == 0xF0 && at[1] < 0x90);
     const bool outside = (lead == 0xED && at[1] > 0x9F) || (lead == 0xF4 && at[1] > 0x8F);
     return overlong || outside ? 0 : length;
@@ -34,10 +38,11 @@ std::string repaired(const char* text)
     std::string result;
     while (at != end) {
         const std::size_t length = sequenceLength(at, end);
-        if (length == 0)
+        if (length == 0) {
             result += "\xEF\xBF\xBD";
-        else
+        } else {
             result.append(reinterpret_cast<const char*>(at), length);
+        }
         at += std::max<std::size_t>(length, 1);
     }
     return result;

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_TEXT_H
-#define PEGASUS_CMPI_TEXT_H
+#pragma once
 
 #include <Pegasus/Common/CIMName.h>
 #include <Pegasus/Common/String.h>
@@ -26,5 +25,3 @@ bool sameName(std::string_view left, std::string_view right);
 CIMName requireName(const char* text);
 
 } // namespace Pegasus::cmpi
-
-#endif

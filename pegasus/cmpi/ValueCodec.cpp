@@ -52,8 +52,9 @@ template <class Object, class Face> CIMValue decodeObject(const CMPIValue* value
 
 CIMValue decodeString(const CMPIString* string)
 {
-    if (string == nullptr || string->hdl == nullptr)
+    if (string == nullptr || string->hdl == nullptr) {
         return {CIMTYPE_STRING, false};
+    }
     return fromUtf8(static_cast<const char*>(string->hdl));
 }
 
@@ -64,11 +65,13 @@ CIMValue decodeText(const char* text)
 
 CIMValue decodeArray(const CMPIArray* array, CMPIType type)
 {
-    if (array == nullptr)
+    if (array == nullptr) {
         return {cimTypeOf(type), true};
+    }
     const ArrayObject& object = objectOf<ArrayObject>(array);
-    if (cimTypeOf(object.elementType()) != cimTypeOf(type))
+    if (cimTypeOf(object.elementType()) != cimTypeOf(type)) {
         throw SlotError{CMPI_RC_ERR_INVALID_DATA_TYPE, {}};
+    }
     return arrayOf(cimTypeOf(type), object.elements());
 }
 
@@ -127,8 +130,9 @@ template <class T> CIMValue typedArray(const std::vector<CIMValue>& elements)
 {
     Array<T> array;
     array.reserveCapacity(static_cast<Uint32>(elements.size()));
-    for (const CIMValue& element : elements)
+    for (const CIMValue& element : elements) {
         array.append(element.isNull() ? T{} : valueOf<T>(element));
+    }
     return CIMValue(array);
 }
 
@@ -138,8 +142,9 @@ template <class T> void appendElements(const CIMValue& array, std::vector<CIMVal
     array.get(values);
     const T* const data = values.getData();
     elements.reserve(values.size());
-    for (Uint32 i = 0; i < values.size(); ++i)
+    for (Uint32 i = 0; i < values.size(); ++i) {
         elements.emplace_back(data[i]);
+    }
 }
 
 // Calls the template with the C++ type of each CIM type that an array may have.
@@ -213,10 +218,11 @@ CMPIData encodeScalar(Broker& broker, const CIMValue& value)
     default:
         return visitType(value.getType(), [&](auto sample) -> CMPIData {
             using T = decltype(sample);
-            if constexpr (std::is_arithmetic_v<T>)
+            if constexpr (std::is_arithmetic_v<T>) {
                 return plainData<T>(cmpiTypeOf(value.getType(), false), valueOf<T>(value));
-            else
+            } else {
                 throw SlotError{CMPI_RC_ERR_INVALID_DATA_TYPE, {}};
+            }
         });
     }
 }
@@ -232,33 +238,39 @@ CMPIData encodeArray(Broker& broker, const CIMValue& value)
 
 CMPIType cmpiTypeOf(CIMType type, bool isArray)
 {
-    for (const TypePair& pair : kTypes)
-        if (pair.cim == type)
+    for (const TypePair& pair : kTypes) {
+        if (pair.cim == type) {
             return static_cast<CMPIType>(isArray ? pair.cmpi | CMPI_ARRAY : pair.cmpi);
+        }
+    }
     return CMPI_null;
 }
 
 CIMType cimTypeOf(CMPIType type)
 {
     const auto simple = static_cast<CMPIType>(type & ~CMPI_ARRAY);
-    for (const TypePair& pair : kTypes)
-        if (pair.cmpi == simple)
+    for (const TypePair& pair : kTypes) {
+        if (pair.cmpi == simple) {
             return pair.cim;
+        }
+    }
     throw SlotError{CMPI_RC_ERR_INVALID_DATA_TYPE, {}};
 }
 
 CIMValue decodeValue(const CMPIValue* value, CMPIType type)
 {
     const bool isArray = (type & CMPI_ARRAY) != 0;
-    if (value == nullptr)
+    if (value == nullptr) {
         return {cimTypeOf(type), isArray};
+    }
     return isArray ? decodeArray(read<const CMPIArray*>(value), type) : decodeScalar(value, type);
 }
 
 CMPIData encodeValue(Broker& broker, const CIMValue& value)
 {
-    if (value.isNull())
+    if (value.isNull()) {
         return {cmpiTypeOf(value.getType(), value.isArray()), CMPI_nullValue, {}};
+    }
     return value.isArray() ? encodeArray(broker, value) : encodeScalar(broker, value);
 }
 
@@ -270,8 +282,9 @@ CIMValue arrayOf(CIMType type, const std::vector<CIMValue>& elements)
 std::vector<CIMValue> elementsOf(const CIMValue& array)
 {
     std::vector<CIMValue> elements;
-    if (!array.isNull())
+    if (!array.isNull()) {
         visitType(array.getType(), [&](auto sample) { appendElements<decltype(sample)>(array, elements); });
+    }
     return elements;
 }
 

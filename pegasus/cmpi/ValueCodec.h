@@ -1,5 +1,4 @@
-#ifndef PEGASUS_CMPI_VALUECODEC_H
-#define PEGASUS_CMPI_VALUECODEC_H
+#pragma once
 
 #include "pegasus/cmpi/Slot.h"
 
@@ -48,5 +47,3 @@ CIMValue arrayOf(CIMType type, const std::vector<CIMValue>& elements);
 std::vector<CIMValue> elementsOf(const CIMValue& array);
 
 } // namespace Pegasus::cmpi
-
-#endif

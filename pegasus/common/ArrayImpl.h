@@ -1,5 +1,4 @@
-#ifndef PEGASUS_COMMON_ARRAYIMPL_H
-#define PEGASUS_COMMON_ARRAYIMPL_H
+#pragma once
 
 #include <Pegasus/Common/Array.h>
 #include <Pegasus/Common/Exception.h>
@@ -13,7 +12,7 @@
 
 namespace Pegasus {
 
-/// In front of the elements, in one piece of memory. No header at all is the empty array.
+// In front of the elements, in one piece of memory. No header at all is the empty array.
 struct ArrayHeader
 {
     std::atomic<Uint32> fRefs{1};
@@ -32,8 +31,9 @@ template <class T> T* elements(ArrayHeader* header) noexcept
 
 template <class T> ArrayHeader* allocate(std::size_t capacity)
 {
-    if (capacity > (PEG_NOT_FOUND - sizeof(ArrayHeader)) / sizeof(T))
+    if (capacity > (PEG_NOT_FOUND - sizeof(ArrayHeader)) / sizeof(T)) {
         throw std::bad_alloc();
+    }
     void* memory = ::operator new(sizeof(ArrayHeader) + capacity * sizeof(T));
     auto* header = new (memory) ArrayHeader();
     header->fCapacity = static_cast<Uint32>(capacity);
@@ -43,8 +43,9 @@ template <class T> ArrayHeader* allocate(std::size_t capacity)
 template <class T> void destroyRange(T* first, Uint32 count) noexcept
 {
     if constexpr (!std::is_trivially_destructible_v<T>) {
-        for (Uint32 i = 0; i < count; ++i)
+        for (Uint32 i = 0; i < count; ++i) {
             first[i].~T();
+        }
     } else {
         (void)first;
         (void)count;
@@ -58,8 +59,9 @@ inline bool isOnlyHolder(const ArrayHeader& header) noexcept
 
 template <class T> void release(ArrayHeader* header) noexcept
 {
-    if (!header || (!isOnlyHolder(*header) && header->fRefs.fetch_sub(1, std::memory_order_acq_rel) != 1))
+    if (!header || (!isOnlyHolder(*header) && header->fRefs.fetch_sub(1, std::memory_order_acq_rel) != 1)) {
         return;
+    }
     destroyRange(elements<T>(header), header->fSize);
     header->~ArrayHeader();
     ::operator delete(header);
@@ -67,16 +69,18 @@ template <class T> void release(ArrayHeader* header) noexcept
 
 inline void checkIndex(Uint32 index, Uint32 size)
 {
-    if (index >= size)
+    if (index >= size) {
         throw IndexOutOfBoundsException();
+    }
 }
 
 } // namespace array_detail
 
 template <class T> Array<T>::Array(const Array<T>& x) noexcept : fHeader(x.fHeader)
 {
-    if (fHeader)
+    if (fHeader) {
         fHeader->fRefs.fetch_add(1, std::memory_order_relaxed);
+    }
 }
 
 template <class T> Array<T>::Array(Uint32 size) : Array(size, T()) {}
@@ -124,22 +128,24 @@ template <class T> const T* Array<T>::getData() const noexcept
     return fHeader ? array_detail::elements<T>(fHeader) : nullptr;
 }
 
-/// Makes the elements this array's own with room for `capacity`; moves them when they already were.
+// Makes the elements this array's own with room for `capacity`; moves them when they already were.
 template <class T> void Array<T>::reserveCapacity(Uint32 capacity)
 {
     const bool own = fHeader && array_detail::isOnlyHolder(*fHeader);
-    if (own ? fHeader->fCapacity >= capacity : (!fHeader && capacity == 0))
+    if (own ? fHeader->fCapacity >= capacity : (!fHeader && capacity == 0)) {
         return;
+    }
     const Uint32 count = size();
     Array<T> bigger;
     bigger.fHeader = array_detail::allocate<T>(capacity < count ? count : capacity);
     T* to = array_detail::elements<T>(bigger.fHeader);
     const T* from = getData();
     for (Uint32 i = 0; i < count; ++i, ++bigger.fHeader->fSize) {
-        if (own)
+        if (own) {
             new (to + i) T(std::move(const_cast<T&>(from[i])));
-        else
+        } else {
             new (to + i) T(from[i]);
+        }
     }
     swap(bigger);
 }
@@ -150,20 +156,24 @@ template <class T> T* Array<T>::writable()
     return fHeader ? array_detail::elements<T>(fHeader) : nullptr;
 }
 
-/// Opens a gap of default elements; the array is this one's own afterwards. Returns: the gap.
+// Opens a gap of default elements; the array is this one's own afterwards. Returns: the gap.
 template <class T> T* Array<T>::makeRoom(Uint32 index, Uint32 count)
 {
     const Uint32 oldSize = size();
-    if (index > oldSize || count > PEG_NOT_FOUND - 1 - oldSize)
+    if (index > oldSize || count > PEG_NOT_FOUND - 1 - oldSize) {
         throw IndexOutOfBoundsException();
+    }
     const Uint32 newSize = oldSize + count;
-    if (getCapacity() < newSize)
+    if (getCapacity() < newSize) {
         reserveCapacity(newSize < 2 * getCapacity() ? 2 * getCapacity() : newSize);
+    }
     T* items = writable();
-    for (; fHeader && fHeader->fSize < newSize; ++fHeader->fSize)
+    for (; fHeader && fHeader->fSize < newSize; ++fHeader->fSize) {
         new (items + fHeader->fSize) T();
-    for (Uint32 i = oldSize; i > index; --i)
+    }
+    for (Uint32 i = oldSize; i > index; --i) {
         items[i - 1 + count] = std::move(items[i - 1]);
+    }
     return items + index;
 }
 
@@ -171,8 +181,9 @@ template <class T> void Array<T>::grow(Uint32 size, const T& x)
 {
     const T copy(x); // NOLINT(performance-unnecessary-copy-initialization): x may be one of ours
     T* gap = makeRoom(this->size(), size);
-    for (Uint32 i = 0; i < size; ++i)
+    for (Uint32 i = 0; i < size; ++i) {
         gap[i] = copy;
+    }
 }
 
 template <class T> T& Array<T>::operator[](Uint32 index)
@@ -228,8 +239,9 @@ template <class T> void Array<T>::insert(Uint32 index, const T* x, Uint32 size)
         return insert(index, copies.getData(), size);
     }
     T* gap = makeRoom(index, size);
-    for (Uint32 i = 0; i < size; ++i)
+    for (Uint32 i = 0; i < size; ++i) {
         gap[i] = x[i];
+    }
 }
 
 template <class T> void Array<T>::remove(Uint32 index)
@@ -240,17 +252,18 @@ template <class T> void Array<T>::remove(Uint32 index)
 template <class T> void Array<T>::remove(Uint32 index, Uint32 size)
 {
     const Uint32 oldSize = this->size();
-    if (size == 0)
+    if (size == 0) {
         return;
-    if (index >= oldSize || size > oldSize - index)
+    }
+    if (index >= oldSize || size > oldSize - index) {
         throw IndexOutOfBoundsException();
+    }
     T* items = writable();
-    for (Uint32 i = index; i + size < oldSize; ++i)
+    for (Uint32 i = index; i + size < oldSize; ++i) {
         items[i] = std::move(items[i + size]);
+    }
     array_detail::destroyRange(items + (oldSize - size), size);
     fHeader->fSize = oldSize - size;
 }
 
 } // namespace Pegasus
-
-#endif

@@ -12,8 +12,9 @@ CIMConstClass::CIMConstClass(const CIMName& className, const CIMName& superClass
 
 CIMConstClass::CIMConstClass(const CIMConstObject& object) : fRep(ObjectAccess::classIn(object).fRep)
 {
-    if (!fRep)
+    if (!fRep) {
         throw DynamicCastFailedException();
+    }
 }
 
 CIMClass::CIMClass(const CIMObject& object) : CIMConstClass(static_cast<const CIMConstObject&>(object)) {}
@@ -92,8 +93,9 @@ void CIMConstClass::getKeyNames(Array<CIMName>& keyNames) const
 {
     const Array<CIMProperty>& properties = fRep.checked().fProperties;
     for (Uint32 i = 0; i < properties.size(); ++i) {
-        if (ObjectAccess::isTrue(ObjectAccess::rep(properties[i]).fQualifiers, "Key"))
+        if (ObjectAccess::isTrue(ObjectAccess::rep(properties[i]).fQualifiers, "Key")) {
             keyNames.append(properties[i].getName());
+        }
     }
 }
 
@@ -143,8 +145,9 @@ CIMClass CIMConstClass::clone() const
 
 void CIMClass::setPath(const CIMObjectPath& path)
 {
-    if (!path.getClassName().equal(getClassName()))
+    if (!path.getClassName().equal(getClassName())) {
         throw TypeMismatchException();
+    }
     fRep->fPath = path;
 }
 

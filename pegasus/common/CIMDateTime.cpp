@@ -9,12 +9,12 @@
 
 namespace Pegasus {
 
-/// A default-constructed one is the default interval.
+// A default-constructed one is the default interval.
 struct CIMDateTimeRep : RefCounted
 {
-    Uint64 fMicros = 0;     ///< of the interval, or of the local time since the beginning of year 0
-    Sint32 fUtcMinutes = 0; ///< local time minus UTC
-    Uint32 fWildcards = 0;  ///< how many of the 20 digits are `*`, from the right
+    Uint64 fMicros = 0;     // of the interval, or of the local time since the beginning of year 0
+    Sint32 fUtcMinutes = 0; // local time minus UTC
+    Uint32 fWildcards = 0;  // how many of the 20 digits are `*`, from the right
     bool fIsInterval = true;
 };
 
@@ -30,7 +30,7 @@ constexpr Uint32 kSignAt = 21;
 constexpr Uint32 kDigits = 20;
 constexpr Uint32 kMicroDigits = 6;
 
-/// The 20 digits without the point.
+// The 20 digits without the point.
 using Digits = std::array<char, kDigits>;
 
 struct Field
@@ -51,35 +51,40 @@ Digits readDigits(const Char16* text)
     Digits digits{};
     for (Uint32 i = 0; i < kDigits; ++i) {
         const Uint16 unit = text[i < kPointAt ? i : i + 1];
-        if (!isDigit(unit) && unit != '*')
+        if (!isDigit(unit) && unit != '*') {
             throw InvalidDateTimeFormatException();
+        }
         digits[i] = static_cast<char>(unit);
     }
     return digits;
 }
 
-/// Wildcards stand at the end of the digits and, except in the microseconds, fill whole fields.
+// Wildcards stand at the end of the digits and, except in the microseconds, fill whole fields.
 Uint32 countWildcards(const Digits& digits, bool isInterval)
 {
     const auto first = static_cast<Uint32>(std::find(digits.begin(), digits.end(), '*') - digits.begin());
-    if (std::any_of(digits.begin() + first, digits.end(), [](char digit) { return digit != '*'; }))
+    if (std::any_of(digits.begin() + first, digits.end(), [](char digit) { return digit != '*'; })) {
         throw InvalidDateTimeFormatException();
+    }
     const bool inYear = first > 0 && first < 4;
     const bool splitsField =
         first < kPointAt && (isInterval ? first != 0 && (first < 8 || first % 2 != 0) : inYear || first % 2 != 0);
-    if (splitsField)
+    if (splitsField) {
         throw InvalidDateTimeFormatException();
+    }
     return kDigits - first;
 }
 
-/// A wildcard digit counts as 0, a field of nothing else as `ifWild`.
+// A wildcard digit counts as 0, a field of nothing else as `ifWild`.
 Uint32 readField(const Digits& digits, const Field& field, Uint32 ifWild = 0)
 {
-    if (digits[field.at] == '*')
+    if (digits[field.at] == '*') {
         return ifWild;
+    }
     Uint32 number = 0;
-    for (Uint32 i = field.at; i < field.at + field.size; ++i)
+    for (Uint32 i = field.at; i < field.at + field.size; ++i) {
         number = number * 10 + (digits[i] == '*' ? 0 : static_cast<Uint32>(digits[i] - '0'));
+    }
     return number;
 }
 
@@ -88,24 +93,30 @@ Uint64 readTimeOfDay(const Digits& digits)
     const Uint32 hour = readField(digits, kHour);
     const Uint32 minute = readField(digits, kMinute);
     const Uint32 second = readField(digits, kSecond);
-    if (hour > 23)
+    if (hour > 23) {
         throw DateTimeOutOfRangeException("illegal hours number ");
-    if (minute > 59)
+    }
+    if (minute > 59) {
         throw DateTimeOutOfRangeException("illegal minutes number ");
-    if (second > 59)
+    }
+    if (second > 59) {
         throw DateTimeOutOfRangeException("illegal seconds number ");
+    }
     return hour * kMicrosPerHour + minute * kMicrosPerMinute + second * kMicrosPerSecond + readField(digits, kMicros);
 }
 
 Uint64 readDay(const Digits& digits, bool isInterval)
 {
-    if (isInterval)
+    if (isInterval) {
         return readField(digits, kDays, 1);
+    }
     const CivilDay day{readField(digits, kYear), readField(digits, kMonth, 1), readField(digits, kDay, 1)};
-    if (day.month < 1 || day.month > 12)
+    if (day.month < 1 || day.month > 12) {
         throw DateTimeOutOfRangeException("illegal month number");
-    if (day.day < 1 || day.day > daysInMonth(day.year, day.month))
+    }
+    if (day.day < 1 || day.day > daysInMonth(day.year, day.month)) {
         throw DateTimeOutOfRangeException("illegal day number");
+    }
     return dayNumber(day);
 }
 
@@ -113,8 +124,9 @@ Sint32 readOffset(const Char16* text)
 {
     Sint32 minutes = 0;
     for (Uint32 i = kSignAt + 1; i < kTextSize; ++i) {
-        if (!isDigit(text[i]))
+        if (!isDigit(text[i])) {
             throw InvalidDateTimeFormatException();
+        }
         minutes = minutes * 10 + (Uint16(text[i]) - '0');
     }
     return text[kSignAt] == '-' ? -minutes : minutes;
@@ -123,15 +135,18 @@ Sint32 readOffset(const Char16* text)
 void parse(const String& str, Rep& rep)
 {
     const Char16* text = str.getChar16Data();
-    if (str.size() != kTextSize || text[kPointAt] != '.')
+    if (str.size() != kTextSize || text[kPointAt] != '.') {
         throw InvalidDateTimeFormatException();
+    }
     const Uint16 sign = text[kSignAt];
-    if (sign != ':' && sign != '+' && sign != '-')
+    if (sign != ':' && sign != '+' && sign != '-') {
         throw InvalidDateTimeFormatException();
+    }
     rep.fIsInterval = sign == ':';
     rep.fUtcMinutes = readOffset(text);
-    if (rep.fIsInterval && rep.fUtcMinutes != 0)
+    if (rep.fIsInterval && rep.fUtcMinutes != 0) {
         throw InvalidDateTimeFormatException();
+    }
     const Digits digits = readDigits(text);
     rep.fWildcards = countWildcards(digits, rep.fIsInterval);
     rep.fMicros = readDay(digits, rep.fIsInterval) * kMicrosPerDay + readTimeOfDay(digits);
@@ -139,8 +154,9 @@ void parse(const String& str, Rep& rep)
 
 void writeField(char* digits, const Field& field, Uint64 number)
 {
-    for (Uint32 i = field.size; i > 0; --i, number /= 10)
+    for (Uint32 i = field.size; i > 0; --i, number /= 10) {
         digits[field.at + i - 1] = static_cast<char>('0' + number % 10);
+    }
 }
 
 Digits writeDigits(const Rep& rep)
@@ -176,7 +192,7 @@ String format(const Rep& rep)
     return String(text, kTextSize);
 }
 
-/// Signed: a local time early in year 0 can be before it in UTC.
+// Signed: a local time early in year 0 can be before it in UTC.
 Sint64 utcMicros(const Rep& rep)
 {
     return Sint64(rep.fMicros) - Sint64(rep.fUtcMinutes) * Sint64(kMicrosPerMinute);
@@ -184,10 +200,12 @@ Sint64 utcMicros(const Rep& rep)
 
 RepPointer<Rep> make(Uint64 micros, bool isInterval, Sint32 utcMinutes = 0, Uint32 wildcards = 0)
 {
-    if (isInterval && micros >= kIntervalEnd)
+    if (isInterval && micros >= kIntervalEnd) {
         throw DateTimeOutOfRangeException("Cannot create a CIMDateTime interval greater than 100 million days");
-    if (!isInterval && micros >= kTimeStampEnd)
+    }
+    if (!isInterval && micros >= kTimeStampEnd) {
         throw DateTimeOutOfRangeException("Cannot create a CIMDateTime time stamp beyond the year 10,000");
+    }
     RepPointer<Rep> rep(new Rep());
     rep->fMicros = micros;
     rep->fUtcMinutes = utcMinutes;
@@ -204,8 +222,9 @@ const Rep& repOf(const RepPointer<Rep>& pointer)
 
 Sint64 difference(const Rep& x, const Rep& y)
 {
-    if (x.fIsInterval != y.fIsInterval)
+    if (x.fIsInterval != y.fIsInterval) {
         throw TypeMismatchException("Trying to compare CIMDateTime objects of differing types");
+    }
     const Sint64 left = utcMicros(x);
     const Sint64 right = utcMicros(y);
     return left < right ? -1 : (left > right ? 1 : 0);
@@ -213,8 +232,9 @@ Sint64 difference(const Rep& x, const Rep& y)
 
 void expectInterval(const Rep& rep)
 {
-    if (!rep.fIsInterval)
+    if (!rep.fIsInterval) {
         throw TypeMismatchException("Only an interval can be used here");
+    }
 }
 
 } // namespace
@@ -258,8 +278,9 @@ CIMDateTime CIMDateTime::getCurrentDateTime()
 
 Sint64 CIMDateTime::getDifference(CIMDateTime startTime, CIMDateTime finishTime)
 {
-    if (startTime.isInterval() != finishTime.isInterval())
+    if (startTime.isInterval() != finishTime.isInterval()) {
         throw InvalidDateTimeFormatException();
+    }
     return utcMicros(repOf(finishTime.fRep)) - utcMicros(repOf(startTime.fRep));
 }
 
@@ -298,13 +319,15 @@ CIMDateTime CIMDateTime::operator-(const CIMDateTime& cdt) const
 {
     const Rep& left = repOf(fRep);
     const Rep& right = repOf(cdt.fRep);
-    if (left.fIsInterval)
+    if (left.fIsInterval) {
         expectInterval(right);
+    }
     const bool betweenStamps = !left.fIsInterval && !right.fIsInterval;
     const Sint64 micros =
         betweenStamps ? utcMicros(left) - utcMicros(right) : Sint64(left.fMicros) - Sint64(right.fMicros);
-    if (micros < 0)
+    if (micros < 0) {
         throw DateTimeOutOfRangeException("Result of subtracting two CIMDateTimes would be negative.");
+    }
     CIMDateTime result;
     result.fRep = make(static_cast<Uint64>(micros), left.fIsInterval || betweenStamps,
                        betweenStamps ? 0 : left.fUtcMinutes, std::max(left.fWildcards, right.fWildcards));
@@ -320,8 +343,9 @@ CIMDateTime CIMDateTime::operator*(Uint64 num) const
 {
     const Rep& rep = repOf(fRep);
     expectInterval(rep);
-    if (num != 0 && rep.fMicros > kIntervalEnd / num)
+    if (num != 0 && rep.fMicros > kIntervalEnd / num) {
         throw DateTimeOutOfRangeException("Cannot create a CIMDateTime interval greater than 100 million days");
+    }
     CIMDateTime product;
     product.fRep = make(rep.fMicros * num, true, 0, rep.fWildcards);
     return product;
@@ -336,8 +360,9 @@ CIMDateTime CIMDateTime::operator/(Uint64 num) const
 {
     const Rep& rep = repOf(fRep);
     expectInterval(rep);
-    if (num == 0)
+    if (num == 0) {
         throw Exception("CIMDateTime: division by zero");
+    }
     CIMDateTime quotient;
     quotient.fRep = make(rep.fMicros / num, true, 0, rep.fWildcards);
     return quotient;
@@ -352,8 +377,9 @@ Uint64 CIMDateTime::operator/(const CIMDateTime& cdt) const
 {
     expectInterval(repOf(fRep));
     expectInterval(repOf(cdt.fRep));
-    if (repOf(cdt.fRep).fMicros == 0)
+    if (repOf(cdt.fRep).fMicros == 0) {
         throw Exception("CIMDateTime: division by zero");
+    }
     return repOf(fRep).fMicros / repOf(cdt.fRep).fMicros;
 }
 

@@ -4,7 +4,7 @@ namespace Pegasus {
 
 template class RepPointer<CIMInstanceRep>;
 
-/// An instance lacks a property that was needed.
+// An instance lacks a property that was needed.
 class PEGASUS_COMMON_LINKAGE NoSuchProperty : public Exception
 {
   public:
@@ -15,10 +15,12 @@ namespace {
 
 void dropQualifiersAndOrigins(CIMProperty property, Boolean includeQualifiers, Boolean includeClassOrigin)
 {
-    while (!includeQualifiers && property.getQualifierCount() > 0)
+    while (!includeQualifiers && property.getQualifierCount() > 0) {
         property.removeQualifier(property.getQualifierCount() - 1);
-    if (!includeClassOrigin)
+    }
+    if (!includeClassOrigin) {
         property.setClassOrigin(CIMName());
+    }
 }
 
 } // namespace
@@ -30,8 +32,9 @@ CIMConstInstance::CIMConstInstance(const CIMName& className) : fRep(new CIMInsta
 
 CIMConstInstance::CIMConstInstance(const CIMConstObject& object) : fRep(ObjectAccess::instanceIn(object).fRep)
 {
-    if (!fRep)
+    if (!fRep) {
         throw DynamicCastFailedException();
+    }
 }
 
 CIMInstance::CIMInstance(const CIMObject& object) : CIMConstInstance(static_cast<const CIMConstObject&>(object)) {}
@@ -83,8 +86,9 @@ CIMObjectPath CIMConstInstance::buildPath(const CIMConstClass& cimClass) const
     Array<CIMKeyBinding> keys;
     for (Uint32 i = 0; i < keyNames.size(); ++i) {
         const Uint32 index = findProperty(keyNames[i]);
-        if (index == PEG_NOT_FOUND)
+        if (index == PEG_NOT_FOUND) {
             throw NoSuchProperty(keyNames[i].getString());
+        }
         keys.append(CIMKeyBinding(keyNames[i], fRep->fProperties[index].getValue()));
     }
     return CIMObjectPath(String(), CIMNamespaceName(), getClassName(), keys);
@@ -114,8 +118,9 @@ CIMInstance CIMConstInstance::clone() const
 
 void CIMInstance::setPath(const CIMObjectPath& path)
 {
-    if (!path.getClassName().equal(getClassName()))
+    if (!path.getClassName().equal(getClassName())) {
         throw TypeMismatchException();
+    }
     fRep->fPath = path;
 }
 
@@ -155,13 +160,15 @@ void CIMInstance::instanceFilter(Boolean includeQualifiers, Boolean includeClass
                                  const CIMPropertyList& propertyList)
 {
     CIMInstanceRep& rep = fRep.checked();
-    if (!includeQualifiers)
+    if (!includeQualifiers) {
         rep.fQualifiers.clear();
+    }
     Array<CIMProperty> kept;
     for (Uint32 i = 0; i < rep.fProperties.size(); ++i) {
         const CIMProperty& property = rep.fProperties[i];
-        if (!propertyList.isNull() && !propertyList.contains(property.getName()))
+        if (!propertyList.isNull() && !propertyList.contains(property.getName())) {
             continue;
+        }
         dropQualifiersAndOrigins(property, includeQualifiers, includeClassOrigin);
         kept.append(property);
     }

@@ -1,4 +1,4 @@
-#include "pegasus/common/NumberText.h"
+#include "pegasus/base/NumberText.h"
 #include "pegasus/common/StringRep.h"
 
 #include <Pegasus/Common/CIMObjectPath.h>
@@ -28,11 +28,12 @@ RepPointer<CIMKeyBindingRep> make(const CIMName& name, const String& value, Type
     return rep;
 }
 
-/// Throws: TypeMismatchException for a value that cannot be a key.
+// Throws: TypeMismatchException for a value that cannot be a key.
 Type typeOf(const CIMValue& value)
 {
-    if (value.isArray())
+    if (value.isArray()) {
         throw TypeMismatchException();
+    }
     switch (value.getType()) {
     case CIMTYPE_BOOLEAN:
         return CIMKeyBinding::BOOLEAN;
@@ -56,8 +57,9 @@ Boolean sameNumber(const String& x, const String& y)
     const std::string text2 = StringAccess::toUtf8(y);
     const auto unsigned1 = number::parseUnsigned(text1);
     const auto unsigned2 = number::parseUnsigned(text2);
-    if (unsigned1 && unsigned2)
+    if (unsigned1 && unsigned2) {
         return *unsigned1 == *unsigned2;
+    }
     const auto signed1 = number::parseSigned(text1);
     const auto signed2 = number::parseSigned(text2);
     return signed1 && signed2 ? *signed1 == *signed2 : x == y;

@@ -11,8 +11,9 @@ CIMConstParameter::CIMConstParameter(const CIMName& name, CIMType type, Boolean 
                                      const CIMName& referenceClassName)
     : fRep(new CIMParameterRep())
 {
-    if ((arraySize != 0 && !isArray) || (type == CIMTYPE_REFERENCE) == referenceClassName.isNull())
+    if ((arraySize != 0 && !isArray) || (type == CIMTYPE_REFERENCE) == referenceClassName.isNull()) {
         throw TypeMismatchException();
+    }
     fRep->fName = notNull(name);
     fRep->fType = type;
     fRep->fIsArray = isArray;

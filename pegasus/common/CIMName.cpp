@@ -17,24 +17,28 @@ bool isDigit(Uint16 unit)
 
 bool isLegalName(const Char16* units, Uint32 count)
 {
-    if (count == 0 || !isLetter(units[0]))
+    if (count == 0 || !isLetter(units[0])) {
         return false;
+    }
     for (Uint32 i = 1; i < count; ++i) {
-        if (!isLetter(units[i]) && !isDigit(units[i]))
+        if (!isLetter(units[i]) && !isDigit(units[i])) {
             return false;
+        }
     }
     return true;
 }
 
-/// Legal names with one "/" between.
+// Legal names with one "/" between.
 bool isLegalNamespace(const Char16* units, Uint32 count)
 {
     Uint32 start = 0;
     for (Uint32 i = 0; i <= count; ++i) {
-        if (i < count && units[i] != '/')
+        if (i < count && units[i] != '/') {
             continue;
-        if (!isLegalName(units + start, i - start))
+        }
+        if (!isLegalName(units + start, i - start)) {
             return false;
+        }
         start = i + 1;
     }
     return true;
@@ -45,29 +49,33 @@ Uint32 leadingSlash(const String& name)
     return name.size() > 0 && name[0] == '/' ? 1 : 0;
 }
 
-/// From the end: the names in one class begin alike more often than they end alike.
+// From the end: the names in one class begin alike more often than they end alike.
 bool sameNoCase(const StringRep& x, const StringRep& y)
 {
-    if (x.fSize != y.fSize)
+    if (x.fSize != y.fSize) {
         return false;
+    }
     for (Uint32 i = x.fSize; i > 0; --i) {
-        if (lowerAscii(x.units()[i - 1]) != lowerAscii(y.units()[i - 1]))
+        if (lowerAscii(x.units()[i - 1]) != lowerAscii(y.units()[i - 1])) {
             return false;
+        }
     }
     return true;
 }
 
 String checkedName(const String& name)
 {
-    if (!CIMName::legal(name))
+    if (!CIMName::legal(name)) {
         throw InvalidNameException(name);
+    }
     return name;
 }
 
 String checkedNamespace(const String& name)
 {
-    if (!CIMNamespaceName::legal(name))
+    if (!CIMNamespaceName::legal(name)) {
         throw InvalidNamespaceNameException(name);
+    }
     return leadingSlash(name) ? name.subString(1) : name;
 }
 
@@ -86,8 +94,9 @@ Boolean CIMName::equal(const CIMName& name) const
 {
     const StringRep* x = StringAccess::rep(fName);
     const StringRep* y = StringAccess::rep(name.fName);
-    if (x == y)
+    if (x == y) {
         return true; // equal names of one message share their text
+    }
     return x && y ? sameNoCase(*x, *y) : isNull() && name.isNull();
 }
 

@@ -1,16 +1,16 @@
-#include "pegasus/common/ElementEncoder.h"
 #include "pegasus/common/ObjectReps.h"
 #include "pegasus/common/StringRep.h"
 
 namespace Pegasus {
 namespace {
 
-/// Calls `action` with the class or the instance that the object is.
+// Calls `action` with the class or the instance that the object is.
 template <class Object, class Class, class Instance, class Action>
 decltype(auto) visitObject(const Object& object, Class& cimClass, Instance& instance, Action&& action)
 {
-    if (object.isClass())
+    if (object.isClass()) {
         return action(cimClass);
+    }
     return action(instance); // throws when that is not one either
 }
 
@@ -87,28 +87,18 @@ Boolean CIMConstObject::isInstance() const
 
 Boolean CIMConstObject::identical(const CIMConstObject& object) const
 {
-    if (isUninitialized() || object.isUninitialized())
+    if (isUninitialized() || object.isUninitialized()) {
         throw UninitializedObjectException();
-    if (isClass() != object.isClass())
+    }
+    if (isClass() != object.isClass()) {
         return false;
+    }
     return isClass() ? fClass.identical(object.fClass) : fInstance.identical(object.fInstance);
 }
 
 CIMObject CIMConstObject::clone() const
 {
     return visitObject(*this, fClass, fInstance, [](auto& x) { return CIMObject(x.clone()); });
-}
-
-String CIMConstObject::toString() const
-{
-    if (isUninitialized())
-        throw UninitializedObjectException();
-    std::string text;
-    if (isClass())
-        wire::appendClass(text, fClass);
-    else
-        wire::appendInstance(text, fInstance);
-    return StringAccess::fromUtf8(text);
 }
 
 void CIMObject::setPath(const CIMObjectPath& path)
@@ -151,8 +141,9 @@ void CIMObject::removeProperty(Uint32 index)
 void CIMObject::instanceFilter(Boolean includeQualifiers, Boolean includeClassOrigin,
                                const CIMPropertyList& propertyList)
 {
-    if (isInstance())
+    if (isInstance()) {
         fInstance.instanceFilter(includeQualifiers, includeClassOrigin, propertyList);
+    }
 }
 
 } // namespace Pegasus

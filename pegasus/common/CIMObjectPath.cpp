@@ -36,8 +36,9 @@ const Rep& repOf(const RepPointer<Rep>& pointer)
 
 String checkedHost(const String& host)
 {
-    if (host.size() > 0 && !path::isHost(StringAccess::toUtf8(host)))
+    if (host.size() > 0 && !path::isHost(StringAccess::toUtf8(host))) {
         throwMalformed(host, "invalid hostname");
+    }
     return host;
 }
 
@@ -46,12 +47,13 @@ bool isBefore(const CIMKeyBinding& x, const CIMKeyBinding& y)
     return String::compareNoCase(x.getName().getString(), y.getName().getString()) < 0;
 }
 
-/// In the order of the names; equal names stay in the order given.
+// In the order of the names; equal names stay in the order given.
 Array<CIMKeyBinding> sorted(const Array<CIMKeyBinding>& keys)
 {
     const CIMKeyBinding* data = keys.getData();
-    if (std::is_sorted(data, data + keys.size(), isBefore))
+    if (std::is_sorted(data, data + keys.size(), isBefore)) {
         return keys;
+    }
     std::vector<CIMKeyBinding> copy(data, data + keys.size());
     std::stable_sort(copy.begin(), copy.end(), isBefore);
     return Array<CIMKeyBinding>(copy.data(), keys.size());
@@ -75,17 +77,20 @@ RepPointer<Rep> parse(const String& text)
 {
     path::Parts parts;
     const std::string reason = path::parse(StringAccess::toUtf8(text), parts);
-    if (!reason.empty())
+    if (!reason.empty()) {
         throwMalformed(text, reason);
+    }
     RepPointer<Rep> rep(new Rep());
     rep->fHost = StringAccess::fromUtf8(parts.host);
-    if (!parts.nameSpace.empty())
+    if (!parts.nameSpace.empty()) {
         rep->fNameSpace = StringAccess::fromUtf8(parts.nameSpace);
+    }
     rep->fClassName = StringAccess::fromUtf8(parts.className);
     Array<CIMKeyBinding> keys;
-    for (const path::Key& key : parts.keys)
+    for (const path::Key& key : parts.keys) {
         keys.append(
             CIMKeyBinding(StringAccess::fromUtf8(key.name), StringAccess::fromUtf8(key.value), typeOf(key.kind)));
+    }
     rep->fKeys = sorted(keys);
     return rep;
 }
@@ -94,8 +99,9 @@ void appendQuoted(std::string& out, const String& value)
 {
     out += '"';
     for (const char c : StringAccess::toUtf8(value)) {
-        if (c == '"' || c == '\\')
+        if (c == '"' || c == '\\') {
             out += '\\';
+        }
         out += c;
     }
     out += '"';
@@ -105,19 +111,22 @@ void appendKey(std::string& out, const CIMKeyBinding& key)
 {
     StringAccess::appendUtf8(out, key.getName().getString());
     out += '=';
-    if (key.getType() == CIMKeyBinding::STRING || key.getType() == CIMKeyBinding::REFERENCE)
+    if (key.getType() == CIMKeyBinding::STRING || key.getType() == CIMKeyBinding::REFERENCE) {
         appendQuoted(out, key.getValue());
-    else
+    } else {
         StringAccess::appendUtf8(out, key.getValue());
+    }
 }
 
 std::string format(const Rep& rep)
 {
     std::string out;
-    if (rep.fHost.size() > 0)
+    if (rep.fHost.size() > 0) {
         out = "//" + StringAccess::toUtf8(rep.fHost) + "/";
-    if (rep.fHost.size() > 0 || !rep.fNameSpace.isNull())
+    }
+    if (rep.fHost.size() > 0 || !rep.fNameSpace.isNull()) {
         out += StringAccess::toUtf8(rep.fNameSpace.getString()) + ":";
+    }
     StringAccess::appendUtf8(out, rep.fClassName.getString());
     char separator = '.';
     for (Uint32 i = 0; i < rep.fKeys.size(); ++i, separator = ',') {
@@ -132,14 +141,15 @@ bool sameKeys(const Array<CIMKeyBinding>& x, const Array<CIMKeyBinding>& y)
     return x.size() == y.size() && std::equal(x.getData(), x.getData() + x.size(), y.getData());
 }
 
-/// FNV-1a without ASCII case.
+// FNV-1a without ASCII case.
 class Hash
 {
   public:
     void add(const String& text)
     {
-        for (Uint32 i = 0; i < text.size(); ++i)
+        for (Uint32 i = 0; i < text.size(); ++i) {
             add(lowerAscii(text.getChar16Data()[i]));
+        }
         add(Uint16(0));
     }
     void add(Uint16 unit) { fValue = (fValue ^ unit) * 16777619u; }
@@ -233,8 +243,9 @@ String CIMObjectPath::toString() const
 
 Boolean CIMObjectPath::identical(const CIMObjectPath& path) const
 {
-    if (fRep.get() == path.fRep.get())
+    if (fRep.get() == path.fRep.get()) {
         return true;
+    }
     const Rep& x = repOf(fRep);
     const Rep& y = repOf(path.fRep);
     return x.fClassName.equal(y.fClassName) && x.fNameSpace.equal(y.fNameSpace) &&
@@ -251,8 +262,9 @@ Uint32 CIMObjectPath::makeHashCode() const
     hash.add(rep.fClassName.getString());
     for (Uint32 i = 0; i < rep.fKeys.size(); ++i) {
         hash.add(rep.fKeys[i].getName().getString());
-        if (rep.fKeys[i].getType() == CIMKeyBinding::STRING)
+        if (rep.fKeys[i].getType() == CIMKeyBinding::STRING) {
             hash.add(rep.fKeys[i].getValue());
+        }
     }
     return hash.value();
 }

@@ -17,8 +17,9 @@ namespace {
 
 const String& notEmpty(const String& name)
 {
-    if (name.size() == 0)
+    if (name.size() == 0) {
         throw UninitializedObjectException();
+    }
     return name;
 }
 

@@ -11,7 +11,9 @@ void checkShape(const CIMValue& value, Uint32 arraySize, const CIMName& referenc
     const bool isReference = value.getType() == CIMTYPE_REFERENCE;
     if ((arraySize != 0 && !value.isArray()) || (!referenceClassName.isNull() && !isReference) ||
         (isReference && value.isArray()))
+    {
         throw TypeMismatchException();
+    }
 }
 
 } // namespace
@@ -113,8 +115,9 @@ void CIMProperty::setName(const CIMName& name)
 
 void CIMProperty::setValue(const CIMValue& value)
 {
-    if (!fRep.checked().fValue.typeCompatible(value))
+    if (!fRep.checked().fValue.typeCompatible(value)) {
         throw TypeMismatchException();
+    }
     fRep->fValue = value;
 }
 

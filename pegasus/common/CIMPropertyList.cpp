@@ -12,8 +12,9 @@ CIMPropertyList::CIMPropertyList(const Array<CIMName>& propertyNames)
 
 void CIMPropertyList::set(const Array<CIMName>& propertyNames)
 {
-    for (Uint32 i = 0; i < propertyNames.size(); ++i)
+    for (Uint32 i = 0; i < propertyNames.size(); ++i) {
         notNull(propertyNames[i]);
+    }
     fNames = propertyNames;
     fIsNull = false;
 }
@@ -32,21 +33,25 @@ const CIMName& CIMPropertyList::operator[](Uint32 index) const
 Boolean CIMPropertyList::contains(const CIMName& name) const
 {
     for (Uint32 i = 0; i < fNames.size(); ++i) {
-        if (fNames[i].equal(name))
+        if (fNames[i].equal(name)) {
             return true;
+        }
     }
     return false;
 }
 
 String CIMPropertyList::toString() const
 {
-    if (fIsNull)
+    if (fIsNull) {
         return "NULL";
-    if (fNames.size() == 0)
+    }
+    if (fNames.size() == 0) {
         return "EMPTY";
+    }
     String text = fNames[0].getString();
-    for (Uint32 i = 1; i < fNames.size(); ++i)
+    for (Uint32 i = 1; i < fNames.size(); ++i) {
         text.append(", ").append(fNames[i].getString());
+    }
     return text;
 }
 

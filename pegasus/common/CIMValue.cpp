@@ -1,20 +1,21 @@
+#include "pegasus/base/NumberText.h"
 #include "pegasus/common/CIMValueRep.h"
-
-#include "pegasus/common/NumberText.h"
 #include "pegasus/common/StringRep.h"
 
 namespace Pegasus {
 
 CIMValueRep::~CIMValueRep()
 {
-    if (fIsNull)
+    if (fIsNull) {
         return;
+    }
     visitType(CIMType(fType), [this](auto tag) {
         using T = typename decltype(tag)::Type;
-        if (fIsArray)
+        if (fIsArray) {
             drop<Array<T>>();
-        else
+        } else {
             drop<T>();
+        }
     });
 }
 
@@ -22,12 +23,13 @@ template class RepPointer<CIMValueRep>;
 
 namespace {
 
-/// Objects travel by clone, so that the holder's later changes are not seen; everything else is a value already.
+// Objects travel by clone, so that the holder's later changes are not seen; everything else is a value already.
 template <class T> T passed(const T& x)
 {
     if constexpr (std::is_same_v<T, CIMObject> || std::is_same_v<T, CIMInstance>) {
-        if (x.isUninitialized())
+        if (x.isUninitialized()) {
             throw UninitializedObjectException();
+        }
         return x.clone();
     } else {
         return x;
@@ -39,8 +41,9 @@ template <class T> Array<T> passed(const Array<T>& x)
     if constexpr (std::is_same_v<T, CIMObject> || std::is_same_v<T, CIMInstance>) {
         Array<T> copies;
         copies.reserveCapacity(x.size());
-        for (Uint32 i = 0; i < x.size(); ++i)
+        for (Uint32 i = 0; i < x.size(); ++i) {
             copies.append(passed(x[i]));
+        }
         return copies;
     } else {
         return x;
@@ -56,14 +59,15 @@ RepPointer<CIMValueRep> makeNull(CIMType type, Boolean isArray, Uint32 arraySize
     return rep;
 }
 
-/// Scalar nulls say nothing but their type, and classes are full of them. A representation is never changed, only
-/// replaced, so all nulls of a type can have the same.
+// Scalar nulls say nothing but their type, and classes are full of them. A representation is never changed, only
+// replaced, so all nulls of a type can have the same.
 struct SharedNulls
 {
     SharedNulls()
     {
-        for (int type = CIMTYPE_BOOLEAN; type <= CIMTYPE_INSTANCE; ++type)
+        for (int type = CIMTYPE_BOOLEAN; type <= CIMTYPE_INSTANCE; ++type) {
             ofType[type] = makeNull(CIMType(type), false, 0);
+        }
     }
     RepPointer<CIMValueRep> ofType[CIMTYPE_INSTANCE + 1];
 };
@@ -71,37 +75,44 @@ struct SharedNulls
 template <class T> void getScalar(const RepPointer<CIMValueRep>& rep, T& x)
 {
     const CIMType type = rep ? CIMType(rep->fType) : CIMTYPE_BOOLEAN;
-    if (type != CIMTypeOf<T>::kType || (rep && rep->fIsArray))
+    if (type != CIMTypeOf<T>::kType || (rep && rep->fIsArray)) {
         throw TypeMismatchException();
-    if (rep && !rep->fIsNull)
+    }
+    if (rep && !rep->fIsNull) {
         x = passed(rep->held<T>());
+    }
 }
 
 template <class T> void getArray(const RepPointer<CIMValueRep>& rep, Array<T>& x)
 {
-    if (!rep || !rep->fIsArray || CIMType(rep->fType) != CIMTypeOf<T>::kType)
+    if (!rep || !rep->fIsArray || CIMType(rep->fType) != CIMTypeOf<T>::kType) {
         throw TypeMismatchException();
-    if (!rep->fIsNull)
+    }
+    if (!rep->fIsNull) {
         x = passed(rep->held<Array<T>>());
+    }
 }
 
 template <class T> Boolean sameElement(const T& x, const T& y)
 {
-    if constexpr (std::is_same_v<T, CIMObject> || std::is_same_v<T, CIMInstance>)
+    if constexpr (std::is_same_v<T, CIMObject> || std::is_same_v<T, CIMInstance>) {
         return x.identical(y);
-    else if constexpr (std::is_same_v<T, CIMDateTime>)
+    } else if constexpr (std::is_same_v<T, CIMDateTime>) {
         return x.isInterval() == y.isInterval() && x.equal(y);
-    else
+    } else {
         return x == y;
+    }
 }
 
 template <class T> Boolean sameElements(const Array<T>& x, const Array<T>& y)
 {
-    if (x.size() != y.size())
+    if (x.size() != y.size()) {
         return false;
+    }
     for (Uint32 i = 0; i < x.size(); ++i) {
-        if (!sameElement(x[i], y[i]))
+        if (!sameElement(x[i], y[i])) {
             return false;
+        }
     }
     return true;
 }
@@ -133,12 +144,13 @@ void appendText(std::string& out, const String& x)
 
 template <class T> void appendText(std::string& out, const T& x)
 {
-    if constexpr (std::is_integral_v<T>)
+    if constexpr (std::is_integral_v<T>) {
         out += std::to_string(x);
-    else if constexpr (std::is_same_v<T, CIMInstance>)
+    } else if constexpr (std::is_same_v<T, CIMInstance>) {
         StringAccess::appendUtf8(out, CIMObject(x).toString());
-    else
+    } else {
         StringAccess::appendUtf8(out, x.toString());
+    }
 }
 
 } // namespace
@@ -210,10 +222,12 @@ Boolean CIMValue::isNull() const
 
 Uint32 CIMValue::getArraySize() const
 {
-    if (!isArray())
+    if (!isArray()) {
         return 0;
-    if (fRep->fIsNull)
+    }
+    if (fRep->fIsNull) {
         return fRep->fNullArraySize;
+    }
     return visitType(getType(), [this](auto tag) { return fRep->held<Array<typename decltype(tag)::Type>>().size(); });
 }
 
@@ -267,10 +281,12 @@ PEGASUS_VALUE_SET_GET(const CIMInstance&, CIMInstance)
 
 Boolean CIMValue::equal(const CIMValue& x) const
 {
-    if (!typeCompatible(x) || isNull() != x.isNull())
+    if (!typeCompatible(x) || isNull() != x.isNull()) {
         return false;
-    if (isNull() || fRep.get() == x.fRep.get())
+    }
+    if (isNull() || fRep.get() == x.fRep.get()) {
         return true;
+    }
     return visitType(getType(), [&](auto tag) {
         using T = typename decltype(tag)::Type;
         return isArray() ? sameElements(fRep->held<Array<T>>(), x.fRep->held<Array<T>>())
@@ -280,13 +296,15 @@ Boolean CIMValue::equal(const CIMValue& x) const
 
 String CIMValue::toString() const
 {
-    if (isNull())
+    if (isNull()) {
         return String();
+    }
     std::string out;
     visitType(getType(), [&](auto tag) {
         using T = typename decltype(tag)::Type;
-        if (!isArray())
+        if (!isArray()) {
             return appendText(out, fRep->held<T>());
+        }
         const Array<T>& array = fRep->held<Array<T>>();
         for (Uint32 i = 0; i < array.size(); ++i) {
             appendText(out, array[i]);

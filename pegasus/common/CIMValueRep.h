@@ -1,5 +1,4 @@
-#ifndef PEGASUS_COMMON_CIMVALUEREP_H
-#define PEGASUS_COMMON_CIMVALUEREP_H
+#pragma once
 
 #include "pegasus/common/ArrayImpl.h"
 #include "pegasus/common/RepPointerImpl.h"
@@ -12,7 +11,7 @@
 
 namespace Pegasus {
 
-/// Element type T's number among the CIM types.
+// Element type T's number among the CIM types.
 template <class T> struct CIMTypeOf;
 #define PEGASUS_CIM_TYPE_OF(T, NUMBER)                                                                                 \
     template <> struct CIMTypeOf<T>                                                                                    \
@@ -38,13 +37,13 @@ PEGASUS_CIM_TYPE_OF(CIMObject, CIMTYPE_OBJECT);
 PEGASUS_CIM_TYPE_OF(CIMInstance, CIMTYPE_INSTANCE);
 #undef PEGASUS_CIM_TYPE_OF
 
-/// What a value holds when it is not null: one T, or one Array<T>, in place where it is no bigger than a pointer.
+// What a value holds when it is not null: one T, or one Array<T>, in place where it is no bigger than a pointer.
 struct CIMValueRep : RefCounted
 {
     Uint8 fType = CIMTYPE_BOOLEAN;
     bool fIsArray = false;
     bool fIsNull = true;
-    Uint32 fNullArraySize = 0; ///< the size given with a null array
+    Uint32 fNullArraySize = 0; // the size given with a null array
     alignas(8) unsigned char fStorage[8] = {};
 
     CIMValueRep() = default;
@@ -55,31 +54,34 @@ struct CIMValueRep : RefCounted
 
     template <class Held> Held& held() noexcept
     {
-        if constexpr (kInPlace<Held>)
+        if constexpr (kInPlace<Held>) {
             return *std::launder(reinterpret_cast<Held*>(fStorage));
-        else
+        } else {
             return **std::launder(reinterpret_cast<Held**>(fStorage));
+        }
     }
     template <class Held> const Held& held() const noexcept { return const_cast<CIMValueRep*>(this)->held<Held>(); }
 
     template <class Held> void hold(Held value)
     {
-        if constexpr (kInPlace<Held>)
+        if constexpr (kInPlace<Held>) {
             new (fStorage) Held(std::move(value));
-        else
+        } else {
             new (fStorage) Held*(new Held(std::move(value)));
+        }
         fIsNull = false;
     }
     template <class Held> void drop() noexcept
     {
-        if constexpr (kInPlace<Held>)
+        if constexpr (kInPlace<Held>) {
             held<Held>().~Held();
-        else
+        } else {
             delete &held<Held>();
+        }
     }
 };
 
-/// Calls `visitor` with a tag of the element type that `type` stands for.
+// Calls `visitor` with a tag of the element type that `type` stands for.
 template <class T> struct TypeTag
 {
     using Type = T;
@@ -124,13 +126,13 @@ template <class Visitor> decltype(auto) visitType(CIMType type, Visitor&& visito
     }
 }
 
-/// What the library itself does with values: no copies of what they hold.
+// What the library itself does with values: no copies of what they hold.
 struct ValueAccess
 {
-    /// A value that takes the object as it is.
+    // A value that takes the object as it is.
     template <class T> static CIMValue make(T scalar) { return makeHeld<T, T>(std::move(scalar), false); }
     template <class T> static CIMValue make(Array<T> array) { return makeHeld<T, Array<T>>(std::move(array), true); }
-    /// Requires: not null, and exactly this type. T may be an Array.
+    // Requires: not null, and exactly this type. T may be an Array.
     template <class Held> static const Held& held(const CIMValue& value) { return value.fRep->held<Held>(); }
 
   private:
@@ -146,5 +148,3 @@ struct ValueAccess
 };
 
 } // namespace Pegasus
-
-#endif

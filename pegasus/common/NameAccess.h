@@ -1,19 +1,17 @@
-#ifndef PEGASUS_COMMON_NAMEACCESS_H
-#define PEGASUS_COMMON_NAMEACCESS_H
+#pragma once
 
 #include <Pegasus/Common/CIMName.h>
 #include <Pegasus/Common/Exception.h>
 
 namespace Pegasus {
 
-/// Returns: the name. Throws: UninitializedObjectException when it is null.
+// Returns: the name. Throws: UninitializedObjectException when it is null.
 inline const CIMName& notNull(const CIMName& name)
 {
-    if (name.isNull())
+    if (name.isNull()) {
         throw UninitializedObjectException();
+    }
     return name;
 }
 
 } // namespace Pegasus
-
-#endif

@@ -1,21 +1,22 @@
 #include "pegasus/common/ObjectPathParser.h"
 
-#include "pegasus/common/NumberText.h"
+#include "pegasus/base/NumberText.h"
 #include "pegasus/common/StringRep.h"
 
 #include <Pegasus/Common/CIMName.h>
 
 #include <algorithm>
-#include <arpa/inet.h>
 #include <cctype>
 #include <charconv>
+
+#include <arpa/inet.h>
 
 namespace Pegasus::path {
 namespace {
 
 using Reason = std::string;
 
-/// References in references: each level doubles the backslashes, so real paths stay far below.
+// References in references: each level doubles the backslashes, so real paths stay far below.
 constexpr unsigned kMaxNesting = 16;
 
 bool isAlnum(char c)
@@ -55,15 +56,16 @@ bool isDottedName(std::string_view text)
         const std::size_t dot = text.find('.');
         more = dot != std::string_view::npos;
         label = text.substr(0, dot);
-        if (!isLabel(label))
+        if (!isLabel(label)) {
             return false;
+        }
         text.remove_prefix(more ? dot + 1 : text.size());
     }
     // A name whose last label is a number would be taken for an address.
     return !isAllDigits(label);
 }
 
-/// What is left of the text behind the parts that were read.
+// What is left of the text behind the parts that were read.
 class PathParser
 {
   public:
@@ -89,39 +91,47 @@ class PathParser
 Reason PathParser::run()
 {
     Reason reason = readHost();
-    if (reason.empty())
+    if (reason.empty()) {
         reason = readNamespace();
-    if (reason.empty())
+    }
+    if (reason.empty()) {
         reason = readClass();
-    if (reason.empty())
+    }
+    if (reason.empty()) {
         reason = readKeys();
+    }
     return reason;
 }
 
 Reason PathParser::readHost()
 {
-    if (fText.substr(0, 2) != "//")
+    if (fText.substr(0, 2) != "//") {
         return Reason();
+    }
     const std::size_t slash = fText.find('/', 2);
-    if (slash == std::string_view::npos)
+    if (slash == std::string_view::npos) {
         return "missing slash after hostname";
+    }
     const std::string_view host = fText.substr(2, slash - 2);
-    if (!isHost(host))
+    if (!isHost(host)) {
         return "invalid hostname";
+    }
     fParts.host = host;
     fText.remove_prefix(slash + 1);
     return Reason();
 }
 
-/// The namespace ends at a colon before the first key.
+// The namespace ends at a colon before the first key.
 Reason PathParser::readNamespace()
 {
     const std::size_t colon = fText.find(':');
-    if (colon == std::string_view::npos || colon > fText.find('.'))
+    if (colon == std::string_view::npos || colon > fText.find('.')) {
         return fParts.host.empty() ? Reason() : "host specified, missing namespace";
+    }
     const std::string nameSpace(fText.substr(0, colon));
-    if (!CIMNamespaceName::legal(StringAccess::fromUtf8(nameSpace)))
+    if (!CIMNamespaceName::legal(StringAccess::fromUtf8(nameSpace))) {
         return "invalid namespace name";
+    }
     fParts.nameSpace = nameSpace;
     fText.remove_prefix(colon + 1);
     return Reason();
@@ -131,8 +141,9 @@ Reason PathParser::readClass()
 {
     const std::size_t dot = fText.find('.');
     const std::string className(fText.substr(0, dot));
-    if (!CIMName::legal(StringAccess::fromUtf8(className)))
+    if (!CIMName::legal(StringAccess::fromUtf8(className))) {
         return "class name " + className + " not a legal CIM name";
+    }
     fParts.className = className;
     fText.remove_prefix(dot == std::string_view::npos ? fText.size() : dot + 1);
     return Reason();
@@ -142,10 +153,12 @@ Reason PathParser::readKeys()
 {
     while (!fText.empty()) {
         Reason reason = readKey();
-        if (reason.empty() && !fText.empty() && fText.front() != ',')
+        if (reason.empty() && !fText.empty() && fText.front() != ',') {
             reason = "next key-value pair has to start with comma";
-        if (!reason.empty())
+        }
+        if (!reason.empty()) {
             return "invalid key-value pair, " + reason;
+        }
         fText.remove_prefix(std::min<std::size_t>(1, fText.size()));
     }
     return Reason();
@@ -154,12 +167,14 @@ Reason PathParser::readKeys()
 Reason PathParser::readKey()
 {
     const std::size_t equals = fText.find('=');
-    if (equals == std::string_view::npos)
+    if (equals == std::string_view::npos) {
         return "missing equal sign";
+    }
     Key key;
     key.name = fText.substr(0, equals);
-    if (!CIMName::legal(StringAccess::fromUtf8(key.name)))
+    if (!CIMName::legal(StringAccess::fromUtf8(key.name))) {
         return "invalid key name:" + key.name;
+    }
     fText.remove_prefix(equals + 1);
     Reason reason;
     if (!fText.empty() && fText.front() == '"') {
@@ -178,13 +193,15 @@ Reason PathParser::readQuoted(std::string& value)
     for (; at < fText.size() && fText[at] != '"'; ++at) {
         if (fText[at] == '\\') {
             ++at;
-            if (at == fText.size() || (fText[at] != '"' && fText[at] != '\\'))
+            if (at == fText.size() || (fText[at] != '"' && fText[at] != '\\')) {
                 return "malformed value";
+            }
         }
         value.push_back(fText[at]);
     }
-    if (at == fText.size())
+    if (at == fText.size()) {
         return "malformed value";
+    }
     fText.remove_prefix(at + 1);
     return Reason();
 }
@@ -202,15 +219,17 @@ Reason PathParser::readPlain(Key& key)
         }
     }
     key.kind = KeyKind::Numeric;
-    if (!key.value.empty() && key.value.front() == '-')
+    if (!key.value.empty() && key.value.front() == '-') {
         return number::parseSigned(key.value) ? Reason() : "invalid negative number value " + key.value;
+    }
     return number::parseUnsigned(key.value) ? Reason() : "invalid number value " + key.value;
 }
 
 bool PathParser::isPathWithKeys(const std::string& value) const
 {
-    if (fNesting == kMaxNesting || value.find('=') == std::string::npos)
+    if (fNesting == kMaxNesting || value.find('=') == std::string::npos) {
         return false;
+    }
     Parts parts;
     return PathParser(value, parts, fNesting + 1).run().empty() && !parts.keys.empty();
 }
@@ -221,14 +240,16 @@ bool isHost(std::string_view text)
 {
     if (!text.empty() && text.front() == '[') {
         const std::size_t close = text.find(']');
-        if (close == std::string_view::npos || !isAddress(AF_INET6, text.substr(1, close - 1)))
+        if (close == std::string_view::npos || !isAddress(AF_INET6, text.substr(1, close - 1))) {
             return false;
+        }
         const std::string_view rest = text.substr(close + 1);
         return rest.empty() || (rest.front() == ':' && isPort(rest.substr(1)));
     }
     const std::size_t colon = text.find(':');
-    if (colon != std::string_view::npos && !isPort(text.substr(colon + 1)))
+    if (colon != std::string_view::npos && !isPort(text.substr(colon + 1))) {
         return false;
+    }
     const std::string_view host = text.substr(0, colon);
     return isAddress(AF_INET, host) || isDottedName(host);
 }

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_COMMON_OBJECTPATHPARSER_H
-#define PEGASUS_COMMON_OBJECTPATHPARSER_H
+#pragma once
 
 #include <string>
 #include <string_view>
@@ -22,7 +21,7 @@ struct Key
     KeyKind kind = KeyKind::String;
 };
 
-/// The parts of an object path's text, in UTF-8.
+// The parts of an object path's text, in UTF-8.
 struct Parts
 {
     std::string host;
@@ -31,13 +30,11 @@ struct Parts
     std::vector<Key> keys;
 };
 
-/// `//host/namespace:Class.key=value,...`. A quoted value that is itself a path with keys is a reference.
-/// Returns: empty when the text is well formed, else the reason why it is not.
+// `//host/namespace:Class.key=value,...`. A quoted value that is itself a path with keys is a reference.
+// Returns: empty when the text is well formed, else the reason why it is not.
 std::string parse(std::string_view text, Parts& parts);
 
-/// A host name, dotted name, IPv4 or [IPv6] address, each with an optional :port.
+// A host name, dotted name, IPv4 or [IPv6] address, each with an optional :port.
 bool isHost(std::string_view text);
 
 } // namespace Pegasus::path
-
-#endif

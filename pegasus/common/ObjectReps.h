@@ -1,5 +1,4 @@
-#ifndef PEGASUS_COMMON_OBJECTREPS_H
-#define PEGASUS_COMMON_OBJECTREPS_H
+#pragma once
 
 #include "pegasus/common/ArrayImpl.h"
 #include "pegasus/common/NameAccess.h"
@@ -13,7 +12,7 @@
 
 namespace Pegasus {
 
-/// What the handle classes share. Copying a representation copies handles; the clone functions go deep.
+// What the handle classes share. Copying a representation copies handles; the clone functions go deep.
 
 struct CIMQualifierRep : RefCounted
 {
@@ -63,7 +62,7 @@ struct CIMMethodRep : RefCounted
     bool fPropagated = false;
 };
 
-/// The class name is the path's.
+// The class name is the path's.
 struct CIMInstanceRep : RefCounted
 {
     CIMObjectPath fPath;
@@ -71,7 +70,7 @@ struct CIMInstanceRep : RefCounted
     Array<CIMProperty> fProperties;
 };
 
-/// The class name is the path's.
+// The class name is the path's.
 struct CIMClassRep : RefCounted
 {
     CIMObjectPath fPath;
@@ -81,7 +80,7 @@ struct CIMClassRep : RefCounted
     Array<CIMMethod> fMethods;
 };
 
-/// Sub-objects by name, in lists that hold handles. `what` names the kind in "already exists: property "p"".
+// Sub-objects by name, in lists that hold handles. `what` names the kind in "already exists: property "p"".
 struct ObjectAccess
 {
     template <class Handle> static auto& rep(const Handle& handle) { return handle.fRep.checked(); }
@@ -98,8 +97,9 @@ struct ObjectAccess
     {
         const Item* data = items.getData();
         for (Uint32 i = 0; i < items.size(); ++i) {
-            if (data[i].getName().equal(name))
+            if (data[i].getName().equal(name)) {
                 return i;
+            }
         }
         return PEG_NOT_FOUND;
     }
@@ -107,35 +107,39 @@ struct ObjectAccess
     template <class Item> static void add(Array<Item>& items, const Item& item, const char* what)
     {
         const CIMName& name = item.getName();
-        if (find(items, name) != PEG_NOT_FOUND)
+        if (find(items, name) != PEG_NOT_FOUND) {
             throw AlreadyExistsException(String(what) + " \"" + name.getString() + "\"");
+        }
         items.append(item);
     }
 
-    /// The handle itself: a change through it is a change of the list's object.
+    // The handle itself: a change through it is a change of the list's object.
     template <class Item> static Item at(const Array<Item>& items, Uint32 index) { return items[index]; }
 
     template <class Item> static Array<Item> clone(const Array<Item>& items)
     {
         Array<Item> copies;
         copies.reserveCapacity(items.size());
-        for (Uint32 i = 0; i < items.size(); ++i)
+        for (Uint32 i = 0; i < items.size(); ++i) {
             copies.append(items[i].clone());
+        }
         return copies;
     }
 
     template <class Item> static bool identical(const Array<Item>& x, const Array<Item>& y)
     {
-        if (x.size() != y.size())
+        if (x.size() != y.size()) {
             return false;
+        }
         for (Uint32 i = 0; i < x.size(); ++i) {
-            if (!x[i].identical(y[i]))
+            if (!x[i].identical(y[i])) {
                 return false;
+            }
         }
         return true;
     }
 
-    /// Is there a qualifier of this name, boolean and true?
+    // Is there a qualifier of this name, boolean and true?
     static bool isTrue(const Array<CIMQualifier>& qualifiers, const CIMName& name)
     {
         const Uint32 index = find(qualifiers, name);
@@ -144,5 +148,3 @@ struct ObjectAccess
 };
 
 } // namespace Pegasus
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_COMMON_REPPOINTERIMPL_H
-#define PEGASUS_COMMON_REPPOINTERIMPL_H
+#pragma once
 
 #include <Pegasus/Common/Exception.h>
 #include <Pegasus/Common/RepPointer.h>
@@ -8,7 +7,7 @@
 
 namespace Pegasus {
 
-/// Base of every representation: the count of handles, 1 for the maker's.
+// Base of every representation: the count of handles, 1 for the maker's.
 struct RefCounted
 {
     RefCounted() = default;
@@ -29,27 +28,28 @@ template <class Rep> void RepPointer<Rep>::retain(Rep* rep) noexcept
 template <class Rep> void RepPointer<Rep>::release(Rep* rep) noexcept
 {
     // The last holder needs no atomic write: nobody else can take a count any more.
-    if (rep->fRefs.load(std::memory_order_acquire) == 1 || rep->fRefs.fetch_sub(1, std::memory_order_acq_rel) == 1)
+    if (rep->fRefs.load(std::memory_order_acquire) == 1 || rep->fRefs.fetch_sub(1, std::memory_order_acq_rel) == 1) {
         delete rep;
+    }
 }
 
 template <class Rep> Rep& RepPointer<Rep>::checked() const
 {
-    if (!fRep)
+    if (!fRep) {
         throw UninitializedObjectException();
+    }
     return *fRep;
 }
 
-/// A representation that may be changed: its own copy when it is shared, a new one when there is none.
+// A representation that may be changed: its own copy when it is shared, a new one when there is none.
 template <class Rep> Rep& writable(RepPointer<Rep>& pointer)
 {
-    if (!pointer)
+    if (!pointer) {
         pointer = RepPointer<Rep>(new Rep());
-    else if (pointer->isShared())
+    } else if (pointer->isShared()) {
         pointer = RepPointer<Rep>(new Rep(*pointer));
+    }
     return *pointer;
 }
 
 } // namespace Pegasus
-
-#endif

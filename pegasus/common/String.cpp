@@ -1,5 +1,5 @@
+#include "pegasus/base/Utf8.h"
 #include "pegasus/common/StringRep.h"
-#include "pegasus/common/Utf8.h"
 
 #include <algorithm>
 #include <cstdarg>
@@ -12,7 +12,7 @@
 
 namespace Pegasus {
 
-/// A null pointer where text was expected.
+// A null pointer where text was expected.
 class PEGASUS_COMMON_LINKAGE NullPointer : public Exception
 {
   public:
@@ -25,8 +25,9 @@ const String String::EMPTY;
 
 StringRep* StringRep::create(std::size_t capacity)
 {
-    if (capacity >= PEG_NOT_FOUND / sizeof(Char16))
+    if (capacity >= PEG_NOT_FOUND / sizeof(Char16)) {
         throw std::bad_alloc();
+    }
     void* memory = ::operator new(sizeof(StringRep) + (capacity + 1) * sizeof(Char16));
     auto* rep = new (memory) StringRep();
     rep->fCapacity = static_cast<Uint32>(capacity);
@@ -43,8 +44,9 @@ const Char16 kNoUnits[1];
 StringPointer makeRep(const Char16* units, std::size_t count, std::size_t capacity)
 {
     StringPointer rep(StringRep::create(capacity));
-    if (count)
+    if (count) {
         std::memcpy(static_cast<void*>(rep->units()), units, count * sizeof(Char16));
+    }
     rep->fSize = static_cast<Uint32>(count);
     rep->units()[count] = Char16();
     return rep;
@@ -55,33 +57,37 @@ StringPointer makeRep(const Char16* units, std::size_t count)
     return count ? makeRep(units, count, count) : StringPointer();
 }
 
-/// Makes the units the holder's own, with room for `capacity`.
+// Makes the units the holder's own, with room for `capacity`.
 void makeWritable(StringPointer& rep, std::size_t capacity)
 {
-    if (rep && !rep->isShared() && rep->fCapacity >= capacity)
+    if (rep && !rep->isShared() && rep->fCapacity >= capacity) {
         return;
+    }
     const std::size_t count = rep ? rep->fSize : 0;
     rep = makeRep(rep ? rep->units() : nullptr, count, std::max(capacity, count));
 }
 
 std::size_t lengthOf(const Char16* units)
 {
-    if (!units)
+    if (!units) {
         throw NullPointer();
+    }
     std::size_t count = 0;
-    while (Uint16(units[count]) != 0)
+    while (Uint16(units[count]) != 0) {
         ++count;
+    }
     return count;
 }
 
 const char* notNull(const char* text)
 {
-    if (!text)
+    if (!text) {
         throw NullPointer();
+    }
     return text;
 }
 
-/// The text up to the bad byte, then that byte and the few behind it in hex.
+// The text up to the bad byte, then that byte and the few behind it in hex.
 [[noreturn]] void throwNotUtf8(std::string_view text, std::size_t index)
 {
     constexpr std::size_t kShownBytes = 6;
@@ -98,16 +104,19 @@ const char* notNull(const char* text)
 
 StringPointer repFromUtf8(std::string_view utf8)
 {
-    if (utf8.empty())
+    if (utf8.empty()) {
         return StringPointer();
+    }
     StringPointer rep(StringRep::create(utf8.size()));
     const utf8::DecodeResult result = utf8::decode(utf8.data(), utf8.size(), rep->units());
-    if (result.invalid)
+    if (result.invalid) {
         throwNotUtf8(utf8, static_cast<std::size_t>(result.invalid - utf8.data()));
+    }
     const auto count = static_cast<std::size_t>(result.end - rep->units());
     // Text that is mostly not ASCII would keep up to two thirds of its memory unused.
-    if (count < utf8.size())
+    if (count < utf8.size()) {
         return makeRep(rep->units(), count);
+    }
     rep->fSize = static_cast<Uint32>(count);
     rep->units()[count] = Char16();
     return rep;
@@ -126,8 +135,9 @@ template <class Fold> int compareUnits(const String& s1, const String& s2, Uint3
     const Char16* data2 = s2.getChar16Data();
     for (Uint32 i = 0; i < std::min(count1, count2); ++i) {
         const int difference = int(fold(Uint16(data1[i]))) - int(fold(Uint16(data2[i])));
-        if (difference != 0)
+        if (difference != 0) {
             return signOf(difference);
+        }
     }
     return count1 == count2 ? 0 : (count1 < count2 ? -1 : 1);
 }
@@ -145,8 +155,9 @@ namespace {
 
 char* copyBytes(const char* bytes)
 {
-    if (!bytes)
+    if (!bytes) {
         return nullptr;
+    }
     const std::size_t size = std::strlen(bytes) + 1;
     return static_cast<char*>(std::memcpy(new char[size], bytes, size));
 }
@@ -252,16 +263,18 @@ CString String::getCString() const
 
 Char16& String::operator[](Uint32 index)
 {
-    if (index > size())
+    if (index > size()) {
         throw IndexOutOfBoundsException();
+    }
     makeWritable(fRep, size());
     return fRep->units()[index];
 }
 
 const Char16 String::operator[](Uint32 index) const
 {
-    if (index > size())
+    if (index > size()) {
         throw IndexOutOfBoundsException();
+    }
     return getChar16Data()[index];
 }
 
@@ -280,8 +293,9 @@ String& String::append(const Char16* str, Uint32 n)
     const std::size_t newSize = std::size_t(size()) + n;
     const std::size_t capacity = fRep ? fRep->fCapacity : 0;
     makeWritable(fRep, newSize > capacity ? std::max(newSize, 2 * capacity) : newSize);
-    if (n)
+    if (n) {
         std::memmove(static_cast<void*>(fRep->units() + fRep->fSize), str, n * sizeof(Char16));
+    }
     fRep->fSize = static_cast<Uint32>(newSize);
     fRep->units()[newSize] = Char16();
     return *this;
@@ -289,8 +303,9 @@ String& String::append(const Char16* str, Uint32 n)
 
 String& String::append(const String& str)
 {
-    if (size() == 0)
+    if (size() == 0) {
         return *this = str;
+    }
     const String kept(str); // NOLINT(performance-unnecessary-copy-initialization): str may be *this
     return append(kept.getChar16Data(), kept.size());
 }
@@ -298,12 +313,15 @@ String& String::append(const String& str)
 void String::remove(Uint32 index, Uint32 size)
 {
     const Uint32 oldSize = this->size();
-    if (size == PEG_NOT_FOUND && index <= oldSize)
+    if (size == PEG_NOT_FOUND && index <= oldSize) {
         size = oldSize - index;
-    if (index > oldSize || size > oldSize - index)
+    }
+    if (index > oldSize || size > oldSize - index) {
         throw IndexOutOfBoundsException();
-    if (size == 0)
+    }
+    if (size == 0) {
         return;
+    }
     makeWritable(fRep, oldSize);
     Char16* hole = fRep->units() + index;
     // The zero behind the text moves along.
@@ -313,8 +331,9 @@ void String::remove(Uint32 index, Uint32 size)
 
 String String::subString(Uint32 index, Uint32 n) const
 {
-    if (index >= size())
+    if (index >= size()) {
         return String();
+    }
     return String(getChar16Data() + index, std::min(n, size() - index));
 }
 
@@ -327,16 +346,18 @@ Uint32 String::find(Uint32 index, Char16 c) const
 {
     const Char16* data = getChar16Data();
     for (Uint32 i = index; i < size(); ++i) {
-        if (data[i] == c)
+        if (data[i] == c) {
             return i;
+        }
     }
     return PEG_NOT_FOUND;
 }
 
 Uint32 String::find(const String& s) const
 {
-    if (s.size() == 0)
+    if (s.size() == 0) {
         return PEG_NOT_FOUND;
+    }
     const Char16* begin = getChar16Data();
     const Char16* end = begin + size();
     const Char16* found = std::search(begin, end, s.getChar16Data(), s.getChar16Data() + s.size());
@@ -347,8 +368,9 @@ Uint32 String::reverseFind(Char16 c) const
 {
     const Char16* data = getChar16Data();
     for (Uint32 i = size(); i > 0; --i) {
-        if (data[i - 1] == c)
+        if (data[i - 1] == c) {
             return i - 1;
+        }
     }
     return PEG_NOT_FOUND;
 }
@@ -356,8 +378,9 @@ Uint32 String::reverseFind(Char16 c) const
 void String::toLower()
 {
     makeWritable(fRep, size());
-    for (Uint32 i = 0; i < fRep->fSize; ++i)
+    for (Uint32 i = 0; i < fRep->fSize; ++i) {
         fRep->units()[i] = lowerAscii(fRep->units()[i]);
+    }
 }
 
 void String::appendPrintf(const char* format, ...)

@@ -1,5 +1,4 @@
-#ifndef PEGASUS_COMMON_STRINGREP_H
-#define PEGASUS_COMMON_STRINGREP_H
+#pragma once
 
 #include "pegasus/common/RepPointerImpl.h"
 
@@ -11,7 +10,7 @@
 
 namespace Pegasus {
 
-/// The code units follow in the same piece of memory, with a zero behind them.
+// The code units follow in the same piece of memory, with a zero behind them.
 struct StringRep : RefCounted
 {
     Uint32 fSize = 0;
@@ -20,29 +19,27 @@ struct StringRep : RefCounted
     Char16* units() noexcept { return reinterpret_cast<Char16*>(this + 1); }
     const Char16* units() const noexcept { return reinterpret_cast<const Char16*>(this + 1); }
 
-    /// A representation with room for `capacity` units, and size 0.
+    // A representation with room for `capacity` units, and size 0.
     static StringRep* create(std::size_t capacity);
     static void operator delete(void* memory) { ::operator delete(memory); }
 };
 
-/// What the library itself does with strings beyond their public interface.
+// What the library itself does with strings beyond their public interface.
 struct StringAccess
 {
-    /// Throws: Exception "The byte sequence starting at index ... is not valid UTF-8 encoding: ...".
+    // Throws: Exception "The byte sequence starting at index ... is not valid UTF-8 encoding: ...".
     static String fromUtf8(std::string_view utf8);
     static void appendUtf8(std::string& out, const Char16* units, std::size_t count);
     static void appendUtf8(std::string& out, const String& text) { appendUtf8(out, text.getChar16Data(), text.size()); }
     static std::string toUtf8(const String& text);
-    /// Null for an empty text, perhaps.
+    // Null for an empty text, perhaps.
     static const StringRep* rep(const String& text) noexcept { return text.fRep.get(); }
 };
 
-/// ASCII letters only.
+// ASCII letters only.
 inline Uint16 lowerAscii(Uint16 unit) noexcept
 {
     return unit >= 'A' && unit <= 'Z' ? static_cast<Uint16>(unit + ('a' - 'A')) : unit;
 }
 
 } // namespace Pegasus
-
-#endif

@@ -1,4 +1,5 @@
 #include "pegasus/mof/AliasTable.h"
+
 #include "pegasus/mof/Token.h"
 
 namespace Pegasus::mof {

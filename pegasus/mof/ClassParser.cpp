@@ -1,4 +1,5 @@
 #include "pegasus/mof/ClassParser.h"
+
 #include "pegasus/mof/DataType.h"
 #include "pegasus/mof/ValueBuilder.h"
 
@@ -17,17 +18,20 @@ ParsedClass ClassParser::parse(const Qualifiers& qualifiers)
 {
     ParsedClass parsed;
     const CIMName name = parseName(fCursor, "a class name");
-    if (fCursor.skipWord("as"))
+    if (fCursor.skipWord("as")) {
         parsed.alias = fCursor.expect(TokenKind::Alias, "an alias").text;
+    }
     CIMName superClass;
-    if (fCursor.skipPunctuation(':'))
+    if (fCursor.skipPunctuation(':')) {
         superClass = parseName(fCursor, "a superclass name");
+    }
 
     parsed.itsClass = CIMClass(name, superClass);
     addQualifiers(parsed.itsClass, qualifiers);
     fCursor.expectPunctuation('{');
-    while (!fCursor.skipPunctuation('}'))
+    while (!fCursor.skipPunctuation('}')) {
         parseFeature(parsed.itsClass);
+    }
     fCursor.expectPunctuation(';');
     return parsed;
 }
@@ -41,8 +45,9 @@ void ClassParser::parseFeature(CIMClass& owner)
     const std::size_t offset = fCursor.current().offset;
     const CIMName name = parseName(fCursor, "a property or method name");
     if (fCursor.atPunctuation('(')) {
-        if (type.type == CIMTYPE_REFERENCE)
+        if (type.type == CIMTYPE_REFERENCE) {
             fCursor.failAt(offset, "a method cannot return a reference");
+        }
         CIMMethod method = parseMethod(name, type.type);
         addQualifiers(method, qualifiers);
         addMethod(owner, method, offset);
@@ -57,11 +62,13 @@ CIMProperty ClassParser::parseProperty(const CIMName& name, ValueType type, cons
 {
     const std::size_t suffix = fCursor.current().offset;
     parseArraySuffix(fCursor, type);
-    if (type.isArray && type.type == CIMTYPE_REFERENCE)
+    if (type.isArray && type.type == CIMTYPE_REFERENCE) {
         fCursor.failAt(suffix, "a reference property cannot be an array");
+    }
     CIMValue value(type.type, type.isArray, type.arraySize);
-    if (fCursor.skipPunctuation('='))
+    if (fCursor.skipPunctuation('=')) {
         value = buildValue(fCursor, fCompilation.aliases, parseInitializer(fCursor), type);
+    }
     fCursor.expectPunctuation(';');
     return CIMProperty(name, value, type.arraySize, referenceClass);
 }
@@ -75,8 +82,9 @@ CIMMethod ClassParser::parseMethod(const CIMName& name, CIMType type)
             checkMemberCount(method.getParameterCount());
             const std::size_t offset = fCursor.current().offset;
             const CIMParameter parameter = parseParameter();
-            if (method.findParameter(parameter.getName()) != PEG_NOT_FOUND)
+            if (method.findParameter(parameter.getName()) != PEG_NOT_FOUND) {
                 fCursor.failAt(offset, "parameter " + utf8(parameter.getName()) + " is given twice");
+            }
             method.addParameter(parameter);
         } while (fCursor.skipPunctuation(','));
         fCursor.expectPunctuation(')');
@@ -92,35 +100,39 @@ CIMParameter ClassParser::parseParameter()
     ValueType type = parseElementType(fCursor, referenceClass);
     const CIMName name = parseName(fCursor, "a parameter name");
     parseArraySuffix(fCursor, type);
-    if (fCursor.atPunctuation('='))
+    if (fCursor.atPunctuation('=')) {
         fCursor.fail("a parameter cannot have a default value");
+    }
     CIMParameter parameter(name, type.type, type.isArray, type.arraySize, referenceClass);
     addQualifiers(parameter, qualifiers);
     return parameter;
 }
 
-/// A second property of one name is left out, as OpenPegasus's compiler does.
+// A second property of one name is left out, as OpenPegasus's compiler does.
 void ClassParser::addProperty(CIMClass& owner, const CIMProperty& property, std::size_t offset)
 {
-    if (owner.findProperty(property.getName()) == PEG_NOT_FOUND)
+    if (owner.findProperty(property.getName()) == PEG_NOT_FOUND) {
         owner.addProperty(property);
-    else
+    } else {
         fCompilation.handler.warn(fCursor.place(offset).text(), "Property " + utf8(property.getName()) +
                                                                     " already exists in class " +
                                                                     utf8(owner.getClassName()));
+    }
 }
 
 void ClassParser::addMethod(CIMClass& owner, const CIMMethod& method, std::size_t offset)
 {
-    if (owner.findMethod(method.getName()) != PEG_NOT_FOUND)
+    if (owner.findMethod(method.getName()) != PEG_NOT_FOUND) {
         fCursor.failAt(offset, "method " + utf8(method.getName()) + " is given twice");
+    }
     owner.addMethod(method);
 }
 
 void ClassParser::checkMemberCount(std::size_t count)
 {
-    if (count >= fCursor.limits().memberCount)
+    if (count >= fCursor.limits().memberCount) {
         fCursor.fail("more members than the limit memberCount (" + std::to_string(fCursor.limits().memberCount) + ")");
+    }
 }
 
 } // namespace Pegasus::mof

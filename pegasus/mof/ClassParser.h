@@ -10,14 +10,14 @@
 
 namespace Pegasus::mof {
 
-/// A class and the alias that its declaration gave it, if any.
+// A class and the alias that its declaration gave it, if any.
 struct ParsedClass
 {
     CIMClass itsClass;
     std::string alias;
 };
 
-/// Parses classes, associations and indications: they differ in their qualifiers only. Throws MofError.
+// Parses classes, associations and indications: they differ in their qualifiers only. Throws MofError.
 class ClassParser
 {
   public:
@@ -26,7 +26,7 @@ class ClassParser
     {
     }
 
-    /// The text behind the word "class", up to and with the semicolon.
+    // The text behind the word "class", up to and with the semicolon.
     ParsedClass parse(const Qualifiers& qualifiers);
 
   private:

@@ -6,7 +6,7 @@
 
 namespace Pegasus::mof {
 
-/// What the files of one compilation share.
+// What the files of one compilation share.
 struct Compilation
 {
     Compilation(const CompileOptions& given, DefinitionHandler& target)
@@ -16,7 +16,7 @@ struct Compilation
 
     const CompileOptions& options;
     DefinitionHandler& handler;
-    CIMNamespaceName nameSpace; ///< the current target
+    CIMNamespaceName nameSpace; // the current target
     AliasTable aliases;
     InstanceQueue instances;
     std::size_t includeDepth = 0;

@@ -1,4 +1,5 @@
 #include "pegasus/mof/Compiler.h"
+
 #include "pegasus/mof/FileCompiler.h"
 
 namespace Pegasus::mof {

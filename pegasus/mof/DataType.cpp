@@ -25,29 +25,34 @@ constexpr TypeWord kTypeWords[] = {
 
 bool isDataType(const Token& word, CIMType& type)
 {
-    for (const TypeWord& known : kTypeWords)
+    for (const TypeWord& known : kTypeWords) {
         if (word.isWord(known.word)) {
             type = known.type;
             return true;
         }
+    }
     return false;
 }
 
 void parseArraySuffix(TokenCursor& cursor, ValueType& type)
 {
-    if (!cursor.skipPunctuation('['))
+    if (!cursor.skipPunctuation('[')) {
         return;
+    }
     type.isArray = true;
-    if (cursor.skipPunctuation(']'))
+    if (cursor.skipPunctuation(']')) {
         return;
+    }
     const Token size = cursor.expect(TokenKind::Integer, "an array size or ']'");
     const char* end = size.text.data() + size.text.size();
     const auto [stop, error] = std::from_chars(size.text.data(), end, type.arraySize);
-    if (error != std::errc() || stop != end || type.arraySize == 0)
+    if (error != std::errc() || stop != end || type.arraySize == 0) {
         cursor.failAt(size.offset, "array size must be a positive decimal number");
-    if (type.arraySize > cursor.limits().arrayElementCount)
+    }
+    if (type.arraySize > cursor.limits().arrayElementCount) {
         cursor.failAt(size.offset, "array size is beyond the limit arrayElementCount (" +
                                        std::to_string(cursor.limits().arrayElementCount) + ")");
+    }
     cursor.expectPunctuation(']');
 }
 
@@ -59,8 +64,9 @@ ValueType parseElementType(TokenCursor& cursor, CIMName& referenceClass)
         return type;
     }
     const Token word = cursor.expect(TokenKind::Identifier, "a type");
-    if (!cursor.skipWord("ref"))
+    if (!cursor.skipWord("ref")) {
         cursor.failAt(word.offset, "unknown type " + word.shown());
+    }
     referenceClass = CIMName(word.text.c_str());
     type.type = CIMTYPE_REFERENCE;
     return type;

@@ -1,4 +1,5 @@
 #include "pegasus/mof/FileCompiler.h"
+
 #include "pegasus/mof/ClassParser.h"
 #include "pegasus/mof/IncludeSearch.h"
 #include "pegasus/mof/InstanceParser.h"
@@ -18,25 +19,29 @@ std::string utf8(const String& text)
 template <class T> bool qualifierValue(const CIMConstClass& owner, const char* name, T& value)
 {
     const Uint32 index = owner.findQualifier(CIMName(name));
-    if (index == PEG_NOT_FOUND)
+    if (index == PEG_NOT_FOUND) {
         return false;
+    }
     const CIMValue held = owner.getQualifier(index).getValue();
-    if (held.isNull() || !held.typeCompatible(CIMValue(value)))
+    if (held.isNull() || !held.typeCompatible(CIMValue(value))) {
         return false;
+    }
     held.get(value);
     return true;
 }
 
-/// m.n.u, digits all (DSP0004, Version). The DMTF's own files leave out the last part now and then.
+// m.n.u, digits all (DSP0004, Version). The DMTF's own files leave out the last part now and then.
 bool isVersion(const std::string& text)
 {
     int dotCount = 0;
     for (std::size_t at = 0;; ++dotCount) {
         const std::size_t end = std::min(text.find('.', at), text.size());
-        if (end == at || text.find_first_not_of("0123456789", at) < end)
+        if (end == at || text.find_first_not_of("0123456789", at) < end) {
             return false;
-        if (end == text.size())
+        }
+        if (end == text.size()) {
             return dotCount <= 2;
+        }
         at = end + 1;
     }
 }
@@ -67,14 +72,15 @@ void FileCompiler::definition()
         return;
     }
     const Qualifiers qualifiers = QualifierParser(fCursor, fCompilation).parseList();
-    if (fCursor.skipWord("class"))
+    if (fCursor.skipWord("class")) {
         defineClass(qualifiers);
-    else if (fCursor.skipWord("instance"))
+    } else if (fCursor.skipWord("instance")) {
         defineInstance();
-    else if (fCursor.skipWord("qualifier"))
+    } else if (fCursor.skipWord("qualifier")) {
         defineQualifier(qualifiers);
-    else
+    } else {
         fCursor.failExpected("a class, an instance, a qualifier declaration or a pragma");
+    }
 }
 
 void FileCompiler::defineClass(const Qualifiers& qualifiers)
@@ -82,14 +88,17 @@ void FileCompiler::defineClass(const Qualifiers& qualifiers)
     fSubject = fCursor.current().offset;
     const ParsedClass parsed = ClassParser(fCursor, fCompilation).parse(qualifiers);
     const CIMName name = parsed.itsClass.getClassName();
-    if (isWelcome(parsed.itsClass) && !fCompilation.handler.createClass(parsed.itsClass))
+    if (isWelcome(parsed.itsClass) && !fCompilation.handler.createClass(parsed.itsClass)) {
         warn("Class " + utf8(name.getString()) + " already exists in the repository");
+    }
     if (!parsed.alias.empty() &&
         !fCompilation.aliases.define(parsed.alias, CIMObjectPath(String(), CIMNamespaceName(), name)))
+    {
         fCursor.failAt(fSubject, "alias $" + parsed.alias + " is already defined");
+    }
 }
 
-/// Classes with a true Experimental or a malformed Version are left out with a warning, as OpenPegasus's compiler does.
+// Classes with a true Experimental or a malformed Version are left out with a warning, as OpenPegasus's compiler does.
 bool FileCompiler::isWelcome(const CIMClass& newClass)
 {
     const std::string start = "Class " + utf8(newClass.getClassName().getString()) + " was not added or updated: ";
@@ -115,8 +124,9 @@ void FileCompiler::defineInstance()
 
 void FileCompiler::defineQualifier(const Qualifiers& qualifiers)
 {
-    if (!qualifiers.empty())
+    if (!qualifiers.empty()) {
         fCursor.failAt(fSubject, "a qualifier declaration cannot have qualifiers");
+    }
     fSubject = fCursor.current().offset;
     fCompilation.handler.declareQualifier(QualifierParser(fCursor, fCompilation).parseDeclaration());
 }
@@ -129,26 +139,30 @@ void FileCompiler::obeyPragma()
     const Token parameter = fCursor.expect(TokenKind::String, "a string");
     fSubject = parameter.offset;
     fCursor.expectPunctuation(')');
-    if (name.isWord("include"))
+    if (name.isWord("include")) {
         include(parameter.text);
-    else if (name.isWord("namespace"))
+    } else if (name.isWord("namespace")) {
         changeNamespace(parameter.text);
-    else if (!name.isWord("locale") && !name.isWord("instancelocale"))
+    } else if (!name.isWord("locale") && !name.isWord("instancelocale")) {
         warn("Pragma \"" + name.text + "\" not implemented by the compiler. Ignored");
+    }
 }
 
 void FileCompiler::include(const std::string& name)
 {
     const Limits& limits = fCompilation.options.limits;
-    if (fCompilation.includeDepth == limits.includeDepth)
+    if (fCompilation.includeDepth == limits.includeDepth) {
         fCursor.failAt(fSubject, "include is nested deeper than the limit includeDepth (" +
                                      std::to_string(limits.includeDepth) + ")");
-    if (++fCompilation.includeCount > limits.includeCount)
+    }
+    if (++fCompilation.includeCount > limits.includeCount) {
         fCursor.failAt(fSubject,
                        "more includes than the limit includeCount (" + std::to_string(limits.includeCount) + ")");
+    }
     const std::string path = findInclude(name, fSource.directory(), fCompilation.options.includeDirectories);
-    if (path.empty())
+    if (path.empty()) {
         fCursor.failAt(fSubject, "Could not open include file " + name);
+    }
     try {
         const SourceText source = SourceText::read(path, limits.fileBytes);
         ++fCompilation.includeDepth;

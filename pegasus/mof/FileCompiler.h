@@ -9,13 +9,13 @@
 
 namespace Pegasus::mof {
 
-/// Compiles the definitions of one file in order; an include is a further FileCompiler of the same compilation.
+// Compiles the definitions of one file in order; an include is a further FileCompiler of the same compilation.
 class FileCompiler
 {
   public:
     FileCompiler(const SourceText& source, Compilation& compilation);
 
-    /// Throws MofError.
+    // Throws MofError.
     void run();
 
   private:
@@ -32,7 +32,7 @@ class FileCompiler
     const SourceText& fSource;
     Compilation& fCompilation;
     TokenCursor fCursor;
-    std::size_t fSubject = 0; ///< offset of what an error of the current definition is about, unless it knows better
+    std::size_t fSubject = 0; // offset of what an error of the current definition is about, unless it knows better
 };
 
 } // namespace Pegasus::mof

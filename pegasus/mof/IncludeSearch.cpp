@@ -18,15 +18,20 @@ std::string findInclude(const std::string& name, const std::string& includingDir
                         const std::vector<std::string>& includeDirectories)
 {
     const bool isAbsolute = !name.empty() && name[0] == '/';
-    if (!isAbsolute && isFile(includingDirectory + name))
+    if (!isAbsolute && isFile(includingDirectory + name)) {
         return includingDirectory + name;
-    if (isFile(name))
+    }
+    if (isFile(name)) {
         return name;
-    if (isAbsolute)
+    }
+    if (isAbsolute) {
         return "";
-    for (const std::string& directory : includeDirectories)
-        if (isFile(directory + "/" + name))
+    }
+    for (const std::string& directory : includeDirectories) {
+        if (isFile(directory + "/" + name)) {
             return directory + "/" + name;
+        }
+    }
     return "";
 }
 

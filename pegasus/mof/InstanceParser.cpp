@@ -1,4 +1,5 @@
 #include "pegasus/mof/InstanceParser.h"
+
 #include "pegasus/mof/ValueBuilder.h"
 
 #include <Pegasus/Common/CIMObject.h>
@@ -16,7 +17,7 @@ bool isGiven(const ParsedInstance& parsed, const CIMName& name)
            std::any_of(parsed.open.begin(), parsed.open.end(), isSame);
 }
 
-/// A class that comes from a server may have the types already.
+// A class that comes from a server may have the types already.
 bool isEmbeddedObject(const CIMConstProperty& declared)
 {
     return declared.getType() == CIMTYPE_OBJECT ||
@@ -34,17 +35,20 @@ bool isEmbeddedInstance(const CIMConstProperty& declared)
 
 ParsedInstance InstanceParser::parse()
 {
-    if (!fCursor.skipWord("of"))
+    if (!fCursor.skipWord("of")) {
         fCursor.failExpected("'of'");
+    }
     ParsedInstance parsed;
     parsed.place = fCursor.place(fCursor.current().offset);
     parsed.itsClass = parseClass();
     parsed.instance = CIMInstance(parsed.itsClass.getClassName());
-    if (fCursor.skipWord("as"))
+    if (fCursor.skipWord("as")) {
         parsed.alias = fCursor.expect(TokenKind::Alias, "an alias").text;
+    }
     fCursor.expectPunctuation('{');
-    while (!fCursor.skipPunctuation('}'))
+    while (!fCursor.skipPunctuation('}')) {
         parseValue(parsed);
+    }
     fCursor.expectPunctuation(';');
     return parsed;
 }
@@ -53,26 +57,29 @@ CIMClass InstanceParser::parseClass()
 {
     const Token name = fCursor.expect(TokenKind::Identifier, "a class name");
     CIMClass found;
-    if (!fCompilation.handler.findClass(CIMName(name.text.c_str()), found))
+    if (!fCompilation.handler.findClass(CIMName(name.text.c_str()), found)) {
         fCursor.failAt(name.offset, "Error getting class " + name.text + " from namespace " +
                                         std::string(fCompilation.nameSpace.getString().getCString()) +
                                         ": CIM_ERR_NOT_FOUND: " + name.text);
+    }
     return found;
 }
 
-/// Qualifiers of instances have no meaning any more (DSP0004, 7.9): they are read and dropped.
+// Qualifiers of instances have no meaning any more (DSP0004, 7.9): they are read and dropped.
 void InstanceParser::parseValue(ParsedInstance& parsed)
 {
     fQualifiers.parseList();
     const Token word = fCursor.expect(TokenKind::Identifier, "a property name");
     const CIMConstClass itsClass = parsed.itsClass;
     const Uint32 index = itsClass.findProperty(CIMName(word.text.c_str()));
-    if (index == PEG_NOT_FOUND)
+    if (index == PEG_NOT_FOUND) {
         fCursor.failAt(word.offset, "class " + std::string(itsClass.getClassName().getString().getCString()) +
                                         " has no such property: " + word.text);
+    }
     const CIMConstProperty declared = itsClass.getProperty(index);
-    if (isGiven(parsed, declared.getName()))
+    if (isGiven(parsed, declared.getName())) {
         fCursor.failAt(word.offset, "property " + word.text + " is given twice");
+    }
     fCursor.expectPunctuation('=');
     setValue(parsed, declared);
     fCursor.expectPunctuation(';');
@@ -101,36 +108,42 @@ void InstanceParser::setValue(ParsedInstance& parsed, const CIMConstProperty& de
 
 CIMValue InstanceParser::embeddedValue(const Initializer& initializer, const CIMConstProperty& declared)
 {
-    if (initializer.isArray != declared.isArray())
+    if (initializer.isArray != declared.isArray()) {
         fCursor.failAt(initializer.offset,
                        declared.isArray() ? "expected an array" : "expected one value, not an array");
+    }
     Array<CIMInstance> instances;
     Array<CIMObject> objects;
     for (const Literal& element : initializer.elements) {
         instances.append(parseEmbedded(element));
         objects.append(CIMObject(instances[instances.size() - 1]));
     }
-    if (isEmbeddedObject(declared))
+    if (isEmbeddedObject(declared)) {
         return declared.isArray() ? CIMValue(objects) : CIMValue(objects[0]);
+    }
     return declared.isArray() ? CIMValue(instances) : CIMValue(instances[0]);
 }
 
-/// An embedded instance is a string that holds its MOF (DSP0004, EmbeddedInstance). Each nesting takes longer escapes
-/// for the quotes within, so the length of a string bounds the depth.
+// An embedded instance is a string that holds its MOF (DSP0004, EmbeddedInstance). Each nesting takes longer escapes
+// for the quotes within, so the length of a string bounds the depth.
 CIMInstance InstanceParser::parseEmbedded(const Literal& literal)
 {
-    if (literal.kind != Literal::Kind::String)
+    if (literal.kind != Literal::Kind::String) {
         fCursor.failAt(literal.offset, "expected a string with the MOF of an instance instead of " + literal.shown());
+    }
     const SourceText text("embedded instance", literal.text);
     try {
         TokenCursor cursor(text, fCursor.limits());
-        if (!cursor.skipWord("instance"))
+        if (!cursor.skipWord("instance")) {
             cursor.failExpected("'instance'");
+        }
         const ParsedInstance parsed = InstanceParser(cursor, fCompilation).parse();
-        if (!parsed.alias.empty() || !parsed.open.empty())
+        if (!parsed.alias.empty() || !parsed.open.empty()) {
             cursor.failAt(0, "an embedded instance has no alias and uses none that is not defined yet");
-        if (cursor.current().kind != TokenKind::End)
+        }
+        if (cursor.current().kind != TokenKind::End) {
             cursor.failExpected("the end of the string");
+        }
         return parsed.instance;
     } catch (const MofError& error) {
         fCursor.failAt(literal.offset, "in the embedded instance, line " + std::to_string(error.place().line) +

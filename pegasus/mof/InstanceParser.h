@@ -5,7 +5,7 @@
 
 namespace Pegasus::mof {
 
-/// Parses instances; the types of their values come from their classes. Throws MofError.
+// Parses instances; the types of their values come from their classes. Throws MofError.
 class InstanceParser
 {
   public:
@@ -14,7 +14,7 @@ class InstanceParser
     {
     }
 
-    /// The text behind the word "instance", up to and with the semicolon.
+    // The text behind the word "instance", up to and with the semicolon.
     ParsedInstance parse();
 
   private:

@@ -1,8 +1,8 @@
 #include "pegasus/mof/InstanceQueue.h"
 
-#include <algorithm>
-
 #include <Pegasus/Common/Exception.h>
+
+#include <algorithm>
 
 namespace Pegasus::mof {
 
@@ -36,13 +36,14 @@ void InstanceQueue::submit(ParsedInstance parsed)
 
 void InstanceQueue::finish() const
 {
-    if (fWaiting.empty())
+    if (fWaiting.empty()) {
         return;
+    }
     const OpenReference& reference = fWaiting.front().open.front();
     throw MofError(reference.place, "alias $" + reference.alias + " is not defined");
 }
 
-/// Goes on until a whole round changes nothing: each alias that gets a path may be what another instance waits for.
+// Goes on until a whole round changes nothing: each alias that gets a path may be what another instance waits for.
 void InstanceQueue::settle()
 {
     bool hasProgress = true;
@@ -53,8 +54,9 @@ void InstanceQueue::settle()
             if (it->open.empty()) {
                 const ParsedInstance complete = std::move(*it);
                 it = fWaiting.erase(it);
-                if (!fHandler.createInstance(complete.instance))
+                if (!fHandler.createInstance(complete.instance)) {
                     fHandler.warn(complete.place.text(), "the instance already exists, it is not changed");
+                }
             } else {
                 ++it;
             }
@@ -72,8 +74,9 @@ bool InstanceQueue::resolve(ParsedInstance& parsed) const
 {
     const auto isResolved = [this, &parsed](const OpenReference& reference) {
         const CIMObjectPath* path = fAliases.find(reference.alias);
-        if (path)
+        if (path) {
             addReference(parsed, reference.property, *path);
+        }
         return path != nullptr;
     };
     const auto kept = std::remove_if(parsed.open.begin(), parsed.open.end(), isResolved);
@@ -84,10 +87,12 @@ bool InstanceQueue::resolve(ParsedInstance& parsed) const
 
 bool InstanceQueue::nameAlias(ParsedInstance& parsed)
 {
-    if (parsed.alias.empty() || hasOpenKey(parsed))
+    if (parsed.alias.empty() || hasOpenKey(parsed)) {
         return false;
-    if (!fAliases.define(parsed.alias, parsed.instance.buildPath(parsed.itsClass)))
+    }
+    if (!fAliases.define(parsed.alias, parsed.instance.buildPath(parsed.itsClass))) {
         throw MofError(parsed.place, "alias $" + parsed.alias + " is already defined");
+    }
     parsed.alias.clear();
     return true;
 }

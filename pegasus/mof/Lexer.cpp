@@ -42,14 +42,15 @@ bool isPunctuation(char c)
 std::string shownByte(char c)
 {
     char text[16];
-    if (c > ' ' && c < 0x7F)
+    if (c > ' ' && c < 0x7F) {
         std::snprintf(text, sizeof text, "'%c'", c);
-    else
+    } else {
         std::snprintf(text, sizeof text, "byte 0x%02X", static_cast<unsigned char>(c));
+    }
     return text;
 }
 
-/// A code unit as UTF-8. Each half of a surrogate pair takes three bytes; CIM strings put the halves together again.
+// A code unit as UTF-8. Each half of a surrogate pair takes three bytes; CIM strings put the halves together again.
 void appendCodeUnit(std::string& value, unsigned unit)
 {
     if (unit < 0x80u) {
@@ -65,7 +66,7 @@ void appendCodeUnit(std::string& value, unsigned unit)
     value += static_cast<char>(0x80u | (unit & 0x3Fu));
 }
 
-/// What a one-letter escape stands for, or NUL if it is none.
+// What a one-letter escape stands for, or NUL if it is none.
 char simpleEscape(char letter)
 {
     switch (letter) {
@@ -92,32 +93,41 @@ char simpleEscape(char letter)
 
 Lexer::Lexer(const SourceText& source, const Limits& limits) : fSource(source), fText(source.text()), fLimits(limits)
 {
-    if (fText.compare(0, 3, kByteOrderMark) == 0)
+    if (fText.compare(0, 3, kByteOrderMark) == 0) {
         fAt = 3;
+    }
 }
 
 Token Lexer::next()
 {
     skipBlanksAndComments();
-    if (atEnd())
+    if (atEnd()) {
         return Token{TokenKind::End, "", fAt};
+    }
     const char c = peek();
-    if (startsName(c))
+    if (startsName(c)) {
         return word(TokenKind::Identifier, fAt);
-    if (isDigit(c) || c == '+' || c == '-' || c == '.')
+    }
+    if (isDigit(c) || c == '+' || c == '-' || c == '.') {
         return number();
-    if (c == '"')
+    }
+    if (c == '"') {
         return strings();
-    if (c == '\'')
+    }
+    if (c == '\'') {
         return character();
-    if (c == '$' && startsName(peek(1)))
+    }
+    if (c == '$' && startsName(peek(1))) {
         return word(TokenKind::Alias, ++fAt - 1);
-    if (isPunctuation(c))
+    }
+    if (isPunctuation(c)) {
         return Token{TokenKind::Punctuation, std::string(1, c), fAt++};
+    }
     if (c == '#') {
         Token directive = word(TokenKind::Pragma, ++fAt - 1);
-        if (toLower(directive.text) == "pragma")
+        if (toLower(directive.text) == "pragma") {
             return directive;
+        }
         fail(directive.offset, "unknown directive '#" + directive.text + "'");
     }
     fail(fAt, "unexpected " + shownByte(c));
@@ -126,52 +136,60 @@ Token Lexer::next()
 void Lexer::skipBlanksAndComments()
 {
     for (;;) {
-        while (!atEnd() && isBlank(peek()))
+        while (!atEnd() && isBlank(peek())) {
             ++fAt;
-        if (peek() == '/' && peek(1) == '/')
+        }
+        if (peek() == '/' && peek(1) == '/') {
             fAt = std::min(fText.find('\n', fAt), fText.size());
-        else if (peek() == '/' && peek(1) == '*')
+        } else if (peek() == '/' && peek(1) == '*') {
             skipBlockComment();
-        else
+        } else {
             return;
+        }
     }
 }
 
 void Lexer::skipBlockComment()
 {
     const std::size_t end = fText.find("*/", fAt + 2);
-    if (end == std::string::npos)
+    if (end == std::string::npos) {
         fail(fAt, "comment is not closed");
+    }
     fAt = end + 2;
 }
 
 Token Lexer::word(TokenKind kind, std::size_t start)
 {
     const std::size_t first = fAt;
-    while (continuesName(peek()))
+    while (continuesName(peek())) {
         ++fAt;
-    if (fAt - first > fLimits.tokenBytes)
+    }
+    if (fAt - first > fLimits.tokenBytes) {
         fail(start, "name is longer than the limit tokenBytes (" + std::to_string(fLimits.tokenBytes) + ")");
+    }
     return Token{kind, fText.substr(first, fAt - first), start};
 }
 
-/// Takes everything that can belong to a number; whether it is one in which base is decided where its value is made.
+// Takes everything that can belong to a number; whether it is one in which base is decided where its value is made.
 Token Lexer::number()
 {
     const std::size_t start = fAt;
     bool isReal = false;
-    if (peek() == '+' || peek() == '-')
+    if (peek() == '+' || peek() == '-') {
         ++fAt;
+    }
     const bool isHex = peek() == '0' && (peek(1) == 'x' || peek(1) == 'X');
     while (continuesName(peek()) || peek() == '.') {
         const bool isExponent = !isHex && isReal && (peek() == 'e' || peek() == 'E');
         isReal = isReal || peek() == '.';
         ++fAt;
-        if (isExponent && (peek() == '+' || peek() == '-'))
+        if (isExponent && (peek() == '+' || peek() == '-')) {
             ++fAt;
+        }
     }
-    if (fAt - start > fLimits.tokenBytes)
+    if (fAt - start > fLimits.tokenBytes) {
         fail(start, "number is longer than the limit tokenBytes (" + std::to_string(fLimits.tokenBytes) + ")");
+    }
     return Token{isReal ? TokenKind::Real : TokenKind::Integer, fText.substr(start, fAt - start), start};
 }
 
@@ -180,9 +198,10 @@ Token Lexer::strings()
     Token token{TokenKind::String, "", fAt};
     do {
         stringLiteral(token.text);
-        if (token.text.size() > fLimits.stringBytes)
+        if (token.text.size() > fLimits.stringBytes) {
             fail(token.offset,
                  "string is longer than the limit stringBytes (" + std::to_string(fLimits.stringBytes) + ")");
+        }
         skipBlanksAndComments();
     } while (peek() == '"');
     return token;
@@ -195,10 +214,12 @@ void Lexer::stringLiteral(std::string& value)
         const std::size_t plainEnd = std::min(fText.find_first_of("\"\\\n", fAt), fText.size());
         value.append(fText, fAt, plainEnd - fAt);
         fAt = plainEnd;
-        if (atEnd() || peek() == '\n')
+        if (atEnd() || peek() == '\n') {
             fail(start, "string is not closed on its line");
-        if (peek() == '"')
+        }
+        if (peek() == '"') {
             break;
+        }
         escape(value);
     }
     ++fAt;
@@ -212,8 +233,9 @@ void Lexer::escape(std::string& value)
         return;
     }
     const char meaning = simpleEscape(letter);
-    if (meaning == '\0')
+    if (meaning == '\0') {
         fail(fAt, "unknown escape sequence \\" + std::string(letter == '\0' ? "" : std::string(1, letter)));
+    }
     value += meaning;
     fAt += 2;
 }
@@ -224,12 +246,15 @@ void Lexer::hexEscape(std::string& value)
     fAt += 2;
     unsigned unit = 0;
     std::size_t digitCount = 0;
-    for (; digitCount < 4 && isHexDigit(peek()); ++digitCount, ++fAt)
+    for (; digitCount < 4 && isHexDigit(peek()); ++digitCount, ++fAt) {
         unit = unit * 16 + static_cast<unsigned>(std::stoi(std::string(1, peek()), nullptr, 16));
-    if (digitCount == 0)
+    }
+    if (digitCount == 0) {
         fail(start, "\\x needs one to four hexadecimal digits");
-    if (unit == 0)
+    }
+    if (unit == 0) {
         fail(start, "\\x0 is not a character");
+    }
     appendCodeUnit(value, unit);
 }
 
@@ -237,18 +262,22 @@ Token Lexer::character()
 {
     Token token{TokenKind::Character, "", fAt++};
     while (!atEnd() && peek() != '\'' && peek() != '\n') {
-        if (peek() == '\\')
+        if (peek() == '\\') {
             escape(token.text);
-        else
+        } else {
             token.text += fText[fAt++];
-        if (token.text.size() > 4)
+        }
+        if (token.text.size() > 4) {
             break;
+        }
     }
-    if (peek() != '\'')
+    if (peek() != '\'') {
         fail(token.offset, "character literal is not closed after one character");
+    }
     ++fAt;
-    if (token.text.empty())
+    if (token.text.empty()) {
         fail(token.offset, "character literal is empty");
+    }
     return token;
 }
 

@@ -6,15 +6,15 @@
 
 namespace Pegasus::mof {
 
-/// Cuts a source text into tokens; blanks and comments go, adjacent string literals become one token.
-///
-/// Ownership: keeps references to the text and the limits.
+// Cuts a source text into tokens; blanks and comments go, adjacent string literals become one token.
+//
+// Ownership: keeps references to the text and the limits.
 class Lexer
 {
   public:
     Lexer(const SourceText& source, const Limits& limits);
 
-    /// Throws MofError at the offending byte.
+    // Throws MofError at the offending byte.
     Token next();
 
   private:

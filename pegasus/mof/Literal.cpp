@@ -7,12 +7,15 @@ namespace {
 Literal keywordLiteral(TokenCursor& cursor)
 {
     const std::size_t offset = cursor.current().offset;
-    if (cursor.skipWord("null"))
+    if (cursor.skipWord("null")) {
         return {Literal::Kind::Null, "", offset};
-    if (cursor.skipWord("true"))
+    }
+    if (cursor.skipWord("true")) {
         return {Literal::Kind::Boolean, "true", offset};
-    if (cursor.skipWord("false"))
+    }
+    if (cursor.skipWord("false")) {
         return {Literal::Kind::Boolean, "false", offset};
+    }
     cursor.failExpected("a value");
 }
 
@@ -63,9 +66,10 @@ Initializer parseArrayInitializer(TokenCursor& cursor)
     result.offset = cursor.current().offset;
     cursor.expectPunctuation('{');
     do {
-        if (result.elements.size() == cursor.limits().arrayElementCount)
+        if (result.elements.size() == cursor.limits().arrayElementCount) {
             cursor.fail("array has more elements than the limit arrayElementCount (" +
                         std::to_string(cursor.limits().arrayElementCount) + ")");
+        }
         result.elements.push_back(parseLiteral(cursor));
     } while (cursor.skipPunctuation(','));
     cursor.expectPunctuation('}');
@@ -74,8 +78,9 @@ Initializer parseArrayInitializer(TokenCursor& cursor)
 
 Initializer parseInitializer(TokenCursor& cursor)
 {
-    if (cursor.atPunctuation('{'))
+    if (cursor.atPunctuation('{')) {
         return parseArrayInitializer(cursor);
+    }
     Initializer result;
     result.offset = cursor.current().offset;
     result.elements.push_back(parseLiteral(cursor));

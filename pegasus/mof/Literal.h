@@ -8,13 +8,13 @@
 
 namespace Pegasus::mof {
 
-/// A constant as written, before it is known which type it must have.
+// A constant as written, before it is known which type it must have.
 struct Literal
 {
     enum class Kind
     {
         Null,
-        Boolean, ///< text: "true" or "false"
+        Boolean, // text: "true" or "false"
         Integer,
         Real,
         String,
@@ -26,25 +26,25 @@ struct Literal
     std::string text;
     std::size_t offset = 0;
 
-    /// How a diagnostic shows it: 256, "a string", …
+    // How a diagnostic shows it: 256, "a string", …
     std::string shown() const;
 };
 
-/// What stands behind an equal sign, or in a qualifier's parentheses or braces.
+// What stands behind an equal sign, or in a qualifier's parentheses or braces.
 struct Initializer
 {
     bool isArray = false;
-    std::vector<Literal> elements; ///< exactly one if it is no array
+    std::vector<Literal> elements; // exactly one if it is no array
     std::size_t offset = 0;
 
     bool isNull() const { return !isArray && elements.front().kind == Literal::Kind::Null; }
 };
 
-/// Throw MofError.
+// Throw MofError.
 Literal parseLiteral(TokenCursor& cursor);
-/// The braces of an array are expected at the cursor.
+// The braces of an array are expected at the cursor.
 Initializer parseArrayInitializer(TokenCursor& cursor);
-/// Either form.
+// Either form.
 Initializer parseInitializer(TokenCursor& cursor);
 
 } // namespace Pegasus::mof

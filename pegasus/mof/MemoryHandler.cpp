@@ -1,4 +1,5 @@
 #include "pegasus/mof/MemoryHandler.h"
+
 #include "pegasus/mof/Token.h"
 
 #include <Pegasus/Common/Exception.h>
@@ -16,8 +17,9 @@ void inheritProperties(CIMClass& whole, const CIMConstClass& superClass)
 {
     for (Uint32 i = 0; i < superClass.getPropertyCount(); ++i) {
         const CIMConstProperty property = superClass.getProperty(i);
-        if (whole.findProperty(property.getName()) == PEG_NOT_FOUND)
+        if (whole.findProperty(property.getName()) == PEG_NOT_FOUND) {
             whole.addProperty(property.clone());
+        }
     }
 }
 
@@ -32,16 +34,18 @@ void MemoryHandler::useNamespace(const CIMNamespaceName&)
 bool MemoryHandler::findQualifier(const CIMName& name, CIMQualifierDecl& declaration)
 {
     const auto found = fQualifiers.find(keyOf(name));
-    if (found != fQualifiers.end())
+    if (found != fQualifiers.end()) {
         declaration = found->second;
+    }
     return found != fQualifiers.end();
 }
 
 bool MemoryHandler::findClass(const CIMName& name, CIMClass& found)
 {
     const auto held = fWholeClasses.find(keyOf(name));
-    if (held != fWholeClasses.end())
+    if (held != fWholeClasses.end()) {
         found = held->second;
+    }
     return held != fWholeClasses.end();
 }
 
@@ -53,15 +57,17 @@ void MemoryHandler::declareQualifier(const CIMQualifierDecl& declaration)
 bool MemoryHandler::createClass(const CIMClass& newClass)
 {
     const std::string key = keyOf(newClass.getClassName());
-    if (fWholeClasses.count(key) != 0)
+    if (fWholeClasses.count(key) != 0) {
         return false;
+    }
     CIMClass whole = newClass.clone();
     const CIMName& superName = newClass.getSuperClassName();
     if (!superName.isNull()) {
         CIMClass superClass;
-        if (!findClass(superName, superClass))
+        if (!findClass(superName, superClass)) {
             throw CIMException(CIM_ERR_INVALID_SUPERCLASS,
                                String("superclass does not exist: ") + superName.getString());
+        }
         inheritProperties(whole, superClass);
     }
     fWholeClasses[key] = whole;

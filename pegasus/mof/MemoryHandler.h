@@ -8,8 +8,8 @@
 
 namespace Pegasus::mof {
 
-/// Keeps definitions in memory, one namespace at a time, and checks no more than that superclasses exist.
-/// For looking at a file without a server.
+// Keeps definitions in memory, one namespace at a time, and checks no more than that superclasses exist.
+// For looking at a file without a server.
 class MemoryHandler : public DefinitionHandler
 {
   public:
@@ -22,15 +22,15 @@ class MemoryHandler : public DefinitionHandler
     void warn(const std::string& place, const std::string& text) override;
 
     const std::map<std::string, CIMQualifierDecl>& qualifiers() const noexcept { return fQualifiers; }
-    /// As declared, in order.
+    // As declared, in order.
     const std::vector<CIMClass>& classes() const noexcept { return fClasses; }
     const std::vector<CIMInstance>& instances() const noexcept { return fInstances; }
-    /// "place: warning: text"
+    // "place: warning: text"
     const std::vector<std::string>& warnings() const noexcept { return fWarnings; }
 
   private:
-    std::map<std::string, CIMQualifierDecl> fQualifiers; ///< by lower-case name, as the next
-    std::map<std::string, CIMClass> fWholeClasses;       ///< with inherited properties
+    std::map<std::string, CIMQualifierDecl> fQualifiers; // by lower-case name, as the next
+    std::map<std::string, CIMClass> fWholeClasses;       // with inherited properties
     std::vector<CIMClass> fClasses;
     std::vector<CIMInstance> fInstances;
     std::vector<std::string> fWarnings;

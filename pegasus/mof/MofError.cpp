@@ -14,15 +14,16 @@ MofError::MofError(SourcePlace place, const std::string& cause)
 
 namespace {
 
-/// Blanks up to the column; tabs stay tabs, so that the caret lines up in any terminal.
+// Blanks up to the column; tabs stay tabs, so that the caret lines up in any terminal.
 std::string caretIndent(const std::string& lineText, std::size_t column)
 {
     std::string indent;
     for (std::size_t i = 0; i + 1 < column && i < lineText.size(); ++i) {
         const auto byte = static_cast<unsigned char>(lineText[i]);
         const bool continuesCharacter = (byte & 0xC0u) == 0x80u;
-        if (!continuesCharacter)
+        if (!continuesCharacter) {
             indent += byte == '\t' ? '\t' : ' ';
+        }
     }
     return indent;
 }
@@ -32,8 +33,9 @@ std::string caretIndent(const std::string& lineText, std::size_t column)
 std::string MofError::diagnostic() const
 {
     std::string text = std::string(what()) + "\n";
-    if (!fPlace.lineText.empty())
+    if (!fPlace.lineText.empty()) {
         text += fPlace.lineText + "\n" + caretIndent(fPlace.lineText, fPlace.column) + "^\n";
+    }
     return text;
 }
 

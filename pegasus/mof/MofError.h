@@ -6,19 +6,19 @@
 
 namespace Pegasus::mof {
 
-/// A place in a source text; lines and columns count from 1, columns in bytes.
+// A place in a source text; lines and columns count from 1, columns in bytes.
 struct SourcePlace
 {
     std::string file;
     std::size_t line = 1;
     std::size_t column = 1;
-    std::string lineText; ///< the whole line, for the caret; empty where none can be shown
+    std::string lineText; // the whole line, for the caret; empty where none can be shown
 
-    /// "file:line:column"
+    // "file:line:column"
     std::string text() const;
 };
 
-/// What stopped a compilation, and where.
+// What stopped a compilation, and where.
 class MofError : public std::runtime_error
 {
   public:
@@ -27,7 +27,7 @@ class MofError : public std::runtime_error
     const SourcePlace& place() const noexcept { return fPlace; }
     const std::string& cause() const noexcept { return fCause; }
 
-    /// "file:line:column: error: cause", the line, and a caret below the column; ends with a newline.
+    // "file:line:column: error: cause", the line, and a caret below the column; ends with a newline.
     std::string diagnostic() const;
 
   private:
@@ -35,14 +35,14 @@ class MofError : public std::runtime_error
     std::string fCause;
 };
 
-/// A source file that could not be opened or, once open, not be read.
+// A source file that could not be opened or, once open, not be read.
 class FileError : public std::runtime_error
 {
   public:
     enum class Kind
     {
         NotOpened,
-        NotReadable ///< a directory, too large, a device that fails
+        NotReadable // a directory, too large, a device that fails
     };
 
     FileError(Kind kind, const std::string& text) : std::runtime_error(text), fKind(kind) {}

@@ -1,4 +1,5 @@
 #include "pegasus/mof/QualifierParser.h"
+
 #include "pegasus/mof/DataType.h"
 #include "pegasus/mof/ValueBuilder.h"
 
@@ -22,13 +23,15 @@ const CIMScope* findScope(const Token& word)
         {"reference", CIMScope::REFERENCE},   {"method", CIMScope::METHOD},
         {"parameter", CIMScope::PARAMETER},   {"any", CIMScope::ANY},
     };
-    for (const ScopeWord& known : kWords)
-        if (word.isWord(known.word))
+    for (const ScopeWord& known : kWords) {
+        if (word.isWord(known.word)) {
             return &known.scope;
+        }
+    }
     return nullptr;
 }
 
-/// Sets one of a pair of opposite flavors.
+// Sets one of a pair of opposite flavors.
 void choose(CIMFlavor& flavor, const CIMFlavor& chosen, const CIMFlavor& opposite)
 {
     flavor.removeFlavor(opposite);
@@ -46,17 +49,20 @@ bool isAmong(const Qualifiers& qualifiers, const CIMName& name)
 Qualifiers QualifierParser::parseList()
 {
     Qualifiers list;
-    if (!fCursor.skipPunctuation('['))
+    if (!fCursor.skipPunctuation('[')) {
         return list;
+    }
     do {
         const std::size_t offset = fCursor.current().offset;
-        if (list.size() == fCursor.limits().memberCount)
+        if (list.size() == fCursor.limits().memberCount) {
             fCursor.fail("more qualifiers than the limit memberCount (" + std::to_string(fCursor.limits().memberCount) +
                          ")");
+        }
         const CIMQualifier qualifier = parseUse();
-        if (isAmong(list, qualifier.getName()))
+        if (isAmong(list, qualifier.getName())) {
             fCursor.failAt(offset, "qualifier " + std::string(qualifier.getName().getString().getCString()) +
                                        " is given twice");
+        }
         list.push_back(qualifier);
     } while (fCursor.skipPunctuation(','));
     fCursor.expectPunctuation(']');
@@ -69,32 +75,36 @@ CIMQualifier QualifierParser::parseUse()
     const CIMQualifierDecl declaration = declarationOf(name);
     const CIMValue value = parseParameter(declaration);
     CIMFlavor flavor;
-    if (fCursor.skipPunctuation(':'))
+    if (fCursor.skipPunctuation(':')) {
         flavor = parseUseFlavors(declaration.getFlavor());
+    }
     return CIMQualifier(CIMName(name.text.c_str()), value, flavor);
 }
 
 CIMQualifierDecl QualifierParser::declarationOf(const Token& name)
 {
     CIMQualifierDecl declaration;
-    if (!fCompilation.handler.findQualifier(CIMName(name.text.c_str()), declaration))
+    if (!fCompilation.handler.findQualifier(CIMName(name.text.c_str()), declaration)) {
         fCursor.failAt(name.offset, "Could not find declaration for Qualifier named " + name.text);
+    }
     return declaration;
 }
 
-/// Without a parameter a boolean qualifier is true, any other null (DSP0004, 7.6.3).
+// Without a parameter a boolean qualifier is true, any other null (DSP0004, 7.6.3).
 CIMValue QualifierParser::parseParameter(const CIMQualifierDecl& declaration)
 {
     const ValueType type{declaration.getType(), declaration.isArray(), declaration.getArraySize()};
-    if (fCursor.atPunctuation('{'))
+    if (fCursor.atPunctuation('{')) {
         return buildValue(fCursor, fCompilation.aliases, parseArrayInitializer(fCursor), type);
+    }
     if (fCursor.skipPunctuation('(')) {
         const Initializer initializer = parseInitializer(fCursor);
         fCursor.expectPunctuation(')');
         return buildValue(fCursor, fCompilation.aliases, initializer, type);
     }
-    if (type.type == CIMTYPE_BOOLEAN && !type.isArray)
+    if (type.type == CIMTYPE_BOOLEAN && !type.isArray) {
         return CIMValue(Boolean(true));
+    }
     return CIMValue(type.type, type.isArray);
 }
 
@@ -103,26 +113,30 @@ CIMQualifierDecl QualifierParser::parseDeclaration()
     const CIMName name = parseName(fCursor, "a qualifier name");
     fCursor.expectPunctuation(':');
     ValueType type;
-    if (!isDataType(fCursor.current(), type.type))
+    if (!isDataType(fCursor.current(), type.type)) {
         fCursor.failExpected("a data type");
+    }
     fCursor.take();
     parseArraySuffix(fCursor, type);
     CIMValue value(type.type, type.isArray, type.arraySize);
-    if (fCursor.skipPunctuation('='))
+    if (fCursor.skipPunctuation('=')) {
         value = buildValue(fCursor, fCompilation.aliases, parseInitializer(fCursor), type);
+    }
 
     CIMScope scope;
     CIMFlavor flavor(CIMFlavor::DEFAULTS);
     while (fCursor.skipPunctuation(',')) {
-        if (fCursor.skipWord("scope"))
+        if (fCursor.skipWord("scope")) {
             scope = parseScopes();
-        else if (fCursor.skipWord("flavor"))
+        } else if (fCursor.skipWord("flavor")) {
             flavor = parseDeclaredFlavors();
-        else
+        } else {
             fCursor.failExpected("'Scope' or 'Flavor'");
+        }
     }
-    if (scope.equal(CIMScope()))
+    if (scope.equal(CIMScope())) {
         fCursor.failExpected("', Scope (…)'");
+    }
     fCursor.expectPunctuation(';');
     return CIMQualifierDecl(name, value, scope, flavor, type.arraySize);
 }
@@ -133,8 +147,9 @@ CIMScope QualifierParser::parseScopes()
     fCursor.expectPunctuation('(');
     do {
         const CIMScope* scope = findScope(fCursor.current());
-        if (!scope)
+        if (!scope) {
             fCursor.failExpected("a scope");
+        }
         scopes.addScope(*scope);
         fCursor.take();
     } while (fCursor.skipPunctuation(','));
@@ -142,12 +157,13 @@ CIMScope QualifierParser::parseScopes()
     return scopes;
 }
 
-/// The words behind a use: they stand side by side.
+// The words behind a use: they stand side by side.
 CIMFlavor QualifierParser::parseUseFlavors(CIMFlavor flavor)
 {
     do {
-        if (!applyFlavorWord(flavor))
+        if (!applyFlavorWord(flavor)) {
             fCursor.failExpected("a flavor");
+        }
     } while (fCursor.current().kind == TokenKind::Identifier);
     return flavor;
 }
@@ -157,8 +173,9 @@ CIMFlavor QualifierParser::parseDeclaredFlavors()
     CIMFlavor flavor(CIMFlavor::DEFAULTS);
     fCursor.expectPunctuation('(');
     do {
-        if (!applyFlavorWord(flavor))
+        if (!applyFlavorWord(flavor)) {
             fCursor.failExpected("a flavor");
+        }
     } while (fCursor.skipPunctuation(','));
     fCursor.expectPunctuation(')');
     return flavor;
@@ -166,20 +183,21 @@ CIMFlavor QualifierParser::parseDeclaredFlavors()
 
 bool QualifierParser::applyFlavorWord(CIMFlavor& flavor)
 {
-    if (fCursor.skipWord("enableoverride"))
+    if (fCursor.skipWord("enableoverride")) {
         choose(flavor, CIMFlavor::OVERRIDABLE, CIMFlavor::DISABLEOVERRIDE);
-    else if (fCursor.skipWord("disableoverride"))
+    } else if (fCursor.skipWord("disableoverride")) {
         choose(flavor, CIMFlavor::DISABLEOVERRIDE, CIMFlavor::OVERRIDABLE);
-    else if (fCursor.skipWord("tosubclass"))
+    } else if (fCursor.skipWord("tosubclass")) {
         choose(flavor, CIMFlavor::TOSUBCLASS, CIMFlavor::RESTRICTED);
-    else if (fCursor.skipWord("restricted"))
+    } else if (fCursor.skipWord("restricted")) {
         choose(flavor, CIMFlavor::RESTRICTED, CIMFlavor::TOSUBCLASS);
-    else if (fCursor.skipWord("toinstance"))
+    } else if (fCursor.skipWord("toinstance")) {
         flavor.addFlavor(CIMFlavor::TOINSTANCE);
-    else if (fCursor.skipWord("translatable"))
+    } else if (fCursor.skipWord("translatable")) {
         flavor.addFlavor(CIMFlavor::TRANSLATABLE);
-    else
+    } else {
         return false;
+    }
     return true;
 }
 

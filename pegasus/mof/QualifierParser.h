@@ -12,15 +12,15 @@ namespace Pegasus::mof {
 
 using Qualifiers = std::vector<CIMQualifier>;
 
-/// Parses uses and declarations of qualifiers. All functions throw MofError.
+// Parses uses and declarations of qualifiers. All functions throw MofError.
 class QualifierParser
 {
   public:
     QualifierParser(TokenCursor& cursor, Compilation& compilation) : fCursor(cursor), fCompilation(compilation) {}
 
-    /// A list in brackets, or nothing. A use without flavors of its own has the flavor NONE; its declaration decides.
+    // A list in brackets, or nothing. A use without flavors of its own has the flavor NONE; its declaration decides.
     Qualifiers parseList();
-    /// The text behind the word "qualifier", up to and with the semicolon.
+    // The text behind the word "qualifier", up to and with the semicolon.
     CIMQualifierDecl parseDeclaration();
 
   private:
@@ -36,11 +36,12 @@ class QualifierParser
     Compilation& fCompilation;
 };
 
-/// Adds a parsed list to a class, property, method or parameter.
+// Adds a parsed list to a class, property, method or parameter.
 template <class Owner> void addQualifiers(Owner& owner, const Qualifiers& qualifiers)
 {
-    for (const CIMQualifier& qualifier : qualifiers)
+    for (const CIMQualifier& qualifier : qualifiers) {
         owner.addQualifier(qualifier);
+    }
 }
 
 } // namespace Pegasus::mof

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cerrno>
 #include <cstring>
+
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -11,7 +12,7 @@ namespace Pegasus::mof {
 
 namespace {
 
-/// Long lines are cut for the diagnostic: a megabyte on one line helps nobody.
+// Long lines are cut for the diagnostic: a megabyte on one line helps nobody.
 constexpr std::size_t kShownLineBytes = 240;
 
 class Descriptor
@@ -20,8 +21,9 @@ class Descriptor
     explicit Descriptor(const std::string& path) : fDescriptor(::open(path.c_str(), O_RDONLY | O_CLOEXEC)) {}
     ~Descriptor()
     {
-        if (fDescriptor >= 0)
+        if (fDescriptor >= 0) {
             ::close(fDescriptor);
+        }
     }
     Descriptor(const Descriptor&) = delete;
     Descriptor& operator=(const Descriptor&) = delete;
@@ -35,9 +37,9 @@ class Descriptor
 ssize_t readSome(int descriptor, char* buffer, std::size_t size)
 {
     ssize_t count = -1;
-    do
+    do {
         count = ::read(descriptor, buffer, size);
-    while (count < 0 && errno == EINTR);
+    } while (count < 0 && errno == EINTR);
     return count;
 }
 
@@ -47,15 +49,18 @@ std::string readAll(int descriptor, const std::string& path, std::size_t maxByte
     char buffer[65536];
     for (;;) {
         const ssize_t count = readSome(descriptor, buffer, sizeof buffer);
-        if (count < 0)
+        if (count < 0) {
             throw FileError(FileError::Kind::NotReadable, "Can't read file " + path + ": " + std::strerror(errno));
-        if (count == 0)
+        }
+        if (count == 0) {
             return text;
+        }
         text.append(buffer, static_cast<std::size_t>(count));
-        if (text.size() > maxBytes)
+        if (text.size() > maxBytes) {
             throw FileError(FileError::Kind::NotReadable, "Can't read file " + path +
                                                               ": larger than the limit fileBytes (" +
                                                               std::to_string(maxBytes) + ")");
+        }
     }
 }
 
@@ -65,10 +70,12 @@ SourceText SourceText::read(const std::string& path, std::size_t maxBytes)
 {
     const Descriptor file(path);
     struct stat status = {};
-    if (file.get() < 0 || ::fstat(file.get(), &status) != 0)
+    if (file.get() < 0 || ::fstat(file.get(), &status) != 0) {
         throw FileError(FileError::Kind::NotOpened, "Can't open file " + path);
-    if (S_ISDIR(status.st_mode))
+    }
+    if (S_ISDIR(status.st_mode)) {
         throw FileError(FileError::Kind::NotReadable, "Can't read file " + path + ": it is a directory");
+    }
     return SourceText(path, readAll(file.get(), path, maxBytes));
 }
 
@@ -80,8 +87,9 @@ std::string SourceText::directory() const
 
 std::size_t SourceText::lineOf(std::size_t offset) const
 {
-    if (offset < fCountedOffset)
+    if (offset < fCountedOffset) {
         fCountedOffset = fCountedBreaks = 0;
+    }
     const auto begin = fText.begin();
     const auto at = [&begin](std::size_t o) { return begin + static_cast<std::ptrdiff_t>(o); };
     fCountedBreaks += static_cast<std::size_t>(std::count(at(fCountedOffset), at(offset), '\n'));
@@ -100,8 +108,9 @@ SourcePlace SourceText::place(std::size_t offset) const
     place.file = fName;
     place.line = lineOf(offset);
     place.column = 1 + offset - lineStart;
-    if (lineEnd - lineStart <= kShownLineBytes)
+    if (lineEnd - lineStart <= kShownLineBytes) {
         place.lineText = fText.substr(lineStart, lineEnd - lineStart);
+    }
     return place;
 }
 

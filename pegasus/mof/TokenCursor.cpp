@@ -11,8 +11,9 @@ TokenCursor::TokenCursor(const SourceText& source, const Limits& limits)
 
 const Token& TokenCursor::current()
 {
-    if (!fIsCut)
+    if (!fIsCut) {
         fCurrent = fLexer.next();
+    }
     fIsCut = true;
     return fCurrent;
 }
@@ -26,30 +27,34 @@ Token TokenCursor::take()
 
 bool TokenCursor::skipPunctuation(char sign)
 {
-    if (!atPunctuation(sign))
+    if (!atPunctuation(sign)) {
         return false;
+    }
     take();
     return true;
 }
 
 bool TokenCursor::skipWord(std::string_view lowerWord)
 {
-    if (!atWord(lowerWord))
+    if (!atWord(lowerWord)) {
         return false;
+    }
     take();
     return true;
 }
 
 void TokenCursor::expectPunctuation(char sign)
 {
-    if (!skipPunctuation(sign))
+    if (!skipPunctuation(sign)) {
         failExpected(std::string("'") + sign + "'");
+    }
 }
 
 Token TokenCursor::expect(TokenKind kind, std::string_view what)
 {
-    if (current().kind != kind)
+    if (current().kind != kind) {
         failExpected(what);
+    }
     return take();
 }
 

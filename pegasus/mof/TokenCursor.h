@@ -6,24 +6,24 @@
 
 namespace Pegasus::mof {
 
-/// A parser's view of a text: one token of look-ahead, and the ways to insist on the next one.
-/// A token is only cut when it is looked at, so that a fault behind a definition does not spoil the definition.
+// A parser's view of a text: one token of look-ahead, and the ways to insist on the next one.
+// A token is only cut when it is looked at, so that a fault behind a definition does not spoil the definition.
 class TokenCursor
 {
   public:
     TokenCursor(const SourceText& source, const Limits& limits);
 
     const Token& current();
-    /// Returns the current token and moves on.
+    // Returns the current token and moves on.
     Token take();
 
     bool atPunctuation(char sign) { return current().isPunctuation(sign); }
     bool atWord(std::string_view lowerWord) { return current().isWord(lowerWord); }
-    /// Moves on and returns true if the current token is this one.
+    // Moves on and returns true if the current token is this one.
     bool skipPunctuation(char sign);
     bool skipWord(std::string_view lowerWord);
 
-    /// Throw MofError "expected … instead of …" at the current token unless it is of this kind.
+    // Throw MofError "expected … instead of …" at the current token unless it is of this kind.
     void expectPunctuation(char sign);
     Token expect(TokenKind kind, std::string_view what);
 
@@ -38,7 +38,7 @@ class TokenCursor
     const Limits& fLimits;
     Lexer fLexer;
     Token fCurrent;
-    bool fIsCut = false; ///< fCurrent is the current token
+    bool fIsCut = false; // fCurrent is the current token
 };
 
 } // namespace Pegasus::mof

@@ -1,17 +1,17 @@
 #include "pegasus/mof/ValueBuilder.h"
 
+#include <Pegasus/Common/CIMDateTime.h>
+#include <Pegasus/Common/Exception.h>
+
 #include <charconv>
 #include <cmath>
 #include <limits>
-
-#include <Pegasus/Common/CIMDateTime.h>
-#include <Pegasus/Common/Exception.h>
 
 namespace Pegasus::mof {
 
 namespace {
 
-/// Converts the literals of one value; holds what every conversion needs.
+// Converts the literals of one value; holds what every conversion needs.
 class Converter
 {
   public:
@@ -31,8 +31,9 @@ class Converter
   private:
     void require(const Literal& literal, Literal::Kind kind) const
     {
-        if (literal.kind != kind)
+        if (literal.kind != kind) {
             invalid(literal);
+        }
     }
     [[noreturn]] void invalid(const Literal& literal) const
     {
@@ -50,26 +51,30 @@ bool parseDigits(const char* begin, const char* end, int base, Uint64& magnitude
     return error == std::errc() && stop == end && begin != end;
 }
 
-/// DSP0004: 0x… hexadecimal, …b binary, 0… octal, else decimal; the sign is gone already.
+// DSP0004: 0x… hexadecimal, …b binary, 0… octal, else decimal; the sign is gone already.
 bool parseMagnitude(const std::string& text, std::size_t start, Uint64& magnitude)
 {
     const char* begin = text.data() + start;
     const char* end = text.data() + text.size();
-    if (begin == end)
+    if (begin == end) {
         return false;
+    }
     const bool hasZero = *begin == '0' && end - begin > 1;
-    if (hasZero && (begin[1] == 'x' || begin[1] == 'X'))
+    if (hasZero && (begin[1] == 'x' || begin[1] == 'X')) {
         return parseDigits(begin + 2, end, 16, magnitude);
-    if (end[-1] == 'b' || end[-1] == 'B')
+    }
+    if (end[-1] == 'b' || end[-1] == 'B') {
         return parseDigits(begin, end - 1, 2, magnitude);
+    }
     return parseDigits(begin, end, hasZero ? 8 : 10, magnitude);
 }
 
 template <class T> bool fits(Uint64 magnitude, bool isNegative)
 {
     const auto most = static_cast<Uint64>(std::numeric_limits<T>::max());
-    if (!isNegative)
+    if (!isNegative) {
         return magnitude <= most;
+    }
     return magnitude == 0 || (std::is_signed_v<T> && magnitude <= most + 1);
 }
 
@@ -79,23 +84,26 @@ template <class T> T Converter::integer(const Literal& literal) const
     const bool isNegative = literal.text[0] == '-';
     const bool hasSign = isNegative || literal.text[0] == '+';
     Uint64 magnitude = 0;
-    if (!parseMagnitude(literal.text, hasSign ? 1 : 0, magnitude) || !fits<T>(magnitude, isNegative))
+    if (!parseMagnitude(literal.text, hasSign ? 1 : 0, magnitude) || !fits<T>(magnitude, isNegative)) {
         invalid(literal);
+    }
     return static_cast<T>(isNegative ? Uint64(0) - magnitude : magnitude);
 }
 
 template <class T> T Converter::real(const Literal& literal) const
 {
-    if (literal.kind == Literal::Kind::Integer)
+    if (literal.kind == Literal::Kind::Integer) {
         return static_cast<T>(literal.text[0] == '-' ? static_cast<Real64>(integer<Sint64>(literal))
                                                      : static_cast<Real64>(integer<Uint64>(literal)));
+    }
     require(literal, Literal::Kind::Real);
     const char* begin = literal.text.data() + (literal.text[0] == '+' ? 1 : 0);
     const char* end = literal.text.data() + literal.text.size();
     T value = 0;
     const auto [stop, error] = std::from_chars(begin, end, value);
-    if (error != std::errc() || stop != end || !std::isfinite(value) || end[-1] == '.')
+    if (error != std::errc() || stop != end || !std::isfinite(value) || end[-1] == '.') {
         invalid(literal);
+    }
     return value;
 }
 
@@ -107,12 +115,14 @@ Boolean Converter::boolean(const Literal& literal) const
 
 Char16 Converter::character(const Literal& literal) const
 {
-    if (literal.kind == Literal::Kind::Integer)
+    if (literal.kind == Literal::Kind::Integer) {
         return Char16(integer<Uint16>(literal));
+    }
     require(literal, Literal::Kind::Character);
     const String text = cimString(fCursor, literal.text, literal.offset);
-    if (text.size() != 1)
+    if (text.size() != 1) {
         invalid(literal);
+    }
     return text[0];
 }
 
@@ -136,8 +146,9 @@ CIMObjectPath Converter::reference(const Literal& literal) const
 {
     if (literal.kind == Literal::Kind::Alias) {
         const CIMObjectPath* path = fAliases.find(literal.text);
-        if (!path)
+        if (!path) {
             fCursor.failAt(literal.offset, "alias $" + literal.text + " is not defined");
+        }
         return *path;
     }
     try {
@@ -150,13 +161,15 @@ CIMObjectPath Converter::reference(const Literal& literal) const
 template <class T, class Convert>
 CIMValue assemble(const TokenCursor& cursor, const Initializer& initializer, const Convert& convert)
 {
-    if (!initializer.isArray)
+    if (!initializer.isArray) {
         return CIMValue(T(convert(initializer.elements.front())));
+    }
     Array<T> values;
     values.reserveCapacity(static_cast<Uint32>(initializer.elements.size()));
     for (const Literal& literal : initializer.elements) {
-        if (literal.kind == Literal::Kind::Null)
+        if (literal.kind == Literal::Kind::Null) {
             cursor.failAt(literal.offset, "an array cannot hold null elements");
+        }
         values.append(convert(literal));
     }
     return CIMValue(values);
@@ -164,15 +177,18 @@ CIMValue assemble(const TokenCursor& cursor, const Initializer& initializer, con
 
 void checkShape(const TokenCursor& cursor, const Initializer& initializer, const ValueType& type)
 {
-    if (initializer.isArray != type.isArray)
+    if (initializer.isArray != type.isArray) {
         cursor.failAt(initializer.offset, std::string("type mismatch: ") +
                                               (type.isArray ? "an array of " : "a single ") +
                                               cimTypeToString(type.type) + " value is expected");
-    if (type.arraySize != 0 && initializer.elements.size() != type.arraySize)
+    }
+    if (type.arraySize != 0 && initializer.elements.size() != type.arraySize) {
         cursor.failAt(initializer.offset, "type mismatch: " + std::to_string(initializer.elements.size()) +
                                               " elements for an array of " + std::to_string(type.arraySize));
-    if (type.isArray && type.type == CIMTYPE_REFERENCE)
+    }
+    if (type.isArray && type.type == CIMTYPE_REFERENCE) {
         cursor.failAt(initializer.offset, "type mismatch: there are no arrays of references");
+    }
 }
 
 template <class T>
@@ -209,8 +225,9 @@ CIMValue assembleOther(const TokenCursor& cursor, const Initializer& initializer
 CIMValue buildValue(const TokenCursor& cursor, const AliasTable& aliases, const Initializer& initializer,
                     const ValueType& type)
 {
-    if (initializer.isNull())
+    if (initializer.isNull()) {
         return CIMValue(type.type, type.isArray, type.arraySize);
+    }
     checkShape(cursor, initializer, type);
     const Converter converter(cursor, aliases, type.type);
     switch (type.type) {

@@ -8,19 +8,19 @@
 
 namespace Pegasus::mof {
 
-/// The type that a value must take on.
+// The type that a value must take on.
 struct ValueType
 {
     CIMType type = CIMTYPE_BOOLEAN;
     bool isArray = false;
-    Uint32 arraySize = 0; ///< the fixed number of elements, 0 for any
+    Uint32 arraySize = 0; // the fixed number of elements, 0 for any
 };
 
-/// Gives a written constant its type. Throws MofError at the literal that does not fit; references look into aliases.
+// Gives a written constant its type. Throws MofError at the literal that does not fit; references look into aliases.
 CIMValue buildValue(const TokenCursor& cursor, const AliasTable& aliases, const Initializer& initializer,
                     const ValueType& type);
 
-/// UTF-8 to CIM text. Throws MofError at offset if the bytes are not valid UTF-8.
+// UTF-8 to CIM text. Throws MofError at offset if the bytes are not valid UTF-8.
 String cimString(const TokenCursor& cursor, const std::string& text, std::size_t offset);
 
 } // namespace Pegasus::mof

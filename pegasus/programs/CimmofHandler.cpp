@@ -6,7 +6,7 @@ namespace Pegasus::cimmof {
 
 namespace {
 
-/// Instances of more classes than this in turn ask the server again.
+// Instances of more classes than this in turn ask the server again.
 constexpr std::size_t kMaxRememberedClasses = 256;
 
 std::string utf8(const String& text)
@@ -14,7 +14,7 @@ std::string utf8(const String& text)
     return std::string(text.getCString());
 }
 
-/// The message that stays in front of whatever the server said.
+// The message that stays in front of whatever the server said.
 [[noreturn]] void failAdding(const String& what, const Exception& cause)
 {
     throw Exception(String("Error adding ") + what + String(": ") + cause.getMessage());
@@ -32,8 +32,9 @@ void ServerHandler::useNamespace(const CIMNamespaceName& nameSpace)
     try {
         fClient.createInstance(fNamespace, instance);
     } catch (const CIMException& error) {
-        if (error.getCode() != CIM_ERR_ALREADY_EXISTS)
+        if (error.getCode() != CIM_ERR_ALREADY_EXISTS) {
             failAdding(String("namespace ") + nameSpace.getString(), error);
+        }
     }
 }
 
@@ -50,8 +51,9 @@ bool ServerHandler::findQualifier(const CIMName& name, CIMQualifierDecl& declara
         return true;
     } catch (const CIMException& error) {
         fQualifiers.erase(key);
-        if (error.getCode() == CIM_ERR_NOT_FOUND)
+        if (error.getCode() == CIM_ERR_NOT_FOUND) {
             return false;
+        }
         throw;
     }
 }
@@ -67,17 +69,19 @@ bool ServerHandler::findClass(const CIMName& name, CIMClass& found)
     try {
         found = fClient.getClass(fNamespace, name, false, true, true);
     } catch (const CIMException& error) {
-        if (error.getCode() == CIM_ERR_NOT_FOUND)
+        if (error.getCode() == CIM_ERR_NOT_FOUND) {
             return false;
+        }
         throw;
     }
-    if (fClasses.size() >= kMaxRememberedClasses)
+    if (fClasses.size() >= kMaxRememberedClasses) {
         fClasses.clear();
+    }
     fClasses[key] = found;
     return true;
 }
 
-/// What the server then holds may differ: it keeps a declaration whose type would change.
+// What the server then holds may differ: it keeps a declaration whose type would change.
 void ServerHandler::declareQualifier(const CIMQualifierDecl& declaration)
 {
     fQualifiers.clear();
@@ -94,8 +98,9 @@ bool ServerHandler::createClass(const CIMClass& newClass)
         fClient.createClass(fNamespace, newClass);
         return true;
     } catch (const CIMException& error) {
-        if (error.getCode() == CIM_ERR_ALREADY_EXISTS)
+        if (error.getCode() == CIM_ERR_ALREADY_EXISTS) {
             return false;
+        }
         failAdding(String("class ") + newClass.getClassName().getString() + String(" to the repository"), error);
     }
 }
@@ -106,16 +111,18 @@ bool ServerHandler::createInstance(const CIMInstance& newInstance)
         fClient.createInstance(fNamespace, newInstance);
         return true;
     } catch (const CIMException& error) {
-        if (error.getCode() == CIM_ERR_ALREADY_EXISTS)
+        if (error.getCode() == CIM_ERR_ALREADY_EXISTS) {
             return false;
+        }
         failAdding(String("an instance"), error);
     }
 }
 
 void ServerHandler::warn(const std::string& place, const std::string& text)
 {
-    if (!fHideWarnings)
+    if (!fHideWarnings) {
         std::cerr << place << ": warning: " << text << "\n";
+    }
 }
 
 } // namespace Pegasus::cimmof

@@ -9,31 +9,31 @@
 
 namespace Pegasus::cimmof {
 
-/// Brings definitions into a server, and remembers the declarations and classes that it had to ask for.
-///
-/// Thread: one thread at a time. Throws: Pegasus::Exception whose message names what could not be done.
+// Brings definitions into a server, and remembers the declarations and classes that it had to ask for.
+//
+// Thread: one thread at a time. Throws: Pegasus::Exception whose message names what could not be done.
 class ServerHandler : public mof::DefinitionHandler
 {
   public:
-    /// Requires: client is connected and outlives the handler.
+    // Requires: client is connected and outlives the handler.
     ServerHandler(CIMClient& client, bool hideWarnings) : fClient(client), fHideWarnings(hideWarnings) {}
 
-    /// Creates the namespace if it does not exist.
+    // Creates the namespace if it does not exist.
     void useNamespace(const CIMNamespaceName& nameSpace) override;
     bool findQualifier(const CIMName& name, CIMQualifierDecl& declaration) override;
     bool findClass(const CIMName& name, CIMClass& found) override;
     void declareQualifier(const CIMQualifierDecl& declaration) override;
     bool createClass(const CIMClass& newClass) override;
     bool createInstance(const CIMInstance& newInstance) override;
-    /// To standard error.
+    // To standard error.
     void warn(const std::string& place, const std::string& text) override;
 
   private:
     CIMClient& fClient;
     bool fHideWarnings;
     CIMNamespaceName fNamespace;
-    std::map<std::string, CIMQualifierDecl> fQualifiers; ///< of fNamespace, by name as written
-    std::map<std::string, CIMClass> fClasses;            ///< of fNamespace, by name as written
+    std::map<std::string, CIMQualifierDecl> fQualifiers; // of fNamespace, by name as written
+    std::map<std::string, CIMClass> fClasses;            // of fNamespace, by name as written
 };
 
 } // namespace Pegasus::cimmof

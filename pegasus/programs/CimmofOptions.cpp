@@ -18,7 +18,7 @@ const char* const kHelp =
 
 namespace {
 
-/// Walks over the arguments.
+// Walks over the arguments.
 class Arguments
 {
   public:
@@ -28,8 +28,9 @@ class Arguments
     const std::string& take() { return fAll[fNext++]; }
     std::string takeValue(const std::string& option)
     {
-        if (atEnd())
+        if (atEnd()) {
             throw OptionError("Missing value for flag " + option);
+        }
         return take();
     }
 
@@ -40,16 +41,17 @@ class Arguments
 
 bool setSwitch(Options& options, const std::string& flag)
 {
-    if (flag == "-h" || flag == "--help")
+    if (flag == "-h" || flag == "--help") {
         options.showHelp = true;
-    else if (flag == "-E")
+    } else if (flag == "-E") {
         options.syntaxOnly = true;
-    else if (flag == "-w")
+    } else if (flag == "-w") {
         options.hideWarnings = true;
-    else if (flag == "-aE")
+    } else if (flag == "-aE") {
         options.allowExperimental = true;
-    else
+    } else {
         return false;
+    }
     return true;
 }
 
@@ -60,18 +62,20 @@ bool startsWith(const std::string& text, const char* start)
 
 void setValue(Options& options, const std::string& flag, Arguments& arguments)
 {
-    if (flag == "-uc")
+    if (flag == "-uc") {
         throw OptionError("Flag uc is not supported: this server does not replace classes");
-    if (flag == "-n" || flag == "--namespace")
+    }
+    if (flag == "-n" || flag == "--namespace") {
         options.nameSpace = arguments.takeValue("n");
-    else if (flag == "-I" || flag == "--include")
+    } else if (flag == "-I" || flag == "--include") {
         options.includeDirectories.push_back(arguments.takeValue("I"));
-    else if (startsWith(flag, "-n"))
+    } else if (startsWith(flag, "-n")) {
         options.nameSpace = flag.substr(2);
-    else if (startsWith(flag, "-I"))
+    } else if (startsWith(flag, "-I")) {
         options.includeDirectories.push_back(flag.substr(2));
-    else
+    } else {
         throw OptionError("Unknown flag " + flag.substr(flag.find_first_not_of('-')));
+    }
 }
 
 } // namespace
@@ -82,10 +86,11 @@ Options parseOptions(const std::vector<std::string>& all)
     Arguments arguments(all);
     while (!arguments.atEnd()) {
         const std::string& argument = arguments.take();
-        if (argument.find_first_not_of('-') == std::string::npos || argument[0] != '-')
+        if (argument.find_first_not_of('-') == std::string::npos || argument[0] != '-') {
             options.files.push_back(argument);
-        else if (!setSwitch(options, argument))
+        } else if (!setSwitch(options, argument)) {
             setValue(options, argument, arguments);
+        }
     }
     return options;
 }

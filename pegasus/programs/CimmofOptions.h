@@ -6,27 +6,27 @@
 
 namespace Pegasus::cimmof {
 
-/// What the command line asks for.
+// What the command line asks for.
 struct Options
 {
     bool showHelp = false;
-    bool syntaxOnly = false;        ///< -E
-    bool hideWarnings = false;      ///< -w
-    bool allowExperimental = false; ///< -aE
+    bool syntaxOnly = false;        // -E
+    bool hideWarnings = false;      // -w
+    bool allowExperimental = false; // -aE
     std::string nameSpace = "root/cimv2";
     std::vector<std::string> includeDirectories;
     std::vector<std::string> files;
 };
 
-/// what(): one line, such as "Unknown flag nope".
+// what(): one line, such as "Unknown flag nope".
 class OptionError : public std::runtime_error
 {
   public:
     using std::runtime_error::runtime_error;
 };
 
-/// Options and files may be mixed; a value stands right behind its letter or in the next argument.
-/// Throws OptionError.
+// Options and files may be mixed; a value stands right behind its letter or in the next argument.
+// Throws OptionError.
 Options parseOptions(const std::vector<std::string>& arguments);
 
 extern const char* const kHelp;

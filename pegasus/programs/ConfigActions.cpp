@@ -1,6 +1,6 @@
 #include "pegasus/programs/ConfigActions.h"
 
-#include "pegasus/server/Config.h"
+#include "pegasus/server/admin/Config.h"
 
 #include <Pegasus/Client/CIMClient.h>
 
@@ -116,10 +116,11 @@ int setCurrent(const ConfigCommand& command)
 int setPlanned(const ConfigCommand& command, const std::string& home)
 try {
     server::Config config(home);
-    if (command.action == ConfigCommand::Action::kReset)
+    if (command.action == ConfigCommand::Action::kReset) {
         config.resetPlanned(command.name);
-    else
+    } else {
         config.setPlanned(command.name, command.value);
+    }
     printOutcome("Planned", command, newValue(command));
     return 0;
 } catch (const server::ConfigError& error) {
@@ -136,8 +137,9 @@ try {
 std::optional<Array<CIMInstance>> serverSettings()
 {
     CIMClient client;
-    if (!connect(client))
+    if (!connect(client)) {
         return std::nullopt;
+    }
     return client.enumerateInstances(CIMNamespaceName(kNamespace), CIMName(kClass));
 }
 
@@ -164,8 +166,9 @@ try {
         std::cout << "Current values can not be listed because the CIM server is not running.\n";
         return 1;
     }
-    for (Uint32 i = 0; i < settings->size(); ++i)
+    for (Uint32 i = 0; i < settings->size(); ++i) {
         std::cout << textOf((*settings)[i], "PropertyName") << "=" << textOf((*settings)[i], "CurrentValue") << "\n";
+    }
     return 0;
 } catch (const CIMException& error) {
     std::cout << "Failed to list the config properties. \n";
@@ -176,18 +179,21 @@ try {
 int listPlanned(const std::string& home)
 {
     const server::ConfigValues values = server::readConfigFile(server::plannedConfigPath(home));
-    if (values.empty())
+    if (values.empty()) {
         std::cout << "No configuration properties found in the configuration file.\n";
-    for (const auto& [name, value] : values)
+    }
+    for (const auto& [name, value] : values) {
         std::cout << name << "=" << value << "\n";
+    }
     return 0;
 }
 
 int listMeanings()
 {
-    for (const server::ConfigProperty& property : server::configTable())
+    for (const server::ConfigProperty& property : server::configTable()) {
         std::cout << property.name << " (default " << property.defaultValue << ") " << property.meaning
                   << (property.dynamic ? "" : "; at start only") << "\n";
+    }
     return 0;
 }
 
@@ -196,8 +202,9 @@ int listMeanings()
 int setProperty(const ConfigCommand& command, const std::string& home)
 {
     int status = 0;
-    if (command.planned)
+    if (command.planned) {
         status = setPlanned(command, home);
+    }
     if (status == 0 && (command.current || !command.planned)) {
         ConfigCommand onServer = command;
         onServer.current = true;
@@ -216,19 +223,23 @@ int getProperty(const ConfigCommand& command, const std::string& home)
         return 1;
     }
     int status = 0;
-    if (command.current || (!command.planned && !command.defaults))
+    if (command.current || (!command.planned && !command.defaults)) {
         status = printCurrent(command.name);
-    if (command.planned)
+    }
+    if (command.planned) {
         std::cout << "Planned value: " << server::Config(home).planned(command.name) << "\n";
-    if (command.defaults)
+    }
+    if (command.defaults) {
         std::cout << "Default value: " << property->defaultValue << "\n";
+    }
     return status;
 }
 
 int listProperties(const ConfigCommand& command, const std::string& home)
 {
-    if (command.planned)
+    if (command.planned) {
         return listPlanned(home);
+    }
     return command.current ? listCurrent() : listMeanings();
 }
 

@@ -20,18 +20,24 @@ using Action = ConfigCommand::Action;
 
 std::optional<Action> actionOf(const std::string& word)
 {
-    if (word == "-s")
+    if (word == "-s") {
         return Action::kSet;
-    if (word == "-u")
+    }
+    if (word == "-u") {
         return Action::kReset;
-    if (word == "-g")
+    }
+    if (word == "-g") {
         return Action::kGet;
-    if (word == "-l")
+    }
+    if (word == "-l") {
         return Action::kList;
-    if (word == "--version")
+    }
+    if (word == "--version") {
         return Action::kVersion;
-    if (word == "-h" || word == "--help")
+    }
+    if (word == "-h" || word == "--help") {
         return Action::kHelp;
+    }
     return std::nullopt;
 }
 
@@ -43,11 +49,13 @@ bool takesArgument(Action action)
 void readArgument(ConfigCommand& command, const std::string& option, const std::string& argument)
 {
     const std::size_t equals = argument.find('=');
-    if ((command.action == Action::kSet) != (equals != std::string::npos) || equals == 0 || argument.empty())
+    if ((command.action == Action::kSet) != (equals != std::string::npos) || equals == 0 || argument.empty()) {
         throw std::runtime_error("argument \"" + argument + "\" is not valid for option \"" + option + "\"");
+    }
     command.name = argument.substr(0, equals);
-    if (equals != std::string::npos)
+    if (equals != std::string::npos) {
         command.value = argument.substr(equals + 1);
+    }
 }
 
 bool readFlag(ConfigCommand& command, const std::string& word)
@@ -56,8 +64,9 @@ bool readFlag(ConfigCommand& command, const std::string& word)
                        : word == "-p" ? &command.planned
                        : word == "-d" ? &command.defaults
                                       : nullptr;
-    if (flag != nullptr)
+    if (flag != nullptr) {
         *flag = true;
+    }
     return flag != nullptr;
 }
 
@@ -68,24 +77,30 @@ ConfigCommand parseConfigCommand(const std::vector<std::string>& words)
     ConfigCommand command;
     bool chosen = false;
     for (std::size_t i = 0; i < words.size(); ++i) {
-        if (readFlag(command, words[i]))
+        if (readFlag(command, words[i])) {
             continue;
+        }
         const std::optional<Action> action = actionOf(words[i]);
-        if (!action)
+        if (!action) {
             throw std::runtime_error("Unknown flag " + words[i]);
-        if (chosen)
+        }
+        if (chosen) {
             throw std::runtime_error("option \"" + words[i] + "\" cannot be combined with the one before it");
+        }
         chosen = true;
         command.action = *action;
-        if (!takesArgument(*action))
+        if (!takesArgument(*action)) {
             continue;
-        if (i + 1 == words.size())
+        }
+        if (i + 1 == words.size()) {
             throw std::runtime_error("missing argument for option \"" + words[i] + "\"");
+        }
         readArgument(command, words[i], words[i + 1]);
         ++i;
     }
-    if (!chosen)
+    if (!chosen) {
         throw std::runtime_error("Required arguments missing.");
+    }
     return command;
 }
 

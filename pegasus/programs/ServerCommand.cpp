@@ -17,26 +17,28 @@ namespace {
 void addProperty(ServerCommand& command, const std::string& word)
 {
     const std::size_t equals = word.find('=');
-    if (equals == std::string::npos)
+    if (equals == std::string::npos) {
         throw std::runtime_error("Unrecognized config property: " + word);
+    }
     command.properties.emplace_back(word.substr(0, equals), word.substr(equals + 1));
 }
 
 void readOption(ServerCommand& command, const std::string& word)
 {
     using Action = ServerCommand::Action;
-    if (word == "-s")
+    if (word == "-s") {
         command.action = Action::kStop;
-    else if (word == "--status")
+    } else if (word == "--status") {
         command.action = Action::kStatus;
-    else if (word == "-v" || word == "--version")
+    } else if (word == "-v" || word == "--version") {
         command.action = Action::kVersion;
-    else if (word == "-h" || word == "--help")
+    } else if (word == "-h" || word == "--help") {
         command.action = Action::kHelp;
-    else if (word == "--foreground")
+    } else if (word == "--foreground") {
         command.foreground = true;
-    else
+    } else {
         throw std::runtime_error("Unrecognized command line option. ");
+    }
 }
 
 } // namespace
@@ -45,12 +47,13 @@ ServerCommand parseServerCommand(const std::vector<std::string>& words)
 {
     ServerCommand command;
     for (std::size_t i = 0; i < words.size(); ++i) {
-        if (words[i] == "-D" && i + 1 < words.size())
+        if (words[i] == "-D" && i + 1 < words.size()) {
             command.home = words[++i];
-        else if (!words[i].empty() && words[i][0] == '-')
+        } else if (!words[i].empty() && words[i][0] == '-') {
             readOption(command, words[i]);
-        else
+        } else {
             addProperty(command, words[i]);
+        }
     }
     return command;
 }

@@ -1,19 +1,19 @@
 #include "pegasus/programs/StopCommand.h"
 
-#include "pegasus/common/LocalSocket.h"
-#include "pegasus/server/Descriptor.h"
-#include "pegasus/server/StartFile.h"
+#include "pegasus/base/Descriptor.h"
+#include "pegasus/base/LocalSocket.h"
+#include "pegasus/server/admin/StartFile.h"
 
 #include <Pegasus/Client/CIMClient.h>
+
+#include <iostream>
+#include <system_error>
 
 #include <poll.h>
 #include <signal.h>
 #include <sys/socket.h>
 #include <sys/syscall.h>
 #include <sys/types.h>
-
-#include <iostream>
-#include <system_error>
 
 namespace Pegasus::programs {
 
@@ -99,8 +99,9 @@ int stopServer(const std::string& home, const std::string& consumer)
     } catch (const Exception& error) {
         return forceShutdown(std::string(error.getMessage().getCString()), process, pid, consumer);
     }
-    if (!process.waitForEnd(kEndTimeoutMs))
+    if (!process.waitForEnd(kEndTimeoutMs)) {
         return forceShutdown("The server does not end.", process, pid, consumer);
+    }
     std::cout << "CIM Server stopped.\n";
     return 0;
 }

@@ -11,7 +11,7 @@ using namespace Pegasus::cimmof;
 
 namespace {
 
-/// Exit statuses, as OpenPegasus's compiler has them.
+// Exit statuses, as OpenPegasus's compiler has them.
 enum Status
 {
     kDone = 0,
@@ -46,7 +46,7 @@ Status compileOne(const std::string& file, const mof::CompileOptions& options, m
     }
 }
 
-/// An error ends its own file only; the first one decides the exit status.
+// An error ends its own file only; the first one decides the exit status.
 Status compileAll(const Options& options, const mof::CompileOptions& compileOptions, mof::DefinitionHandler& handler)
 {
     Status status = kDone;
@@ -61,9 +61,11 @@ Status checkSyntax(const Options& options, const mof::CompileOptions& compileOpt
 {
     mof::MemoryHandler handler;
     const Status status = compileAll(options, compileOptions, handler);
-    if (!options.hideWarnings)
-        for (const std::string& warning : handler.warnings())
+    if (!options.hideWarnings) {
+        for (const std::string& warning : handler.warnings()) {
             std::cerr << warning << "\n";
+        }
+    }
     return status;
 }
 
@@ -91,8 +93,9 @@ Status run(const Options& options)
                   << "\nFailed to set DefaultNamespacePath.\n";
         return kBadNamespace;
     }
-    if (options.files.empty())
+    if (options.files.empty()) {
         return kDone;
+    }
     mof::CompileOptions compileOptions;
     compileOptions.nameSpace = CIMNamespaceName(options.nameSpace.c_str());
     compileOptions.includeDirectories = options.includeDirectories;

@@ -1,9 +1,9 @@
 // The private CIM server: starts, stops and asks after it. As "cimprovagt --agent" it is a provider agent.
 #include "pegasus/programs/ServerCommand.h"
 #include "pegasus/programs/StopCommand.h"
-#include "pegasus/server/Agent.h"
 #include "pegasus/server/Server.h"
-#include "pegasus/server/StartFile.h"
+#include "pegasus/server/admin/StartFile.h"
+#include "pegasus/server/agent/Agent.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -37,10 +37,12 @@ bool serve(server::Config& config, server::LaunchSignal& signal, std::string& er
 int start(const ServerCommand& command, const std::string& home)
 {
     server::Config config(home);
-    for (const auto& [name, value] : command.properties)
+    for (const auto& [name, value] : command.properties) {
         config.setFromCommandLine(name, value);
-    if (command.foreground)
+    }
+    if (command.foreground) {
         config.setFromCommandLine("daemon", "false");
+    }
     std::string error;
     if (config.flag("daemon")) {
         error = server::launchDaemon([&](server::LaunchSignal& signal) { serve(config, signal, error); }).error;
@@ -49,8 +51,9 @@ int start(const ServerCommand& command, const std::string& home)
         server::LaunchSignal nobody;
         serve(config, nobody, error);
     }
-    if (!error.empty())
+    if (!error.empty()) {
         std::cerr << error << "\n";
+    }
     return error.empty() ? 0 : 1;
 }
 
@@ -64,8 +67,9 @@ int status(const std::string& consumer)
 std::string consumerOf(const ServerCommand& command, const std::string& home)
 {
     server::Config config(home);
-    for (const auto& [name, value] : command.properties)
+    for (const auto& [name, value] : command.properties) {
         config.setFromCommandLine(name, value);
+    }
     return config.text("consumer");
 }
 
@@ -94,8 +98,9 @@ int run(const ServerCommand& command)
 
 int main(int argc, char** argv)
 {
-    if (server::isAgentCommand(argc, argv))
+    if (server::isAgentCommand(argc, argv)) {
         return server::runAgent(argc, argv);
+    }
     try {
         return run(programs::parseServerCommand(std::vector<std::string>(argv + 1, argv + argc)));
     } catch (const std::exception& error) {

@@ -1,7 +1,7 @@
 #include "pegasus/repository/ClassCache.h"
 
-#include "pegasus/common/ElementEncoder.h"
 #include "pegasus/repository/ClassFilter.h"
+#include "pegasus/wire/ElementEncoder.h"
 
 namespace Pegasus::repository {
 
@@ -23,8 +23,9 @@ std::size_t formIndex(const ClassOptions& options)
 ClassCache::Entry* ClassCache::touch(const std::string& key)
 {
     const auto found = fByKey.find(key);
-    if (found == fByKey.end())
+    if (found == fByKey.end()) {
         return nullptr;
+    }
     fEntries.splice(fEntries.begin(), fEntries, found->second);
     return &fEntries.front();
 }
@@ -51,8 +52,9 @@ std::shared_ptr<const std::string> ClassCache::text(NamespaceId nameSpace, const
 {
     Entry& entry = *touch(keyOf(nameSpace, foldedName));
     std::shared_ptr<const std::string>& kept = entry.texts[formIndex(options)];
-    if (kept)
+    if (kept) {
         return kept;
+    }
     auto made = std::make_shared<std::string>();
     wire::appendClass(*made, filterClass(entry.resolved, options));
     fTextBytes += made->size();
@@ -65,15 +67,17 @@ std::shared_ptr<const std::string> ClassCache::text(NamespaceId nameSpace, const
 
 void ClassCache::forgetTexts()
 {
-    for (Entry& entry : fEntries)
+    for (Entry& entry : fEntries) {
         entry.texts = {};
+    }
 }
 
 void ClassCache::remove(NamespaceId nameSpace, const std::string& foldedName)
 {
     const auto found = fByKey.find(keyOf(nameSpace, foldedName));
-    if (found == fByKey.end())
+    if (found == fByKey.end()) {
         return;
+    }
     fEntries.erase(found->second);
     fByKey.erase(found);
 }

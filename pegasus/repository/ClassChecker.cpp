@@ -14,12 +14,14 @@ const CIMName kKey("Key");
 template <class Owner> bool isTrue(const Owner& owner, const CIMName& qualifier)
 {
     const Uint32 index = owner.findQualifier(qualifier);
-    if (index == PEG_NOT_FOUND)
+    if (index == PEG_NOT_FOUND) {
         return false;
+    }
     const CIMValue value = owner.getQualifier(index).getValue();
     Boolean isSet = false;
-    if (!value.isNull() && !value.isArray() && value.getType() == CIMTYPE_BOOLEAN)
+    if (!value.isNull() && !value.isArray() && value.getType() == CIMTYPE_BOOLEAN) {
         value.get(isSet);
+    }
     return isSet;
 }
 
@@ -28,7 +30,7 @@ bool isKind(const CIMConstClass& newClass, const CIMConstClass& superClass, cons
     return isTrue(newClass, qualifier) || (!superClass.isUninitialized() && isTrue(superClass, qualifier));
 }
 
-/// Checks one class; holds what its parts need to know of it.
+// Checks one class; holds what its parts need to know of it.
 class Checker
 {
   public:
@@ -38,8 +40,9 @@ class Checker
 
     template <class To, class From> void checkQualifiers(To& to, const From& from, const CIMScope& scope) const
     {
-        for (Uint32 i = 0; i < from.getQualifierCount(); ++i)
+        for (Uint32 i = 0; i < from.getQualifierCount(); ++i) {
             to.addQualifier(checkedQualifier(from.getQualifier(i), scope, fLookup));
+        }
     }
 
     CIMProperty checkProperty(const CIMConstProperty& property, bool isAssociation) const;
@@ -57,12 +60,13 @@ template <class Element> void checkOverrides(const Element& element, const Eleme
     for (Uint32 i = 0; i < element.getQualifierCount(); ++i) {
         const CIMConstQualifier use = element.getQualifier(i);
         const Uint32 index = inherited.findQualifier(use.getName());
-        if (index != PEG_NOT_FOUND)
+        if (index != PEG_NOT_FOUND) {
             checkOverride(use, inherited.getQualifier(index));
+        }
     }
 }
 
-/// A string may become one that holds embedded objects (the standard schema does so).
+// A string may become one that holds embedded objects (the standard schema does so).
 bool isSameKind(const CIMConstProperty& property, const CIMConstProperty& inherited)
 {
     const auto travelsAsString = [](const CIMConstProperty& any) {
@@ -77,37 +81,44 @@ bool isSameKind(const CIMConstProperty& property, const CIMConstProperty& inheri
 void checkOverriddenProperty(const CIMConstProperty& property, const CIMConstClass& superClass)
 {
     const Uint32 index = superClass.findProperty(property.getName());
-    if (index == PEG_NOT_FOUND)
+    if (index == PEG_NOT_FOUND) {
         return;
+    }
     const CIMConstProperty inherited = superClass.getProperty(index);
-    if (!isSameKind(property, inherited))
+    if (!isSameKind(property, inherited)) {
         fail(CIM_ERR_FAILED, "type mismatch");
+    }
     checkOverrides(property, inherited);
 }
 
 void checkOverriddenMethod(const CIMConstMethod& method, const CIMConstClass& superClass)
 {
     const Uint32 index = superClass.findMethod(method.getName());
-    if (index == PEG_NOT_FOUND)
+    if (index == PEG_NOT_FOUND) {
         return;
+    }
     const CIMConstMethod inherited = superClass.getMethod(index);
-    if (method.getType() != inherited.getType())
+    if (method.getType() != inherited.getType()) {
         fail(CIM_ERR_FAILED, "type mismatch");
+    }
     checkOverrides(method, inherited);
 }
 
 CIMProperty Checker::checkProperty(const CIMConstProperty& property, bool isAssociation) const
 {
     const bool isReference = property.getType() == CIMTYPE_REFERENCE;
-    if (isReference && !isAssociation)
+    if (isReference && !isAssociation) {
         fail(CIM_ERR_INVALID_PARAMETER, "Non-association class contains reference property");
-    if (property.isArray() && isTrue(property, kKey))
+    }
+    if (property.isArray() && isTrue(property, kKey)) {
         fail(CIM_ERR_INVALID_PARAMETER, "key property " + utf8(property.getName()) + " is an array");
+    }
     CIMProperty checked(property.getName(), embeddedValue(property), property.getArraySize(),
                         property.getReferenceClassName());
     checkQualifiers(checked, property, isReference ? CIMScope::REFERENCE : CIMScope::PROPERTY);
-    if (!fSuperClass.isUninitialized())
+    if (!fSuperClass.isUninitialized()) {
         checkOverriddenProperty(property, fSuperClass);
+    }
     return checked;
 }
 
@@ -115,10 +126,12 @@ CIMMethod Checker::checkMethod(const CIMConstMethod& method) const
 {
     CIMMethod checked(method.getName(), method.getType());
     checkQualifiers(checked, method, CIMScope::METHOD);
-    for (Uint32 i = 0; i < method.getParameterCount(); ++i)
+    for (Uint32 i = 0; i < method.getParameterCount(); ++i) {
         checked.addParameter(checkParameter(method.getParameter(i)));
-    if (!fSuperClass.isUninitialized())
+    }
+    if (!fSuperClass.isUninitialized()) {
         checkOverriddenMethod(method, fSuperClass);
+    }
     return checked;
 }
 
@@ -132,8 +145,9 @@ CIMParameter Checker::checkParameter(const CIMConstParameter& parameter) const
 
 CIMScope scopeOf(bool isAssociation, bool isIndication)
 {
-    if (isAssociation)
+    if (isAssociation) {
         return CIMScope::ASSOCIATION;
+    }
     return isIndication ? CIMScope::INDICATION : CIMScope::CLASS;
 }
 
@@ -146,12 +160,15 @@ CIMClass checkClass(const CIMConstClass& newClass, const CIMConstClass& superCla
     const Checker checker(superClass, lookup);
     CIMClass checked(newClass.getClassName(), newClass.getSuperClassName());
     checker.checkQualifiers(checked, newClass, scopeOf(isAssociation, isIndication));
-    if (!superClass.isUninitialized())
+    if (!superClass.isUninitialized()) {
         checkOverrides(newClass, superClass);
-    for (Uint32 i = 0; i < newClass.getPropertyCount(); ++i)
+    }
+    for (Uint32 i = 0; i < newClass.getPropertyCount(); ++i) {
         checked.addProperty(checker.checkProperty(newClass.getProperty(i), isAssociation));
-    for (Uint32 i = 0; i < newClass.getMethodCount(); ++i)
+    }
+    for (Uint32 i = 0; i < newClass.getMethodCount(); ++i) {
         checked.addMethod(checker.checkMethod(newClass.getMethod(i)));
+    }
     return checked;
 }
 

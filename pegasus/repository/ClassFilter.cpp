@@ -6,12 +6,14 @@ namespace {
 
 template <class To, class From> void copyQualifiers(To& to, From& from, const ClassOptions& options)
 {
-    if (!options.includeQualifiers)
+    if (!options.includeQualifiers) {
         return;
+    }
     for (Uint32 i = 0; i < from.getQualifierCount(); ++i) {
         const CIMQualifier qualifier = from.getQualifier(i);
-        if (!options.localOnly || !qualifier.getPropagated())
+        if (!options.localOnly || !qualifier.getPropagated()) {
             to.addQualifier(qualifier);
+        }
     }
 }
 
@@ -36,8 +38,9 @@ CIMMethod filterMethod(CIMMethod from, const ClassOptions& options)
     CIMMethod method(from.getName(), from.getType(), options.includeClassOrigin ? from.getClassOrigin() : CIMName(),
                      from.getPropagated());
     copyQualifiers(method, from, options);
-    for (Uint32 i = 0; i < from.getParameterCount(); ++i)
+    for (Uint32 i = 0; i < from.getParameterCount(); ++i) {
         method.addParameter(filterParameter(from.getParameter(i), options));
+    }
     return method;
 }
 
@@ -54,13 +57,15 @@ CIMClass filterClass(CIMClass resolved, const ClassOptions& options)
     copyQualifiers(filtered, resolved, options);
     for (Uint32 i = 0; i < resolved.getPropertyCount(); ++i) {
         const CIMProperty property = resolved.getProperty(i);
-        if (!(options.localOnly && property.getPropagated()) && isListed(options.propertyList, property.getName()))
+        if (!(options.localOnly && property.getPropagated()) && isListed(options.propertyList, property.getName())) {
             filtered.addProperty(filterProperty(property, options));
+        }
     }
     for (Uint32 i = 0; i < resolved.getMethodCount(); ++i) {
         const CIMMethod method = resolved.getMethod(i);
-        if (!(options.localOnly && method.getPropagated()))
+        if (!(options.localOnly && method.getPropagated())) {
             filtered.addMethod(filterMethod(method, options));
+        }
     }
     return filtered;
 }

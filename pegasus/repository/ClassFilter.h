@@ -4,10 +4,10 @@
 
 namespace Pegasus::repository {
 
-/// The part of a resolved class that the options ask for; shares what it can with it.
+// The part of a resolved class that the options ask for; shares what it can with it.
 CIMClass filterClass(CIMClass resolved, const ClassOptions& options);
 
-/// Is the name asked for by a property list?
+// Is the name asked for by a property list?
 bool isListed(const CIMPropertyList& list, const CIMName& name);
 
 } // namespace Pegasus::repository

@@ -4,23 +4,26 @@ namespace Pegasus::repository {
 
 namespace {
 
-/// All functions take handles that can be written to because only those give out handles to parts that can be shared;
-/// nothing is changed but `to`.
+// All functions take handles that can be written to because only those give out handles to parts that can be shared;
+// nothing is changed but `to`.
 
 template <class To, class From> void shareQualifiers(To& to, From& from)
 {
-    for (Uint32 i = 0; i < from.getQualifierCount(); ++i)
+    for (Uint32 i = 0; i < from.getQualifierCount(); ++i) {
         to.addQualifier(from.getQualifier(i));
+    }
 }
 
-/// Backwards, as OpenPegasus gives them out.
+// Backwards, as OpenPegasus gives them out.
 template <class To, class From, class Local> void inheritQualifiers(To& to, From& from, Local& local)
 {
     for (Uint32 i = from.getQualifierCount(); i-- > 0;) {
         const CIMQualifier inherited = from.getQualifier(i);
         if (inherited.getFlavor().hasFlavor(CIMFlavor::TOSUBCLASS) &&
             local.findQualifier(inherited.getName()) == PEG_NOT_FOUND)
+        {
             to.addQualifier(CIMQualifier(inherited.getName(), inherited.getValue(), inherited.getFlavor(), true));
+        }
     }
 }
 
@@ -54,8 +57,9 @@ CIMProperty ownProperty(CIMProperty local, const CIMName& owner, CIMClass& super
 
 void shareParameters(CIMMethod& to, CIMMethod& from)
 {
-    for (Uint32 i = 0; i < from.getParameterCount(); ++i)
+    for (Uint32 i = 0; i < from.getParameterCount(); ++i) {
         to.addParameter(from.getParameter(i));
+    }
 }
 
 CIMMethod inheritedMethod(CIMMethod from)
@@ -69,8 +73,9 @@ CIMMethod inheritedMethod(CIMMethod from)
 CIMParameter overridingParameter(CIMParameter local, CIMMethod& overridden)
 {
     const Uint32 index = overridden.findParameter(local.getName());
-    if (index == PEG_NOT_FOUND)
+    if (index == PEG_NOT_FOUND) {
         return local;
+    }
     CIMParameter inherited = overridden.getParameter(index);
     CIMParameter parameter(local.getName(), local.getType(), local.isArray(), local.getArraySize(),
                            local.getReferenceClassName());
@@ -92,8 +97,9 @@ CIMMethod ownMethod(CIMMethod local, const CIMName& owner, CIMClass& superClass)
     CIMMethod method(local.getName(), local.getType(), overridden.getClassOrigin(), false);
     inheritQualifiers(method, overridden, local);
     shareQualifiers(method, local);
-    for (Uint32 i = 0; i < local.getParameterCount(); ++i)
+    for (Uint32 i = 0; i < local.getParameterCount(); ++i) {
         method.addParameter(overridingParameter(local.getParameter(i), overridden));
+    }
     return method;
 }
 
@@ -102,13 +108,15 @@ void addInherited(CIMClass& resolved, CIMClass& local, CIMClass& superClass)
     inheritQualifiers(resolved, superClass, local);
     for (Uint32 i = 0; i < superClass.getPropertyCount(); ++i) {
         const CIMProperty property = superClass.getProperty(i);
-        if (local.findProperty(property.getName()) == PEG_NOT_FOUND)
+        if (local.findProperty(property.getName()) == PEG_NOT_FOUND) {
             resolved.addProperty(inheritedProperty(property));
+        }
     }
     for (Uint32 i = 0; i < superClass.getMethodCount(); ++i) {
         const CIMMethod method = superClass.getMethod(i);
-        if (local.findMethod(method.getName()) == PEG_NOT_FOUND)
+        if (local.findMethod(method.getName()) == PEG_NOT_FOUND) {
             resolved.addMethod(inheritedMethod(method));
+        }
     }
 }
 
@@ -118,13 +126,16 @@ CIMClass resolveClass(CIMClass local, CIMClass superClass)
 {
     const CIMName name = local.getClassName();
     CIMClass resolved(name, local.getSuperClassName());
-    if (!superClass.isUninitialized())
+    if (!superClass.isUninitialized()) {
         addInherited(resolved, local, superClass);
+    }
     shareQualifiers(resolved, local);
-    for (Uint32 i = 0; i < local.getPropertyCount(); ++i)
+    for (Uint32 i = 0; i < local.getPropertyCount(); ++i) {
         resolved.addProperty(ownProperty(local.getProperty(i), name, superClass));
-    for (Uint32 i = 0; i < local.getMethodCount(); ++i)
+    }
+    for (Uint32 i = 0; i < local.getMethodCount(); ++i) {
         resolved.addMethod(ownMethod(local.getMethod(i), name, superClass));
+    }
     return resolved;
 }
 

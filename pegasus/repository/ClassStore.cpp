@@ -1,12 +1,12 @@
 #include "pegasus/repository/ClassStore.h"
 
-#include "pegasus/common/ElementEncoder.h"
 #include "pegasus/repository/ClassChecker.h"
 #include "pegasus/repository/ClassFilter.h"
 #include "pegasus/repository/ClassResolver.h"
 #include "pegasus/repository/EmbeddedTypes.h"
 #include "pegasus/repository/Failure.h"
 #include "pegasus/repository/Names.h"
+#include "pegasus/wire/ElementEncoder.h"
 
 namespace Pegasus::repository {
 
@@ -15,16 +15,18 @@ ClassStore::ClassStore(Storage& storage, ObjectText& texts, QualifierStore& qual
 {
 }
 
-/// Recursion ends at a root class; the depth is bounded when classes are created.
+// Recursion ends at a root class; the depth is bounded when classes are created.
 CIMClass ClassStore::resolved(NamespaceId nameSpace, const CIMName& name)
 {
     const std::string key = folded(name);
     CIMClass cached = fCache.find(nameSpace, key);
-    if (!cached.isUninitialized())
+    if (!cached.isUninitialized()) {
         return cached;
+    }
     const std::optional<std::string> text = fStorage.findClass(nameSpace, key);
-    if (!text)
+    if (!text) {
         return CIMClass();
+    }
     const CIMClass local = withEmbeddedTypes(fTexts.toClass(*text));
     const CIMName& superName = local.getSuperClassName();
     CIMClass whole = resolveClass(local, superName.isNull() ? CIMClass() : resolved(nameSpace, superName));
@@ -35,8 +37,9 @@ CIMClass ClassStore::resolved(NamespaceId nameSpace, const CIMName& name)
 CIMClass ClassStore::existing(NamespaceId nameSpace, const CIMName& name)
 {
     CIMClass whole = resolved(nameSpace, name);
-    if (whole.isUninitialized())
+    if (whole.isUninitialized()) {
         fail(CIM_ERR_NOT_FOUND, utf8(name));
+    }
     return whole;
 }
 
@@ -49,8 +52,9 @@ std::shared_ptr<const std::string> ClassStore::text(NamespaceId nameSpace, const
                                                     const ClassOptions& options)
 {
     const CIMClass whole = existing(nameSpace, name);
-    if (options.propertyList.isNull())
+    if (options.propertyList.isNull()) {
         return fCache.text(nameSpace, folded(name), options);
+    }
     auto made = std::make_shared<std::string>();
     wire::appendClass(*made, filterClass(whole, options));
     return made;
@@ -64,25 +68,29 @@ bool ClassStore::has(NamespaceId nameSpace, const CIMName& name)
 CIMName ClassStore::superClass(NamespaceId nameSpace, const CIMName& name)
 {
     const std::optional<std::string> superName = fStorage.findSuperClass(nameSpace, utf8(name));
-    if (!superName)
+    if (!superName) {
         fail(CIM_ERR_NOT_FOUND, utf8(name));
+    }
     return superName->empty() ? CIMName() : CIMName(superName->c_str());
 }
 
 std::vector<CIMName> ClassStore::listNames(NamespaceId nameSpace, const CIMName& name, bool isDeep)
 {
-    if (!name.isNull() && !has(nameSpace, name))
+    if (!name.isNull() && !has(nameSpace, name)) {
         fail(CIM_ERR_INVALID_CLASS, utf8(name));
+    }
     std::vector<CIMName> names;
-    for (const std::string& text : fStorage.listSubclasses(nameSpace, utf8(name), isDeep))
+    for (const std::string& text : fStorage.listSubclasses(nameSpace, utf8(name), isDeep)) {
         names.emplace_back(text.c_str());
+    }
     return names;
 }
 
 void ClassStore::create(NamespaceId nameSpace, const CIMConstClass& newClass)
 {
-    if (has(nameSpace, newClass.getClassName()))
+    if (has(nameSpace, newClass.getClassName())) {
         fail(CIM_ERR_ALREADY_EXISTS, utf8(newClass.getClassName()));
+    }
     put(nameSpace, newClass);
 }
 
@@ -99,7 +107,7 @@ void ClassStore::remove(NamespaceId nameSpace, const CIMName& name)
     fCache.remove(nameSpace, folded(name));
 }
 
-/// The new class goes into the cache at once: a compiler creates its subclasses next.
+// The new class goes into the cache at once: a compiler creates its subclasses next.
 void ClassStore::put(NamespaceId nameSpace, const CIMConstClass& newClass)
 {
     checkDepth(nameSpace, newClass);
@@ -113,11 +121,13 @@ void ClassStore::put(NamespaceId nameSpace, const CIMConstClass& newClass)
 CIMClass ClassStore::resolvedSuperClass(NamespaceId nameSpace, const CIMConstClass& newClass)
 {
     const CIMName& superName = newClass.getSuperClassName();
-    if (superName.isNull())
+    if (superName.isNull()) {
         return CIMClass();
+    }
     CIMClass superClass = resolved(nameSpace, superName);
-    if (superClass.isUninitialized() || superName.equal(newClass.getClassName()))
+    if (superClass.isUninitialized() || superName.equal(newClass.getClassName())) {
         fail(CIM_ERR_INVALID_SUPERCLASS, utf8(superName));
+    }
     return superClass;
 }
 
@@ -126,21 +136,25 @@ void ClassStore::checkDepth(NamespaceId nameSpace, const CIMConstClass& newClass
     std::size_t depth = 1;
     std::string above = utf8(newClass.getSuperClassName());
     while (!above.empty()) {
-        if (++depth > fLimits.inheritanceDepth)
+        if (++depth > fLimits.inheritanceDepth) {
             fail(CIM_ERR_SERVER_LIMITS_EXCEEDED,
                  "class is deeper than the limit inheritanceDepth (" + std::to_string(fLimits.inheritanceDepth) + ")");
+        }
         above = fStorage.findSuperClass(nameSpace, above).value_or("");
     }
 }
 
 void ClassStore::expectUnused(NamespaceId nameSpace, const CIMName& name)
 {
-    if (!has(nameSpace, name))
+    if (!has(nameSpace, name)) {
         fail(CIM_ERR_NOT_FOUND, utf8(name));
-    if (!fStorage.listSubclasses(nameSpace, utf8(name), false).empty())
+    }
+    if (!fStorage.listSubclasses(nameSpace, utf8(name), false).empty()) {
         fail(CIM_ERR_CLASS_HAS_CHILDREN, utf8(name));
-    if (fStorage.hasInstances(nameSpace, utf8(name)))
+    }
+    if (fStorage.hasInstances(nameSpace, utf8(name))) {
         fail(CIM_ERR_CLASS_HAS_INSTANCES, utf8(name));
+    }
 }
 
 } // namespace Pegasus::repository

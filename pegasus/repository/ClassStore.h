@@ -5,16 +5,16 @@
 
 namespace Pegasus::repository {
 
-/// Classes: stored as created, given out resolved. Errors and limits: see Repository. Thread: one thread at a time.
+// Classes: stored as created, given out resolved. Errors and limits: see Repository. Thread: one thread at a time.
 class ClassStore
 {
   public:
     ClassStore(Storage& storage, ObjectText& texts, QualifierStore& qualifiers, const Limits& limits);
 
-    /// With everything inherited. Uninitialised if there is none.
+    // With everything inherited. Uninitialised if there is none.
     CIMClass resolved(NamespaceId nameSpace, const CIMName& name);
     CIMClass get(NamespaceId nameSpace, const CIMName& name, const ClassOptions& options);
-    /// The same as a CLASS element.
+    // The same as a CLASS element.
     std::shared_ptr<const std::string> text(NamespaceId nameSpace, const CIMName& name, const ClassOptions& options);
     bool has(NamespaceId nameSpace, const CIMName& name);
     CIMName superClass(NamespaceId nameSpace, const CIMName& name);

@@ -1,15 +1,15 @@
 #include "pegasus/repository/Database.h"
 
-#include <sqlite3.h>
-
 #include <Pegasus/Common/Exception.h>
+
+#include <sqlite3.h>
 
 namespace Pegasus::repository {
 
 namespace {
 
-/// EXCLUSIVE keeps the write-ahead log's index in this process's memory: no further file, no locking per statement.
-/// OFF leaves writing back to the kernel, which outlives the process.
+// EXCLUSIVE keeps the write-ahead log's index in this process's memory: no further file, no locking per statement.
+// OFF leaves writing back to the kernel, which outlives the process.
 constexpr const char* kPragmas = "PRAGMA locking_mode=EXCLUSIVE;"
                                  "PRAGMA synchronous=OFF;"
                                  "PRAGMA journal_mode=WAL;"
@@ -21,8 +21,9 @@ Database::Database(const std::string& path)
 {
     constexpr int kFlags = SQLITE_OPEN_READWRITE | SQLITE_OPEN_CREATE | SQLITE_OPEN_NOMUTEX;
     try {
-        if (sqlite3_open_v2(path.c_str(), &fHandle, kFlags, nullptr) != SQLITE_OK)
+        if (sqlite3_open_v2(path.c_str(), &fHandle, kFlags, nullptr) != SQLITE_OK) {
             fail("open");
+        }
         execute(kPragmas);
     } catch (...) {
         sqlite3_close(fHandle);
@@ -37,8 +38,9 @@ Database::~Database()
 
 void Database::execute(const char* sql)
 {
-    if (sqlite3_exec(fHandle, sql, nullptr, nullptr, nullptr) != SQLITE_OK)
+    if (sqlite3_exec(fHandle, sql, nullptr, nullptr, nullptr) != SQLITE_OK) {
         fail("set up");
+    }
 }
 
 void Database::fail(const char* operation) const
@@ -57,8 +59,9 @@ Rows::~Rows()
 bool Rows::next()
 {
     const int result = sqlite3_step(fStatement);
-    if (result != SQLITE_ROW && result != SQLITE_DONE)
+    if (result != SQLITE_ROW && result != SQLITE_DONE) {
         fDatabase.fail(sqlite3_stmt_readonly(fStatement) ? "read" : "write");
+    }
     return result == SQLITE_ROW;
 }
 
@@ -76,8 +79,9 @@ std::string_view Rows::text(int column) const
 
 Statement::Statement(const Database& database, const char* sql) : fDatabase(database)
 {
-    if (sqlite3_prepare_v3(database.handle(), sql, -1, SQLITE_PREPARE_PERSISTENT, &fStatement, nullptr) != SQLITE_OK)
+    if (sqlite3_prepare_v3(database.handle(), sql, -1, SQLITE_PREPARE_PERSISTENT, &fStatement, nullptr) != SQLITE_OK) {
         database.fail("prepare a statement of");
+    }
 }
 
 Statement::~Statement()
@@ -87,16 +91,18 @@ Statement::~Statement()
 
 void Statement::bind(int parameter, std::int64_t value)
 {
-    if (sqlite3_bind_int64(fStatement, parameter, value) != SQLITE_OK)
+    if (sqlite3_bind_int64(fStatement, parameter, value) != SQLITE_OK) {
         fDatabase.fail("bind a number for");
+    }
 }
 
 void Statement::bind(int parameter, std::string_view value)
 {
     // A null data pointer would bind NULL where an empty text is meant.
     const char* data = value.data() ? value.data() : "";
-    if (sqlite3_bind_text64(fStatement, parameter, data, value.size(), SQLITE_STATIC, SQLITE_UTF8) != SQLITE_OK)
+    if (sqlite3_bind_text64(fStatement, parameter, data, value.size(), SQLITE_STATIC, SQLITE_UTF8) != SQLITE_OK) {
         fDatabase.fail("bind a text for");
+    }
 }
 
 } // namespace Pegasus::repository

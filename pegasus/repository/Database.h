@@ -10,10 +10,10 @@ struct sqlite3_stmt;
 
 namespace Pegasus::repository {
 
-/// One SQLite file, held open by this process alone. A statement that has returned survives the death of the process,
-/// not a power cut: nothing waits for the disk.
-///
-/// Throws: CIMException CIM_ERR_FAILED from everything that fails. Thread: one thread at a time.
+// One SQLite file, held open by this process alone. A statement that has returned survives the death of the process,
+// not a power cut: nothing waits for the disk.
+//
+// Throws: CIMException CIM_ERR_FAILED from everything that fails. Thread: one thread at a time.
 class Database
 {
   public:
@@ -30,7 +30,7 @@ class Database
     sqlite3* fHandle = nullptr;
 };
 
-/// The rows of one run of a statement. Texts are valid until the next row.
+// The rows of one run of a statement. Texts are valid until the next row.
 class Rows
 {
   public:
@@ -39,7 +39,7 @@ class Rows
     Rows(const Rows&) = delete;
     Rows& operator=(const Rows&) = delete;
 
-    /// Goes to the next row, the first one at first. Returns false behind the last.
+    // Goes to the next row, the first one at first. Returns false behind the last.
     bool next();
     std::int64_t integer(int column) const;
     std::string_view text(int column) const;
@@ -49,7 +49,7 @@ class Rows
     sqlite3_stmt* fStatement;
 };
 
-/// A statement prepared once and run many times.
+// A statement prepared once and run many times.
 class Statement
 {
   public:
@@ -58,14 +58,14 @@ class Statement
     Statement(const Statement&) = delete;
     Statement& operator=(const Statement&) = delete;
 
-    /// Binds the arguments (integers and texts, which must outlive the rows) to the parameters in order.
+    // Binds the arguments (integers and texts, which must outlive the rows) to the parameters in order.
     template <class... Arguments> Rows run(const Arguments&... arguments)
     {
         int parameter = 0;
         (bind(++parameter, arguments), ...);
         return Rows(fDatabase, fStatement);
     }
-    /// Runs a statement that gives no rows.
+    // Runs a statement that gives no rows.
     template <class... Arguments> void execute(const Arguments&... arguments) { run(arguments...).next(); }
 
   private:

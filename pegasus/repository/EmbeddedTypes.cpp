@@ -23,8 +23,9 @@ CIMProperty retyped(CIMProperty property)
 {
     CIMProperty result(property.getName(), embeddedValue(property), property.getArraySize(),
                        property.getReferenceClassName(), property.getClassOrigin(), property.getPropagated());
-    for (Uint32 i = 0; i < property.getQualifierCount(); ++i)
+    for (Uint32 i = 0; i < property.getQualifierCount(); ++i) {
         result.addQualifier(property.getQualifier(i));
+    }
     return result;
 }
 
@@ -33,10 +34,12 @@ CIMProperty retyped(CIMProperty property)
 CIMType embeddedType(const CIMConstProperty& property)
 {
     const CIMType type = property.getType();
-    if (type != CIMTYPE_STRING && !isEmbedded(type))
+    if (type != CIMTYPE_STRING && !isEmbedded(type)) {
         return type;
-    if (hasQualifier(property, "EmbeddedInstance"))
+    }
+    if (hasQualifier(property, "EmbeddedInstance")) {
         return property.isArray() ? CIMTYPE_STRING : CIMTYPE_INSTANCE;
+    }
     return hasQualifier(property, "EmbeddedObject") ? CIMTYPE_STRING : type;
 }
 
@@ -50,26 +53,33 @@ CIMValue embeddedValue(const CIMConstProperty& property)
 CIMClass withEmbeddedTypes(CIMClass decoded)
 {
     bool isAsIs = true;
-    for (Uint32 i = 0; i < decoded.getPropertyCount(); ++i)
+    for (Uint32 i = 0; i < decoded.getPropertyCount(); ++i) {
         isAsIs = isAsIs && !changesType(decoded.getProperty(i));
-    if (isAsIs)
+    }
+    if (isAsIs) {
         return decoded;
+    }
     CIMClass result(decoded.getClassName(), decoded.getSuperClassName());
-    for (Uint32 i = 0; i < decoded.getQualifierCount(); ++i)
+    for (Uint32 i = 0; i < decoded.getQualifierCount(); ++i) {
         result.addQualifier(decoded.getQualifier(i));
-    for (Uint32 i = 0; i < decoded.getPropertyCount(); ++i)
+    }
+    for (Uint32 i = 0; i < decoded.getPropertyCount(); ++i) {
         result.addProperty(retyped(decoded.getProperty(i)));
-    for (Uint32 i = 0; i < decoded.getMethodCount(); ++i)
+    }
+    for (Uint32 i = 0; i < decoded.getMethodCount(); ++i) {
         result.addMethod(decoded.getMethod(i));
+    }
     return result;
 }
 
 bool isStorableAs(const CIMConstProperty& given, const CIMConstProperty& declared)
 {
-    if (given.isArray() != declared.isArray())
+    if (given.isArray() != declared.isArray()) {
         return false;
-    if (given.getType() == declared.getType())
+    }
+    if (given.getType() == declared.getType()) {
         return true;
+    }
     const bool holdsEmbedded = isEmbedded(declared.getType()) || hasQualifier(declared, "EmbeddedObject") ||
                                hasQualifier(declared, "EmbeddedInstance");
     return holdsEmbedded && (isEmbedded(given.getType()) || given.getValue().isNull());

@@ -1,11 +1,11 @@
 #include "pegasus/repository/InstanceRules.h"
 
-#include <algorithm>
-
 #include "pegasus/repository/ClassFilter.h"
 #include "pegasus/repository/EmbeddedTypes.h"
 #include "pegasus/repository/Failure.h"
 #include "pegasus/repository/Names.h"
+
+#include <algorithm>
 
 namespace Pegasus::repository {
 
@@ -14,8 +14,9 @@ namespace {
 CIMConstProperty declaredProperty(const CIMConstClass& itsClass, const CIMName& name)
 {
     const Uint32 index = itsClass.findProperty(name);
-    if (index == PEG_NOT_FOUND)
+    if (index == PEG_NOT_FOUND) {
         fail(CIM_ERR_FAILED, "no such property: " + utf8(name));
+    }
     return itsClass.getProperty(index);
 }
 
@@ -28,8 +29,9 @@ CIMProperty propertyOf(const CIMConstProperty& declared, const CIMValue& value, 
 CIMProperty givenProperty(const CIMConstProperty& given, const CIMConstClass& itsClass)
 {
     const CIMConstProperty declared = declaredProperty(itsClass, given.getName());
-    if (!isStorableAs(given, declared))
+    if (!isStorableAs(given, declared)) {
         fail(CIM_ERR_FAILED, "type mismatch");
+    }
     return propertyOf(declared, given.getValue(), false);
 }
 
@@ -38,10 +40,12 @@ CIMKeyBinding keyBinding(const CIMConstProperty& property)
     const CIMValue& value = property.getValue();
     const CIMType type = value.getType();
     const bool isText = type == CIMTYPE_STRING || type == CIMTYPE_CHAR16 || type == CIMTYPE_DATETIME;
-    if (value.isNull() && !isText)
+    if (value.isNull() && !isText) {
         fail(CIM_ERR_INVALID_PARAMETER, "key property " + utf8(property.getName()) + " is null");
-    if (value.isNull())
+    }
+    if (value.isNull()) {
         return CIMKeyBinding(property.getName(), String(), CIMKeyBinding::STRING);
+    }
     return CIMKeyBinding(property.getName(), value);
 }
 
@@ -65,16 +69,19 @@ std::string canonicalValue(const CIMKeyBinding& key)
 
 CIMInstance completeInstance(const CIMConstInstance& given, const CIMConstClass& itsClass)
 {
-    if (itsClass.isAbstract())
+    if (itsClass.isAbstract()) {
         fail(CIM_ERR_NOT_SUPPORTED, "abstract class cannot have instances: " + utf8(itsClass.getClassName()));
+    }
     CIMInstance completed(itsClass.getClassName());
     for (Uint32 i = 0; i < itsClass.getPropertyCount(); ++i) {
         const CIMConstProperty declared = itsClass.getProperty(i);
-        if (given.findProperty(declared.getName()) == PEG_NOT_FOUND)
+        if (given.findProperty(declared.getName()) == PEG_NOT_FOUND) {
             completed.addProperty(propertyOf(declared, declared.getValue(), true));
+        }
     }
-    for (Uint32 i = 0; i < given.getPropertyCount(); ++i)
+    for (Uint32 i = 0; i < given.getPropertyCount(); ++i) {
         completed.addProperty(givenProperty(given.getProperty(i), itsClass));
+    }
     return completed;
 }
 
@@ -82,11 +89,13 @@ CIMObjectPath instancePath(const CIMConstInstance& completed, const CIMConstClas
 {
     Array<CIMName> keyNames;
     itsClass.getKeyNames(keyNames);
-    if (keyNames.size() == 0)
+    if (keyNames.size() == 0) {
         fail(CIM_ERR_FAILED, "class has no keys: " + utf8(itsClass.getClassName()));
+    }
     Array<CIMKeyBinding> keys;
-    for (Uint32 i = 0; i < keyNames.size(); ++i)
+    for (Uint32 i = 0; i < keyNames.size(); ++i) {
         keys.append(keyBinding(completed.getProperty(completed.findProperty(keyNames[i]))));
+    }
     return CIMObjectPath(String(), CIMNamespaceName(), itsClass.getClassName(), keys);
 }
 
@@ -94,14 +103,17 @@ void mergeValues(CIMInstance& stored, const CIMConstInstance& modified, const CI
 {
     for (Uint32 i = 0; i < modified.getPropertyCount(); ++i) {
         const CIMConstProperty property = modified.getProperty(i);
-        if (!isListed(list, property.getName()))
+        if (!isListed(list, property.getName())) {
             continue;
+        }
         const Uint32 index = stored.findProperty(property.getName());
-        if (index == PEG_NOT_FOUND)
+        if (index == PEG_NOT_FOUND) {
             fail(CIM_ERR_FAILED, "no such property: " + utf8(property.getName()));
+        }
         CIMProperty target = stored.getProperty(index);
-        if (property.getType() != target.getType() || property.isArray() != target.isArray())
+        if (property.getType() != target.getType() || property.isArray() != target.isArray()) {
             fail(CIM_ERR_FAILED, "type mismatch");
+        }
         target.setValue(property.getValue());
         target.setPropagated(false);
     }
@@ -112,14 +124,15 @@ void filterInstance(CIMInstance& stored, const CIMConstClass& shape, const Insta
     for (Uint32 i = stored.getPropertyCount(); i-- > 0;) {
         CIMProperty property = stored.getProperty(i);
         const bool fitsShape = shape.isUninitialized() || shape.findProperty(property.getName()) != PEG_NOT_FOUND;
-        if (!fitsShape || !isListed(options.propertyList, property.getName()))
+        if (!fitsShape || !isListed(options.propertyList, property.getName())) {
             stored.removeProperty(i);
-        else if (!options.includeClassOrigin)
+        } else if (!options.includeClassOrigin) {
             property.setClassOrigin(CIMName());
+        }
     }
 }
 
-/// Each value comes behind its length, so that no value can look like a further key. CIMObjectPath has its keys sorted.
+// Each value comes behind its length, so that no value can look like a further key. CIMObjectPath has its keys sorted.
 std::string pathKey(const CIMObjectPath& path)
 {
     std::string text = folded(path.getClassName());

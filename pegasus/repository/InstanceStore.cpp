@@ -7,7 +7,7 @@ namespace Pegasus::repository {
 
 namespace {
 
-/// Enough to spread the cost of a query, little enough to keep memory flat.
+// Enough to spread the cost of a query, little enough to keep memory flat.
 constexpr std::size_t kBatchSize = 64;
 constexpr std::size_t kBatchBytes = 1u << 20;
 
@@ -26,8 +26,9 @@ CIMObjectPath InstanceStore::create(NamespaceId nameSpace, const CIMConstInstanc
     const CIMInstance completed = completeInstance(newInstance, itsClass);
     CIMObjectPath path = instancePath(completed, itsClass);
     const std::string key = pathKey(path);
-    if (fStorage.findInstance(nameSpace, key))
+    if (fStorage.findInstance(nameSpace, key)) {
         fail(CIM_ERR_ALREADY_EXISTS, utf8(path.toString()));
+    }
     fStorage.insertInstance(nameSpace, utf8(itsClass.getClassName()), key, fTexts.fromInstance(completed));
     return path;
 }
@@ -45,8 +46,9 @@ void InstanceStore::modify(NamespaceId nameSpace, const CIMConstInstance& modifi
     const CIMClass itsClass = classOf(nameSpace, modified.getPath().getClassName());
     CIMInstance stored = fTexts.toInstance(row.body);
     mergeValues(stored, modified, list);
-    if (pathKey(instancePath(stored, itsClass)) != pathKey(modified.getPath()))
+    if (pathKey(instancePath(stored, itsClass)) != pathKey(modified.getPath())) {
         fail(CIM_ERR_INVALID_PARAMETER, "a key property cannot change");
+    }
     fStorage.updateInstance(row.sequence, fTexts.fromInstance(stored));
 }
 
@@ -71,8 +73,9 @@ std::vector<CIMInstance> InstanceStore::nextBatch(NamespaceId nameSpace, const C
 CIMClass InstanceStore::classOf(NamespaceId nameSpace, const CIMName& name)
 {
     CIMClass itsClass = fClasses.resolved(nameSpace, name);
-    if (itsClass.isUninitialized())
+    if (itsClass.isUninitialized()) {
         fail(CIM_ERR_INVALID_CLASS, utf8(name));
+    }
     return itsClass;
 }
 
@@ -80,8 +83,9 @@ InstanceRow InstanceStore::find(NamespaceId nameSpace, const CIMObjectPath& path
 {
     classOf(nameSpace, path.getClassName());
     const std::optional<InstanceRow> row = fStorage.findInstance(nameSpace, pathKey(path));
-    if (!row)
+    if (!row) {
         fail(CIM_ERR_NOT_FOUND, utf8(withoutNamespace(path).toString()));
+    }
     return *row;
 }
 

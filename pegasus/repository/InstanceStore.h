@@ -4,7 +4,7 @@
 
 namespace Pegasus::repository {
 
-/// Instances of stored classes. Errors and limits: see Repository. Thread: one thread at a time.
+// Instances of stored classes. Errors and limits: see Repository. Thread: one thread at a time.
 class InstanceStore
 {
   public:
@@ -17,8 +17,8 @@ class InstanceStore
     CIMInstance get(NamespaceId nameSpace, const CIMObjectPath& path, const InstanceOptions& options);
     void modify(NamespaceId nameSpace, const CIMConstInstance& modified, const CIMPropertyList& list);
     void remove(NamespaceId nameSpace, const CIMObjectPath& path);
-    /// Reads on behind the instance `after` (0 at first), which it moves, until the batch is full.
-    /// Returns nothing when there is no more.
+    // Reads on behind the instance `after` (0 at first), which it moves, until the batch is full.
+    // Returns nothing when there is no more.
     std::vector<CIMInstance> nextBatch(NamespaceId nameSpace, const CIMName& className, const InstanceOptions& options,
                                        std::int64_t& after);
 

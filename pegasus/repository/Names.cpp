@@ -9,9 +9,11 @@ namespace Pegasus::repository {
 
 std::string foldCase(std::string text)
 {
-    for (char& c : text)
-        if (c >= 'A' && c <= 'Z')
+    for (char& c : text) {
+        if (c >= 'A' && c <= 'Z') {
             c = static_cast<char>(c - 'A' + 'a');
+        }
+    }
     return text;
 }
 
@@ -34,8 +36,9 @@ std::string canonicalNumber(const std::string& text)
     const char* end = digits.data() + digits.size();
     std::uint64_t magnitude = 0;
     const auto [stop, error] = std::from_chars(begin, end, magnitude, isHex ? 16 : 10);
-    if (error != std::errc() || stop != end)
+    if (error != std::errc() || stop != end) {
         return text;
+    }
     return (isNegative && magnitude != 0 ? "-" : "") + std::to_string(magnitude);
 }
 

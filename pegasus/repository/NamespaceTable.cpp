@@ -12,15 +12,17 @@ NamespaceTable::NamespaceTable(Storage& storage, std::size_t maxCount) : fStorag
         fNames[number] = CIMNamespaceName(name.c_str());
     }
     const CIMNamespaceName root("root");
-    if (!has(root))
+    if (!has(root)) {
         create(root);
+    }
 }
 
 NamespaceId NamespaceTable::id(const CIMNamespaceName& name) const
 {
     const auto found = fIds.find(folded(name));
-    if (found == fIds.end())
+    if (found == fIds.end()) {
         fail(CIM_ERR_INVALID_NAMESPACE, utf8(name.getString()));
+    }
     return found->second;
 }
 
@@ -32,18 +34,21 @@ bool NamespaceTable::has(const CIMNamespaceName& name) const
 std::vector<CIMNamespaceName> NamespaceTable::list() const
 {
     std::vector<CIMNamespaceName> names;
-    for (const auto& [number, name] : fNames)
+    for (const auto& [number, name] : fNames) {
         names.push_back(name);
+    }
     return names;
 }
 
 void NamespaceTable::create(const CIMNamespaceName& name)
 {
-    if (has(name))
+    if (has(name)) {
         fail(CIM_ERR_ALREADY_EXISTS, utf8(name.getString()));
-    if (fIds.size() >= fMaxCount)
+    }
+    if (fIds.size() >= fMaxCount) {
         fail(CIM_ERR_SERVER_LIMITS_EXCEEDED,
              "more namespaces than the limit namespaceCount (" + std::to_string(fMaxCount) + ")");
+    }
     const NamespaceId number = fStorage.insertNamespace(utf8(name.getString()));
     fIds[folded(name)] = number;
     fNames[number] = name;
@@ -52,8 +57,9 @@ void NamespaceTable::create(const CIMNamespaceName& name)
 void NamespaceTable::remove(const CIMNamespaceName& name)
 {
     const NamespaceId number = id(name);
-    if (!fStorage.isNamespaceEmpty(number))
+    if (!fStorage.isNamespaceEmpty(number)) {
         fail(CIM_ERR_NAMESPACE_NOT_EMPTY, utf8(name.getString()));
+    }
     fStorage.deleteNamespace(number);
     fIds.erase(folded(name));
     fNames.erase(number);

@@ -10,16 +10,16 @@
 
 namespace Pegasus::repository {
 
-/// The namespaces, held in memory and written through. Errors and limits: see Repository. Thread: one thread at a time.
+// The namespaces, held in memory and written through. Errors and limits: see Repository. Thread: one thread at a time.
 class NamespaceTable
 {
   public:
-    /// Creates root if it is missing.
+    // Creates root if it is missing.
     NamespaceTable(Storage& storage, std::size_t maxCount);
 
     NamespaceId id(const CIMNamespaceName& name) const;
     bool has(const CIMNamespaceName& name) const;
-    /// In order of creation.
+    // In order of creation.
     std::vector<CIMNamespaceName> list() const;
     void create(const CIMNamespaceName& name);
     void remove(const CIMNamespaceName& name);
@@ -27,7 +27,7 @@ class NamespaceTable
   private:
     Storage& fStorage;
     std::size_t fMaxCount;
-    std::map<std::string, NamespaceId> fIds; ///< by folded name
+    std::map<std::string, NamespaceId> fIds; // by folded name
     std::map<NamespaceId, CIMNamespaceName> fNames;
 };
 

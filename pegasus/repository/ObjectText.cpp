@@ -1,13 +1,13 @@
 #include "pegasus/repository/ObjectText.h"
 
-#include "pegasus/common/ElementEncoder.h"
 #include "pegasus/repository/Failure.h"
+#include "pegasus/wire/ElementEncoder.h"
 
 namespace Pegasus::repository {
 
 namespace {
 
-/// What was accepted once must be readable later, whatever limits the network has.
+// What was accepted once must be readable later, whatever limits the network has.
 wire::XmlLimits storageLimits(std::size_t maxBytes)
 {
     wire::XmlLimits limits;
@@ -26,9 +26,10 @@ ObjectText::ObjectText(std::size_t maxBytes)
 
 std::string ObjectText::checked(std::string text) const
 {
-    if (text.size() > fMaxBytes)
+    if (text.size() > fMaxBytes) {
         fail(CIM_ERR_SERVER_LIMITS_EXCEEDED,
              "object is larger than the limit objectBytes (" + std::to_string(fMaxBytes) + ")");
+    }
     return text;
 }
 

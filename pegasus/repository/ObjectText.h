@@ -1,6 +1,6 @@
 #pragma once
 
-#include "pegasus/common/ElementDecoder.h"
+#include "pegasus/wire/ElementDecoder.h"
 
 #include <Pegasus/Common/CIMClass.h>
 #include <Pegasus/Common/CIMInstance.h>
@@ -11,10 +11,10 @@
 
 namespace Pegasus::repository {
 
-/// Objects to the texts in which they are stored, and back: the elements of CIM-XML.
-///
-/// Throws: CIM_ERR_SERVER_LIMITS_EXCEEDED for an object beyond the limit; CIM_ERR_FAILED for a stored text that cannot
-/// be read. Thread: one thread at a time.
+// Objects to the texts in which they are stored, and back: the elements of CIM-XML.
+//
+// Throws: CIM_ERR_SERVER_LIMITS_EXCEEDED for an object beyond the limit; CIM_ERR_FAILED for a stored text that cannot
+// be read. Thread: one thread at a time.
 class ObjectText
 {
   public:

@@ -1,4 +1,5 @@
 #include "pegasus/repository/QualifierRules.h"
+
 #include "pegasus/repository/Failure.h"
 
 namespace Pegasus::repository {
@@ -10,8 +11,9 @@ CIMFlavor effectiveFlavor(const CIMFlavor& use, const CIMFlavor& declared)
     const bool isOverridable = use.hasFlavor(CIMFlavor::OVERRIDABLE);
     const bool isHandedDown = use.hasFlavor(CIMFlavor::TOSUBCLASS);
     CIMFlavor flavor = declared;
-    if (!isOverridable && !isHandedDown)
+    if (!isOverridable && !isHandedDown) {
         return flavor;
+    }
     if (!isOverridable) {
         flavor.removeFlavor(CIMFlavor::OVERRIDABLE);
         flavor.addFlavor(CIMFlavor::DISABLEOVERRIDE);
@@ -20,12 +22,13 @@ CIMFlavor effectiveFlavor(const CIMFlavor& use, const CIMFlavor& declared)
         flavor.removeFlavor(CIMFlavor::TOSUBCLASS);
         flavor.addFlavor(CIMFlavor::RESTRICTED);
     }
-    if (use.hasFlavor(CIMFlavor::TRANSLATABLE))
+    if (use.hasFlavor(CIMFlavor::TRANSLATABLE)) {
         flavor.addFlavor(CIMFlavor::TRANSLATABLE);
+    }
     return flavor;
 }
 
-/// An association or indication is a class as well: a declaration for classes admits it.
+// An association or indication is a class as well: a declaration for classes admits it.
 bool admits(const CIMScope& declared, const CIMScope& scope)
 {
     const bool isKindOfClass = scope.equal(CIMScope::ASSOCIATION) || scope.equal(CIMScope::INDICATION);
@@ -37,13 +40,16 @@ bool admits(const CIMScope& declared, const CIMScope& scope)
 CIMQualifier checkedQualifier(const CIMConstQualifier& use, const CIMScope& scope, const QualifierLookup& lookup)
 {
     CIMQualifierDecl declaration;
-    if (!lookup(use.getName(), declaration))
+    if (!lookup(use.getName(), declaration)) {
         fail(CIM_ERR_FAILED, "undeclared qualifier: " + utf8(use.getName()));
-    if (use.getType() != declaration.getType() || use.isArray() != declaration.isArray())
+    }
+    if (use.getType() != declaration.getType() || use.isArray() != declaration.isArray()) {
         fail(CIM_ERR_FAILED, "bad qualifier type: " + utf8(use.getName()));
-    if (!admits(declaration.getScope(), scope))
+    }
+    if (!admits(declaration.getScope(), scope)) {
         fail(CIM_ERR_FAILED,
              "qualifier invalid in this scope: " + utf8(use.getName()) + " scope=" + utf8(scope.toString()));
+    }
     return CIMQualifier(use.getName(), use.getValue(), effectiveFlavor(use.getFlavor(), declaration.getFlavor()));
 }
 
@@ -52,7 +58,9 @@ void checkOverride(const CIMConstQualifier& use, const CIMConstQualifier& inheri
     const CIMFlavor& flavor = inherited.getFlavor();
     if (flavor.hasFlavor(CIMFlavor::TOSUBCLASS) && !flavor.hasFlavor(CIMFlavor::OVERRIDABLE) &&
         use.getValue() != inherited.getValue())
+    {
         fail(CIM_ERR_FAILED, "qualifier cannot be overridden: " + utf8(use.getName()));
+    }
 }
 
 } // namespace Pegasus::repository

@@ -7,7 +7,7 @@ namespace Pegasus::repository {
 
 namespace {
 
-/// A schema has a hundred declarations; beyond this many it is cheaper to start over than to choose.
+// A schema has a hundred declarations; beyond this many it is cheaper to start over than to choose.
 constexpr std::size_t kMaxKnown = 4096;
 
 std::string keyOf(NamespaceId nameSpace, const CIMName& name)
@@ -21,21 +21,25 @@ CIMQualifierDecl QualifierStore::find(NamespaceId nameSpace, const CIMName& name
 {
     const std::string key = keyOf(nameSpace, name);
     const auto known = fKnown.find(key);
-    if (known != fKnown.end())
+    if (known != fKnown.end()) {
         return known->second;
+    }
     const std::optional<std::string> text = fStorage.findQualifier(nameSpace, utf8(name));
-    if (!text)
+    if (!text) {
         return CIMQualifierDecl();
-    if (fKnown.size() >= kMaxKnown)
+    }
+    if (fKnown.size() >= kMaxKnown) {
         fKnown.clear();
+    }
     return fKnown[key] = fTexts.toQualifier(*text);
 }
 
 std::vector<CIMQualifierDecl> QualifierStore::list(NamespaceId nameSpace)
 {
     std::vector<CIMQualifierDecl> all;
-    for (const std::string& text : fStorage.listQualifiers(nameSpace))
+    for (const std::string& text : fStorage.listQualifiers(nameSpace)) {
         all.push_back(fTexts.toQualifier(text));
+    }
     return all;
 }
 
@@ -45,15 +49,18 @@ void QualifierStore::set(NamespaceId nameSpace, const CIMConstQualifierDecl& dec
     const CIMQualifierDecl existing = find(nameSpace, name);
     if (!existing.isUninitialized() &&
         (existing.getType() != declaration.getType() || existing.isArray() != declaration.isArray()))
+    {
         return;
+    }
     fStorage.putQualifier(nameSpace, utf8(name), fTexts.fromQualifier(declaration));
     fKnown.erase(keyOf(nameSpace, name));
 }
 
 void QualifierStore::remove(NamespaceId nameSpace, const CIMName& name)
 {
-    if (!fStorage.deleteQualifier(nameSpace, utf8(name)))
+    if (!fStorage.deleteQualifier(nameSpace, utf8(name))) {
         fail(CIM_ERR_NOT_FOUND, utf8(name));
+    }
     fKnown.erase(keyOf(nameSpace, name));
 }
 

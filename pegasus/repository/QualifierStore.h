@@ -10,13 +10,13 @@
 
 namespace Pegasus::repository {
 
-/// Qualifier declarations, each decoded once. Errors and limits: see Repository. Thread: one thread at a time.
+// Qualifier declarations, each decoded once. Errors and limits: see Repository. Thread: one thread at a time.
 class QualifierStore
 {
   public:
     QualifierStore(Storage& storage, ObjectText& texts) : fStorage(storage), fTexts(texts) {}
 
-    /// Uninitialised if there is none.
+    // Uninitialised if there is none.
     CIMQualifierDecl find(NamespaceId nameSpace, const CIMName& name);
     std::vector<CIMQualifierDecl> list(NamespaceId nameSpace);
     void set(NamespaceId nameSpace, const CIMConstQualifierDecl& declaration);
@@ -27,7 +27,7 @@ class QualifierStore
   private:
     Storage& fStorage;
     ObjectText& fTexts;
-    std::unordered_map<std::string, CIMQualifierDecl> fKnown; ///< by namespace and folded name
+    std::unordered_map<std::string, CIMQualifierDecl> fKnown; // by namespace and folded name
 };
 
 } // namespace Pegasus::repository

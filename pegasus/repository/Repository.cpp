@@ -7,6 +7,7 @@
 #include <cerrno>
 #include <cstring>
 #include <mutex>
+
 #include <sys/stat.h>
 
 namespace Pegasus::repository {
@@ -17,15 +18,17 @@ using Lock = std::lock_guard<std::mutex>;
 
 constexpr const char* kFileName = "/repository.db";
 
-/// Like mkdir -p. Only the owner may look into what is created here.
+// Like mkdir -p. Only the owner may look into what is created here.
 void makeDirectories(const std::string& directory)
 {
     for (std::size_t end = directory.find('/', 1);; end = directory.find('/', end + 1)) {
         const std::string part = directory.substr(0, end);
-        if (::mkdir(part.c_str(), S_IRWXU) != 0 && errno != EEXIST)
+        if (::mkdir(part.c_str(), S_IRWXU) != 0 && errno != EEXIST) {
             fail(CIM_ERR_FAILED, "cannot create directory " + part + ": " + std::strerror(errno));
-        if (end == std::string::npos)
+        }
+        if (end == std::string::npos) {
             return;
+        }
     }
 }
 
@@ -37,7 +40,7 @@ std::string preparedFile(const std::string& directory)
 
 } // namespace
 
-/// The stores, and the lock that makes operations run one after the other.
+// The stores, and the lock that makes operations run one after the other.
 class Repository::State
 {
   public:
@@ -93,8 +96,9 @@ CIMQualifierDecl Repository::getQualifier(const CIMNamespaceName& nameSpace, con
 {
     const Lock lock(fState->mutex);
     CIMQualifierDecl found = fState->qualifiers.find(fState->namespaces.id(nameSpace), name);
-    if (found.isUninitialized())
+    if (found.isUninitialized()) {
         fail(CIM_ERR_NOT_FOUND, utf8(name));
+    }
     return found;
 }
 
@@ -155,8 +159,9 @@ std::vector<CIMConstClass> Repository::enumerateClasses(const CIMNamespaceName& 
     const Lock lock(fState->mutex);
     const NamespaceId id = fState->namespaces.id(nameSpace);
     std::vector<CIMConstClass> found;
-    for (const CIMName& name : fState->classes.listNames(id, className, deepInheritance))
+    for (const CIMName& name : fState->classes.listNames(id, className, deepInheritance)) {
         found.push_back(fState->classes.get(id, name, options));
+    }
     return found;
 }
 
@@ -204,7 +209,7 @@ void Repository::deleteInstance(const CIMNamespaceName& nameSpace, const CIMObje
     fState->instances.remove(fState->namespaces.id(nameSpace), path);
 }
 
-/// The lock is let go between batches; instances created or deleted meanwhile may or may not be seen.
+// The lock is let go between batches; instances created or deleted meanwhile may or may not be seen.
 void Repository::enumerateInstances(const CIMNamespaceName& nameSpace, const CIMName& className,
                                     const InstanceOptions& options, const InstanceSink& sink) const
 {
@@ -215,11 +220,14 @@ void Repository::enumerateInstances(const CIMNamespaceName& nameSpace, const CIM
             const Lock lock(fState->mutex);
             batch = fState->instances.nextBatch(fState->namespaces.id(nameSpace), className, options, after);
         }
-        if (batch.empty())
+        if (batch.empty()) {
             return;
-        for (const CIMInstance& instance : batch)
-            if (!sink(instance))
+        }
+        for (const CIMInstance& instance : batch) {
+            if (!sink(instance)) {
                 return;
+            }
+        }
     }
 }
 

@@ -31,16 +31,18 @@ constexpr const char* kListInstances =
 
 std::optional<std::string> firstText(Rows rows)
 {
-    if (!rows.next())
+    if (!rows.next()) {
         return std::nullopt;
+    }
     return std::string(rows.text(0));
 }
 
 std::vector<std::string> allTexts(Rows rows)
 {
     std::vector<std::string> texts;
-    while (rows.next())
+    while (rows.next()) {
         texts.emplace_back(rows.text(0));
+    }
     return texts;
 }
 
@@ -93,8 +95,9 @@ std::vector<std::pair<NamespaceId, std::string>> Storage::namespaces()
 {
     std::vector<std::pair<NamespaceId, std::string>> all;
     Rows rows = fStatements->listNamespaces.run();
-    while (rows.next())
+    while (rows.next()) {
         all.emplace_back(rows.integer(0), rows.text(1));
+    }
     return all;
 }
 
@@ -137,8 +140,9 @@ bool Storage::deleteQualifier(NamespaceId id, const std::string& name)
 {
     Rows rows = fStatements->deleteQualifier.run(id, std::string_view(name));
     const bool wasThere = rows.next();
-    if (wasThere)
+    if (wasThere) {
         rows.next();
+    }
     return wasThere;
 }
 
@@ -176,8 +180,9 @@ bool Storage::hasInstances(NamespaceId id, const std::string& className)
 std::optional<InstanceRow> Storage::findInstance(NamespaceId id, const std::string& path)
 {
     Rows rows = fStatements->findInstance.run(id, std::string_view(path));
-    if (!rows.next())
+    if (!rows.next()) {
         return std::nullopt;
+    }
     return InstanceRow{rows.integer(0), std::string(rows.text(1))};
 }
 

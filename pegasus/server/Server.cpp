@@ -1,15 +1,15 @@
 #include "pegasus/server/Server.h"
 
-#include "pegasus/common/LocalSocket.h"
-#include "pegasus/server/Acceptor.h"
-#include "pegasus/server/Dispatcher.h"
-#include "pegasus/server/Housekeeper.h"
-#include "pegasus/server/Listener.h"
-#include "pegasus/server/Log.h"
-#include "pegasus/server/PeerCheck.h"
-#include "pegasus/server/StartFile.h"
-#include "pegasus/server/StopSignal.h"
-#include "pegasus/server/TreeLock.h"
+#include "pegasus/base/LocalSocket.h"
+#include "pegasus/server/admin/Housekeeper.h"
+#include "pegasus/server/admin/Log.h"
+#include "pegasus/server/admin/StartFile.h"
+#include "pegasus/server/admin/StopSignal.h"
+#include "pegasus/server/admin/TreeLock.h"
+#include "pegasus/server/net/Acceptor.h"
+#include "pegasus/server/net/Listener.h"
+#include "pegasus/server/net/PeerCheck.h"
+#include "pegasus/server/operations/Dispatcher.h"
 
 #include <mutex>
 #include <system_error>
@@ -61,8 +61,9 @@ template <typename Settings> class SettingsCache
     {
         const std::lock_guard<std::mutex> lock(fMutex);
         const unsigned generation = fConfig.generation();
-        if (generation != fGeneration)
+        if (generation != fGeneration) {
             fSettings = fMake(fConfig);
+        }
         fGeneration = generation;
         return fSettings;
     }
@@ -82,8 +83,9 @@ class Presence
     explicit Presence(const Config& config) : fHome(config.home()), fStartFile(config.text("consumer")) {}
     ~Presence()
     {
-        if (fWritten)
+        if (fWritten) {
             fStartFile.removeIfOf(::getpid());
+        }
         fLock.release();
     }
     Presence(const Presence&) = delete;
@@ -91,8 +93,9 @@ class Presence
 
     void take(const Config& config)
     try {
-        if (!fLock.acquire(fHome) || fStartFile.runningServer())
+        if (!fLock.acquire(fHome) || fStartFile.runningServer()) {
             throw StartError("Unable to start CIMServer. CIMServer is already running.");
+        }
         config.save();
     } catch (const std::system_error&) {
         throw StartError("cimserver not started: Failed to save configuration properties to file: cannot open file: " +
@@ -154,8 +157,9 @@ void endConnections(ConnectionGroup& remote, ConnectionGroup& local, AgentPool& 
     local.endReading();
     const bool localEnded = local.waitForEnd(deadline);
     agents.shutDown();
-    if (remoteEnded && localEnded)
+    if (remoteEnded && localEnded) {
         return;
+    }
     remote.breakAll();
     local.breakAll();
     if (!remote.waitForEnd(Clock::now() + kGraceAfterBreak) || !local.waitForEnd(Clock::now() + kGraceAfterBreak)) {

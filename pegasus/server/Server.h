@@ -1,7 +1,7 @@
 #pragma once
 
-#include "pegasus/server/Config.h"
-#include "pegasus/server/Daemon.h"
+#include "pegasus/server/admin/Config.h"
+#include "pegasus/server/admin/Daemon.h"
 
 #include <string>
 #include <vector>

@@ -31,22 +31,26 @@ void describeExtent(const SystemTree& tree, const std::string& directory, std::u
     const std::uint64_t bytes = sectors * kSectorBytes;
     const auto block = tree.natural(directory + "queue/logical_block_size");
     record.set("BlockSize", block);
-    if (block && *block > 0)
+    if (block && *block > 0) {
         record.set("NumberOfBlocks", bytes / *block);
+    }
     record.set("TotalBytes", bytes);
     record.set("PhysicalBlockSize", narrowed<std::uint32_t>(tree.natural(directory + "queue/physical_block_size")));
     const auto readOnly = tree.flag(directory + "ro");
-    if (readOnly)
+    if (readOnly) {
         record.set("Access", std::uint16_t(*readOnly ? 1 : 3)); // Readable, Read/Write Supported
+    }
 }
 
 void describeActivity(const SystemTree& tree, const std::string& directory, Record& record)
 {
     const auto stat = tree.text(directory + "stat");
     const auto columns = stat ? words(*stat) : std::vector<std::string>();
-    for (const Counter& counter : kCounters)
-        if (counter.column < columns.size())
+    for (const Counter& counter : kCounters) {
+        if (counter.column < columns.size()) {
             record.set(counter.property, toNatural(columns[counter.column]));
+        }
+    }
 }
 
 Record blockDevice(const SystemTree& tree, const std::string& name, std::uint64_t sectors)
@@ -75,7 +79,9 @@ std::vector<Record> blockDevices(const SystemTree& tree)
     for (const std::string& name : tree.entries("/sys/block")) {
         const auto sectors = tree.natural("/sys/block/" + name + "/size");
         if (sectors && *sectors > 0) // an unused loop device has none
+        {
             result.push_back(blockDevice(tree, name, *sectors));
+        }
     }
     return result;
 }

@@ -1,8 +1,8 @@
 #include "providers/linux/Classes.h"
 
-#include <strings.h>
-
 #include <array>
+
+#include <strings.h>
 
 namespace lnx {
 namespace {
@@ -18,9 +18,11 @@ constexpr std::array kClasses{
 
 const ClassEntry* findClass(const std::string& name)
 {
-    for (const ClassEntry& entry : kClasses)
-        if (::strcasecmp(entry.name, name.c_str()) == 0)
+    for (const ClassEntry& entry : kClasses) {
+        if (::strcasecmp(entry.name, name.c_str()) == 0) {
             return &entry;
+        }
+    }
     return nullptr;
 }
 

@@ -1,5 +1,4 @@
-#ifndef PROVIDERS_LINUX_CLASSES_H
-#define PROVIDERS_LINUX_CLASSES_H
+#pragma once
 
 #include "providers/linux/Record.h"
 #include "providers/linux/SystemTree.h"
@@ -40,5 +39,3 @@ Record device(const SystemTree& tree, const char* className, const std::string& 
 std::uint32_t countProcesses(const SystemTree& tree, const std::optional<std::string>& name);
 
 } // namespace lnx
-
-#endif

@@ -1,8 +1,8 @@
 #include "providers/linux/CmpiRecord.h"
 
-#include <strings.h>
-
 #include <type_traits>
+
+#include <strings.h>
 
 namespace lnx {
 namespace {
@@ -64,16 +64,18 @@ template <> constexpr CMPIType typeOf<std::string>()
 // What a broker's function wants to see of a value: the text itself, or a pointer to as many bytes as the type has.
 template <class T> const CMPIValue* pointerTo(const T& value)
 {
-    if constexpr (std::is_same_v<T, std::string>)
+    if constexpr (std::is_same_v<T, std::string>) {
         return reinterpret_cast<const CMPIValue*>(value.c_str());
-    else
+    } else {
         return reinterpret_cast<const CMPIValue*>(&value);
+    }
 }
 
 template <class Object> void release(Object* object)
 {
-    if (object != nullptr)
+    if (object != nullptr) {
         object->ft->release(object);
+    }
 }
 
 // Calls `use(value, type)` with the value as the broker takes it; says the broker's status.
@@ -100,18 +102,20 @@ class ValuePasser
         constexpr CMPIType kElement = std::is_same_v<T, std::string> ? CMPIType{CMPI_string} : typeOf<T>();
         CMPIStatus status{CMPI_RC_OK, nullptr};
         CMPIArray* array = fBroker.eft->newArray(&fBroker, static_cast<CMPICount>(values.size()), kElement, &status);
-        for (CMPICount i = 0; array != nullptr && status.rc == CMPI_RC_OK && i < values.size(); ++i)
+        for (CMPICount i = 0; array != nullptr && status.rc == CMPI_RC_OK && i < values.size(); ++i) {
             status = passElement(values[i], [&](const CMPIValue* value, CMPIType type) {
                 return array->ft->setElementAt(array, i, value, type);
             });
+        }
         return usedOnce(array, status, static_cast<CMPIType>(CMPI_ARRAY | kElement), use);
     }
 
     template <class Object, class Use>
     static CMPIStatus usedOnce(Object* object, CMPIStatus status, CMPIType type, Use&& use)
     {
-        if (object != nullptr && status.rc == CMPI_RC_OK)
+        if (object != nullptr && status.rc == CMPI_RC_OK) {
             status = use(reinterpret_cast<const CMPIValue*>(&object), type);
+        }
         release(object);
         return status;
     }
@@ -143,14 +147,19 @@ bool sameKey(const CMPIObjectPath& path, const std::string& name, const std::str
 bool sameKey(const CMPIObjectPath& path, const std::string& name, const Reference& expected)
 {
     const CMPIData data = path.ft->getKey(&path, name.c_str(), nullptr);
-    if ((data.state & CMPI_nullValue) != 0 || data.type != CMPI_ref || data.value.ref == nullptr)
+    if ((data.state & CMPI_nullValue) != 0 || data.type != CMPI_ref || data.value.ref == nullptr) {
         return false;
+    }
     const CMPIString* className = data.value.ref->ft->getClassName(data.value.ref, nullptr);
     if (className == nullptr || ::strcasecmp(static_cast<const char*>(className->hdl), expected.className.c_str()) != 0)
+    {
         return false;
-    for (const auto& [key, value] : expected.keys)
-        if (!sameKey(*data.value.ref, key, value))
+    }
+    for (const auto& [key, value] : expected.keys) {
+        if (!sameKey(*data.value.ref, key, value)) {
             return false;
+        }
+    }
     return true;
 }
 
@@ -160,9 +169,11 @@ CMPIObjectPath* CmpiRecord::reference(const Reference& reference, CMPIStatus& st
 {
     CMPIObjectPath* path =
         fBroker.eft->newObjectPath(&fBroker, fNameSpace.c_str(), reference.className.c_str(), &status);
-    for (const auto& [name, value] : reference.keys)
-        if (path != nullptr && status.rc == CMPI_RC_OK)
+    for (const auto& [name, value] : reference.keys) {
+        if (path != nullptr && status.rc == CMPI_RC_OK) {
             status = path->ft->addKey(path, name.c_str(), pointerTo(value), CMPI_chars);
+        }
+    }
     return path;
 }
 
@@ -185,9 +196,11 @@ CMPIObjectPath* CmpiRecord::path(const Record& record, CMPIStatus& status) const
     status = {CMPI_RC_OK, nullptr};
     CMPIObjectPath* path =
         fBroker.eft->newObjectPath(&fBroker, fNameSpace.c_str(), record.className().c_str(), &status);
-    for (const Property& property : record.properties())
-        if (path != nullptr && status.rc == CMPI_RC_OK && property.isKey)
+    for (const Property& property : record.properties()) {
+        if (path != nullptr && status.rc == CMPI_RC_OK && property.isKey) {
             addKey(*path, property, status);
+        }
+    }
     if (status.rc != CMPI_RC_OK) {
         release(path);
         return nullptr;
@@ -208,10 +221,11 @@ CMPIStatus CmpiRecord::setProperty(CMPIInstance& instance, const Property& prope
     const ValuePasser passer(fBroker);
     return std::visit(
         [&](const auto& value) {
-            if constexpr (std::is_same_v<std::decay_t<decltype(value)>, Reference>)
+            if constexpr (std::is_same_v<std::decay_t<decltype(value)>, Reference>) {
                 return CMPIStatus{CMPI_RC_OK, nullptr}; // done above
-            else
+            } else {
                 return passer.pass(value, set);
+            }
         },
         property.value);
 }
@@ -219,13 +233,16 @@ CMPIStatus CmpiRecord::setProperty(CMPIInstance& instance, const Property& prope
 CMPIInstance* CmpiRecord::instance(const Record& record, CMPIStatus& status) const
 {
     CMPIObjectPath* at = path(record, status);
-    if (at == nullptr)
+    if (at == nullptr) {
         return nullptr;
+    }
     CMPIInstance* instance = fBroker.eft->newInstance(&fBroker, at, &status);
     release(at);
-    for (const Property& property : record.properties())
-        if (instance != nullptr && status.rc == CMPI_RC_OK)
+    for (const Property& property : record.properties()) {
+        if (instance != nullptr && status.rc == CMPI_RC_OK) {
             status = setProperty(*instance, property);
+        }
+    }
     if (status.rc != CMPI_RC_OK) {
         release(instance);
         return nullptr;
@@ -236,13 +253,15 @@ CMPIInstance* CmpiRecord::instance(const Record& record, CMPIStatus& status) con
 bool CmpiRecord::matches(const Record& record, const CMPIObjectPath& path)
 {
     for (const Property& property : record.properties()) {
-        if (!property.isKey)
+        if (!property.isKey) {
             continue;
+        }
         const auto* linked = std::get_if<Reference>(&property.value);
         const bool isSame = linked != nullptr ? sameKey(path, property.name, *linked)
                                               : sameKey(path, property.name, std::get<std::string>(property.value));
-        if (!isSame)
+        if (!isSame) {
             return false;
+        }
     }
     return true;
 }

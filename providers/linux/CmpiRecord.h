@@ -1,5 +1,4 @@
-#ifndef PROVIDERS_LINUX_CMPIRECORD_H
-#define PROVIDERS_LINUX_CMPIRECORD_H
+#pragma once
 
 #include "providers/linux/Record.h"
 
@@ -34,5 +33,3 @@ class CmpiRecord
 };
 
 } // namespace lnx
-
-#endif

@@ -34,13 +34,14 @@ std::vector<Record> systemDevices(const SystemTree& tree)
 {
     const Reference system = computerSystems(tree).front().reference();
     std::vector<Record> links;
-    for (const auto collect : {processors, memories, networkPorts, blockDevices})
+    for (const auto collect : {processors, memories, networkPorts, blockDevices}) {
         for (const Record& part : collect(tree)) {
             Record link("LNX_SystemDevice");
             link.key("GroupComponent", system);
             link.key("PartComponent", part.reference());
             links.push_back(std::move(link));
         }
+    }
     return links;
 }
 

@@ -38,12 +38,14 @@ void describeUse(const MemoryInfo& info, Record& record)
     record.set("FreeBytes", info.bytes("MemFree"));
     record.set("AvailableBytes", available);
     record.set("CachedBytes", info.bytes("Cached"));
-    if (total && available && *total > 0 && *available <= *total)
+    if (total && available && *total > 0 && *available <= *total) {
         record.set("UsedPercentage", static_cast<std::uint8_t>((*total - *available) * 100 / *total));
+    }
     const auto limit = info.bytes("CommitLimit");
     const auto committed = info.bytes("Committed_AS");
-    if (limit && committed)
+    if (limit && committed) {
         record.set("CommitHeadroom", static_cast<std::int64_t>(*limit) - static_cast<std::int64_t>(*committed));
+    }
 }
 
 } // namespace
@@ -51,8 +53,9 @@ void describeUse(const MemoryInfo& info, Record& record)
 std::vector<Record> memories(const SystemTree& tree)
 {
     const auto text = tree.word("/proc/meminfo");
-    if (!text)
+    if (!text) {
         return {};
+    }
     Record record = device(tree, "LNX_Memory", "Memory");
     record.set("Name", std::string("Memory"));
     record.set("ElementName", std::string("Memory"));

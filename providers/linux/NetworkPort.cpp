@@ -1,11 +1,11 @@
 #include "providers/linux/Classes.h"
 #include "providers/linux/Parse.h"
 
-#include <net/if.h>
-#include <net/if_arp.h>
-
 #include <array>
 #include <cctype>
+
+#include <net/if.h>
+#include <net/if_arp.h>
 
 namespace lnx {
 namespace {
@@ -33,9 +33,11 @@ constexpr std::array kStates{"unknown", "notpresent", "down", "lowerlayerdown", 
 
 std::optional<std::uint16_t> linkState(const std::optional<std::string>& word)
 {
-    for (std::size_t i = 0; i < kStates.size(); ++i)
-        if (word == kStates[i])
+    for (std::size_t i = 0; i < kStates.size(); ++i) {
+        if (word == kStates[i]) {
             return static_cast<std::uint16_t>(i);
+        }
+    }
     return std::nullopt;
 }
 
@@ -43,12 +45,14 @@ std::optional<std::uint16_t> linkState(const std::optional<std::string>& word)
 std::vector<std::uint8_t> octets(const std::string& address)
 {
     std::vector<std::uint8_t> result;
-    if (address.size() % 3 != 2)
+    if (address.size() % 3 != 2) {
         return result;
+    }
     for (std::size_t at = 0; at < address.size(); at += 3) {
         const auto octet = toNatural("0x" + address.substr(at, 2));
-        if (!octet || (at != 0 && address[at - 1] != ':'))
+        if (!octet || (at != 0 && address[at - 1] != ':')) {
             return {};
+        }
         result.push_back(static_cast<std::uint8_t>(*octet));
     }
     return result;
@@ -58,16 +62,19 @@ std::vector<std::uint8_t> octets(const std::string& address)
 std::string compact(const std::string& address)
 {
     std::string result;
-    for (const char c : address)
-        if (c != ':')
+    for (const char c : address) {
+        if (c != ':') {
             result += static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
+        }
+    }
     return result;
 }
 
 void describeAddress(const std::optional<std::string>& address, Record& record)
 {
-    if (!address)
+    if (!address) {
         return;
+    }
     record.set("MACAddress", *address);
     if (auto bytes = octets(*address); !bytes.empty()) {
         record.set("MACOctets", std::move(bytes));
@@ -82,18 +89,21 @@ void describeLink(const SystemTree& tree, const std::string& directory, Record& 
     record.set("HardwareType", type);
     const bool isLoopback = type == ARPHRD_LOOPBACK;
     record.set("LinkTechnology", std::uint16_t(type == ARPHRD_ETHER ? 2 : isLoopback ? 1 : 0));
-    if (isLoopback)
+    if (isLoopback) {
         record.set("OtherLinkTechnology", std::string("loopback"));
+    }
     record.set("LinkState", linkState(tree.word(directory + "operstate")));
     record.set("CarrierDetected", tree.flag(directory + "carrier"));
 
     const auto speed = narrowed<std::int32_t>(tree.integer(directory + "speed")); // -1: not known
     record.set("NegotiatedSpeed", speed);
-    if (speed && *speed > 0)
+    if (speed && *speed > 0) {
         record.set("Speed", static_cast<std::uint64_t>(*speed) * 1'000'000);
+    }
     const auto duplex = tree.word(directory + "duplex");
-    if (duplex == "full" || duplex == "half")
+    if (duplex == "full" || duplex == "half") {
         record.set("FullDuplex", duplex == "full");
+    }
 }
 
 Record networkPort(const SystemTree& tree, const std::string& name)
@@ -104,14 +114,16 @@ Record networkPort(const SystemTree& tree, const std::string& name)
     record.set("ElementName", name);
     const auto flags = narrowed<std::uint32_t>(tree.natural(directory + "flags"));
     record.set("InterfaceFlags", flags);
-    if (flags)
+    if (flags) {
         record.set("EnabledState", std::uint16_t((*flags & IFF_UP) != 0 ? 2 : 3)); // Enabled, Disabled
+    }
     record.set("InterfaceIndex", narrowed<std::uint32_t>(tree.natural(directory + "ifindex")));
     record.set("ActiveMaximumTransmissionUnit", tree.natural(directory + "mtu"));
     describeAddress(tree.word(directory + "address"), record);
     describeLink(tree, directory, record);
-    for (const Counter& counter : kCounters)
+    for (const Counter& counter : kCounters) {
         record.set(counter.property, tree.natural(directory + "statistics/" + counter.file));
+    }
     return record;
 }
 
@@ -120,9 +132,12 @@ Record networkPort(const SystemTree& tree, const std::string& name)
 std::vector<Record> networkPorts(const SystemTree& tree)
 {
     std::vector<Record> result;
-    for (const std::string& name : tree.entries("/sys/class/net"))
+    for (const std::string& name : tree.entries("/sys/class/net")) {
         if (tree.exists("/sys/class/net/" + name + "/address")) // the directory also holds bonding_masters and the like
+        {
             result.push_back(networkPort(tree, name));
+        }
+    }
     return result;
 }
 

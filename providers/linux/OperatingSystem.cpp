@@ -1,10 +1,10 @@
 #include "providers/linux/Classes.h"
 #include "providers/linux/Parse.h"
 
-#include <time.h>
-
 #include <algorithm>
 #include <map>
+
+#include <time.h>
 
 namespace lnx {
 namespace {
@@ -35,12 +35,15 @@ std::optional<char> stateOf(const SystemTree& tree, const std::string& process)
 void describeProcesses(const SystemTree& tree, Record& record)
 {
     const std::vector<std::string> all = processes(tree);
-    if (all.empty())
+    if (all.empty()) {
         return;
+    }
     std::map<char, std::uint32_t> counts;
-    for (const std::string& process : all)
-        if (const auto state = stateOf(tree, process))
+    for (const std::string& process : all) {
+        if (const auto state = stateOf(tree, process)) {
             ++counts[*state];
+        }
+    }
 
     std::vector<Char16> states;
     std::vector<std::uint32_t> numbers;
@@ -51,8 +54,9 @@ void describeProcesses(const SystemTree& tree, Record& record)
     record.set("NumberOfProcesses", static_cast<std::uint32_t>(all.size()));
     record.set("ProcessStates", states);
     record.set("ProcessStateCounts", numbers);
-    if (const auto init = stateOf(tree, all.front()))
+    if (const auto init = stateOf(tree, all.front())) {
         record.set("InitProcessState", Char16{static_cast<std::uint16_t>(*init)});
+    }
 }
 
 void describeTimes(const SystemTree& tree, Record& record)
@@ -67,9 +71,11 @@ void describeTimes(const SystemTree& tree, Record& record)
     record.set("CurrentTimeZone", static_cast<std::int16_t>(local.tm_gmtoff / 60));
 
     const auto stat = tree.text("/proc/stat");
-    if (const auto booted = stat ? field(fields(*stat, ' '), "btime") : std::nullopt)
-        if (const auto seconds = toNatural(*booted))
+    if (const auto booted = stat ? field(fields(*stat, ' '), "btime") : std::nullopt) {
+        if (const auto seconds = toNatural(*booted)) {
             record.set("LastBootUpTime", DateTime{*seconds * kMicroseconds, false});
+        }
+    }
 
     const auto upTime = tree.text("/proc/uptime");
     const auto parts = upTime ? words(*upTime) : std::vector<std::string>();
@@ -84,11 +90,14 @@ void describeLoad(const SystemTree& tree, Record& record)
     const auto load = tree.text("/proc/loadavg");
     const auto parts = load ? words(*load) : std::vector<std::string>();
     std::vector<float> averages;
-    for (std::size_t i = 0; i < 3 && i < parts.size(); ++i)
-        if (const auto value = toReal(parts[i]))
+    for (std::size_t i = 0; i < 3 && i < parts.size(); ++i) {
+        if (const auto value = toReal(parts[i])) {
             averages.push_back(static_cast<float>(*value));
-    if (averages.size() == 3)
+        }
+    }
+    if (averages.size() == 3) {
         record.set("LoadAverages", averages);
+    }
 }
 
 // /proc/meminfo gives kilobytes, and so do these properties.
@@ -106,8 +115,9 @@ void describeMemory(const SystemTree& tree, Record& record)
     record.set("FreePhysicalMemory", kilobytes("MemFree"));
     record.set("TotalSwapSpaceSize", swap);
     record.set("FreeSpaceInPagingFiles", kilobytes("SwapFree"));
-    if (memory && swap)
+    if (memory && swap) {
         record.set("TotalVirtualMemorySize", *memory + *swap);
+    }
 }
 
 } // namespace
@@ -115,8 +125,9 @@ void describeMemory(const SystemTree& tree, Record& record)
 std::uint32_t countProcesses(const SystemTree& tree, const std::optional<std::string>& name)
 {
     const std::vector<std::string> all = processes(tree);
-    if (!name)
+    if (!name) {
         return static_cast<std::uint32_t>(all.size());
+    }
     return static_cast<std::uint32_t>(std::count_if(all.begin(), all.end(), [&](const std::string& process) {
         return tree.text("/proc/" + process + "/comm") == name;
     }));

@@ -28,8 +28,9 @@ std::string_view unquoted(std::string_view text)
 std::string_view trimmed(std::string_view text)
 {
     const std::size_t begin = text.find_first_not_of(kBlanks);
-    if (begin == std::string_view::npos)
+    if (begin == std::string_view::npos) {
         return {};
+    }
     return text.substr(begin, text.find_last_not_of(kBlanks) - begin + 1);
 }
 
@@ -81,8 +82,9 @@ Fields fields(std::string_view text, char separator)
     Fields result;
     for (const std::string_view line : lines(text)) {
         const std::size_t at = line.find(separator);
-        if (at != std::string_view::npos)
+        if (at != std::string_view::npos) {
             result.emplace(trimmed(line.substr(0, at)), trimmed(line.substr(at + 1)));
+        }
     }
     return result;
 }
@@ -90,8 +92,9 @@ Fields fields(std::string_view text, char separator)
 Fields shellFields(std::string_view text)
 {
     Fields result = fields(text, '=');
-    for (auto& [name, value] : result)
+    for (auto& [name, value] : result) {
         value = std::string(unquoted(value));
+    }
     return result;
 }
 

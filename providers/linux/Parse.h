@@ -1,5 +1,4 @@
-#ifndef PROVIDERS_LINUX_PARSE_H
-#define PROVIDERS_LINUX_PARSE_H
+#pragma once
 
 #include <cstdint>
 #include <limits>
@@ -25,8 +24,9 @@ std::optional<double> toReal(std::string_view text);
 // Returns: the value in the narrower type, when it fits.
 template <class T, class From> std::optional<T> narrowed(const std::optional<From>& value)
 {
-    if (!value)
+    if (!value) {
         return std::nullopt;
+    }
     const T result = static_cast<T>(*value);
     const bool isSame = static_cast<From>(result) == *value && (result < T{}) == (*value < From{});
     return isSame ? std::optional<T>(result) : std::nullopt;
@@ -42,5 +42,3 @@ Fields shellFields(std::string_view text);
 std::optional<std::string> field(const Fields& from, const std::string& name);
 
 } // namespace lnx
-
-#endif

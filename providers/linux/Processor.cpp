@@ -14,15 +14,17 @@ std::vector<Fields> blocks(const std::string& info)
     std::string block;
     const auto flush = [&] {
         Fields parsed = fields(block, ':');
-        if (field(parsed, "processor"))
+        if (field(parsed, "processor")) {
             result.push_back(std::move(parsed));
+        }
         block.clear();
     };
     for (const std::string_view line : lines(info)) {
-        if (trimmed(line).empty())
+        if (trimmed(line).empty()) {
             flush();
-        else
+        } else {
             block.append(line).append(1, '\n');
+        }
     }
     flush();
     return result;
@@ -37,10 +39,13 @@ std::optional<std::uint64_t> number(const Fields& block, const char* name)
 // The node whose directory entry lies beside the processor's; -1 where the machine has none.
 std::int8_t nodeOf(const SystemTree& tree, const std::string& directory)
 {
-    for (const std::string& entry : tree.entries(directory))
-        if (entry.compare(0, 4, "node") == 0)
-            if (const auto node = narrowed<std::int8_t>(toNatural(entry.substr(4))))
+    for (const std::string& entry : tree.entries(directory)) {
+        if (entry.compare(0, 4, "node") == 0) {
+            if (const auto node = narrowed<std::int8_t>(toNatural(entry.substr(4)))) {
                 return *node;
+            }
+        }
+    }
     return -1;
 }
 
@@ -50,10 +55,12 @@ std::vector<std::uint32_t> cacheKilobytes(const SystemTree& tree, const std::str
     std::vector<std::uint32_t> sizes;
     for (const std::string& entry : tree.entries(directory + "/cache")) {
         const auto text = tree.word(directory + "/cache/" + entry + "/size");
-        if (!text || text->back() != 'K')
+        if (!text || text->back() != 'K') {
             continue;
-        if (const auto size = narrowed<std::uint32_t>(toNatural(text->substr(0, text->size() - 1))))
+        }
+        if (const auto size = narrowed<std::uint32_t>(toNatural(text->substr(0, text->size() - 1)))) {
             sizes.push_back(*size);
+        }
     }
     return sizes;
 }
@@ -65,8 +72,9 @@ void describeClock(const SystemTree& tree, const Fields& block, const std::strin
         record.set("CurrentClockSpeed", static_cast<std::uint32_t>(std::lround(*megahertz)));
         record.set("ClockMegahertz", static_cast<float>(*megahertz));
     }
-    if (const auto kilohertz = tree.natural(directory + "/cpufreq/cpuinfo_max_freq"))
+    if (const auto kilohertz = tree.natural(directory + "/cpufreq/cpuinfo_max_freq")) {
         record.set("MaxClockSpeed", narrowed<std::uint32_t>(std::optional<std::uint64_t>(*kilohertz / 1000)));
+    }
     const auto bogus = field(block, "bogomips");
     record.set("BogoMips", bogus ? toReal(*bogus) : std::nullopt);
 }
@@ -74,8 +82,9 @@ void describeClock(const SystemTree& tree, const Fields& block, const std::strin
 void describeFeatures(const Fields& block, Record& record)
 {
     const auto text = field(block, "flags");
-    if (!text)
+    if (!text) {
         return;
+    }
     const std::vector<std::string> flags = words(*text);
     const bool isLong = std::find(flags.begin(), flags.end(), "lm") != flags.end();
     record.set("DataWidth", std::uint16_t(isLong ? 64 : 32));
@@ -102,8 +111,9 @@ Record processor(const SystemTree& tree, const Fields& block)
     record.set("PackageID", narrowed<std::uint32_t>(number(block, "physical id")));
     record.set("CoreID", narrowed<std::uint32_t>(number(block, "core id")));
     record.set("NumaNode", nodeOf(tree, directory));
-    if (auto sizes = cacheKilobytes(tree, directory); !sizes.empty())
+    if (auto sizes = cacheKilobytes(tree, directory); !sizes.empty()) {
         record.set("CacheSizes", std::move(sizes));
+    }
     describeClock(tree, block, directory, record);
     describeFeatures(block, record);
     return record;
@@ -114,9 +124,11 @@ Record processor(const SystemTree& tree, const Fields& block)
 std::vector<Record> processors(const SystemTree& tree)
 {
     std::vector<Record> result;
-    if (const auto info = tree.text("/proc/cpuinfo"))
-        for (const Fields& block : blocks(*info))
+    if (const auto info = tree.text("/proc/cpuinfo")) {
+        for (const Fields& block : blocks(*info)) {
             result.push_back(processor(tree, block));
+        }
+    }
     return result;
 }
 

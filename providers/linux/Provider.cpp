@@ -3,11 +3,11 @@
 
 #include <cmpi/cmpi.h>
 
-#include <strings.h>
-
 #include <atomic>
 #include <exception>
 #include <functional>
+
+#include <strings.h>
 
 // The library's two interfaces, instances and methods, both under the name LinuxInventory. The machine is read anew for
 // every request; nothing is kept between them, so any number may run at once.
@@ -56,12 +56,14 @@ CMPIStatus forEach(const CMPIObjectPath* path, const std::function<CMPIStatus(co
 {
     const std::string name = classOf(path);
     const ClassEntry* entry = findClass(name);
-    if (entry == nullptr)
+    if (entry == nullptr) {
         return failure(CMPI_RC_ERR_INVALID_CLASS, name + " is not of this provider");
+    }
     for (const Record& record : entry->collect(SystemTree())) {
         const CMPIStatus status = deliver(record);
-        if (status.rc != CMPI_RC_OK)
+        if (status.rc != CMPI_RC_OK) {
             return status;
+        }
     }
     return kOk;
 }
@@ -121,13 +123,15 @@ CMPIStatus getInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* re
         const CmpiRecord maker(*gBroker, nameSpace);
         bool isFound = false;
         const CMPIStatus status = forEach(path, [&](const Record& record) {
-            if (isFound || !CmpiRecord::matches(record, *path))
+            if (isFound || !CmpiRecord::matches(record, *path)) {
                 return kOk;
+            }
             isFound = true;
             return returnInstance(result, maker, record);
         });
-        if (status.rc == CMPI_RC_OK && !isFound)
+        if (status.rc == CMPI_RC_OK && !isFound) {
             return failure(CMPI_RC_ERR_NOT_FOUND, textOf(path->ft->toString(path, nullptr)));
+        }
         return done(status, result);
     });
 }
@@ -170,8 +174,9 @@ CMPIStatus countProcesses(const CMPIResult* result, const CMPIArgs* in, CMPIArgs
 {
     const CMPIData name = in->ft->getArg(in, "Name", nullptr);
     const bool isGiven = (name.state & CMPI_nullValue) == 0;
-    if (isGiven && name.type != CMPI_string)
+    if (isGiven && name.type != CMPI_string) {
         return failure(CMPI_RC_ERR_INVALID_PARAMETER, "CountProcesses: Name is not a string");
+    }
     const std::optional<std::string> wanted =
         isGiven ? std::optional<std::string>(textOf(name.value.string)) : std::nullopt;
 
@@ -179,8 +184,9 @@ CMPIStatus countProcesses(const CMPIResult* result, const CMPIArgs* in, CMPIArgs
     value.uint32 = lnx::countProcesses(SystemTree(), wanted);
     CMPIStatus status = out->ft->addArg(out, "Count", &value, CMPI_uint32);
     value.uint32 = 0;
-    if (status.rc == CMPI_RC_OK)
+    if (status.rc == CMPI_RC_OK) {
         status = result->ft->returnData(result, &value, CMPI_uint32);
+    }
     return done(status, result);
 }
 

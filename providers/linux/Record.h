@@ -1,5 +1,4 @@
-#ifndef PROVIDERS_LINUX_RECORD_H
-#define PROVIDERS_LINUX_RECORD_H
+#pragma once
 
 #include <cstdint>
 #include <optional>
@@ -54,8 +53,9 @@ class Record
     void set(const char* name, Value value) { fProperties.push_back({name, std::move(value), false}); }
     template <class T> void set(const char* name, const std::optional<T>& value)
     {
-        if (value)
+        if (value) {
             set(name, Value(*value));
+        }
     }
 
     // Returns: the value of that property, or null.
@@ -71,5 +71,3 @@ class Record
 };
 
 } // namespace lnx
-
-#endif

@@ -2,15 +2,15 @@
 
 #include "providers/linux/Parse.h"
 
-#include <dirent.h>
-#include <fcntl.h>
-#include <string.h>
-#include <unistd.h>
-
 #include <algorithm>
 #include <array>
 #include <cerrno>
 #include <memory>
+
+#include <dirent.h>
+#include <fcntl.h>
+#include <string.h>
+#include <unistd.h>
 
 namespace lnx {
 namespace {
@@ -21,8 +21,9 @@ class Descriptor
     explicit Descriptor(const std::string& path) : fFd(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK)) {}
     ~Descriptor()
     {
-        if (fFd >= 0)
+        if (fFd >= 0) {
             ::close(fFd);
+        }
     }
     Descriptor(const Descriptor&) = delete;
     Descriptor& operator=(const Descriptor&) = delete;
@@ -52,16 +53,19 @@ struct DirectoryCloser
 std::optional<std::string> SystemTree::text(const std::string& path) const
 {
     const Descriptor file(fRoot + path);
-    if (!file.isOpen())
+    if (!file.isOpen()) {
         return std::nullopt;
+    }
     std::string content;
     std::array<char, 16384> buffer{};
     while (content.size() < kMaxFileBytes) {
         const ssize_t got = file.read(buffer.data(), std::min(buffer.size(), kMaxFileBytes - content.size()));
-        if (got < 0)
+        if (got < 0) {
             return std::nullopt;
-        if (got == 0)
+        }
+        if (got == 0) {
             break;
+        }
         content.append(buffer.data(), static_cast<std::size_t>(got));
     }
     return std::string(trimmed(content));
@@ -95,15 +99,18 @@ std::vector<std::string> SystemTree::entries(const std::string& path) const
 {
     std::vector<std::string> names;
     const std::unique_ptr<DIR, DirectoryCloser> directory(::opendir((fRoot + path).c_str()));
-    if (!directory)
+    if (!directory) {
         return names;
+    }
     while (names.size() < kMaxEntries) {
         const dirent* entry = ::readdir(directory.get());
-        if (entry == nullptr)
+        if (entry == nullptr) {
             break;
+        }
         const std::string name = entry->d_name;
-        if (name != "." && name != "..")
+        if (name != "." && name != "..") {
             names.push_back(name);
+        }
     }
     std::sort(names.begin(), names.end(),
               [](const std::string& a, const std::string& b) { return ::strverscmp(a.c_str(), b.c_str()) < 0; });

@@ -1,5 +1,4 @@
-#ifndef PROVIDERS_LINUX_SYSTEMTREE_H
-#define PROVIDERS_LINUX_SYSTEMTREE_H
+#pragma once
 
 #include <cstddef>
 #include <cstdint>
@@ -43,5 +42,3 @@ class SystemTree
 };
 
 } // namespace lnx
-
-#endif

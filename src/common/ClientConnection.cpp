@@ -1,11 +1,11 @@
 #include "src/common/ClientConnection.h"
 
-#include <unistd.h>
+#include "src/common/CoreLog.h"
 
 #include <Pegasus/Client/CIMClient.h>
 #include <host/TVRXException.h>
 
-#include "src/common/CoreLog.h"
+#include <unistd.h>
 
 namespace NKOLVRX20 {
 
@@ -25,8 +25,9 @@ TClientConnection::~TClientConnection() = default;
 void TClientConnection::Init()
 {
     try {
-        if (!fClient)
+        if (!fClient) {
             fClient = std::make_unique<Pegasus::CIMClient>();
+        }
         fClient->setTimeout(kCreationTimeoutMs);
     } catch (const Pegasus::Exception& exception) {
         LogProgress(fTexts.fCreationFailed, ToStdString(exception.getMessage()));
@@ -37,8 +38,9 @@ void TClientConnection::Init()
 void TClientConnection::Connect(const std::string& host, unsigned short port, const std::string& user,
                                 const std::string& password)
 {
-    if (fConnected)
+    if (fConnected) {
         return;
+    }
     LogProgress(fTexts.fEnter);
     for (int failedTries = 1; failedTries <= kTries; ++failedTries) {
         try {

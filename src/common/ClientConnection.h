@@ -1,5 +1,4 @@
-#ifndef SRC_COMMON_CLIENTCONNECTION_H
-#define SRC_COMMON_CLIENTCONNECTION_H
+#pragma once
 
 #include <memory>
 #include <string>
@@ -56,5 +55,3 @@ class TClientConnection
 };
 
 } // namespace NKOLVRX20
-
-#endif

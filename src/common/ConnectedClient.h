@@ -1,5 +1,4 @@
-#ifndef SRC_COMMON_CONNECTEDCLIENT_H
-#define SRC_COMMON_CONNECTEDCLIENT_H
+#pragma once
 
 #include <Pegasus/Client/CIMClient.h>
 
@@ -10,11 +9,10 @@ namespace NKOLVRX20 {
 // answers for this too.
 template <typename TOwner> Pegasus::CIMClient& ConnectedClient(const TOwner& owner)
 {
-    if (!owner.isConnected())
+    if (!owner.isConnected()) {
         throw Pegasus::NotConnectedException();
+    }
     return *owner.getPegClient();
 }
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,6 +1,5 @@
 // Texts that several concerns of the plug-in share.
-#ifndef SRC_COMMON_CONSTANTS_H
-#define SRC_COMMON_CONSTANTS_H
+#pragma once
 
 #include <string>
 
@@ -23,5 +22,3 @@ inline const std::string kNspKey = "nsp";
 inline const std::string kTimeoutKey = "timeout";
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,10 +1,10 @@
 #include "src/common/CoreLog.h"
 
-#include <exception>
-
 #include <Pegasus/Common/Exception.h>
 #include <Pegasus/Common/String.h>
 #include <host/TRootObject.h>
+
+#include <exception>
 
 namespace NKOLVRX20 {
 

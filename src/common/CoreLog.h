@@ -1,12 +1,11 @@
 // Entries of the host's core log, put together with a string stream in the "C" locale.
-#ifndef SRC_COMMON_CORELOG_H
-#define SRC_COMMON_CORELOG_H
+#pragma once
+
+#include <host/ILogger.h>
 
 #include <locale>
 #include <sstream>
 #include <string>
-
-#include <host/ILogger.h>
 
 namespace Pegasus {
 class String;
@@ -56,5 +55,3 @@ template <typename... TParts> void LogCaughtException(const TParts&... parts) no
 }
 
 } // namespace NKOLVRX20
-
-#endif

@@ -34,20 +34,24 @@ bool IsRegularFile(const std::string& path)
 bool ReadDirectory(const std::string& path, std::vector<std::string>& names)
 {
     const std::unique_ptr<DIR, TDirectoryCloser> directory(::opendir(path.c_str()));
-    if (!directory)
+    if (!directory) {
         return false;
-    while (const dirent* entry = ::readdir(directory.get()))
+    }
+    while (const dirent* entry = ::readdir(directory.get())) {
         names.emplace_back(entry->d_name);
+    }
     return true;
 }
 
 TFile OpenRegularFile(const std::string& path)
 {
-    if (!IsRegularFile(path))
+    if (!IsRegularFile(path)) {
         return nullptr;
+    }
     TFile file(std::fopen(path.c_str(), "r"));
-    if (file)
+    if (file) {
         static_cast<void>(::fcntl(::fileno(file.get()), F_SETFD, FD_CLOEXEC));
+    }
     return file;
 }
 

@@ -1,6 +1,5 @@
 // What the plug-in asks the file system, without exceptions.
-#ifndef SRC_COMMON_FILES_H
-#define SRC_COMMON_FILES_H
+#pragma once
 
 #include <cstdio>
 #include <memory>
@@ -27,5 +26,3 @@ typedef std::unique_ptr<std::FILE, TFileCloser> TFile;
 TFile OpenRegularFile(const std::string& path);
 
 } // namespace NKOLVRX20
-
-#endif

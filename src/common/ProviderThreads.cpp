@@ -1,8 +1,8 @@
 #include "src/common/ProviderThreads.h"
 
-#include <boost/thread/thread.hpp>
-
 #include <host/TConfig.h>
+
+#include <boost/thread/thread.hpp>
 
 namespace NKOLVRX20 {
 
@@ -17,8 +17,9 @@ void RunOnThreads(const std::vector<boost::function<void()>>& tasks)
     const boost::this_thread::disable_interruption uninterrupted;
     boost::thread_group threads;
     try {
-        for (const boost::function<void()>& task : tasks)
+        for (const boost::function<void()>& task : tasks) {
             threads.create_thread(task);
+        }
     } catch (...) {
         threads.join_all();
         throw;

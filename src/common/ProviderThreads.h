@@ -1,9 +1,8 @@
-#ifndef SRC_COMMON_PROVIDERTHREADS_H
-#define SRC_COMMON_PROVIDERTHREADS_H
-
-#include <vector>
+#pragma once
 
 #include <boost/function.hpp>
+
+#include <vector>
 
 namespace NKOLVRX20 {
 
@@ -17,5 +16,3 @@ bool IsMultiThreaded();
 void RunOnThreads(const std::vector<boost::function<void()>>& tasks);
 
 } // namespace NKOLVRX20
-
-#endif

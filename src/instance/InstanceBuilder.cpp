@@ -1,16 +1,16 @@
 #include "src/instance/InstanceBuilder.h"
 
-#include <optional>
-
-#include <host/ICIMProperty.h>
-#include <host/TCIMValue.h>
-
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/instance/TPEGASUSInstance.h"
 #include "src/instance/ValueConversion.h"
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSClass.h"
+
+#include <host/ICIMProperty.h>
+#include <host/TCIMValue.h>
+
+#include <optional>
 
 namespace NKOLVRX20 {
 
@@ -64,8 +64,9 @@ class TPropertyTransfer
     {
         fName = TPEGASUSNamespace::NormalizeName(fServerName);
         target.SetPropertyValue(fName, Value(), {});
-        if (fServerName == kSlotNumber && fClass.GetName({}) == kSlotClass)
+        if (fServerName == kSlotNumber && fClass.GetName({}) == kSlotClass) {
             Narrow(target);
+        }
     }
 
   private:
@@ -74,13 +75,16 @@ class TPropertyTransfer
         TCIMValue value;
         const bool isReference = fProperty.getType() == Pegasus::CIMTYPE_REFERENCE;
         const auto referenced = isReference ? ReferencedClass(fClass, fSource, fServerName) : nullptr;
-        if (!fProperty.getValue().isNull())
+        if (!fProperty.getValue().isNull()) {
             pegValToVRX(fName, fProperty.getValue(), fProperty.getType(), fProperty.isArray(), value,
                         fClass.shared_from_this());
-        if (referenced)
+        }
+        if (referenced) {
             value.SetReferencedClass(referenced);
-        if (fServerName.find(kInstanceIdName) != std::string::npos && value.ToString(kDecimal).empty())
+        }
+        if (fServerName.find(kInstanceIdName) != std::string::npos && value.ToString(kDecimal).empty()) {
             value.Set("");
+        }
         return value;
     }
 

@@ -1,11 +1,10 @@
-#ifndef SRC_INSTANCE_INSTANCEBUILDER_H
-#define SRC_INSTANCE_INSTANCEBUILDER_H
+#pragma once
 
-#include <string>
+#include <Pegasus/Client/CIMClient.h>
 
 #include <boost/shared_ptr.hpp>
 
-#include <Pegasus/Client/CIMClient.h>
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -20,5 +19,3 @@ boost::shared_ptr<TPEGASUSInstance> BuildInstance(TPEGASUSClass& instanceClass, 
                                                   const std::string& operation);
 
 } // namespace NKOLVRX20
-
-#endif

@@ -9,8 +9,9 @@ TCIMValue MethodValueToHost(const std::string& name, const Pegasus::CIMValue& va
                             const boost::shared_ptr<ICIMClass>& forClass)
 {
     TCIMValue converted;
-    if (!value.isNull())
+    if (!value.isNull()) {
         pegValToVRX(name, value, value.getType(), value.isArray(), converted, forClass);
+    }
     return converted;
 }
 

@@ -1,11 +1,10 @@
-#ifndef SRC_INSTANCE_METHODRESULT_H
-#define SRC_INSTANCE_METHODRESULT_H
-
-#include <boost/function.hpp>
-#include <boost/shared_ptr.hpp>
+#pragma once
 
 #include <Pegasus/Client/CIMClient.h>
 #include <host/TCIMValue.h>
+
+#include <boost/function.hpp>
+#include <boost/shared_ptr.hpp>
 
 namespace NKOLVRX20 {
 
@@ -20,5 +19,3 @@ void AddOutputs(const Pegasus::Array<Pegasus::CIMParamValue>& outputs, const boo
                 const boost::function<void(const std::string&)>& onOutput, TCIMContext& entries);
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,15 +1,15 @@
 #include "src/instance/TPEGASUSInstance.h"
 
-#include <host/ICIMMethodDecl.h>
-#include <host/ICIMParameterDecl.h>
-#include <host/ICIMQualifier.h>
-#include <host/TVRXException.h>
-
 #include "src/common/ConnectedClient.h"
 #include "src/common/CoreLog.h"
 #include "src/instance/MethodResult.h"
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSClass.h"
+
+#include <host/ICIMMethodDecl.h>
+#include <host/ICIMParameterDecl.h>
+#include <host/ICIMQualifier.h>
+#include <host/TVRXException.h>
 
 namespace NKOLVRX20 {
 
@@ -23,8 +23,9 @@ boost::shared_ptr<ICIMParameterDecl> ParameterDeclOf(const ICIMClass& instanceCl
 {
     const auto methodDecl = instanceClass.GetMethodDecl(method, {});
     auto parameterDecl = methodDecl ? methodDecl->GetParameterDecl(parameter, {}) : nullptr;
-    if (!parameterDecl)
+    if (!parameterDecl) {
         throw TVRXException(TVRXStatusCode::kNotFound);
+    }
     return parameterDecl;
 }
 
@@ -62,10 +63,12 @@ Pegasus::Array<Pegasus::CIMParamValue> TPEGASUSInstance::InputsFor(const std::st
     Pegasus::Array<Pegasus::CIMParamValue> inputs;
     for (const auto& [name, value] : parameters) {
         const auto declaration = ParameterDeclOf(*GetClass({}), method, name);
-        if (declaration->GetQualifier("OUT", {}))
+        if (declaration->GetQualifier("OUT", {})) {
             inputs.append(ReferenceParameter(name, value));
-        if (declaration->GetQualifier("IN", {}))
+        }
+        if (declaration->GetQualifier("IN", {})) {
             inputs.append(ReferenceParameter(name, value));
+        }
     }
     return inputs;
 }

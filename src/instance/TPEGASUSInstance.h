@@ -1,11 +1,10 @@
-#ifndef SRC_INSTANCE_TPEGASUSINSTANCE_H
-#define SRC_INSTANCE_TPEGASUSINSTANCE_H
-
-#include <memory>
-#include <string>
+#pragma once
 
 #include <Pegasus/Client/CIMClient.h>
 #include <host/TInmemInstance.h>
+
+#include <memory>
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -53,5 +52,3 @@ class TPEGASUSInstance : public TInmemInstance
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,11 +1,11 @@
 #include "src/instance/ValueConversion.h"
 
-#include <sstream>
+#include "src/common/CoreLog.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMNamespace.h>
 
-#include "src/common/CoreLog.h"
+#include <sstream>
 
 namespace NKOLVRX20 {
 
@@ -74,8 +74,9 @@ template <typename TPeg> TCIMValue ArrayToHost(const Pegasus::CIMValue& value, T
     const auto held = Get<Pegasus::Array<TPeg>>(value);
     std::vector<TCIMValue> elements;
     elements.reserve(held.size());
-    for (Pegasus::Uint32 i = 0; i < held.size(); ++i)
+    for (Pegasus::Uint32 i = 0; i < held.size(); ++i) {
         elements.push_back(ToHost(held[i]));
+    }
     return TCIMValue(elementType, 0, elements);
 }
 
@@ -244,16 +245,18 @@ void ScalarToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
 void StringArrayToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
 {
     Pegasus::Array<Pegasus::String> elements;
-    for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(in))
+    for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(in)) {
         elements.append(Pegasus::String(static_cast<std::string>(element).c_str()));
+    }
     out.set(elements);
 }
 
 void DatetimeArrayToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
 {
     Pegasus::Array<Pegasus::CIMDateTime> elements;
-    for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(in))
+    for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(in)) {
         elements.append(Pegasus::CIMDateTime(DecimalText(element)));
+    }
     out.set(elements);
 }
 
@@ -312,18 +315,20 @@ void ArrayToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
 void pegValToVRX(std::string, Pegasus::CIMValue value, Pegasus::CIMType type, bool isArray, TCIMValue& out,
                  boost::shared_ptr<ICIMClass> forClass)
 {
-    if (isArray)
+    if (isArray) {
         ArrayFromPegasus(value, type, out);
-    else
+    } else {
         ScalarFromPegasus(value, type, out, forClass);
+    }
 }
 
 void vrxValToPeg(const TCIMValue& in, Pegasus::CIMValue& out)
 {
-    if (in.IsArray())
+    if (in.IsArray()) {
         ArrayToPegasus(in, out);
-    else
+    } else {
         ScalarToPegasus(in, out);
+    }
 }
 
 TCIMValue::TCIMType pegTypeToVRXType(Pegasus::CIMType type, bool isArray)

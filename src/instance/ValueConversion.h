@@ -2,15 +2,14 @@
 //
 // None of these functions catches or logs anything. Pegasus::TypeMismatchException (the declared type is not the
 // value's) and TVRXException 14 (a host value that does not convert) leave them, with the output as it was.
-#ifndef SRC_INSTANCE_VALUECONVERSION_H
-#define SRC_INSTANCE_VALUECONVERSION_H
-
-#include <string>
-
-#include <boost/shared_ptr.hpp>
+#pragma once
 
 #include <Pegasus/Client/CIMClient.h>
 #include <host/TCIMValue.h>
+
+#include <boost/shared_ptr.hpp>
+
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -30,8 +29,9 @@ void vrxValToPeg(const TCIMValue& in, Pegasus::CIMValue& out);
 template <typename THost, typename TPeg> void vrxArrayToPeg(const TCIMValue& in, Pegasus::CIMValue& out, THost, TPeg)
 {
     Pegasus::Array<TPeg> elements;
-    for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(in))
+    for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(in)) {
         elements.append(static_cast<TPeg>(static_cast<THost>(element)));
+    }
     out.set(elements);
 }
 
@@ -39,5 +39,3 @@ template <typename THost, typename TPeg> void vrxArrayToPeg(const TCIMValue& in,
 TCIMValue::TCIMType pegTypeToVRXType(Pegasus::CIMType type, bool isArray);
 
 } // namespace NKOLVRX20
-
-#endif

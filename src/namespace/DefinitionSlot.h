@@ -1,15 +1,14 @@
-#ifndef SRC_NAMESPACE_DEFINITIONSLOT_H
-#define SRC_NAMESPACE_DEFINITIONSLOT_H
-
-#include <map>
-#include <string>
-
-#include <boost/shared_ptr.hpp>
-
-#include <host/TVRXException.h>
+#pragma once
 
 #include "src/common/CoreLog.h"
 #include "src/namespace/TPEGASUSNamespace.h"
+
+#include <host/TVRXException.h>
+
+#include <boost/shared_ptr.hpp>
+
+#include <map>
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -29,5 +28,3 @@ boost::shared_ptr<TDefinition>& DefinitionSlot(std::map<std::string, boost::shar
 }
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,6 +1,5 @@
 // Texts and numbers that several concerns of the namespace share.
-#ifndef SRC_NAMESPACE_NAMESPACECONSTANTS_H
-#define SRC_NAMESPACE_NAMESPACECONSTANTS_H
+#pragma once
 
 #include "src/common/ClientConnection.h"
 
@@ -24,5 +23,3 @@ inline constexpr char kWrongContextTypeText[] =
     "kSint8.";
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,11 +1,4 @@
 // Which providers are installed: one for each requested-class file in a vendor's directory.
-#include <algorithm>
-
-#include <boost/make_shared.hpp>
-
-#include <host/TOSSpecific.h>
-#include <host/TVRXException.h>
-
 #include "src/common/CoreLog.h"
 #include "src/common/Files.h"
 #include "src/namespace/ServerTree.h"
@@ -13,6 +6,13 @@
 #include "src/plugin/TPEGASUSNamespaceProvider.h"
 #include "src/provider/TPEGASUSProvider.h"
 #include "src/provider/TPEGASUSRequestedClassParser.h"
+
+#include <host/TOSSpecific.h>
+#include <host/TVRXException.h>
+
+#include <boost/make_shared.hpp>
+
+#include <algorithm>
 
 namespace NKOLVRX20 {
 
@@ -24,8 +24,9 @@ constexpr char kDiagnosticOnly[] = "YES";
 std::vector<std::string> ReadDirectoryOrThrow(const std::string& path)
 {
     std::vector<std::string> names;
-    if (!ReadDirectory(path, names))
+    if (!ReadDirectory(path, names)) {
         throw TVRXException(TVRXStatusCode::kDirectoryNotOpened);
+    }
     return names;
 }
 
@@ -34,8 +35,9 @@ std::vector<std::string> SubDirectoriesAmong(const std::vector<std::string>& nam
 {
     std::vector<std::string> subDirectories;
     for (const std::string& name : names) {
-        if (name != "." && name != ".." && IsDirectory(directory + "/" + name))
+        if (name != "." && name != ".." && IsDirectory(directory + "/" + name)) {
             subDirectories.push_back(name);
+        }
     }
     return subDirectories;
 }
@@ -44,10 +46,12 @@ std::vector<std::string> SubDirectoriesAmong(const std::vector<std::string>& nam
 std::unique_ptr<char[]> AllocateFileBuffer(std::size_t bytes)
 {
     std::unique_ptr<char[]> buffer;
-    if (bytes <= kMaxRequestedClassFileBytes)
+    if (bytes <= kMaxRequestedClassFileBytes) {
         buffer.reset(new (std::nothrow) char[bytes]);
-    if (!buffer)
+    }
+    if (!buffer) {
         throw TVRXException(TVRXStatusCode::kAllocationFailed);
+    }
     return buffer;
 }
 
@@ -76,8 +80,9 @@ std::vector<std::string> TPEGASUSNamespace::FindXmlFiles(const std::string& root
     for (const std::string& vendor : SubDirectoriesAmong(ReadDirectoryOrThrow(root), root)) {
         const std::string directory = root + "/" + vendor;
         for (const std::string& name : ReadDirectoryOrThrow(directory)) {
-            if (name.find(extension) != std::string::npos)
+            if (name.find(extension) != std::string::npos) {
                 paths.push_back(directory + "/" + name);
+            }
         }
     }
     std::sort(paths.begin(), paths.end());
@@ -99,8 +104,9 @@ void TPEGASUSNamespace::parseProvider(const std::string& path, std::vector<std::
     const std::size_t bytes = TOSSpecific::GetFileSize(path);
     const std::unique_ptr<char[]> buffer = AllocateFileBuffer(bytes);
     TFile file = OpenRegularFile(path);
-    if (!file)
+    if (!file) {
         return;
+    }
     const std::size_t readBytes = std::fread(buffer.get(), 1, bytes, file.get());
     file.reset();
     {
@@ -110,8 +116,9 @@ void TPEGASUSNamespace::parseProvider(const std::string& path, std::vector<std::
         information = parser.GetRequestedProInfoData();
     }
     std::string names;
-    for (const std::string& name : classes)
+    for (const std::string& name : classes) {
         names += name + " , ";
+    }
     LogProgress("TPEGASUSNamespace::parseClasses collected for Class info = ", names, "\nNSP = ", information["nsp"],
                 "\nDefault timeout = ", information["timeout"], "\nModule name = ", information["module"]);
 }
@@ -119,8 +126,9 @@ void TPEGASUSNamespace::parseProvider(const std::string& path, std::vector<std::
 void TPEGASUSNamespace::prepareRegProvider(const std::string& path)
 {
     const auto hasPath = [&path](const auto& provider) { return provider->GetPath() == path; };
-    if (std::any_of(fProviders.begin(), fProviders.end(), hasPath))
+    if (std::any_of(fProviders.begin(), fProviders.end(), hasPath)) {
         return;
+    }
     LogProgress("Loading... ", path);
     const auto provider = boost::make_shared<TPEGASUSProvider>();
     provider->SetType(kProviderType);

@@ -1,9 +1,9 @@
 // MOF compilation by the server's own compiler.
-#include <host/TVRXException.h>
-
 #include "src/common/CoreLog.h"
 #include "src/common/Files.h"
 #include "src/namespace/TPEGASUSNamespace.h"
+
+#include <host/TVRXException.h>
 
 namespace NKOLVRX20 {
 
@@ -18,8 +18,9 @@ std::vector<std::string> TPEGASUSNamespace::FindMofFiles(const std::string& dire
     ReadDirectory(directory, names);
     std::vector<std::string> paths;
     for (const std::string& name : names) {
-        if (name.find(pattern) != std::string::npos)
+        if (name.find(pattern) != std::string::npos) {
             paths.push_back(directory + "/" + name);
+        }
     }
     return paths;
 }
@@ -27,8 +28,9 @@ std::vector<std::string> TPEGASUSNamespace::FindMofFiles(const std::string& dire
 std::vector<std::string> TPEGASUSNamespace::BuildMofPath(const std::string& path, const std::string& pattern)
 {
     const std::string::size_type slash = path.rfind('/');
-    if (slash == std::string::npos)
+    if (slash == std::string::npos) {
         throw TVRXException(TVRXStatusCode::kBadPath);
+    }
     return FindMofFiles(path.substr(0, slash), pattern);
 }
 

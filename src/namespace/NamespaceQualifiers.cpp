@@ -1,10 +1,10 @@
 // The qualifier declarations of this namespace, and the way to the host's own.
-#include <boost/make_shared.hpp>
-
 #include "src/namespace/DefinitionSlot.h"
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSQualifierDecl.h"
 #include "src/schema/VisitInOrder.h"
+
+#include <boost/make_shared.hpp>
 
 namespace NKOLVRX20 {
 

@@ -1,9 +1,4 @@
 // Making the providers known to the server, fetching their classes, and listing them to the host.
-#include <boost/bind/bind.hpp>
-
-#include <host/ICIMClass.h>
-#include <host/TVRXException.h>
-
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/common/ProviderThreads.h"
@@ -12,6 +7,11 @@
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/provider/TPEGASUSProvider.h"
 #include "src/schema/TPEGASUSClass.h"
+
+#include <host/ICIMClass.h>
+#include <host/TVRXException.h>
+
+#include <boost/bind/bind.hpp>
 
 namespace NKOLVRX20 {
 
@@ -37,8 +37,9 @@ void RunForProvider(const char* operation, const boost::shared_ptr<TPEGASUSProvi
 bool AsksForProviders(const TCIMContext& context)
 {
     const auto entry = context.find(kPluginTypeKey);
-    if (entry == context.end())
+    if (entry == context.end()) {
         return true;
+    }
     if (entry->second.IsArray() || entry->second.GetType() != TCIMValue::TCIMType::kSint8) {
         LogFailure(kWrongContextTypeText);
         throw TVRXException(TVRXStatusCode::kTypeMismatch);
@@ -60,12 +61,14 @@ void TPEGASUSNamespace::RegisterProviders()
         }
         RunOnThreads(tasks);
     } else {
-        for (const auto& provider : fProviders)
+        for (const auto& provider : fProviders) {
             regProvider(provider->GetPath(), provider);
+        }
     }
     LogProgress("after reg...");
-    for (const auto& provider : fProviders)
+    for (const auto& provider : fProviders) {
         finishRegProvider(provider->GetPath(), provider);
+    }
 }
 
 void TPEGASUSNamespace::regProvider(std::string path, boost::shared_ptr<TPEGASUSProvider> provider)
@@ -73,10 +76,12 @@ void TPEGASUSNamespace::regProvider(std::string path, boost::shared_ptr<TPEGASUS
     LogProgress("Entering TPEGASUSNamespace::regProvider: ", path);
     const std::vector<std::string> specifications = BuildMofPath(path, kSpecificationExtension);
     const std::vector<std::string> registrations = BuildMofPath(path, kRegistrationExtension);
-    for (const std::string& file : specifications)
+    for (const std::string& file : specifications) {
         callCimmof(provider->GetNameSpaceName({}), file);
-    for (const std::string& file : registrations)
+    }
+    for (const std::string& file : registrations) {
         callCimmof(kInterOpNamespace, file);
+    }
 }
 
 void TPEGASUSNamespace::finishRegProvider(std::string path, boost::shared_ptr<TPEGASUSProvider> provider)
@@ -84,8 +89,9 @@ void TPEGASUSNamespace::finishRegProvider(std::string path, boost::shared_ptr<TP
     LogProgress("Entering TPEGASUSNamespace::ffinishRegProvider: ", path);
     std::vector<boost::shared_ptr<ICIMClass>> collected;
     for (const std::string& entry : provider->GetClassVector()) {
-        if (const auto requestedClass = CollectClass(entry, provider))
+        if (const auto requestedClass = CollectClass(entry, provider)) {
             collected.push_back(requestedClass);
+        }
     }
     provider->SetCollectedClasses(collected);
     provider->initPegasusClient();
@@ -101,8 +107,9 @@ boost::shared_ptr<ICIMClass> TPEGASUSNamespace::CollectClass(const std::string& 
     const TCIMContext context = {{kNspKey, provider->GetNameSpaceName({})}, {kTimeoutKey, tags[kTimeOutTag]}};
     const auto requestedClass = boost::dynamic_pointer_cast<TPEGASUSClass>(GetClass(name, context));
     if (requestedClass) {
-        if (tags[kTag] == kCdmTag)
+        if (tags[kTag] == kCdmTag) {
             requestedClass->SetTag(kCdmTag);
+        }
         requestedClass->SetProvider(provider);
     }
     LogProgress("TPEGASUSNamespace::Getting class: ", name, " from Pegasus CIMOM");
@@ -117,12 +124,14 @@ std::string TPEGASUSNamespace::filterTag4classes(const std::string& entry, std::
     const auto tagStart = entry.find("%^");
     const auto tagEnd = entry.find("^%");
     std::string name = entry.substr(0, std::min(leftBracket, tagStart));
-    if (rightBracket != kNone && leftBracket < rightBracket)
+    if (rightBracket != kNone && leftBracket < rightBracket) {
         tags[kTimeOutTag] = entry.substr(leftBracket + 1, rightBracket - leftBracket - 1);
+    }
     if (tagEnd != kNone && tagStart != kNone && tagStart + 2 < tagEnd) {
         const std::string tag = entry.substr(tagStart + 2, tagEnd - tagStart - 2);
-        if (tag == kCdmTag)
+        if (tag == kCdmTag) {
             LogProgress("TPEGASUSNamespace::filterTag4classes find one CDM class: ", name);
+        }
         tags[kTag] = tag;
     }
     return name;
@@ -132,14 +141,16 @@ void TPEGASUSNamespace::undoProvidersSetup() {}
 
 void TPEGASUSNamespace::EnumerateProviders(TProviderVisitor visitor, TCIMContext context)
 {
-    if (!AsksForProviders(context))
+    if (!AsksForProviders(context)) {
         return;
+    }
     LogProgress("TPEGASUSNamespace::EnumerateProviders: fProviders.size() = ", fProviders.size());
     LogProgress("before inventory pegasus NSP");
-    if (IsMultiThreaded())
+    if (IsMultiThreaded()) {
         VisitProvidersOnThreads(visitor);
-    else
+    } else {
         VisitProvidersInOrder(visitor);
+    }
     LogProgress("after inventory pegasus NSP");
 }
 
@@ -148,8 +159,9 @@ void TPEGASUSNamespace::VisitProvidersInOrder(const TProviderVisitor& visitor)
 {
     const auto providers = fProviders;
     for (const auto& provider : providers) {
-        if (!visitor(provider))
+        if (!visitor(provider)) {
             return;
+        }
     }
 }
 

@@ -1,18 +1,18 @@
 // The cache of classes: looked up by normalised name, fetched from the server on first use.
-#include <cctype>
-#include <iostream>
-
-#include <boost/make_shared.hpp>
-
-#include <Pegasus/Client/CIMClient.h>
-#include <host/TVRXException.h>
-
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/namespace/DefinitionSlot.h"
 #include "src/namespace/NamespaceConstants.h"
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSClass.h"
+
+#include <Pegasus/Client/CIMClient.h>
+#include <host/TVRXException.h>
+
+#include <boost/make_shared.hpp>
+
+#include <cctype>
+#include <iostream>
 
 namespace NKOLVRX20 {
 
@@ -35,11 +35,13 @@ bool IsNamePart(unsigned char character)
 
 bool IsLegalName(const std::string& name)
 {
-    if (!name.empty() && !IsNameStart(static_cast<unsigned char>(name.front())))
+    if (!name.empty() && !IsNameStart(static_cast<unsigned char>(name.front()))) {
         return false;
+    }
     for (const char character : name) {
-        if (!IsNamePart(static_cast<unsigned char>(character)))
+        if (!IsNamePart(static_cast<unsigned char>(character))) {
             return false;
+        }
     }
     return true;
 }
@@ -47,8 +49,9 @@ bool IsLegalName(const std::string& name)
 std::string TextFromContext(const TCIMContext& context, const std::string& key, const std::string& fallback)
 {
     const auto entry = context.find(key);
-    if (entry == context.end())
+    if (entry == context.end()) {
         return fallback;
+    }
     if (entry->second.IsArray() || entry->second.GetType() != TCIMValue::TCIMType::kString) {
         LogFailure(kWrongContextTypeText);
         throw TVRXException(TVRXStatusCode::kTypeMismatch);
@@ -74,8 +77,9 @@ class TDepthCount
 std::string TPEGASUSNamespace::NormalizeName(const std::string& name)
 {
     std::string normalized = name;
-    for (char& character : normalized)
+    for (char& character : normalized) {
         character = static_cast<char>(std::tolower(static_cast<unsigned char>(character)));
+    }
     if (!IsLegalName(normalized)) {
         LogFailure("PEGASUS: CIM name '", name, "' is invalid");
         throw TVRXException(TVRXStatusCode::kInvalidName);
@@ -91,8 +95,9 @@ boost::shared_ptr<TPEGASUSClass> TPEGASUSNamespace::FindClass(const std::string&
 
 boost::shared_ptr<ICIMClass> TPEGASUSNamespace::GetClass(const std::string& name, TCIMContext context)
 {
-    if (!isConnected() || name.empty())
+    if (!isConnected() || name.empty()) {
         return nullptr;
+    }
     if (name == kRootClassName) {
         LogProgress("TPEGASUSNamespace::GetClass ", name, " : return <root>");
         return fRootClass;
@@ -121,13 +126,15 @@ boost::shared_ptr<ICIMClass> TPEGASUSNamespace::FetchClass(const std::string& na
                 " From Pegasus CIMOM with ei timeout = ", timeout);
     Pegasus::CIMClass answer;
     TCIMContext classContext = {{kNspKey, cimNamespace}, {kTimeoutKey, timeout}};
-    if (!AskServerForClass(cimNamespace, name, answer) || !MirrorClass(answer, context, classContext))
+    if (!AskServerForClass(cimNamespace, name, answer) || !MirrorClass(answer, context, classContext)) {
         return nullptr;
+    }
     const auto mirrored = FindClass(key);
-    if (mirrored)
+    if (mirrored) {
         LogProgress("TPEGASUSNamespace::GetClass ", name, " Now it is Found in TPEGASUSNamespace");
-    else
+    } else {
         LogFailure("TPEGASUSNamespace::GetClass ", name, " Not Found - Something Wrong");
+    }
     return mirrored;
 }
 
@@ -195,15 +202,17 @@ void TPEGASUSNamespace::AddClass(boost::shared_ptr<TPEGASUSClass> newClass)
 {
     boost::shared_ptr<TPEGASUSClass>& slot =
         DefinitionSlot(fClasses, newClass->GetName({}), fAllowRedefinition, "TPEGASUSNamespace: class ");
-    if (slot)
+    if (slot) {
         newClass->SetChildClasses(slot->GetChildClasses());
+    }
     slot = newClass;
 }
 
 void TPEGASUSNamespace::EnumerateRootClasses(TClassVisitor visitor, TCIMContext context)
 {
-    if (isConnected() && fRootClass)
+    if (isConnected() && fRootClass) {
         fRootClass->EnumerateSubClasses(visitor, true, context);
+    }
 }
 
 } // namespace NKOLVRX20

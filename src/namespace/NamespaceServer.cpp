@@ -1,4 +1,14 @@
 // The private server as a process: port, configuration, start, stop, what an earlier run left, clean-up.
+#include "src/common/CoreLog.h"
+#include "src/common/Files.h"
+#include "src/namespace/NamespaceConstants.h"
+#include "src/namespace/Removal.h"
+#include "src/namespace/ServerTree.h"
+#include "src/namespace/TPEGASUSNamespace.h"
+
+#include <host/TOSSpecific.h>
+#include <host/TVRXException.h>
+
 #include <cerrno>
 #include <csignal>
 #include <cstdlib>
@@ -11,16 +21,6 @@
 #include <netinet/in.h>
 #include <sys/socket.h>
 #include <unistd.h>
-
-#include <host/TOSSpecific.h>
-#include <host/TVRXException.h>
-
-#include "src/common/CoreLog.h"
-#include "src/common/Files.h"
-#include "src/namespace/NamespaceConstants.h"
-#include "src/namespace/Removal.h"
-#include "src/namespace/ServerTree.h"
-#include "src/namespace/TPEGASUSNamespace.h"
 
 namespace NKOLVRX20 {
 
@@ -67,8 +67,9 @@ class TProbeSocket
 // Returns: false when there is no such file. A file without a number gives 0, which no server has.
 bool ReadProcessId(const std::string& path, int& pid)
 {
-    if (!IsRegularFile(path))
+    if (!IsRegularFile(path)) {
         return false;
+    }
     std::ifstream file(path);
     file.imbue(std::locale::classic());
     file >> pid;
@@ -92,7 +93,9 @@ bool ListsServer(const std::string& listing, const std::string& pid)
     for (std::string line; std::getline(lines, line);) {
         std::string firstToken;
         if (line.find(kServerName) != std::string::npos && std::istringstream(line) >> firstToken && firstToken == pid)
+        {
             return true;
+        }
     }
     return false;
 }
@@ -102,12 +105,14 @@ bool ListsServer(const std::string& listing, const std::string& pid)
 unsigned short TPEGASUSNamespace::getAvailablePort()
 {
     const TProbeSocket socket;
-    if (socket.CanBind(fHostAddress, kPreferredPort))
+    if (socket.CanBind(fHostAddress, kPreferredPort)) {
         return kPreferredPort;
+    }
     LogProgress("Can not bind to port ", kPreferredPort, ", try others");
     for (unsigned short port = kHighestPort; port >= kLowestPort; --port) {
-        if (socket.CanBind(fHostAddress, port))
+        if (socket.CanBind(fHostAddress, port)) {
             return port;
+        }
     }
     std::exit(1);
 }
@@ -124,8 +129,9 @@ std::string TPEGASUSNamespace::RunServerProgram(const std::string& name,
 void TPEGASUSNamespace::callCimconfig()
 {
     std::string directories;
-    for (const std::string& vendor : FindSubDirs(fRootDirectory + kProviderDirectory + "/"))
+    for (const std::string& vendor : FindSubDirs(fRootDirectory + kProviderDirectory + "/")) {
         directories += "provider/" + vendor + ":";
+    }
     LogProgress(RunServerProgram(kConfigName, {"-s", "providerDir=" + directories}));
 }
 
@@ -159,8 +165,9 @@ void TPEGASUSNamespace::killResidualCimserver()
     const std::string path = StartFilePath();
     int pid = 0;
     if (ReadProcessId(path, pid)) {
-        if (isResidualCimserver(pid))
+        if (isResidualCimserver(pid)) {
             teminateCimserver(pid);
+        }
     } else {
         LogProgress("Error opening ", path);
     }
@@ -180,8 +187,9 @@ void TPEGASUSNamespace::StopCimserver()
 
 void TPEGASUSNamespace::closeCimserver(bool stopFirst)
 {
-    if (stopFirst)
+    if (stopFirst) {
         StopCimserver();
+    }
     ::sleep(kStopPauseSeconds);
     killResidualCimserver();
 }

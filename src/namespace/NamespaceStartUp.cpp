@@ -1,11 +1,4 @@
 // Start-up: from a constructed namespace to a connected one with the base schema and the vendors' files in place.
-#include <fstream>
-
-#include <unistd.h>
-
-#include <host/TOSSpecific.h>
-#include <host/TVRXException.h>
-
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/namespace/Removal.h"
@@ -14,6 +7,13 @@
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/plugin/TPEGASUSNamespaceProvider.h"
 #include "src/schema/TPEGASUSClass.h"
+
+#include <host/TOSSpecific.h>
+#include <host/TVRXException.h>
+
+#include <fstream>
+
+#include <unistd.h>
 
 namespace NKOLVRX20 {
 
@@ -76,8 +76,9 @@ void TPEGASUSNamespace::Initialize(TCIMContext context)
 void TPEGASUSNamespace::RefuseUnsafeNames()
 {
     const bool safeConsumer = IsSafeNamePart(fConsumerName);
-    if (!fRefused && safeConsumer)
+    if (!fRefused && safeConsumer) {
         return;
+    }
     const bool unsafeRoot = fRefused;
     fRefused = true;
     LogFailure(
@@ -89,8 +90,9 @@ void TPEGASUSNamespace::RefuseUnsafeNames()
 void TPEGASUSNamespace::StartServerAndConnect()
 {
     for (int attempt = 1; attempt <= kStartAttempts; ++attempt) {
-        if (TryToStartServer(attempt))
+        if (TryToStartServer(attempt)) {
             return;
+        }
     }
 }
 
@@ -131,8 +133,9 @@ void TPEGASUSNamespace::preConfig()
     const std::string vendors = fRootDirectory + kProviderDirectory;
     callCimconfig();
     RemovePath(kLsiConfiguration, kRemoveTree);
-    if (BrocadeVersion().find(kBrocadeVersion) == std::string::npos)
+    if (BrocadeVersion().find(kBrocadeVersion) == std::string::npos) {
         RemovePath(vendors + kBrocadeLibrary, kRemoveTree);
+    }
     WriteLsiConfiguration();
 }
 
@@ -140,8 +143,9 @@ void TPEGASUSNamespace::WriteLsiConfiguration() const
 {
     const std::string directory = fRootDirectory + kLsiDirectory;
     std::ofstream file(kLsiConfiguration, std::ios::trunc);
-    if (file)
+    if (file) {
         file << "DATA_DIR=" << directory << "\nLIBRARY_DIR=" << directory;
+    }
 }
 
 } // namespace NKOLVRX20

@@ -1,5 +1,4 @@
-#ifndef SRC_NAMESPACE_REMOVAL_H
-#define SRC_NAMESPACE_REMOVAL_H
+#pragma once
 
 #include <string>
 
@@ -14,5 +13,3 @@ inline constexpr char kRemoveFile[] = "-f";
 void RemovePath(const std::string& path, const char* options);
 
 } // namespace NKOLVRX20
-
-#endif

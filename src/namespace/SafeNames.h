@@ -1,7 +1,6 @@
 // Which names may stand in a removal command. Those commands go through a shell and end in "-rf", with the names in
 // them to the letter: a blank or a star could delete something else.
-#ifndef SRC_NAMESPACE_SAFENAMES_H
-#define SRC_NAMESPACE_SAFENAMES_H
+#pragma once
 
 #include <string>
 
@@ -14,5 +13,3 @@ bool IsSafeDirectory(const std::string& path);
 bool IsSafeNamePart(const std::string& name);
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,6 +1,5 @@
 // Where things lie below the root directory (the server's) and below the module path (the plug-in's).
-#ifndef SRC_NAMESPACE_SERVERTREE_H
-#define SRC_NAMESPACE_SERVERTREE_H
+#pragma once
 
 namespace NKOLVRX20 {
 
@@ -24,5 +23,3 @@ inline constexpr char kInterOpNamespace[] = "root/PG_InterOp";
 inline constexpr int kProgramTimeoutSeconds = 32767;
 
 } // namespace NKOLVRX20
-
-#endif

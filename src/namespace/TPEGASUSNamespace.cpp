@@ -1,11 +1,5 @@
 #include "src/namespace/TPEGASUSNamespace.h"
 
-#include <cstdlib>
-
-#include <host/ICIMIndicationFilter.h>
-#include <host/ICIMInstance.h>
-#include <host/TVRXException.h>
-
 #include "src/common/CoreLog.h"
 #include "src/namespace/NamespaceConstants.h"
 #include "src/namespace/SafeNames.h"
@@ -14,6 +8,12 @@
 #include "src/provider/TPEGASUSProvider.h"
 #include "src/schema/TPEGASUSClass.h"
 #include "src/schema/TPEGASUSQualifierDecl.h"
+
+#include <host/ICIMIndicationFilter.h>
+#include <host/ICIMInstance.h>
+#include <host/TVRXException.h>
+
+#include <cstdlib>
 
 namespace NKOLVRX20 {
 
@@ -28,8 +28,9 @@ constexpr char kProgramVendor[] = "/mellanox";
 std::string LibraryPath(const std::string& root)
 {
     std::string path = root + kLibraryDirectory + ":" + root;
-    for (const char* vendor : kLibraryVendors)
+    for (const char* vendor : kLibraryVendors) {
         path += ":" + root + kProviderDirectory + vendor;
+    }
     return path;
 }
 
@@ -50,7 +51,9 @@ boost::shared_ptr<ICIMNamespace> NamespaceFromContext(const TCIMContext& context
     const auto entry = context.find(key);
     if (entry == context.end() || entry->second.IsArray() || entry->second.IsNull() ||
         entry->second.GetType() != TCIMValue::TCIMType::kUint64)
+    {
         return nullptr;
+    }
     const unsigned long address = entry->second;
     // The host passes a pointer as a number.
     // NOLINTNEXTLINE(performance-no-int-to-ptr)
@@ -90,12 +93,15 @@ TPEGASUSNamespace::~TPEGASUSNamespace()
 
 void TPEGASUSNamespace::ReleaseCycles()
 {
-    for (const auto& provider : fProviders)
+    for (const auto& provider : fProviders) {
         provider->SetCollectedClasses({});
-    for (const auto& entry : fClasses)
+    }
+    for (const auto& entry : fClasses) {
         entry.second->ReleaseLinks();
-    if (fRootClass)
+    }
+    if (fRootClass) {
         fRootClass->ReleaseLinks();
+    }
 }
 
 boost::shared_ptr<INamespaceProvider> TPEGASUSNamespace::GetNamespaceProvider(TCIMContext)
@@ -131,8 +137,9 @@ boost::shared_ptr<ICIMInstance> TPEGASUSNamespace::GetInstance(const TCIMReferen
 
 ICIMNamespace& TPEGASUSNamespace::RepositoryNamespace() const
 {
-    if (!fRepositoryNamespace)
+    if (!fRepositoryNamespace) {
         throw TVRXException(TVRXStatusCode::kNotSupported);
+    }
     return *fRepositoryNamespace;
 }
 

@@ -1,17 +1,16 @@
-#ifndef SRC_NAMESPACE_TPEGASUSNAMESPACE_H
-#define SRC_NAMESPACE_TPEGASUSNAMESPACE_H
+#pragma once
 
-#include <map>
-#include <string>
-#include <vector>
+#include "src/common/ClientConnection.h"
+
+#include <host/ICIMNamespace.h>
 
 #include <boost/enable_shared_from_this.hpp>
 #include <boost/shared_ptr.hpp>
 #include <boost/weak_ptr.hpp>
 
-#include <host/ICIMNamespace.h>
-
-#include "src/common/ClientConnection.h"
+#include <map>
+#include <string>
+#include <vector>
 
 namespace Pegasus {
 class CIMClass;
@@ -238,5 +237,3 @@ class TPEGASUSNamespace : public ICIMNamespace, public boost::enable_shared_from
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,16 +1,16 @@
 #include "src/plugin/TPEGASUSNamespaceProvider.h"
 
-#include <dlfcn.h>
-
-#include <boost/make_shared.hpp>
+#include "src/common/Constants.h"
+#include "src/common/CoreLog.h"
+#include "src/namespace/TPEGASUSNamespace.h"
 
 #include <host/ICIMNamespace.h>
 #include <host/INamespaceProviderManager.h>
 #include <host/TRootObject.h>
 
-#include "src/common/Constants.h"
-#include "src/common/CoreLog.h"
-#include "src/namespace/TPEGASUSNamespace.h"
+#include <boost/make_shared.hpp>
+
+#include <dlfcn.h>
 
 namespace NKOLVRX20 {
 

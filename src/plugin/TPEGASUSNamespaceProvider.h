@@ -1,11 +1,10 @@
-#ifndef SRC_PLUGIN_TPEGASUSNAMESPACEPROVIDER_H
-#define SRC_PLUGIN_TPEGASUSNAMESPACEPROVIDER_H
+#pragma once
 
-#include <string>
+#include <host/INamespaceProvider.h>
 
 #include <boost/shared_ptr.hpp>
 
-#include <host/INamespaceProvider.h>
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -51,5 +50,3 @@ class TPEGASUSNamespaceProvider : public INamespaceProvider
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,17 +1,17 @@
 #include "src/provider/TPEGASUSProvider.h"
 
-#include <algorithm>
-#include <utility>
-
-#include <boost/make_shared.hpp>
+#include "src/common/Constants.h"
+#include "src/common/CoreLog.h"
+#include "src/schema/TPEGASUSClass.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMQualifier.h>
 #include <host/TVRXException.h>
 
-#include "src/common/Constants.h"
-#include "src/common/CoreLog.h"
-#include "src/schema/TPEGASUSClass.h"
+#include <boost/make_shared.hpp>
+
+#include <algorithm>
+#include <utility>
 
 namespace NKOLVRX20 {
 
@@ -35,8 +35,9 @@ bool IsTaggedCdm(const boost::shared_ptr<ICIMClass>& collected)
 bool IsNotToBeCollected(const ICIMClass& collected)
 {
     const boost::shared_ptr<ICIMQualifier> qualifier = collected.GetQualifier(kDontCollectQualifier, {});
-    if (!qualifier)
+    if (!qualifier) {
         return false;
+    }
     const TCIMValue value = qualifier->GetValue({});
     return !value.IsNull() && static_cast<bool>(value);
 }
@@ -92,8 +93,9 @@ void TPEGASUSProvider::OfferClass(const boost::shared_ptr<ICIMClass>& collected,
         LogProgress("TPEGASUSProvider::EnumerateClassesProvided ignored one CDM class: ", className);
         return;
     }
-    if (IsNotToBeCollected(*collected))
+    if (IsNotToBeCollected(*collected)) {
         return;
+    }
     LogProgress("TPEGASUSProvider::EnumerateClassesProvided Asking plugin ", providerName, " for ", className);
     visitor(collected);
 }

@@ -1,16 +1,15 @@
-#ifndef SRC_PROVIDER_TPEGASUSPROVIDER_H
-#define SRC_PROVIDER_TPEGASUSPROVIDER_H
+#pragma once
 
-#include <string>
-#include <vector>
-
-#include <boost/shared_ptr.hpp>
+#include "src/common/ClientConnection.h"
 
 #include <Pegasus/Client/CIMClient.h>
 #include <host/IProvider.h>
 #include <host/TProviderInfo.h>
 
-#include "src/common/ClientConnection.h"
+#include <boost/shared_ptr.hpp>
+
+#include <string>
+#include <vector>
 
 // CMPI's own names for a broker and a call context.
 struct _CMPIBroker;  // NOLINT(bugprone-reserved-identifier)
@@ -103,5 +102,3 @@ class TPEGASUSProvider : public IProvider
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,9 +1,9 @@
 #include "src/provider/TPEGASUSRequestedClassParser.h"
 
+#include "src/common/CoreLog.h"
+
 #include <algorithm>
 #include <cctype>
-
-#include "src/common/CoreLog.h"
 
 namespace NKOLVRX20 {
 
@@ -38,8 +38,9 @@ const TElementRule* FindRule(const std::string& element)
 
 std::string LowerCase(std::string text)
 {
-    for (char& character : text)
+    for (char& character : text) {
         character = static_cast<char>(std::tolower(static_cast<unsigned char>(character)));
+    }
     return text;
 }
 
@@ -59,10 +60,11 @@ void TPEGASUSRequestedClassParser::StartElement(const char* name, std::map<std::
     }
     for (const auto& attribute : attributes) {
         if (attribute.first == rule->fAttribute) {
-            if (rule->fInformationKey)
+            if (rule->fInformationKey) {
                 fProviderInformation[rule->fInformationKey] = attribute.second;
-            else
+            } else {
                 fRequestedClasses.push_back(attribute.second);
+            }
             return;
         }
         FatalError(("Unrecognized Attribute:" + attribute.first).c_str());
@@ -73,12 +75,14 @@ void TPEGASUSRequestedClassParser::StartElement(const char* name, std::map<std::
 void TPEGASUSRequestedClassParser::EndElement(const char* name)
 {
     fCurrentElement = LowerCase(name);
-    if (fCurrentElement == kRootElement)
+    if (fCurrentElement == kRootElement) {
         return;
-    if (fCurrentElement == kClassElement)
+    }
+    if (fCurrentElement == kClassElement) {
         fCurrentClass.clear();
-    else
+    } else {
         FatalError("Unrecognized identifier");
+    }
     fCurrentElement.clear();
 }
 

@@ -1,13 +1,12 @@
-#ifndef SRC_PROVIDER_TPEGASUSREQUESTEDCLASSPARSER_H
-#define SRC_PROVIDER_TPEGASUSREQUESTEDCLASSPARSER_H
+#pragma once
+
+#include <host/ILogger.h>
+#include <host/TXmlParser.h>
 
 #include <cstddef>
 #include <map>
 #include <string>
 #include <vector>
-
-#include <host/ILogger.h>
-#include <host/TXmlParser.h>
 
 namespace NKOLVRX20 {
 
@@ -51,5 +50,3 @@ class TPEGASUSRequestedClassParser : public TXmlParser
 };
 
 } // namespace NKOLVRX20
-
-#endif

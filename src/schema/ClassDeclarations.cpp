@@ -1,6 +1,4 @@
 // The properties and methods that a class declares, and the rules for adding one.
-#include <boost/make_shared.hpp>
-
 #include "src/common/CoreLog.h"
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSClass.h"
@@ -8,6 +6,8 @@
 #include "src/schema/TPEGASUSProperty.h"
 #include "src/schema/TPEGASUSPropertyDecl.h"
 #include "src/schema/VisitInOrder.h"
+
+#include <boost/make_shared.hpp>
 
 namespace NKOLVRX20 {
 
@@ -45,8 +45,9 @@ boost::shared_ptr<ICIMPropertyDecl> TPEGASUSClass::AllocatePropertyDecl(const st
 boost::shared_ptr<ICIMPropertyDecl> TPEGASUSClass::GetPropertyDecl(const std::string& name, TCIMContext) const
 {
     const auto declaration = FindDeclared(fPropertyDecls, name);
-    if (!declaration && name != kCollectionTimeProperty)
+    if (!declaration && name != kCollectionTimeProperty) {
         throw TVRXException(TVRXStatusCode::kUnknownProperty);
+    }
     return declaration;
 }
 
@@ -58,8 +59,9 @@ void TPEGASUSClass::EnumeratePropertyDecls(TPropertyDeclVisitor visitor, TCIMCon
 boost::shared_ptr<ICIMProperty> TPEGASUSClass::GetProperty(const std::string& name, TCIMContext) const
 {
     auto property = FindDeclared(fProperties, name);
-    if (!property)
+    if (!property) {
         throw TVRXException(TVRXStatusCode::kUnknownProperty);
+    }
     return property;
 }
 
@@ -87,8 +89,9 @@ void TPEGASUSClass::EnumerateMethodDecls(TMethodDeclVisitor visitor, TCIMContext
 void TPEGASUSClass::AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declaration)
 {
     const auto own = boost::dynamic_pointer_cast<TPEGASUSPropertyDecl>(declaration);
-    if (!own)
+    if (!own) {
         throw TVRXException(TVRXStatusCode::kTypeMismatch);
+    }
     const std::string name = own->GetName({});
     if (own->GetType({}) == TCIMValue::TCIMType::kReference && !IsAssociation({})) {
         LogFailure("TPEGASUS: Attempt to add reference property ", name, " to non-association class ", fName);
@@ -102,8 +105,9 @@ void TPEGASUSClass::AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declarat
     try {
         OverridePropertyDecl(key, own);
     } catch (const TVRXException& exception) {
-        if (exception.GetStatusCode() == TVRXStatusCode::kUnknownProperty)
+        if (exception.GetStatusCode() == TVRXStatusCode::kUnknownProperty) {
             throw;
+        }
         LogFailure("TPEGASUS: Attempt define property ", name, " in class ", fName,
                    "failed. Reason = ", exception.what());
         throw TVRXException(exception.GetStatusCode());
@@ -121,10 +125,12 @@ void TPEGASUSClass::OverridePropertyDecl(const std::string& key,
         AddNewPropertyDecl(key, declaration);
         return;
     }
-    if (existing->second->GetType({}) != declaration->GetType({}))
+    if (existing->second->GetType({}) != declaration->GetType({})) {
         RefuseOverride(name, ": different types", TVRXStatusCode::kTypeMismatch);
-    if (existing->second->GetClass({}) == shared_from_this())
+    }
+    if (existing->second->GetClass({}) == shared_from_this()) {
         RefuseOverride(name, ": original was defined in this class", TVRXStatusCode::kAlreadyExists);
+    }
     existing->second = declaration;
 }
 
@@ -150,8 +156,9 @@ void TPEGASUSClass::AdoptPropertyDecl(const std::string& name)
 {
     const auto superClass = fSuperClass.lock();
     const auto inherited = superClass ? FindDeclared(superClass->fPropertyDecls, name) : nullptr;
-    if (inherited)
+    if (inherited) {
         fPropertyDecls.emplace(TPEGASUSNamespace::NormalizeName(name), inherited);
+    }
 }
 
 void TPEGASUSClass::EnterProperty(const boost::shared_ptr<ICIMPropertyDecl>& declaration, const TCIMValue& value)

@@ -1,11 +1,11 @@
 // A class among its superclasses, subclasses and associations.
-#include <algorithm>
-
 #include "src/common/ConnectedClient.h"
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSClass.h"
+
+#include <algorithm>
 
 namespace NKOLVRX20 {
 
@@ -28,8 +28,9 @@ bool TPEGASUSClass::IsRootClass(TCIMContext) const
 boost::shared_ptr<ICIMClass> TPEGASUSClass::GetSuperClass(TCIMContext context) const
 {
     const auto ns = LockNamespace();
-    if (!ns->isConnected())
+    if (!ns->isConnected()) {
         return nullptr;
+    }
     std::string superName;
     try {
         const Pegasus::CIMClass answer =
@@ -58,23 +59,28 @@ void TPEGASUSClass::EnumerateSubClasses(TClassVisitor visitor, bool deep, TCIMCo
             LogFailure("TPEGASUSClass::EnumerateSubClasses : ", fName, "  ", exception.what());
             continue;
         }
-        if (goesOn && deep)
+        if (goesOn && deep) {
             child->EnumerateSubClasses(remembered, deep, context);
-        if (!goesOn)
+        }
+        if (!goesOn) {
             return;
+        }
     }
 }
 
 bool TPEGASUSClass::IsSubclassOf(boost::shared_ptr<const ICIMClass> other, TCIMContext context) const
 {
-    if (!other)
+    if (!other) {
         return false;
+    }
     const std::string wanted = other->GetName(context);
-    if (fName == wanted)
+    if (fName == wanted) {
         return true;
+    }
     for (auto ancestor = fSuperClass.lock(); ancestor; ancestor = ancestor->fSuperClass.lock()) {
-        if (ancestor->fName == wanted)
+        if (ancestor->fName == wanted) {
             return wanted != kRootClassName;
+        }
     }
     return false;
 }
@@ -89,8 +95,9 @@ void TPEGASUSClass::EnumerateAssociationClasses(TClassVisitor, const std::string
 void TPEGASUSClass::AddChildClass(boost::shared_ptr<ICIMClass> child)
 {
     const auto hasName = [name = child->GetName({})](const auto& other) { return other->GetName({}) == name; };
-    if (std::none_of(fChildClasses.begin(), fChildClasses.end(), hasName))
+    if (std::none_of(fChildClasses.begin(), fChildClasses.end(), hasName)) {
         fChildClasses.push_back(child);
+    }
 }
 
 void TPEGASUSClass::RemoveChildClass(boost::shared_ptr<ICIMClass>) {}

@@ -1,12 +1,12 @@
 // How a new class gets its settings and its declarations from the server.
-#include <cstdlib>
-
 #include "src/common/ConnectedClient.h"
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/ClassMirror.h"
 #include "src/schema/TPEGASUSClass.h"
+
+#include <cstdlib>
 
 namespace NKOLVRX20 {
 
@@ -33,8 +33,9 @@ void TPEGASUSClass::Initialize(const std::string& cimNamespace, const std::strin
     fSuperClass = superClass;
     try {
         fPegasusNsp = Pegasus::CIMNamespaceName(cimNamespace.c_str());
-        if (fName == kRootClassName)
+        if (fName == kRootClassName) {
             return;
+        }
         const auto ns = LockNamespace();
         TClassMirror(*this, *ns)
             .Mirror(ConnectedClient(*ns).getClass(fPegasusNsp, Pegasus::CIMName(fName.c_str()), false, true, false));
@@ -43,8 +44,9 @@ void TPEGASUSClass::Initialize(const std::string& cimNamespace, const std::strin
                    "\tdetail: ", ToStdString(exception.getMessage()));
         throw TVRXException(TVRXStatusCode::kServerConnectionFailed);
     }
-    if (superClass)
+    if (superClass) {
         superClass->AddChildClass(shared_from_this());
+    }
 }
 
 } // namespace NKOLVRX20

@@ -59,16 +59,18 @@ void TClassMirror::Mirror(const Pegasus::CIMClass& source)
 
 template <typename TSource> void TClassMirror::MirrorQualifiers(const TSource& source, const TElement& element)
 {
-    for (Pegasus::Uint32 i = 0; i < source.getQualifierCount(); ++i)
+    for (Pegasus::Uint32 i = 0; i < source.getQualifierCount(); ++i) {
         Guarded(element.fFailureText, element.fName,
                 [&] { MirrorQualifier(source.getQualifier(i), element.fElement); });
+    }
 }
 
 void TClassMirror::MirrorQualifier(const Pegasus::CIMConstQualifier& source, ICIMNamedElement& element)
 {
     const auto declaration = DeclarationOf(source.getName());
-    if (!declaration)
+    if (!declaration) {
         return;
+    }
     const auto qualifier = element.AllocateQualifier(declaration, ValueOf(source, NameOf(source)),
                                                      FlavorFromText(ToStdString(source.getFlavor().toString())), {});
     boost::static_pointer_cast<TPEGASUSQualifier>(qualifier)->SetPropagated(source.getPropagated() != 0);
@@ -78,16 +80,18 @@ void TClassMirror::MirrorQualifier(const Pegasus::CIMConstQualifier& source, ICI
 template <typename TSource> TCIMValue TClassMirror::ValueOf(const TSource& source, const std::string& name) const
 {
     TCIMValue value;
-    if (!source.getValue().isNull())
+    if (!source.getValue().isNull()) {
         pegValToVRX(name, source.getValue(), source.getType(), source.isArray(), value, fTarget.shared_from_this());
+    }
     return value;
 }
 
 boost::shared_ptr<ICIMQualifierDecl> TClassMirror::DeclarationOf(const Pegasus::CIMName& qualifier)
 {
     const std::string name = ToStdString(qualifier.getString());
-    if (const auto known = fNamespace.FindQualifierDecl(name))
+    if (const auto known = fNamespace.FindQualifierDecl(name)) {
         return known;
+    }
     return fUnknownQualifiers.count(name) == 0 ? FetchDeclaration(qualifier, name) : nullptr;
 }
 
@@ -115,8 +119,9 @@ boost::shared_ptr<ICIMQualifierDecl> TClassMirror::FetchDeclaration(const Pegasu
 TType TClassMirror::PropertyType(const Pegasus::CIMConstProperty& source, const std::string& name) const
 {
     const TType type = pegTypeToVRXType(source.getType(), source.isArray());
-    if (type.GetElementType() != TType::kNone)
+    if (type.GetElementType() != TType::kNone) {
         return type;
+    }
     LogFailure("Not supported type of property ", name, " in class ", fTarget.GetName({}), ": ",
                static_cast<int>(source.getType()), ", default to string.");
     return source.isArray() ? TType::kStringArray : TType::kString;
@@ -128,11 +133,13 @@ void TClassMirror::MirrorProperty(const Pegasus::CIMConstProperty& source, const
     const TCIMValue defaultValue = ValueOf(source, name);
     declaration->SetDefaultValue(defaultValue, {});
     MirrorQualifiers(source, {*declaration, kPropertyFailure, name});
-    if (declaration->GetQualifier(kOverrideQualifier, {}))
+    if (declaration->GetQualifier(kOverrideQualifier, {})) {
         fTarget.AdoptPropertyDecl(name);
+    }
     fTarget.AddPropertyDecl(declaration);
-    if (!defaultValue.IsNull())
+    if (!defaultValue.IsNull()) {
         fTarget.EnterProperty(declaration, defaultValue);
+    }
 }
 
 void TClassMirror::MirrorMethod(const Pegasus::CIMConstMethod& source, const std::string& name)
@@ -140,8 +147,9 @@ void TClassMirror::MirrorMethod(const Pegasus::CIMConstMethod& source, const std
     const auto method = boost::dynamic_pointer_cast<TPEGASUSMethodDecl>(
         fTarget.AllocateMethodDecl(name, pegTypeToVRXType(source.getType(), false), {}));
     MirrorQualifiers(source, {*method, kMethodFailure, name});
-    for (Pegasus::Uint32 i = 0; i < source.getParameterCount(); ++i)
+    for (Pegasus::Uint32 i = 0; i < source.getParameterCount(); ++i) {
         Guarded(kMethodFailure, name, [&] { MirrorParameter(source.getParameter(i), *method); });
+    }
     fTarget.EnterMethodDecl(method);
 }
 

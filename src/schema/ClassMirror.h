@@ -1,11 +1,10 @@
-#ifndef SRC_SCHEMA_CLASSMIRROR_H
-#define SRC_SCHEMA_CLASSMIRROR_H
-
-#include <set>
-#include <string>
+#pragma once
 
 #include <Pegasus/Client/CIMClient.h>
 #include <host/ICIMNamedElement.h>
+
+#include <set>
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -52,5 +51,3 @@ class TClassMirror
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,9 +1,5 @@
 // The instances of a class, fetched live. The three operations are one, told apart by the function's name in the log
 // and by where and how long they ask.
-#include <optional>
-
-#include <host/ICIMProperty.h>
-
 #include "src/common/ConnectedClient.h"
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
@@ -12,6 +8,10 @@
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/provider/TPEGASUSProvider.h"
 #include "src/schema/TPEGASUSClass.h"
+
+#include <host/ICIMProperty.h>
+
+#include <optional>
 
 namespace NKOLVRX20 {
 
@@ -43,8 +43,9 @@ constexpr TLossWarning kLossWarnings[] = {
 const char* LossWarning(const std::string& className)
 {
     for (const TLossWarning& warning : kLossWarnings) {
-        if (className == warning.fClassName)
+        if (className == warning.fClassName) {
             return warning.fText;
+        }
     }
     return "";
 }
@@ -57,10 +58,12 @@ bool Contains(const std::string& text, const char* part)
 unsigned int EnumerationTimeoutMs(const TPEGASUSClass& instanceClass)
 {
     const std::string name = instanceClass.GetName({});
-    if (Contains(name, kDiagnosticServicePart))
+    if (Contains(name, kDiagnosticServicePart)) {
         return kDiagnosticServiceTimeoutMs;
-    if (Contains(name, kSoftwareIdentityPart))
+    }
+    if (Contains(name, kSoftwareIdentityPart)) {
         return kSoftwareIdentityTimeoutMs;
+    }
     return instanceClass.GetDefaultTimeoutMs();
 }
 
@@ -116,8 +119,9 @@ struct TPEGASUSClass::TRetrieval
         return Ask([&]() -> std::optional<TInstances> {
             Pegasus::CIMClient& client = Client(timeoutMs);
             const auto ns = fClass.fProvider ? fClass.fProvider->GetPegNamespace() : fClass.fPegasusNsp;
-            if (!ServerHasClass(client, ns))
+            if (!ServerHasClass(client, ns)) {
                 return std::nullopt;
+            }
             return Enumerate(client, ns, deep);
         });
     }
@@ -148,8 +152,9 @@ struct TPEGASUSClass::TRetrieval
             Guarded(i, [&] {
                 const std::string path = ToStdString(instances[i].getPath().toString());
                 LogProgress("objPath from Pegasus : ", path);
-                if (path != reference.GetPath())
+                if (path != reference.GetPath()) {
                     return;
+                }
                 LogProgress("TPEGASUSClass:", fOperation, " ObjectPath matched : ", path);
                 found = BuildInstance(fClass, instances[i], fOperation);
             });
@@ -164,9 +169,10 @@ struct TPEGASUSClass::TRetrieval
 
     void LogBuilt(const TPEGASUSInstance& instance) const
     {
-        if (fClass.fName == kRecordClass)
+        if (fClass.fName == kRecordClass) {
             LogProgress("TPEGASUSClass::", fOperation, " Antecedent = ", TextOf(instance, "Antecedent"), " Dependent",
                         TextOf(instance, "Dependent"));
+        }
         LogProgress("TPEGASUSClass::", fOperation, " nsp=", instance.GetPegasusNSPStr());
     }
 
@@ -185,12 +191,13 @@ struct TPEGASUSClass::TRetrieval
 
     void LogTimeout(const Pegasus::ConnectionTimeoutException& exception) const
     {
-        if (fReportsTimeout)
+        if (fReportsTimeout) {
             LogFailure("Get Instances for: ", fClass.fName,
                        " returned ConnectionTimeoutException: ", ToStdString(exception.getMessage()),
                        LossWarning(fClass.fName));
-        else
+        } else {
             LogFailedCall("", exception);
+        }
     }
 
     void LogFailedCall(const char* mark, const Pegasus::Exception& exception) const
@@ -212,8 +219,9 @@ void TPEGASUSClass::EnumerateInstances(TInstanceVisitor visitor, bool deep, TCIM
     LogProgress("TPEGASUSClass::EnumerateInstances ", fName);
     retrieval.LogCallingNamespace();
     const auto instances = retrieval.AskProvider(deep, EnumerationTimeoutMs(*this));
-    if (!instances)
+    if (!instances) {
         return;
+    }
     LogProgress("DEBUG: TPEGASUSClass:EnumerateInstances get instance of ", fName, " count: ", instances->size());
     bool goesOn = true;
     for (Pegasus::Uint32 i = 0; i < instances->size() && goesOn; ++i) {
@@ -222,8 +230,9 @@ void TPEGASUSClass::EnumerateInstances(TInstanceVisitor visitor, bool deep, TCIM
             built = BuildInstance(*this, (*instances)[i], retrieval.fOperation);
             built->SetPegasusNSPStr(fPegasusNspText);
         });
-        if (!built)
+        if (!built) {
             continue;
+        }
         retrieval.LogBuilt(*built);
         goesOn = visitor(built);
     }
@@ -239,8 +248,9 @@ boost::shared_ptr<ICIMInstance> TPEGASUSClass::GetInstance(const TCIMReference& 
                     static_cast<const void*>(&client), ")\n");
         return retrieval.Enumerate(client, fPegasusNsp, false);
     });
-    if (!instances)
+    if (!instances) {
         return nullptr;
+    }
     LogProgress("DEBUG: TPEGASUSClass:GetInstance get instance of ", fName, " instance size ", instances->size());
     return retrieval.Find(*instances, reference);
 }
@@ -252,12 +262,14 @@ boost::shared_ptr<ICIMInstance> TPEGASUSClass::GetInstanceWithNsp(const TCIMRefe
                 " nsp = ", context[kNspKey].ToString(kDecimal));
     retrieval.LogCallingNamespace();
     const auto instances = retrieval.AskProvider(false, fDefaultTimeoutMs);
-    if (!instances)
+    if (!instances) {
         return nullptr;
+    }
     LogProgress("DEBUG: TPEGASUSClass:GetInstanceWithNsp get instance of ", fName);
     const auto found = retrieval.Find(*instances, reference);
-    if (found)
+    if (found) {
         retrieval.LogBuilt(*found);
+    }
     return found;
 }
 

@@ -1,5 +1,4 @@
-#ifndef SRC_SCHEMA_DECLAREDTYPE_H
-#define SRC_SCHEMA_DECLAREDTYPE_H
+#pragma once
 
 #include <host/TCIMValue.h>
 
@@ -13,5 +12,3 @@ inline TCIMValue::TCIMType DeclaredType(const TCIMValue& defaultValue)
 }
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,11 +1,11 @@
 #include "src/schema/PropertyDisplay.h"
 
+#include <host/ICIMPropertyDecl.h>
+#include <host/ICIMQualifier.h>
+
 #include <algorithm>
 #include <limits>
 #include <optional>
-
-#include <host/ICIMPropertyDecl.h>
-#include <host/ICIMQualifier.h>
 
 namespace NKOLVRX20 {
 
@@ -31,8 +31,9 @@ bool IsNumber(const TCIMValue& value)
 
 TWide WideValue(const TCIMValue& integer)
 {
-    if (integer.GetType() == TType::kUint64)
+    if (integer.GetType() == TType::kUint64) {
         return static_cast<unsigned long>(integer);
+    }
     return static_cast<long>(integer);
 }
 
@@ -41,11 +42,13 @@ std::optional<TWide> ParseInteger(const std::string& text)
 {
     const bool isNegative = !text.empty() && text.front() == '-';
     const std::string digits = isNegative ? text.substr(1) : text;
-    if (digits.empty() || digits.size() > 20 || digits.find_first_not_of("0123456789") != std::string::npos)
+    if (digits.empty() || digits.size() > 20 || digits.find_first_not_of("0123456789") != std::string::npos) {
         return std::nullopt;
+    }
     TWide number = 0;
-    for (const char digit : digits)
+    for (const char digit : digits) {
         number = number * 10 + (digit - '0');
+    }
     return isNegative ? -number : number;
 }
 
@@ -59,8 +62,9 @@ std::optional<TWide> ParseBound(const std::string& text, TWide fallback)
 bool EntryCovers(const std::string& entry, TWide number)
 {
     const auto mark = entry.find(kRangeMark);
-    if (mark == std::string::npos)
+    if (mark == std::string::npos) {
         return ParseInteger(entry) == number;
+    }
     const auto low = ParseBound(entry.substr(0, mark), std::numeric_limits<long>::min());
     const auto high = ParseBound(entry.substr(mark + 2), std::numeric_limits<unsigned long>::max());
     return low && high && number >= *low && number <= *high;
@@ -69,8 +73,9 @@ bool EntryCovers(const std::string& entry, TWide number)
 // Lower is nearer: a single value, a range, all the rest.
 int EntryRank(const std::string& entry)
 {
-    if (entry.find(kRangeMark) == std::string::npos)
+    if (entry.find(kRangeMark) == std::string::npos) {
         return 0;
+    }
     return entry == kRangeMark ? 2 : 1;
 }
 
@@ -85,8 +90,9 @@ TTexts QualifierTexts(const ICIMPropertyDecl& declaration, const char* name)
     TTexts texts;
     const TCIMValue value = QualifierValue(declaration, name);
     if (value.IsArray()) {
-        for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(value))
+        for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(value)) {
             texts.push_back(element.ToString(kDecimal));
+        }
     }
     return texts;
 }
@@ -99,8 +105,9 @@ std::string UnitText(const ICIMPropertyDecl& declaration)
 
 std::string PlainText(const TCIMValue& value)
 {
-    if (value.GetType() == TType::kDatetime && !value.IsNull())
+    if (value.GetType() == TType::kDatetime && !value.IsNull()) {
         return static_cast<TCIMDateTime>(value).ToUIString();
+    }
     return value.ToString(kDecimal);
 }
 
@@ -118,11 +125,13 @@ class TDisplayRules
     std::string Text(const TCIMValue& value) const
     {
         const auto place = Place(value);
-        if (place && *place < fValues.size())
+        if (place && *place < fValues.size()) {
             return fValues[*place];
+        }
         std::string bits = IsInteger(value) ? BitText(value) : "";
-        if (!bits.empty())
+        if (!bits.empty()) {
             return bits;
+        }
         return fUnit.empty() || !IsNumber(value) ? PlainText(value) : PlainText(value) + " " + fUnit;
     }
 
@@ -130,8 +139,9 @@ class TDisplayRules
     // Returns: where in Values the text stands.
     std::optional<std::size_t> Place(const TCIMValue& value) const
     {
-        if (IsInteger(value))
+        if (IsInteger(value)) {
             return fValueMap.empty() ? PlaceByNumber(WideValue(value)) : PlaceInMap(WideValue(value));
+        }
         const auto entry = std::find(fValueMap.begin(), fValueMap.end(), value.ToString(kDecimal));
         const bool isThere = value.GetType() == TType::kString && entry != fValueMap.end();
         return isThere ? std::make_optional<std::size_t>(entry - fValueMap.begin()) : std::nullopt;
@@ -147,8 +157,9 @@ class TDisplayRules
         std::optional<std::size_t> nearest;
         for (std::size_t i = 0; i < fValueMap.size(); ++i) {
             const bool isNearer = !nearest || EntryRank(fValueMap[i]) < EntryRank(fValueMap[*nearest]);
-            if (isNearer && EntryCovers(fValueMap[i], number))
+            if (isNearer && EntryCovers(fValueMap[i], number)) {
                 nearest = i;
+            }
         }
         return nearest;
     }
@@ -169,8 +180,9 @@ class TDisplayRules
     {
         std::string text;
         for (std::size_t i = 0; i < fBitValues.size(); ++i) {
-            if (IsBitSet(i, static_cast<unsigned long>(value)))
+            if (IsBitSet(i, static_cast<unsigned long>(value))) {
                 text += (text.empty() ? "" : " | ") + fBitValues[i];
+            }
         }
         return text;
     }
@@ -186,25 +198,29 @@ class TDisplayRules
 
 std::vector<std::string> DisplayTexts(const TCIMValue& value, const boost::shared_ptr<ICIMPropertyDecl>& declaration)
 {
-    if (value.IsNull())
+    if (value.IsNull()) {
         return {};
+    }
     const auto elements =
         value.IsArray() ? static_cast<const std::vector<TCIMValue>&>(value) : std::vector<TCIMValue>{value};
     std::optional<TDisplayRules> rules;
-    if (declaration)
+    if (declaration) {
         rules.emplace(*declaration);
+    }
     std::vector<std::string> texts;
     texts.reserve(elements.size());
-    for (const TCIMValue& element : elements)
+    for (const TCIMValue& element : elements) {
         texts.push_back(rules && !element.IsNull() ? rules->Text(element) : PlainText(element));
+    }
     return texts;
 }
 
 std::string JoinDisplayTexts(const std::vector<std::string>& texts)
 {
     std::string joined;
-    for (std::size_t i = 0; i < texts.size(); ++i)
+    for (std::size_t i = 0; i < texts.size(); ++i) {
         joined += (i == 0 ? "" : ", ") + texts[i];
+    }
     return joined;
 }
 

@@ -1,13 +1,12 @@
 // A property's value in words, by the qualifiers of its declaration (DSP0004, 5.6.3).
-#ifndef SRC_SCHEMA_PROPERTYDISPLAY_H
-#define SRC_SCHEMA_PROPERTYDISPLAY_H
+#pragma once
 
-#include <string>
-#include <vector>
+#include <host/TCIMValue.h>
 
 #include <boost/shared_ptr.hpp>
 
-#include <host/TCIMValue.h>
+#include <string>
+#include <vector>
 
 namespace NKOLVRX20 {
 
@@ -22,5 +21,3 @@ std::vector<std::string> DisplayTexts(const TCIMValue& value, const boost::share
 std::string JoinDisplayTexts(const std::vector<std::string>& texts);
 
 } // namespace NKOLVRX20
-
-#endif

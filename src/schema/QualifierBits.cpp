@@ -13,8 +13,9 @@ template <typename TBits> TBits BitsFromText(const std::string& text, const std:
     std::istringstream stream(text);
     for (std::string word; stream >> word;) {
         const auto known = words.find(word);
-        if (known != words.end())
+        if (known != words.end()) {
             bits = WithBits(bits, known->second);
+        }
     }
     return bits;
 }

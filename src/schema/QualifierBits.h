@@ -1,9 +1,8 @@
-#ifndef SRC_SCHEMA_QUALIFIERBITS_H
-#define SRC_SCHEMA_QUALIFIERBITS_H
-
-#include <string>
+#pragma once
 
 #include <host/ICIMQualifierDecl.h>
+
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -23,5 +22,3 @@ template <typename TBits> TBits WithoutBits(TBits bits, TBits removed)
 }
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,13 +1,13 @@
 // The class itself: its name, its place, its instances, and what is not served.
 #include "src/schema/TPEGASUSClass.h"
 
-#include <utility>
+#include "src/instance/TPEGASUSInstance.h"
+#include "src/namespace/TPEGASUSNamespace.h"
 
 #include <host/ICIMInstance.h>
 #include <host/TVRXException.h>
 
-#include "src/instance/TPEGASUSInstance.h"
-#include "src/namespace/TPEGASUSNamespace.h"
+#include <utility>
 
 namespace NKOLVRX20 {
 
@@ -86,16 +86,18 @@ void TPEGASUSClass::SetCollected() {}
 void TPEGASUSClass::AddInstance(boost::shared_ptr<ICIMInstance> instance)
 {
     const auto owner = instance->GetClass({});
-    if (owner && owner.get() != this)
+    if (owner && owner.get() != this) {
         fInstanceOwners.insert(owner);
+    }
     fInstances.emplace(instance->GetReference({}).GetPath(), instance);
 }
 
 // By identity: the path may have changed since the instance was added.
 void TPEGASUSClass::RemoveInstance(boost::shared_ptr<ICIMInstance> instance)
 {
-    for (auto entry = fInstances.begin(); entry != fInstances.end();)
+    for (auto entry = fInstances.begin(); entry != fInstances.end();) {
         entry = entry->second == instance ? fInstances.erase(entry) : std::next(entry);
+    }
 }
 
 // The containers are emptied first: two classes may hold each other's instances.
@@ -103,10 +105,12 @@ void TPEGASUSClass::ClearInstances()
 {
     const auto owners = std::exchange(fInstanceOwners, {});
     const auto instances = std::exchange(fInstances, {});
-    for (const auto& owner : owners)
+    for (const auto& owner : owners) {
         owner->ClearInstances();
-    for (const auto& child : fChildClasses)
+    }
+    for (const auto& child : fChildClasses) {
         child->ClearInstances();
+    }
 }
 
 void TPEGASUSClass::ReleaseLinks()

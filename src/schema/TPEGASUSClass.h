@@ -1,18 +1,17 @@
-#ifndef SRC_SCHEMA_TPEGASUSCLASS_H
-#define SRC_SCHEMA_TPEGASUSCLASS_H
+#pragma once
+
+#include "src/schema/TQualifiedElement.h"
+
+#include <Pegasus/Client/CIMClient.h>
+#include <host/ICIMClass.h>
+
+#include <boost/shared_ptr.hpp>
+#include <boost/weak_ptr.hpp>
 
 #include <map>
 #include <set>
 #include <string>
 #include <vector>
-
-#include <boost/shared_ptr.hpp>
-#include <boost/weak_ptr.hpp>
-
-#include <Pegasus/Client/CIMClient.h>
-#include <host/ICIMClass.h>
-
-#include "src/schema/TQualifiedElement.h"
 
 namespace NKOLVRX20 {
 
@@ -206,5 +205,3 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,11 +1,11 @@
 #include "src/schema/TPEGASUSMethodDecl.h"
 
-#include <utility>
-
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSClass.h"
 #include "src/schema/TPEGASUSParameterDecl.h"
 #include "src/schema/VisitInOrder.h"
+
+#include <utility>
 
 namespace NKOLVRX20 {
 

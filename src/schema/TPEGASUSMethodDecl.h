@@ -1,14 +1,13 @@
-#ifndef SRC_SCHEMA_TPEGASUSMETHODDECL_H
-#define SRC_SCHEMA_TPEGASUSMETHODDECL_H
+#pragma once
 
-#include <map>
-#include <string>
-
-#include <boost/weak_ptr.hpp>
+#include "src/schema/TQualifiedElement.h"
 
 #include <host/ICIMMethodDecl.h>
 
-#include "src/schema/TQualifiedElement.h"
+#include <boost/weak_ptr.hpp>
+
+#include <map>
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -56,5 +55,3 @@ class TPEGASUSMethodDecl : public TQualifiedElement<TPEGASUSMethodDecl, ICIMMeth
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,8 +1,8 @@
 #include "src/schema/TPEGASUSParameterDecl.h"
 
-#include <utility>
-
 #include "src/schema/TPEGASUSMethodDecl.h"
+
+#include <utility>
 
 namespace NKOLVRX20 {
 

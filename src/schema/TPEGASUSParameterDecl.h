@@ -1,13 +1,12 @@
-#ifndef SRC_SCHEMA_TPEGASUSPARAMETERDECL_H
-#define SRC_SCHEMA_TPEGASUSPARAMETERDECL_H
+#pragma once
 
-#include <string>
-
-#include <boost/weak_ptr.hpp>
+#include "src/schema/TQualifiedElement.h"
 
 #include <host/ICIMParameterDecl.h>
 
-#include "src/schema/TQualifiedElement.h"
+#include <boost/weak_ptr.hpp>
+
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -46,5 +45,3 @@ class TPEGASUSParameterDecl : public TQualifiedElement<TPEGASUSParameterDecl, IC
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,11 +1,11 @@
 #include "src/schema/TPEGASUSProperty.h"
 
-#include <utility>
+#include "src/schema/DeclaredType.h"
+#include "src/schema/PropertyDisplay.h"
 
 #include <host/ICIMPropertyDecl.h>
 
-#include "src/schema/DeclaredType.h"
-#include "src/schema/PropertyDisplay.h"
+#include <utility>
 
 namespace NKOLVRX20 {
 

@@ -1,10 +1,9 @@
-#ifndef SRC_SCHEMA_TPEGASUSPROPERTY_H
-#define SRC_SCHEMA_TPEGASUSPROPERTY_H
+#pragma once
+
+#include <host/ICIMProperty.h>
 
 #include <boost/shared_ptr.hpp>
 #include <boost/weak_ptr.hpp>
-
-#include <host/ICIMProperty.h>
 
 namespace NKOLVRX20 {
 
@@ -49,5 +48,3 @@ class TPEGASUSProperty : public ICIMProperty
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,9 +1,9 @@
 #include "src/schema/TPEGASUSPropertyDecl.h"
 
-#include <utility>
-
 #include "src/schema/DeclaredType.h"
 #include "src/schema/TPEGASUSClass.h"
+
+#include <utility>
 
 namespace NKOLVRX20 {
 

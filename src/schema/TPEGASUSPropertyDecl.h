@@ -1,13 +1,12 @@
-#ifndef SRC_SCHEMA_TPEGASUSPROPERTYDECL_H
-#define SRC_SCHEMA_TPEGASUSPROPERTYDECL_H
+#pragma once
 
-#include <string>
-
-#include <boost/weak_ptr.hpp>
+#include "src/schema/TQualifiedElement.h"
 
 #include <host/ICIMPropertyDecl.h>
 
-#include "src/schema/TQualifiedElement.h"
+#include <boost/weak_ptr.hpp>
+
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -51,5 +50,3 @@ class TPEGASUSPropertyDecl : public TQualifiedElement<TPEGASUSPropertyDecl, ICIM
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,11 +1,11 @@
 #include "src/schema/TPEGASUSQualifier.h"
 
-#include <utility>
+#include "src/schema/QualifierBits.h"
 
 #include <host/ICIMNamedElement.h>
 #include <host/TVRXException.h>
 
-#include "src/schema/QualifierBits.h"
+#include <utility>
 
 namespace NKOLVRX20 {
 

@@ -1,13 +1,12 @@
-#ifndef SRC_SCHEMA_TPEGASUSQUALIFIER_H
-#define SRC_SCHEMA_TPEGASUSQUALIFIER_H
+#pragma once
 
-#include <string>
+#include <host/ICIMQualifier.h>
 
 #include <boost/enable_shared_from_this.hpp>
 #include <boost/shared_ptr.hpp>
 #include <boost/weak_ptr.hpp>
 
-#include <host/ICIMQualifier.h>
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -59,5 +58,3 @@ class TPEGASUSQualifier : public ICIMQualifier, public boost::enable_shared_from
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,12 +1,12 @@
 #include "src/schema/TPEGASUSQualifierDecl.h"
 
-#include <utility>
-
-#include <host/TVRXException.h>
-
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/DeclaredType.h"
 #include "src/schema/QualifierBits.h"
+
+#include <host/TVRXException.h>
+
+#include <utility>
 
 namespace NKOLVRX20 {
 

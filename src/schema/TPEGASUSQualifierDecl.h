@@ -1,13 +1,12 @@
-#ifndef SRC_SCHEMA_TPEGASUSQUALIFIERDECL_H
-#define SRC_SCHEMA_TPEGASUSQUALIFIERDECL_H
+#pragma once
 
-#include <string>
+#include <host/ICIMQualifierDecl.h>
 
 #include <boost/enable_shared_from_this.hpp>
 #include <boost/shared_ptr.hpp>
 #include <boost/weak_ptr.hpp>
 
-#include <host/ICIMQualifierDecl.h>
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -58,5 +57,3 @@ class TPEGASUSQualifierDecl : public ICIMQualifierDecl, public boost::enable_sha
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,16 +1,15 @@
-#ifndef SRC_SCHEMA_TQUALIFIEDELEMENT_H
-#define SRC_SCHEMA_TQUALIFIEDELEMENT_H
+#pragma once
 
-#include <string>
-
-#include <boost/enable_shared_from_this.hpp>
-#include <boost/make_shared.hpp>
+#include "src/schema/TPEGASUSQualifier.h"
+#include "src/schema/TQualifierSet.h"
 
 #include <host/ICIMNamedElement.h>
 #include <host/TVRXException.h>
 
-#include "src/schema/TPEGASUSQualifier.h"
-#include "src/schema/TQualifierSet.h"
+#include <boost/enable_shared_from_this.hpp>
+#include <boost/make_shared.hpp>
+
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -29,8 +28,9 @@ class TQualifiedElement : public TInterface, public boost::enable_shared_from_th
                                                        TCIMValue value, ICIMQualifierDecl::EFlavor flavor,
                                                        TCIMContext) override
     {
-        if (!declaration)
+        if (!declaration) {
             throw TVRXException(TVRXStatusCode::kTypeMismatch);
+        }
         return boost::make_shared<TPEGASUSQualifier>(this->shared_from_this(), declaration, value, flavor);
     }
 
@@ -67,5 +67,3 @@ inline bool HasTrueQualifier(const ICIMNamedElement& element, const std::string&
 }
 
 } // namespace NKOLVRX20
-
-#endif

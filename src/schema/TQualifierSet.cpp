@@ -1,18 +1,19 @@
 #include "src/schema/TQualifierSet.h"
 
-#include <host/TVRXException.h>
-
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSQualifier.h"
 #include "src/schema/VisitInOrder.h"
+
+#include <host/TVRXException.h>
 
 namespace NKOLVRX20 {
 
 void TQualifierSet::Add(const boost::shared_ptr<ICIMQualifier>& qualifier)
 {
     const auto own = boost::dynamic_pointer_cast<TPEGASUSQualifier>(qualifier);
-    if (!own)
+    if (!own) {
         throw TVRXException(TVRXStatusCode::kTypeMismatch);
+    }
     fQualifiers[TPEGASUSNamespace::NormalizeName(own->GetName({}))] = own;
 }
 

@@ -1,12 +1,11 @@
-#ifndef SRC_SCHEMA_TQUALIFIERSET_H
-#define SRC_SCHEMA_TQUALIFIERSET_H
+#pragma once
 
-#include <map>
-#include <string>
+#include <host/HostFwd.h>
 
 #include <boost/shared_ptr.hpp>
 
-#include <host/HostFwd.h>
+#include <map>
+#include <string>
 
 namespace NKOLVRX20 {
 
@@ -29,5 +28,3 @@ class TQualifierSet
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef SRC_SCHEMA_VISITINORDER_H
-#define SRC_SCHEMA_VISITINORDER_H
+#pragma once
 
 namespace NKOLVRX20 {
 
@@ -8,11 +7,10 @@ namespace NKOLVRX20 {
 template <typename TMap, typename TVisitor> void VisitInOrder(TMap map, const TVisitor& visitor)
 {
     for (const auto& entry : map) {
-        if (!visitor(entry.second))
+        if (!visitor(entry.second)) {
             return;
+        }
     }
 }
 
 } // namespace NKOLVRX20
-
-#endif

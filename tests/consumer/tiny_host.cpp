@@ -1,10 +1,5 @@
 // The least that a host does: loads the plug-in, prints "class count" for every class that it serves, unloads it.
 // Usage: tiny_host CONSUMER, with the deployed tree as working directory
-#include <cstdio>
-#include <exception>
-
-#include <dlfcn.h>
-
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>
 #include <host/ICIMNamespace.h>
@@ -14,6 +9,11 @@
 #include <host/PluginSymbols.h>
 #include <host/TCIMValue.h>
 #include <host/TRootObject.h>
+
+#include <cstdio>
+#include <exception>
+
+#include <dlfcn.h>
 
 using namespace NKOLVRX20;
 

@@ -1,17 +1,18 @@
-#include "providers/FixtureTree.h"
-
-#include <stdlib.h>
+#include "tests/providers/FixtureTree.h"
 
 #include <fstream>
 #include <stdexcept>
+
+#include <stdlib.h>
 
 namespace lnx {
 
 FixtureTree::FixtureTree()
 {
     std::string name = (std::filesystem::temp_directory_path() / "lnx-fixture-XXXXXX").string();
-    if (::mkdtemp(name.data()) == nullptr)
+    if (::mkdtemp(name.data()) == nullptr) {
         throw std::runtime_error("mkdtemp " + name);
+    }
     fRoot = name;
 }
 

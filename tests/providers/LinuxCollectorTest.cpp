@@ -1,6 +1,6 @@
-#include "providers/FixtureTree.h"
 #include "providers/linux/Classes.h"
 #include "providers/linux/Parse.h"
+#include "tests/providers/FixtureTree.h"
 
 #include <gtest/gtest.h>
 
@@ -8,6 +8,7 @@
 #include <limits>
 #include <set>
 #include <sstream>
+
 #include <sys/stat.h>
 
 namespace lnx {
@@ -25,15 +26,17 @@ struct Shown
     std::string operator()(const Reference& value) const
     {
         std::string text = value.className;
-        for (const auto& [name, key] : value.keys)
+        for (const auto& [name, key] : value.keys) {
             text += " " + name + "=" + key;
+        }
         return text;
     }
     template <class T> std::string operator()(const std::vector<T>& values) const
     {
         std::string text;
-        for (const T& value : values)
+        for (const T& value : values) {
             text += (text.empty() ? "" : ",") + (*this)(value);
+        }
         return text;
     }
     template <class T> std::string operator()(T number) const
@@ -54,23 +57,26 @@ std::vector<std::pair<std::string, std::string>> pairs(const std::string& text)
 {
     std::vector<std::pair<std::string, std::string>> found;
     std::istringstream lines(text);
-    for (std::string line; std::getline(lines, line, '|');)
+    for (std::string line; std::getline(lines, line, '|');) {
         found.emplace_back(line.substr(0, line.find('=')), line.substr(line.find('=') + 1));
+    }
     return found;
 }
 
 // Expected is "Property=value|Property=value...".
 void expectProperties(const Record& record, const std::string& expected)
 {
-    for (const auto& [name, value] : pairs(expected))
+    for (const auto& [name, value] : pairs(expected)) {
         EXPECT_EQ(shown(record, name), value) << record.className() << '.' << name;
+    }
 }
 
 // Files is "name=line|name=line...".
 void addFiles(FixtureTree& fixture, const std::string& folder, const std::string& files)
 {
-    for (const auto& [file, text] : pairs(files))
+    for (const auto& [file, text] : pairs(files)) {
         fixture.file(folder + "/" + file, text + "\n");
+    }
 }
 
 TEST(NetworkPorts, ReadWhatTheKernelShows)
@@ -109,10 +115,11 @@ TEST(Processors, OneForEachListed)
 {
     FixtureTree fixture;
     std::string info;
-    for (int i = 0; i < 12; ++i)
+    for (int i = 0; i < 12; ++i) {
         info += "processor\t: " + std::to_string(i) + "\nvendor_id\t: GenuineIntel\ncpu family\t: 6\nmodel\t\t: 85\n" +
                 "model name\t: Some Processor @ 2.50GHz\nstepping\t: 7\ncpu MHz\t\t: 2499.998\nphysical id\t: 1\n" +
                 "core id\t\t: 3\nflags\t\t: fpu vme lm\nbogomips\t: 4999.99\npower management:\n\n";
+    }
     fixture.file("/proc/cpuinfo", info)
         .file("/sys/devices/system/cpu/cpu11/cache/index0/size", "32K\n")
         .file("/sys/devices/system/cpu/cpu11/cache/index1/size", "1024K\n")
@@ -227,11 +234,13 @@ TEST(AllClasses, SurviveAMachineWithoutFiles)
                                          "/proc/1/stat"};
     for (const char* kind : {"missing", "empty", "directory"}) {
         FixtureTree fixture;
-        for (const std::string& file : files)
-            if (kind == std::string("empty"))
+        for (const std::string& file : files) {
+            if (kind == std::string("empty")) {
                 fixture.file(file, "");
-            else if (kind == std::string("directory"))
+            } else if (kind == std::string("directory")) {
                 fixture.directory(file);
+            }
+        }
         EXPECT_EQ(computerSystems(fixture.tree()).size(), 1U) << kind;
         EXPECT_EQ(operatingSystems(fixture.tree()).size(), 1U) << kind;
         EXPECT_TRUE(processors(fixture.tree()).empty()) << kind;

@@ -1,16 +1,16 @@
-#include "pegasus/cmpi/MofServices.h"
+#include "tests/pegasus/cmpi/MofServices.h"
 
 #include <Pegasus/Common/CIMProperty.h>
 #include <Pegasus/Common/Exception.h>
 
 #include <gtest/gtest.h>
 
-#include <dlfcn.h>
-
 #include <filesystem>
 #include <fstream>
 #include <map>
 #include <set>
+
+#include <dlfcn.h>
 
 namespace Pegasus::cmpi {
 namespace {
@@ -54,13 +54,16 @@ std::string firstLine(const std::filesystem::path& path)
 TEST_F(LinuxProvider, ShowsEveryAddressAsTheKernelDoes)
 {
     std::map<std::string, std::string> expected;
-    for (const auto& entry : std::filesystem::directory_iterator("/sys/class/net"))
-        if (std::filesystem::exists(entry.path() / "address"))
+    for (const auto& entry : std::filesystem::directory_iterator("/sys/class/net")) {
+        if (std::filesystem::exists(entry.path() / "address")) {
             expected[entry.path().filename()] = firstLine(entry.path() / "address");
+        }
+    }
 
     std::map<std::string, std::string> shown;
-    for (const CIMInstance& port : all("LNX_NetworkPort"))
+    for (const CIMInstance& port : all("LNX_NetworkPort")) {
         shown[propertyText(port, "DeviceID")] = propertyText(port, "MACAddress");
+    }
     EXPECT_EQ(shown, expected);
 }
 
@@ -68,8 +71,9 @@ TEST_F(LinuxProvider, ShowsAsManyProcessorsAsTheKernelLists)
 {
     std::size_t listed = 0;
     std::ifstream info("/proc/cpuinfo");
-    for (std::string line; std::getline(info, line);)
+    for (std::string line; std::getline(info, line);) {
         listed += line.rfind("processor", 0) == 0 ? 1 : 0;
+    }
     EXPECT_EQ(all("LNX_Processor").size(), listed);
 }
 
@@ -98,16 +102,22 @@ TEST_F(LinuxProvider, EveryInstanceIsFoundByItsPath)
 TEST_F(LinuxProvider, DeclaresAndDeliversEveryCimType)
 {
     std::set<std::pair<int, bool>> delivered;
-    for (const char* name : kClasses)
-        for (const CIMInstance& instance : all(name))
-            for (Uint32 i = 0; i < instance.getPropertyCount(); ++i)
-                if (!instance.getProperty(i).getValue().isNull())
+    for (const char* name : kClasses) {
+        for (const CIMInstance& instance : all(name)) {
+            for (Uint32 i = 0; i < instance.getPropertyCount(); ++i) {
+                if (!instance.getProperty(i).getValue().isNull()) {
                     delivered.insert({instance.getProperty(i).getType(), instance.getProperty(i).isArray()});
+                }
+            }
+        }
+    }
 
-    for (int type = CIMTYPE_BOOLEAN; type <= CIMTYPE_REFERENCE; ++type)
+    for (int type = CIMTYPE_BOOLEAN; type <= CIMTYPE_REFERENCE; ++type) {
         EXPECT_TRUE(delivered.count({type, false})) << cimTypeToString(static_cast<CIMType>(type));
-    for (const CIMType type : {CIMTYPE_UINT8, CIMTYPE_UINT16, CIMTYPE_REAL32, CIMTYPE_CHAR16, CIMTYPE_STRING})
+    }
+    for (const CIMType type : {CIMTYPE_UINT8, CIMTYPE_UINT16, CIMTYPE_REAL32, CIMTYPE_CHAR16, CIMTYPE_STRING}) {
         EXPECT_TRUE(delivered.count({type, true})) << cimTypeToString(type) << "[]";
+    }
 }
 
 TEST_F(LinuxProvider, CountsProcesses)
@@ -156,9 +166,11 @@ TEST_F(LinuxProvider, RefusesWhatItDoesNotServe)
     EXPECT_EQ(codeOf([&] { all("CIM_Processor"); }), CIM_ERR_INVALID_CLASS);
 
     Array<CIMKeyBinding> keys = path.getKeyBindings();
-    for (Uint32 i = 0; i < keys.size(); ++i)
-        if (keys[i].getName().equal(CIMName("DeviceID")))
+    for (Uint32 i = 0; i < keys.size(); ++i) {
+        if (keys[i].getName().equal(CIMName("DeviceID"))) {
             keys[i].setValue(String("CPU99999"));
+        }
+    }
     path.setKeyBindings(keys);
     EXPECT_EQ(codeOf([&] { module->getInstance(request, path, CIMPropertyList()); }), CIM_ERR_NOT_FOUND);
 }

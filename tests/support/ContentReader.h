@@ -1,36 +1,34 @@
-#ifndef TESTS_SUPPORT_CONTENTREADER_H
-#define TESTS_SUPPORT_CONTENTREADER_H
+#pragma once
 
-#include "pegasus/common/ElementDecoder.h"
-#include "pegasus/common/ElementEncoder.h"
+#include "pegasus/wire/ElementDecoder.h"
+#include "pegasus/wire/ElementEncoder.h"
 
 #include <string>
 
 namespace test {
 
-/// Decodes an answer's content element, whatever it is, and appends it encoded again: text that stands for the object.
+// Decodes an answer's content element, whatever it is, and appends it encoded again: text that stands for the object.
 inline void encodeAgain(const Pegasus::wire::XmlElement& element, Pegasus::wire::ElementDecoder& decoder,
                         std::string& out)
 {
     using namespace Pegasus;
-    if (element.is("CLASS"))
+    if (element.is("CLASS")) {
         wire::appendClass(out, decoder.decodeClass(element));
-    else if (element.is("VALUE.NAMEDINSTANCE"))
+    } else if (element.is("VALUE.NAMEDINSTANCE")) {
         wire::appendNamedInstance(out, decoder.decodeNamedInstance(element));
-    else if (element.is("INSTANCE"))
+    } else if (element.is("INSTANCE")) {
         wire::appendInstance(out, decoder.decodeInstance(element));
-    else if (element.is("QUALIFIER.DECLARATION"))
+    } else if (element.is("QUALIFIER.DECLARATION")) {
         wire::appendQualifierDeclaration(out, decoder.decodeQualifierDeclaration(element));
-    else if (element.is("CLASSNAME"))
+    } else if (element.is("CLASSNAME")) {
         wire::appendClassName(out, decoder.decodeClassName(element));
-    else if (element.is("RETURNVALUE"))
+    } else if (element.is("RETURNVALUE")) {
         wire::appendReturnValue(out, decoder.decodeReturnValue(element));
-    else if (element.is("PARAMVALUE"))
+    } else if (element.is("PARAMVALUE")) {
         wire::appendParamValue(out, decoder.decodeParamValue(element));
-    else
+    } else {
         wire::appendInstanceName(out, decoder.decodeInstanceName(element));
+    }
 }
 
 } // namespace test
-
-#endif

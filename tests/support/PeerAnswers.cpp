@@ -1,6 +1,6 @@
-#include "support/PeerAnswers.h"
+#include "tests/support/PeerAnswers.h"
 
-#include "pegasus/common/ElementEncoder.h"
+#include "pegasus/wire/ElementEncoder.h"
 
 #include <algorithm>
 #include <cctype>
@@ -41,7 +41,7 @@ std::string response(const char* element, const PeerRequest& request, const std:
     return message(request, "<" + name + " NAME=\"" + request.method() + "\">\n" + content + "</" + name + ">\n");
 }
 
-/// An error's text: control characters and other than ASCII as escapes.
+// An error's text: control characters and other than ASCII as escapes.
 std::string fieldText(const std::string& text)
 {
     std::string out;
@@ -120,8 +120,9 @@ PeerAnswer classAnswer(const PeerRequest& request, const Pegasus::CIMClass& cimC
 PeerAnswer instancesAnswer(const PeerRequest& request, const std::vector<Pegasus::CIMInstance>& instances)
 {
     std::string xml;
-    for (const Pegasus::CIMInstance& instance : instances)
+    for (const Pegasus::CIMInstance& instance : instances) {
         Pegasus::wire::appendNamedInstance(xml, instance);
+    }
     return httpAnswer(intrinsicBody(request, xml));
 }
 
@@ -137,8 +138,9 @@ PeerAnswer methodAnswer(const PeerRequest& request, const Pegasus::CIMValue& ret
 {
     std::string xml;
     Pegasus::wire::appendReturnValue(xml, returnValue);
-    for (const Pegasus::CIMParamValue& output : outputs)
+    for (const Pegasus::CIMParamValue& output : outputs) {
         Pegasus::wire::appendParamValue(xml, output);
+    }
     return httpAnswer(extrinsicBody(request, xml));
 }
 
@@ -181,7 +183,9 @@ PeerAnswer withReplaced(PeerAnswer answer, const std::string& from, const std::s
 {
     for (std::size_t at = answer.bytes.find(from); at != std::string::npos;
          at = answer.bytes.find(from, at + to.size()))
+    {
         answer.bytes.replace(at, from.size(), to);
+    }
     return answer;
 }
 
@@ -252,8 +256,9 @@ PeerAnswer ServedModel::answer(const PeerRequest& request)
         faults.erase(faults.begin());
         return fault(request);
     }
-    if (request.body.find("<IMETHODCALL") != std::string::npos)
+    if (request.body.find("<IMETHODCALL") != std::string::npos) {
         return answerIntrinsic(request);
+    }
     const auto method = fMethods.find(lower(request.method()));
     return method == fMethods.end() ? errorAnswer(request, Pegasus::CIM_ERR_METHOD_NOT_FOUND,
                                                   "CIM_ERR_METHOD_NOT_FOUND: " + request.method())
@@ -265,14 +270,16 @@ PeerAnswer ServedModel::answerIntrinsic(const PeerRequest& request)
     const std::string method = request.method();
     const std::string name = request.nameIn("CLASSNAME");
     const auto cimClass = fClasses.find(key(request.object(), name));
-    if (method == "GetClass")
+    if (method == "GetClass") {
         return cimClass == fClasses.end()
                    ? errorAnswer(request, Pegasus::CIM_ERR_NOT_FOUND, "CIM_ERR_NOT_FOUND: " + name)
                    : classAnswer(request, cimClass->second);
-    if (method == "EnumerateInstances")
+    }
+    if (method == "EnumerateInstances") {
         return cimClass == fClasses.end()
                    ? errorAnswer(request, Pegasus::CIM_ERR_INVALID_CLASS, "CIM_ERR_INVALID_CLASS: " + name)
                    : instancesAnswer(request, fInstances[cimClass->first]);
+    }
     if (method == "GetQualifier") {
         const std::size_t value = request.body.find("<VALUE>") + 7;
         const std::string wanted = request.body.substr(value, request.body.find("</VALUE>", value) - value);

@@ -1,4 +1,4 @@
-#include "support/PrivateServer.h"
+#include "tests/support/PrivateServer.h"
 
 #include <csignal>
 #include <filesystem>
@@ -16,7 +16,7 @@ namespace test {
 
 namespace {
 
-/// A port that was free a moment ago.
+// A port that was free a moment ago.
 int freePort()
 {
     const int probe = ::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0);
@@ -27,32 +27,36 @@ int freePort()
     const bool isBound = ::bind(probe, reinterpret_cast<sockaddr*>(&address), size) == 0 &&
                          ::getsockname(probe, reinterpret_cast<sockaddr*>(&address), &size) == 0;
     ::close(probe);
-    if (!isBound)
+    if (!isBound) {
         throw std::runtime_error("no free port");
+    }
     return ntohs(address.sin_port);
 }
 
 std::string newDirectory()
 {
     std::string pattern = (std::filesystem::temp_directory_path() / "vrx-server-XXXXXX").string();
-    if (!::mkdtemp(pattern.data()))
+    if (!::mkdtemp(pattern.data())) {
         throw std::runtime_error("mkdtemp " + pattern);
+    }
     return pattern;
 }
 
 void expectSuccess(const ProgramResult& result, const std::string& what)
 {
-    if (result.exitStatus != 0)
+    if (result.exitStatus != 0) {
         throw std::runtime_error(what + " failed with " + std::to_string(result.exitStatus) + ": " + result.out +
                                  result.err);
+    }
 }
 
-/// Becomes readable when the process has ended, whosever child it is.
+// Becomes readable when the process has ended, whosever child it is.
 bool waitForEnd(pid_t process, int timeoutMs)
 {
     const int descriptor = static_cast<int>(::syscall(SYS_pidfd_open, process, 0));
-    if (descriptor < 0)
+    if (descriptor < 0) {
         return true;
+    }
     pollfd end = {descriptor, POLLIN, 0};
     const bool hasEnded = ::poll(&end, 1, timeoutMs) == 1;
     ::close(descriptor);
@@ -71,8 +75,9 @@ PrivateServer::PrivateServer() : fDirectory(newDirectory()), fPort(freePort())
 
 PrivateServer::~PrivateServer()
 {
-    if (isRunning())
+    if (isRunning()) {
         kill();
+    }
     std::error_code ignored;
     std::filesystem::remove("/var/tmp/cimserverkol_tc_" + fConsumer + "_start.conf", ignored);
     std::filesystem::remove_all(fDirectory, ignored);
@@ -98,8 +103,9 @@ void PrivateServer::kill()
     const pid_t process = fProcessId;
     fProcessId = 0;
     ::kill(process, SIGKILL);
-    if (!waitForEnd(process, kEndTimeoutMs))
+    if (!waitForEnd(process, kEndTimeoutMs)) {
         throw std::runtime_error("the killed server does not end");
+    }
 }
 
 ProgramResult PrivateServer::run(const std::string& program, std::vector<std::string> arguments) const
@@ -112,8 +118,9 @@ pid_t PrivateServer::readProcessId() const
 {
     std::ifstream file("/var/tmp/cimserverkol_tc_" + fConsumer + "_start.conf");
     pid_t process = 0;
-    if (!(file >> process) || process <= 1)
+    if (!(file >> process) || process <= 1) {
         throw std::runtime_error("no start file of consumer " + fConsumer);
+    }
     return process;
 }
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "support/RunProgram.h"
+#include "tests/support/RunProgram.h"
 
 #include <string>
 #include <vector>
@@ -9,29 +9,29 @@
 
 namespace test {
 
-/// A real cimserver in a temporary tree of its own, with a consumer name and a port of its own; stopped and removed at
-/// the end. The programs come from the build tree.
+// A real cimserver in a temporary tree of its own, with a consumer name and a port of its own; stopped and removed at
+// the end. The programs come from the build tree.
 class PrivateServer
 {
   public:
-    /// Creates the tree. Throws std::runtime_error.
+    // Creates the tree. Throws std::runtime_error.
     PrivateServer();
     ~PrivateServer();
     PrivateServer(const PrivateServer&) = delete;
     PrivateServer& operator=(const PrivateServer&) = delete;
 
-    /// Throws std::runtime_error with the server's words if it does not start.
+    // Throws std::runtime_error with the server's words if it does not start.
     void start();
-    /// In good order. Requires: the schema of root/PG_Internal is compiled. Throws std::runtime_error.
+    // In good order. Requires: the schema of root/PG_Internal is compiled. Throws std::runtime_error.
     void stop();
-    /// As a crash would; returns when the process is gone.
+    // As a crash would; returns when the process is gone.
     void kill();
 
-    /// cimmof, cimconfig or cimserver with these arguments, in the tree's environment.
+    // cimmof, cimconfig or cimserver with these arguments, in the tree's environment.
     ProgramResult run(const std::string& program, std::vector<std::string> arguments) const;
 
-    const std::string& directory() const { return fDirectory; }  ///< of the whole tree
-    std::string home() const { return fDirectory + "/pegasus"; } ///< PEGASUS_HOME
+    const std::string& directory() const { return fDirectory; }  // of the whole tree
+    std::string home() const { return fDirectory + "/pegasus"; } // PEGASUS_HOME
     int port() const { return fPort; }
     pid_t processId() const { return fProcessId; }
 

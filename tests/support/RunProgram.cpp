@@ -1,4 +1,4 @@
-#include "support/RunProgram.h"
+#include "tests/support/RunProgram.h"
 
 #include <algorithm>
 #include <cerrno>
@@ -26,15 +26,16 @@ using Clock = std::chrono::steady_clock;
     throw std::runtime_error(what + ": " + std::strerror(error));
 }
 
-/// A pipe whose reading end stays here.
+// A pipe whose reading end stays here.
 class OutputPipe
 {
   public:
     OutputPipe()
     {
         int ends[2];
-        if (::pipe2(ends, O_CLOEXEC | O_NONBLOCK) != 0)
+        if (::pipe2(ends, O_CLOEXEC | O_NONBLOCK) != 0) {
             fail("pipe", errno);
+        }
         readEnd = ends[0];
         writeEnd = ends[1];
         // The child must not inherit the non-blocking mode of its output.
@@ -50,46 +51,51 @@ class OutputPipe
 
     void closeWriteEnd()
     {
-        if (writeEnd >= 0)
+        if (writeEnd >= 0) {
             ::close(writeEnd);
+        }
         writeEnd = -1;
     }
     void drainInto(std::string& text)
     {
         char buffer[4096];
         ssize_t got;
-        while ((got = ::read(readEnd, buffer, sizeof buffer)) > 0)
+        while ((got = ::read(readEnd, buffer, sizeof buffer)) > 0) {
             text.append(buffer, static_cast<std::size_t>(got));
+        }
         isOpen = isOpen && got != 0;
     }
-    /// What to wait for; poll() passes over a negative descriptor.
+    // What to wait for; poll() passes over a negative descriptor.
     pollfd toPoll() const { return {isOpen ? readEnd : -1, POLLIN, 0}; }
 
     int readEnd = -1;
     int writeEnd = -1;
-    bool isOpen = true; ///< the child has not closed its end
+    bool isOpen = true; // the child has not closed its end
 };
 
 std::vector<char*> pointers(std::vector<std::string>& texts)
 {
     std::vector<char*> result;
-    for (std::string& text : texts)
+    for (std::string& text : texts) {
         result.push_back(text.data());
+    }
     result.push_back(nullptr);
     return result;
 }
 
-/// Later entries win for getenv() of the child only if the earlier ones are gone.
+// Later entries win for getenv() of the child only if the earlier ones are gone.
 std::vector<std::string> mergedEnvironment(const std::vector<std::string>& added)
 {
     std::vector<std::string> merged = added;
     for (char** entry = environ; *entry; ++entry) {
         const std::string name(*entry, std::strcspn(*entry, "=") + 1);
         bool isReplaced = false;
-        for (const std::string& text : added)
+        for (const std::string& text : added) {
             isReplaced = isReplaced || text.compare(0, name.size(), name) == 0;
-        if (!isReplaced)
+        }
+        if (!isReplaced) {
             merged.emplace_back(*entry);
+        }
     }
     return merged;
 }
@@ -106,18 +112,19 @@ pid_t start(std::vector<std::string> arguments, std::vector<std::string> environ
     const int error = ::posix_spawn(&child, arguments[0].c_str(), &actions, nullptr, pointers(arguments).data(),
                                     pointers(environment).data());
     posix_spawn_file_actions_destroy(&actions);
-    if (error != 0)
+    if (error != 0) {
         fail("cannot start " + arguments[0], error);
+    }
     return child;
 }
 
-/// Reaps the child if it has ended.
+// Reaps the child if it has ended.
 bool hasEnded(pid_t child, int& status)
 {
     return ::waitpid(child, &status, WNOHANG) == child;
 }
 
-/// Readable when the child has ended.
+// Readable when the child has ended.
 class ChildHandle
 {
   public:
@@ -165,10 +172,11 @@ ProgramResult runProgram(const std::vector<std::string>& arguments, const std::v
         out.drainInto(result.out);
         err.drainInto(result.err);
     }
-    if (WIFEXITED(status))
+    if (WIFEXITED(status)) {
         result.exitStatus = WEXITSTATUS(status);
-    else if (WIFSIGNALED(status))
+    } else if (WIFSIGNALED(status)) {
         result.signal = WTERMSIG(status);
+    }
     return result;
 }
 

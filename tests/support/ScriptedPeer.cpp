@@ -1,16 +1,17 @@
-#include "support/ScriptedPeer.h"
+#include "tests/support/ScriptedPeer.h"
 
 #include <algorithm>
-#include <arpa/inet.h>
 #include <cerrno>
 #include <cstdlib>
+#include <system_error>
+
+#include <arpa/inet.h>
 #include <netinet/in.h>
 #include <netinet/tcp.h>
 #include <poll.h>
 #include <strings.h>
 #include <sys/eventfd.h>
 #include <sys/socket.h>
-#include <system_error>
 #include <unistd.h>
 
 namespace test {
@@ -50,7 +51,8 @@ std::string PeerRequest::header(std::string_view name) const
         const std::size_t end = std::min(head.find("\r\n", start), head.size());
         const std::string_view line = std::string_view(head).substr(start, end - start);
         if (line.size() > name.size() && line[name.size()] == ':' &&
-            ::strncasecmp(line.data(), name.data(), name.size()) == 0) {
+            ::strncasecmp(line.data(), name.data(), name.size()) == 0)
+        {
             const std::size_t value = line.find_first_not_of(' ', name.size() + 1);
             return value == std::string_view::npos ? std::string() : std::string(line.substr(value));
         }
@@ -82,19 +84,22 @@ std::string PeerRequest::nameIn(std::string_view element) const
 {
     const std::size_t tag = body.find("<" + std::string(element) + " ");
     const std::size_t name = tag == std::string::npos ? tag : body.find("NAME=\"", tag);
-    if (name == std::string::npos)
+    if (name == std::string::npos) {
         return std::string();
+    }
     return body.substr(name + 6, body.find('"', name + 6) - name - 6);
 }
 
 ScriptedPeer::ScriptedPeer(PeerHandler handler, Start start) : fHandler(std::move(handler))
 {
     fStopEvent = ::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK);
-    if (fStopEvent < 0)
+    if (fStopEvent < 0) {
         fail("eventfd");
+    }
     bindPort();
-    if (start == Start::Listening)
+    if (start == Start::Listening) {
         listen();
+    }
 }
 
 ScriptedPeer::~ScriptedPeer()
@@ -104,7 +109,7 @@ ScriptedPeer::~ScriptedPeer()
     ::close(fStopEvent);
 }
 
-/// A bound socket that does not listen refuses connections, and nobody else gets its port.
+// A bound socket that does not listen refuses connections, and nobody else gets its port.
 void ScriptedPeer::bindPort()
 {
     fListener = ::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0);
@@ -116,17 +121,20 @@ void ScriptedPeer::bindPort()
     address.sin_port = htons(fPort);
     socklen_t size = sizeof(address);
     auto* generic = reinterpret_cast<sockaddr*>(&address);
-    if (fListener < 0 || ::bind(fListener, generic, size) < 0 || ::getsockname(fListener, generic, &size) < 0)
+    if (fListener < 0 || ::bind(fListener, generic, size) < 0 || ::getsockname(fListener, generic, &size) < 0) {
         fail("bind");
+    }
     fPort = ntohs(address.sin_port);
 }
 
 void ScriptedPeer::listen()
 {
-    if (fAcceptThread.joinable())
+    if (fAcceptThread.joinable()) {
         return;
-    if (::listen(fListener, 64) < 0)
+    }
+    if (::listen(fListener, 64) < 0) {
         fail("listen");
+    }
     fAcceptThread = std::thread([this, listener = fListener] { acceptLoop(listener); });
 }
 
@@ -140,15 +148,19 @@ void ScriptedPeer::refuse()
 void ScriptedPeer::stopThreads()
 {
     std::uint64_t count = 1;
-    if (::write(fStopEvent, &count, sizeof(count)) < 0)
+    if (::write(fStopEvent, &count, sizeof(count)) < 0) {
         std::abort();
-    if (fAcceptThread.joinable())
+    }
+    if (fAcceptThread.joinable()) {
         fAcceptThread.join();
-    for (std::thread& thread : fThreads)
+    }
+    for (std::thread& thread : fThreads) {
         thread.join();
+    }
     fThreads.clear();
-    if (::read(fStopEvent, &count, sizeof(count)) < 0)
+    if (::read(fStopEvent, &count, sizeof(count)) < 0) {
         std::abort();
+    }
 }
 
 std::vector<PeerRequest> ScriptedPeer::requests() const
@@ -169,14 +181,15 @@ bool ScriptedPeer::waitForRequests(std::size_t count, std::chrono::milliseconds 
     return fChanged.wait_for(lock, limit, [&] { return fRequests.size() >= count; });
 }
 
-/// Returns: false when the peer is to stop, or the time is over.
+// Returns: false when the peer is to stop, or the time is over.
 bool ScriptedPeer::waitFor(int socket, short events, int timeoutMs) const
 {
     pollfd entries[] = {{fStopEvent, POLLIN, 0}, {socket, events, 0}};
     for (;;) {
         const int ready = ::poll(entries, socket < 0 ? 1 : 2, timeoutMs);
-        if (ready < 0 && errno == EINTR)
+        if (ready < 0 && errno == EINTR) {
             continue;
+        }
         return ready > 0 && entries[0].revents == 0;
     }
 }
@@ -185,8 +198,9 @@ void ScriptedPeer::acceptLoop(int listener)
 {
     while (waitFor(listener, POLLIN)) {
         const int socket = ::accept4(listener, nullptr, nullptr, SOCK_CLOEXEC | SOCK_NONBLOCK);
-        if (socket < 0)
+        if (socket < 0) {
             continue;
+        }
         const int on = 1;
         ::setsockopt(socket, IPPROTO_TCP, TCP_NODELAY, &on, sizeof(on));
         const std::lock_guard<std::mutex> lock(fMutex);
@@ -206,13 +220,14 @@ void ScriptedPeer::serve(int socket, std::size_t connection)
             fRequests.push_back(request);
         }
         fChanged.notify_all();
-        if (!play(socket, fHandler(request)))
+        if (!play(socket, fHandler(request))) {
             break;
+        }
     }
     ::close(socket);
 }
 
-/// Returns: false at the end of the connection.
+// Returns: false at the end of the connection.
 bool ScriptedPeer::readRequest(int socket, std::string& buffer, PeerRequest& request)
 {
     for (;;) {
@@ -228,14 +243,16 @@ bool ScriptedPeer::readRequest(int socket, std::string& buffer, PeerRequest& req
         }
         char bytes[16 * 1024];
         const ssize_t count = waitFor(socket, POLLIN) ? ::recv(socket, bytes, sizeof(bytes), 0) : 0;
-        if (count == 0 || (count < 0 && errno != EAGAIN && errno != EINTR))
+        if (count == 0 || (count < 0 && errno != EAGAIN && errno != EINTR)) {
             return false;
-        if (count > 0)
+        }
+        if (count > 0) {
             buffer.append(bytes, static_cast<std::size_t>(count));
+        }
     }
 }
 
-/// Returns: whether the connection goes on.
+// Returns: whether the connection goes on.
 bool ScriptedPeer::play(int socket, const PeerAnswer& answer)
 {
     if (answer.neverAnswers) {
@@ -247,14 +264,17 @@ bool ScriptedPeer::play(int socket, const PeerAnswer& answer)
     while (!rest.empty()) {
         const std::size_t piece = answer.pieceBytes ? std::min(answer.pieceBytes, rest.size()) : rest.size();
         const ssize_t count = ::send(socket, rest.data(), piece, MSG_NOSIGNAL);
-        if (count < 0 && (errno != EAGAIN || !waitFor(socket, POLLOUT)))
+        if (count < 0 && (errno != EAGAIN || !waitFor(socket, POLLOUT))) {
             return false;
-        if (count > 0)
+        }
+        if (count > 0) {
             rest.remove_prefix(static_cast<std::size_t>(count));
+        }
         const auto pause = static_cast<int>(answer.pauseBetweenPieces.count());
         // The pause is a wait for the order to stop.
-        if (pause > 0 && !rest.empty() && waitFor(-1, 0, pause))
+        if (pause > 0 && !rest.empty() && waitFor(-1, 0, pause)) {
             return false;
+        }
     }
     return !answer.closesAfterwards;
 }

@@ -1,5 +1,4 @@
-#ifndef TESTS_SUPPORT_SCRIPTEDPEER_H
-#define TESTS_SUPPORT_SCRIPTEDPEER_H
+#pragma once
 
 #include <chrono>
 #include <condition_variable>
@@ -13,63 +12,63 @@
 
 namespace test {
 
-/// A CIM request as the peer got it.
+// A CIM request as the peer got it.
 struct PeerRequest
 {
-    std::string head; ///< request line and header fields
+    std::string head; // request line and header fields
     std::string body;
-    std::size_t connection = 0; ///< which connection, counted from 0
+    std::size_t connection = 0; // which connection, counted from 0
 
-    /// A header field's value, looked up without case; empty when it is not there.
+    // A header field's value, looked up without case; empty when it is not there.
     std::string header(std::string_view name) const;
-    /// CIMMethod and CIMObject, percent-decoded.
+    // CIMMethod and CIMObject, percent-decoded.
     std::string method() const;
     std::string object() const;
     std::string messageId() const;
-    /// The name in the first element `<element ...NAME="x"`; empty when there is none.
+    // The name in the first element `<element ...NAME="x"`; empty when there is none.
     std::string nameIn(std::string_view element) const;
 };
 
-/// What the peer does with a request.
+// What the peer does with a request.
 struct PeerAnswer
 {
-    std::string bytes;                     ///< sent as they are, header and all
-    const std::string* prepared = nullptr; ///< sent instead, without a copy; must outlive the peer
-    std::size_t pieceBytes = 0;            ///< at most so many bytes in one send; 0: all at once
+    std::string bytes;                     // sent as they are, header and all
+    const std::string* prepared = nullptr; // sent instead, without a copy; must outlive the peer
+    std::size_t pieceBytes = 0;            // at most so many bytes in one send; 0: all at once
     std::chrono::milliseconds pauseBetweenPieces{0};
     bool closesAfterwards = false;
-    bool neverAnswers = false; ///< keeps the connection open and silent
+    bool neverAnswers = false; // keeps the connection open and silent
 };
 
 using PeerHandler = std::function<PeerAnswer(const PeerRequest&)>;
 
-/// An HTTP server on the loopback interface, in this process, that plays what the test says.
-/// Thread: the handler runs on the peer's threads, one connection each; the members may be called from any thread.
+// An HTTP server on the loopback interface, in this process, that plays what the test says.
+// Thread: the handler runs on the peer's threads, one connection each; the members may be called from any thread.
 class ScriptedPeer
 {
   public:
     enum class Start
     {
         Listening,
-        Refusing ///< the port is taken, but connections are refused until listen() is called
+        Refusing // the port is taken, but connections are refused until listen() is called
     };
 
     explicit ScriptedPeer(PeerHandler handler, Start start = Start::Listening);
-    /// Closes everything and waits for the threads.
+    // Closes everything and waits for the threads.
     ~ScriptedPeer();
     ScriptedPeer(const ScriptedPeer&) = delete;
     ScriptedPeer& operator=(const ScriptedPeer&) = delete;
 
     std::uint16_t port() const { return fPort; }
-    /// From now on connections are accepted.
+    // From now on connections are accepted.
     void listen();
-    /// From now on connections are refused again; those that are open are closed. The port stays the peer's.
+    // From now on connections are refused again; those that are open are closed. The port stays the peer's.
     void refuse();
 
-    /// All requests so far, in the order of their arrival.
+    // All requests so far, in the order of their arrival.
     std::vector<PeerRequest> requests() const;
     std::size_t connectionCount() const;
-    /// Returns: whether so many requests had come before the time was over.
+    // Returns: whether so many requests had come before the time was over.
     bool waitForRequests(std::size_t count, std::chrono::milliseconds limit = std::chrono::seconds(10)) const;
 
   private:
@@ -84,7 +83,7 @@ class ScriptedPeer
     PeerHandler fHandler;
     std::uint16_t fPort = 0;
     int fListener = -1;
-    int fStopEvent = -1; ///< readable when the threads have to end
+    int fStopEvent = -1; // readable when the threads have to end
     std::thread fAcceptThread;
 
     mutable std::mutex fMutex;
@@ -95,5 +94,3 @@ class ScriptedPeer
 };
 
 } // namespace test
-
-#endif

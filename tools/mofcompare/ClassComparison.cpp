@@ -16,7 +16,7 @@ std::string utf8(const CIMName& name)
     return name.isNull() ? std::string("(none)") : utf8(name.getString());
 }
 
-/// Embedded objects are declared, and travel, as strings.
+// Embedded objects are declared, and travel, as strings.
 std::string shown(CIMType type)
 {
     const bool isEmbedded = type == CIMTYPE_OBJECT || type == CIMTYPE_INSTANCE;
@@ -29,7 +29,7 @@ std::string shown(const CIMValue& value)
            (value.isNull() ? "null" : "\"" + utf8(value.toString()) + "\"");
 }
 
-/// The two flavors that every declaration decides; the rest is compared as it is.
+// The two flavors that every declaration decides; the rest is compared as it is.
 std::string shown(const CIMFlavor& flavor)
 {
     std::string text = flavor.hasFlavor(CIMFlavor::OVERRIDABLE) ? "overridable" : "not overridable";
@@ -38,7 +38,7 @@ std::string shown(const CIMFlavor& flavor)
     return text + (flavor.hasFlavor(CIMFlavor::TOINSTANCE) ? ", to instance" : "");
 }
 
-/// Walks over two objects side by side and collects what differs.
+// Walks over two objects side by side and collects what differs.
 class Comparison
 {
   public:
@@ -62,8 +62,9 @@ class Comparison
 
 void Comparison::expectEqual(const std::string& where, const std::string& source, const std::string& readBack)
 {
-    if (source != readBack)
+    if (source != readBack) {
         fLines.push_back(where + ": " + source + " in the source, " + readBack + " read back");
+    }
 }
 
 CIMFlavor Comparison::flavorOf(const CIMConstQualifier& use) const
@@ -86,9 +87,10 @@ void Comparison::compareQualifiers(const std::string& where, const Owner& source
 {
     expectEqual(where + " qualifiers", std::to_string(source.getQualifierCount()),
                 std::to_string(readBack.getQualifierCount()));
-    for (Uint32 i = 0; i < source.getQualifierCount() && i < readBack.getQualifierCount(); ++i)
+    for (Uint32 i = 0; i < source.getQualifierCount() && i < readBack.getQualifierCount(); ++i) {
         compareQualifier(where + " [" + utf8(source.getQualifier(i).getName()) + "]", source.getQualifier(i),
                          readBack.getQualifier(i));
+    }
 }
 
 void Comparison::compareProperty(const std::string& where, const CIMConstProperty& source,
@@ -121,9 +123,10 @@ void Comparison::compareMethod(const std::string& where, const CIMConstMethod& s
     compareQualifiers(where, source, readBack);
     expectEqual(where + " parameters", std::to_string(source.getParameterCount()),
                 std::to_string(readBack.getParameterCount()));
-    for (Uint32 i = 0; i < source.getParameterCount() && i < readBack.getParameterCount(); ++i)
+    for (Uint32 i = 0; i < source.getParameterCount() && i < readBack.getParameterCount(); ++i) {
         compareParameter(where + "(" + utf8(source.getParameter(i).getName()) + ")", source.getParameter(i),
                          readBack.getParameter(i));
+    }
 }
 
 void Comparison::compareClass(const CIMConstClass& source, const CIMConstClass& readBack)
@@ -134,12 +137,14 @@ void Comparison::compareClass(const CIMConstClass& source, const CIMConstClass& 
     compareQualifiers(where, source, readBack);
     expectEqual(where + " properties", std::to_string(source.getPropertyCount()),
                 std::to_string(readBack.getPropertyCount()));
-    for (Uint32 i = 0; i < source.getPropertyCount() && i < readBack.getPropertyCount(); ++i)
+    for (Uint32 i = 0; i < source.getPropertyCount() && i < readBack.getPropertyCount(); ++i) {
         compareProperty(where + "." + utf8(source.getProperty(i).getName()), source.getProperty(i),
                         readBack.getProperty(i));
+    }
     expectEqual(where + " methods", std::to_string(source.getMethodCount()), std::to_string(readBack.getMethodCount()));
-    for (Uint32 i = 0; i < source.getMethodCount() && i < readBack.getMethodCount(); ++i)
+    for (Uint32 i = 0; i < source.getMethodCount() && i < readBack.getMethodCount(); ++i) {
         compareMethod(where + "." + utf8(source.getMethod(i).getName()), source.getMethod(i), readBack.getMethod(i));
+    }
 }
 
 std::string shown(const CIMConstQualifierDecl& declaration)
@@ -161,8 +166,9 @@ std::vector<std::string> differences(const CIMConstClass& source, const CIMConst
 
 std::vector<std::string> differences(const CIMConstQualifierDecl& source, const CIMConstQualifierDecl& readBack)
 {
-    if (shown(source) == shown(readBack))
+    if (shown(source) == shown(readBack)) {
         return {};
+    }
     return {"qualifier " + utf8(source.getName()) + ": " + shown(source) + " in the source, " + shown(readBack) +
             " read back"};
 }

@@ -7,12 +7,12 @@
 #include <iostream>
 #include <stdexcept>
 
-/// Compares what a server holds with the MOF file that was compiled into it, element by element.
-///
-///   mofcompare NAMESPACE FILE          through the server's local socket below $PEGASUS_HOME
-///   mofcompare NAMESPACE FILE PORT     through 127.0.0.1:PORT
-///
-/// Exit status: 0 all equal, 1 differences (one line each on standard output), 2 it could not be done.
+// Compares what a server holds with the MOF file that was compiled into it, element by element.
+//
+//   mofcompare NAMESPACE FILE          through the server's local socket below $PEGASUS_HOME
+//   mofcompare NAMESPACE FILE PORT     through 127.0.0.1:PORT
+//
+// Exit status: 0 all equal, 1 differences (one line each on standard output), 2 it could not be done.
 
 using namespace Pegasus;
 
@@ -24,8 +24,9 @@ class Report
     void add(const std::vector<std::string>& lines)
     {
         fCount += lines.size();
-        for (const std::string& line : lines)
+        for (const std::string& line : lines) {
             std::cout << line << "\n";
+        }
     }
     std::size_t count() const { return fCount; }
 
@@ -35,10 +36,11 @@ class Report
 
 void connect(CIMClient& client, int argc, char** argv)
 {
-    if (argc > 3)
+    if (argc > 3) {
         client.connect(String("127.0.0.1"), static_cast<Uint32>(std::stoul(argv[3])), String(), String());
-    else
+    } else {
         client.connectLocal();
+    }
 }
 
 int compareAll(int argc, char** argv)
@@ -53,13 +55,15 @@ int compareAll(int argc, char** argv)
     CIMClient client;
     connect(client, argc, argv);
     Report report;
-    for (const auto& [key, declaration] : source.qualifiers())
+    for (const auto& [key, declaration] : source.qualifiers()) {
         report.add(mofcompare::differences(declaration, client.getQualifier(nameSpace, declaration.getName())));
+    }
     const auto lookup = [&source](const CIMName& name, CIMQualifierDecl& found) {
         return source.findQualifier(name, found);
     };
-    for (const CIMClass& declared : source.classes())
+    for (const CIMClass& declared : source.classes()) {
         report.add(mofcompare::differences(declared, client.getClass(nameSpace, declared.getClassName()), lookup));
+    }
     std::cout << source.qualifiers().size() << " qualifier declarations and " << source.classes().size()
               << " classes compared, " << report.count() << " differences\n";
     return report.count() == 0 ? 0 : 1;

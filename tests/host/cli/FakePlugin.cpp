@@ -2,16 +2,8 @@
 // what can only be wrong in the library itself is a macro:
 //   FAKE_WITHOUT_ENTRY_POINTS   there is nothing to call
 // Whatever is let go leaves a file "cleared" in the working directory, so that a test sees that the host did shut down.
-#include <csignal>
-#include <cstdio>
-#include <fstream>
-#include <future>
-#include <stdexcept>
-#include <thread>
-
-#include <unistd.h>
-
-#include <boost/make_shared.hpp>
+#include "host/inmem/TInmemNamespace.h"
+#include "tests/host/support/FakeModel.h"
 
 #include <host/INamespaceProvider.h>
 #include <host/INamespaceProviderManager.h>
@@ -20,9 +12,17 @@
 #include <host/TInmemInstance.h>
 #include <host/TOSSpecific.h>
 #include <host/TRootObject.h>
-#include <inmem/TInmemNamespace.h>
 
-#include "host/support/FakeModel.h"
+#include <boost/make_shared.hpp>
+
+#include <csignal>
+#include <cstdio>
+#include <fstream>
+#include <future>
+#include <stdexcept>
+#include <thread>
+
+#include <unistd.h>
 
 #ifndef FAKE_WITHOUT_ENTRY_POINTS
 
@@ -105,14 +105,17 @@ boost::shared_ptr<TFakeClass> ManyClass()
 boost::shared_ptr<TFakeClass> BrokenClass()
 {
     const auto broken = boost::make_shared<TFakeClass>("Fake_Broken");
-    if (HasFault("class-throws"))
+    if (HasFault("class-throws")) {
         broken->fEnumerate = [](TInstanceVisitor) { throw 5; };
-    if (HasFault("interrupt-enumeration"))
+    }
+    if (HasFault("interrupt-enumeration")) {
         broken->fEnumerate = [broken = broken.get()](TInstanceVisitor visitor) {
             ::kill(::getpid(), SIGINT);
-            while (visitor(boost::make_shared<TInmemInstance>(broken->shared_from_this(), TCIMContext())))
+            while (visitor(boost::make_shared<TInmemInstance>(broken->shared_from_this(), TCIMContext()))) {
                 continue;
+            }
         };
+    }
     return broken;
 }
 
@@ -126,9 +129,11 @@ class TFakeProvider : public IProvider
     boost::shared_ptr<ICIMNamespace> GetNamespace(TCIMContext) const override { ThrowUnused(); }
     void EnumerateClassesProvided(TClassVisitor visitor, TCIMContext) override
     {
-        for (const auto& each : fClasses)
-            if (!visitor(each))
+        for (const auto& each : fClasses) {
+            if (!visitor(each)) {
                 return;
+            }
+        }
     }
     IProvider& operator=(const IProvider&) override { ThrowUnused(); }
 
@@ -141,33 +146,40 @@ class TFakeNamespace : public TInmemNamespace
   public:
     ~TFakeNamespace() override
     {
-        for (const auto& each : fClasses)
+        for (const auto& each : fClasses) {
             each->ClearInstances(); // a class and its instances hold each other
+        }
         std::ofstream("cleared") << "cleared";
-        if (HasFault("program-at-shutdown"))
+        if (HasFault("program-at-shutdown")) {
             TOSSpecific::SpawnProcess("touch shut-down-program-ran", 10);
+        }
     }
 
     void Fill(const boost::shared_ptr<ICIMNamespace>& self)
     {
         fClasses = {EveryTypeClass(self), BrokenClass(), ManyClass()};
         fProviders.push_back(boost::make_shared<TFakeProvider>(fClasses));
-        if (HasFault("threads"))
+        if (HasFault("threads")) {
             fProviders.insert(fProviders.end(), 7, fProviders.front());
+        }
     }
 
     void EnumerateProviders(TProviderVisitor visitor, TCIMContext context) override
     {
-        if (context.at("pluginType") != TCIMValue(static_cast<signed char>(7)))
+        if (context.at("pluginType") != TCIMValue(static_cast<signed char>(7))) {
             return;
+        }
         std::vector<std::future<bool>> threads;
-        for (const auto& provider : fProviders)
-            if (HasFault("threads"))
+        for (const auto& provider : fProviders) {
+            if (HasFault("threads")) {
                 threads.push_back(std::async(std::launch::async, visitor, provider));
-            else
+            } else {
                 visitor(provider);
-        for (auto& thread : threads)
+            }
+        }
+        for (auto& thread : threads) {
             thread.wait();
+        }
     }
 
   private:
@@ -215,50 +227,65 @@ class TPEGASUSNamespaceProvider : public INamespaceProvider
 
 void TPEGASUSNamespaceProvider::Initialize()
 {
-    if (HasFault("initialize-throws"))
+    if (HasFault("initialize-throws")) {
         throw std::runtime_error("no initialisation today");
-    if (!HasFault("registers-nothing"))
+    }
+    if (!HasFault("registers-nothing")) {
         TRootObject::GetNamespaceProviderManager()->RegisterNamespaceProvider(Instance());
+    }
 }
 
 void TPEGASUSNamespaceProvider::ClearNamespace()
 {
     Instance()->fNamespace.reset();
-    if (HasFault("clear-throws"))
+    if (HasFault("clear-throws")) {
         throw std::runtime_error("no shutdown today");
+    }
 }
 
 boost::shared_ptr<ICIMNamespace> TPEGASUSNamespaceProvider::AllocateNamespace(TCIMContext context, bool,
                                                                               std::string) const
 {
     fNamespace = boost::make_shared<TFakeNamespace>();
-    if (HasFault("throws-standard"))
+    if (HasFault("throws-standard")) {
         throw std::runtime_error("out of luck");
-    if (HasFault("throws-status"))
+    }
+    if (HasFault("throws-status")) {
         throw TVRXException(TVRXStatusCode::kServerConnectionFailed);
-    if (HasFault("throws-directory"))
+    }
+    if (HasFault("throws-directory")) {
         throw TVRXException(TVRXStatusCode::kDirectoryNotOpened);
-    if (HasFault("throws-int"))
+    }
+    if (HasFault("throws-int")) {
         throw 5;
-    if (HasFault("returns-null"))
+    }
+    if (HasFault("returns-null")) {
         return boost::shared_ptr<ICIMNamespace>();
-    if (HasFault("prints"))
+    }
+    if (HasFault("prints")) {
         std::puts("printed by the plug-in"), std::fflush(stdout);
-    if (HasFault("leaves-a-thread"))
+    }
+    if (HasFault("leaves-a-thread")) {
         std::thread([] { ::pause(); }).detach();
-    if (HasFault("losses"))
+    }
+    if (HasFault("losses")) {
         LogLosses();
+    }
     if (HasFault("interrupt-program") || HasFault("program-at-shutdown")) {
         ::kill(::getpid(), SIGTERM);
         TOSSpecific::SpawnProcess("tail -f /dev/null", 300);
     }
-    if (HasFault("interrupt-twice"))
-        for (;;)
+    if (HasFault("interrupt-twice")) {
+        for (;;) {
             ::kill(::getpid(), SIGINT);
+        }
+    }
     // The keys hold addresses of the host's pointers; one that is wrong ends the test here.
-    for (const char* key : {"repository", "upcall"})
-        if (!*reinterpret_cast<boost::shared_ptr<ICIMNamespace>*>(static_cast<unsigned long>(context.at(key))))
+    for (const char* key : {"repository", "upcall"}) {
+        if (!*reinterpret_cast<boost::shared_ptr<ICIMNamespace>*>(static_cast<unsigned long>(context.at(key)))) {
             throw std::logic_error("a null namespace");
+        }
+    }
     Log(ILogger::kInfo, "consumer " + context.at("consumer").ToString(10));
     fNamespace->Fill(fNamespace);
     return fNamespace;

@@ -1,18 +1,19 @@
 // Parts of vrxhost that need no plug-in.
+#include "host/cli/LossRules.h"
+#include "host/cli/TLossLog.h"
+#include "host/cli/TPrivateServer.h"
+
+#include <host/TOSSpecific.h>
+#include <host/TRootObject.h>
+
+#include <gtest/gtest.h>
+
 #include <filesystem>
 #include <fstream>
 
 #include <spawn.h>
 #include <sys/wait.h>
 #include <unistd.h>
-
-#include <gtest/gtest.h>
-
-#include <cli/LossRules.h>
-#include <cli/TLossLog.h>
-#include <cli/TPrivateServer.h>
-#include <host/TOSSpecific.h>
-#include <host/TRootObject.h>
 
 extern char** environ;
 

@@ -1,4 +1,11 @@
 // vrxhost as a program, with a plug-in that misbehaves on demand: what it prints, what it says and how it exits.
+#include "host/core/TChildProcess.h"
+#include "host/core/TUniqueFd.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
+
 #include <filesystem>
 #include <fstream>
 #include <sstream>
@@ -7,13 +14,6 @@
 #include <sys/file.h>
 #include <sys/stat.h>
 #include <unistd.h>
-
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-#include <nlohmann/json.hpp>
-
-#include <core/TChildProcess.h>
-#include <core/TUniqueFd.h>
 
 namespace {
 
@@ -81,8 +81,9 @@ class Vrxhost : public testing::Test
 
 testing::AssertionResult HasStatus(const TProcessOutcome& outcome, int status)
 {
-    if (outcome.fEnd == TProcessOutcome::kExited && outcome.fStatus == status)
+    if (outcome.fEnd == TProcessOutcome::kExited && outcome.fStatus == status) {
         return testing::AssertionSuccess();
+    }
     return testing::AssertionFailure() << "end " << outcome.fEnd << ", status " << outcome.fStatus << ", not " << status
                                        << "\nout: " << outcome.fOutput << "\nerr: " << outcome.fErrorOutput;
 }
@@ -240,8 +241,9 @@ TEST_F(Vrxhost, LossesAreLearntFromTheLogAndFromPrograms)
         "Parsing error: bad.mof:3"};
     EXPECT_EQ(nlohmann::json::parse(outcome.fOutput)["losses"], nlohmann::json(expected));
     std::string sentences;
-    for (const std::string& sentence : expected)
+    for (const std::string& sentence : expected) {
         sentences += "vrxhost: " + sentence + "\n";
+    }
     EXPECT_EQ(outcome.fErrorOutput, sentences);
 }
 

@@ -1,12 +1,5 @@
 // The binary order of every host interface. A plug-in and a host that were built apart meet in the slots of the virtual
 // tables, so the tables here are written out by hand; a declaration that moves in a header fails its row.
-#include <cstddef>
-#include <cstring>
-#include <string>
-#include <vector>
-
-#include <gtest/gtest.h>
-
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>
 #include <host/ICIMMethodDecl.h>
@@ -20,6 +13,13 @@
 #include <host/INamespaceProviderManager.h>
 #include <host/IProvider.h>
 #include <host/TXmlParser.h>
+
+#include <gtest/gtest.h>
+
+#include <cstddef>
+#include <cstring>
+#include <string>
+#include <vector>
 
 namespace NKOLVRX20 {
 namespace {
@@ -48,17 +48,18 @@ template <typename Function> std::size_t SlotOf(Function function)
 
 void ExpectOrder(const std::vector<TOperation>& operations)
 {
-    for (std::size_t i = 0; i < operations.size(); ++i)
+    for (std::size_t i = 0; i < operations.size(); ++i) {
         EXPECT_EQ(operations[i].fSlot, kFirstSlot + i) << operations[i].fName;
+    }
 }
 
 #define OP(Class, Name)                                                                                                \
     {                                                                                                                  \
-#Name, SlotOf(&Class::Name)                                                                                    \
+        #Name, SlotOf(&Class::Name)                                                                                    \
     }
 #define OVERLOAD(Class, Name, Result, Signature)                                                                       \
     {                                                                                                                  \
-#Name #Signature, SlotOf(static_cast <Result(Class::*) Signature>(&Class::Name))                               \
+        #Name #Signature, SlotOf(static_cast<Result(Class::*) Signature>(&Class::Name))                                \
     }
 
 typedef boost::shared_ptr<ICIMQualifier> TQualifier;

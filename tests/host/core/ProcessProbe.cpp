@@ -19,16 +19,20 @@ constexpr unsigned int kLifetimeSeconds = 30;
 
 int PrintArguments(int argc, char** argv)
 {
-    for (int i = 0; i < argc; ++i)
+    for (int i = 0; i < argc; ++i) {
         std::printf("[%s]", argv[i]);
+    }
     return 0;
 }
 
 int PrintEnvironment()
 {
-    for (char** entry = environ; *entry; ++entry)
+    for (char** entry = environ; *entry; ++entry) {
         if (std::strncmp(*entry, "__LLVM_PROFILE", 14) != 0) // set by the coverage runtime itself
+        {
             std::printf("[%s]", *entry);
+        }
+    }
     return 0;
 }
 
@@ -36,9 +40,11 @@ int PrintDescriptors()
 {
     DIR* directory = ::opendir("/proc/self/fd");
     const int own = ::dirfd(directory);
-    for (int fd = 0; fd < 4096; ++fd)
-        if (fd != own && ::fcntl(fd, F_GETFD) != -1)
+    for (int fd = 0; fd < 4096; ++fd) {
+        if (fd != own && ::fcntl(fd, F_GETFD) != -1) {
             std::printf("[%d]", fd);
+        }
+    }
     ::closedir(directory);
     return 0;
 }
@@ -61,8 +67,9 @@ int PrintSignals()
 int WriteBytes(long count)
 {
     const std::string block(4096, 'x');
-    for (; count > 0; count -= 4096)
+    for (; count > 0; count -= 4096) {
         std::fwrite(block.data(), 1, count < 4096 ? static_cast<std::size_t>(count) : 4096, stdout);
+    }
     return 0;
 }
 
@@ -85,8 +92,9 @@ int HoldLockInGroup(const char* path)
 {
     int ready[2];
     char byte = 0;
-    if (::pipe(ready) != 0)
+    if (::pipe(ready) != 0) {
         return 1;
+    }
     if (::fork() == 0) {
         ::flock(::open(path, O_RDWR | O_CREAT, 0600), LOCK_EX);
         const ssize_t ignored = ::write(ready[1], &byte, 1);
@@ -94,8 +102,9 @@ int HoldLockInGroup(const char* path)
         ::pause();
         ::_exit(0);
     }
-    if (::read(ready[0], &byte, 1) != 1)
+    if (::read(ready[0], &byte, 1) != 1) {
         return 1;
+    }
     std::printf("locked");
     std::fflush(stdout);
     ::pause();
@@ -109,30 +118,43 @@ int main(int argc, char** argv)
     ::alarm(kLifetimeSeconds);
     const std::string mode = argc > 1 ? argv[1] : "";
     const char* const value = argc > 2 ? argv[2] : "";
-    if (mode == "arguments")
+    if (mode == "arguments") {
         return PrintArguments(argc, argv);
-    if (mode == "environment")
+    }
+    if (mode == "environment") {
         return PrintEnvironment();
-    if (mode == "descriptors")
+    }
+    if (mode == "descriptors") {
         return PrintDescriptors();
-    if (mode == "signals")
+    }
+    if (mode == "signals") {
         return PrintSignals();
-    if (mode == "exit")
+    }
+    if (mode == "exit") {
         return std::atoi(value);
-    if (mode == "signal")
+    }
+    if (mode == "signal") {
         return std::raise(std::atoi(value));
-    if (mode == "bytes")
+    }
+    if (mode == "bytes") {
         return WriteBytes(std::atol(value));
-    if (mode == "daemon")
+    }
+    if (mode == "daemon") {
         return LeaveDaemon();
-    if (mode == "lock")
+    }
+    if (mode == "lock") {
         return HoldLockInGroup(value);
-    if (mode == "complain")
+    }
+    if (mode == "complain") {
         return std::fputs(value, stderr) < 0 ? 1 : 3;
-    if (mode == "write-forever")
-        for (;;)
+    }
+    if (mode == "write-forever") {
+        for (;;) {
             WriteBytes(4096);
-    if (mode == "input")
+        }
+    }
+    if (mode == "input") {
         return std::getchar() == EOF ? 0 : 1;
+    }
     return 99;
 }

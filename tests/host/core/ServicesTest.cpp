@@ -1,23 +1,24 @@
 // Settings, logger, the namespace-provider manager, and the switch that cancels programs.
-#include <fstream>
-#include <future>
-#include <sstream>
+#include "host/core/TChildProcess.h"
+#include "host/core/TCoreLogger.h"
+#include "host/core/TProcessControl.h"
 
-#include <unistd.h>
-
-#include <boost/make_shared.hpp>
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
-#include <core/TChildProcess.h>
-#include <core/TCoreLogger.h>
-#include <core/TProcessControl.h>
 #include <host/ICIMNamespace.h>
 #include <host/INamespaceProvider.h>
 #include <host/TConfig.h>
 #include <host/TOSSpecific.h>
 #include <host/TRootObject.h>
 #include <host/TVRXException.h>
+
+#include <boost/make_shared.hpp>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <fstream>
+#include <future>
+#include <sstream>
+
+#include <unistd.h>
 
 namespace NKOLVRX20 {
 namespace {
@@ -76,8 +77,9 @@ TEST_F(TConfigTest, ABadFileChangesNothing)
 {
     const TFile bad("a=1\nno equals sign\n"), large(std::string(1024 * 1024 + 1, '#'));
     const TFile justSmallEnough(std::string(1024 * 1024 - 4, '#') + "\na=1");
-    for (const std::string& path : {bad.fPath, large.fPath, std::string("/"), std::string("/nonexistent")})
+    for (const std::string& path : {bad.fPath, large.fPath, std::string("/"), std::string("/nonexistent")}) {
         EXPECT_THROW(fConfig.Load(path), TVRXException) << path;
+    }
     EXPECT_EQ(fConfig.getValue("a"), "");
     fConfig.Load(justSmallEnough.fPath);
     EXPECT_EQ(fConfig.getValue("a"), "1");

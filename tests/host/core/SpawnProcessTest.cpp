@@ -1,3 +1,13 @@
+#include "host/core/TChildProcess.h"
+#include "host/core/TProcessLog.h"
+
+#include <host/TOSSpecific.h>
+#include <host/TRootObject.h>
+#include <host/TVRXException.h>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
@@ -7,15 +17,6 @@
 #include <fcntl.h>
 #include <sys/file.h>
 #include <unistd.h>
-
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
-#include <core/TChildProcess.h>
-#include <core/TProcessLog.h>
-#include <host/TOSSpecific.h>
-#include <host/TRootObject.h>
-#include <host/TVRXException.h>
 
 namespace NKOLVRX20 {
 namespace {
@@ -228,10 +229,12 @@ TEST(TProcessLog, FailuresAreLoggedInOneLineAndKeptForTheHost)
 TEST(SpawnProcess, RunsFromSeveralThreadsAtOnce)
 {
     std::vector<std::future<std::string>> outputs;
-    for (int i = 0; i < 8; ++i)
+    for (int i = 0; i < 8; ++i) {
         outputs.push_back(std::async(std::launch::async, [i] { return OutputOf({"arguments", std::to_string(i)}); }));
-    for (int i = 0; i < 8; ++i)
+    }
+    for (int i = 0; i < 8; ++i) {
         EXPECT_EQ(outputs[static_cast<std::size_t>(i)].get(), "[probe][arguments][" + std::to_string(i) + "]");
+    }
 }
 
 TEST(GetFileSize, AnswersForRegularFilesAlone)

@@ -1,11 +1,11 @@
-#include <cmath>
-#include <limits>
+#include <host/TCIMValue.h>
+#include <host/TVRXException.h>
 
 #include <boost/make_shared.hpp>
 #include <gtest/gtest.h>
 
-#include <host/TCIMValue.h>
-#include <host/TVRXException.h>
+#include <cmath>
+#include <limits>
 
 namespace NKOLVRX20 {
 namespace {
@@ -170,8 +170,9 @@ TEST(TCIMValue, KindsThatDoNotConvertAreRefused)
 {
     const TCIMValue text("5"), number(5), nothing, typedNull(TType::kUint32, 0);
     const TCIMValue array(TType::kUint32, 0, {TCIMValue(5u)});
-    for (const TCIMValue* value : {&text, &nothing, &typedNull, &array})
+    for (const TCIMValue* value : {&text, &nothing, &typedNull, &array}) {
         EXPECT_EQ(StatusOf([&] { (void)static_cast<int>(*value); }), TVRXStatusCode::kTypeMismatch);
+    }
     EXPECT_EQ(StatusOf([&] { (void)static_cast<std::string>(number); }), TVRXStatusCode::kTypeMismatch);
     EXPECT_EQ(StatusOf([&] { (void)static_cast<TCIMChar16>(number); }), TVRXStatusCode::kTypeMismatch);
     EXPECT_EQ(StatusOf([&] { (void)static_cast<TCIMDateTime>(text); }), TVRXStatusCode::kTypeMismatch);
@@ -243,12 +244,13 @@ TEST(TCIMValue, ComparesByTypeThenNullThenValue)
         TCIMValue(TType(TType::kSint32), 0, {TCIMValue(1)}),
         TCIMValue(TType(TType::kSint32), 0, {TCIMValue(1), TCIMValue(0)}),
     };
-    for (std::size_t i = 0; i < ascending.size(); ++i)
+    for (std::size_t i = 0; i < ascending.size(); ++i) {
         for (std::size_t j = 0; j < ascending.size(); ++j) {
             SCOPED_TRACE(std::to_string(i) + " and " + std::to_string(j));
             EXPECT_EQ(ascending[i] < ascending[j], i < j);
             EXPECT_EQ(ascending[i] == ascending[j], i == j);
         }
+    }
 }
 
 TEST(TCIMValue, EqualValuesMadeApartAreEqual)

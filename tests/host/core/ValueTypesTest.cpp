@@ -1,9 +1,9 @@
 // The small types beside the variant: datetime, char16, reference, status code and exception.
-#include <gtest/gtest.h>
-
 #include <host/TCIMReference.h>
 #include <host/TCIMValue.h>
 #include <host/TVRXException.h>
+
+#include <gtest/gtest.h>
 
 namespace NKOLVRX20 {
 namespace {
@@ -44,7 +44,9 @@ TEST(TCIMDateTime, RefusesOtherShapes)
     for (const char* text : {"", "20261121041500.123456+06", "20261121041500.123456+0600", "2026112104150a.123456+060",
                              "20261121041500,123456+060", "20261121041500.123456 060", "2026112*041500.123456+060",
                              "20261121041500.12*456+060", "20261121041500.123456+0*0", "00000003040506.000000:001"})
+    {
         EXPECT_THROW(TCIMDateTime{std::string(text)}, TVRXException) << text;
+    }
 }
 
 TEST(TCIMDateTime, SetMakesAnIntervalWithinTheFields)
@@ -64,8 +66,9 @@ TEST(TCIMChar16, ReadsADecimalCode)
 {
     EXPECT_EQ(TCIMChar16("65").GetCode(), 65);
     EXPECT_EQ(TCIMChar16("65535").GetCode(), 65535);
-    for (const char* text : {"", "A", "-1", "65536", "6 5", "0x41"})
+    for (const char* text : {"", "A", "-1", "65536", "6 5", "0x41"}) {
         EXPECT_THROW(TCIMChar16{std::string(text)}, TVRXException) << text;
+    }
 }
 
 struct TPathRow

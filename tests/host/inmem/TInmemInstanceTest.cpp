@@ -1,13 +1,13 @@
-#include <climits>
+#include "host/inmem/TInmemNamespace.h"
+#include "tests/host/support/FakeModel.h"
+
+#include <host/ICIMProperty.h>
+#include <host/TInmemInstance.h>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <host/ICIMProperty.h>
-#include <host/TInmemInstance.h>
-#include <inmem/TInmemNamespace.h>
-
-#include "host/support/FakeModel.h"
+#include <climits>
 
 namespace NKOLVRX20 {
 namespace {
@@ -144,15 +144,17 @@ TEST(TInmemProperty, TextsComeFromTheDeclaration)
         SCOPED_TRACE(row.fName);
         const auto fan = boost::make_shared<TFakeClass>("CIM_Fan");
         const auto declaration = fan->Declare("X", row.fValue.GetType());
-        for (const auto& qualifier : row.fQualifiers)
+        for (const auto& qualifier : row.fQualifiers) {
             declaration->SetQualifier(qualifier.first, qualifier.second);
+        }
         const auto instance = boost::make_shared<TInmemInstance>(fan, TCIMContext());
         instance->SetPropertyValue("x", row.fValue, TCIMContext());
         const auto property = instance->GetProperty("x", TCIMContext());
         EXPECT_EQ(property->ToStringVector(), row.fTexts);
         std::string joined;
-        for (const std::string& text : row.fTexts)
+        for (const std::string& text : row.fTexts) {
             joined += (joined.empty() ? "" : ", ") + text;
+        }
         EXPECT_EQ(property->ToString(), joined);
     }
 }

@@ -1,4 +1,4 @@
-#include "FakeModel.h"
+#include "tests/host/support/FakeModel.h"
 
 #include <algorithm>
 #include <cctype>
@@ -18,42 +18,53 @@ void TFakeClass::EnumerateKeyNames(TKeyNameVisitor visitor, TCIMContext) const
 {
     for (const auto& property : fProperties) {
         const std::string name = property->GetName(TCIMContext());
-        if (property->IsKey() && !visitor(&name))
+        if (property->IsKey() && !visitor(&name)) {
             return;
+        }
     }
 }
 
 boost::shared_ptr<ICIMPropertyDecl> TFakeClass::GetPropertyDecl(const std::string& name, TCIMContext) const
 {
-    if (!name.empty() && std::isdigit(static_cast<unsigned char>(name[0])))
+    if (!name.empty() && std::isdigit(static_cast<unsigned char>(name[0]))) {
         throw TVRXException(TVRXStatusCode::kInvalidName);
-    for (const auto& property : fProperties)
-        if (strcasecmp(property->GetName(TCIMContext()).c_str(), name.c_str()) == 0)
+    }
+    for (const auto& property : fProperties) {
+        if (strcasecmp(property->GetName(TCIMContext()).c_str(), name.c_str()) == 0) {
             return property;
+        }
+    }
     throw TVRXException(TVRXStatusCode::kUnknownProperty);
 }
 
 void TFakeClass::EnumeratePropertyDecls(TPropertyDeclVisitor visitor, TCIMContext) const
 {
-    for (const auto& property : fProperties)
-        if (!visitor(property))
+    for (const auto& property : fProperties) {
+        if (!visitor(property)) {
             return;
+        }
+    }
 }
 
 void TFakeClass::EnumerateInstances(TInstanceVisitor visitor, bool, TCIMContext)
 {
-    if (fEnumerate)
+    if (fEnumerate) {
         return fEnumerate(visitor);
-    for (const auto& instance : fInstances)
-        if (!visitor(instance))
+    }
+    for (const auto& instance : fInstances) {
+        if (!visitor(instance)) {
             return;
+        }
+    }
 }
 
 void TFakeClass::EnumerateMethodDecls(TMethodDeclVisitor visitor, TCIMContext) const
 {
-    for (const auto& method : fMethods)
-        if (!visitor(method))
+    for (const auto& method : fMethods) {
+        if (!visitor(method)) {
             return;
+        }
+    }
 }
 
 void TFakeClass::RemoveInstance(boost::shared_ptr<ICIMInstance> instance)

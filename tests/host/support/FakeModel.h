@@ -1,15 +1,6 @@
 // A small object model for the host's tests: declarations with settable qualifiers, and a class that holds them and
 // serves instances. What the host never asks for throws TVRXException 31.
-#ifndef TESTS_HOST_FAKEMODEL_H
-#define TESTS_HOST_FAKEMODEL_H
-
-#include <functional>
-#include <map>
-#include <vector>
-
-#include <boost/enable_shared_from_this.hpp>
-#include <boost/make_shared.hpp>
-#include <boost/weak_ptr.hpp>
+#pragma once
 
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>
@@ -19,6 +10,14 @@
 #include <host/ICIMPropertyDecl.h>
 #include <host/ICIMQualifier.h>
 #include <host/TVRXException.h>
+
+#include <boost/enable_shared_from_this.hpp>
+#include <boost/make_shared.hpp>
+#include <boost/weak_ptr.hpp>
+
+#include <functional>
+#include <map>
+#include <vector>
 
 namespace NKOLVRX20 {
 
@@ -164,9 +163,11 @@ class TFakeMethodDecl : public TFakeElement<ICIMMethodDecl>
     }
     void EnumerateParameterDecls(TParameterDeclVisitor visitor, TCIMContext) const override
     {
-        for (const auto& parameter : fParameters)
-            if (!visitor(parameter))
+        for (const auto& parameter : fParameters) {
+            if (!visitor(parameter)) {
                 return;
+            }
+        }
     }
     bool operator==(const ICIMMethodDecl&) const override { ThrowUnused(); }
     bool operator<(const ICIMMethodDecl&) const override { ThrowUnused(); }
@@ -265,5 +266,3 @@ class TFakeClass : public TFakeElement<ICIMClass>, public boost::enable_shared_f
 };
 
 } // namespace NKOLVRX20
-
-#endif

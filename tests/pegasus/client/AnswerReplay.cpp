@@ -1,14 +1,15 @@
-#include "AnswerReplay.h"
+#include "tests/pegasus/client/AnswerReplay.h"
 
 #include "pegasus/client/HttpResponse.h"
 #include "pegasus/client/ResponseReader.h"
-#include "support/ContentReader.h"
-#include "support/PeerAnswers.h"
+#include "tests/support/ContentReader.h"
+#include "tests/support/PeerAnswers.h"
 
 #include <Pegasus/Common/CIMDateTime.h>
 
-#include <cxxabi.h>
 #include <memory>
+
+#include <cxxabi.h>
 
 using namespace Pegasus;
 
@@ -95,17 +96,20 @@ std::string readAnswer(const AnswerCase& answer, const std::vector<std::size_t>&
             at = cut;
         }
         response.feed(std::string_view(answer.bytes).substr(at));
-        if (!response.endOfConnection())
+        if (!response.endOfConnection()) {
             return "incomplete";
+        }
         reader.finish();
     } catch (const Exception& exception) {
         return "EXC " + nameOf(typeid(exception)) + ": " + std::string(exception.getMessage().getCString());
     }
-    if (response.fields().hasStatusCode)
+    if (response.fields().hasStatusCode) {
         out += "status " + response.fields().statusCode + " " + response.fields().statusDescription;
-    if (reader.error())
+    }
+    if (reader.error()) {
         out += "error " + std::to_string(reader.error()->getCode()) + " " +
                std::string(reader.error()->getMessage().getCString());
+    }
     return out;
 }
 
@@ -139,7 +143,7 @@ std::vector<AnswerCase> sampleAnswers()
 
 namespace {
 
-/// Where the bytes of the body are: all behind the header, or what the chunks hold. Requires: sound framing.
+// Where the bytes of the body are: all behind the header, or what the chunks hold. Requires: sound framing.
 std::vector<std::size_t> bodyBytes(std::string_view answer)
 {
     std::vector<std::size_t> places;
@@ -151,8 +155,9 @@ std::vector<std::size_t> bodyBytes(std::string_view answer)
             size = std::stoul(std::string(answer.substr(at, 16)), nullptr, 16);
             at = answer.find("\r\n", at) + 2;
         }
-        for (const std::size_t end = at + size; at < end; ++at)
+        for (const std::size_t end = at + size; at < end; ++at) {
             places.push_back(at);
+        }
         at += 2;
     } while (isChunked && size > 0);
     return places;
@@ -164,8 +169,9 @@ std::vector<bool> markupBytes(std::string_view answer)
 {
     std::vector<bool> marks(answer.size(), false);
     const std::vector<std::size_t> body = bodyBytes(answer);
-    if (body.empty())
+    if (body.empty()) {
         return marks;
+    }
     // Between the pieces of a body there is nothing but framing, which may not change either.
     std::fill(marks.begin() + static_cast<std::ptrdiff_t>(body.front()),
               marks.begin() + static_cast<std::ptrdiff_t>(body.back()), true);

@@ -1,5 +1,4 @@
-#ifndef TESTS_PEGASUS_CLIENT_ANSWERREPLAY_H
-#define TESTS_PEGASUS_CLIENT_ANSWERREPLAY_H
+#pragma once
 
 #include "pegasus/client/ClientLimits.h"
 
@@ -9,28 +8,26 @@
 
 namespace test {
 
-/// An answer and the request that it is for, without a socket between.
+// An answer and the request that it is for, without a socket between.
 struct AnswerCase
 {
     std::string name;
     std::string messageId;
     std::string method;
     bool isIntrinsic = true;
-    std::string bytes; ///< the whole HTTP message
+    std::string bytes; // the whole HTTP message
 };
 
-/// Reads the answer as the client does, in pieces that end at `cuts`.
-/// Returns: what was decoded, encoded again; or "EXC class: message"; "incomplete" when the bytes end too early.
+// Reads the answer as the client does, in pieces that end at `cuts`.
+// Returns: what was decoded, encoded again; or "EXC class: message"; "incomplete" when the bytes end too early.
 std::string readAnswer(const AnswerCase& answer, const std::vector<std::size_t>& cuts = {},
                        const Pegasus::client::ClientLimits& limits = Pegasus::client::ClientLimits());
 
-/// Answers with every kind of element, chunks, trailers and errors.
+// Answers with every kind of element, chunks, trailers and errors.
 std::vector<AnswerCase> sampleAnswers();
 
-/// For each byte of the answer: does it belong to the XML's markup (tags without the values of attributes) or to the
-/// framing of chunks? Elsewhere a changed byte may be other data, which nobody can tell.
+// For each byte of the answer: does it belong to the XML's markup (tags without the values of attributes) or to the
+// framing of chunks? Elsewhere a changed byte may be other data, which nobody can tell.
 std::vector<bool> markupBytes(std::string_view answer);
 
 } // namespace test
-
-#endif

@@ -1,7 +1,7 @@
 // Each answer split at every byte, cut at every length, and with every byte changed: it is read the same way, or
 // refused, and never taken for another success.
-#include "AnswerReplay.h"
-#include "WireCases.h"
+#include "tests/pegasus/client/AnswerReplay.h"
+#include "tests/pegasus/client/WireCases.h"
 
 #include <gtest/gtest.h>
 
@@ -10,17 +10,18 @@ namespace {
 using test::AnswerCase;
 using test::readAnswer;
 
-/// What all trials with one answer may read together: the work would grow with the square of the size.
+// What all trials with one answer may read together: the work would grow with the square of the size.
 constexpr std::size_t kMaxReadBytes = 2 << 20;
 
-/// The bytes of an answer that are tried: each of them, or so many as the limit allows, spread evenly.
+// The bytes of an answer that are tried: each of them, or so many as the limit allows, spread evenly.
 std::vector<std::size_t> placesIn(const AnswerCase& answer)
 {
     const std::size_t size = std::max<std::size_t>(answer.bytes.size(), 1);
     const std::size_t step = size * size / kMaxReadBytes + 1;
     std::vector<std::size_t> places;
-    for (std::size_t at = 0; at < answer.bytes.size(); at += step)
+    for (std::size_t at = 0; at < answer.bytes.size(); at += step) {
         places.push_back(at);
+    }
     return places;
 }
 
@@ -29,9 +30,10 @@ std::vector<AnswerCase> allAnswers()
     std::vector<AnswerCase> cases = test::sampleAnswers();
     for (const test::WireCase& wireCase : test::loadWireCases()) {
         const std::string id = wireCase.request.messageId();
-        if (!wireCase.response.empty())
+        if (!wireCase.response.empty()) {
             cases.push_back({wireCase.name, id, wireCase.request.method(),
                              wireCase.request.body.find("<IMETHODCALL") != std::string::npos, wireCase.response});
+        }
     }
     return cases;
 }
@@ -45,8 +47,9 @@ bool isRefused(const std::string& result)
 
 TEST(AnswerRobustness, SamplesAreReadAtAll)
 {
-    for (const AnswerCase& answer : test::sampleAnswers())
+    for (const AnswerCase& answer : test::sampleAnswers()) {
         EXPECT_FALSE(isRefused(readAnswer(answer))) << answer.name << ": " << readAnswer(answer);
+    }
 }
 
 TEST(AnswerRobustness, AnswerSplitAnywhereIsReadTheSame)
@@ -55,8 +58,9 @@ TEST(AnswerRobustness, AnswerSplitAnywhereIsReadTheSame)
     for (const AnswerCase& answer : allAnswers()) {
         const std::string whole = readAnswer(answer);
         std::vector<std::size_t> everyByte;
-        for (std::size_t at = 1; at < answer.bytes.size(); ++at)
+        for (std::size_t at = 1; at < answer.bytes.size(); ++at) {
             everyByte.push_back(at);
+        }
         for (const std::size_t cut : placesIn(answer)) {
             // What comes after an error may differ in the place it names, never in being refused.
             const std::string result = readAnswer(answer, {cut});
@@ -77,8 +81,9 @@ TEST(AnswerRobustness, AnswerCutShortIsRefused)
         // Without a length the end of the connection ends the body; blanks at its end may be missing.
         const std::size_t needed = bytes.find_last_not_of(" \r\n") + 1;
         for (const std::size_t size : placesIn(answer)) {
-            if (size >= needed)
+            if (size >= needed) {
                 break;
+            }
             answer.bytes = bytes.substr(0, size);
             ASSERT_TRUE(isRefused(readAnswer(answer))) << answer.name << " cut at " << size;
         }
@@ -143,8 +148,9 @@ TEST(AnswerLimits, EachLimitHasAnErrorOfItsOwn)
         limit.lower(limits);
         bool found = false;
         for (const AnswerCase& answer : test::sampleAnswers()) {
-            if (answer.name != limit.answer)
+            if (answer.name != limit.answer) {
                 continue;
+            }
             found = true;
             EXPECT_NE(readAnswer(answer, {}, limits).find(limit.complaint), std::string::npos)
                 << limit.name << ": " << readAnswer(answer, {}, limits);

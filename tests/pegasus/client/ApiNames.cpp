@@ -155,12 +155,16 @@ void useFlags(CIMScope& scope, CIMFlavor& flavor)
     for (const CIMScope& one :
          {CIMScope::NONE, CIMScope::CLASS, CIMScope::ASSOCIATION, CIMScope::INDICATION, CIMScope::PROPERTY,
           CIMScope::REFERENCE, CIMScope::METHOD, CIMScope::PARAMETER, CIMScope::ANY})
+    {
         scope.addScope(one);
+    }
     for (const CIMFlavor& one :
          {CIMFlavor::NONE, CIMFlavor::OVERRIDABLE, CIMFlavor::ENABLEOVERRIDE, CIMFlavor::TOSUBCLASS,
           CIMFlavor::TOSUBELEMENTS, CIMFlavor::TOINSTANCE, CIMFlavor::TRANSLATABLE, CIMFlavor::DISABLEOVERRIDE,
           CIMFlavor::RESTRICTED, CIMFlavor::DEFAULTS})
+    {
         flavor.addFlavor(one);
+    }
     flavor.removeFlavor(CIMFlavor());
     (void)(scope.hasScope(CIMScope()) || flavor.hasFlavor(CIMFlavor::NONE));
     useBits(scope, CIMScope::ANY);

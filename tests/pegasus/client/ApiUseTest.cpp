@@ -3,6 +3,7 @@
 #include <Pegasus/Client/CIMClient.h>
 
 #include <gtest/gtest.h>
+
 #include <sstream>
 #include <type_traits>
 
@@ -108,8 +109,9 @@ TEST(ApiUse, ObjectsAreSharedByHandlesAndNotByClones)
 TEST(ApiUse, TextsAndArraysMayBeGivenTheirOwnParts)
 {
     String text("abc");
-    for (int i = 0; i < 4; ++i)
+    for (int i = 0; i < 4; ++i) {
         text.append(text.getChar16Data() + 1, text.size() - 1);
+    }
     EXPECT_EQ(text.size(), 33u); // each time its size less one more
     text.append(text);
     EXPECT_EQ(text.subString(33), text.subString(0, 33));
@@ -117,8 +119,9 @@ TEST(ApiUse, TextsAndArraysMayBeGivenTheirOwnParts)
     Array<String> array;
     array.append("a");
     array.append("b");
-    for (int i = 0; i < 4; ++i)
+    for (int i = 0; i < 4; ++i) {
         array.append(array.getData(), array.size());
+    }
     array.append(array[0]);
     array.appendArray(array);
     array.prepend(array[1]);

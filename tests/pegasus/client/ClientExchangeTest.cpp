@@ -1,23 +1,25 @@
 // A client and a peer that plays good and bad answers: the exceptions, the deadline, and that the next call works.
-#include "support/PeerAnswers.h"
+#include "tests/support/PeerAnswers.h"
 
 #include <Pegasus/Client/CIMClient.h>
+
+#include <gtest/gtest.h>
 
 #include <atomic>
 #include <chrono>
 #include <csignal>
+#include <filesystem>
+#include <memory>
+#include <stdexcept>
+#include <thread>
+#include <vector>
+
 #include <cxxabi.h>
 #include <fcntl.h>
-#include <filesystem>
-#include <gtest/gtest.h>
-#include <memory>
 #include <netinet/in.h>
 #include <poll.h>
-#include <stdexcept>
 #include <sys/socket.h>
-#include <thread>
 #include <unistd.h>
-#include <vector>
 
 using namespace Pegasus;
 using test::PeerAnswer;
@@ -26,10 +28,10 @@ using test::PeerRequest;
 namespace {
 
 constexpr const char* kNameSpace = "root/cimv2";
-/// Far more than any of these calls needs, far less than a hang.
+// Far more than any of these calls needs, far less than a hang.
 constexpr Uint32 kTimeoutMs = 10000;
 constexpr Uint32 kShortTimeoutMs = 200;
-/// Even a busy machine and a sanitizer do not make a call last that long.
+// Even a busy machine and a sanitizer do not make a call last that long.
 constexpr std::chrono::minutes kHang(2);
 
 CIMClass fanClass()
@@ -57,7 +59,7 @@ void connect(CIMClient& client, const test::ScriptedPeer& peer, Uint32 timeoutMs
     client.connect("127.0.0.1", peer.port(), String(), String());
 }
 
-/// "Pegasus::X: message" of what the call throws; "ok" when it does not.
+// "Pegasus::X: message" of what the call throws; "ok" when it does not.
 template <class Call> std::string outcome(Call&& call)
 {
     try {
@@ -70,7 +72,7 @@ template <class Call> std::string outcome(Call&& call)
     }
 }
 
-/// What the call throws, when it takes the time-out's time.
+// What the call throws, when it takes the time-out's time.
 template <class Call> std::string outcomeInTime(Call&& call)
 {
     const auto start = std::chrono::steady_clock::now();
@@ -95,7 +97,7 @@ struct Fault
 {
     const char* name;
     PeerAnswer (*answer)(const PeerRequest&);
-    const char* outcome; ///< how it begins
+    const char* outcome; // how it begins
 };
 
 const Fault kFaults[] = {
@@ -236,7 +238,7 @@ TEST(ClientDeadline, BoundsEveryWaitAndTheNextCallWorks)
 
 namespace {
 
-/// A server that is there but never accepts: the kernel takes as many connections and bytes as it keeps room for.
+// A server that is there but never accepts: the kernel takes as many connections and bytes as it keeps room for.
 class DeafServer
 {
   public:
@@ -249,20 +251,23 @@ class DeafServer
         auto* generic = reinterpret_cast<sockaddr*>(&address);
         if (::bind(fListener, generic, size) < 0 || ::getsockname(fListener, generic, &size) < 0 ||
             ::listen(fListener, 0) < 0)
+        {
             throw std::runtime_error("cannot listen");
+        }
         fAddress = address;
     }
     ~DeafServer()
     {
-        for (const int fd : fWaiting)
+        for (const int fd : fWaiting) {
             ::close(fd);
+        }
         ::close(fListener);
     }
     DeafServer(const DeafServer&) = delete;
     DeafServer& operator=(const DeafServer&) = delete;
 
     Uint32 port() const { return ntohs(fAddress.sin_port); }
-    /// Connects until a connection is not taken any more. Returns: whether it came to that.
+    // Connects until a connection is not taken any more. Returns: whether it came to that.
     bool fill()
     {
         for (int tries = 0; tries < 16; ++tries) {
@@ -270,8 +275,9 @@ class DeafServer
             fWaiting.push_back(fd);
             (void)::connect(fd, reinterpret_cast<const sockaddr*>(&fAddress), sizeof(fAddress));
             pollfd entry{fd, POLLOUT, 0};
-            if (::poll(&entry, 1, 100) == 0)
+            if (::poll(&entry, 1, 100) == 0) {
                 return true;
+            }
         }
         return false;
     }
@@ -356,8 +362,9 @@ TEST(ClientConnection, OnlyWhatReadsIsSentAgainAfterALostAnswer)
     // The second request of each connection finds it closed, as behind a server that gave up an idle one.
     const auto answer = [](const PeerRequest& request) -> PeerAnswer {
         static thread_local std::size_t served = 0;
-        if (++served % 2 == 0)
+        if (++served % 2 == 0) {
             return test::closedConnection();
+        }
         return request.method() == "CreateClass" ? test::httpAnswer(test::intrinsicBodyWithout(request))
                                                  : good(request);
     };
@@ -391,8 +398,9 @@ TEST(ClientConnection, SocketsAreCloseOnExecAndBrokenOnesRaiseNoSignal)
     EXPECT_GE(sockets, 1u);
     CIMClass big("T_Big");
     big.addQualifier(CIMQualifier("Description", String(std::string(8 << 20, 'x').c_str())));
-    for (int call = 0; call < 3; ++call)
+    for (int call = 0; call < 3; ++call) {
         EXPECT_NE(outcome([&] { client.createClass(kNameSpace, big); }), "ok");
+    }
 }
 
 TEST(ClientThreads, ClientsOfTheirOwnAndObjectsInCommon)
@@ -414,8 +422,9 @@ TEST(ClientThreads, ClientsOfTheirOwnAndObjectsInCommon)
             }
         });
     }
-    for (std::thread& thread : threads)
+    for (std::thread& thread : threads) {
         thread.join();
+    }
     EXPECT_EQ(equal, 200u);
     EXPECT_EQ(peer.connectionCount(), 4u);
 }

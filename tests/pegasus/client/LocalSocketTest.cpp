@@ -1,24 +1,26 @@
 // The private socket, in a folder whose path is longer than a socket address.
-#include "pegasus/common/LocalSocket.h"
+#include "pegasus/base/LocalSocket.h"
 
 #include <Pegasus/Client/CIMClient.h>
 
+#include <gtest/gtest.h>
+
 #include <cstdlib>
 #include <filesystem>
-#include <gtest/gtest.h>
+#include <system_error>
+#include <thread>
+#include <vector>
+
 #include <poll.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
-#include <system_error>
-#include <thread>
 #include <unistd.h>
-#include <vector>
 
 using namespace Pegasus;
 
 namespace {
 
-/// PEGASUS_HOME for the time of a test.
+// PEGASUS_HOME for the time of a test.
 class LocalSocketTest : public testing::Test
 {
   protected:
@@ -44,8 +46,9 @@ class LocalSocketTest : public testing::Test
 std::string requestOf(int listener)
 {
     pollfd entry{listener, POLLIN, 0};
-    if (::poll(&entry, 1, 10000) != 1)
+    if (::poll(&entry, 1, 10000) != 1) {
         return "nobody came";
+    }
     const int socket = ::accept4(listener, nullptr, nullptr, SOCK_CLOEXEC);
     std::string text(4096, '\0');
     const ssize_t size = ::recv(socket, text.data(), text.size(), 0);
@@ -96,8 +99,9 @@ TEST_F(LocalSocketTest, ConnectingIsBoundedWithNoTimeLeftToo)
         ASSERT_LT(waiting.size(), 100u);
     }
     EXPECT_FALSE(waiting.empty());
-    for (const int fd : waiting)
+    for (const int fd : waiting) {
         ::close(fd);
+    }
     ::close(listener);
 }
 

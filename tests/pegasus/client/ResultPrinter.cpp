@@ -1,9 +1,10 @@
-#include "ResultPrinter.h"
+#include "tests/pegasus/client/ResultPrinter.h"
 
 #include <cstdlib>
-#include <cxxabi.h>
 #include <memory>
 #include <typeinfo>
+
+#include <cxxabi.h>
 
 using namespace Pegasus;
 
@@ -45,8 +46,9 @@ std::string printParameter(const CIMConstParameter& parameter)
 {
     std::string out = utf8(parameter.getName()) + ":" + cimTypeToString(parameter.getType()) +
                       std::to_string(parameter.isArray()) + "{";
-    for (Uint32 i = 0; i < parameter.getQualifierCount(); ++i)
+    for (Uint32 i = 0; i < parameter.getQualifierCount(); ++i) {
         out += utf8(parameter.getQualifier(i).getName()) + "=" + valueText(parameter.getQualifier(i).getValue()) + " ";
+    }
     return out + "} ";
 }
 
@@ -69,8 +71,9 @@ std::string printClass(const CIMClass& cimClass)
     for (Uint32 i = 0; i < cimClass.getMethodCount(); ++i) {
         const CIMConstMethod method = static_cast<const CIMConstClass&>(cimClass).getMethod(i);
         out += "\n  M " + utf8(method.getName()) + " " + cimTypeToString(method.getType()) + " params ";
-        for (Uint32 p = 0; p < method.getParameterCount(); ++p)
+        for (Uint32 p = 0; p < method.getParameterCount(); ++p) {
             out += printParameter(method.getParameter(p));
+        }
     }
     return out;
 }
@@ -102,16 +105,18 @@ std::string printInstanceSummary(const CIMInstance& instance)
 std::string printPaths(const Array<CIMObjectPath>& paths)
 {
     std::string out = std::to_string(paths.size());
-    for (Uint32 i = 0; i < paths.size(); ++i)
+    for (Uint32 i = 0; i < paths.size(); ++i) {
         out += "\n " + utf8(paths[i].toString());
+    }
     return out;
 }
 
 std::string printNames(const Array<CIMName>& names)
 {
     std::string out = std::to_string(names.size()) + "\n";
-    for (Uint32 i = 0; i < names.size(); ++i)
+    for (Uint32 i = 0; i < names.size(); ++i) {
         out += " " + utf8(names[i]);
+    }
     return out;
 }
 
@@ -151,11 +156,13 @@ std::string printException(const Exception& exception)
     const std::unique_ptr<char, decltype(&std::free)> name(
         abi::__cxa_demangle(typeid(exception).name(), nullptr, nullptr, nullptr), &std::free);
     std::string out = std::string("EXC ") + name.get();
-    if (const auto* status = dynamic_cast<const CIMException*>(&exception))
+    if (const auto* status = dynamic_cast<const CIMException*>(&exception)) {
         out += " code=" + std::to_string(status->getCode());
-    if (const auto* http = dynamic_cast<const CIMClientHTTPErrorException*>(&exception))
+    }
+    if (const auto* http = dynamic_cast<const CIMClientHTTPErrorException*>(&exception)) {
         out += " http=" + std::to_string(http->getCode()) + " cimError=" + utf8(http->getCIMError()) +
                " detail=" + utf8(http->getCIMErrorDetail());
+    }
     return out + " msg=" + utf8(exception.getMessage());
 }
 

@@ -1,5 +1,4 @@
-#ifndef TESTS_PEGASUS_CLIENT_RESULTPRINTER_H
-#define TESTS_PEGASUS_CLIENT_RESULTPRINTER_H
+#pragma once
 
 #include <Pegasus/Client/CIMClient.h>
 
@@ -7,7 +6,7 @@
 
 namespace test {
 
-/// Results as the program printed them that made the recordings; each line feed stands for its " | ".
+// Results as the program printed them that made the recordings; each line feed stands for its " | ".
 
 std::string printClass(const Pegasus::CIMClass& cimClass);
 std::string printInstances(const Pegasus::Array<Pegasus::CIMInstance>& instances);
@@ -17,9 +16,7 @@ std::string printNames(const Pegasus::Array<Pegasus::CIMName>& names);
 std::string printQualifier(const Pegasus::CIMQualifierDecl& declaration);
 std::string printQualifiers(const Pegasus::Array<Pegasus::CIMQualifierDecl>& declarations);
 std::string printMethodResult(const Pegasus::CIMValue& result, const Pegasus::Array<Pegasus::CIMParamValue>& outputs);
-/// "EXC Pegasus::CIMException code=6 msg=..."
+// "EXC Pegasus::CIMException code=6 msg=..."
 std::string printException(const Pegasus::Exception& exception);
 
 } // namespace test
-
-#endif

@@ -1,16 +1,17 @@
-#include "WireCases.h"
+#include "tests/pegasus/client/WireCases.h"
 
-#include "ResultPrinter.h"
-#include "pegasus/common/ElementDecoder.h"
 #include "pegasus/common/StringRep.h"
+#include "pegasus/wire/ElementDecoder.h"
+#include "tests/pegasus/client/ResultPrinter.h"
 
 #include <Pegasus/Client/CIMClient.h>
+
+#include <pugixml.hpp>
 
 #include <algorithm>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
-#include <pugixml.hpp>
 
 using namespace Pegasus;
 
@@ -23,18 +24,19 @@ std::string readFile(const std::filesystem::path& path)
     return std::string((std::istreambuf_iterator<char>(file)), std::istreambuf_iterator<char>());
 }
 
-/// What stands behind the words that introduce the client's output.
+// What stands behind the words that introduce the client's output.
 std::string printedIn(const std::string& note)
 {
     const std::string printed = "Client printed: ";
     std::size_t start = note.find(printed);
-    if (start != std::string::npos)
+    if (start != std::string::npos) {
         return note.substr(start + printed.size());
+    }
     start = note.find(", exit ");
     return start == std::string::npos ? std::string() : note.substr(start + 10);
 }
 
-/// The recorded request's parameters, read with the library's own decoders.
+// The recorded request's parameters, read with the library's own decoders.
 class RecordedCall
 {
   public:
@@ -67,11 +69,13 @@ wire::XmlElement RecordedCall::parameter(const std::string& name)
 {
     for (wire::XmlElement child = fCall.firstChild(); child; child = child.nextSibling()) {
         std::string_view values[2];
-        if (!child.is("IPARAMVALUE"))
+        if (!child.is("IPARAMVALUE")) {
             continue;
+        }
         child.attributes({"NAME", "PARAMTYPE"}, values);
-        if (values[0] == name)
+        if (values[0] == name) {
             return child.onlyChild();
+        }
     }
     return wire::XmlElement();
 }
@@ -92,13 +96,15 @@ CIMName RecordedCall::className(const std::string& name)
 CIMPropertyList RecordedCall::propertyList()
 {
     const wire::XmlElement element = parameter("PropertyList");
-    if (!element)
+    if (!element) {
         return CIMPropertyList();
+    }
     Array<String> texts;
     fDecoder.decodeValue(element, CIMTYPE_STRING).get(texts);
     Array<CIMName> names;
-    for (Uint32 i = 0; i < texts.size(); ++i)
+    for (Uint32 i = 0; i < texts.size(); ++i) {
         names.append(texts[i]);
+    }
     return CIMPropertyList(names);
 }
 
@@ -107,8 +113,9 @@ std::string RecordedCall::invoke(CIMClient& client)
     wire::XmlElement child = fCall.firstChild();
     const CIMObjectPath path = fDecoder.decodeObjectPath(child);
     Array<CIMParamValue> inputs;
-    for (child = child.nextSibling(); child; child = child.nextSibling())
+    for (child = child.nextSibling(); child; child = child.nextSibling()) {
         inputs.append(fDecoder.decodeParamValue(child));
+    }
     Array<CIMParamValue> outputs;
     const CIMValue result = client.invokeMethod(path.getNameSpace(), path, fMethod.c_str(), inputs, outputs);
     return printMethodResult(result, outputs);
@@ -117,45 +124,54 @@ std::string RecordedCall::invoke(CIMClient& client)
 std::string RecordedCall::run(CIMClient& client)
 {
     const CIMNamespaceName ns(fNameSpace.c_str());
-    if (fCall.is("METHODCALL"))
+    if (fCall.is("METHODCALL")) {
         return invoke(client);
-    if (fMethod == "GetClass")
+    }
+    if (fMethod == "GetClass") {
         return printClass(client.getClass(ns, className("ClassName"), flag("LocalOnly", true),
                                           flag("IncludeQualifiers", true), flag("IncludeClassOrigin", false),
                                           propertyList()));
-    if (fMethod == "EnumerateInstances")
+    }
+    if (fMethod == "EnumerateInstances") {
         return printInstances(client.enumerateInstances(ns, className("ClassName"), flag("DeepInheritance", true),
                                                         flag("LocalOnly", true), flag("IncludeQualifiers", false),
                                                         flag("IncludeClassOrigin", false), propertyList()));
-    if (fMethod == "EnumerateInstanceNames")
+    }
+    if (fMethod == "EnumerateInstanceNames") {
         return printPaths(client.enumerateInstanceNames(ns, className("ClassName")));
-    if (fMethod == "GetInstance")
+    }
+    if (fMethod == "GetInstance") {
         return printInstanceSummary(client.getInstance(ns, fDecoder.decodeInstanceName(parameter("InstanceName")),
                                                        flag("LocalOnly", true), flag("IncludeQualifiers", false),
                                                        flag("IncludeClassOrigin", false), propertyList()));
-    if (fMethod == "EnumerateClasses")
+    }
+    if (fMethod == "EnumerateClasses") {
         return std::to_string(client
                                   .enumerateClasses(ns, className("ClassName"), flag("DeepInheritance", false),
                                                     flag("LocalOnly", true), flag("IncludeQualifiers", true),
                                                     flag("IncludeClassOrigin", false))
                                   .size());
-    if (fMethod == "EnumerateClassNames")
+    }
+    if (fMethod == "EnumerateClassNames") {
         return printNames(client.enumerateClassNames(ns, className("ClassName"), flag("DeepInheritance", false)));
+    }
     if (fMethod == "GetQualifier") {
         std::string scratch;
         return printQualifier(client.getQualifier(ns, std::string(parameter("QualifierName").text(scratch)).c_str()));
     }
-    if (fMethod == "EnumerateQualifiers")
+    if (fMethod == "EnumerateQualifiers") {
         return printQualifiers(client.enumerateQualifiers(ns));
-    if (fMethod == "CreateClass")
+    }
+    if (fMethod == "CreateClass") {
         client.createClass(ns, fDecoder.decodeClass(parameter("NewClass")));
-    else if (fMethod == "SetQualifier")
+    } else if (fMethod == "SetQualifier") {
         client.setQualifier(ns, fDecoder.decodeQualifierDeclaration(parameter("QualifierDeclaration")));
-    else if (fMethod == "CreateInstance")
+    } else if (fMethod == "CreateInstance") {
         return std::string(
             client.createInstance(ns, fDecoder.decodeInstance(parameter("NewInstance"))).toString().getCString());
-    else
+    } else {
         return "unsupported";
+    }
     return "ok";
 }
 
@@ -166,15 +182,18 @@ void appendCanonical(std::string& out, const pugi::xml_node& node)
         return;
     }
     std::vector<std::string> attributes;
-    for (const pugi::xml_attribute attribute : node.attributes())
+    for (const pugi::xml_attribute attribute : node.attributes()) {
         attributes.push_back(std::string(" ") + attribute.name() + "='" + attribute.value() + "'");
+    }
     std::sort(attributes.begin(), attributes.end());
     out += std::string("<") + node.name();
-    for (const std::string& attribute : attributes)
+    for (const std::string& attribute : attributes) {
         out += attribute;
+    }
     out += ">";
-    for (const pugi::xml_node child : node.children())
+    for (const pugi::xml_node child : node.children()) {
         appendCanonical(out, child);
+    }
     out += std::string("</") + node.name() + ">\n";
 }
 
@@ -188,17 +207,20 @@ std::string vectorsFolder()
 std::vector<WireCase> loadWireCases()
 {
     std::vector<WireCase> cases;
-    if (vectorsFolder().empty())
+    if (vectorsFolder().empty()) {
         return cases;
+    }
     for (const auto& entry : std::filesystem::directory_iterator(vectorsFolder() + "/wire")) {
-        if (!entry.is_directory() || entry.path().filename().string().rfind("http-", 0) == 0)
+        if (!entry.is_directory() || entry.path().filename().string().rfind("http-", 0) == 0) {
             continue;
+        }
         WireCase wireCase;
         wireCase.name = entry.path().filename();
         const std::string request = readFile(entry.path() / "request.http");
         const std::size_t headEnd = request.find("\r\n\r\n");
-        if (headEnd == std::string::npos)
+        if (headEnd == std::string::npos) {
             continue;
+        }
         wireCase.request.head = request.substr(0, headEnd + 2);
         wireCase.request.body = request.substr(headEnd + 4);
         wireCase.response = readFile(entry.path() / "response.http");
@@ -225,8 +247,9 @@ std::string replayCall(const WireCase& wireCase, std::uint16_t port, unsigned ti
 std::string canonicalXml(const std::string& xml)
 {
     pugi::xml_document document;
-    if (!document.load_buffer(xml.data(), xml.size()))
+    if (!document.load_buffer(xml.data(), xml.size())) {
         return "not XML: " + xml;
+    }
     std::string out;
     appendCanonical(out, document.document_element());
     return out;

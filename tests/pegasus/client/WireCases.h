@@ -1,34 +1,31 @@
-#ifndef TESTS_PEGASUS_CLIENT_WIRECASES_H
-#define TESTS_PEGASUS_CLIENT_WIRECASES_H
+#pragma once
 
-#include "support/ScriptedPeer.h"
+#include "tests/support/ScriptedPeer.h"
 
 #include <string>
 #include <vector>
 
 namespace test {
 
-/// One recorded exchange of the real library, and what its client printed.
+// One recorded exchange of the real library, and what its client printed.
 struct WireCase
 {
     std::string name;
     PeerRequest request;
-    std::string response; ///< as sent
-    std::string printed;  ///< the result or "EXC class ..."; cut off at some length; empty when nothing was noted
+    std::string response; // as sent
+    std::string printed;  // the result or "EXC class ..."; cut off at some length; empty when nothing was noted
 };
 
-/// The cases in the folder that were recorded from a client call. Empty when no folder was configured.
+// The cases in the folder that were recorded from a client call. Empty when no folder was configured.
 std::vector<WireCase> loadWireCases();
-/// The folder given to CMake; empty when none was.
+// The folder given to CMake; empty when none was.
 std::string vectorsFolder();
 
-/// Makes the recorded call with a client that is connected to `port` and prints the result as the recording did.
-/// Returns: "unsupported" for an operation that this library has not.
+// Makes the recorded call with a client that is connected to `port` and prints the result as the recording did.
+// Returns: "unsupported" for an operation that this library has not.
 std::string replayCall(const WireCase& wireCase, std::uint16_t port, unsigned timeoutMs);
 
-/// XML without what makes no difference: order of attributes, blanks between elements.
+// XML without what makes no difference: order of attributes, blanks between elements.
 std::string canonicalXml(const std::string& xml);
 
 } // namespace test
-
-#endif

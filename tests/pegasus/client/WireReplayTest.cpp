@@ -1,7 +1,7 @@
 // Every recorded exchange once more: the recorded answer to the same call gives what the real client made of it, and
 // our request is the one that it sent.
-#include "WireCases.h"
-#include "support/PeerAnswers.h"
+#include "tests/pegasus/client/WireCases.h"
+#include "tests/support/PeerAnswers.h"
 
 #include <gtest/gtest.h>
 
@@ -12,19 +12,19 @@ namespace {
 
 using test::WireCase;
 
-/// Longer outputs were cut off when they were noted.
+// Longer outputs were cut off when they were noted.
 constexpr std::size_t kCutBytes = 650;
 constexpr unsigned kTimeoutMs = 10000;
-/// For the peers that do not answer in time.
+// For the peers that do not answer in time.
 constexpr unsigned kShortTimeoutMs = 300;
 
 struct Deviation
 {
-    const char* begins; ///< what we give instead
+    const char* begins; // what we give instead
     const char* reason;
 };
 
-/// Where the real client's result is a fault that is not worth keeping.
+// Where the real client's result is a fault that is not worth keeping.
 const std::map<std::string, Deviation>& deviations()
 {
     static const std::map<std::string, Deviation> table = {
@@ -46,22 +46,25 @@ const std::map<std::string, Deviation>& deviations()
 std::string withoutTiming(std::string printed)
 {
     const std::size_t after = printed.rfind(" after ");
-    if (after != std::string::npos && printed.find_first_not_of("0123456789.s\n", after + 7) == std::string::npos)
+    if (after != std::string::npos && printed.find_first_not_of("0123456789.s\n", after + 7) == std::string::npos) {
         printed.erase(after);
-    while (!printed.empty() && (printed.back() == ' ' || printed.back() == '\n'))
+    }
+    while (!printed.empty() && (printed.back() == ' ' || printed.back() == '\n')) {
         printed.pop_back();
+    }
     return printed;
 }
 
 std::string onOneLine(const std::string& result)
 {
     std::string out;
-    for (const char c : result)
+    for (const char c : result) {
         out += c == '\n' ? std::string(" | ") : std::string(1, c);
+    }
     return withoutTiming(out);
 }
 
-/// Blanks are not compared: the notes have runs of them folded in places.
+// Blanks are not compared: the notes have runs of them folded in places.
 std::string withoutBlanks(std::string text)
 {
     text.erase(std::remove_if(text.begin(), text.end(), [](char c) { return c == ' ' || c == '|' || c == '\n'; }),
@@ -69,7 +72,7 @@ std::string withoutBlanks(std::string text)
     return text;
 }
 
-/// The wording of complaints about XML is our own; the class is not.
+// The wording of complaints about XML is our own; the class is not.
 std::string comparable(const std::string& text)
 {
     const std::string xmlException = "EXC Pegasus::CIMClientXmlException";
@@ -87,13 +90,14 @@ void expectPrinted(const WireCase& wireCase, const std::string& result)
     const std::string actual = comparable(onOneLine(result));
     // Of a thousand instances only their number was noted.
     const bool isWhole = wireCase.printed.size() < kCutBytes && wireCase.name != "enuminst-bulk1000";
-    if (isWhole)
+    if (isWhole) {
         EXPECT_EQ(actual, expected);
-    else
+    } else {
         EXPECT_EQ(actual.substr(0, expected.size()), expected);
+    }
 }
 
-/// Only for this file's own recordings: sizes and chunks are well formed.
+// Only for this file's own recordings: sizes and chunks are well formed.
 std::string unchunked(const std::string& response)
 {
     std::string body;
@@ -107,25 +111,31 @@ std::string unchunked(const std::string& response)
     return body;
 }
 
-/// The recorded answer with the id of the request that it answers now.
+// The recorded answer with the id of the request that it answers now.
 test::PeerAnswer recordedAnswer(const WireCase& wireCase, const test::PeerRequest& request)
 {
     test::PeerAnswer answer;
     answer.bytes = wireCase.response;
     if (wireCase.name == "fault-chunk-many") // its chunks cut the id in two
+    {
         answer = test::chunkedAnswer(unchunked(wireCase.response), 1 << 20);
+    }
     const std::string recordedId = "MESSAGE ID=\"" + wireCase.request.messageId() + "\"";
     const std::size_t id = answer.bytes.find(recordedId);
-    if (id != std::string::npos)
+    if (id != std::string::npos) {
         answer.bytes.replace(id, recordedId.size(), "MESSAGE ID=\"" + request.messageId() + "\"");
-    if (wireCase.name == "fault-chunk-many")
+    }
+    if (wireCase.name == "fault-chunk-many") {
         answer = test::chunkedAnswer(unchunked(answer.bytes), 7);
+    }
     answer.closesAfterwards = true;
     answer.neverAnswers = answer.bytes.empty() && wireCase.name == "fault-silent";
-    if (wireCase.name == "fault-drip")
+    if (wireCase.name == "fault-drip") {
         answer = test::inPieces(answer, 1, std::chrono::milliseconds(20));
-    if (wireCase.name == "fault-400-nolength-hold")
+    }
+    if (wireCase.name == "fault-400-nolength-hold") {
         answer.closesAfterwards = false;
+    }
     return answer;
 }
 
@@ -138,8 +148,9 @@ std::string withoutId(const test::PeerRequest& request)
 
 void expectSameRequest(const test::PeerRequest& sent, const test::PeerRequest& recorded)
 {
-    for (const char* field : {"CIMOperation", "CIMMethod", "CIMObject", "Content-Type", "TE"})
+    for (const char* field : {"CIMOperation", "CIMMethod", "CIMObject", "Content-Type", "TE"}) {
         EXPECT_EQ(sent.header(field), recorded.header(field));
+    }
     EXPECT_EQ(test::canonicalXml(withoutId(sent)), test::canonicalXml(withoutId(recorded)));
 }
 
@@ -164,8 +175,9 @@ std::string withRecordedId(const std::string& result, const WireCase& wireCase,
 TEST(WireReplay, EveryRecordedExchangeGivesTheRecordedResult)
 {
     const std::vector<WireCase> cases = test::loadWireCases();
-    if (cases.empty())
+    if (cases.empty()) {
         GTEST_SKIP() << "no recorded exchanges: configure with -DVRX_VECTORS_DIR=<folder>";
+    }
     std::size_t passed = 0;
     std::size_t replayed = 0;
     std::size_t unsupported = 0;
@@ -183,8 +195,9 @@ TEST(WireReplay, EveryRecordedExchangeGivesTheRecordedResult)
         const std::vector<test::PeerRequest> requests = peer.requests();
         ASSERT_FALSE(requests.empty()) << result;
         expectSameRequest(requests.front(), wireCase.request);
-        if (!wireCase.printed.empty())
+        if (!wireCase.printed.empty()) {
             expectPrinted(wireCase, withRecordedId(result, wireCase, requests));
+        }
         passed += failureCount() == failuresBefore ? 1 : 0;
     }
     std::printf(

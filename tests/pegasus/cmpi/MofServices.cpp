@@ -1,4 +1,4 @@
-#include "pegasus/cmpi/MofServices.h"
+#include "tests/pegasus/cmpi/MofServices.h"
 
 #include "pegasus/mof/Compiler.h"
 
@@ -47,8 +47,9 @@ ProviderRequest MofServices::request(const std::string& provider)
 
 void MofServices::requireNameSpace(const CIMNamespaceName& nameSpace) const
 {
-    if (!nameSpace.equal(CIMNamespaceName(kNameSpace)))
+    if (!nameSpace.equal(CIMNamespaceName(kNameSpace))) {
         throw CIMException(CIM_ERR_INVALID_NAMESPACE, nameSpace.getString());
+    }
 }
 
 CIMClass MofServices::getClass(const CIMNamespaceName& nameSpace, const CIMName& className)
@@ -57,8 +58,9 @@ CIMClass MofServices::getClass(const CIMNamespaceName& nameSpace, const CIMName&
     const std::lock_guard lock(fMutex);
     ++fClassCount;
     CIMClass found;
-    if (!fDefinitions.findClass(className, found))
+    if (!fDefinitions.findClass(className, found)) {
         throw CIMException(CIM_ERR_NOT_FOUND, className.getString());
+    }
     return found;
 }
 
@@ -74,8 +76,9 @@ Array<CIMInstance> MofServices::enumerateInstances(const CIMNamespaceName& nameS
 {
     requireNameSpace(nameSpace);
     CIMClass known;
-    if (!fDefinitions.findClass(className, known))
+    if (!fDefinitions.findClass(className, known)) {
         throw CIMException(CIM_ERR_INVALID_CLASS, className.getString());
+    }
     Array<CIMInstance> found;
     fModule->enumerateInstances(request(fProvider), className, properties,
                                 [&](const CIMInstance& instance) { found.append(instance); });
@@ -124,8 +127,9 @@ std::string text(const String& string)
 std::string propertyText(const CIMInstance& instance, const char* name)
 {
     const Uint32 at = instance.findProperty(CIMName(name));
-    if (at == PEG_NOT_FOUND)
+    if (at == PEG_NOT_FOUND) {
         return "<none>";
+    }
     const CIMValue value = instance.getProperty(at).getValue();
     return value.isNull() ? "<null>" : text(value.toString());
 }

@@ -1,4 +1,4 @@
-#include "pegasus/cmpi/MofServices.h"
+#include "tests/pegasus/cmpi/MofServices.h"
 
 #include <Pegasus/Common/CIMProperty.h>
 #include <Pegasus/Common/Exception.h>
@@ -6,11 +6,11 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <dlfcn.h>
-
 #include <atomic>
 #include <memory>
 #include <thread>
+
+#include <dlfcn.h>
 
 #define FAULT_LIBRARY(fault) FAULT_LIBRARY_PREFIX #fault ".so"
 
@@ -86,8 +86,9 @@ std::vector<std::string> checkNames()
     Array<String> names;
     out[0].getValue().get(names);
     std::vector<std::string> result;
-    for (Uint32 i = 0; i < names.size(); ++i)
+    for (Uint32 i = 0; i < names.size(); ++i) {
         result.push_back(text(names[i]));
+    }
     return result;
 }
 
@@ -196,8 +197,9 @@ TEST_F(Module, SinkMayEndTheEnumeration)
     setMode("count 5000");
     int delivered = 0;
     const auto sink = [&](const CIMInstance&) {
-        if (++delivered == 2)
+        if (++delivered == 2) {
             throw std::runtime_error("the client is gone");
+        }
     };
     EXPECT_THROW(module->enumerateInstances(request(), CIMName("TST_Item"), CIMPropertyList(), sink),
                  std::runtime_error);
@@ -269,8 +271,9 @@ TEST_F(Module, MethodWithoutResultFails)
 TEST_F(Module, UnknownPropertyIsLoggedOnce)
 {
     load();
-    for (int i = 0; i < 2; ++i)
+    for (int i = 0; i < 2; ++i) {
         invoke("Run", "Name", CIMValue(String("unknown and mistyped properties")));
+    }
     EXPECT_THAT(services.logged(), ElementsAre("setProperty: class TST_Everything has no property Nope"));
 }
 
@@ -329,18 +332,22 @@ TEST_F(Module, ServesSixteenClientsAndNeverCleansUpMeanwhile)
     std::atomic<int> wrong{0};
     std::atomic<int> running{16};
     std::vector<std::thread> clients;
-    for (int i = 0; i < 16; ++i)
+    for (int i = 0; i < 16; ++i) {
         clients.emplace_back([&] {
-            for (int round = 0; round < 20; ++round)
+            for (int round = 0; round < 20; ++round) {
                 wrong += items().size() != 20;
+            }
             --running;
         });
+    }
     std::thread cleaner([&] {
-        while (running > 0)
+        while (running > 0) {
             module->cleanupWhenIdle();
+        }
     });
-    for (std::thread& client : clients)
+    for (std::thread& client : clients) {
         client.join();
+    }
     cleaner.join();
     EXPECT_EQ(wrong, 0);
     Array<CIMParamValue> out;

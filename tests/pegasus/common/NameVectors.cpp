@@ -1,4 +1,4 @@
-#include "VectorTable.h"
+#include "tests/pegasus/common/VectorTable.h"
 
 #include <algorithm>
 

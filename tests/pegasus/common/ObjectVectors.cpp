@@ -1,9 +1,10 @@
-#include "VectorTable.h"
+#include "tests/pegasus/common/VectorTable.h"
 
 #include <Pegasus/Client/CIMClient.h>
 
-#include <cxxabi.h>
 #include <memory>
+
+#include <cxxabi.h>
 
 using namespace Pegasus;
 
@@ -12,7 +13,7 @@ namespace {
 
 constexpr const char* kDone = "no exception";
 
-/// A call on a default-constructed object.
+// A call on a default-constructed object.
 template <class T, class Call> Evaluator on(Call call)
 {
     return [call](const Vector&) {
@@ -262,8 +263,9 @@ void addRest(VectorTable& table)
     table["obj.cast.bad2"] = [](const Vector&) { return CIMClass(CIMObject(CIMInstance("Foo"))).isUninitialized(); };
     const auto names = [](std::initializer_list<const char*> list) {
         Array<CIMName> array;
-        for (const char* name : list)
+        for (const char* name : list) {
             array.append(name);
+        }
         return CIMPropertyList(array);
     };
     table["pl.null"] = [](const Vector&) { return json{CIMPropertyList().isNull(), CIMPropertyList().size()}; };

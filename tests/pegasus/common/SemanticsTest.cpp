@@ -1,12 +1,14 @@
 // The recorded answers of the real library: names, paths, values, date-times, objects, exceptions and their texts.
-#include "VectorTable.h"
+#include "tests/pegasus/common/VectorTable.h"
 
 #include <Pegasus/Common/Exception.h>
 
-#include <cxxabi.h>
-#include <fstream>
 #include <gtest/gtest.h>
+
+#include <fstream>
 #include <memory>
+
+#include <cxxabi.h>
 
 using namespace Pegasus;
 
@@ -75,7 +77,7 @@ json describe(const CIMDateTime& dateTime)
 
 namespace {
 
-/// Real answers that are faults and not kept.
+// Real answers that are faults and not kept.
 const std::map<std::string, const char*>& notImitated()
 {
     static const std::map<std::string, const char*> table = {
@@ -99,13 +101,14 @@ VectorTable allEvaluators()
     return table;
 }
 
-/// By the whole id, else by its longest beginning.
+// By the whole id, else by its longest beginning.
 const Evaluator* findEvaluator(const VectorTable& table, const std::string& id)
 {
     for (std::string key = id; !key.empty();) {
         const auto found = table.find(key);
-        if (found != table.end())
+        if (found != table.end()) {
             return &found->second;
+        }
         key.pop_back();
         key.erase(key.find_last_of('.') + 1);
     }
@@ -120,8 +123,9 @@ json evaluate(const Evaluator& evaluator, const Vector& vector)
         const std::unique_ptr<char, decltype(&std::free)> name(
             abi::__cxa_demangle(typeid(exception).name(), nullptr, nullptr, nullptr), &std::free);
         json result = {{"throws", name.get()}, {"message", utf8(exception.getMessage())}};
-        if (const auto* status = dynamic_cast<const CIMException*>(&exception))
+        if (const auto* status = dynamic_cast<const CIMException*>(&exception)) {
             result["code"] = int(status->getCode());
+        }
         return result;
     }
 }
@@ -131,15 +135,17 @@ json evaluate(const Evaluator& evaluator, const Vector& vector)
 TEST(Semantics, EveryRecordedAnswerIsGivenHereToo)
 {
     const std::string folder = VRX_VECTORS_DIR;
-    if (folder.empty())
+    if (folder.empty()) {
         GTEST_SKIP() << "no recorded answers: configure with -DVRX_VECTORS_DIR=<folder>";
+    }
     const json vectors = json::parse(std::ifstream(folder + "/semantics.json"));
     const VectorTable table = allEvaluators();
     std::size_t passed = 0;
     for (const json& entry : vectors) {
         const Vector vector{entry.at("id"), entry.at("input")};
-        if (notImitated().count(vector.id))
+        if (notImitated().count(vector.id)) {
             continue;
+        }
         const Evaluator* evaluator = findEvaluator(table, vector.id);
         if (!evaluator) {
             ADD_FAILURE() << "no evaluator for " << vector.id << ": " << vector.input;

@@ -1,4 +1,4 @@
-#include "VectorTable.h"
+#include "tests/pegasus/common/VectorTable.h"
 
 #include <Pegasus/Client/CIMClient.h>
 
@@ -37,7 +37,7 @@ std::string hex(const std::string& bytes)
     return out;
 }
 
-/// Of both kinds of index: that of a string that may be changed, and that of one that may not.
+// Of both kinds of index: that of a string that may be changed, and that of one that may not.
 json unitAt(Uint32 index)
 {
     String text("abc");
@@ -247,7 +247,7 @@ const std::map<std::string, CIMScope>& scopes()
     return table;
 }
 
-/// The word before the last one in an id.
+// The word before the last one in an id.
 std::string firstOperand(const Vector& vector)
 {
     const std::string head = vector.id.substr(0, vector.id.rfind('.'));
@@ -290,8 +290,9 @@ void addFlagVectors(VectorTable& table)
     table["scope.all7"] = [](const Vector&) {
         CIMScope all;
         for (const auto& [name, scope] : scopes()) {
-            if (name != "ANY")
+            if (name != "ANY") {
                 all.addScope(scope);
+            }
         }
         return json{utf8(all.toString()), all.equal(CIMScope::ANY), all.hasScope(CIMScope::ANY)};
     };
@@ -302,8 +303,9 @@ void addFlagVectors(VectorTable& table)
     table["scope.six"] = [](const Vector&) {
         CIMScope six;
         for (const auto& [name, scope] : scopes()) {
-            if (name != "ANY" && name != "PARAMETER")
+            if (name != "ANY" && name != "PARAMETER") {
                 six.addScope(scope);
+            }
         }
         return utf8(six.toString());
     };

@@ -1,4 +1,4 @@
-#include "VectorTable.h"
+#include "tests/pegasus/common/VectorTable.h"
 
 #include <cmath>
 #include <limits>
@@ -23,7 +23,7 @@ Evaluator equals(const CIMValue& x, const CIMValue& y)
     return [=](const Vector&) { return x == y; };
 }
 
-/// "Real64(1.5)"
+// "Real64(1.5)"
 double realIn(const Vector& vector)
 {
     return std::strtod(vector.input.c_str() + vector.input.find('(') + 1, nullptr);
@@ -34,7 +34,7 @@ json typedNull(const Vector& vector, bool isArray)
     return describe(CIMValue(CIMType(std::stoi(vector.lastWord())), isArray));
 }
 
-/// The values that get() is tried on; each number is 1.
+// The values that get() is tried on; each number is 1.
 const std::map<std::string, CIMValue>& kinds()
 {
     static const std::map<std::string, CIMValue> table = {
@@ -56,7 +56,7 @@ const std::map<std::string, CIMValue>& kinds()
     return table;
 }
 
-/// get() into a variable that holds `before`.
+// get() into a variable that holds `before`.
 template <class T> T got(const CIMValue& value, T before)
 {
     value.get(before);
@@ -65,24 +65,33 @@ template <class T> T got(const CIMValue& value, T before)
 
 json getAs(const CIMValue& value, const std::string& type)
 {
-    if (type == "Boolean")
+    if (type == "Boolean") {
         return got(value, false);
-    if (type == "Uint8")
+    }
+    if (type == "Uint8") {
         return got(value, Uint8(77));
-    if (type == "Uint16")
+    }
+    if (type == "Uint16") {
         return got(value, Uint16(77));
-    if (type == "Uint32")
+    }
+    if (type == "Uint32") {
         return got(value, Uint32(77));
-    if (type == "Sint32")
+    }
+    if (type == "Sint32") {
         return got(value, Sint32(77));
-    if (type == "String")
+    }
+    if (type == "String") {
         return utf8(got(value, String("unset")));
-    if (type == "CIMDateTime")
+    }
+    if (type == "CIMDateTime") {
         return utf8(got(value, CIMDateTime()).toString());
-    if (type == "CIMObjectPath")
+    }
+    if (type == "CIMObjectPath") {
         return utf8(got(value, CIMObjectPath()).toString());
-    if (type == "ArrayUint8")
+    }
+    if (type == "ArrayUint8") {
         return got(value, Array<Uint8>(1, 77)).size();
+    }
     return got(value, Array<String>(1, String("unset"))).size();
 }
 
@@ -164,7 +173,7 @@ void addComparisons(VectorTable& table)
     };
 }
 
-/// A value that is changed by `change`.
+// A value that is changed by `change`.
 template <class Change> Evaluator changed(const CIMValue& before, Change change)
 {
     return [=](const Vector&) {

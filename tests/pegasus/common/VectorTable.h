@@ -1,30 +1,30 @@
-#ifndef TESTS_PEGASUS_COMMON_VECTORTABLE_H
-#define TESTS_PEGASUS_COMMON_VECTORTABLE_H
+#pragma once
 
 #include <Pegasus/Common/CIMObject.h>
 
+#include <nlohmann/json.hpp>
+
 #include <functional>
 #include <map>
-#include <nlohmann/json.hpp>
 #include <string>
 
 namespace test {
 
 using nlohmann::json;
 
-/// One recorded answer of the real library.
+// One recorded answer of the real library.
 struct Vector
 {
     std::string id;
     std::string input;
 
-    /// The text in quotes in the input, its escapes resolved.
+    // The text in quotes in the input, its escapes resolved.
     std::string quoted() const;
-    /// The id behind its last dot.
+    // The id behind its last dot.
     std::string lastWord() const;
 };
 
-/// What computes the same here. A name stands for the vector of that id; one that ends in a dot for all that begin so.
+// What computes the same here. A name stands for the vector of that id; one that ends in a dot for all that begin so.
 using Evaluator = std::function<json(const Vector&)>;
 using VectorTable = std::map<std::string, Evaluator>;
 
@@ -44,5 +44,3 @@ json describe(const Pegasus::CIMObjectPath& path);
 json describe(const Pegasus::CIMDateTime& dateTime);
 
 } // namespace test
-
-#endif

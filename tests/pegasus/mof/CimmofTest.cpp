@@ -1,13 +1,14 @@
-#include "pegasus/mof/TemporaryDirectory.h"
 #include "pegasus/repository/Repository.h"
-#include "support/PrivateServer.h"
+#include "tests/pegasus/mof/TemporaryDirectory.h"
+#include "tests/support/PrivateServer.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
 
 #include <climits>
 #include <random>
 #include <thread>
 
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
 #include <poll.h>
 #include <sys/inotify.h>
 #include <unistd.h>
@@ -20,7 +21,7 @@ namespace {
 
 const char* const kKey = "Qualifier Key : boolean = false, Scope(property, reference), Flavor(DisableOverride);\n";
 
-/// One server for all tests of the program.
+// One server for all tests of the program.
 class Cimmof : public testing::Test
 {
   protected:
@@ -31,7 +32,7 @@ class Cimmof : public testing::Test
     }
     static void TearDownTestSuite() { server.reset(); }
 
-    /// Compiles a text as "t.mof" into a namespace.
+    // Compiles a text as "t.mof" into a namespace.
     ProgramResult compile(const std::string& nameSpace, const std::string& text) const
     {
         return server->run("cimmof", {"-n", nameSpace, "-aE", directory.write("t.mof", text)});
@@ -41,7 +42,7 @@ class Cimmof : public testing::Test
     static std::unique_ptr<PrivateServer> server;
 };
 
-/// Counts writes into the files of a directory. A burst that nobody has read yet may count as one.
+// Counts writes into the files of a directory. A burst that nobody has read yet may count as one.
 class WriteCounter
 {
   public:
@@ -53,14 +54,16 @@ class WriteCounter
     WriteCounter(const WriteCounter&) = delete;
     WriteCounter& operator=(const WriteCounter&) = delete;
 
-    /// Returns: false if so many do not come.
+    // Returns: false if so many do not come.
     bool waitFor(unsigned count)
     {
         pollfd wait = {fWatch, POLLIN, 0};
         alignas(inotify_event) char event[sizeof(inotify_event) + NAME_MAX + 1];
-        for (unsigned seen = 0; seen < count; ++seen)
-            if (::poll(&wait, 1, 20000) != 1 || ::read(fWatch, event, sizeof event) <= 0)
+        for (unsigned seen = 0; seen < count; ++seen) {
+            if (::poll(&wait, 1, 20000) != 1 || ::read(fWatch, event, sizeof event) <= 0) {
                 return false;
+            }
+        }
         return true;
     }
 
@@ -81,7 +84,7 @@ TEST_F(Cimmof, AnswersTheCommandLineAsOpenPegasusDoes)
         const char* name;
         std::vector<std::string> arguments;
         int exitStatus;
-        std::string out; ///< a part of it; "" nothing at all
+        std::string out; // a part of it; "" nothing at all
         std::string err;
     };
     const Row rows[] = {
@@ -122,7 +125,7 @@ TEST_F(Cimmof, SaysWhatTheServerRefused)
     {
         const char* name;
         const char* text;
-        const char* error; ///< behind the file name
+        const char* error; // behind the file name
     };
     const Row rows[] = {
         {"superclass", "class S1 : NoSuper {};",
@@ -150,7 +153,7 @@ TEST_F(Cimmof, SaysWhatTheServerRefused)
     }
 }
 
-/// A registration refers to the base schema; the server itself answers for it.
+// A registration refers to the base schema; the server itself answers for it.
 TEST_F(Cimmof, RegistersAProviderOverTheBaseSchemas)
 {
     for (const char* schema : {"PG_Internal", "PG_InterOp"}) {
@@ -179,15 +182,17 @@ TEST_F(Cimmof, RegistersAProviderOverTheBaseSchemas)
 TEST_F(Cimmof, LetsTwoCompilersWorkAtOnce)
 {
     std::string text = kKey;
-    for (int i = 0; i < 40; ++i)
+    for (int i = 0; i < 40; ++i) {
         text += "class Two" + std::to_string(i) + " { [Key] string id; };\n";
+    }
     const std::string file = directory.write("two.mof", text);
     ProgramResult results[2];
     std::thread other([&] { results[1] = server->run("cimmof", {"-n", "root/two", file}); });
     results[0] = server->run("cimmof", {"-n", "root/two", file});
     other.join();
-    for (const ProgramResult& result : results)
+    for (const ProgramResult& result : results) {
         EXPECT_EQ(result.exitStatus, 0) << result.err;
+    }
     EXPECT_THAT(server->run("cimmof", {"-n", "root/two", file}).err, testing::HasSubstr("Class Two39 already exists"));
 }
 
@@ -200,15 +205,16 @@ TEST(CimmofAlone, SaysThatThereIsNoServer)
     EXPECT_EQ(result.err, "Cannot connect to CIM Server. The CIM Server may not be running.\n");
 }
 
-/// The server dies in the middle of a compilation: the compiler says so and ends, and what the server had stored is
-/// whole and can be compiled over.
+// The server dies in the middle of a compilation: the compiler says so and ends, and what the server had stored is
+// whole and can be compiled over.
 TEST(CimmofAlone, LeavesAWholeRepositoryWhenTheServerIsKilled)
 {
     constexpr int kRounds = 4;
     std::string text = kKey;
-    for (int i = 0; i < 3000; ++i)
+    for (int i = 0; i < 3000; ++i) {
         text += "class K" + std::to_string(i) + (i < 10 ? "" : " : K" + std::to_string(i / 10)) + " { string p" +
                 std::to_string(i) + "; };\n";
+    }
     const TemporaryDirectory directory;
     const std::string file = directory.write("many.mof", text);
     const unsigned seed = std::random_device()();
@@ -235,8 +241,9 @@ TEST(CimmofAlone, LeavesAWholeRepositoryWhenTheServerIsKilled)
         const auto names = repository.enumerateClassNames(nameSpace, Pegasus::CIMName(), true);
         EXPECT_GE(names.size(), before) << "an acknowledged class is gone";
         before = names.size();
-        for (std::size_t i = 0; i < names.size(); ++i)
+        for (std::size_t i = 0; i < names.size(); ++i) {
             EXPECT_TRUE(names[i].equal(Pegasus::CIMName(("K" + std::to_string(i)).c_str()))) << i;
+        }
         EXPECT_EQ(repository.enumerateClasses(nameSpace, Pegasus::CIMName(), true, {false, true, true, {}}).size(),
                   before);
     }

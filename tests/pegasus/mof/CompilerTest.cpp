@@ -1,6 +1,7 @@
 #include "pegasus/mof/Compiler.h"
-#include "pegasus/mof/Describe.h"
+
 #include "pegasus/mof/MemoryHandler.h"
+#include "tests/pegasus/mof/Describe.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -12,7 +13,7 @@ using mof_test::utf8;
 
 namespace {
 
-/// Declarations that every case can use; on one line, so that a case's own lines start at 2.
+// Declarations that every case can use; on one line, so that a case's own lines start at 2.
 const std::string kQualifiers =
     "Qualifier Key : boolean = false, Scope(property, reference), Flavor(DisableOverride, ToSubclass);"
     "Qualifier Association : boolean = false, Scope(association), Flavor(DisableOverride, ToSubclass);"
@@ -36,7 +37,7 @@ MemoryHandler compile(const std::string& text, const CompileOptions& with = opti
     return handler;
 }
 
-/// What went wrong, as "line:column: cause"; empty if nothing did.
+// What went wrong, as "line:column: cause"; empty if nothing did.
 std::string failureOf(const std::string& text, const CompileOptions& with = options())
 {
     try {
@@ -52,8 +53,8 @@ std::string failureOf(const std::string& text, const CompileOptions& with = opti
 struct LiteralCase
 {
     const char* name;
-    const char* declaration; ///< of the property p with its default
-    const char* expected;    ///< type and value, or the failure
+    const char* declaration; // of the property p with its default
+    const char* expected;    // type and value, or the failure
 };
 
 void PrintTo(const LiteralCase& row, std::ostream* out)
@@ -170,8 +171,9 @@ TEST(Compiler, ReadsQualifierDeclarations)
         {"flavorFirst", "Qualifier Q : uint8, Flavor(ToInstance, Translatable), Scope(reference);",
          "qualifier Q uint8=null scope(REFERENCE) flavor(OVERRIDABLE TOSUBCLASS TOINSTANCE TRANSLATABLE)"},
     };
-    for (const Row& row : rows)
+    for (const Row& row : rows) {
         EXPECT_EQ(describe(compile(row.text).qualifiers().at("q")), row.expected) << row.name;
+    }
 }
 
 TEST(Compiler, GivesInstancesTheTypesOfTheirClass)
@@ -181,7 +183,7 @@ TEST(Compiler, GivesInstancesTheTypesOfTheirClass)
     EXPECT_EQ(describe(handler.instances().at(0)), "instance B { uint8[] n=<1 2 >; string id=<one>; real32 r=null; }");
 }
 
-/// Each row: instances whose references use aliases before they exist; the values that must come out.
+// Each row: instances whose references use aliases before they exist; the values that must come out.
 TEST(Compiler, ResolvesAliasesInAnyOrder)
 {
     const std::string schema = "class A { [Key] string id; A ref next; }; "
@@ -215,8 +217,9 @@ TEST(Compiler, ResolvesAliasesInAnyOrder)
     for (const Row& row : rows) {
         std::vector<std::string> got;
         const MemoryHandler handler = compile(schema + row.text);
-        for (const CIMInstance& instance : handler.instances())
+        for (const CIMInstance& instance : handler.instances()) {
             got.push_back(describe(instance));
+        }
         EXPECT_THAT(got, testing::ElementsAreArray(row.expected)) << row.name;
     }
 }
@@ -235,7 +238,7 @@ TEST(Compiler, DeliversEverythingInFrontOfTheFirstError)
     }
 }
 
-/// Cut anywhere, a text must end in an error inside of it or in the definitions that are whole.
+// Cut anywhere, a text must end in an error inside of it or in the definitions that are whole.
 TEST(Compiler, SurvivesATextCutAtEveryLength)
 {
     const std::string text =
@@ -260,7 +263,7 @@ TEST(Compiler, NamesTheLimitThatATextExceeds)
         const char* name;
         std::string text;
         void (*tighten)(Limits&);
-        const char* within; ///< a text that the same limit lets through
+        const char* within; // a text that the same limit lets through
     };
     const Row rows[] = {
         {"tokenBytes", "class Abcdefghijklmnop {};", [](Limits& l) { l.tokenBytes = 15; }, "class Abcdefghijklmno {};"},

@@ -1,4 +1,4 @@
-#include "pegasus/mof/Describe.h"
+#include "tests/pegasus/mof/Describe.h"
 
 using namespace Pegasus;
 
@@ -9,8 +9,9 @@ namespace {
 std::string typeText(CIMType type, bool isArray, Uint32 arraySize, const CIMName& referenceClass)
 {
     std::string text = type == CIMTYPE_REFERENCE ? utf8(referenceClass.getString()) + " ref" : cimTypeToString(type);
-    if (isArray)
+    if (isArray) {
         text += "[" + (arraySize ? std::to_string(arraySize) : std::string()) + "]";
+    }
     return text;
 }
 
@@ -68,8 +69,9 @@ std::string describe(const CIMConstMethod& method)
     std::string text = propagatedText(method.getPropagated()) + qualifiersText(method) +
                        cimTypeToString(method.getType()) + " " + utf8(method.getName().getString()) +
                        originText(method.getClassOrigin()) + "(";
-    for (Uint32 i = 0; i < method.getParameterCount(); ++i)
+    for (Uint32 i = 0; i < method.getParameterCount(); ++i) {
         text += (i == 0 ? "" : ", ") + describe(method.getParameter(i));
+    }
     return text + "); ";
 }
 
@@ -91,21 +93,25 @@ std::string describe(const CIMConstQualifierDecl& declaration)
 std::string describe(const CIMConstClass& cimClass)
 {
     std::string text = qualifiersText(cimClass) + "class " + utf8(cimClass.getClassName().getString());
-    if (!cimClass.getSuperClassName().isNull())
+    if (!cimClass.getSuperClassName().isNull()) {
         text += " : " + utf8(cimClass.getSuperClassName().getString());
+    }
     text += " { ";
-    for (Uint32 i = 0; i < cimClass.getPropertyCount(); ++i)
+    for (Uint32 i = 0; i < cimClass.getPropertyCount(); ++i) {
         text += describe(cimClass.getProperty(i));
-    for (Uint32 i = 0; i < cimClass.getMethodCount(); ++i)
+    }
+    for (Uint32 i = 0; i < cimClass.getMethodCount(); ++i) {
         text += describe(cimClass.getMethod(i));
+    }
     return text + "}";
 }
 
 std::string describe(const CIMConstInstance& instance)
 {
     std::string text = "instance " + utf8(instance.getClassName().getString()) + " { ";
-    for (Uint32 i = 0; i < instance.getPropertyCount(); ++i)
+    for (Uint32 i = 0; i < instance.getPropertyCount(); ++i) {
         text += describe(instance.getProperty(i));
+    }
     return text + "}";
 }
 

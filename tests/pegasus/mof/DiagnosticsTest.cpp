@@ -1,17 +1,17 @@
 #include "pegasus/mof/Compiler.h"
 #include "pegasus/mof/MemoryHandler.h"
 
+#include <gtest/gtest.h>
+
 #include <algorithm>
 #include <filesystem>
 #include <fstream>
 #include <sstream>
 #include <vector>
 
-#include <gtest/gtest.h>
-
-/// Each cases/NAME.mof is compiled from within its folder; cases/NAME.expected holds what a user reads: the warnings,
-/// the error with its line and caret, and how much was delivered.
-/// With VRX_UPDATE_GOLDEN set in the environment the files are written instead of compared.
+// Each cases/NAME.mof is compiled from within its folder; cases/NAME.expected holds what a user reads: the warnings,
+// the error with its line and caret, and how much was delivered.
+// With VRX_UPDATE_GOLDEN set in the environment the files are written instead of compared.
 
 using namespace Pegasus::mof;
 
@@ -39,8 +39,9 @@ std::string outcome(const std::string& name)
         diagnostic = error.diagnostic();
     }
     std::ostringstream text;
-    for (const std::string& warning : handler.warnings())
+    for (const std::string& warning : handler.warnings()) {
         text << warning << "\n";
+    }
     text << diagnostic << "delivered: " << handler.qualifiers().size() << " qualifiers, " << handler.classes().size()
          << " classes, " << handler.instances().size() << " instances\n";
     return text.str();
@@ -49,9 +50,11 @@ std::string outcome(const std::string& name)
 std::vector<std::string> caseNames()
 {
     std::vector<std::string> names;
-    for (const auto& entry : std::filesystem::directory_iterator(kCases))
-        if (entry.path().extension() == ".mof")
+    for (const auto& entry : std::filesystem::directory_iterator(kCases)) {
+        if (entry.path().extension() == ".mof") {
             names.push_back(entry.path().stem().string());
+        }
+    }
     std::sort(names.begin(), names.end());
     return names;
 }
@@ -66,8 +69,9 @@ TEST_P(Diagnostics, ReadAsExpected)
 {
     const std::filesystem::path expected = kCases / (GetParam() + ".expected");
     const std::string got = outcome(GetParam() + ".mof");
-    if (std::getenv("VRX_UPDATE_GOLDEN"))
+    if (std::getenv("VRX_UPDATE_GOLDEN")) {
         std::ofstream(expected, std::ios::binary) << got;
+    }
     EXPECT_EQ(got, readFile(expected));
 }
 

@@ -1,7 +1,7 @@
 #include "pegasus/mof/Compiler.h"
-#include "pegasus/mof/Describe.h"
 #include "pegasus/mof/MemoryHandler.h"
-#include "pegasus/mof/TemporaryDirectory.h"
+#include "tests/pegasus/mof/Describe.h"
+#include "tests/pegasus/mof/TemporaryDirectory.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -11,7 +11,7 @@ using mof_test::TemporaryDirectory;
 
 namespace {
 
-/// Goes back to the working directory that the test had.
+// Goes back to the working directory that the test had.
 class WorkingDirectory
 {
   public:
@@ -30,8 +30,9 @@ std::string classesOf(const std::string& file, const CompileOptions& options)
     MemoryHandler handler;
     compileFile(file, options, handler);
     std::string names;
-    for (const Pegasus::CIMClass& found : handler.classes())
+    for (const Pegasus::CIMClass& found : handler.classes()) {
         names += mof_test::utf8(found.getClassName().getString()) + " ";
+    }
     return names;
 }
 

@@ -8,15 +8,16 @@
 
 namespace mof_test {
 
-/// A directory of its own for one test, removed with all it holds.
+// A directory of its own for one test, removed with all it holds.
 class TemporaryDirectory
 {
   public:
     TemporaryDirectory()
     {
         std::string pattern = (std::filesystem::temp_directory_path() / "vrx-mof-XXXXXX").string();
-        if (!::mkdtemp(pattern.data()))
+        if (!::mkdtemp(pattern.data())) {
             throw std::runtime_error("mkdtemp " + pattern);
+        }
         fPath = pattern;
     }
     ~TemporaryDirectory()
@@ -28,7 +29,7 @@ class TemporaryDirectory
     TemporaryDirectory& operator=(const TemporaryDirectory&) = delete;
 
     const std::string& path() const { return fPath; }
-    /// Writes a file, with the folders above it, and returns its path.
+    // Writes a file, with the folders above it, and returns its path.
     std::string write(const std::string& name, const std::string& text) const
     {
         const std::filesystem::path file = std::filesystem::path(fPath) / name;

@@ -1,6 +1,6 @@
-#include "pegasus/mof/Describe.h"
-#include "pegasus/mof/TemporaryDirectory.h"
-#include "pegasus/repository/RepositoryHandler.h"
+#include "tests/pegasus/mof/Describe.h"
+#include "tests/pegasus/mof/TemporaryDirectory.h"
+#include "tests/pegasus/repository/RepositoryHandler.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -25,7 +25,7 @@ const char* const kQualifiers =
     "Qualifier Write : boolean = false, Scope(property), Flavor(DisableOverride, ToSubclass);"
     "Qualifier D : string = null, Scope(any), Flavor(EnableOverride, ToSubclass);";
 
-/// A base, a class that overrides, and one below that adds.
+// A base, a class that overrides, and one below that adds.
 const char* const kClasses = "[Abstract, D(\"base\")] class Base {\n"
                              "  [Key, D(\"id\")] string Id; [Write, D(\"c\")] string Caption = \"none\";\n"
                              "  [D(\"m\")] uint32 M([D(\"p\")] string p, uint8 q); boolean N(); };\n"
@@ -67,7 +67,7 @@ TEST_F(ClassTest, GivesBackWhatTheOptionsAskFor)
     {
         const char* name;
         const char* className;
-        ClassOptions options; ///< localOnly, includeQualifiers, includeClassOrigin, propertyList
+        ClassOptions options; // localOnly, includeQualifiers, includeClassOrigin, propertyList
         std::string expected;
     };
     Array<CIMName> list;
@@ -95,8 +95,9 @@ TEST_F(ClassTest, GivesBackWhatTheOptionsAskFor)
          {false, false, false, CIMPropertyList(Array<CIMName>())},
          "class Base { uint32 M(string p, uint8 q); boolean N(); }"},
     };
-    for (const Row& row : rows)
+    for (const Row& row : rows) {
         EXPECT_EQ(read(row.className, row.options), row.expected) << row.name;
+    }
     // Asked for again, the answer comes from the cache.
     EXPECT_EQ(read("MIDDLE", {false, true, false, {}}), kMiddleWhole);
 }
@@ -106,7 +107,7 @@ TEST_F(ClassTest, RefusesWhatBreaksARuleAndStoresNothingOfIt)
     struct Row
     {
         const char* name;
-        const char* definition; ///< of class X
+        const char* definition; // of class X
         const char* failure;
     };
     const Row rows[] = {
@@ -147,8 +148,9 @@ TEST_F(ClassTest, LetsTheRulesAllowWhatOpenPegasusAllows)
         "class X4 : X3 { Base ref another; };",
         "[Abstract, Association] class X5 {};",
     };
-    for (const char* definition : definitions)
+    for (const char* definition : definitions) {
         EXPECT_NO_THROW(compileText(repository, "root/test", definition)) << definition;
+    }
 }
 
 TEST_F(ClassTest, LetsAUseNarrowItsFlavorButNotWidenIt)
@@ -166,8 +168,9 @@ TEST_F(ClassTest, ListsSubclassesInOrderOfCreation)
     compileText(repository, "root/test", "class Other : base {}; class Alone {};");
     const auto list = [this](const CIMName& name, bool isDeep) {
         std::string text;
-        for (const CIMName& found : repository.enumerateClassNames(kNamespace, name, isDeep))
+        for (const CIMName& found : repository.enumerateClassNames(kNamespace, name, isDeep)) {
             text += utf8(found.getString()) + " ";
+        }
         return text;
     };
     EXPECT_EQ(list(CIMName(), false), "Base Alone ");
@@ -235,8 +238,9 @@ TEST_F(ClassTest, KeepsNamespacesApart)
     EXPECT_FALSE(repository.hasClass(CIMNamespaceName("a/b/c"), CIMName("Base")));
     EXPECT_EQ(failureOf([&] { repository.hasClass(CIMNamespaceName("root/none"), CIMName("Base")); }), "3 root/none");
     std::string names;
-    for (const CIMNamespaceName& name : repository.namespaces())
+    for (const CIMNamespaceName& name : repository.namespaces()) {
         names += utf8(name.getString()) + " ";
+    }
     EXPECT_EQ(names, "root root/test a/b/c ");
     EXPECT_EQ(failureOf([&] { repository.deleteNamespace(kNamespace); }), "20 root/test");
     EXPECT_EQ(failureOf([&] { repository.deleteNamespace(CIMNamespaceName("A/B/C")); }), "no failure");

@@ -1,13 +1,14 @@
-#include "pegasus/mof/Describe.h"
-#include "pegasus/mof/TemporaryDirectory.h"
-#include "pegasus/repository/RepositoryHandler.h"
+#include "tests/pegasus/mof/Describe.h"
+#include "tests/pegasus/mof/TemporaryDirectory.h"
+#include "tests/pegasus/repository/RepositoryHandler.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
 
 #include <csignal>
 #include <random>
 #include <thread>
 
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -34,7 +35,7 @@ std::string classText(unsigned number)
            " { id = \"i\"; };\n";
 }
 
-/// In the child: defines one class and one instance after the other and acknowledges each pair with a byte.
+// In the child: defines one class and one instance after the other and acknowledges each pair with a byte.
 [[noreturn]] void writeForEver(const std::string& directory, int acknowledgements)
 {
     try {
@@ -42,8 +43,9 @@ std::string classText(unsigned number)
         compileText(repository, "root/test", kKey);
         for (unsigned number = 0;; ++number) {
             compileText(repository, "root/test", classText(number));
-            if (::write(acknowledgements, "+", 1) != 1)
+            if (::write(acknowledgements, "+", 1) != 1) {
                 ::_exit(3);
+            }
         }
     } catch (...) {
         ::_exit(2);
@@ -54,17 +56,19 @@ unsigned countBytes(int descriptor)
 {
     unsigned count = 0;
     char buffer[4096];
-    for (ssize_t got; (got = ::read(descriptor, buffer, sizeof buffer)) > 0;)
+    for (ssize_t got; (got = ::read(descriptor, buffer, sizeof buffer)) > 0;) {
         count += static_cast<unsigned>(got);
+    }
     return count;
 }
 
-/// Kills the writer when it has acknowledged so many pairs and works on the next. Returns: how many it had in the end.
+// Kills the writer when it has acknowledged so many pairs and works on the next. Returns: how many it had in the end.
 unsigned writeAndKill(const std::string& directory, unsigned pairs)
 {
     int ends[2];
-    if (::pipe(ends) != 0)
+    if (::pipe(ends) != 0) {
         return 0;
+    }
     const pid_t child = ::fork();
     if (child == 0) {
         ::close(ends[0]);
@@ -72,8 +76,9 @@ unsigned writeAndKill(const std::string& directory, unsigned pairs)
     }
     ::close(ends[1]);
     unsigned acknowledged = 0;
-    for (char one; acknowledged < pairs && ::read(ends[0], &one, 1) == 1;)
+    for (char one; acknowledged < pairs && ::read(ends[0], &one, 1) == 1;) {
         ++acknowledged;
+    }
     EXPECT_EQ(acknowledged, pairs) << "the writer ended by itself";
     ::kill(child, SIGKILL);
     acknowledged += countBytes(ends[0]);
@@ -141,8 +146,9 @@ TEST(Durability, KeepsTextsThatAreHardToWriteDown)
         }
     }
     const Repository repository(directory.path());
-    for (std::size_t i = 0; i < std::size(texts); ++i)
+    for (std::size_t i = 0; i < std::size(texts); ++i) {
         EXPECT_EQ(describe(repository.getClass(kNamespace, name(i), {})), before[i]) << texts[i];
+    }
 }
 
 TEST(Durability, GoesOnWhenItsDirectoryIsDeleted)
@@ -153,8 +159,9 @@ TEST(Durability, GoesOnWhenItsDirectoryIsDeleted)
         Repository repository(directory);
         compileText(repository, "root/test", kKey + classText(0));
         std::filesystem::remove_all(directory);
-        for (unsigned number = 1; number < 200; ++number)
+        for (unsigned number = 1; number < 200; ++number) {
             compileText(repository, "root/test", classText(number));
+        }
         EXPECT_EQ(repository.enumerateInstanceNames(kNamespace, CIMName("C0")).size(), 200u);
     }
     EXPECT_FALSE(std::filesystem::exists(directory)) << "the end of the repository must not bring files back";
@@ -191,9 +198,11 @@ TEST(Concurrency, ServesManyThreadsAtOnce)
         }
     };
     std::vector<std::thread> threads;
-    for (unsigned thread = 0; thread < 4; ++thread)
+    for (unsigned thread = 0; thread < 4; ++thread) {
         threads.emplace_back(work, thread);
-    for (std::thread& thread : threads)
+    }
+    for (std::thread& thread : threads) {
         thread.join();
+    }
     EXPECT_EQ(repository.enumerateClassNames(kNamespace, CIMName("C0"), false).size(), 200u);
 }

@@ -1,6 +1,6 @@
-#include "pegasus/mof/Describe.h"
-#include "pegasus/mof/TemporaryDirectory.h"
-#include "pegasus/repository/RepositoryHandler.h"
+#include "tests/pegasus/mof/Describe.h"
+#include "tests/pegasus/mof/TemporaryDirectory.h"
+#include "tests/pegasus/repository/RepositoryHandler.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -49,8 +49,9 @@ class InstanceTest : public testing::Test
 CIMInstance instanceOf(const char* className, const std::vector<std::pair<const char*, CIMValue>>& values)
 {
     CIMInstance instance{CIMName(className)};
-    for (const auto& [name, value] : values)
+    for (const auto& [name, value] : values) {
         instance.addProperty(CIMProperty(CIMName(name), value));
+    }
     return instance;
 }
 
@@ -87,26 +88,29 @@ TEST_F(InstanceTest, RefusesWhatDoesNotFitTheClass)
         {"noKeys", instanceOf("Keyless", {}), "1 class has no keys: Keyless"},
         {"nullNumberKey", instanceOf("Keys", {{"b", CIMValue(true)}}), "4 key property u is null"},
     };
-    for (const Row& row : rows)
+    for (const Row& row : rows) {
         EXPECT_EQ(failureOf([&] { repository.createInstance(kNamespace, row.instance); }), row.failure) << row.name;
+    }
     EXPECT_EQ(list("Base", {}), "");
 }
 
-/// A null text key counts as empty, as OpenPegasus has it.
+// A null text key counts as empty, as OpenPegasus has it.
 TEST_F(InstanceTest, KnowsAPathInWhateverSpelling)
 {
     create("instance of Keys { u = 16; b = true; r = \"Keys.u=1,b=FALSE\"; }; instance of Sub {};");
     const char* const same[] = {"KEYS.U=16,B=TRUE,R=\"Keys.b=FALSE,u=1\"",
                                 "Keys.b=true,u=0x10,r=\"keys.B=false,U=0x1\"",
                                 "//host/root/else:Keys.u=16,b=TRUE,r=\"Keys.u=1,b=FALSE\"", "Sub.Id=\"\""};
-    for (const char* path : same)
+    for (const char* path : same) {
         EXPECT_NO_THROW(repository.getInstance(kNamespace, CIMObjectPath(path), {})) << path;
+    }
     const char* const others[] = {"Keys.u=17,b=TRUE,r=\"Keys.u=1,b=FALSE\"", "Keys.u=16,b=TRUE,r=\"Keys.u=2,b=FALSE\"",
                                   "Keys.u=16,b=TRUE", "Sub.Id=\"x\"", "Leaf.Id=\"\""};
-    for (const char* path : others)
+    for (const char* path : others) {
         EXPECT_THAT(failureOf([&] { repository.getInstance(kNamespace, CIMObjectPath(path), {}); }),
                     testing::StartsWith("6 "))
             << path;
+    }
     EXPECT_EQ(failureOf([&] {
                   repository.createInstance(kNamespace, instanceOf("sub", {{"ID", CIMValue(String())}}));
               }),
@@ -122,7 +126,7 @@ TEST_F(InstanceTest, EnumeratesSubclassesToo)
     {
         const char* name;
         const char* className;
-        InstanceOptions options; ///< deepInheritance, includeClassOrigin, propertyList
+        InstanceOptions options; // deepInheritance, includeClassOrigin, propertyList
         const char* expected;
     };
     const Row rows[] = {
@@ -146,20 +150,23 @@ TEST_F(InstanceTest, EnumeratesSubclassesToo)
          {false, true, CIMPropertyList(onlyR)},
          "Leaf.Id=\"a\" instance Leaf { real64 r@Leaf=<1.5000000000000000e+00>; }\n"},
     };
-    for (const Row& row : rows)
+    for (const Row& row : rows) {
         EXPECT_EQ(list(row.className, row.options), row.expected) << row.name;
+    }
     EXPECT_EQ(failureOf([&] { list("Nope", {}); }), "5 Nope");
 }
 
 TEST_F(InstanceTest, EnumeratesMoreThanOneBatchInOrderAndStopsWhenTold)
 {
     constexpr Uint32 kCount = 150;
-    for (Uint32 i = 0; i < kCount; ++i)
+    for (Uint32 i = 0; i < kCount; ++i) {
         repository.createInstance(kNamespace, instanceOf("Sub", {{"Id", CIMValue(String(std::to_string(i).c_str()))}}));
+    }
     const std::vector<CIMObjectPath> paths = repository.enumerateInstanceNames(kNamespace, CIMName("Base"));
     ASSERT_EQ(paths.size(), kCount);
-    for (Uint32 i = 0; i < kCount; ++i)
+    for (Uint32 i = 0; i < kCount; ++i) {
         EXPECT_EQ(utf8(paths[i].toString()), "Sub.Id=\"" + std::to_string(i) + "\"");
+    }
     Uint32 seen = 0;
     // The sink may use the repository: it runs outside of its lock.
     repository.enumerateInstances(kNamespace, CIMName("Base"), {}, [&](const CIMInstance& found) {

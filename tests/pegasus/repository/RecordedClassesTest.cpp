@@ -1,15 +1,15 @@
-#include "pegasus/common/ElementDecoder.h"
-#include "pegasus/common/ElementEncoder.h"
-#include "pegasus/mof/TemporaryDirectory.h"
 #include "pegasus/repository/Repository.h"
+#include "pegasus/wire/ElementDecoder.h"
+#include "pegasus/wire/ElementEncoder.h"
+#include "tests/pegasus/mof/TemporaryDirectory.h"
+
+#include <gtest/gtest.h>
 
 #include <fstream>
 #include <sstream>
 
-#include <gtest/gtest.h>
-
-/// Classes as a real server once gave them out: their local forms are created here, and what comes back in every form
-/// must be what the real server answered, byte by byte.
+// Classes as a real server once gave them out: their local forms are created here, and what comes back in every form
+// must be what the real server answered, byte by byte.
 
 using namespace Pegasus;
 using namespace Pegasus::repository;
@@ -27,13 +27,14 @@ std::string answerOf(const std::string& exchange)
     return text.str();
 }
 
-/// The CLASS elements of an answer, each with the line feed behind it.
+// The CLASS elements of an answer, each with the line feed behind it.
 std::vector<std::string> classesIn(const std::string& answer)
 {
     static const std::string kEnd = "</CLASS>\n";
     std::vector<std::string> found;
-    for (std::size_t at = answer.find("<CLASS "); at != std::string::npos; at = answer.find("<CLASS ", at + 1))
+    for (std::size_t at = answer.find("<CLASS "); at != std::string::npos; at = answer.find("<CLASS ", at + 1)) {
         found.push_back(answer.substr(at, answer.find(kEnd, at) + kEnd.size() - at));
+    }
     return found;
 }
 
@@ -51,7 +52,7 @@ std::string encode(const CIMConstClass& cimClass)
     return text;
 }
 
-/// The recorded classes carry the effective flavors, so a use tells its declaration.
+// The recorded classes carry the effective flavors, so a use tells its declaration.
 template <class Owner> void declareQualifiers(Repository& repository, const Owner& owner)
 {
     for (Uint32 i = 0; i < owner.getQualifierCount(); ++i) {
@@ -65,13 +66,15 @@ void create(Repository& repository, const std::string& text)
 {
     const CIMClass local = decode(text);
     declareQualifiers(repository, local);
-    for (Uint32 i = 0; i < local.getPropertyCount(); ++i)
+    for (Uint32 i = 0; i < local.getPropertyCount(); ++i) {
         declareQualifiers(repository, CIMConstClass(local).getProperty(i));
+    }
     for (Uint32 i = 0; i < local.getMethodCount(); ++i) {
         const CIMConstMethod method = CIMConstClass(local).getMethod(i);
         declareQualifiers(repository, method);
-        for (Uint32 j = 0; j < method.getParameterCount(); ++j)
+        for (Uint32 j = 0; j < method.getParameterCount(); ++j) {
             declareQualifiers(repository, method.getParameter(j));
+        }
     }
     repository.createClass(kNamespace, local);
 }
@@ -80,14 +83,17 @@ void create(Repository& repository, const std::string& text)
 
 TEST(RecordedClasses, ComeBackAsTheRealServerGaveThemOut)
 {
-    if (kFolder.empty())
+    if (kFolder.empty()) {
         GTEST_SKIP() << "no recorded exchanges: set VRX_VECTORS_DIR";
+    }
     const mof_test::TemporaryDirectory directory;
     Repository repository(directory.path());
     repository.createNamespace(kNamespace);
-    for (const char* exchange : {"getclass-base", "enumclasses", "getclass-localonly", "getclass-assoc"})
-        for (const std::string& text : classesIn(answerOf(exchange)))
+    for (const char* exchange : {"getclass-base", "enumclasses", "getclass-localonly", "getclass-assoc"}) {
+        for (const std::string& text : classesIn(answerOf(exchange))) {
             create(repository, text);
+        }
+    }
 
     Array<CIMName> list;
     list.append(CIMName("U8"));
@@ -96,7 +102,7 @@ TEST(RecordedClasses, ComeBackAsTheRealServerGaveThemOut)
     {
         const char* exchange;
         const char* className;
-        ClassOptions options; ///< localOnly, includeQualifiers, includeClassOrigin, propertyList
+        ClassOptions options; // localOnly, includeQualifiers, includeClassOrigin, propertyList
     };
     const Row rows[] = {
         {"getclass-base", "Lab_Base", {false, true, false, {}}},

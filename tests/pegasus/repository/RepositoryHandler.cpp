@@ -1,7 +1,7 @@
-#include "pegasus/repository/RepositoryHandler.h"
+#include "tests/pegasus/repository/RepositoryHandler.h"
 
-#include "pegasus/mof/Describe.h"
 #include "pegasus/mof/MemoryHandler.h"
+#include "tests/pegasus/mof/Describe.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -19,7 +19,7 @@ mof::CompileOptions optionsFor(const char* nameSpace)
     return options;
 }
 
-/// Takes any class, whatever it derives from.
+// Takes any class, whatever it derives from.
 class Collector : public mof::MemoryHandler
 {
   public:
@@ -37,8 +37,9 @@ class Collector : public mof::MemoryHandler
 void RepositoryHandler::useNamespace(const CIMNamespaceName& nameSpace)
 {
     fNamespace = nameSpace;
-    if (!fRepository.hasNamespace(nameSpace))
+    if (!fRepository.hasNamespace(nameSpace)) {
         fRepository.createNamespace(nameSpace);
+    }
 }
 
 bool RepositoryHandler::findQualifier(const CIMName& name, CIMQualifierDecl& declaration)
@@ -53,8 +54,9 @@ bool RepositoryHandler::findQualifier(const CIMName& name, CIMQualifierDecl& dec
 
 bool RepositoryHandler::findClass(const CIMName& name, CIMClass& found)
 {
-    if (!fRepository.hasClass(fNamespace, name))
+    if (!fRepository.hasClass(fNamespace, name)) {
         return false;
+    }
     repository::ClassOptions options;
     options.localOnly = false;
     options.includeClassOrigin = true;

@@ -8,7 +8,7 @@
 
 namespace repository_test {
 
-/// Compiles MOF straight into a repository, as the server would for a client.
+// Compiles MOF straight into a repository, as the server would for a client.
 class RepositoryHandler : public Pegasus::mof::DefinitionHandler
 {
   public:
@@ -27,14 +27,14 @@ class RepositoryHandler : public Pegasus::mof::DefinitionHandler
     Pegasus::CIMNamespaceName fNamespace;
 };
 
-/// Both throw mof::MofError or Pegasus::Exception; creates the namespace if it is missing.
+// Both throw mof::MofError or Pegasus::Exception; creates the namespace if it is missing.
 void compileText(Pegasus::repository::Repository& repository, const char* nameSpace, const std::string& text);
 void compileFile(Pegasus::repository::Repository& repository, const char* nameSpace, const std::string& path);
 
-/// The one class that the definition declares, as a client would send it; nothing is checked but its syntax.
+// The one class that the definition declares, as a client would send it; nothing is checked but its syntax.
 Pegasus::CIMClass parseClass(const std::string& declarations, const std::string& definition);
 
-/// "code message" of the CIMException that the operation throws, or "no failure".
+// "code message" of the CIMException that the operation throws, or "no failure".
 std::string failureOf(const std::function<void()>& operation);
 
 } // namespace repository_test

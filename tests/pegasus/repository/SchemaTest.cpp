@@ -1,15 +1,15 @@
-#include "pegasus/mof/Describe.h"
 #include "pegasus/mof/MemoryHandler.h"
-#include "pegasus/mof/TemporaryDirectory.h"
-#include "pegasus/repository/RepositoryHandler.h"
+#include "tests/pegasus/mof/Describe.h"
+#include "tests/pegasus/mof/TemporaryDirectory.h"
+#include "tests/pegasus/repository/RepositoryHandler.h"
 #include "tools/mofcompare/ClassComparison.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
 
 #include <iterator>
 #include <set>
 #include <sstream>
-
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 using namespace Pegasus;
 using namespace Pegasus::repository;
@@ -31,7 +31,7 @@ mof::MemoryHandler parse(const std::string& file)
     return source;
 }
 
-/// Compiles the file into a repository, opens that again and compares every definition with its source.
+// Compiles the file into a repository, opens that again and compares every definition with its source.
 std::vector<std::string> readBackDifferences(const std::string& file, mof::MemoryHandler& source)
 {
     const TemporaryDirectory directory;
@@ -47,16 +47,18 @@ std::vector<std::string> readBackDifferences(const std::string& file, mof::Memor
     const auto add = [&all](const std::vector<std::string>& lines) {
         all.insert(all.end(), lines.begin(), lines.end());
     };
-    for (const auto& [key, declaration] : source.qualifiers())
+    for (const auto& [key, declaration] : source.qualifiers()) {
         add(mofcompare::differences(declaration, repository.getQualifier(kNamespace, declaration.getName())));
-    for (const CIMClass& declared : source.classes())
+    }
+    for (const CIMClass& declared : source.classes()) {
         add(mofcompare::differences(declared, repository.getClass(kNamespace, declared.getClassName(), {}), lookup));
+    }
     return all;
 }
 
 } // namespace
 
-/// What servers, programs and vendors' registrations rely on.
+// What servers, programs and vendors' registrations rely on.
 TEST(BaseSchemas, HoldWhatAServerNeeds)
 {
     const TemporaryDirectory directory;
@@ -107,19 +109,22 @@ TEST(BaseSchemas, HoldWhatAServerNeeds)
                               utf8(property.getName().getString()));
         }
         std::istringstream wanted(row.properties);
-        for (std::string property; std::getline(wanted, property, ',');)
+        for (std::string property; std::getline(wanted, property, ',');) {
             EXPECT_EQ(properties.count(property), 1u) << row.className << ": " << property;
+        }
         Array<CIMName> keys;
         found.getKeyNames(keys);
         std::multiset<std::string> keyNames;
-        for (Uint32 i = 0; i < keys.size(); ++i)
+        for (Uint32 i = 0; i < keys.size(); ++i) {
             keyNames.insert(utf8(keys[i].getString()));
+        }
         std::istringstream keyWords(row.keys);
         EXPECT_EQ(keyNames, std::multiset<std::string>(std::istream_iterator<std::string>(keyWords), {}))
             << row.className;
         std::istringstream methodWords(row.methods);
-        for (std::string method; methodWords >> method;)
+        for (std::string method; methodWords >> method;) {
             EXPECT_NE(found.findMethod(CIMName(method.c_str())), PEG_NOT_FOUND) << row.className << "." << method;
+        }
         EXPECT_FALSE(found.isAbstract()) << row.className;
     }
 }
@@ -135,8 +140,9 @@ TEST(BaseSchemas, ReadBackAsWritten)
 TEST(DmtfSchema, ReadsBackAsWritten)
 {
     const std::string file = DMTF_SCHEMA_FILE;
-    if (file.empty())
+    if (file.empty()) {
         GTEST_SKIP() << "no DMTF schema: set VRX_DMTF_SCHEMA";
+    }
     mof::MemoryHandler source = parse(file);
     EXPECT_THAT(source.warnings(), testing::IsEmpty());
     EXPECT_EQ(source.qualifiers().size(), 70u);

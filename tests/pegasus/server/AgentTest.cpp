@@ -1,16 +1,16 @@
 // Vendor code behind the server: what it delivers, and what becomes of everybody else when it fails.
-#include "pegasus/server/HttpExchange.h"
-#include "pegasus/server/ServerTree.h"
+#include "tests/pegasus/server/HttpExchange.h"
+#include "tests/pegasus/server/ServerTree.h"
 
 #include <Pegasus/Client/CIMClient.h>
 
 #include <gtest/gtest.h>
 
-#include <signal.h>
-
 #include <cstdio>
 #include <fstream>
 #include <memory>
+
+#include <signal.h>
 
 namespace servertest {
 namespace {
@@ -185,8 +185,9 @@ TEST_F(AgentTest, aDeathIsReportedWithModuleAndCauseAndTheOthersGoOn)
 TEST_F(AgentTest, aModuleThatKeepsDyingIsLeftAloneForAWhile)
 {
     start();
-    for (int i = 0; i < 3; ++i)
+    for (int i = 0; i < 3; ++i) {
         EXPECT_NE(errorOf([&] { call(fClient, "Probe_Bulk", "Crash"); }).find("Lost connection"), std::string::npos);
+    }
     EXPECT_NE(errorOf([&] { call(fClient, "Probe_Bulk", "Crash"); }).find("it is not started again yet"),
               std::string::npos);
     EXPECT_TRUE(eventually([&] { return errorOf([&] { call(fClient, "Probe_Bulk", "ProcessId"); }) == "no error"; }));

@@ -1,17 +1,17 @@
-#include "pegasus/server/HttpExchange.h"
+#include "tests/pegasus/server/HttpExchange.h"
 
-#include "pegasus/server/HttpRequest.h"
+#include "pegasus/server/net/HttpRequest.h"
+
+#include <algorithm>
+#include <cstdlib>
+#include <sstream>
+#include <stdexcept>
 
 #include <arpa/inet.h>
 #include <netinet/in.h>
 #include <poll.h>
 #include <sys/socket.h>
 #include <unistd.h>
-
-#include <algorithm>
-#include <cstdlib>
-#include <sstream>
-#include <stdexcept>
 
 namespace servertest {
 
@@ -22,8 +22,9 @@ using Deadline = std::chrono::steady_clock::time_point;
 void addHeader(std::map<std::string, std::string>& headers, const std::string& line)
 {
     const std::size_t colon = line.find(':');
-    if (colon == std::string::npos)
+    if (colon == std::string::npos) {
         return;
+    }
     std::string name = line.substr(0, colon);
     std::transform(name.begin(), name.end(), name.begin(), [](unsigned char c) { return std::tolower(c); });
     const std::size_t value = line.find_first_not_of(' ', colon + 1);
@@ -52,8 +53,9 @@ RawConnection::RawConnection(std::uint16_t port) : fSocket(::socket(AF_INET, SOC
     address.sin_family = AF_INET;
     address.sin_port = htons(port);
     address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
-    if (::connect(fSocket, reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0)
+    if (::connect(fSocket, reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0) {
         throw std::runtime_error("cannot connect to the server");
+    }
 }
 
 RawConnection::~RawConnection()
@@ -65,8 +67,9 @@ bool RawConnection::send(const std::string& bytes)
 {
     for (std::size_t done = 0; done < bytes.size();) {
         const ssize_t n = ::send(fSocket, bytes.data() + done, bytes.size() - done, MSG_NOSIGNAL);
-        if (n < 0)
+        if (n < 0) {
             return false;
+        }
         done += static_cast<std::size_t>(n);
     }
     return true;
@@ -81,17 +84,20 @@ bool RawConnection::fill(Deadline deadline)
 {
     char part[65536];
     const ssize_t n = waitReadable(fSocket, deadline) ? ::recv(fSocket, part, sizeof part, 0) : 0;
-    if (n > 0)
+    if (n > 0) {
         fBuffer.append(part, static_cast<std::size_t>(n));
+    }
     return n > 0;
 }
 
 bool RawConnection::readLine(std::string& line, Deadline deadline)
 {
     std::size_t end;
-    while ((end = fBuffer.find("\r\n")) == std::string::npos)
-        if (!fill(deadline))
+    while ((end = fBuffer.find("\r\n")) == std::string::npos) {
+        if (!fill(deadline)) {
             return false;
+        }
+    }
     line = fBuffer.substr(0, end);
     fBuffer.erase(0, end + 2);
     return true;
@@ -102,13 +108,16 @@ bool RawConnection::readChunks(HttpAnswer& answer, Deadline deadline)
     for (std::string line; readLine(line, deadline);) {
         const std::size_t size = std::strtoul(line.c_str(), nullptr, 16);
         if (size == 0) {
-            while (readLine(line, deadline) && !line.empty())
+            while (readLine(line, deadline) && !line.empty()) {
                 addHeader(answer.trailers, line);
+            }
             return line.empty();
         }
-        while (fBuffer.size() < size + 2)
-            if (!fill(deadline))
+        while (fBuffer.size() < size + 2) {
+            if (!fill(deadline)) {
                 return false;
+            }
+        }
         answer.body.append(fBuffer, 0, size);
         fBuffer.erase(0, size + 2);
     }
@@ -117,12 +126,15 @@ bool RawConnection::readChunks(HttpAnswer& answer, Deadline deadline)
 
 bool RawConnection::readBody(HttpAnswer& answer, Deadline deadline)
 {
-    if (header(answer, "transfer-encoding") == "chunked")
+    if (header(answer, "transfer-encoding") == "chunked") {
         return readChunks(answer, deadline);
+    }
     const std::size_t size = std::strtoul(header(answer, "content-length").c_str(), nullptr, 10);
-    while (fBuffer.size() < size)
-        if (!fill(deadline))
+    while (fBuffer.size() < size) {
+        if (!fill(deadline)) {
             return false;
+        }
+    }
     answer.body = fBuffer.substr(0, size);
     fBuffer.erase(0, size);
     return true;
@@ -132,11 +144,13 @@ HttpAnswer RawConnection::receive(std::chrono::milliseconds limit)
 {
     const Deadline deadline = std::chrono::steady_clock::now() + limit;
     HttpAnswer answer;
-    if (!readLine(answer.statusLine, deadline))
+    if (!readLine(answer.statusLine, deadline)) {
         return answer;
+    }
     answer.status = std::atoi(answer.statusLine.c_str() + std::min<std::size_t>(9, answer.statusLine.size()));
-    for (std::string line; readLine(line, deadline) && !line.empty();)
+    for (std::string line; readLine(line, deadline) && !line.empty();) {
         addHeader(answer.headers, line);
+    }
     answer.isComplete = readBody(answer, deadline);
     return answer;
 }
@@ -145,9 +159,11 @@ bool RawConnection::isClosed(std::chrono::milliseconds limit)
 {
     const Deadline deadline = std::chrono::steady_clock::now() + limit;
     char scrap[4096];
-    while (waitReadable(fSocket, deadline))
-        if (::recv(fSocket, scrap, sizeof scrap, 0) <= 0)
+    while (waitReadable(fSocket, deadline)) {
+        if (::recv(fSocket, scrap, sizeof scrap, 0) <= 0) {
             return true;
+        }
+    }
     return false;
 }
 
@@ -174,8 +190,9 @@ std::string intrinsicRequest(const std::string& method, const std::string& nameS
 {
     std::string path;
     std::istringstream parts(nameSpace);
-    for (std::string part; std::getline(parts, part, '/');)
+    for (std::string part; std::getline(parts, part, '/');) {
         path += "<NAMESPACE NAME=\"" + part + "\"/>\n";
+    }
     return post(headers + "CIMOperation: MethodCall\r\nCIMMethod: " + method +
                     "\r\nCIMObject: " + Pegasus::server::percentEncode(nameSpace) + "\r\n",
                 "<?xml version=\"1.0\" encoding=\"utf-8\" ?>\n<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">\n"

@@ -1,14 +1,14 @@
 // The HTTP layer without a server: bytes in, bytes out.
-#include "pegasus/server/AnswerStream.h"
-#include "pegasus/server/CimAnswer.h"
-#include "pegasus/server/HttpRequestReader.h"
-#include "pegasus/server/Utf8Check.h"
+#include "pegasus/server/net/AnswerStream.h"
+#include "pegasus/server/net/CimAnswer.h"
+#include "pegasus/server/net/HttpRequestReader.h"
+#include "pegasus/server/net/Utf8Check.h"
 
 #include <gtest/gtest.h>
 
-#include <sys/socket.h>
-
 #include <thread>
+
+#include <sys/socket.h>
 
 namespace Pegasus::server {
 namespace {
@@ -24,8 +24,9 @@ HttpRequest parseSplit(const std::string& bytes, std::size_t at, std::size_t& ta
     taken = parser.put(std::string_view(bytes).substr(0, at));
     while (!parser.isDone()) {
         const std::size_t n = parser.put(std::string_view(bytes).substr(taken));
-        if (n == 0)
+        if (n == 0) {
             throw std::runtime_error("the parser stands still");
+        }
         taken += n;
     }
     return parser.take();
@@ -96,8 +97,9 @@ template <typename Write> std::string sent(AnswerStream::Options options, const 
     std::string bytes;
     std::thread reader([&, fd = Descriptor(ends[0])] {
         char part[65536];
-        for (ssize_t n; (n = ::read(fd.get(), part, sizeof part)) > 0;)
+        for (ssize_t n; (n = ::read(fd.get(), part, sizeof part)) > 0;) {
             bytes.append(part, static_cast<std::size_t>(n));
+        }
     });
     {
         SocketStream stream((Descriptor(ends[1])));
@@ -181,9 +183,12 @@ TEST(Utf8CheckTest, acceptsUtf8Only)
                             {"lone follower", "ab\x80", false},
                             {"cut", "\xe5\x90", false},
                             {"latin 1", "caf\xe9 x", false}};
-    for (const Utf8Row& row : rows)
+    for (const Utf8Row& row : rows) {
         for (std::size_t shift = 0; shift < 9; ++shift) // at every offset in a word
+        {
             EXPECT_EQ(isUtf8(std::string(shift, 'x') + row.bytes), row.valid) << row.name << " at " << shift;
+        }
+    }
 }
 
 struct StatusRow
@@ -200,7 +205,9 @@ TEST(CimStatusTest, putsTheSymbolicNameInFront)
                                  {28, "x", "CIM_ERR_SERVER_IS_SHUTTING_DOWN: x"},
                                  {99, "x", "Unrecognized CIM status code \"99\": x"},
                                  {19, "x", "Unrecognized CIM status code \"19\": x"}})
+    {
         EXPECT_EQ(makeStatus(static_cast<CIMStatusCode>(row.code), row.text).text, row.expected);
+    }
 }
 
 } // namespace

@@ -64,12 +64,14 @@ static CMPIStatus deliver(const CMPIResult* result, const CMPIObjectPath* of, CM
     CMPIObjectPath* path = makePath(of, number);
     CMPIStatus status = kOk;
     CMPIInstance* instance = gBroker->eft->newInstance(gBroker, path, &status);
-    if (instance == NULL)
+    if (instance == NULL) {
         return status;
+    }
     snprintf(id, sizeof id, "bulk-%07u", (unsigned)number);
     setText(instance, "Id", id);
-    for (size_t i = 0; i < sizeof kTexts / sizeof kTexts[0]; ++i)
+    for (size_t i = 0; i < sizeof kTexts / sizeof kTexts[0]; ++i) {
         setText(instance, kTexts[i], "A text of about sixty characters, as inventories are full of <them>.");
+    }
     setNumbers(instance, number);
     status = result->ft->returnInstance(result, instance);
     instance->ft->release(instance);
@@ -88,8 +90,9 @@ static CMPIStatus enumerateInstances(CMPIInstanceMI* mi, const CMPIContext* cont
         return failure(CMPI_RC_ERR_ACCESS_DENIED, "the probe says no: \xc3\xa9");
     }
     const int endless = strcasecmp(name, "Probe_Endless") == 0;
-    for (CMPIUint32 i = 0; status.rc == CMPI_RC_OK && (endless || i < gCount); ++i)
+    for (CMPIUint32 i = 0; status.rc == CMPI_RC_OK && (endless || i < gCount); ++i) {
         status = deliver(result, path, i);
+    }
     return status.rc == CMPI_RC_OK ? result->ft->returnDone(result) : status;
 }
 
@@ -111,8 +114,9 @@ static CMPIStatus getInstance(CMPIInstanceMI* mi, const CMPIContext* context, co
     unsigned number = 0;
     (void)mi, (void)context, (void)properties;
     const CMPIData id = path->ft->getKey(path, "Id", NULL);
-    if (id.type != CMPI_string || sscanf(textOf(id.value.string), "bulk-%u", &number) != 1 || number >= gCount)
+    if (id.type != CMPI_string || sscanf(textOf(id.value.string), "bulk-%u", &number) != 1 || number >= gCount) {
         return failure(CMPI_RC_ERR_NOT_FOUND, "no such probe");
+    }
     CMPIStatus status = deliver(result, path, number);
     return status.rc == CMPI_RC_OK ? result->ft->returnDone(result) : status;
 }
@@ -161,16 +165,18 @@ static CMPIStatus returnNumber(const CMPIResult* result, CMPIUint32 number)
 static CMPIStatus echo(const CMPIResult* result, const CMPIArgs* in, CMPIArgs* out)
 {
     const CMPIData text = in->ft->getArg(in, "Text", NULL);
-    if (text.type == CMPI_string && (text.state & CMPI_nullValue) == 0)
+    if (text.type == CMPI_string && (text.state & CMPI_nullValue) == 0) {
         out->ft->addArg(out, "Back", &text.value, CMPI_string);
+    }
     return returnNumber(result, 0);
 }
 
 static CMPIStatus setCount(const CMPIResult* result, const CMPIArgs* in)
 {
     const CMPIData count = in->ft->getArg(in, "Count", NULL);
-    if (count.type != CMPI_uint32)
+    if (count.type != CMPI_uint32) {
         return failure(CMPI_RC_ERR_INVALID_PARAMETER, "Count");
+    }
     gCount = count.value.uint32;
     return returnNumber(result, gCount);
 }
@@ -183,10 +189,12 @@ static CMPIStatus countByUpcall(const CMPIContext* context, const CMPIResult* re
     CMPIObjectPath* bulk =
         gBroker->eft->newObjectPath(gBroker, textOf(path->ft->getNameSpace(path, NULL)), "Probe_Bulk", NULL);
     CMPIEnumeration* names = gBroker->bft->enumerateInstanceNames(gBroker, context, bulk, &status);
-    if (names == NULL)
+    if (names == NULL) {
         return status;
-    for (; names->ft->hasNext(names, NULL); names->ft->getNext(names, NULL))
+    }
+    for (; names->ft->hasNext(names, NULL); names->ft->getNext(names, NULL)) {
         ++count;
+    }
     return returnNumber(result, count);
 }
 
@@ -217,23 +225,32 @@ static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, con
                                const CMPIObjectPath* path, const char* method, const CMPIArgs* in, CMPIArgs* out)
 {
     (void)mi;
-    if (strcasecmp(method, "Echo") == 0)
+    if (strcasecmp(method, "Echo") == 0) {
         return echo(result, in, out);
-    if (strcasecmp(method, "SetCount") == 0)
+    }
+    if (strcasecmp(method, "SetCount") == 0) {
         return setCount(result, in);
-    if (strcasecmp(method, "CountByUpcall") == 0)
+    }
+    if (strcasecmp(method, "CountByUpcall") == 0) {
         return countByUpcall(context, result, path);
-    if (strcasecmp(method, "ProcessId") == 0)
+    }
+    if (strcasecmp(method, "ProcessId") == 0) {
         return returnNumber(result, (CMPIUint32)getpid());
-    if (strcasecmp(method, "Grow") == 0)
+    }
+    if (strcasecmp(method, "Grow") == 0) {
         return grow();
-    if (strcasecmp(method, "Crash") == 0)
+    }
+    if (strcasecmp(method, "Crash") == 0) {
         raise(SIGSEGV);
-    if (strcasecmp(method, "Exit") == 0)
+    }
+    if (strcasecmp(method, "Exit") == 0) {
         _exit(3);
-    if (strcasecmp(method, "Hang") == 0)
-        for (;;)
+    }
+    if (strcasecmp(method, "Hang") == 0) {
+        for (;;) {
             pause();
+        }
+    }
     return failure(CMPI_RC_ERR_METHOD_NOT_AVAILABLE, method);
 }
 

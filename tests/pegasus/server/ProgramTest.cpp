@@ -1,8 +1,13 @@
 // cimserver and cimconfig as people and other programs call them: texts, exit statuses, files.
-#include "pegasus/server/HttpExchange.h"
-#include "pegasus/server/ServerTree.h"
+#include "tests/pegasus/server/HttpExchange.h"
+#include "tests/pegasus/server/ServerTree.h"
 
 #include <gtest/gtest.h>
+
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <sstream>
 
 #include <arpa/inet.h>
 #include <fcntl.h>
@@ -11,11 +16,6 @@
 #include <sys/socket.h>
 #include <sys/stat.h>
 #include <unistd.h>
-
-#include <filesystem>
-#include <fstream>
-#include <iterator>
-#include <sstream>
 
 namespace servertest {
 namespace {
@@ -126,7 +126,9 @@ TEST(ProgramTest, withAServer)
            {"stop", "cimserver -s", 0, "CIM Server stopped.\n", ""},
            {"stopped", "cimserver --status", 2, "The CIM Server is not running.\n", ""}});
     for (const std::string& file : {tree.startFile(), tree.home() + "/cimserver.lock", tree.home() + "/cimxml.socket"})
+    {
         EXPECT_FALSE(fs::exists(file)) << file;
+    }
 }
 
 TEST(ProgramTest, everyLimitIsListedWithDefaultAndMeaning)
@@ -134,7 +136,9 @@ TEST(ProgramTest, everyLimitIsListedWithDefaultAndMeaning)
     const std::string list = ServerTree().run("cimconfig", {"-l"}).out;
     for (const char* line : {"maxConnections (default 128) ", "maxHeaderBytes (default 65536) ",
                              "maxBodyBytes (default 16777216) ", "requestReadTimeout (default 30) "})
+    {
         EXPECT_NE(list.find(line), std::string::npos) << line;
+    }
 }
 
 TEST(ProgramTest, stopsByForceWhenTheSchemaIsMissing)
@@ -222,8 +226,9 @@ TEST(ProgramTest, theServerKeepsNoneOfItsCallersDescriptors)
     EXPECT_EQ(::read(ends[0], &byte, 1), 0);
     ::close(ends[0]);
     const std::string fds = "/proc/" + std::to_string(tree.serverProcess()) + "/fd/";
-    for (const char* fd : {"0", "1", "2"})
+    for (const char* fd : {"0", "1", "2"}) {
         EXPECT_EQ(fs::read_symlink(fds + fd), "/dev/null");
+    }
 }
 
 TEST(ProgramTest, listensOnLoopbackOnly)
@@ -234,8 +239,9 @@ TEST(ProgramTest, listensOnLoopbackOnly)
     std::snprintf(text, sizeof text, ":%04X", tree.port());
     std::ifstream table("/proc/net/tcp");
     for (std::string line; std::getline(table, line);) {
-        if (line.find(text) == std::string::npos || line.find(" 0A ") == std::string::npos)
+        if (line.find(text) == std::string::npos || line.find(" 0A ") == std::string::npos) {
             continue; // not a listener on our port
+        }
         EXPECT_NE(line.find(std::string("0100007F") + text), std::string::npos) << line;
     }
     std::ifstream six("/proc/net/tcp6");

@@ -1,14 +1,14 @@
 // The server as any HTTP client sees it: rows of request bytes, and what comes back.
-#include "pegasus/server/HttpExchange.h"
-#include "pegasus/server/ServerTree.h"
+#include "tests/pegasus/server/HttpExchange.h"
+#include "tests/pegasus/server/ServerTree.h"
 
 #include <gtest/gtest.h>
+
+#include <memory>
 
 #include <sys/socket.h>
 #include <sys/wait.h>
 #include <unistd.h>
-
-#include <memory>
 
 namespace servertest {
 namespace {
@@ -134,12 +134,14 @@ TEST_F(ProtocolTest, refusesWithStatusAndCause)
 TEST_F(ProtocolTest, theServerOutlivesDeepAndWideInput)
 {
     std::string deep;
-    for (int i = 0; i < 100'000; ++i)
+    for (int i = 0; i < 100'000; ++i) {
         deep += "<A>";
+    }
     const std::string wide = "<IPARAMVALUE NAME=\"" + std::string(1'000'000, 'x') + "\"></IPARAMVALUE>\n";
     std::string many = "<IPARAMVALUE";
-    for (int i = 0; i < 10'000; ++i)
+    for (int i = 0; i < 10'000; ++i) {
         many += " A" + std::to_string(i) + "=\"\"";
+    }
     const std::pair<const char*, std::string> rows[] = {
         {"100000 nested elements", deep}, {"a megabyte in an attribute", wide}, {"10000 attributes", many + "/>"}};
     for (const auto& [name, parameters] : rows) {
@@ -260,8 +262,9 @@ TEST_F(ProtocolTest, unknownAndUnsupportedOperations)
 template <typename Action> int asNobody(const Action& action)
 {
     const pid_t pid = ::fork();
-    if (pid == 0)
+    if (pid == 0) {
         ::_exit(::setgid(65534) == 0 && ::setuid(65534) == 0 ? action() : 99);
+    }
     int status = 0;
     ::waitpid(pid, &status, 0);
     return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
@@ -269,20 +272,22 @@ template <typename Action> int asNobody(const Action& action)
 
 TEST_F(ProtocolTest, anotherUserIsNotServed)
 {
-    if (::geteuid() != 0)
+    if (::geteuid() != 0) {
         GTEST_SKIP() << "needs root, to become somebody else";
+    }
     const std::string create = intrinsicRequest(
         "CreateInstance", "root",
         "<IPARAMVALUE NAME=\"NewInstance\">\n<INSTANCE CLASSNAME=\"__Namespace\">\n<PROPERTY NAME=\"Name\" "
         "TYPE=\"string\">\n<VALUE>intruder</VALUE>\n</PROPERTY>\n</INSTANCE>\n</IPARAMVALUE>\n");
     EXPECT_EQ(asNobody([&] { return exchange(fgTree->port(), create).status; }), 0);
     // One that closes at once leaves a socket of which the kernel reports no owner, which must not pass for root.
-    for (int i = 0; i < 50; ++i)
+    for (int i = 0; i < 50; ++i) {
         EXPECT_EQ(asNobody([&] {
                       RawConnection connection(fgTree->port());
                       return connection.send(create) ? 0 : 0;
                   }),
                   0);
+    }
     EXPECT_TRUE(
         eventually([] { return fgTree->log().find("Refused a connection of user 65534.") != std::string::npos; }));
     const HttpAnswer names =

@@ -1,8 +1,7 @@
 // Recorded requests that a provider answered, against our server and a CMPI provider that has the recorded provider's
 // data: it reads the files that this test writes from the recordings.
-#include "pegasus/server/ReplayFixture.h"
-
-#include "pegasus/server/HttpRequest.h"
+#include "pegasus/server/net/HttpRequest.h"
+#include "tests/pegasus/server/ReplayFixture.h"
 
 #include <filesystem>
 #include <fstream>
@@ -35,7 +34,7 @@ std::string classOf(const std::string& name, const std::string& body)
 {
     const std::regex property("<(PROPERTY|PROPERTY.ARRAY) NAME=\"(\\w+)\" +TYPE=\"(\\w+)\"([^>]*)>");
     std::string declared = "<CLASS NAME=\"" + name + "\">\n";
-    for (const std::string& instance : elementsOf(body.substr(0, body.find("</INSTANCE>\n") + 12), "INSTANCE"))
+    for (const std::string& instance : elementsOf(body.substr(0, body.find("</INSTANCE>\n") + 12), "INSTANCE")) {
         for (std::sregex_iterator at(instance.begin(), instance.end(), property), end; at != end; ++at) {
             const bool isKey = body.find("KEYBINDING NAME=\"" + (*at)[2].str() + "\"") != std::string::npos;
             declared +=
@@ -43,6 +42,7 @@ std::string classOf(const std::string& name, const std::string& body)
                 (isKey ? "<QUALIFIER NAME=\"Key\" TYPE=\"boolean\">\n<VALUE>TRUE</VALUE>\n</QUALIFIER>\n" : "") + "</" +
                 (*at)[1].str() + ">\n";
         }
+    }
     return declared + "</CLASS>\n";
 }
 
@@ -52,8 +52,9 @@ class ProviderReplayTest : public ReplayFixture
     void SetUp() override
     {
         ReplayFixture::SetUp();
-        if (IsSkipped())
+        if (IsSkipped()) {
             return;
+        }
         fTree.compileBase();
         fFolder = fTree.home() + "/provider/lab/";
         std::filesystem::create_directories(fFolder);
@@ -81,8 +82,9 @@ class ProviderReplayTest : public ReplayFixture
 
     void registerClass(const std::string& nameSpace, const std::string& name, const std::string& module = "LabModule")
     {
-        if (!fRegistered.insert(nameSpace + ":" + name).second)
+        if (!fRegistered.insert(nameSpace + ":" + name).second) {
             return;
+        }
         writeFile("capabilities.mof", "instance of PG_ProviderCapabilities { ProviderModuleName = \"" + module +
                                           "\"; ProviderName = \"Lab\"; CapabilityID = \"" +
                                           std::to_string(fRegistered.size()) + "\"; ClassName = \"" + name +
@@ -97,7 +99,9 @@ class ProviderReplayTest : public ReplayFixture
         createClasses("root/cimv2", "getclass-assoc");
         for (const char* name : {"Lab_AllTypes", "Lab_Child", "Lab_Emb", "Lab_Ref", "Lab_Bulk", "Lab_Slow", "Lab_Empty",
                                  "Lab_Assoc", "Lab_Fail", "Lab_Methods"})
+        {
             registerClass("root/cimv2", name);
+        }
         registerClass("root/cimv2", "Lab_NoLib", "NoLibModule");
     }
 
@@ -105,21 +109,26 @@ class ProviderReplayTest : public ReplayFixture
     void provideInstances(const std::string& body) const
     {
         std::map<std::string, std::string> classes;
-        for (const auto& entry : std::filesystem::directory_iterator(fFolder))
-            if (entry.path().extension() == ".xml")
+        for (const auto& entry : std::filesystem::directory_iterator(fFolder)) {
+            if (entry.path().extension() == ".xml") {
                 std::filesystem::remove(entry);
-        for (const std::string& element : elementsOf(body, "VALUE.NAMEDINSTANCE"))
+            }
+        }
+        for (const std::string& element : elementsOf(body, "VALUE.NAMEDINSTANCE")) {
             classes[firstMatch(element, "CLASSNAME=\"(\\w+)\"")] += element;
-        for (const auto& [name, elements] : classes)
+        }
+        for (const auto& [name, elements] : classes) {
             writeFile(name + ".xml", kMessage + elements + kMessageEnd);
+        }
     }
 
     // The provider's word in a recorded status: without the symbol that the server puts before it.
     static std::string statusLine(const HttpAnswer& answer)
     {
         const auto code = answer.trailers.find("cimstatuscode");
-        if (code == answer.trailers.end())
+        if (code == answer.trailers.end()) {
             return "";
+        }
         const std::string text = Pegasus::server::percentDecode(answer.trailers.at("cimstatuscodedescription"));
         return code->second + " " + std::regex_replace(text, std::regex("^(CIM_ERR_\\w+|Unrecognized.*\"): "), "");
     }
@@ -130,11 +139,14 @@ class ProviderReplayTest : public ReplayFixture
         const RecordedExchange recorded(name);
         const std::string method = firstMatch(recorded.request, "<METHODCALL NAME=\"(\\w+)\"");
         std::string elements;
-        for (const std::string& element : elementsOf(recorded.answer.body, "RETURNVALUE"))
+        for (const std::string& element : elementsOf(recorded.answer.body, "RETURNVALUE")) {
             elements += element;
-        for (const std::string& element : elementsOf(recorded.answer.body, "PARAMVALUE"))
-            if (echo == nullptr || firstMatch(element, "NAME=\"(\\w+)\"") == "count")
+        }
+        for (const std::string& element : elementsOf(recorded.answer.body, "PARAMVALUE")) {
+            if (echo == nullptr || firstMatch(element, "NAME=\"(\\w+)\"") == "count") {
                 elements += element;
+            }
+        }
         writeFile(method + ".xml", kMessage + elements + kMessageEnd);
         writeFile(method + ".status", statusLine(recorded.answer));
         writeFile(method + ".echo", echo == nullptr ? "" : std::string(echo) + "\n");
@@ -178,8 +190,9 @@ TEST_F(ProviderReplayTest, failures)
     createLab();
     for (const auto& entry : std::filesystem::directory_iterator(recordingsFolder())) {
         const std::string name = entry.path().filename().string();
-        if (name.rfind("enuminst-fail", 0) != 0)
+        if (name.rfind("enuminst-fail", 0) != 0) {
             continue;
+        }
         writeFile("Lab_Fail.status",
                   name == "enuminst-fail-foreign" ? "throw" : statusLine(RecordedExchange(name).answer));
         expectRecorded(name);
@@ -191,8 +204,9 @@ TEST_F(ProviderReplayTest, methods)
     createLab();
     for (const auto& entry : std::filesystem::directory_iterator(recordingsFolder())) {
         const std::string name = entry.path().filename().string();
-        if (name.rfind("invoke-", 0) != 0 || name == "invoke-noprovider" || name == "invoke-badns")
+        if (name.rfind("invoke-", 0) != 0 || name == "invoke-noprovider" || name == "invoke-badns") {
             continue;
+        }
         const std::string method = firstMatch(RecordedExchange(name).request, "<METHODCALL NAME=\"(\\w+)\"");
         provideMethod(name, method.rfind("Echo", 0) == 0 ? "o" : method == "InOut" ? "" : nullptr);
         expectRecorded(name);
@@ -204,7 +218,8 @@ TEST_F(ProviderReplayTest, otherVendors)
 {
     std::set<std::string> namespaces;
     for (const char* name :
-         {"cli-enum", "cli-embedded", "ptypes-enum", "sample-enum", "sample-sayhello", "mtest-identity"}) {
+         {"cli-enum", "cli-embedded", "ptypes-enum", "sample-enum", "sample-sayhello", "mtest-identity"})
+    {
         const RecordedExchange recorded(name);
         const std::string nameSpace =
             Pegasus::server::percentDecode(firstMatch(recorded.request, "CIMObject: ([\\w%]+?)(%3A|\r)"));
@@ -222,8 +237,9 @@ TEST_F(ProviderReplayTest, otherVendors)
         }
         registerClass(nameSpace, className);
         provideInstances(recorded.answer.body);
-        if (recorded.request.find("<METHODCALL") != std::string::npos)
+        if (recorded.request.find("<METHODCALL") != std::string::npos) {
             provideMethod(name, nullptr);
+        }
         expectRecorded(name, Order::kSorted);
     }
 }

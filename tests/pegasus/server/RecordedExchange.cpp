@@ -1,7 +1,7 @@
-#include "pegasus/server/RecordedExchange.h"
+#include "tests/pegasus/server/RecordedExchange.h"
 
-#include "pegasus/common/XmlReader.h"
-#include "pegasus/server/HttpRequest.h"
+#include "pegasus/server/net/HttpRequest.h"
+#include "pegasus/wire/XmlReader.h"
 
 #include <algorithm>
 #include <cstdlib>
@@ -19,8 +19,9 @@ namespace {
 std::string contentOf(const std::string& path)
 {
     std::ifstream file(path, std::ios::binary);
-    if (!file)
+    if (!file) {
         throw std::runtime_error("no recording " + path);
+    }
     return {std::istreambuf_iterator<char>(file), {}};
 }
 
@@ -36,8 +37,9 @@ HttpAnswer parseAnswer(const std::string& bytes)
     const auto readFields = [](std::istream& from, std::map<std::string, std::string>& to) {
         for (std::string line; std::getline(from, line);) {
             const std::size_t colon = line.find(": ");
-            if (colon == std::string::npos)
+            if (colon == std::string::npos) {
                 continue;
+            }
             std::string name = line.substr(0, colon);
             std::transform(name.begin(), name.end(), name.begin(), [](unsigned char c) { return std::tolower(c); });
             to[name] = line.substr(colon + 2, line.find('\r') - colon - 2);
@@ -64,8 +66,9 @@ void appendCanonical(std::string& out, const XmlElement& element, int depth, Ord
 // The text of a VALUE; an embedded instance is taken apart where order does not matter, for it does not there either.
 std::string canonicalText(std::string text, int depth, Order order)
 {
-    if (order == Order::kAsSent || text.rfind("<INSTANCE ", 0) != 0)
+    if (order == Order::kAsSent || text.rfind("<INSTANCE ", 0) != 0) {
         return ": " + text;
+    }
     XmlDocument document;
     std::string out = "\n";
     appendCanonical(out, document.parseFragment(text.data(), text.size()), depth + 1, order);
@@ -86,29 +89,37 @@ void appendCanonical(std::string& out, const XmlElement& element, int depth, Ord
     std::string scratch;
     element.attributes(kNames, values);
     out += std::string(static_cast<std::size_t>(depth), ' ') + std::string(element.name());
-    for (std::size_t i = 0; i < std::size(kNames); ++i)
-        if (values[i].data() != nullptr)
+    for (std::size_t i = 0; i < std::size(kNames); ++i) {
+        if (values[i].data() != nullptr) {
             out += " " + std::string(kNames[i]) + "=" + std::string(element.resolved(values[i], scratch));
-    if (element.is("VALUE") || element.is("KEYVALUE") || element.is("HOST"))
+        }
+    }
+    if (element.is("VALUE") || element.is("KEYVALUE") || element.is("HOST")) {
         out += canonicalText(std::string(element.text(scratch)), depth, order);
+    }
     out += "\n";
-    if (element.is("VALUE") || element.is("KEYVALUE") || element.is("HOST"))
+    if (element.is("VALUE") || element.is("KEYVALUE") || element.is("HOST")) {
         return;
+    }
     std::vector<std::string> children;
-    for (XmlElement child = element.firstChild(); child; child = child.nextSibling())
+    for (XmlElement child = element.firstChild(); child; child = child.nextSibling()) {
         appendCanonical(children.emplace_back(), child, depth + 1, order);
-    if (order == Order::kSorted && (element.is("IRETURNVALUE") || element.is("INSTANCE")))
+    }
+    if (order == Order::kSorted && (element.is("IRETURNVALUE") || element.is("INSTANCE"))) {
         std::sort(children.begin(), children.end());
-    for (const std::string& child : children)
+    }
+    for (const std::string& child : children) {
         out += child;
+    }
 }
 
 } // namespace
 
 std::string canonicalBody(std::string body, Order order)
 {
-    if (body.find("<?xml") != 0)
+    if (body.find("<?xml") != 0) {
         return body;
+    }
     XmlDocument document;
     std::string out;
     appendCanonical(out, document.parseMessage(body.data(), body.size()), 0, order);
@@ -146,11 +157,14 @@ std::vector<std::string> elementsOf(const std::string& body, const std::string& 
 std::string canonical(const HttpAnswer& answer, Order order)
 {
     std::string text = answer.statusLine + "\n";
-    for (const char* name : {"cimoperation", "cimerror", "pgerrordetail"})
-        if (answer.headers.count(name) != 0)
+    for (const char* name : {"cimoperation", "cimerror", "pgerrordetail"}) {
+        if (answer.headers.count(name) != 0) {
             text += std::string(name) + ": " + header(answer, name) + "\n";
-    for (const auto& [name, value] : answer.trailers)
+        }
+    }
+    for (const auto& [name, value] : answer.trailers) {
         text += name + ": " + Pegasus::server::percentDecode(value) + "\n";
+    }
     return text + canonicalBody(answer.body, order);
 }
 
@@ -166,17 +180,20 @@ std::string firstDifference(const std::string& ours, const std::string& recorded
         a = b = "(end)";
         std::getline(left, a);
         std::getline(right, b);
-        if (!left && !right)
+        if (!left && !right) {
             return "";
+        }
         ++number;
     } while (a == b);
     std::string text = "line " + std::to_string(number - 1);
     std::string more = "\nours:     " + a;
-    for (int i = 0; i < kLines && std::getline(left, a); ++i)
+    for (int i = 0; i < kLines && std::getline(left, a); ++i) {
         more += "\n          " + a;
+    }
     more += "\nrecorded: " + b;
-    for (int i = 0; i < kLines && std::getline(right, b); ++i)
+    for (int i = 0; i < kLines && std::getline(right, b); ++i) {
         more += "\n          " + b;
+    }
     return text + more;
 }
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "pegasus/server/HttpExchange.h"
+#include "tests/pegasus/server/HttpExchange.h"
 
 #include <string>
 #include <vector>

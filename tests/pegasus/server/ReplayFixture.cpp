@@ -1,4 +1,4 @@
-#include "pegasus/server/ReplayFixture.h"
+#include "tests/pegasus/server/ReplayFixture.h"
 
 #include <gmock/gmock.h>
 
@@ -52,8 +52,9 @@ const BetterRow kBetter[] = {
 
 void ReplayFixture::SetUp()
 {
-    if (recordingsFolder().empty())
+    if (recordingsFolder().empty()) {
         GTEST_SKIP() << "VRX_VECTORS_DIR is not set";
+    }
     fTree.start();
 }
 
@@ -90,7 +91,7 @@ void ReplayFixture::declareUsedQualifiers(const std::string& nameSpace, const st
     std::set<std::string> declared;
     for (std::sregex_iterator at(body.begin(), body.end(), use), end; at != end; ++at) {
         const std::smatch& match = *at;
-        if (declared.insert(match[1]).second)
+        if (declared.insert(match[1]).second) {
             send("SetQualifier", nameSpace,
                  "<IPARAMVALUE NAME=\"QualifierDeclaration\">\n<QUALIFIER.DECLARATION NAME=\"" + match[1].str() +
                      "\" TYPE=\"" + match[2].str() + "\" ISARRAY=\"" + (match[4].matched ? "true" : "false") + "\"" +
@@ -98,6 +99,7 @@ void ReplayFixture::declareUsedQualifiers(const std::string& nameSpace, const st
                      ">\n<SCOPE CLASS=\"true\" ASSOCIATION=\"true\" REFERENCE=\"true\" PROPERTY=\"true\" "
                      "METHOD=\"true\" "
                      "PARAMETER=\"true\" INDICATION=\"true\"/>\n</QUALIFIER.DECLARATION>\n</IPARAMVALUE>\n");
+        }
     }
 }
 
@@ -116,8 +118,9 @@ void ReplayFixture::createInstance(const std::string& nameSpace, const std::stri
 void ReplayFixture::createInstances(const std::string& nameSpace, const std::string& recordedAnswer) const
 {
     static const std::regex filledIn("<PROPERTY[^>]*PROPAGATED=[^>]*>\n(<VALUE>[^<]*</VALUE>\n)?</PROPERTY[^>]*>\n");
-    for (const std::string& instance : elementsOf(RecordedExchange(recordedAnswer).answer.body, "INSTANCE"))
+    for (const std::string& instance : elementsOf(RecordedExchange(recordedAnswer).answer.body, "INSTANCE")) {
         createInstance(nameSpace, std::regex_replace(instance, filledIn, ""));
+    }
 }
 
 void ReplayFixture::createClass(const std::string& nameSpace, const std::string& cimClass) const
@@ -130,24 +133,28 @@ void ReplayFixture::createClasses(const std::string& nameSpace, const std::strin
 {
     static const std::regex value("(<PROPERTY[^>]*>\n|</QUALIFIER>\n)(<VALUE>[^<]*</VALUE>\n|<VALUE.ARRAY>\n"
                                   "(?:<VALUE>[^<]*</VALUE>\n)*</VALUE.ARRAY>\n)(?=</PROPERTY)");
-    for (const std::string& cimClass : elementsOf(RecordedExchange(recordedAnswer).answer.body, "CLASS"))
+    for (const std::string& cimClass : elementsOf(RecordedExchange(recordedAnswer).answer.body, "CLASS")) {
         createClass(nameSpace, defaults == Defaults::kKept ? cimClass : std::regex_replace(cimClass, value, "$1"));
+    }
 }
 
 void ReplayFixture::createRecordedSchema(Defaults defaults) const
 {
     createNamespace("root/cimv2");
     declareQualifiers("root/cimv2");
-    for (const char* source : {"getclass-base", "enumclasses", "getclass-localonly"})
+    for (const char* source : {"getclass-base", "enumclasses", "getclass-localonly"}) {
         createClasses("root/cimv2", source, defaults);
+    }
 }
 
 void ReplayFixture::declareQualifiers(const std::string& nameSpace) const
 {
     for (const std::string& declaration :
          elementsOf(RecordedExchange("enumqualifiers").answer.body, "QUALIFIER.DECLARATION"))
+    {
         send("SetQualifier", nameSpace,
              "<IPARAMVALUE NAME=\"QualifierDeclaration\">\n" + declaration + "</IPARAMVALUE>\n");
+    }
 }
 
 } // namespace servertest

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "pegasus/server/RecordedExchange.h"
-#include "pegasus/server/ServerTree.h"
+#include "tests/pegasus/server/RecordedExchange.h"
+#include "tests/pegasus/server/ServerTree.h"
 
 #include <gtest/gtest.h>
 

@@ -1,6 +1,6 @@
 // Recorded requests against our server: the answer must be canonically equal to the recorded one, but for the rows that
 // say why ours is better. The recordings are not part of the project: VRX_VECTORS_DIR names their folder.
-#include "pegasus/server/ReplayFixture.h"
+#include "tests/pegasus/server/ReplayFixture.h"
 
 #include <filesystem>
 #include <map>
@@ -20,22 +20,28 @@ TEST_F(ReplayTest, compilations)
     std::set<std::string> second;
     for (const auto& entry : std::filesystem::directory_iterator(recordingsFolder())) {
         const std::string name = entry.path().filename().string();
-        if (name.rfind("cimmof-small-", 0) == 0)
+        if (name.rfind("cimmof-small-", 0) == 0) {
             first[name] = "";
-        if (name.rfind("cimmof-again-", 0) == 0)
+        }
+        if (name.rfind("cimmof-again-", 0) == 0) {
             second.insert(name);
+        }
     }
     ASSERT_GT(first.size(), 10u);
     for (const auto& [name, substitute] : first) {
         if (name == "cimmof-small-17-GetClass") // whose message before it, a CreateClass, was not recorded either
+        {
             createClasses("root/mofns", "cimmof-again-13-GetClass");
-        if (substitute.empty())
+        }
+        if (substitute.empty()) {
             expectRecorded(name);
-        else
+        } else {
             EXPECT_EQ(replay(substitute).trailers.count("cimstatuscode"), 0u) << substitute;
+        }
     }
-    for (const std::string& name : second)
+    for (const std::string& name : second) {
         expectRecorded(name);
+    }
 }
 
 TEST_F(ReplayTest, schema)
@@ -75,7 +81,9 @@ TEST_F(ReplayTest, schema)
                              "createinstance-badprop",
                              "enumqualifiers-empty",
                              "execquery"})
+    {
         expectRecorded(name);
+    }
 }
 
 // What the server answers of itself: namespaces, registrations, configuration, its own end.
@@ -95,8 +103,9 @@ TEST_F(ReplayTest, ownClasses)
     expectRecorded("cimmof-reg-08-CreateInstance");
 
     std::filesystem::create_directories(fTree.home() + "/provider/labvend");
-    for (const char* name : {"cimconfig-01-UpdatePropertyValue", "cimserver-stop-01-shutdown"})
+    for (const char* name : {"cimconfig-01-UpdatePropertyValue", "cimserver-stop-01-shutdown"}) {
         expectRecorded(name);
+    }
 }
 
 TEST_F(ReplayTest, protocol)
@@ -105,7 +114,9 @@ TEST_F(ReplayTest, protocol)
     for (const auto& entry : std::filesystem::directory_iterator(recordingsFolder())) {
         const std::string name = entry.path().filename().string();
         if (name.rfind("http-", 0) == 0 && name != "http-truncated") // half-closed at once: refused by peer check
+        {
             expectRecorded(name);
+        }
     }
 }
 

@@ -1,4 +1,11 @@
-#include "pegasus/server/ServerTree.h"
+#include "tests/pegasus/server/ServerTree.h"
+
+#include <chrono>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+#include <stdexcept>
 
 #include <netinet/in.h>
 #include <poll.h>
@@ -7,13 +14,6 @@
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
-
-#include <chrono>
-#include <cstdlib>
-#include <filesystem>
-#include <fstream>
-#include <sstream>
-#include <stdexcept>
 
 namespace servertest {
 
@@ -26,8 +26,9 @@ constexpr std::chrono::seconds kProgramLimit{30};
 std::string makeRoot()
 {
     std::string path = (fs::temp_directory_path() / "server-test-XXXXXX").string();
-    if (::mkdtemp(path.data()) == nullptr)
+    if (::mkdtemp(path.data()) == nullptr) {
         throw std::runtime_error("cannot make a temporary folder");
+    }
     return path;
 }
 
@@ -62,8 +63,9 @@ int waitFor(pid_t pid)
     const auto deadline = std::chrono::steady_clock::now() + kProgramLimit;
     int status = 0;
     while (::waitpid(pid, &status, WNOHANG) == 0) {
-        if (std::chrono::steady_clock::now() > deadline)
+        if (std::chrono::steady_clock::now() > deadline) {
             ::kill(pid, SIGKILL);
+        }
         ::poll(nullptr, 0, 2);
     }
     return WIFEXITED(status) ? WEXITSTATUS(status) : -WTERMSIG(status);
@@ -75,8 +77,9 @@ bool waitUntil(bool (*condition)(const void*), const void* argument)
 {
     const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(10);
     while (!condition(argument)) {
-        if (std::chrono::steady_clock::now() > deadline)
+        if (std::chrono::steady_clock::now() > deadline) {
             return false;
+        }
         ::poll(nullptr, 0, 5);
     }
     return true;
@@ -94,8 +97,9 @@ std::vector<int> childrenOf(int pid)
     std::vector<int> children;
     for (const auto& task : fs::directory_iterator("/proc/" + std::to_string(pid) + "/task")) {
         std::istringstream list(readFile(task.path().string() + "/children"));
-        for (int child; list >> child;)
+        for (int child; list >> child;) {
             children.push_back(child);
+        }
     }
     return children;
 }
@@ -105,8 +109,9 @@ ServerTree::ServerTree() : fRoot(makeRoot()), fHome(fRoot + "/pegasus"), fPort(f
     fConsumer = fs::path(fRoot).filename().string();
     fs::create_directories(fHome + "/lib");
     const ProgramResult planned = run("cimconfig", {"-s", "consumer=" + fConsumer, "-p"});
-    if (planned.exitStatus != 0)
+    if (planned.exitStatus != 0) {
         throw std::runtime_error("cimconfig: " + planned.out + planned.err);
+    }
 }
 
 ServerTree::~ServerTree()
@@ -114,8 +119,9 @@ ServerTree::~ServerTree()
     const int pid = serverProcess();
     if (pid > 0 && isRunning(pid)) {
         ::kill(pid, SIGTERM);
-        if (!eventually([&] { return !isRunning(pid); }))
+        if (!eventually([&] { return !isRunning(pid); })) {
             ::kill(pid, SIGKILL);
+        }
     }
     ::unlink(startFile().c_str());
     std::error_code ignored;
@@ -132,15 +138,17 @@ ProgramResult ServerTree::run(const std::string& program, const std::vector<std:
     const std::string out = fRoot + "/out." + program;
     const std::string err = fRoot + "/err." + program;
     std::vector<char*> argv = {const_cast<char*>(program.c_str())};
-    for (const std::string& argument : arguments)
+    for (const std::string& argument : arguments) {
         argv.push_back(const_cast<char*>(argument.c_str()));
+    }
     argv.push_back(nullptr);
     const std::string path = programPath(program);
     const pid_t pid = ::fork();
     if (pid == 0) {
         ::setenv("PEGASUS_HOME", fHome.c_str(), 1);
-        if (::freopen(out.c_str(), "w", stdout) == nullptr || ::freopen(err.c_str(), "w", stderr) == nullptr)
+        if (::freopen(out.c_str(), "w", stdout) == nullptr || ::freopen(err.c_str(), "w", stderr) == nullptr) {
             ::_exit(126);
+        }
         ::execv(path.c_str(), argv.data());
         ::_exit(127);
     }
@@ -156,8 +164,9 @@ void ServerTree::start(const std::vector<std::string>& properties)
     std::vector<std::string> words = {"httpPort=" + std::to_string(fPort), "enableHttpsConnection=false"};
     words.insert(words.end(), properties.begin(), properties.end());
     const ProgramResult result = run("cimserver", words);
-    if (result.exitStatus != 0)
+    if (result.exitStatus != 0) {
         throw std::runtime_error("cimserver: " + result.out + result.err);
+    }
 }
 
 int ServerTree::serverProcess() const
@@ -168,14 +177,16 @@ int ServerTree::serverProcess() const
 void ServerTree::compile(const std::string& nameSpace, const std::string& file)
 {
     const ProgramResult result = run("cimmof", {"-n", nameSpace, "-aE", file});
-    if (result.exitStatus != 0)
+    if (result.exitStatus != 0) {
         throw std::runtime_error("cimmof " + file + ": " + result.out + result.err);
+    }
 }
 
 void ServerTree::compileBase()
 {
-    for (const std::string name : {"PG_Internal", "PG_InterOp"})
+    for (const std::string name : {"PG_Internal", "PG_InterOp"}) {
         compile("root/" + name, std::string(SCHEMA_DIRECTORY) + "/" + name + "/" + name + ".mof");
+    }
 }
 
 void ServerTree::installProbe()
@@ -184,8 +195,9 @@ void ServerTree::installProbe()
     fs::create_directories(fHome + "/provider/probe");
     fs::copy_file(PROBE_LIBRARY, fHome + "/provider/probe/libprobe.so", fs::copy_options::overwrite_existing);
     const ProgramResult result = run("cimconfig", {"-s", "providerDir=provider/probe:"});
-    if (result.exitStatus != 0)
+    if (result.exitStatus != 0) {
         throw std::runtime_error("cimconfig: " + result.out + result.err);
+    }
     compile("root/probe", std::string(TEST_SOURCES) + "/probe.mof");
     compile("root/PG_InterOp", std::string(TEST_SOURCES) + "/probe.registration.mof");
 }

@@ -1,25 +1,25 @@
 // What the server keeps and checks: configuration, files, peers, registrations.
-#include "pegasus/server/Config.h"
-#include "pegasus/server/Listener.h"
-#include "pegasus/server/PeerCheck.h"
-#include "pegasus/server/PrivateFile.h"
-#include "pegasus/server/ProviderRegistry.h"
-#include "pegasus/server/RegistrationChecks.h"
-#include "pegasus/server/StartFile.h"
-#include "pegasus/server/TreeLock.h"
+#include "pegasus/server/admin/Config.h"
+#include "pegasus/server/admin/PrivateFile.h"
+#include "pegasus/server/admin/StartFile.h"
+#include "pegasus/server/admin/TreeLock.h"
+#include "pegasus/server/net/Listener.h"
+#include "pegasus/server/net/PeerCheck.h"
+#include "pegasus/server/operations/ProviderRegistry.h"
+#include "pegasus/server/operations/RegistrationChecks.h"
 
 #include <Pegasus/Common/Exception.h>
 
 #include <gtest/gtest.h>
+
+#include <filesystem>
+#include <fstream>
 
 #include <arpa/inet.h>
 #include <netinet/in.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
 #include <unistd.h>
-
-#include <filesystem>
-#include <fstream>
 
 namespace Pegasus::server {
 namespace {
@@ -77,11 +77,13 @@ TEST_F(StateTest, configurationValuesAreChecked)
         {"repositoryDir", "x\ny", false},
         {"enableHttpsConnection", "true", false},
     };
-    for (const ValueRow& row : rows)
+    for (const ValueRow& row : rows) {
         EXPECT_EQ(isValidConfigValue(*findConfigProperty(row.name), row.value, fHome), row.valid)
             << row.name << "=" << row.value;
-    for (const ConfigProperty& property : configTable())
+    }
+    for (const ConfigProperty& property : configTable()) {
         EXPECT_TRUE(isValidConfigValue(property, property.defaultValue, fHome)) << property.name;
+    }
 }
 
 TEST_F(StateTest, plannedValuesRuleTheNextStartAndCurrentOnesThisRun)
@@ -246,9 +248,11 @@ using Properties = std::vector<std::pair<const char*, CIMValue>>;
 CIMInstance makeInstance(const char* className, const Properties& properties)
 {
     CIMInstance instance((CIMName(className)));
-    for (const auto& [name, value] : properties)
-        if (!value.isNull())
+    for (const auto& [name, value] : properties) {
+        if (!value.isNull()) {
             instance.addProperty(CIMProperty(CIMName(name), value));
+        }
+    }
     return instance;
 }
 
@@ -308,8 +312,9 @@ void addClass(repository::Repository& repository, const char* name, const std::v
         property.addQualifier(CIMQualifier(CIMName("Key"), CIMValue(Boolean(true))));
         cimClass.addProperty(property);
     }
-    for (const auto& [other, value] : others)
+    for (const auto& [other, value] : others) {
         cimClass.addProperty(CIMProperty(CIMName(other), value));
+    }
     repository.createClass(CIMNamespaceName(kInteropNamespace), cimClass);
 }
 
@@ -387,8 +392,9 @@ TEST_F(RegistryTest, registrationsAreCheckedInOrder)
         {"another type of it", capabilities("Q", "2", texts("root/x"), 5), ""},
         {"another namespace", capabilities("Q", "3", texts("root/y")), ""},
     };
-    for (const RegistrationRow& row : rows)
+    for (const RegistrationRow& row : rows) {
         EXPECT_EQ(errorOf(row.instance), row.error) << row.name;
+    }
 
     const auto found = fRegistry.find(CIMNamespaceName("ROOT/X"), CIMName("c"), ProviderType::kInstance);
     ASSERT_TRUE(found);

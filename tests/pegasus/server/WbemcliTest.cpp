@@ -1,6 +1,6 @@
 // A foreign client, Debian's wbemcli, against our server: every verb that it has. It has none for qualifier
 // declarations (GetQualifier, EnumerateQualifiers, SetQualifier) and none for CreateClass.
-#include "pegasus/server/ServerTree.h"
+#include "tests/pegasus/server/ServerTree.h"
 
 #include <gtest/gtest.h>
 
@@ -23,15 +23,17 @@ std::string outputOf(const std::string& command)
     std::string text;
     const std::unique_ptr<FILE, int (*)(FILE*)> pipe(::popen(command.c_str(), "r"), ::pclose);
     char part[4096];
-    for (std::size_t n; (n = std::fread(part, 1, sizeof part, pipe.get())) > 0;)
+    for (std::size_t n; (n = std::fread(part, 1, sizeof part, pipe.get())) > 0;) {
         text.append(part, n);
+    }
     return text;
 }
 
 TEST(WbemcliTest, everyOperation)
 {
-    if (std::system("command -v wbemcli >/dev/null") != 0)
+    if (std::system("command -v wbemcli >/dev/null") != 0) {
         GTEST_SKIP() << "wbemcli is not installed";
+    }
     ServerTree tree;
     tree.start();
     tree.installProbe();
@@ -75,8 +77,9 @@ TEST(WbemcliTest, everyOperation)
     for (const CliRow& row : rows) {
         SCOPED_TRACE(row.name);
         const std::string output = outputOf("wbemcli " + row.arguments);
-        for (const std::string& piece : row.expected)
+        for (const std::string& piece : row.expected) {
             EXPECT_NE(output.find(piece), std::string::npos) << piece << "\nin: " << output.substr(0, 600);
+        }
     }
 }
 

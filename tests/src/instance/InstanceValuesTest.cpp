@@ -1,8 +1,8 @@
 // The values of an instance: names, the two special properties, references.
+#include "tests/src/instance/RetrievalFixture.h"
+
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-
-#include "src/instance/RetrievalFixture.h"
 
 namespace NKOLVRX20 {
 namespace {

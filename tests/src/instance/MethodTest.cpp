@@ -1,11 +1,10 @@
 // Methods called through an instance and through a class.
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
+#include "src/instance/TPEGASUSInstance.h"
+#include "tests/src/schema/ServedNamespace.h"
 
 #include <boost/make_shared.hpp>
-
-#include "src/instance/TPEGASUSInstance.h"
-#include "src/schema/ServedNamespace.h"
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
 
 namespace NKOLVRX20 {
 namespace {
@@ -20,16 +19,18 @@ using ::testing::IsEmpty;
 std::size_t CountOf(const std::string& text, const std::string& part)
 {
     std::size_t count = 0;
-    for (auto at = text.find(part); at != std::string::npos; at = text.find(part, at + 1))
+    for (auto at = text.find(part); at != std::string::npos; at = text.find(part, at + 1)) {
         ++count;
+    }
     return count;
 }
 
 Pegasus::CIMParameter Parameter(const char* name, const std::vector<const char*>& qualifiers)
 {
     Pegasus::CIMParameter parameter(CIMName(name), Pegasus::CIMTYPE_REFERENCE, false, 0, CIMName("CIM_Y"));
-    for (const char* qualifier : qualifiers)
+    for (const char* qualifier : qualifiers) {
         parameter.addQualifier(TrueQualifier(qualifier));
+    }
     return parameter;
 }
 

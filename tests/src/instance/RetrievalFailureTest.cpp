@@ -1,14 +1,14 @@
 // What a server, a property or a visitor that fails costs a retrieval.
-#include <algorithm>
-#include <functional>
+#include "tests/src/instance/RetrievalFixture.h"
+
+#include <host/TRootObject.h>
 
 #include <boost/make_shared.hpp>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <host/TRootObject.h>
-
-#include "src/instance/RetrievalFixture.h"
+#include <algorithm>
+#include <functional>
 
 namespace NKOLVRX20 {
 namespace {
@@ -67,12 +67,13 @@ TEST_F(RetrievalFailureTest, AFailedCallIsLoggedByItsKindAndYieldsNothing)
             SCOPED_TRACE(operation + (isCimError ? " CIM error" : " not HTTP"));
             fServed.fModel.addFault("EnumerateInstances", isCimError ? cimError : closed);
             fServed.Log();
-            if (operation == "EnumerateInstances")
+            if (operation == "EnumerateInstances") {
                 EXPECT_THAT(Enumerate(*target), IsEmpty());
-            else if (operation == "GetInstance")
+            } else if (operation == "GetInstance") {
                 EXPECT_FALSE(target->GetInstance(ReferenceTo("x"), {}));
-            else
+            } else {
                 EXPECT_FALSE(target->GetInstanceWithNsp(ReferenceTo("x"), {}));
+            }
             EXPECT_EQ(isCimError ? "3|DEBUG1:TPEGASUSClass::" + operation +
                                        " from Pegasus for: CIM_A returned exception: CIM_ERR_FAILED: no"
                                  : "3|TPEGASUSClass::" + operation + " from Pegasus for: CIM_A returned exception: " +
@@ -167,10 +168,11 @@ TEST_F(RetrievalFailureTest, AClassThatTheServerLostIsNotEnumerated)
     const auto target = Serve("CIM_A", {});
     for (const std::string operation : {"EnumerateInstances", "GetInstanceWithNsp"}) {
         FailNext("GetClass", 6, "CIM_ERR_NOT_FOUND: CIM_A");
-        if (operation == "EnumerateInstances")
+        if (operation == "EnumerateInstances") {
             EXPECT_THAT(Enumerate(*target), IsEmpty());
-        else
+        } else {
             EXPECT_FALSE(target->GetInstanceWithNsp(ReferenceTo("x"), {}));
+        }
         EXPECT_EQ("0|TPEGASUSClass:" + operation +
                       ". NSP :root/cimv2 Do not have class CIM_Awith pegasus exeption: CIM_ERR_NOT_FOUND: CIM_A",
                   fServed.Log().back());
@@ -216,8 +218,9 @@ class TFailingLogger : public ILogger
 
     void Log(EVRXLogSeverity severity, const std::string& text) override
     {
-        if (text.find("Unable to retrieve property") != std::string::npos)
+        if (text.find("Unable to retrieve property") != std::string::npos) {
             fFailure();
+        }
         fLines.push_back(std::to_string(severity) + "|" + text);
     }
 

@@ -1,15 +1,14 @@
-#ifndef TESTS_SRC_INSTANCE_RETRIEVALFIXTURE_H
-#define TESTS_SRC_INSTANCE_RETRIEVALFIXTURE_H
+#pragma once
 
-#include <string>
-#include <vector>
-
-#include <gtest/gtest.h>
+#include "src/instance/TPEGASUSInstance.h"
+#include "tests/src/schema/ServedNamespace.h"
 
 #include <host/ICIMProperty.h>
 
-#include "src/instance/TPEGASUSInstance.h"
-#include "src/schema/ServedNamespace.h"
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
 
 namespace NKOLVRX20 {
 
@@ -19,8 +18,9 @@ inline Pegasus::CIMInstance Instance(const char* className, const std::string& p
                                      const std::vector<Pegasus::CIMProperty>& properties)
 {
     Pegasus::CIMInstance instance{Pegasus::CIMName(className)};
-    for (const Pegasus::CIMProperty& property : properties)
+    for (const Pegasus::CIMProperty& property : properties) {
         instance.addProperty(property);
+    }
     instance.setPath(Pegasus::CIMObjectPath(Pegasus::String(path.c_str())));
     return instance;
 }
@@ -34,8 +34,9 @@ class TRetrievalFixture : public ::testing::Test
                                            const std::string& timeout = "60")
     {
         fServed.fModel.addClass(kNsp, Pegasus::CIMClass(Pegasus::CIMName(name)));
-        for (const Pegasus::CIMInstance& instance : instances)
+        for (const Pegasus::CIMInstance& instance : instances) {
             fServed.fModel.addInstance(kNsp, instance);
+        }
         const auto made = fServed.Class(name, timeout);
         fServed.Log();
         fServed.TakeRequests();
@@ -76,5 +77,3 @@ class TRetrievalFixture : public ::testing::Test
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,10 +1,10 @@
 // Instances fetched from the server: who is asked, for what, how long it has, and which instance is the one.
-#include <functional>
+#include "tests/src/instance/RetrievalFixture.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "src/instance/RetrievalFixture.h"
+#include <functional>
 
 namespace NKOLVRX20 {
 namespace {
@@ -42,7 +42,9 @@ TEST_F(RetrievalTest, EveryInstanceIsHandedOverInTheServersOrder)
     instances[0]->finishGettingInst();
     EXPECT_TRUE(instances[0]->instReadytoUse());
     for (const std::size_t visits : {1U, 2U}) // the visitor's false ends it
+    {
         EXPECT_EQ(visits, Enumerate(*target, visits).size());
+    }
 }
 
 TEST_F(RetrievalTest, TheRequestSaysWhatTheCallerWants)

@@ -1,15 +1,15 @@
 // Values from the server to the host and back, over every type.
+#include "src/instance/ValueConversion.h"
+
+#include "tests/src/support/StatusOf.h"
+
+#include <host/ICIMClass.h>
+
+#include <boost/make_shared.hpp>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <limits>
-
-#include <boost/make_shared.hpp>
-
-#include <host/ICIMClass.h>
-
-#include "src/instance/ValueConversion.h"
-#include "src/support/StatusOf.h"
 
 namespace NKOLVRX20 {
 namespace {
@@ -23,8 +23,9 @@ constexpr char kInterval[] = "00000003040506.000000:000";
 template <typename T> Pegasus::CIMValue PegArray(std::initializer_list<T> elements)
 {
     Pegasus::Array<T> array;
-    for (const T& element : elements)
+    for (const T& element : elements) {
         array.append(element);
+    }
     return Pegasus::CIMValue(array);
 }
 

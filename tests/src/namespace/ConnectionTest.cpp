@@ -1,14 +1,14 @@
 // Tries and attempts against a server that refuses first.
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
-#include <dlfcn.h>
+#include "src/provider/TPEGASUSProvider.h"
+#include "tests/src/support/NamespaceRig.h"
 
 #include <Pegasus/Client/CIMClient.h>
 #include <host/TVRXException.h>
 
-#include "src/provider/TPEGASUSProvider.h"
-#include "src/support/NamespaceRig.h"
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <dlfcn.h>
 
 namespace {
 
@@ -19,8 +19,9 @@ bool gSettingsFail = false;
 // In front of the client library's own.
 void Pegasus::CIMClient::setTimeout(Uint32 timeoutMs)
 {
-    if (gSettingsFail)
+    if (gSettingsFail) {
         throw Exception("no memory");
+    }
     typedef void (*TFunction)(CIMClient*, Uint32);
     static const auto fgNext = reinterpret_cast<TFunction>(::dlsym(RTLD_NEXT, "_ZN7Pegasus9CIMClient10setTimeoutEj"));
     fgNext(this, timeoutMs);
@@ -69,10 +70,11 @@ TEST_F(ConnectionTest, TriesThreeTimesWithAPauseAfterEachFailure)
             TPEGASUSProvider provider;
             const auto owner = fRig.MakeNamespace();
             const auto connect = [&] {
-                if (isProvider)
+                if (isProvider) {
                     provider.connectPegasusClient("127.0.0.1", fServer.Port(), "", "");
-                else
+                } else {
                     owner->connect("127.0.0.1", fServer.Port(), "", "");
+                }
             };
             isProvider ? provider.initPegasusClient() : owner->Init();
             fServer.Refuse();
@@ -81,27 +83,33 @@ TEST_F(ConnectionTest, TriesThreeTimesWithAPauseAfterEachFailure)
             int pauses = 0;
             fRig.fWorld.fOnSleep = [&](unsigned int seconds) {
                 EXPECT_EQ(1U, seconds);
-                if (++pauses == refusals)
+                if (++pauses == refusals) {
                     fServer.Listen();
+                }
             };
-            if (refusals == 0)
+            if (refusals == 0) {
                 fServer.Listen();
-            if (refusals == 3)
+            }
+            if (refusals == 3) {
                 fRig.fWorld.fOnSleep = nullptr;
+            }
 
             EXPECT_EQ(refusals == 3 ? 42U : 0U, StatusOf(connect));
             std::vector<std::string> log = {texts.fEnter};
-            for (int failed = 1; failed <= refusals; ++failed)
+            for (int failed = 1; failed <= refusals; ++failed) {
                 log.push_back(texts.fFailed + Refusal() + " try to reconnect " + std::to_string(failed));
-            if (refusals < 3)
+            }
+            if (refusals < 3) {
                 log.push_back(texts.fSucceeded);
+            }
             EXPECT_EQ(log, fRig.fLog.Lines());
             EXPECT_EQ(static_cast<std::size_t>(refusals), fRig.fWorld.Traced("sleep").size());
             const Pegasus::CIMClient& client = isProvider ? *provider.getPegClient() : *owner->getPegClient();
             EXPECT_EQ(65535000U, client.getTimeout());
             EXPECT_EQ(refusals < 3, isProvider ? provider.isConnected() : owner->isConnected());
-            if (refusals == 3)
+            if (refusals == 3) {
                 continue;
+            }
 
             fRig.fLog.Take();
             EXPECT_EQ(0U, StatusOf(connect)); // once is enough
@@ -153,8 +161,9 @@ TEST_F(ConnectionTest, SucceedsAtWhicheverAttemptTheServerAppears)
             };
             // One pause follows the start itself, then one each failed try.
             fRig.fWorld.fOnSleep = [&](unsigned int) {
-                if (starts == attempt && pausesSinceStart++ == failedTries)
+                if (starts == attempt && pausesSinceStart++ == failedTries) {
                     fServer.Listen();
+                }
             };
             fRig.fLog.Take();
             const auto ns = fRig.MakeNamespace();

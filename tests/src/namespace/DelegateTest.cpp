@@ -1,8 +1,5 @@
 // What the namespace hands to the host's own namespaces, and how it finds them in the context.
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
-#include <boost/make_shared.hpp>
+#include "tests/src/support/NamespaceRig.h"
 
 #include <host/ICIMInstance.h>
 #include <host/ICIMNamespace.h>
@@ -11,7 +8,9 @@
 #include <host/IProvider.h>
 #include <host/TVRXException.h>
 
-#include "src/support/NamespaceRig.h"
+#include <boost/make_shared.hpp>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
 
 namespace NKOLVRX20 {
 namespace {

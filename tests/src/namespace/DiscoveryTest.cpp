@@ -1,15 +1,15 @@
 // MOF files beside a path, and the providers that lie on disk.
+#include "src/provider/TPEGASUSProvider.h"
+#include "src/provider/TPEGASUSRequestedClassParser.h"
+#include "tests/src/support/NamespaceRig.h"
+
+#include <host/TVRXException.h>
+
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <sys/stat.h>
 #include <unistd.h>
-
-#include <host/TVRXException.h>
-
-#include "src/provider/TPEGASUSProvider.h"
-#include "src/provider/TPEGASUSRequestedClassParser.h"
-#include "src/support/NamespaceRig.h"
 
 namespace NKOLVRX20 {
 namespace {
@@ -195,8 +195,9 @@ TEST_F(DiscoveryTest, SplitsARequestedEntry)
         SCOPED_TRACE(row.fEntry);
         fRig.fLog.Take();
         std::map<std::string, std::string> tags = {{"TimeOut", "-"}}, expected = {{"TimeOut", row.fTimeOut}};
-        if (row.fTag)
+        if (row.fTag) {
             expected["Tag"] = row.fTag;
+        }
         EXPECT_EQ(row.fClass, ns->filterTag4classes(row.fEntry, tags));
         EXPECT_EQ(expected, tags);
         const bool isCdm = row.fTag && std::string(row.fTag) == "CDM";

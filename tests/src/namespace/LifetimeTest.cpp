@@ -1,18 +1,18 @@
 // A host that drops the namespace at an awkward moment: with its objects in hand, or from inside a visitor.
-#include <functional>
-
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
+#include "src/plugin/TPEGASUSNamespaceProvider.h"
+#include "src/provider/TPEGASUSProvider.h"
+#include "src/schema/TPEGASUSClass.h"
+#include "tests/src/support/NamespaceRig.h"
 
 #include <host/ICIMInstance.h>
 #include <host/ICIMProperty.h>
 #include <host/ICIMPropertyDecl.h>
 #include <host/TCIMReference.h>
 
-#include "src/plugin/TPEGASUSNamespaceProvider.h"
-#include "src/provider/TPEGASUSProvider.h"
-#include "src/schema/TPEGASUSClass.h"
-#include "src/support/NamespaceRig.h"
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <functional>
 
 namespace NKOLVRX20 {
 namespace {
@@ -54,14 +54,16 @@ class LifetimeTest : public ::testing::Test
   protected:
     LifetimeTest()
     {
-        for (const char* vendor : {"acme", "beta"})
+        for (const char* vendor : {"acme", "beta"}) {
             fRig.WriteProvider(vendor, "a.classes.xml",
                                "<vrx><nsp name='root/cimv2'/><module name='" + std::string(vendor) +
                                    "'/><timeout value='9'/><class name='ACME_One'/><class name='ACME_Two'/></vrx>");
+        }
         fServer.AnswerClass("ACME_One", "", kElements);
         fServer.AnswerClass("ACME_Two", "ACME_One", kElements);
-        for (const char* name : {"Association", "Key"})
+        for (const char* name : {"Association", "Key"}) {
             fServer.Answer(std::string("GetQualifier ") + name, QualifierDeclaration(name));
+        }
         fServer.Answer("EnumerateInstances ACME_One", NamedInstance("1") + NamedInstance("2"));
         fServer.Listen();
         fRig.OfferPortOf(fServer);
@@ -101,8 +103,9 @@ TEST_F(LifetimeTest, AVisitorMayDropEverythingThatItWasCalledFrom)
     int visits = 0;
     // By value: the first visit drops what the host holds; the rest still comes.
     const auto drop = [&](const auto&...) {
-        if (++visits == 1)
+        if (++visits == 1) {
             Drop();
+        }
         return true;
     };
     const auto dropAndThrow = [&](const auto&) -> bool {

@@ -1,14 +1,7 @@
 // From a provider on disk to one that the host is offered: compilation, collection, connection, enumeration.
-#include <algorithm>
-#include <atomic>
-#include <mutex>
-#include <stdexcept>
-#include <thread>
-
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
-#include <boost/thread/exceptions.hpp>
+#include "src/provider/TPEGASUSProvider.h"
+#include "src/schema/TPEGASUSClass.h"
+#include "tests/src/support/NamespaceRig.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>
@@ -16,9 +9,15 @@
 #include <host/TConfig.h>
 #include <host/TVRXException.h>
 
-#include "src/provider/TPEGASUSProvider.h"
-#include "src/schema/TPEGASUSClass.h"
-#include "src/support/NamespaceRig.h"
+#include <boost/thread/exceptions.hpp>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <atomic>
+#include <mutex>
+#include <stdexcept>
+#include <thread>
 
 namespace NKOLVRX20 {
 namespace {
@@ -44,8 +43,9 @@ class RegistrationTest : public ::testing::Test
     std::string AddProvider(const std::string& vendor, const std::vector<std::string>& entries) const
     {
         std::string text = "<vrx><nsp name='root/" + vendor + "'/><module name='" + vendor + "'/><timeout value='30'/>";
-        for (const std::string& entry : entries)
+        for (const std::string& entry : entries) {
             text += "<class name='" + entry + "'/>";
+        }
         return fRig.WriteProvider(vendor, "a.classes.xml", text + "</vrx>");
     }
 
@@ -267,10 +267,12 @@ TEST_F(ThreadedRegistrationTest, AThreadThatThrowsCostsOneLineAndTheSequenceGoes
     SetThreads("on");
     const auto ns = fRig.MakeConnectedNamespace(fServer);
     fRig.fWorld.fRun = [](const TSpawnCall& call, std::string&) {
-        if (call.fArguments[1] == "root/beta")
+        if (call.fArguments[1] == "root/beta") {
             throw TVRXException(12);
-        if (call.fArguments[1] == "root/gamma")
+        }
+        if (call.fArguments[1] == "root/gamma") {
             throw 42;
+        }
     };
     ns->FindProviders();
     fRig.fWorld.fRun = nullptr;
@@ -302,8 +304,9 @@ TEST_F(ThreadedRegistrationTest, AVisitorThatThrowsOnAThreadCostsOneLine)
     fRig.fLog.Take();
     ns->EnumerateProviders(
         [](boost::shared_ptr<IProvider> provider) -> bool {
-            if (provider->GetName({}) == "beta")
+            if (provider->GetName({}) == "beta") {
                 throw std::runtime_error("no beta");
+            }
             return true;
         },
         {});

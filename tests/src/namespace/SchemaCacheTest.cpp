@@ -1,20 +1,19 @@
 // Names, and the classes that the namespace mirrors from its server.
-#include <atomic>
-
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
-#include <boost/make_shared.hpp>
+#include "src/schema/TPEGASUSClass.h"
+#include "src/schema/TPEGASUSQualifierDecl.h"
+#include "tests/src/support/NamespaceRig.h"
+#include "tests/support/PeerAnswers.h"
 
 #include <Pegasus/Client/CIMClient.h>
 #include <host/ICIMClass.h>
 #include <host/TCIMReference.h>
 #include <host/TVRXException.h>
 
-#include "src/schema/TPEGASUSClass.h"
-#include "src/schema/TPEGASUSQualifierDecl.h"
-#include "src/support/NamespaceRig.h"
-#include "support/PeerAnswers.h"
+#include <boost/make_shared.hpp>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <atomic>
 
 namespace NKOLVRX20 {
 namespace {
@@ -128,7 +127,9 @@ TEST_F(SchemaCacheTest, AsksForAllPropertiesWithQualifiers)
     for (const std::string& body : bodies) {
         EXPECT_NE(std::string::npos, body.find("<IPARAMVALUE NAME=\"LocalOnly\">\n<VALUE>FALSE</VALUE>")) << body;
         for (const char* byDefault : {"IncludeQualifiers", "IncludeClassOrigin", "PropertyList"}) // true, false, all
+        {
             EXPECT_EQ(std::string::npos, body.find(byDefault)) << body;
+        }
         EXPECT_NE(std::string::npos, body.find("<NAMESPACE NAME=\"acme\"/>")) << body;
     }
 }

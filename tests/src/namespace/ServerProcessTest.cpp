@@ -1,17 +1,17 @@
 // The server as a process: the port it gets, what is run with which arguments, what is killed and what is removed.
+#include "tests/src/support/NamespaceRig.h"
+
+#include <host/TVRXException.h>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
 #include <algorithm>
 #include <cstdio>
 #include <cstdlib>
 #include <fstream>
 
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
 #include <sys/stat.h>
-
-#include <host/TVRXException.h>
-
-#include "src/support/NamespaceRig.h"
 
 namespace NKOLVRX20 {
 namespace {
@@ -58,8 +58,9 @@ TEST_F(ServerProcessTest, TakesThePreferredPortOrTheHighestFreeOne)
         EXPECT_EQ(row.fTriesOthers ? std::vector<std::string>{kOthersLine} : std::vector<std::string>{},
                   fRig.fLog.LinesWith("3|Can"));
         std::vector<unsigned short> expected = {5988};
-        for (unsigned int port = 65535; row.fTriesOthers && port >= row.fPort; --port)
+        for (unsigned int port = 65535; row.fTriesOthers && port >= row.fPort; --port) {
             expected.push_back(static_cast<unsigned short>(port));
+        }
         EXPECT_EQ(expected, probed);
     }
 }
@@ -160,12 +161,14 @@ TEST_F(ServerProcessTest, KillsOnlyAServerThatTheStartFileAndTheProcessListingNa
         SCOPED_TRACE(row.fName);
         fRig.fLog.Take();
         fRig.fWorld.Take();
-        if (row.fStartFile)
+        if (row.fStartFile) {
             std::ofstream(fRig.StartFile()) << row.fStartFile;
+        }
         fRig.fWorld.fRun = [&row](const TSpawnCall& call, std::string& output) {
             EXPECT_EQ(360, call.fTimeoutSeconds);
-            if (!row.fListing)
+            if (!row.fListing) {
                 throw TVRXException(12);
+            }
             output = row.fListing;
         };
         ns->killResidualCimserver();

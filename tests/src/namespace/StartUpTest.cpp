@@ -1,16 +1,16 @@
 // Start-up without a server that answers: context, refusals, attempts, vendor preparation, and the whole life's traces.
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
-#include <boost/make_shared.hpp>
-#include <sys/stat.h>
-#include <unistd.h>
+#include "src/plugin/TPEGASUSNamespaceProvider.h"
+#include "tests/src/support/NamespaceRig.h"
 
 #include <host/TCIMReference.h>
 #include <host/TVRXException.h>
 
-#include "src/plugin/TPEGASUSNamespaceProvider.h"
-#include "src/support/NamespaceRig.h"
+#include <boost/make_shared.hpp>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <sys/stat.h>
+#include <unistd.h>
 
 namespace NKOLVRX20 {
 namespace {
@@ -58,8 +58,9 @@ TEST_F(StartUpTest, ReadsTheConsumerFromTheContext)
 TEST_F(StartUpTest, RefusesAConsumerThatAShellWouldMisread)
 {
     std::vector<std::string> consumers = {"a b", "a/b", "a\nb", "a\tb", std::string(1, '\x7F'), "../x"};
-    for (const char character : std::string("\"'\\`$&|;<>()*?[]{}!#~"))
+    for (const char character : std::string("\"'\\`$&|;<>()*?[]{}!#~")) {
         consumers.push_back(std::string("a") + character);
+    }
     for (const std::string& consumer : consumers) {
         SCOPED_TRACE(consumer);
         fRig.fLog.Take();
@@ -108,9 +109,10 @@ TEST_F(StartUpTest, GoesOnUnconnectedAfterSixAttemptsOfThreeTries)
     for (int attempt = 1; attempt <= 6; ++attempt) {
         log.insert(log.end(), {"3|Error opening START", "3|Can not bind to port 5988, try others", "3|",
                                "3|TPEGASUSNamespace::connect enter"});
-        for (int failed = 1; failed <= 3; ++failed)
+        for (int failed = 1; failed <= 3; ++failed) {
             log.push_back("3|TPEGASUSNamespace::connect failed: " + refused + " try to reconnect " +
                           std::to_string(failed));
+        }
         log.push_back("0|TPEGASUSNamespace::connect failed: " + std::string(TVRXException(42).what()) +
                       " try to restart cimserver " + std::to_string(attempt) + "\n");
         trace.insert(trace.end(),
@@ -135,8 +137,9 @@ TEST_F(StartUpTest, GoesOnUnconnectedAfterSixAttemptsOfThreeTries)
 TEST_F(StartUpTest, AnUnconnectedNamespaceAnswersEveryQuestion)
 {
     const auto ns = fRig.MakeNamespaceWithConsumer();
-    for (const char* name : {"CIM_Any", "", "<root>", "1 bad name"})
+    for (const char* name : {"CIM_Any", "", "<root>", "1 bad name"}) {
         EXPECT_EQ(nullptr, ns->GetClass(name, {})) << name;
+    }
     const auto visit = [](auto&&...) {
         ADD_FAILURE() << "nothing to visit";
         return true;
@@ -166,8 +169,9 @@ TEST_F(StartUpTest, AnUnconnectedNamespaceAnswersEveryQuestion)
 TEST_F(StartUpTest, ExceptionsOfOtherFamiliesLeaveAtOnce)
 {
     fRig.fWorld.fRun = [](const TSpawnCall& call, std::string&) {
-        if (call.fName == "cimserver" && call.fArguments.size() == 2)
+        if (call.fName == "cimserver" && call.fArguments.size() == 2) {
             throw std::runtime_error("not of the host's family");
+        }
     };
     const auto ns = fRig.MakeNamespace();
     EXPECT_THROW(ns->Initialize(fRig.Context()), std::runtime_error);
@@ -178,18 +182,20 @@ TEST_F(StartUpTest, ExceptionsOfOtherFamiliesLeaveAtOnce)
 TEST_F(StartUpTest, NoServerProgramMeansSixAttemptsAnExceptionAndAQuietEnd)
 {
     fRig.fWorld.fRun = [](const TSpawnCall& call, std::string&) {
-        if (!call.fProgramPath.empty())
+        if (!call.fProgramPath.empty()) {
             throw TVRXException(12);
+        }
     };
     EXPECT_EQ(12U, StatusOf([&] {
                   TPEGASUSNamespaceProvider::GetInstance()->AllocateNamespace(fRig.Context(), true, "root/other");
               }));
     const std::vector<std::string> failures = fRig.fLog.LinesWith("0|TPEGASUSNamespace::connect failed: ");
     ASSERT_EQ(6U, failures.size());
-    for (std::size_t i = 0; i < failures.size(); ++i)
+    for (std::size_t i = 0; i < failures.size(); ++i) {
         EXPECT_EQ("0|TPEGASUSNamespace::connect failed: " + std::string(TVRXException(12).what()) +
                       " try to restart cimserver " + std::to_string(i + 1) + "\n",
                   failures[i]);
+    }
     EXPECT_NE(nullptr, TPEGASUSNamespaceProvider::GetNamespace());
     fRig.fWorld.Take();
     fRig.fLog.Take();
@@ -234,22 +240,26 @@ TEST_F(StartUpTest, KeepsTheBrocadeLibraryOnlyForItsAdapterVersion)
         fRig.fWorld.Take();
         fRig.fLog.Take();
         fRig.fWorld.fRun = [&row](const TSpawnCall& call, std::string& output) {
-            if (call.fName != "bcu -v")
+            if (call.fName != "bcu -v") {
                 return;
+            }
             EXPECT_EQ(300, call.fTimeoutSeconds);
             output = row.fOutput ? row.fOutput : "3.0.0 of a tool that failed";
-            if (!row.fOutput)
+            if (!row.fOutput) {
                 throw TVRXException(12);
+            }
         };
         ns->preConfig();
         std::vector<std::string> trace = {"run cimconfig -s providerDir=", "system " + RemovalOf("/lsi_mr.conf"),
                                           "run bcu -v"};
-        if (row.fRemoved)
+        if (row.fRemoved) {
             trace.push_back("system " + RemovalOf("R/pegasus/provider/brocade/libdbfaj.so"));
+        }
         EXPECT_EQ(trace, fRig.Abbreviate(fRig.fWorld.Trace()));
         std::vector<std::string> log = {"3|"};
-        if (!row.fOutput)
+        if (!row.fOutput) {
             log.push_back("0|" + std::string(TVRXException(12).what()));
+        }
         EXPECT_EQ(log, fRig.fLog.Lines());
     }
     fRig.fWorld.fRun = nullptr;
@@ -275,8 +285,9 @@ TEST_F(StartUpTest, AsksTheAdapterToolOnThePathForItsVersion)
     const std::string oldPath = ::getenv("PATH");
     const auto ns = fRig.MakeNamespaceWithConsumer();
     fRig.fWorld.fRun = [](const TSpawnCall& call, std::string& output) {
-        if (call.fName == "bcu -v")
+        if (call.fName == "bcu -v") {
             TOutsideWorld::RunByPathForReal(call, output);
+        }
     };
     for (const auto& row : rows) {
         SCOPED_TRACE(row.fName);

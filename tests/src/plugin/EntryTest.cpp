@@ -1,13 +1,13 @@
 // The entry object: the singleton, the module path, and the namespaces that it makes and drops.
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
+#include "src/plugin/TPEGASUSNamespaceProvider.h"
+#include "tests/src/support/NamespaceRig.h"
 
 #include <host/INamespaceProviderManager.h>
 #include <host/TRootObject.h>
 #include <host/TVRXException.h>
 
-#include "src/plugin/TPEGASUSNamespaceProvider.h"
-#include "src/support/NamespaceRig.h"
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
 
 namespace NKOLVRX20 {
 namespace {

@@ -1,15 +1,8 @@
 // The library as a host loads it: what it exports, and that it goes without a trace.
-#include <algorithm>
-#include <cstdio>
-#include <filesystem>
-#include <memory>
-#include <set>
-
-#include <dlfcn.h>
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-#include <malloc.h>
-#include <unistd.h>
+#include "tests/src/support/CapturedLog.h"
+#include "tests/src/support/FakeCimServer.h"
+#include "tests/src/support/OutsideWorld.h"
+#include "tests/src/support/TempTree.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>
@@ -21,10 +14,18 @@
 #include <host/TConfig.h>
 #include <host/TRootObject.h>
 
-#include "src/support/CapturedLog.h"
-#include "src/support/FakeCimServer.h"
-#include "src/support/OutsideWorld.h"
-#include "src/support/TempTree.h"
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <cstdio>
+#include <filesystem>
+#include <memory>
+#include <set>
+
+#include <dlfcn.h>
+#include <malloc.h>
+#include <unistd.h>
 
 namespace NKOLVRX20 {
 namespace {
@@ -54,8 +55,9 @@ class TDeployedModule
     void Clear() const { Call(kClearNamespaceSymbol); }
     void Unload()
     {
-        if (!fHandle)
+        if (!fHandle) {
             return;
+        }
         TRootObject::GetNamespaceProviderManager()->UnregisterNamespaceProvider(fProvider);
         fProvider.reset();
         ::dlclose(fHandle);
@@ -64,8 +66,9 @@ class TDeployedModule
     bool IsStillLoaded() const
     {
         void* handle = ::dlopen(fFile.c_str(), RTLD_NOW | RTLD_NOLOAD);
-        if (handle)
+        if (handle) {
             ::dlclose(handle);
+        }
         return handle != nullptr;
     }
     boost::shared_ptr<INamespaceProvider> Provider() const { return fProvider; }
@@ -143,8 +146,9 @@ std::set<std::string> ExportedSymbols()
     const std::string command = std::string("nm -D --defined-only ") + VRX_PLUGIN_FILE;
     std::FILE* output = ::popen(command.c_str(), "r");
     char address[64], kind[8], name[512];
-    while (std::fscanf(output, "%63s %7s %511s", address, kind, name) == 3)
+    while (std::fscanf(output, "%63s %7s %511s", address, kind, name) == 3) {
         symbols.insert(name);
+    }
     EXPECT_EQ(0, ::pclose(output));
     return symbols;
 }

@@ -1,8 +1,8 @@
 // What a provider says of itself, and what it does not serve.
-#include <gtest/gtest.h>
-
 #include "src/provider/TPEGASUSProvider.h"
-#include "src/support/StatusOf.h"
+#include "tests/src/support/StatusOf.h"
+
+#include <gtest/gtest.h>
 
 namespace NKOLVRX20 {
 namespace {

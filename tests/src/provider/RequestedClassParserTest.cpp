@@ -1,9 +1,9 @@
 // What is read of a requested-class file, and the exact line that each oddity costs.
+#include "src/provider/TPEGASUSRequestedClassParser.h"
+#include "tests/src/support/CapturedLog.h"
+
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-
-#include "src/provider/TPEGASUSRequestedClassParser.h"
-#include "src/support/CapturedLog.h"
 
 namespace NKOLVRX20 {
 namespace {
@@ -91,8 +91,9 @@ TEST(RequestedClassParserTest, ReadsWhatItKnowsAndReportsTheRest)
         EXPECT_EQ(row.fClasses, parser.GetRequestedClassData());
         EXPECT_EQ(row.fInformation, parser.GetRequestedProInfoData());
         std::vector<std::string> lines;
-        for (const std::string& report : row.fReports)
+        for (const std::string& report : row.fReports) {
             lines.push_back("0|Performance Data RDD Parser line " + report);
+        }
         EXPECT_EQ(lines, log.Lines());
     }
 }

@@ -1,6 +1,7 @@
 // What a new class takes over from the server, what it asks for, and what it does without.
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
+#include "src/schema/QualifierBits.h"
+#include "src/schema/TPEGASUSQualifierDecl.h"
+#include "tests/src/schema/ServedNamespace.h"
 
 #include <host/ICIMMethodDecl.h>
 #include <host/ICIMParameterDecl.h>
@@ -9,9 +10,8 @@
 #include <host/ICIMQualifier.h>
 #include <host/TVRXException.h>
 
-#include "src/schema/QualifierBits.h"
-#include "src/schema/ServedNamespace.h"
-#include "src/schema/TPEGASUSQualifierDecl.h"
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
 
 namespace NKOLVRX20 {
 namespace {

@@ -1,11 +1,6 @@
 // The class object's own rules: adding declarations, the hierarchy, its instances.
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
-#include <stdexcept>
-#include <utility>
-
-#include <boost/make_shared.hpp>
+#include "src/schema/TPEGASUSQualifierDecl.h"
+#include "tests/src/schema/ServedNamespace.h"
 
 #include <host/ICIMInstance.h>
 #include <host/ICIMMethodDecl.h>
@@ -14,8 +9,12 @@
 #include <host/ICIMQualifier.h>
 #include <host/TVRXException.h>
 
-#include "src/schema/ServedNamespace.h"
-#include "src/schema/TPEGASUSQualifierDecl.h"
+#include <boost/make_shared.hpp>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <stdexcept>
+#include <utility>
 
 namespace NKOLVRX20 {
 namespace {
@@ -88,15 +87,18 @@ TEST_F(ClassObjectTest, AddPropertyDeclTakesEveryBranch)
         const bool overrides = row.fKind[0] == 'o', isForeign = std::string(row.fKind) == "of";
         const auto target = boost::make_shared<TPEGASUSClass>(fServed.fNamespace, "C", nullptr);
         const std::string first = std::string(row.fName) == "duplicate, other case" ? "P" : row.fProperty;
-        if (!row.fFirst.IsNull())
+        if (!row.fFirst.IsNull()) {
             target->AddPropertyDecl(Declare(isForeign ? base : target, first.c_str(), row.fFirst));
+        }
         const auto second = Declare(target, row.fProperty, row.fSecond, overrides);
         std::vector<std::string> log;
-        if (!row.fMessage.empty())
+        if (!row.fMessage.empty()) {
             log.push_back("0|" + row.fMessage);
-        if (overrides && row.fStatus != 0)
+        }
+        if (overrides && row.fStatus != 0) {
             log.push_back(std::string("0|TPEGASUS: Attempt define property P in class Cfailed. Reason = ") +
                           TVRXStatusCode(row.fStatus).TranslateStatusCode());
+        }
         fServed.Log();
         EXPECT_EQ(row.fStatus, StatusOf([&] { second->AddToClass({}); }));
         EXPECT_EQ(log, fServed.Log());
@@ -111,8 +113,9 @@ TEST_F(ClassObjectTest, OnlyTheCollectionTimeMayBeMissing)
 {
     const auto target = Add("CIM_A");
     EXPECT_FALSE(target->GetPropertyDecl("DateTimeOfCollection", {}));
-    for (const char* name : {"datetimeofcollection", "Other"})
+    for (const char* name : {"datetimeofcollection", "Other"}) {
         EXPECT_EQ(15U, StatusOf([&] { target->GetPropertyDecl(name, {}); })) << name;
+    }
 }
 
 TEST_F(ClassObjectTest, EnumerationsGoInKeyOrderAndStopAtFalse)
@@ -159,8 +162,9 @@ TEST_F(ClassObjectTest, EnumerationsGoInKeyOrderAndStopAtFalse)
 
 TEST_F(ClassObjectTest, TheTreeIsWalkedParentsFirstUntilFalseAndPastAThrowingVisitor)
 {
-    for (const char* name : {"A", "B"})
+    for (const char* name : {"A", "B"}) {
         Add(name);
+    }
     Add("A1", "A");
     Add("A1x", "A1");
     Add("A2", "A");
@@ -186,8 +190,9 @@ TEST_F(ClassObjectTest, TheTreeIsWalkedParentsFirstUntilFalseAndPastAThrowingVis
         root->EnumerateSubClasses(
             [&](const boost::shared_ptr<ICIMClass>& child) {
                 seen.push_back(child->GetName({}));
-                if (seen.back() == row.fThrowAt)
+                if (seen.back() == row.fThrowAt) {
                     throw std::runtime_error("visitor");
+                }
                 return seen.back() != row.fStopAt;
             },
             row.fDeep, {});
@@ -252,11 +257,13 @@ TEST_F(ClassObjectTest, ClearingReachesTheWholeSubtreeAndForeignOwners)
     removed->AddToNamespace({});
     other->RemoveInstance(removed);
     EXPECT_EQ(1, removed.use_count());
-    for (const auto& instance : kept)
+    for (const auto& instance : kept) {
         EXPECT_FALSE(instance.expired());
+    }
     base->ClearInstances();
-    for (const auto& instance : kept)
+    for (const auto& instance : kept) {
         EXPECT_TRUE(instance.expired());
+    }
 }
 
 TEST_F(ClassObjectTest, AClassOutlivesItsNamespaceWithoutReachingForIt)

@@ -1,8 +1,7 @@
 // The declaration elements and their qualifiers, and the texts of a property.
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
-#include <boost/make_shared.hpp>
+#include "src/schema/TPEGASUSProperty.h"
+#include "src/schema/TPEGASUSQualifierDecl.h"
+#include "tests/src/schema/ServedNamespace.h"
 
 #include <host/ICIMMethodDecl.h>
 #include <host/ICIMParameterDecl.h>
@@ -10,9 +9,9 @@
 #include <host/ICIMPropertyDecl.h>
 #include <host/ICIMQualifier.h>
 
-#include "src/schema/ServedNamespace.h"
-#include "src/schema/TPEGASUSProperty.h"
-#include "src/schema/TPEGASUSQualifierDecl.h"
+#include <boost/make_shared.hpp>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
 
 namespace NKOLVRX20 {
 namespace {
@@ -114,7 +113,9 @@ TEST_F(DeclarationTest, ElementsCompareByNameAndAssignNothing)
                                  {[&] { m->Validate({}); }},
                                  {[&] { x->Validate({}); }},
                                  {[&] { q->Validate({}); }}})
+    {
         EXPECT_NO_THROW(validate());
+    }
 }
 
 TEST_F(DeclarationTest, AQualifierAndItsDeclarationKeepValueAndFlavorApart)
@@ -202,8 +203,9 @@ TEST_F(DeclarationTest, PropertyTextsFollowTheDeclaration)
     for (const auto& row : rows) {
         SCOPED_TRACE(row.fName);
         const auto declaration = fClass->AllocatePropertyDecl("P" + std::to_string(number++), row.fValue, {});
-        for (const TQualifier& qualifier : row.fQualifiers)
+        for (const TQualifier& qualifier : row.fQualifiers) {
             Qualify(*declaration, qualifier.fName, qualifier.fValue);
+        }
         const TPEGASUSProperty property(row.fValue, declaration, fClass);
         EXPECT_EQ(row.fText, property.ToString());
         EXPECT_EQ(row.fValue.IsNull() ? 0U : row.fValue.IsArray() ? 3U : 1U, property.ToStringVector().size());

@@ -1,8 +1,8 @@
-#include "src/schema/ServedNamespace.h"
-
-#include <boost/make_shared.hpp>
+#include "tests/src/schema/ServedNamespace.h"
 
 #include "src/common/Constants.h"
+
+#include <boost/make_shared.hpp>
 
 namespace NKOLVRX20 {
 
@@ -11,8 +11,9 @@ namespace {
 std::string TextBetween(const std::string& text, const std::string& from, const std::string& to)
 {
     const auto start = text.find(from);
-    if (start == std::string::npos)
+    if (start == std::string::npos) {
         return "";
+    }
     const auto begin = start + from.size();
     return text.substr(begin, text.find(to, begin) - begin);
 }
@@ -29,8 +30,9 @@ std::string RequestName(const test::PeerRequest& request)
 TServedNamespace::TServedNamespace() : fPeer(fModel.handler()), fNamespace(fRig.MakeNamespaceWithConsumer())
 {
     using namespace Pegasus;
-    for (const char* name : {"Key", "Association", "Abstract", "In", "Out"})
+    for (const char* name : {"Key", "Association", "Abstract", "In", "Out"}) {
         fModel.addQualifier(kNsp, CIMQualifierDecl(CIMName(name), CIMValue(false), CIMScope::ANY));
+    }
     fModel.addQualifier(kNsp, CIMQualifierDecl(CIMName("Override"), CIMValue(CIMTYPE_STRING, false),
                                                CIMScope::PROPERTY + CIMScope::METHOD, CIMFlavor::RESTRICTED));
     fNamespace->Init();
@@ -56,8 +58,9 @@ std::vector<std::string> TServedNamespace::TakeRequests()
 {
     std::vector<std::string> names;
     const auto requests = fPeer.requests();
-    for (; fSeen < requests.size(); ++fSeen)
+    for (; fSeen < requests.size(); ++fSeen) {
         names.push_back(RequestName(requests[fSeen]));
+    }
     return names;
 }
 
@@ -74,8 +77,9 @@ Pegasus::CIMQualifier TextQualifier(const char* name, const char* text)
 Pegasus::CIMProperty Property(const char* name, const Pegasus::CIMValue& value, const char* qualifier)
 {
     Pegasus::CIMProperty property{Pegasus::CIMName(name), value};
-    if (qualifier)
+    if (qualifier) {
         property.addQualifier(TrueQualifier(qualifier));
+    }
     return property;
 }
 

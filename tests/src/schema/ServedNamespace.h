@@ -1,16 +1,15 @@
-#ifndef TESTS_SRC_SCHEMA_SERVEDNAMESPACE_H
-#define TESTS_SRC_SCHEMA_SERVEDNAMESPACE_H
-
-#include <string>
-#include <vector>
-
-#include <Pegasus/Client/CIMClient.h>
+#pragma once
 
 #include "src/provider/TPEGASUSProvider.h"
 #include "src/schema/TPEGASUSClass.h"
-#include "src/support/NamespaceRig.h"
-#include "support/PeerAnswers.h"
-#include "support/ScriptedPeer.h"
+#include "tests/src/support/NamespaceRig.h"
+#include "tests/support/PeerAnswers.h"
+#include "tests/support/ScriptedPeer.h"
+
+#include <Pegasus/Client/CIMClient.h>
+
+#include <string>
+#include <vector>
 
 namespace NKOLVRX20 {
 
@@ -48,5 +47,3 @@ Pegasus::CIMQualifier TextQualifier(const char* name, const char* text);
 Pegasus::CIMProperty Property(const char* name, const Pegasus::CIMValue& value, const char* qualifier = nullptr);
 
 } // namespace NKOLVRX20
-
-#endif

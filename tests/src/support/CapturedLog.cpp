@@ -1,10 +1,10 @@
-#include "src/support/CapturedLog.h"
+#include "tests/src/support/CapturedLog.h"
+
+#include <host/TRootObject.h>
 
 #include <algorithm>
 #include <iterator>
 #include <stdexcept>
-
-#include <host/TRootObject.h>
 
 namespace NKOLVRX20 {
 
@@ -18,8 +18,9 @@ TCapturedLog::~TCapturedLog()
 void TCapturedLog::Log(EVRXLogSeverity severity, const std::string& text)
 {
     const std::lock_guard<std::mutex> lock(fMutex);
-    if (!fFailingPart.empty() && text.find(fFailingPart) != std::string::npos)
+    if (!fFailingPart.empty() && text.find(fFailingPart) != std::string::npos) {
         throw std::runtime_error("the log is full");
+    }
     fLines.push_back(std::to_string(severity) + "|" + text);
 }
 

@@ -1,11 +1,10 @@
-#ifndef TESTS_SRC_SUPPORT_CAPTUREDLOG_H
-#define TESTS_SRC_SUPPORT_CAPTUREDLOG_H
+#pragma once
+
+#include <host/ILogger.h>
 
 #include <mutex>
 #include <string>
 #include <vector>
-
-#include <host/ILogger.h>
 
 namespace NKOLVRX20 {
 
@@ -35,5 +34,3 @@ class TCapturedLog : public ILogger
 };
 
 } // namespace NKOLVRX20
-
-#endif

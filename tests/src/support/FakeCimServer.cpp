@@ -1,8 +1,8 @@
-#include "src/support/FakeCimServer.h"
+#include "tests/src/support/FakeCimServer.h"
+
+#include "tests/support/PeerAnswers.h"
 
 #include <algorithm>
-
-#include "support/PeerAnswers.h"
 
 namespace NKOLVRX20 {
 
@@ -50,8 +50,9 @@ void TFakeCimServer::AnswerWith(const std::string& request, test::PeerHandler ha
 std::vector<std::string> TFakeCimServer::Requests() const
 {
     std::vector<std::string> names;
-    for (const test::PeerRequest& request : fPeer.requests())
+    for (const test::PeerRequest& request : fPeer.requests()) {
         names.push_back(NameOf(request));
+    }
     return names;
 }
 
@@ -65,8 +66,9 @@ std::vector<std::string> TFakeCimServer::Bodies(const std::string& request) cons
 {
     std::vector<std::string> bodies;
     for (const test::PeerRequest& asked : fPeer.requests()) {
-        if (NameOf(asked) == request)
+        if (NameOf(asked) == request) {
             bodies.push_back(asked.body);
+        }
     }
     return bodies;
 }
@@ -77,8 +79,9 @@ test::PeerAnswer TFakeCimServer::Respond(const test::PeerRequest& request)
     {
         const std::lock_guard<std::mutex> lock(fMutex);
         const auto scripted = fHandlers.find(NameOf(request));
-        if (scripted != fHandlers.end())
+        if (scripted != fHandlers.end()) {
             handler = scripted->second;
+        }
     }
     return handler ? handler(request) : test::errorAnswer(request, 6, "CIM_ERR_NOT_FOUND: not in the script");
 }

@@ -1,13 +1,12 @@
-#ifndef TESTS_SRC_SUPPORT_FAKECIMSERVER_H
-#define TESTS_SRC_SUPPORT_FAKECIMSERVER_H
+#pragma once
+
+#include "tests/support/ScriptedPeer.h"
 
 #include <functional>
 #include <map>
 #include <mutex>
 #include <string>
 #include <vector>
-
-#include "support/ScriptedPeer.h"
 
 namespace NKOLVRX20 {
 
@@ -47,5 +46,3 @@ class TFakeCimServer
 };
 
 } // namespace NKOLVRX20
-
-#endif

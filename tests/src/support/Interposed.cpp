@@ -1,5 +1,10 @@
 // The functions that the test program puts in front of libc and of the host's process service. Each asks the current
 // TOutsideWorld, and forwards to the next definition when there is none or the call is not the plug-in's.
+#include "tests/src/support/OutsideWorld.h"
+
+#include <host/TOSSpecific.h>
+#include <host/TVRXException.h>
+
 #include <cerrno>
 #include <csignal>
 #include <cstdio>
@@ -11,11 +16,6 @@
 #include <pthread.h>
 #include <sys/socket.h>
 #include <unistd.h>
-
-#include <host/TOSSpecific.h>
-#include <host/TVRXException.h>
-
-#include "src/support/OutsideWorld.h"
 
 using NKOLVRX20::TOutsideWorld;
 
@@ -30,11 +30,13 @@ std::FILE* OpenFile(const char* function, const char* path, const char* mode)
 {
     const auto next = Next<std::FILE*(const char*, const char*)>(function);
     TOutsideWorld* world = TOutsideWorld::Current();
-    if (!world)
+    if (!world) {
         return next(path, mode);
+    }
     const auto redirected = world->fFiles.find(path);
-    if (redirected == world->fFiles.end())
+    if (redirected == world->fFiles.end()) {
         return next(path, mode);
+    }
     if (redirected->second.empty()) {
         errno = EACCES;
         return nullptr;
@@ -66,19 +68,22 @@ extern "C" {
 unsigned int sleep(unsigned int seconds)
 {
     TOutsideWorld* world = TOutsideWorld::Current();
-    if (!world)
+    if (!world) {
         return Next<unsigned int(unsigned int)>("sleep")(seconds);
+    }
     world->Record("sleep " + std::to_string(seconds));
-    if (world->fOnSleep)
+    if (world->fOnSleep) {
         world->fOnSleep(seconds);
+    }
     return 0;
 }
 
 int system(const char* command)
 {
     TOutsideWorld* world = TOutsideWorld::Current();
-    if (!world)
+    if (!world) {
         return Next<int(const char*)>("system")(command);
+    }
     world->Record(std::string("system ") + command);
     return 0;
 }
@@ -86,8 +91,9 @@ int system(const char* command)
 int kill(pid_t pid, int signal) noexcept
 {
     TOutsideWorld* world = TOutsideWorld::Current();
-    if (!world)
+    if (!world) {
         return Next<int(pid_t, int)>("kill")(pid, signal);
+    }
     world->Record("kill " + std::to_string(pid) + " " + std::to_string(signal));
     return world->fKillFails ? -1 : 0;
 }
@@ -111,8 +117,9 @@ int bind(int descriptor, const sockaddr* address, socklen_t length) noexcept
             errno = EADDRINUSE;
             return -1;
         }
-        if (port != 0 && !world->fBindForReal)
+        if (port != 0 && !world->fBindForReal) {
             return 0;
+        }
     }
     return Next<int(int, const sockaddr*, socklen_t)>("bind")(descriptor, address, length);
 }
@@ -120,19 +127,22 @@ int bind(int descriptor, const sockaddr* address, socklen_t length) noexcept
 int dladdr(const void* address, Dl_info* info) noexcept
 {
     TOutsideWorld* world = TOutsideWorld::Current();
-    if (world && world->fDladdrFails)
+    if (world && world->fDladdrFails) {
         return 0;
+    }
     const int found = Next<int(const void*, Dl_info*)>("dladdr")(address, info);
-    if (world && world->fDladdrFile)
+    if (world && world->fDladdrFile) {
         info->dli_fname = world->fDladdrFile;
+    }
     return found;
 }
 
 int pthread_create(pthread_t* thread, const pthread_attr_t* attributes, void* (*start)(void*), void* argument) noexcept
 {
     TOutsideWorld* world = TOutsideWorld::Current();
-    if (world && IsBoostThread(start) && !world->TakeThread())
+    if (world && IsBoostThread(start) && !world->TakeThread()) {
         return EAGAIN;
+    }
     return Next<int(pthread_t*, const pthread_attr_t*, void* (*)(void*), void*)>("pthread_create")(thread, attributes,
                                                                                                    start, argument);
 }
@@ -182,22 +192,24 @@ void TOutsideWorld::RunByPathForReal(const TSpawnCall& call, std::string& output
 void TOSSpecific::SpawnProcess(const std::string& commandLine, const std::vector<std::string>& arguments,
                                std::string& output, int timeoutSeconds)
 {
-    if (TOutsideWorld* world = TOutsideWorld::Current())
+    if (TOutsideWorld* world = TOutsideWorld::Current()) {
         world->Run({commandLine, arguments, "", {}, timeoutSeconds}, output);
-    else
+    } else {
         TOutsideWorld::RunByPathForReal({commandLine, arguments, "", {}, timeoutSeconds}, output);
+    }
 }
 
 void TOSSpecific::SpawnProcess(const std::string& name, const std::vector<std::string>& arguments,
                                const std::string& programPath, const std::vector<std::string>& environment,
                                std::string& output, int timeoutSeconds)
 {
-    if (TOutsideWorld* world = TOutsideWorld::Current())
+    if (TOutsideWorld* world = TOutsideWorld::Current()) {
         world->Run({name, arguments, programPath, environment, timeoutSeconds}, output);
-    else
+    } else {
         Next<void(const std::string&, const std::vector<std::string>&, const std::string&,
                   const std::vector<std::string>&, std::string&, int)>(kRunInEnvironment)(
             name, arguments, programPath, environment, output, timeoutSeconds);
+    }
 }
 
 } // namespace NKOLVRX20

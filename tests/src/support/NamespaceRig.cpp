@@ -1,13 +1,14 @@
-#include "src/support/NamespaceRig.h"
+#include "tests/src/support/NamespaceRig.h"
 
-#include <filesystem>
-
-#include <boost/make_shared.hpp>
-#include <unistd.h>
+#include "src/plugin/TPEGASUSNamespaceProvider.h"
 
 #include <host/TConfig.h>
 
-#include "src/plugin/TPEGASUSNamespaceProvider.h"
+#include <boost/make_shared.hpp>
+
+#include <filesystem>
+
+#include <unistd.h>
 
 namespace NKOLVRX20 {
 
@@ -15,8 +16,9 @@ namespace {
 
 void ReplaceAll(std::string& text, const std::string& what, const std::string& by)
 {
-    for (auto at = text.find(what); at != std::string::npos; at = text.find(what, at + by.size()))
+    for (auto at = text.find(what); at != std::string::npos; at = text.find(what, at + by.size())) {
         text.replace(at, what.size(), by);
+    }
 }
 
 } // namespace
@@ -101,8 +103,9 @@ std::string TNamespaceRig::Abbreviate(std::string text) const
 std::vector<std::string> TNamespaceRig::Abbreviate(const std::vector<std::string>& texts) const
 {
     std::vector<std::string> abbreviated;
-    for (const std::string& text : texts)
+    for (const std::string& text : texts) {
         abbreviated.push_back(Abbreviate(text));
+    }
     return abbreviated;
 }
 

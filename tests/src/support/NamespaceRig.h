@@ -1,19 +1,18 @@
-#ifndef TESTS_SRC_SUPPORT_NAMESPACERIG_H
-#define TESTS_SRC_SUPPORT_NAMESPACERIG_H
+#pragma once
 
-#include <string>
-#include <vector>
-
-#include <boost/shared_ptr.hpp>
+#include "src/namespace/TPEGASUSNamespace.h"
+#include "tests/src/support/CapturedLog.h"
+#include "tests/src/support/FakeCimServer.h"
+#include "tests/src/support/OutsideWorld.h"
+#include "tests/src/support/StatusOf.h"
+#include "tests/src/support/TempTree.h"
 
 #include <host/TCIMValue.h>
 
-#include "src/namespace/TPEGASUSNamespace.h"
-#include "src/support/CapturedLog.h"
-#include "src/support/FakeCimServer.h"
-#include "src/support/OutsideWorld.h"
-#include "src/support/StatusOf.h"
-#include "src/support/TempTree.h"
+#include <boost/shared_ptr.hpp>
+
+#include <string>
+#include <vector>
 
 namespace NKOLVRX20 {
 
@@ -58,5 +57,3 @@ class TNamespaceRig
 std::string RemovalOf(const std::string& path, const std::string& options = "-rf");
 
 } // namespace NKOLVRX20
-
-#endif

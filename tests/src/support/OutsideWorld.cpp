@@ -1,4 +1,4 @@
-#include "src/support/OutsideWorld.h"
+#include "tests/src/support/OutsideWorld.h"
 
 #include <atomic>
 
@@ -35,8 +35,9 @@ std::vector<std::string> TOutsideWorld::Traced(const std::string& kind) const
 {
     std::vector<std::string> chosen;
     for (const std::string& entry : Trace()) {
-        if (entry.compare(0, kind.size() + 1, kind + " ") == 0)
+        if (entry.compare(0, kind.size() + 1, kind + " ") == 0) {
             chosen.push_back(entry.substr(kind.size() + 1));
+        }
     }
     return chosen;
 }
@@ -71,23 +72,26 @@ void TOutsideWorld::Record(const std::string& entry)
 void TOutsideWorld::Run(const TSpawnCall& call, std::string& output)
 {
     std::string entry = "run " + call.fName;
-    for (const std::string& argument : call.fArguments)
+    for (const std::string& argument : call.fArguments) {
         entry += " " + argument;
+    }
     {
         const std::lock_guard<std::mutex> lock(fMutex);
         fTrace.push_back(entry);
         fRuns.push_back(call);
     }
     output.clear();
-    if (fRun)
+    if (fRun) {
         fRun(call, output);
+    }
 }
 
 bool TOutsideWorld::TakeThread()
 {
     const std::lock_guard<std::mutex> lock(fMutex);
-    if (fThreadsUntilFailure == -1)
+    if (fThreadsUntilFailure == -1) {
         return true;
+    }
     return fThreadsUntilFailure-- > 0;
 }
 

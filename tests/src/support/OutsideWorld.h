@@ -1,5 +1,4 @@
-#ifndef TESTS_SRC_SUPPORT_OUTSIDEWORLD_H
-#define TESTS_SRC_SUPPORT_OUTSIDEWORLD_H
+#pragma once
 
 #include <functional>
 #include <map>
@@ -77,5 +76,3 @@ class TOutsideWorld
 };
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef TESTS_SRC_SUPPORT_STATUSOF_H
-#define TESTS_SRC_SUPPORT_STATUSOF_H
+#pragma once
 
 #include <host/TVRXException.h>
 
@@ -17,5 +16,3 @@ template <typename TCall> unsigned int StatusOf(TCall call)
 }
 
 } // namespace NKOLVRX20
-
-#endif

@@ -1,4 +1,4 @@
-#include "src/support/TempTree.h"
+#include "tests/src/support/TempTree.h"
 
 #include <cstdlib>
 #include <fstream>
@@ -10,8 +10,9 @@ namespace NKOLVRX20 {
 TTempTree::TTempTree()
 {
     std::string pattern = (std::filesystem::temp_directory_path() / "vrx-nsp-XXXXXX").string();
-    if (!::mkdtemp(pattern.data()))
+    if (!::mkdtemp(pattern.data())) {
         throw std::runtime_error("no temporary directory " + pattern);
+    }
     fPath = std::filesystem::canonical(pattern);
 }
 

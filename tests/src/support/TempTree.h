@@ -1,5 +1,4 @@
-#ifndef TESTS_SRC_SUPPORT_TEMPTREE_H
-#define TESTS_SRC_SUPPORT_TEMPTREE_H
+#pragma once
 
 #include <filesystem>
 #include <string>
@@ -30,5 +29,3 @@ class TTempTree
 std::string ReadWholeFile(const std::string& path);
 
 } // namespace NKOLVRX20
-
-#endif

@@ -3,8 +3,7 @@
 
   The factory of a provider receives the pointer and may keep it for as long as its library is loaded.
  */
-#ifndef CMPI_BROKER_H
-#define CMPI_BROKER_H
+#pragma once
 
 #include "objects.h"
 
@@ -176,6 +175,4 @@ struct CMPIBrokerMemFT
 
 #ifdef __cplusplus
 }
-#endif
-
 #endif

@@ -6,8 +6,7 @@
   An object that is not a clone lives until the provider's function returns; a clone until it is released.
   The handle of a CMPIString is its NUL-terminated text. Every trailing `rc` may be NULL.
  */
-#ifndef CMPI_OBJECTS_H
-#define CMPI_OBJECTS_H
+#pragma once
 
 #include "types.h"
 
@@ -316,6 +315,4 @@ struct CMPIEnumerationFilterFT
 
 #ifdef __cplusplus
 }
-#endif
-
 #endif

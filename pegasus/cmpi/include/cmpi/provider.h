@@ -7,8 +7,7 @@
       CMPIInstanceMI* _Generic_Create_InstanceMI(const CMPIBroker*, const CMPIContext*, const char* name, CMPIStatus*
   rc) and its four siblings. Before a slot is read, ftVersion is compared with the version that added it.
  */
-#ifndef CMPI_PROVIDER_H
-#define CMPI_PROVIDER_H
+#pragma once
 
 #include "broker.h"
 
@@ -150,6 +149,4 @@ struct CMPIIndicationMIFT
 
 #ifdef __cplusplus
 }
-#endif
-
 #endif

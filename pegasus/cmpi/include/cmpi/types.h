@@ -4,8 +4,7 @@
   Source: the Common Manageability Programming Interface of The Open Group; sizes and codes are those of x86-64 Linux
   and are the same for versions 1.0, 2.0 and 2.1, so that providers compiled elsewhere are binary compatible.
  */
-#ifndef CMPI_TYPES_H
-#define CMPI_TYPES_H
+#pragma once
 
 #include <stddef.h>
 
@@ -367,6 +366,4 @@ typedef CMPIData CMPIAccessor(const char* name, void* parm);
 
 #ifdef __cplusplus
 }
-#endif
-
 #endif

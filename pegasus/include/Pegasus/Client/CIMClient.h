@@ -1,5 +1,4 @@
-#ifndef Pegasus_CIMClient_h
-#define Pegasus_CIMClient_h
+#pragma once
 
 #include <Pegasus/Client/CIMClientException.h>
 #include <Pegasus/Common/CIMClass.h>
@@ -19,37 +18,37 @@ PEGASUS_NAMESPACE_BEGIN
 
 class CIMClientRep;
 
-/// A connection to a CIM server and its operations (CIM-XML over HTTP/1.1, DSP0200).
-///
-/// The connection is kept. When the server closes it, when a call runs out of time or an answer is broken, the client
-/// stays connected in name and opens a new one at the next operation.
-///
-/// Throws (operations): NotConnectedException; CannotConnectException (also on that reconnection);
-/// ConnectionTimeoutException; CIMClientMalformedHTTPException, CIMClientHTTPErrorException, CIMClientXmlException,
-/// CIMClientResponseException; CIMException with the server's status; InvalidNamespaceNameException (null namespace).
-/// Thread: one thread at a time for each client.
-/// Blocks: at most the time-out for each call, connecting, sending, waiting and reading together. Only connect() may
-/// take longer: looking up a host name is bounded by the resolver's own settings.
+// A connection to a CIM server and its operations (CIM-XML over HTTP/1.1, DSP0200).
+//
+// The connection is kept. When the server closes it, when a call runs out of time or an answer is broken, the client
+// stays connected in name and opens a new one at the next operation.
+//
+// Throws (operations): NotConnectedException; CannotConnectException (also on that reconnection);
+// ConnectionTimeoutException; CIMClientMalformedHTTPException, CIMClientHTTPErrorException, CIMClientXmlException,
+// CIMClientResponseException; CIMException with the server's status; InvalidNamespaceNameException (null namespace).
+// Thread: one thread at a time for each client.
+// Blocks: at most the time-out for each call, connecting, sending, waiting and reading together. Only connect() may
+// take longer: looking up a host name is bounded by the resolver's own settings.
 class PEGASUS_CLIENT_LINKAGE CIMClient
 {
   public:
     CIMClient();
-    /// Disconnects.
+    // Disconnects.
     ~CIMClient();
     CIMClient(const CIMClient&) = delete;
     CIMClient& operator=(const CIMClient&) = delete;
 
-    /// In milliseconds; at first 20000.
+    // In milliseconds; at first 20000.
     Uint32 getTimeout() const;
-    /// From the next call on. With 0 every operation ends at once with ConnectionTimeoutException.
+    // From the next call on. With 0 every operation ends at once with ConnectionTimeoutException.
     void setTimeout(Uint32 timeoutMilliseconds);
 
-    /// Opens a TCP connection; user and password are only remembered. An empty host is the local machine, an empty host
-    /// with port 0 the local socket.
-    /// Throws: AlreadyConnectedException, CannotConnectException, InvalidLocatorException.
+    // Opens a TCP connection; user and password are only remembered. An empty host is the local machine, an empty host
+    // with port 0 the local socket.
+    // Throws: AlreadyConnectedException, CannotConnectException, InvalidLocatorException.
     void connect(const String& host, const Uint32 portNumber, const String& userName, const String& password);
-    /// Connects to the private socket of the server whose tree is named by the environment's PEGASUS_HOME.
-    /// Throws: AlreadyConnectedException, CannotConnectException.
+    // Connects to the private socket of the server whose tree is named by the environment's PEGASUS_HOME.
+    // Throws: AlreadyConnectedException, CannotConnectException.
     void connectLocal();
     void disconnect();
 
@@ -78,7 +77,7 @@ class PEGASUS_CLIENT_LINKAGE CIMClient
     Array<CIMQualifierDecl> enumerateQualifiers(const CIMNamespaceName& nameSpace);
     void setQualifier(const CIMNamespaceName& nameSpace, const CIMQualifierDecl& qualifierDeclaration);
 
-    /// The path's host and namespace are not used. `outParameters` is replaced.
+    // The path's host and namespace are not used. `outParameters` is replaced.
     CIMValue invokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPath& instanceName,
                           const CIMName& methodName, const Array<CIMParamValue>& inParameters,
                           Array<CIMParamValue>& outParameters);
@@ -88,5 +87,3 @@ class PEGASUS_CLIENT_LINKAGE CIMClient
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,11 +1,10 @@
-#ifndef Pegasus_CIMClientException_h
-#define Pegasus_CIMClientException_h
+#pragma once
 
 #include <Pegasus/Common/Exception.h>
 
 PEGASUS_NAMESPACE_BEGIN
 
-/// The server's answer is not a usable HTTP message.
+// The server's answer is not a usable HTTP message.
 class PEGASUS_CLIENT_LINKAGE CIMClientMalformedHTTPException : public Exception
 {
   public:
@@ -13,7 +12,7 @@ class PEGASUS_CLIENT_LINKAGE CIMClientMalformedHTTPException : public Exception
     ~CIMClientMalformedHTTPException() override;
 };
 
-/// The server answered with another HTTP status than 200.
+// The server answered with another HTTP status than 200.
 class PEGASUS_CLIENT_LINKAGE CIMClientHTTPErrorException : public Exception
 {
   public:
@@ -25,7 +24,7 @@ class PEGASUS_CLIENT_LINKAGE CIMClientHTTPErrorException : public Exception
     ~CIMClientHTTPErrorException() override;
     CIMClientHTTPErrorException& operator=(const CIMClientHTTPErrorException& exception) = default;
 
-    /// Returns: the HTTP status.
+    // Returns: the HTTP status.
     Uint32 getCode() const;
     String getCIMError() const;
     String getCIMErrorDetail() const;
@@ -36,7 +35,7 @@ class PEGASUS_CLIENT_LINKAGE CIMClientHTTPErrorException : public Exception
     String fCIMErrorDetail;
 };
 
-/// The answer's XML is not well formed, not CIM-XML, or holds a value that does not fit its type.
+// The answer's XML is not well formed, not CIM-XML, or holds a value that does not fit its type.
 class PEGASUS_CLIENT_LINKAGE CIMClientXmlException : public Exception
 {
   public:
@@ -44,7 +43,7 @@ class PEGASUS_CLIENT_LINKAGE CIMClientXmlException : public Exception
     ~CIMClientXmlException() override;
 };
 
-/// The answer is CIM-XML, but not an answer to the request.
+// The answer is CIM-XML, but not an answer to the request.
 class PEGASUS_CLIENT_LINKAGE CIMClientResponseException : public Exception
 {
   public:
@@ -53,5 +52,3 @@ class PEGASUS_CLIENT_LINKAGE CIMClientResponseException : public Exception
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

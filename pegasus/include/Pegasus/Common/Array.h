@@ -1,5 +1,4 @@
-#ifndef Pegasus_Array_h
-#define Pegasus_Array_h
+#pragma once
 
 #include <Pegasus/Common/Config.h>
 
@@ -7,9 +6,9 @@ PEGASUS_NAMESPACE_BEGIN
 
 struct ArrayHeader;
 
-/// A growing array; copies share until one is changed. The library holds the code for its own element types
-/// (the basic types, Char16, String and the CIM classes); other element types do not link.
-/// Throws: IndexOutOfBoundsException for every index or range outside the array.
+// A growing array; copies share until one is changed. The library holds the code for its own element types
+// (the basic types, Char16, String and the CIM classes); other element types do not link.
+// Throws: IndexOutOfBoundsException for every index or range outside the array.
 template <class T> class PEGASUS_COMMON_LINKAGE Array
 {
   public:
@@ -29,7 +28,7 @@ template <class T> class PEGASUS_COMMON_LINKAGE Array
 
     void clear();
     void reserveCapacity(Uint32 capacity);
-    /// Appends `size` copies of x.
+    // Appends `size` copies of x.
     void grow(Uint32 size, const T& x);
     void swap(Array<T>& x) noexcept
     {
@@ -41,7 +40,7 @@ template <class T> class PEGASUS_COMMON_LINKAGE Array
     Uint32 size() const noexcept;
     Uint32 getCapacity() const noexcept;
     const T* getData() const noexcept;
-    /// Unshares the elements first.
+    // Unshares the elements first.
     T& operator[](Uint32 index);
     const T& operator[](Uint32 index) const;
 
@@ -63,5 +62,3 @@ template <class T> class PEGASUS_COMMON_LINKAGE Array
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

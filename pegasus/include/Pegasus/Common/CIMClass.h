@@ -1,5 +1,4 @@
-#ifndef Pegasus_CIMClass_h
-#define Pegasus_CIMClass_h
+#pragma once
 
 #include <Pegasus/Common/CIMInstance.h>
 #include <Pegasus/Common/CIMMethod.h>
@@ -17,9 +16,9 @@ class CIMObject;
 struct CIMClassRep;
 extern template class RepPointer<CIMClassRep>;
 
-/// Read-only handle to a class. Copies of a handle share the class; clone() does not.
-/// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
-/// IndexOutOfBoundsException; DynamicCastFailedException from an object that is no class.
+// Read-only handle to a class. Copies of a handle share the class; clone() does not.
+// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
+// IndexOutOfBoundsException; DynamicCastFailedException from an object that is no class.
 class PEGASUS_COMMON_LINKAGE CIMConstClass
 {
   public:
@@ -27,14 +26,14 @@ class PEGASUS_COMMON_LINKAGE CIMConstClass
     explicit CIMConstClass(const CIMConstObject& object);
     CIMConstClass(const CIMName& className, const CIMName& superClassName = CIMName());
 
-    /// Returns: true when the qualifier Association (or Abstract) is there, boolean and true.
+    // Returns: true when the qualifier Association (or Abstract) is there, boolean and true.
     Boolean isAssociation() const;
     Boolean isAbstract() const;
     const CIMName& getClassName() const;
     const CIMObjectPath& getPath() const;
-    /// Returns: the null name when there is none.
+    // Returns: the null name when there is none.
     const CIMName& getSuperClassName() const;
-    /// Returns: the index, or PEG_NOT_FOUND.
+    // Returns: the index, or PEG_NOT_FOUND.
     Uint32 findQualifier(const CIMName& name) const;
     CIMConstQualifier getQualifier(Uint32 index) const;
     Uint32 getQualifierCount() const;
@@ -44,10 +43,10 @@ class PEGASUS_COMMON_LINKAGE CIMConstClass
     Uint32 findMethod(const CIMName& name) const;
     CIMConstMethod getMethod(Uint32 index) const;
     Uint32 getMethodCount() const;
-    /// Appends the names of the properties whose qualifier Key is true.
+    // Appends the names of the properties whose qualifier Key is true.
     void getKeyNames(Array<CIMName>& keyNames) const;
     Boolean hasKeys() const;
-    /// An instance with the class's properties (all, or those listed) and their defaults; its path has only the class.
+    // An instance with the class's properties (all, or those listed) and their defaults; its path has only the class.
     CIMInstance buildInstance(Boolean includeQualifiers, Boolean includeClassOrigin,
                               const CIMPropertyList& propertyList) const;
     Boolean isUninitialized() const;
@@ -60,7 +59,7 @@ class PEGASUS_COMMON_LINKAGE CIMConstClass
     RepPointer<CIMClassRep> fRep;
 };
 
-/// A CIM class. The add functions throw AlreadyExistsException and return the class.
+// A CIM class. The add functions throw AlreadyExistsException and return the class.
 class PEGASUS_COMMON_LINKAGE CIMClass : public CIMConstClass
 {
   public:
@@ -88,5 +87,3 @@ class PEGASUS_COMMON_LINKAGE CIMClass : public CIMConstClass
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef Pegasus_CIMDateTime_h
-#define Pegasus_CIMDateTime_h
+#pragma once
 
 #include <Pegasus/Common/Array.h>
 #include <Pegasus/Common/RepPointer.h>
@@ -10,24 +9,24 @@ PEGASUS_NAMESPACE_BEGIN
 struct CIMDateTimeRep;
 extern template class RepPointer<CIMDateTimeRep>;
 
-/// A CIM time stamp or interval in its 25-character form (DSP0004), with `*` for what is not significant.
+// A CIM time stamp or interval in its 25-character form (DSP0004), with `*` for what is not significant.
 class PEGASUS_COMMON_LINKAGE CIMDateTime
 {
   public:
-    /// The interval 00000000000000.000000:000.
+    // The interval 00000000000000.000000:000.
     CIMDateTime() noexcept = default;
-    /// Throws: InvalidDateTimeFormatException (shape), DateTimeOutOfRangeException (a number).
+    // Throws: InvalidDateTimeFormatException (shape), DateTimeOutOfRangeException (a number).
     CIMDateTime(const String& str);
-    /// A time stamp counts from the beginning of year 0, in UTC. Throws: DateTimeOutOfRangeException.
+    // A time stamp counts from the beginning of year 0, in UTC. Throws: DateTimeOutOfRangeException.
     CIMDateTime(Uint64 microSec, Boolean isInterval);
 
     String toString() const;
     void set(const String& str);
-    /// Back to the default interval.
+    // Back to the default interval.
     void clear();
 
     static CIMDateTime getCurrentDateTime();
-    /// Returns: finish - start in microseconds. Throws: InvalidDateTimeFormatException when the kinds differ.
+    // Returns: finish - start in microseconds. Throws: InvalidDateTimeFormatException when the kinds differ.
     static Sint64 getDifference(CIMDateTime startTime, CIMDateTime finishTime);
 
     Boolean isInterval() const;
@@ -44,7 +43,7 @@ class PEGASUS_COMMON_LINKAGE CIMDateTime
     CIMDateTime& operator/=(Uint64 num);
     Uint64 operator/(const CIMDateTime& cdt) const;
 
-    /// Instants are compared in UTC. Throws: TypeMismatchException for an interval and a time stamp.
+    // Instants are compared in UTC. Throws: TypeMismatchException for an interval and a time stamp.
     Boolean operator<(const CIMDateTime& cdt) const;
     Boolean operator<=(const CIMDateTime& cdt) const;
     Boolean operator>(const CIMDateTime& cdt) const;
@@ -58,5 +57,3 @@ class PEGASUS_COMMON_LINKAGE CIMDateTime
 PEGASUS_COMMON_LINKAGE Boolean operator==(const CIMDateTime& x, const CIMDateTime& y);
 
 PEGASUS_NAMESPACE_END
-
-#endif

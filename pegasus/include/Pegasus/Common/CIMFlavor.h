@@ -1,12 +1,11 @@
-#ifndef Pegasus_CIMFlavor_h
-#define Pegasus_CIMFlavor_h
+#pragma once
 
 #include <Pegasus/Common/Config.h>
 #include <Pegasus/Common/String.h>
 
 PEGASUS_NAMESPACE_BEGIN
 
-/// How a qualifier may be overridden and passed on. Adding a flag never removes its opposite.
+// How a qualifier may be overridden and passed on. Adding a flag never removes its opposite.
 class PEGASUS_COMMON_LINKAGE CIMFlavor
 {
   public:
@@ -16,10 +15,10 @@ class PEGASUS_COMMON_LINKAGE CIMFlavor
 
     void addFlavor(const CIMFlavor& flavor);
     void removeFlavor(const CIMFlavor& flavor);
-    /// Returns: true when every flag of `flavor` is set here.
+    // Returns: true when every flag of `flavor` is set here.
     Boolean hasFlavor(const CIMFlavor& flavor) const;
     Boolean equal(const CIMFlavor& flavor) const;
-    /// Words in a fixed order, with a blank between; empty for NONE.
+    // Words in a fixed order, with a blank between; empty for NONE.
     String toString() const;
     CIMFlavor operator+(const CIMFlavor& flavor) const;
 
@@ -41,5 +40,3 @@ class PEGASUS_COMMON_LINKAGE CIMFlavor
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

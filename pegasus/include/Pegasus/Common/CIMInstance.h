@@ -1,5 +1,4 @@
-#ifndef Pegasus_CIMInstance_h
-#define Pegasus_CIMInstance_h
+#pragma once
 
 #include <Pegasus/Common/CIMName.h>
 #include <Pegasus/Common/CIMObjectPath.h>
@@ -16,9 +15,9 @@ class CIMInstance;
 struct CIMInstanceRep;
 extern template class RepPointer<CIMInstanceRep>;
 
-/// Read-only handle to an instance. Copies of a handle share the instance; clone() does not.
-/// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
-/// IndexOutOfBoundsException; DynamicCastFailedException from an object that is no instance.
+// Read-only handle to an instance. Copies of a handle share the instance; clone() does not.
+// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
+// IndexOutOfBoundsException; DynamicCastFailedException from an object that is no instance.
 class PEGASUS_COMMON_LINKAGE CIMConstInstance
 {
   public:
@@ -28,15 +27,15 @@ class PEGASUS_COMMON_LINKAGE CIMConstInstance
 
     const CIMName& getClassName() const;
     const CIMObjectPath& getPath() const;
-    /// Returns: the index, or PEG_NOT_FOUND.
+    // Returns: the index, or PEG_NOT_FOUND.
     Uint32 findQualifier(const CIMName& name) const;
     CIMConstQualifier getQualifier(Uint32 index) const;
     Uint32 getQualifierCount() const;
     Uint32 findProperty(const CIMName& name) const;
     CIMConstProperty getProperty(Uint32 index) const;
     Uint32 getPropertyCount() const;
-    /// The path made of the class's key properties. A null key has an empty text.
-    /// Throws: NoSuchProperty when the instance lacks a key of the class.
+    // The path made of the class's key properties. A null key has an empty text.
+    // Throws: NoSuchProperty when the instance lacks a key of the class.
     CIMObjectPath buildPath(const CIMConstClass& cimClass) const;
     Boolean isUninitialized() const;
     Boolean identical(const CIMConstInstance& instance) const;
@@ -48,7 +47,7 @@ class PEGASUS_COMMON_LINKAGE CIMConstInstance
     RepPointer<CIMInstanceRep> fRep;
 };
 
-/// An instance of a CIM class.
+// An instance of a CIM class.
 class PEGASUS_COMMON_LINKAGE CIMInstance : public CIMConstInstance
 {
   public:
@@ -56,22 +55,20 @@ class PEGASUS_COMMON_LINKAGE CIMInstance : public CIMConstInstance
     explicit CIMInstance(const CIMObject& object);
     CIMInstance(const CIMName& className) : CIMConstInstance(className) {}
 
-    /// Throws: TypeMismatchException when the class names differ.
+    // Throws: TypeMismatchException when the class names differ.
     void setPath(const CIMObjectPath& path);
-    /// Throws: AlreadyExistsException.
+    // Throws: AlreadyExistsException.
     CIMInstance& addQualifier(const CIMQualifier& qualifier);
     using CIMConstInstance::getQualifier;
     CIMQualifier getQualifier(Uint32 index);
     void removeQualifier(Uint32 index);
-    /// Throws: AlreadyExistsException.
+    // Throws: AlreadyExistsException.
     CIMInstance& addProperty(const CIMProperty& property);
     using CIMConstInstance::getProperty;
     CIMProperty getProperty(Uint32 index);
     void removeProperty(Uint32 index);
-    /// Drops the properties that are not in the list, and qualifiers and class origins that are not asked for.
+    // Drops the properties that are not in the list, and qualifiers and class origins that are not asked for.
     void instanceFilter(Boolean includeQualifiers, Boolean includeClassOrigin, const CIMPropertyList& propertyList);
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef Pegasus_CIMMethod_h
-#define Pegasus_CIMMethod_h
+#pragma once
 
 #include <Pegasus/Common/CIMName.h>
 #include <Pegasus/Common/CIMParameter.h>
@@ -11,8 +10,8 @@ class CIMMethod;
 struct CIMMethodRep;
 extern template class RepPointer<CIMMethodRep>;
 
-/// Read-only handle to a method declaration. Copies of a handle share it; clone() does not.
-/// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized().
+// Read-only handle to a method declaration. Copies of a handle share it; clone() does not.
+// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized().
 class PEGASUS_COMMON_LINKAGE CIMConstMethod
 {
   public:
@@ -40,7 +39,7 @@ class PEGASUS_COMMON_LINKAGE CIMConstMethod
     RepPointer<CIMMethodRep> fRep;
 };
 
-/// The declaration of a method.
+// The declaration of a method.
 class PEGASUS_COMMON_LINKAGE CIMMethod : public CIMConstMethod
 {
   public:
@@ -51,12 +50,12 @@ class PEGASUS_COMMON_LINKAGE CIMMethod : public CIMConstMethod
     void setType(CIMType type);
     void setClassOrigin(const CIMName& classOrigin);
     void setPropagated(Boolean propagated);
-    /// Throws: AlreadyExistsException.
+    // Throws: AlreadyExistsException.
     CIMMethod& addQualifier(const CIMQualifier& qualifier);
     using CIMConstMethod::getQualifier;
     CIMQualifier getQualifier(Uint32 index);
     void removeQualifier(Uint32 index);
-    /// Throws: AlreadyExistsException.
+    // Throws: AlreadyExistsException.
     CIMMethod& addParameter(const CIMParameter& parameter);
     using CIMConstMethod::getParameter;
     CIMParameter getParameter(Uint32 index);
@@ -64,5 +63,3 @@ class PEGASUS_COMMON_LINKAGE CIMMethod : public CIMConstMethod
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,13 +1,12 @@
-#ifndef Pegasus_CIMName_h
-#define Pegasus_CIMName_h
+#pragma once
 
 #include <Pegasus/Common/Array.h>
 #include <Pegasus/Common/String.h>
 
 PEGASUS_NAMESPACE_BEGIN
 
-/// Name of a CIM element: a letter, underscore or non-ASCII character, then digits too. Compared without (ASCII) case.
-/// The null name is only made by the default constructor. Throws: InvalidNameException from the constructors.
+// Name of a CIM element: a letter, underscore or non-ASCII character, then digits too. Compared without (ASCII) case.
+// The null name is only made by the default constructor. Throws: InvalidNameException from the constructors.
 class PEGASUS_COMMON_LINKAGE CIMName
 {
   public:
@@ -17,24 +16,12 @@ class PEGASUS_COMMON_LINKAGE CIMName
 
     CIMName& operator=(const String& name);
 #ifdef PEGASUS_USE_EXPERIMENTAL_INTERFACES
-    CIMName& operator=(const char* name)
-    {
-        return *this = CIMName(name);
-    }
+    CIMName& operator=(const char* name) { return *this = CIMName(name); }
 #endif
 
-    const String& getString() const
-    {
-        return fName;
-    }
-    Boolean isNull() const
-    {
-        return fName.size() == 0;
-    }
-    void clear()
-    {
-        fName.clear();
-    }
+    const String& getString() const { return fName; }
+    Boolean isNull() const { return fName.size() == 0; }
+    void clear() { fName.clear(); }
     Boolean equal(const CIMName& name) const;
     static Boolean legal(const String& name);
 
@@ -45,8 +32,8 @@ class PEGASUS_COMMON_LINKAGE CIMName
 PEGASUS_COMMON_LINKAGE Boolean operator==(const CIMName& name1, const CIMName& name2);
 PEGASUS_COMMON_LINKAGE Boolean operator!=(const CIMName& name1, const CIMName& name2);
 
-/// Name of a CIM namespace: names joined by "/"; one leading "/" is taken off. Case is kept and not compared.
-/// Throws: InvalidNamespaceNameException from the constructors.
+// Name of a CIM namespace: names joined by "/"; one leading "/" is taken off. Case is kept and not compared.
+// Throws: InvalidNamespaceNameException from the constructors.
 class PEGASUS_COMMON_LINKAGE CIMNamespaceName
 {
   public:
@@ -56,24 +43,12 @@ class PEGASUS_COMMON_LINKAGE CIMNamespaceName
 
     CIMNamespaceName& operator=(const String& name);
 #ifdef PEGASUS_USE_EXPERIMENTAL_INTERFACES
-    CIMNamespaceName& operator=(const char* name)
-    {
-        return *this = CIMNamespaceName(name);
-    }
+    CIMNamespaceName& operator=(const char* name) { return *this = CIMNamespaceName(name); }
 #endif
 
-    const String& getString() const
-    {
-        return fName;
-    }
-    Boolean isNull() const
-    {
-        return fName.size() == 0;
-    }
-    void clear()
-    {
-        fName.clear();
-    }
+    const String& getString() const { return fName; }
+    Boolean isNull() const { return fName.size() == 0; }
+    void clear() { fName.clear(); }
     Boolean equal(const CIMNamespaceName& name) const;
     static Boolean legal(const String& name);
 
@@ -85,5 +60,3 @@ PEGASUS_COMMON_LINKAGE Boolean operator==(const CIMNamespaceName& name1, const C
 PEGASUS_COMMON_LINKAGE Boolean operator!=(const CIMNamespaceName& name1, const CIMNamespaceName& name2);
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef Pegasus_CIMObject_h
-#define Pegasus_CIMObject_h
+#pragma once
 
 #include <Pegasus/Common/CIMClass.h>
 #include <Pegasus/Common/CIMInstance.h>
@@ -8,9 +7,9 @@ PEGASUS_NAMESPACE_BEGIN
 
 class CIMObject;
 
-/// Read-only handle to what is either a class or an instance. Copies of a handle share it; clone() does not.
-/// Throws: UninitializedObjectException from every member of a default-constructed handle
-/// but isUninitialized(), isClass() and isInstance().
+// Read-only handle to what is either a class or an instance. Copies of a handle share it; clone() does not.
+// Throws: UninitializedObjectException from every member of a default-constructed handle
+// but isUninitialized(), isClass() and isInstance().
 class PEGASUS_COMMON_LINKAGE CIMConstObject
 {
   public:
@@ -33,7 +32,7 @@ class PEGASUS_COMMON_LINKAGE CIMConstObject
     Boolean isInstance() const;
     Boolean identical(const CIMConstObject& object) const;
     CIMObject clone() const;
-    /// The object as CIM-XML text.
+    // The object as CIM-XML text.
     String toString() const;
 
   protected:
@@ -44,7 +43,7 @@ class PEGASUS_COMMON_LINKAGE CIMConstObject
     CIMInstance fInstance;
 };
 
-/// A class or an instance.
+// A class or an instance.
 class PEGASUS_COMMON_LINKAGE CIMObject : public CIMConstObject
 {
   public:
@@ -61,10 +60,8 @@ class PEGASUS_COMMON_LINKAGE CIMObject : public CIMConstObject
     using CIMConstObject::getProperty;
     CIMProperty getProperty(Uint32 index);
     void removeProperty(Uint32 index);
-    /// On a class: does nothing.
+    // On a class: does nothing.
     void instanceFilter(Boolean includeQualifiers, Boolean includeClassOrigin, const CIMPropertyList& propertyList);
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

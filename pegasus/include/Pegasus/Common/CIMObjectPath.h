@@ -1,5 +1,4 @@
-#ifndef Pegasus_CIMObjectPath_h
-#define Pegasus_CIMObjectPath_h
+#pragma once
 
 #include <Pegasus/Common/Array.h>
 #include <Pegasus/Common/CIMName.h>
@@ -14,7 +13,7 @@ extern template class RepPointer<CIMKeyBindingRep>;
 struct CIMObjectPathRep;
 extern template class RepPointer<CIMObjectPathRep>;
 
-/// One key of an object path: name, text and kind. The text is not checked against the kind.
+// One key of an object path: name, text and kind. The text is not checked against the kind.
 class PEGASUS_COMMON_LINKAGE CIMKeyBinding
 {
   public:
@@ -28,7 +27,7 @@ class PEGASUS_COMMON_LINKAGE CIMKeyBinding
 
     CIMKeyBinding() noexcept = default;
     CIMKeyBinding(const CIMName& name, const String& value, Type type);
-    /// The kind follows the value's type. Throws: TypeMismatchException for an array, object or instance.
+    // The kind follows the value's type. Throws: TypeMismatchException for an array, object or instance.
     CIMKeyBinding(const CIMName& name, const CIMValue& value);
 
     const CIMName& getName() const;
@@ -37,19 +36,19 @@ class PEGASUS_COMMON_LINKAGE CIMKeyBinding
     void setValue(const String& value);
     Type getType() const;
     void setType(Type type);
-    /// Would a key made from this value be the same?
+    // Would a key made from this value be the same?
     Boolean equal(CIMValue value);
 
   private:
     RepPointer<CIMKeyBindingRep> fRep;
 };
 
-/// Name without case; kind; then numbers by value, booleans without case, references as paths, strings exactly.
+// Name without case; kind; then numbers by value, booleans without case, references as paths, strings exactly.
 PEGASUS_COMMON_LINKAGE Boolean operator==(const CIMKeyBinding& x, const CIMKeyBinding& y);
 
-/// Where a class or an instance is: host, namespace, class and keys, each of which may be absent.
-/// Keys are always kept in the order of their names. Copies are independent.
-/// Throws: MalformedObjectNameException from every function that takes text or a host.
+// Where a class or an instance is: host, namespace, class and keys, each of which may be absent.
+// Keys are always kept in the order of their names. Copies are independent.
+// Throws: MalformedObjectNameException from every function that takes text or a host.
 class PEGASUS_COMMON_LINKAGE CIMObjectPath
 {
   public:
@@ -73,7 +72,7 @@ class PEGASUS_COMMON_LINKAGE CIMObjectPath
     const Array<CIMKeyBinding>& getKeyBindings() const;
     void setKeyBindings(const Array<CIMKeyBinding>& keyBindings);
 
-    /// `//host/namespace:Class.key=value,...` with the absent parts left out.
+    // `//host/namespace:Class.key=value,...` with the absent parts left out.
     String toString() const;
     Boolean identical(const CIMObjectPath& path) const;
     Uint32 makeHashCode() const;
@@ -86,5 +85,3 @@ PEGASUS_COMMON_LINKAGE Boolean operator==(const CIMObjectPath& x, const CIMObjec
 PEGASUS_COMMON_LINKAGE Boolean operator!=(const CIMObjectPath& x, const CIMObjectPath& y);
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef Pegasus_CIMParamValue_h
-#define Pegasus_CIMParamValue_h
+#pragma once
 
 #include <Pegasus/Common/CIMValue.h>
 
@@ -8,8 +7,8 @@ PEGASUS_NAMESPACE_BEGIN
 struct CIMParamValueRep;
 extern template class RepPointer<CIMParamValueRep>;
 
-/// A method's argument: name, value, and whether the type travels with it. Copies share; clone() does not.
-/// Throws: UninitializedObjectException for an empty name, and from a default-constructed one.
+// A method's argument: name, value, and whether the type travels with it. Copies share; clone() does not.
+// Throws: UninitializedObjectException for an empty name, and from a default-constructed one.
 class PEGASUS_COMMON_LINKAGE CIMParamValue
 {
   public:
@@ -30,5 +29,3 @@ class PEGASUS_COMMON_LINKAGE CIMParamValue
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef Pegasus_CIMParameter_h
-#define Pegasus_CIMParameter_h
+#pragma once
 
 #include <Pegasus/Common/CIMName.h>
 #include <Pegasus/Common/CIMQualifier.h>
@@ -10,9 +9,9 @@ class CIMParameter;
 struct CIMParameterRep;
 extern template class RepPointer<CIMParameterRep>;
 
-/// Read-only handle to a parameter declaration. Copies of a handle share it; clone() does not.
-/// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
-/// TypeMismatchException for a fixed size on a scalar, and for a reference without a class or a class without one.
+// Read-only handle to a parameter declaration. Copies of a handle share it; clone() does not.
+// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
+// TypeMismatchException for a fixed size on a scalar, and for a reference without a class or a class without one.
 class PEGASUS_COMMON_LINKAGE CIMConstParameter
 {
   public:
@@ -38,7 +37,7 @@ class PEGASUS_COMMON_LINKAGE CIMConstParameter
     RepPointer<CIMParameterRep> fRep;
 };
 
-/// The declaration of a method's parameter.
+// The declaration of a method's parameter.
 class PEGASUS_COMMON_LINKAGE CIMParameter : public CIMConstParameter
 {
   public:
@@ -46,7 +45,7 @@ class PEGASUS_COMMON_LINKAGE CIMParameter : public CIMConstParameter
     using CIMConstParameter::CIMConstParameter;
 
     void setName(const CIMName& name);
-    /// Throws: AlreadyExistsException.
+    // Throws: AlreadyExistsException.
     CIMParameter& addQualifier(const CIMQualifier& qualifier);
     using CIMConstParameter::getQualifier;
     CIMQualifier getQualifier(Uint32 index);
@@ -54,5 +53,3 @@ class PEGASUS_COMMON_LINKAGE CIMParameter : public CIMConstParameter
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef Pegasus_CIMProperty_h
-#define Pegasus_CIMProperty_h
+#pragma once
 
 #include <Pegasus/Common/CIMName.h>
 #include <Pegasus/Common/CIMQualifier.h>
@@ -11,9 +10,9 @@ class CIMProperty;
 struct CIMPropertyRep;
 extern template class RepPointer<CIMPropertyRep>;
 
-/// Read-only handle to a property. Copies of a handle share the property; clone() does not.
-/// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
-/// TypeMismatchException for a fixed size on a scalar, a reference class on another type, an array of references.
+// Read-only handle to a property. Copies of a handle share the property; clone() does not.
+// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
+// TypeMismatchException for a fixed size on a scalar, a reference class on another type, an array of references.
 class PEGASUS_COMMON_LINKAGE CIMConstProperty
 {
   public:
@@ -26,12 +25,12 @@ class PEGASUS_COMMON_LINKAGE CIMConstProperty
     const CIMValue& getValue() const;
     CIMType getType() const;
     Boolean isArray() const;
-    /// Returns: the declared fixed size, 0 if none.
+    // Returns: the declared fixed size, 0 if none.
     Uint32 getArraySize() const;
     const CIMName& getReferenceClassName() const;
     const CIMName& getClassOrigin() const;
     Boolean getPropagated() const;
-    /// Returns: the index, or PEG_NOT_FOUND.
+    // Returns: the index, or PEG_NOT_FOUND.
     Uint32 findQualifier(const CIMName& name) const;
     CIMConstQualifier getQualifier(Uint32 index) const;
     Uint32 getQualifierCount() const;
@@ -45,7 +44,7 @@ class PEGASUS_COMMON_LINKAGE CIMConstProperty
     RepPointer<CIMPropertyRep> fRep;
 };
 
-/// A property of a class (a declaration with its default) or of an instance.
+// A property of a class (a declaration with its default) or of an instance.
 class PEGASUS_COMMON_LINKAGE CIMProperty : public CIMConstProperty
 {
   public:
@@ -53,11 +52,11 @@ class PEGASUS_COMMON_LINKAGE CIMProperty : public CIMConstProperty
     using CIMConstProperty::CIMConstProperty;
 
     void setName(const CIMName& name);
-    /// Throws: TypeMismatchException when type or array flag differ.
+    // Throws: TypeMismatchException when type or array flag differ.
     void setValue(const CIMValue& value);
     void setClassOrigin(const CIMName& classOrigin);
     void setPropagated(Boolean propagated);
-    /// Throws: AlreadyExistsException.
+    // Throws: AlreadyExistsException.
     CIMProperty& addQualifier(const CIMQualifier& qualifier);
     using CIMConstProperty::getQualifier;
     CIMQualifier getQualifier(Uint32 index);
@@ -65,5 +64,3 @@ class PEGASUS_COMMON_LINKAGE CIMProperty : public CIMConstProperty
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

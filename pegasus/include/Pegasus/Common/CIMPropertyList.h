@@ -1,13 +1,12 @@
-#ifndef Pegasus_CIMPropertyList_h
-#define Pegasus_CIMPropertyList_h
+#pragma once
 
 #include <Pegasus/Common/Array.h>
 #include <Pegasus/Common/CIMName.h>
 
 PEGASUS_NAMESPACE_BEGIN
 
-/// Which properties are wanted: a null list means all, an empty list none.
-/// Throws: UninitializedObjectException for a list with a null name; IndexOutOfBoundsException.
+// Which properties are wanted: a null list means all, an empty list none.
+// Throws: UninitializedObjectException for a list with a null name; IndexOutOfBoundsException.
 class PEGASUS_COMMON_LINKAGE CIMPropertyList
 {
   public:
@@ -21,7 +20,7 @@ class PEGASUS_COMMON_LINKAGE CIMPropertyList
     const CIMName& operator[](Uint32 index) const;
     Array<CIMName> getPropertyNameArray() const { return fNames; }
     Boolean contains(const CIMName& name) const;
-    /// "NULL", "EMPTY" or the names with ", " between.
+    // "NULL", "EMPTY" or the names with ", " between.
     String toString() const;
 
   private:
@@ -30,5 +29,3 @@ class PEGASUS_COMMON_LINKAGE CIMPropertyList
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

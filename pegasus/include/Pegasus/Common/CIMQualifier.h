@@ -1,5 +1,4 @@
-#ifndef Pegasus_CIMQualifier_h
-#define Pegasus_CIMQualifier_h
+#pragma once
 
 #include <Pegasus/Common/CIMFlavor.h>
 #include <Pegasus/Common/CIMName.h>
@@ -11,8 +10,8 @@ class CIMQualifier;
 struct CIMQualifierRep;
 extern template class RepPointer<CIMQualifierRep>;
 
-/// Read-only handle to a qualifier. Copies of a handle share the qualifier; clone() does not.
-/// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized().
+// Read-only handle to a qualifier. Copies of a handle share the qualifier; clone() does not.
+// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized().
 class PEGASUS_COMMON_LINKAGE CIMConstQualifier
 {
   public:
@@ -36,7 +35,7 @@ class PEGASUS_COMMON_LINKAGE CIMConstQualifier
     RepPointer<CIMQualifierRep> fRep;
 };
 
-/// A qualifier on a class, property, method or parameter.
+// A qualifier on a class, property, method or parameter.
 class PEGASUS_COMMON_LINKAGE CIMQualifier : public CIMConstQualifier
 {
   public:
@@ -51,5 +50,3 @@ class PEGASUS_COMMON_LINKAGE CIMQualifier : public CIMConstQualifier
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

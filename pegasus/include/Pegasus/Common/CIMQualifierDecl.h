@@ -1,5 +1,4 @@
-#ifndef Pegasus_CIMQualifierDecl_h
-#define Pegasus_CIMQualifierDecl_h
+#pragma once
 
 #include <Pegasus/Common/CIMFlavor.h>
 #include <Pegasus/Common/CIMName.h>
@@ -12,8 +11,8 @@ class CIMQualifierDecl;
 struct CIMQualifierDeclRep;
 extern template class RepPointer<CIMQualifierDeclRep>;
 
-/// Read-only handle to a qualifier declaration. Copies of a handle share the declaration; clone() does not.
-/// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized().
+// Read-only handle to a qualifier declaration. Copies of a handle share the declaration; clone() does not.
+// Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized().
 class PEGASUS_COMMON_LINKAGE CIMConstQualifierDecl
 {
   public:
@@ -38,7 +37,7 @@ class PEGASUS_COMMON_LINKAGE CIMConstQualifierDecl
     RepPointer<CIMQualifierDeclRep> fRep;
 };
 
-/// The declaration of a qualifier type: its default value, where it may stand, how it is passed on.
+// The declaration of a qualifier type: its default value, where it may stand, how it is passed on.
 class PEGASUS_COMMON_LINKAGE CIMQualifierDecl : public CIMConstQualifierDecl
 {
   public:
@@ -50,5 +49,3 @@ class PEGASUS_COMMON_LINKAGE CIMQualifierDecl : public CIMConstQualifierDecl
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,12 +1,11 @@
-#ifndef Pegasus_CIMScope_h
-#define Pegasus_CIMScope_h
+#pragma once
 
 #include <Pegasus/Common/Config.h>
 #include <Pegasus/Common/String.h>
 
 PEGASUS_NAMESPACE_BEGIN
 
-/// The kinds of element that a qualifier may be put on.
+// The kinds of element that a qualifier may be put on.
 class PEGASUS_COMMON_LINKAGE CIMScope
 {
   public:
@@ -14,11 +13,11 @@ class PEGASUS_COMMON_LINKAGE CIMScope
     CIMScope(const CIMScope& scope) = default;
     CIMScope& operator=(const CIMScope& scope) = default;
 
-    /// Returns: true when every kind of `scope` is in this one.
+    // Returns: true when every kind of `scope` is in this one.
     Boolean hasScope(const CIMScope& scope) const;
     void addScope(const CIMScope& scope);
     Boolean equal(const CIMScope& scope) const;
-    /// Names in a fixed order, with a blank between; all seven for ANY, empty for NONE.
+    // Names in a fixed order, with a blank between; all seven for ANY, empty for NONE.
     String toString() const;
     CIMScope operator+(const CIMScope& scope) const;
 
@@ -39,5 +38,3 @@ class PEGASUS_COMMON_LINKAGE CIMScope
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

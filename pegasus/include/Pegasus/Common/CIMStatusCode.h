@@ -1,11 +1,10 @@
-#ifndef Pegasus_CIMStatusCode_h
-#define Pegasus_CIMStatusCode_h
+#pragma once
 
 #include <Pegasus/Common/Config.h>
 
 PEGASUS_NAMESPACE_BEGIN
 
-/// Status codes of CIM operations (DSP0200); 18 and 19 are not used.
+// Status codes of CIM operations (DSP0200); 18 and 19 are not used.
 // The type is given so that a server's code that is none of these can be held, too.
 enum CIMStatusCode : Uint32
 {
@@ -38,9 +37,7 @@ enum CIMStatusCode : Uint32
     CIM_ERR_SERVER_IS_SHUTTING_DOWN = 28
 };
 
-/// Returns: the symbolic name ("CIM_ERR_FAILED"); "empty" for a number without one.
+// Returns: the symbolic name ("CIM_ERR_FAILED"); "empty" for a number without one.
 PEGASUS_COMMON_LINKAGE const char* cimStatusCodeToString(CIMStatusCode code);
 
 PEGASUS_NAMESPACE_END
-
-#endif

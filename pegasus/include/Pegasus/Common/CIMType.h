@@ -1,11 +1,10 @@
-#ifndef Pegasus_CIMType_h
-#define Pegasus_CIMType_h
+#pragma once
 
 #include <Pegasus/Common/Config.h>
 
 PEGASUS_NAMESPACE_BEGIN
 
-/// The CIM data types (DSP0004); the numbers are part of the interface.
+// The CIM data types (DSP0004); the numbers are part of the interface.
 enum CIMType
 {
     CIMTYPE_BOOLEAN,
@@ -27,9 +26,7 @@ enum CIMType
     CIMTYPE_INSTANCE
 };
 
-/// Returns: the type's name as MOF and CIM-XML spell it; "unknown" for a number that is no type.
+// Returns: the type's name as MOF and CIM-XML spell it; "unknown" for a number that is no type.
 PEGASUS_COMMON_LINKAGE const char* cimTypeToString(const CIMType type);
 
 PEGASUS_NAMESPACE_END
-
-#endif

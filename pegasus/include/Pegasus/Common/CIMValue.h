@@ -1,5 +1,4 @@
-#ifndef Pegasus_CIMValue_h
-#define Pegasus_CIMValue_h
+#pragma once
 
 #include <Pegasus/Common/Array.h>
 #include <Pegasus/Common/CIMDateTime.h>
@@ -16,9 +15,9 @@ class CIMInstance;
 struct CIMValueRep;
 extern template class RepPointer<CIMValueRep>;
 
-/// A value of any CIM type, scalar or array, or a typed null. The default is a null boolean.
-/// There is no constructor from `const char*`: such an argument becomes the boolean true.
-/// Objects and instances are cloned on the way in and out.
+// A value of any CIM type, scalar or array, or a typed null. The default is a null boolean.
+// There is no constructor from `const char*`: such an argument becomes the boolean true.
+// Objects and instances are cloned on the way in and out.
 class PEGASUS_COMMON_LINKAGE CIMValue
 {
   public:
@@ -64,12 +63,12 @@ class PEGASUS_COMMON_LINKAGE CIMValue
     Boolean typeCompatible(const CIMValue& x) const;
     Boolean isArray() const;
     Boolean isNull() const;
-    /// Returns: the number of elements; 0 for a scalar.
+    // Returns: the number of elements; 0 for a scalar.
     Uint32 getArraySize() const;
     CIMType getType() const;
     void setNullValue(CIMType type, Boolean isArray, Uint32 arraySize = 0);
 
-    /// Replaces type, array flag and value.
+    // Replaces type, array flag and value.
     void set(Boolean x);
     void set(Uint8 x);
     void set(Sint8 x);
@@ -105,7 +104,7 @@ class PEGASUS_COMMON_LINKAGE CIMValue
     void set(const Array<CIMObject>& x);
     void set(const Array<CIMInstance>& x);
 
-    /// A null of the right type leaves the argument as it is. Throws: TypeMismatchException for another type.
+    // A null of the right type leaves the argument as it is. Throws: TypeMismatchException for another type.
     void get(Boolean& x) const;
     void get(Uint8& x) const;
     void get(Sint8& x) const;
@@ -142,7 +141,7 @@ class PEGASUS_COMMON_LINKAGE CIMValue
     void get(Array<CIMInstance>& x) const;
 
     Boolean equal(const CIMValue& x) const;
-    /// Booleans as TRUE or FALSE, reals as %.16e, each element of an array followed by a blank; "" for null.
+    // Booleans as TRUE or FALSE, reals as %.16e, each element of an array followed by a blank; "" for null.
     String toString() const;
 
   private:
@@ -155,5 +154,3 @@ PEGASUS_COMMON_LINKAGE Boolean operator==(const CIMValue& x, const CIMValue& y);
 PEGASUS_COMMON_LINKAGE Boolean operator!=(const CIMValue& x, const CIMValue& y);
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,11 +1,10 @@
-#ifndef Pegasus_Char16_h
-#define Pegasus_Char16_h
+#pragma once
 
 #include <Pegasus/Common/Config.h>
 
 PEGASUS_NAMESPACE_BEGIN
 
-/// One UTF-16 code unit. There is no stream inserter of its own: a stream shows the decimal code.
+// One UTF-16 code unit. There is no stream inserter of its own: a stream shows the decimal code.
 class PEGASUS_COMMON_LINKAGE Char16
 {
   public:
@@ -51,5 +50,3 @@ inline Boolean operator!=(char left, const Char16& right)
 }
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,7 +1,6 @@
-#ifndef Pegasus_Config_h
-#define Pegasus_Config_h
+#pragma once
 
-/// Platform check, linkage macros and the basic types that every public header builds on.
+// Platform check, linkage macros and the basic types that every public header builds on.
 
 #if !defined(PEGASUS_PLATFORM_LINUX_X86_64_GNU)
 #error "Unsupported Platform: compile with -DPEGASUS_PLATFORM_LINUX_X86_64_GNU"
@@ -27,7 +26,7 @@
 #define PEGASUS_UNREACHABLE(CODE) CODE
 #define PEGASUS_FORMAT(FORMAT_INDEX, FIRST_ARGUMENT) __attribute__((format(printf, FORMAT_INDEX, FIRST_ARGUMENT)))
 
-/// What an index operation returns when there is no such element.
+// What an index operation returns when there is no such element.
 #define PEG_NOT_FOUND (Pegasus::Uint32(-1))
 
 PEGASUS_NAMESPACE_BEGIN
@@ -45,5 +44,3 @@ typedef float Real32;
 typedef double Real64;
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,5 +1,4 @@
-#ifndef Pegasus_Exception_h
-#define Pegasus_Exception_h
+#pragma once
 
 #include <Pegasus/Common/Array.h>
 #include <Pegasus/Common/CIMStatusCode.h>
@@ -9,7 +8,7 @@ PEGASUS_NAMESPACE_BEGIN
 
 class CIMInstance;
 
-/// Root of everything the library throws. It does not derive from std::exception.
+// Root of everything the library throws. It does not derive from std::exception.
 class PEGASUS_COMMON_LINKAGE Exception
 {
   public:
@@ -17,7 +16,7 @@ class PEGASUS_COMMON_LINKAGE Exception
     Exception(const Exception& exception) = default;
     virtual ~Exception();
     Exception& operator=(const Exception& exception) = default;
-    /// Valid as long as the exception.
+    // Valid as long as the exception.
     virtual const String& getMessage() const;
 
   protected:
@@ -27,7 +26,7 @@ class PEGASUS_COMMON_LINKAGE Exception
     String fMessage;
 };
 
-/// "index out of bounds"
+// "index out of bounds"
 class PEGASUS_COMMON_LINKAGE IndexOutOfBoundsException : public Exception
 {
   public:
@@ -35,7 +34,7 @@ class PEGASUS_COMMON_LINKAGE IndexOutOfBoundsException : public Exception
     ~IndexOutOfBoundsException() override;
 };
 
-/// "already exists: " + message
+// "already exists: " + message
 class PEGASUS_COMMON_LINKAGE AlreadyExistsException : public Exception
 {
   public:
@@ -43,7 +42,7 @@ class PEGASUS_COMMON_LINKAGE AlreadyExistsException : public Exception
     ~AlreadyExistsException() override;
 };
 
-/// "The CIM name is not valid: " + name
+// "The CIM name is not valid: " + name
 class PEGASUS_COMMON_LINKAGE InvalidNameException : public Exception
 {
   public:
@@ -51,7 +50,7 @@ class PEGASUS_COMMON_LINKAGE InvalidNameException : public Exception
     ~InvalidNameException() override;
 };
 
-/// "invalid CIM namespace name: " + name
+// "invalid CIM namespace name: " + name
 class PEGASUS_COMMON_LINKAGE InvalidNamespaceNameException : public Exception
 {
   public:
@@ -59,7 +58,7 @@ class PEGASUS_COMMON_LINKAGE InvalidNamespaceNameException : public Exception
     ~InvalidNamespaceNameException() override;
 };
 
-/// "uninitialized object"
+// "uninitialized object"
 class PEGASUS_COMMON_LINKAGE UninitializedObjectException : public Exception
 {
   public:
@@ -67,7 +66,7 @@ class PEGASUS_COMMON_LINKAGE UninitializedObjectException : public Exception
     ~UninitializedObjectException() override;
 };
 
-/// "type mismatch", or "type mismatch: " + message
+// "type mismatch", or "type mismatch: " + message
 class PEGASUS_COMMON_LINKAGE TypeMismatchException : public Exception
 {
   public:
@@ -76,7 +75,7 @@ class PEGASUS_COMMON_LINKAGE TypeMismatchException : public Exception
     ~TypeMismatchException() override;
 };
 
-/// "dynamic cast failed"
+// "dynamic cast failed"
 class PEGASUS_COMMON_LINKAGE DynamicCastFailedException : public Exception
 {
   public:
@@ -84,7 +83,7 @@ class PEGASUS_COMMON_LINKAGE DynamicCastFailedException : public Exception
     ~DynamicCastFailedException() override;
 };
 
-/// "invalid datetime format"
+// "invalid datetime format"
 class PEGASUS_COMMON_LINKAGE InvalidDateTimeFormatException : public Exception
 {
   public:
@@ -92,7 +91,7 @@ class PEGASUS_COMMON_LINKAGE InvalidDateTimeFormatException : public Exception
     ~InvalidDateTimeFormatException() override;
 };
 
-/// "DateTime is out of range : " + message
+// "DateTime is out of range : " + message
 class PEGASUS_COMMON_LINKAGE DateTimeOutOfRangeException : public Exception
 {
   public:
@@ -100,7 +99,7 @@ class PEGASUS_COMMON_LINKAGE DateTimeOutOfRangeException : public Exception
     ~DateTimeOutOfRangeException() override;
 };
 
-/// "malformed object name: " + objectName
+// "malformed object name: " + objectName
 class PEGASUS_COMMON_LINKAGE MalformedObjectNameException : public Exception
 {
   public:
@@ -108,7 +107,7 @@ class PEGASUS_COMMON_LINKAGE MalformedObjectNameException : public Exception
     ~MalformedObjectNameException() override;
 };
 
-/// "Bind failed: " + message
+// "Bind failed: " + message
 class PEGASUS_COMMON_LINKAGE BindFailedException : public Exception
 {
   public:
@@ -116,7 +115,7 @@ class PEGASUS_COMMON_LINKAGE BindFailedException : public Exception
     ~BindFailedException() override;
 };
 
-/// "Invalid locator: " + locator
+// "Invalid locator: " + locator
 class PEGASUS_COMMON_LINKAGE InvalidLocatorException : public Exception
 {
   public:
@@ -124,7 +123,7 @@ class PEGASUS_COMMON_LINKAGE InvalidLocatorException : public Exception
     ~InvalidLocatorException() override;
 };
 
-/// "Cannot create socket"
+// "Cannot create socket"
 class PEGASUS_COMMON_LINKAGE CannotCreateSocketException : public Exception
 {
   public:
@@ -132,7 +131,7 @@ class PEGASUS_COMMON_LINKAGE CannotCreateSocketException : public Exception
     ~CannotCreateSocketException() override;
 };
 
-/// The message as given.
+// The message as given.
 class PEGASUS_COMMON_LINKAGE CannotConnectException : public Exception
 {
   public:
@@ -140,7 +139,7 @@ class PEGASUS_COMMON_LINKAGE CannotConnectException : public Exception
     ~CannotConnectException() override;
 };
 
-/// "already connected"
+// "already connected"
 class PEGASUS_COMMON_LINKAGE AlreadyConnectedException : public Exception
 {
   public:
@@ -148,7 +147,7 @@ class PEGASUS_COMMON_LINKAGE AlreadyConnectedException : public Exception
     ~AlreadyConnectedException() override;
 };
 
-/// "not connected"
+// "not connected"
 class PEGASUS_COMMON_LINKAGE NotConnectedException : public Exception
 {
   public:
@@ -156,7 +155,7 @@ class PEGASUS_COMMON_LINKAGE NotConnectedException : public Exception
     ~NotConnectedException() override;
 };
 
-/// "connection timed out"
+// "connection timed out"
 class PEGASUS_COMMON_LINKAGE ConnectionTimeoutException : public Exception
 {
   public:
@@ -164,7 +163,7 @@ class PEGASUS_COMMON_LINKAGE ConnectionTimeoutException : public Exception
     ~ConnectionTimeoutException() override;
 };
 
-/// "Invalid Enumeration Context, uninitilialized"
+// "Invalid Enumeration Context, uninitilialized"
 class PEGASUS_COMMON_LINKAGE InvalidEnumerationContextException : public Exception
 {
   public:
@@ -172,7 +171,7 @@ class PEGASUS_COMMON_LINKAGE InvalidEnumerationContextException : public Excepti
     ~InvalidEnumerationContextException() override;
 };
 
-/// "SSL Exception: " + message
+// "SSL Exception: " + message
 class PEGASUS_COMMON_LINKAGE SSLException : public Exception
 {
   public:
@@ -180,7 +179,7 @@ class PEGASUS_COMMON_LINKAGE SSLException : public Exception
     ~SSLException() override;
 };
 
-/// A CIM operation failed with a status code; the message is exactly the text given.
+// A CIM operation failed with a status code; the message is exactly the text given.
 class PEGASUS_COMMON_LINKAGE CIMException : public Exception
 {
   public:
@@ -192,7 +191,7 @@ class PEGASUS_COMMON_LINKAGE CIMException : public Exception
     CIMException& operator=(const CIMException& exception) = default;
 
     CIMStatusCode getCode() const;
-    /// The CIM_Error instances that came with the status.
+    // The CIM_Error instances that came with the status.
     Uint32 getErrorCount() const;
 
   private:
@@ -201,5 +200,3 @@ class PEGASUS_COMMON_LINKAGE CIMException : public Exception
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,18 +1,17 @@
-#ifndef Pegasus_RepPointer_h
-#define Pegasus_RepPointer_h
+#pragma once
 
 #include <Pegasus/Common/Config.h>
 
 PEGASUS_NAMESPACE_BEGIN
 
-/// The one pointer inside every handle class: counted, to a representation that only the library knows.
-/// Null is a state of its own (an uninitialised object, an empty string, a default value).
-/// Thread: the count is atomic, so distinct handles may be used in distinct threads.
+// The one pointer inside every handle class: counted, to a representation that only the library knows.
+// Null is a state of its own (an uninitialised object, an empty string, a default value).
+// Thread: the count is atomic, so distinct handles may be used in distinct threads.
 template <class Rep> class PEGASUS_COMMON_LINKAGE RepPointer
 {
   public:
     RepPointer() noexcept = default;
-    /// Takes over one count of `adopted`.
+    // Takes over one count of `adopted`.
     explicit RepPointer(Rep* adopted) noexcept : fRep(adopted) {}
     RepPointer(const RepPointer& other) noexcept : fRep(other.fRep) { retainIfAny(); }
     RepPointer(RepPointer&& other) noexcept : fRep(other.fRep) { other.fRep = nullptr; }
@@ -42,19 +41,21 @@ template <class Rep> class PEGASUS_COMMON_LINKAGE RepPointer
     Rep& operator*() const noexcept { return *fRep; }
     explicit operator bool() const noexcept { return fRep != nullptr; }
 
-    /// Throws: UninitializedObjectException when null.
+    // Throws: UninitializedObjectException when null.
     Rep& checked() const;
 
   private:
     void retainIfAny() noexcept
     {
-        if (fRep)
+        if (fRep) {
             retain(fRep);
+        }
     }
     void releaseIfAny() noexcept
     {
-        if (fRep)
+        if (fRep) {
             release(fRep);
+        }
     }
     static void retain(Rep* rep) noexcept;
     static void release(Rep* rep) noexcept;
@@ -63,5 +64,3 @@ template <class Rep> class PEGASUS_COMMON_LINKAGE RepPointer
 };
 
 PEGASUS_NAMESPACE_END
-
-#endif

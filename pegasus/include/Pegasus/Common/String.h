@@ -1,12 +1,11 @@
-#ifndef Pegasus_String_h
-#define Pegasus_String_h
+#pragma once
 
 #include <Pegasus/Common/Char16.h>
 #include <Pegasus/Common/RepPointer.h>
 
 PEGASUS_NAMESPACE_BEGIN
 
-/// UTF-8 bytes, owned. A pointer taken from a temporary dies with the full expression.
+// UTF-8 bytes, owned. A pointer taken from a temporary dies with the full expression.
 class PEGASUS_COMMON_LINKAGE CString
 {
   public:
@@ -27,8 +26,8 @@ class PEGASUS_COMMON_LINKAGE CString
 struct StringRep;
 extern template class RepPointer<StringRep>;
 
-/// Text as UTF-16 code units; copies share until one is changed.
-/// Every `const char*` is read as UTF-8. Throws: Exception (not UTF-8), NullPointer (null pointer).
+// Text as UTF-16 code units; copies share until one is changed.
+// Every `const char*` is read as UTF-8. Throws: Exception (not UTF-8), NullPointer (null pointer).
 class PEGASUS_COMMON_LINKAGE String
 {
   public:
@@ -54,28 +53,28 @@ class PEGASUS_COMMON_LINKAGE String
     void clear();
     void reserveCapacity(Uint32 capacity);
 
-    /// Returns: the number of code units.
+    // Returns: the number of code units.
     Uint32 size() const;
-    /// Zero-terminated; valid until the string is changed or destroyed.
+    // Zero-terminated; valid until the string is changed or destroyed.
     const Char16* getChar16Data() const;
-    /// The text as UTF-8; a lone surrogate becomes its three bytes.
+    // The text as UTF-8; a lone surrogate becomes its three bytes.
     CString getCString() const;
 
-    /// Throws: IndexOutOfBoundsException above size(); at size() reads 0.
+    // Throws: IndexOutOfBoundsException above size(); at size() reads 0.
     Char16& operator[](Uint32 index);
     const Char16 operator[](Uint32 index) const;
 
     String& append(const Char16& c);
     String& append(const Char16* str, Uint32 n);
     String& append(const String& str);
-    /// Throws: IndexOutOfBoundsException when index, or index and size, reach past the end.
+    // Throws: IndexOutOfBoundsException when index, or index and size, reach past the end.
     void remove(Uint32 index, Uint32 size = PEG_NOT_FOUND);
     String subString(Uint32 index, Uint32 n = PEG_NOT_FOUND) const;
     Uint32 find(Char16 c) const;
     Uint32 find(Uint32 index, Char16 c) const;
     Uint32 find(const String& s) const;
     Uint32 reverseFind(Char16 c) const;
-    /// ASCII letters only, as in the comparisons without case.
+    // ASCII letters only, as in the comparisons without case.
     void toLower();
     void appendPrintf(const char* format, ...) PEGASUS_FORMAT(2, 3);
 
@@ -101,9 +100,7 @@ PEGASUS_COMMON_LINKAGE Boolean operator>(const String& s1, const String& s2);
 PEGASUS_COMMON_LINKAGE Boolean operator>=(const String& s1, const String& s2);
 PEGASUS_COMMON_LINKAGE String operator+(const String& s1, const String& s2);
 
-/// Not UTF-8: code units 1 to 255 as one byte, 0 and all above 255 as the text `\xHHHH`.
+// Not UTF-8: code units 1 to 255 as one byte, 0 and all above 255 as the text `\xHHHH`.
 PEGASUS_COMMON_LINKAGE std::ostream& operator<<(std::ostream& os, const String& str);
 
 PEGASUS_NAMESPACE_END
-
-#endif

@@ -1,5 +1,5 @@
 /* Arrays and arguments. */
-#include "Conformance.h"
+#include "tests/pegasus/cmpi/conformance/Conformance.h"
 
 #include <string.h>
 

@@ -1,5 +1,5 @@
 /* Clones and releases. */
-#include "Conformance.h"
+#include "tests/pegasus/cmpi/conformance/Conformance.h"
 
 #include <malloc.h>
 #include <pthread.h>

@@ -1,6 +1,5 @@
 /* Checks of a broker from where its providers stand. Every check is a row: a name and a function. */
-#ifndef TESTS_CMPI_CONFORMANCE_H
-#define TESTS_CMPI_CONFORMANCE_H
+#pragma once
 
 #include <cmpi/cmpi.h>
 
@@ -51,5 +50,3 @@ extern const CMPIStatus kGarbage;
 CMPIObjectPath* newPath(const Env* env, const char* className);
 CMPIInstance* newInst(const Env* env, const char* className);
 const char* textOf(const CMPIString* string);
-
-#endif

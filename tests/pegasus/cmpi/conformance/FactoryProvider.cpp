@@ -9,8 +9,9 @@ namespace {
 
 void expect(bool holds, const char* what)
 {
-    if (!holds)
+    if (!holds) {
         throw std::runtime_error(what);
+    }
 }
 
 void oneRound(const CMPIBroker* mb, int round)
@@ -35,7 +36,9 @@ void oneRound(const CMPIBroker* mb, int round)
     expect(rc.rc == CMPI_RC_OK && id == static_cast<const char*>(key.value.string->hdl), "getProperty");
     for (const CMPIStatus status :
          {instance->ft->release(instance), path->ft->release(path), array->ft->release(array)})
+    {
         expect(status.rc == CMPI_RC_OK, "release");
+    }
 }
 
 CMPIStatus cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean)
@@ -72,8 +75,9 @@ extern "C" {
 
 CMPIInstanceMI* Exact_Create_InstanceMI(const CMPIBroker* broker, const CMPIContext*, CMPIStatus*)
 {
-    for (int round = 0; round < 100; ++round)
+    for (int round = 0; round < 100; ++round) {
         oneRound(broker, round);
+    }
     return &gExact;
 }
 

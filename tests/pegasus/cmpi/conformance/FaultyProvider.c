@@ -65,8 +65,9 @@ CMPIInstanceMI* Faulty_Create_InstanceMI(const CMPIBroker* broker, const CMPICon
 {
     static int calls;
     (void)ctx;
-    if (++calls > 1)
+    if (++calls > 1) {
         return make(broker, NULL);
+    }
     rc->rc = CMPI_RC_ERR_FAILED;
     rc->msg = broker->eft->newString(broker, "no device yet", NULL);
     return make(broker, NULL); /* an interface beside an error is an error */

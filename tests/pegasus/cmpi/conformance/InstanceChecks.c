@@ -1,5 +1,5 @@
 /* Instances: their properties, and how path and properties meet. */
-#include "Conformance.h"
+#include "tests/pegasus/cmpi/conformance/Conformance.h"
 
 #include <string.h>
 

@@ -1,5 +1,5 @@
 /* Object paths. */
-#include "Conformance.h"
+#include "tests/pegasus/cmpi/conformance/Conformance.h"
 
 #include <string.h>
 

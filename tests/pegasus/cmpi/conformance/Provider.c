@@ -2,7 +2,7 @@
   The provider that the broker's tests drive: TST_Check has methods that run the checks, TST_Item has instances that are
   returned in as many ways as providers do it, right and wrong.
 */
-#include "Conformance.h"
+#include "tests/pegasus/cmpi/conformance/Conformance.h"
 
 #include <stdatomic.h>
 #include <stdio.h>
@@ -68,8 +68,9 @@ static CMPIStatus returnItem(const CMPIResult* result, int id)
 static CMPIStatus returnItems(const CMPIResult* result, int count)
 {
     CMPIStatus status = kOk;
-    for (int i = 0; i < count && status.rc == CMPI_RC_OK; ++i)
+    for (int i = 0; i < count && status.rc == CMPI_RC_OK; ++i) {
         status = returnItem(result, i);
+    }
     return status;
 }
 
@@ -107,8 +108,9 @@ static CMPIStatus returnAfterDone(const CMPIResult* result)
 static CMPIStatus nameProperties(const char** properties)
 {
     char text[128] = "all";
-    if (properties != NULL)
+    if (properties != NULL) {
         text[0] = '\0';
+    }
     for (; properties != NULL && *properties != NULL; ++properties) {
         strncat(text, *properties, sizeof text - strlen(text) - 1);
         strncat(text, ";", sizeof text - strlen(text) - 1);
@@ -119,22 +121,28 @@ static CMPIStatus nameProperties(const char** properties)
 static CMPIStatus enumerate(const CMPIResult* result, const char** properties)
 {
     int number = 0;
-    if (sscanf(gMode, "count %d", &number) == 1)
+    if (sscanf(gMode, "count %d", &number) == 1) {
         return returnItems(result, number);
+    }
     if (sscanf(gMode, "fail %d", &number) == 1) {
         returnItems(result, 3);
         return failure((CMPIrc)number, "the reason");
     }
-    if (strcmp(gMode, "fail without text") == 0)
+    if (strcmp(gMode, "fail without text") == 0) {
         return failure(CMPI_RC_ERR_ACCESS_DENIED, NULL);
-    if (strcmp(gMode, "changed") == 0)
+    }
+    if (strcmp(gMode, "changed") == 0) {
         return returnChanged(result);
-    if (strcmp(gMode, "wrong kinds") == 0)
+    }
+    if (strcmp(gMode, "wrong kinds") == 0) {
         return returnWrongKinds(result);
-    if (strcmp(gMode, "after done") == 0)
+    }
+    if (strcmp(gMode, "after done") == 0) {
         return returnAfterDone(result);
-    if (strcmp(gMode, "properties") == 0)
+    }
+    if (strcmp(gMode, "properties") == 0) {
         return nameProperties(properties);
+    }
     const CMPIStatus status = returnItems(result, 3);
     return status.rc == CMPI_RC_OK ? result->ft->returnDone(result) : status;
 }
@@ -165,12 +173,14 @@ static CMPIStatus tstGetInstance(CMPIInstanceMI* mi, const CMPIContext* ctx, con
                                  const CMPIObjectPath* op, const char** properties)
 {
     (void)mi, (void)ctx, (void)properties;
-    if (strcmp(gMode, "nothing") == 0)
+    if (strcmp(gMode, "nothing") == 0) {
         return kOk;
+    }
     const CMPIData id = op->ft->getKey(op, "Id", NULL);
     CMPIStatus status = returnItem(result, atoi(textOf(id.value.string)));
-    if (strcmp(gMode, "two") == 0)
+    if (strcmp(gMode, "two") == 0) {
         status = returnItem(result, 1);
+    }
     return status;
 }
 
@@ -201,14 +211,18 @@ enum
 static CMPIStatus listChecks(const CMPIResult* result, CMPIArgs* out)
 {
     CMPICount count = 0;
-    for (int t = 0; t < kTableCount; ++t)
-        for (const CheckRow* row = kTables[t]; row->name != NULL; ++row)
+    for (int t = 0; t < kTableCount; ++t) {
+        for (const CheckRow* row = kTables[t]; row->name != NULL; ++row) {
             ++count;
+        }
+    }
     CMPIValue names = {.array = gBroker->eft->newArray(gBroker, count, CMPI_string, NULL)};
     count = 0;
-    for (int t = 0; t < kTableCount; ++t)
-        for (const CheckRow* row = kTables[t]; row->name != NULL; ++row)
+    for (int t = 0; t < kTableCount; ++t) {
+        for (const CheckRow* row = kTables[t]; row->name != NULL; ++row) {
             names.array->ft->setElementAt(names.array, count++, (const CMPIValue*)row->name, CMPI_chars);
+        }
+    }
     out->ft->addArg(out, "Names", &names, CMPI_stringA);
     const CMPIValue zero = {.uint32 = 0};
     return result->ft->returnData(result, &zero, CMPI_uint32);
@@ -217,13 +231,15 @@ static CMPIStatus listChecks(const CMPIResult* result, CMPIArgs* out)
 static CMPIStatus runCheck(const Env* env)
 {
     const char* wanted = textOf(env->in->ft->getArg(env->in, "Name", NULL).value.string);
-    for (int t = 0; t < kTableCount; ++t)
-        for (const CheckRow* row = kTables[t]; row->name != NULL; ++row)
+    for (int t = 0; t < kTableCount; ++t) {
+        for (const CheckRow* row = kTables[t]; row->name != NULL; ++row) {
             if (strcmp(row->name, wanted) == 0) {
                 const char* failed = row->check(env);
                 return env->result->ft->returnData(env->result, (const CMPIValue*)(failed == NULL ? "" : failed),
                                                    CMPI_chars);
             }
+        }
+    }
     return failure(CMPI_RC_ERR_NOT_FOUND, wanted);
 }
 
@@ -239,8 +255,9 @@ static CMPIStatus descend(const Env* env)
         in->ft->addArg(in, "Depth", &less, CMPI_uint32);
         CMPIStatus rc = kGarbage;
         gBroker->bft->invokeMethod(gBroker, env->ctx, env->op, "Descend", in, out, &rc);
-        if (rc.rc != CMPI_RC_OK)
+        if (rc.rc != CMPI_RC_OK) {
             return rc;
+        }
         snprintf(trail, sizeof trail, "%s", textOf(out->ft->getArg(out, "Trail", NULL).value.string));
     }
     const size_t end = strlen(trail);
@@ -259,8 +276,9 @@ static CMPIStatus echo(const Env* env)
         const CMPIData data = env->in->ft->getArgAt(env->in, i, &name, NULL);
         const CMPIValue* value = (data.state & CMPI_nullValue) != 0 ? NULL : &data.value;
         const CMPIStatus added = env->out->ft->addArg(env->out, textOf(name), value, data.type);
-        if (added.rc != CMPI_RC_OK)
+        if (added.rc != CMPI_RC_OK) {
             return added;
+        }
     }
     const CMPIData first = env->in->ft->getArgAt(env->in, 0, NULL, NULL);
     return (first.state & CMPI_nullValue) != 0 ? kOk
@@ -271,8 +289,9 @@ static CMPIStatus setMode(const Env* env)
 {
     snprintf(gMode, sizeof gMode, "%s", textOf(env->in->ft->getArg(env->in, "Mode", NULL).value.string));
     int answer = 0;
-    if (sscanf(gMode, "cleanup %d", &answer) == 1)
+    if (sscanf(gMode, "cleanup %d", &answer) == 1) {
         gCleanupAnswer = (CMPIrc)answer;
+    }
     const CMPIValue zero = {.uint32 = 0};
     return env->result->ft->returnData(env->result, &zero, CMPI_uint32);
 }
@@ -294,20 +313,21 @@ static CMPIStatus tstInvokeMethod(CMPIMethodMI* mi, const CMPIContext* ctx, cons
     const Env env = {gBroker, ctx, op, result, in, out};
     CMPIStatus status;
     ++gRunning;
-    if (strcmp(method, "List") == 0)
+    if (strcmp(method, "List") == 0) {
         status = listChecks(result, out);
-    else if (strcmp(method, "Run") == 0)
+    } else if (strcmp(method, "Run") == 0) {
         status = runCheck(&env);
-    else if (strcmp(method, "Descend") == 0)
+    } else if (strcmp(method, "Descend") == 0) {
         status = descend(&env);
-    else if (strcmp(method, "Echo") == 0)
+    } else if (strcmp(method, "Echo") == 0) {
         status = echo(&env);
-    else if (strcmp(method, "SetMode") == 0)
+    } else if (strcmp(method, "SetMode") == 0) {
         status = setMode(&env);
-    else if (strcmp(method, "Tell") == 0)
+    } else if (strcmp(method, "Tell") == 0) {
         status = tell(&env);
-    else
+    } else {
         status = failure(CMPI_RC_ERR_METHOD_NOT_FOUND, method);
+    }
     --gRunning;
     return status;
 }

@@ -1,5 +1,5 @@
 /* Strings, datetimes and messages. */
-#include "Conformance.h"
+#include "tests/pegasus/cmpi/conformance/Conformance.h"
 
 #include <stdlib.h>
 #include <string.h>

@@ -1,5 +1,5 @@
 /* The tables themselves: versions, and that no slot is empty. */
-#include "Conformance.h"
+#include "tests/pegasus/cmpi/conformance/Conformance.h"
 
 #include <string.h>
 
@@ -8,8 +8,9 @@ static int hasNoHole(const void* table, size_t from, size_t size)
     for (size_t at = from; at < size; at += sizeof(void*)) {
         const void* slot;
         memcpy(&slot, (const char*)table + at, sizeof slot);
-        if (slot == NULL)
+        if (slot == NULL) {
             return 0;
+        }
     }
     return 1;
 }

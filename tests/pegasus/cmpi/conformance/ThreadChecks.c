@@ -1,5 +1,5 @@
 /* Threads, locks and keys of the broker, and the provider's own threads. */
-#include "Conformance.h"
+#include "tests/pegasus/cmpi/conformance/Conformance.h"
 
 #include <errno.h>
 #include <stdlib.h>
@@ -149,11 +149,13 @@ static const char* visit(const Visitor* visitor)
 static CMPIThreadReturn visitOnThread(void* parm)
 {
     Visitor* visitor = parm;
-    if (visitor->prepared != NULL)
+    if (visitor->prepared != NULL) {
         visitor->mb->bft->attachThread(visitor->mb, visitor->prepared);
+    }
     visitor->failure = visit(visitor);
-    if (visitor->prepared != NULL)
+    if (visitor->prepared != NULL) {
         visitor->mb->bft->detachThread(visitor->mb, visitor->prepared);
+    }
     return NULL;
 }
 
@@ -167,8 +169,9 @@ static const char* ownThreadsMayCall(const Env* env)
         }
         const CMPIThread thread = env->mb->xft->newThread(visitOnThread, &visitor, 0);
         REQUIRE(thread != NULL && env->mb->xft->joinThread(thread, NULL) == 0);
-        if (visitor.failure != NULL)
+        if (visitor.failure != NULL) {
             return visitor.failure;
+        }
     }
     return NULL;
 }

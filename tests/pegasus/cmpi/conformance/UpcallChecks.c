@@ -1,5 +1,5 @@
 /* The context, and upcalls made with it. The server answers upcalls by this provider itself. */
-#include "Conformance.h"
+#include "tests/pegasus/cmpi/conformance/Conformance.h"
 
 #include <string.h>
 

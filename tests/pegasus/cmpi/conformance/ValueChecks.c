@@ -1,5 +1,5 @@
 /* Every type of value, and that no byte beyond it is read. */
-#include "Conformance.h"
+#include "tests/pegasus/cmpi/conformance/Conformance.h"
 
 #include <float.h>
 #include <limits.h>
@@ -34,8 +34,9 @@ static void* atPageEnd(void** page, const void* source, size_t size)
 {
     const size_t bytes = (size_t)sysconf(_SC_PAGESIZE);
     *page = mmap(NULL, 2 * bytes, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
-    if (*page == MAP_FAILED || mprotect((char*)*page + bytes, bytes, PROT_NONE) != 0)
+    if (*page == MAP_FAILED || mprotect((char*)*page + bytes, bytes, PROT_NONE) != 0) {
         return NULL;
+    }
     return memcpy((char*)*page + bytes - size, source, size);
 }
 

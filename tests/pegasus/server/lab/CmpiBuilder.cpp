@@ -1,4 +1,4 @@
-#include "pegasus/server/lab/CmpiBuilder.h"
+#include "tests/pegasus/server/lab/CmpiBuilder.h"
 
 #include <Pegasus/Common/CIMObject.h>
 #include <Pegasus/Common/CIMProperty.h>
@@ -70,29 +70,32 @@ const char* c_str(const CString& text)
 
 Argument CmpiBuilder::argument(const CIMValue& value) const
 {
-    if (value.isArray())
+    if (value.isArray()) {
         return array(value);
+    }
     return visitType(value.getType(), [&](auto content, CMPIType type) {
         using T = decltype(content);
         Argument result{type, value.isNull(), {}};
-        if (result.isNull)
+        if (result.isNull) {
             return result;
+        }
         value.get(content);
-        if constexpr (std::is_same_v<T, String>)
+        if constexpr (std::is_same_v<T, String>) {
             put(result.value, fBroker->eft->newString(fBroker, c_str(content.getCString()), nullptr));
-        else if constexpr (std::is_same_v<T, CIMDateTime>)
+        } else if constexpr (std::is_same_v<T, CIMDateTime>) {
             put(result.value,
                 fBroker->eft->newDateTimeFromChars(fBroker, c_str(content.toString().getCString()), nullptr));
-        else if constexpr (std::is_same_v<T, CIMObjectPath>)
+        } else if constexpr (std::is_same_v<T, CIMObjectPath>) {
             put(result.value, path(content));
-        else if constexpr (std::is_same_v<T, CIMInstance>)
+        } else if constexpr (std::is_same_v<T, CIMInstance>) {
             put(result.value, embedded(content));
-        else if constexpr (std::is_same_v<T, CIMObject>)
+        } else if constexpr (std::is_same_v<T, CIMObject>) {
             put(result.value, embedded(CIMInstance(content)));
-        else if constexpr (std::is_same_v<T, Char16>)
+        } else if constexpr (std::is_same_v<T, Char16>) {
             put(result.value, static_cast<Uint16>(content));
-        else
+        } else {
             put(result.value, content);
+        }
         return result;
     });
 }
@@ -101,8 +104,9 @@ Argument CmpiBuilder::array(const CIMValue& value) const
 {
     return visitType(value.getType(), [&](auto sample, CMPIType type) {
         Argument result{static_cast<CMPIType>(type | CMPI_ARRAY), value.isNull(), {}};
-        if (result.isNull)
+        if (result.isNull) {
             return result;
+        }
         Array<decltype(sample)> elements;
         value.get(elements);
         CMPIArray* made = fBroker->eft->newArray(fBroker, elements.size(), type, nullptr);
@@ -121,18 +125,20 @@ CMPIObjectPath* CmpiBuilder::path(const CIMObjectPath& from, const CIMInstance* 
     CMPIObjectPath* made =
         fBroker->eft->newObjectPath(fBroker, nameSpace.isNull() ? "" : c_str(nameSpace.getString().getCString()),
                                     c_str(from.getClassName().getString().getCString()), nullptr);
-    if (from.getHost().size() != 0)
+    if (from.getHost().size() != 0) {
         made->ft->setHostname(made, c_str(from.getHost().getCString()));
+    }
     const Array<CIMKeyBinding> keys = from.getKeyBindings();
     for (Uint32 i = 0; i < keys.size(); ++i) {
         const Uint32 at = instance == nullptr ? PEG_NOT_FOUND : instance->findProperty(keys[i].getName());
         CIMValue value(keys[i].getValue());
-        if (at != PEG_NOT_FOUND)
+        if (at != PEG_NOT_FOUND) {
             value = instance->getProperty(at).getValue();
-        else if (keys[i].getType() == CIMKeyBinding::REFERENCE)
+        } else if (keys[i].getType() == CIMKeyBinding::REFERENCE) {
             value = CIMValue(CIMObjectPath(keys[i].getValue()));
-        else if (keys[i].getType() == CIMKeyBinding::NUMERIC)
+        } else if (keys[i].getType() == CIMKeyBinding::NUMERIC) {
             value = CIMValue(Sint64(std::atoll(c_str(keys[i].getValue().getCString()))));
+        }
         const Argument key = argument(value);
         made->ft->addKey(made, c_str(keys[i].getName().getString().getCString()), key.pointer(), key.type);
     }

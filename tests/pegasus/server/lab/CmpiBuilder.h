@@ -1,7 +1,6 @@
 #pragma once
 
 #include <Pegasus/Common/CIMInstance.h>
-
 #include <cmpi/cmpi.h>
 
 namespace lab {

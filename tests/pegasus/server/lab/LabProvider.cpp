@@ -3,17 +3,16 @@
 //   <name>.status   "CODE TEXT": class or method fails with that, a class behind its instances; "throw": a C++ int
 //   <Method>.echo   a prefix: the method gives its inputs back with that before their names
 //   <Method>.xml    a CIM-XML message with RETURNVALUE and PARAMVALUE elements: what else the method answers
-#include "pegasus/server/lab/CmpiBuilder.h"
-
-#include "pegasus/common/ElementDecoder.h"
-
-#include <dlfcn.h>
+#include "pegasus/wire/ElementDecoder.h"
+#include "tests/pegasus/server/lab/CmpiBuilder.h"
 
 #include <atomic>
 #include <filesystem>
 #include <fstream>
 #include <functional>
 #include <sstream>
+
+#include <dlfcn.h>
 
 namespace {
 
@@ -51,20 +50,24 @@ std::string contentOf(const std::string& name)
 void forEach(XmlElement element, std::initializer_list<const char*> names,
              const std::function<void(const XmlElement&)>& take)
 {
-    for (; element; element = element.nextSibling())
-        if (std::any_of(names.begin(), names.end(), [&](const char* name) { return element.is(name); }))
+    for (; element; element = element.nextSibling()) {
+        if (std::any_of(names.begin(), names.end(), [&](const char* name) { return element.is(name); })) {
             take(element);
-        else if (element.is("CIM") || element.is("MESSAGE") || element.is("SIMPLERSP") ||
-                 element.is("IMETHODRESPONSE") || element.is("METHODRESPONSE") || element.is("IRETURNVALUE"))
+        } else if (element.is("CIM") || element.is("MESSAGE") || element.is("SIMPLERSP") ||
+                   element.is("IMETHODRESPONSE") || element.is("METHODRESPONSE") || element.is("IRETURNVALUE"))
+        {
             forEach(element.firstChild(), names, take);
+        }
+    }
 }
 
 void readFile(const std::string& name, std::initializer_list<const char*> elements,
               const std::function<void(ElementDecoder&, const XmlElement&)>& take)
 {
     std::string text = contentOf(name);
-    if (text.empty())
+    if (text.empty()) {
         return;
+    }
     XmlDocument document;
     ElementDecoder decoder;
     forEach(document.parseMessage(text.data(), text.size()), elements,
@@ -76,10 +79,12 @@ CMPIStatus statusOf(const std::string& name)
     std::istringstream line(contentOf(name + ".status"));
     std::string text;
     int code = 0;
-    if (line.str() == "throw")
+    if (line.str() == "throw") {
         throw 7;
-    if (!(line >> code))
+    }
+    if (!(line >> code)) {
         return {CMPI_RC_OK, nullptr};
+    }
     std::getline(line.ignore(1), text);
     return failure(code, text);
 }
@@ -120,8 +125,9 @@ CMPIStatus getInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* re
     return deliver(result, wanted, [&](const CmpiBuilder& builder, const Pegasus::CIMInstance& instance) {
         CMPIInstance* made = builder.instance(instance);
         const CMPIObjectPath* path = made->ft->getObjectPath(made, nullptr);
-        if (textOf(path->ft->toString(path, nullptr)) == wantedText)
+        if (textOf(path->ft->toString(path, nullptr)) == wantedText) {
             result->ft->returnInstance(result, made);
+        }
     });
 }
 
@@ -140,10 +146,12 @@ CMPIStatus invokeMethod(CMPIMethodMI*, const CMPIContext*, const CMPIResult* res
                         const char* method, const CMPIArgs* in, CMPIArgs* out)
 {
     const CMPIStatus status = statusOf(method);
-    if (status.rc != CMPI_RC_OK)
+    if (status.rc != CMPI_RC_OK) {
         return status;
-    if (const std::string echo = contentOf(std::string(method) + ".echo"); !echo.empty())
+    }
+    if (const std::string echo = contentOf(std::string(method) + ".echo"); !echo.empty()) {
         giveBack(echo.substr(0, echo.find('\n')), in, out);
+    }
     const CmpiBuilder builder(gBroker, textOf(of->ft->getNameSpace(of, nullptr)));
     const auto take = [&](ElementDecoder& decoder, const XmlElement& element) {
         if (element.is("RETURNVALUE")) {

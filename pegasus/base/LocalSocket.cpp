@@ -1,0 +1,137 @@
+#include "pegasus/base/LocalSocket.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <cstdio>
+#include <cstdlib>
+#include <system_error>
+
+#include <fcntl.h>
+#include <sys/socket.h>
+#include <sys/stat.h>
+#include <sys/time.h>
+#include <sys/un.h>
+#include <unistd.h>
+
+namespace Pegasus::wire {
+
+const char* const kLocalSocketName = "cimxml.socket";
+
+namespace {
+
+[[noreturn]] void fail(const char* operation, const std::string& home)
+{
+    throw std::system_error(errno, std::generic_category(),
+                            std::string(operation) + " " + home + "/" + kLocalSocketName);
+}
+
+// A descriptor that is closed on the way out unless it was released.
+class Descriptor
+{
+  public:
+    explicit Descriptor(int fd) : fFd(fd) {}
+    ~Descriptor()
+    {
+        if (fFd >= 0) {
+            ::close(fFd);
+        }
+    }
+    Descriptor(const Descriptor&) = delete;
+    Descriptor& operator=(const Descriptor&) = delete;
+    int get() const { return fFd; }
+    int release()
+    {
+        const int fd = fFd;
+        fFd = -1;
+        return fd;
+    }
+
+  private:
+    int fFd;
+};
+
+int openHome(const std::string& home)
+{
+    const int fd = ::open(home.c_str(), O_PATH | O_DIRECTORY | O_CLOEXEC);
+    if (fd < 0) {
+        fail("cannot open the folder of", home);
+    }
+    return fd;
+}
+
+int newSocket(const std::string& home)
+{
+    const int fd = ::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0);
+    if (fd < 0) {
+        fail("cannot create a socket for", home);
+    }
+    return fd;
+}
+
+sockaddr_un addressIn(int homeFd)
+{
+    sockaddr_un address{};
+    address.sun_family = AF_UNIX;
+    std::snprintf(address.sun_path, sizeof(address.sun_path), "/proc/self/fd/%d/%s", homeFd, kLocalSocketName);
+    return address;
+}
+
+int connectRetrying(int fd, const sockaddr_un& address)
+{
+    int result = -1;
+    do {
+        result = ::connect(fd, reinterpret_cast<const sockaddr*>(&address), sizeof(address));
+    } while (result < 0 && errno == EINTR);
+    return result;
+}
+
+} // namespace
+
+std::string localSocketHome()
+{
+    const char* home = std::getenv("PEGASUS_HOME");
+    return home ? home : "";
+}
+
+int connectLocalSocket(const std::string& home, int timeoutMs)
+{
+    const Descriptor folder(openHome(home));
+    Descriptor socket(newSocket(home));
+    const int bound = std::max(timeoutMs, 1); // 0 would mean for ever
+    const timeval limit{bound / 1000, (bound % 1000) * 1000L};
+    if (::setsockopt(socket.get(), SOL_SOCKET, SO_SNDTIMEO, &limit, sizeof(limit)) < 0) {
+        fail("cannot set the time-out of", home);
+    }
+    if (connectRetrying(socket.get(), addressIn(folder.get())) < 0) {
+        fail("cannot connect to", home);
+    }
+    return socket.release();
+}
+
+int listenLocalSocket(const std::string& home, int backlog)
+{
+    const Descriptor folder(openHome(home));
+    Descriptor socket(newSocket(home));
+    if (::unlinkat(folder.get(), kLocalSocketName, 0) < 0 && errno != ENOENT) {
+        fail("cannot remove", home);
+    }
+    // The mode of the socket file is the descriptor's own, so there is no moment when others could connect.
+    if (::fchmod(socket.get(), S_IRUSR | S_IWUSR) < 0) {
+        fail("cannot set the mode of", home);
+    }
+    const sockaddr_un address = addressIn(folder.get());
+    if (::bind(socket.get(), reinterpret_cast<const sockaddr*>(&address), sizeof(address)) < 0) {
+        fail("cannot bind", home);
+    }
+    if (::listen(socket.get(), backlog) < 0) {
+        fail("cannot listen on", home);
+    }
+    return socket.release();
+}
+
+void removeLocalSocket(const std::string& home) noexcept
+{
+    ::unlink((home + "/" + kLocalSocketName).c_str());
+}
+
+} // namespace Pegasus::wire

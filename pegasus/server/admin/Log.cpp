@@ -1,0 +1,118 @@
+#include "pegasus/server/admin/Log.h"
+
+#include "pegasus/base/Descriptor.h"
+
+#include <atomic>
+#include <cstdio>
+#include <ctime>
+#include <mutex>
+
+#include <fcntl.h>
+#include <sys/stat.h>
+
+namespace Pegasus::server {
+
+namespace {
+
+struct LogState
+{
+    std::mutex mutex;
+    Descriptor file;
+    std::string path;
+    bool toStandardError = false;
+    std::atomic<Severity> least{Severity::kInformation};
+};
+
+LogState& state()
+{
+    static LogState fgInstance;
+    return fgInstance;
+}
+
+void reopen(LogState& log)
+{
+    log.file.reset(::open(log.path.c_str(), O_WRONLY | O_CREAT | O_APPEND | O_NOFOLLOW | O_CLOEXEC, 0600));
+}
+
+void rotateWhenFull(LogState& log)
+{
+    struct stat info = {};
+    if (::fstat(log.file.get(), &info) != 0 || static_cast<std::size_t>(info.st_size) < Log::kMaxLogBytes) {
+        return;
+    }
+    ::rename(log.path.c_str(), (log.path + ".1").c_str());
+    reopen(log);
+}
+
+const char* label(Severity severity)
+{
+    static const char* const kLabels[] = {"error", "warning", "info", "debug"};
+    return kLabels[static_cast<int>(severity)];
+}
+
+std::string stamp()
+{
+    const std::time_t now = std::time(nullptr);
+    std::tm parts = {};
+    ::gmtime_r(&now, &parts);
+    char text[32];
+    const std::size_t size = std::strftime(text, sizeof text, "%Y-%m-%dT%H:%M:%SZ", &parts);
+    return std::string(text, size);
+}
+
+std::string formatLine(Severity severity, const std::string& text)
+{
+    std::string line = stamp() + " [" + std::to_string(::getpid()) + "] " + label(severity) + ": ";
+    for (const char c : text) {
+        if (c == '\n') {
+            line += "\\n";
+        } else {
+            line += c;
+        }
+    }
+    return line + "\n";
+}
+
+void put(int fd, const std::string& line)
+{
+    if (fd >= 0 && ::write(fd, line.data(), line.size()) < 0) {
+        return; // nowhere to say so
+    }
+}
+
+} // namespace
+
+void Log::open(const std::string& home, bool alsoToStandardError) noexcept
+try {
+    LogState& log = state();
+    const std::lock_guard<std::mutex> lock(log.mutex);
+    log.path = home + "/cimserver.log";
+    log.toStandardError = alsoToStandardError;
+    reopen(log);
+} catch (...) {
+}
+
+void Log::setLevel(Severity least) noexcept
+{
+    state().least = least;
+}
+
+void Log::write(Severity severity, const std::string& text) noexcept
+try {
+    LogState& log = state();
+    if (severity > log.least) {
+        return;
+    }
+    const std::string line = formatLine(severity, text);
+    const std::lock_guard<std::mutex> lock(log.mutex);
+    if (log.file) {
+        rotateWhenFull(log);
+    }
+    put(log.file.get(), line);
+    if (log.toStandardError) {
+        put(STDERR_FILENO, line);
+    }
+} catch (...) {
+}
+
+} // namespace Pegasus::server

@@ -1,0 +1,33 @@
+#pragma once
+
+#include "pegasus/base/Descriptor.h"
+
+#include <thread>
+
+namespace Pegasus::server {
+
+// Becomes readable when the server is to end: by SIGTERM, SIGINT or SIGHUP, or by raise().
+// While it exists, these signals are blocked in this thread and in those started from it.
+class StopSignal
+{
+  public:
+    // Throws: std::system_error. Requires: no other thread runs.
+    StopSignal();
+    ~StopSignal();
+    StopSignal(const StopSignal&) = delete;
+    StopSignal& operator=(const StopSignal&) = delete;
+
+    int fd() const { return fEvent.get(); }
+    // Thread: any.
+    void raise() noexcept;
+
+  private:
+    void waitForSignal();
+
+    Descriptor fEvent;
+    Descriptor fSignals;
+    Descriptor fEnd;
+    std::thread fWaiter;
+};
+
+} // namespace Pegasus::server

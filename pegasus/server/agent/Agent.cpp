@@ -1,0 +1,138 @@
+#include "pegasus/server/agent/Agent.h"
+
+#include "pegasus/server/admin/ConfigFile.h"
+#include "pegasus/server/admin/Log.h"
+#include "pegasus/server/agent/AgentHandler.h"
+#include "pegasus/server/agent/AgentProcess.h"
+#include "pegasus/server/agent/AgentServices.h"
+
+#include <cerrno>
+#include <condition_variable>
+#include <cstdlib>
+#include <cstring>
+#include <system_error>
+#include <thread>
+
+#include <fcntl.h>
+#include <sys/prctl.h>
+#include <sys/resource.h>
+#include <sys/socket.h>
+
+namespace Pegasus::server {
+
+namespace {
+
+constexpr int kControlFd = 3;
+constexpr std::chrono::seconds kGraceForProviders{2};
+
+// The threads that serve channels. They are detached; the count says when none is left.
+class ChannelThreads
+{
+  public:
+    void serve(Descriptor channel, AgentHandler& handler)
+    {
+        {
+            const std::lock_guard<std::mutex> lock(fMutex);
+            ++fCount;
+        }
+        std::thread([this, &handler, fd = channel.release()] {
+            run(Descriptor(fd), handler);
+            const std::lock_guard<std::mutex> lock(fMutex);
+            --fCount;
+            fChanged.notify_all();
+        }).detach();
+    }
+
+    // Returns: false if some still run at the deadline.
+    bool waitForEnd(Deadline deadline)
+    {
+        std::unique_lock<std::mutex> lock(fMutex);
+        return fChanged.wait_until(lock, deadline, [&] { return fCount == 0; });
+    }
+
+  private:
+    // The server has checked its client's limits already; it decides how long anything may take.
+    static ConnectionSettings settings()
+    {
+        ConnectionSettings settings;
+        settings.http = {16u << 20, 1u << 30};
+        settings.times = {std::chrono::milliseconds::zero(), std::chrono::milliseconds::zero()};
+        settings.writePatience = std::chrono::milliseconds::zero();
+        settings.maxXmlDepth = 1024;
+        return settings;
+    }
+
+    static void run(Descriptor channel, AgentHandler& handler)
+    {
+        SocketStream stream(std::move(channel));
+        Connection(stream, handler, settings, CimAnswer::Envelope::kBare).serve();
+    }
+
+    std::mutex fMutex;
+    std::condition_variable fChanged;
+    unsigned fCount = 0;
+};
+
+// Returns: the next channel; none when the server has gone.
+Descriptor receiveChannel()
+{
+    char byte = 0;
+    iovec data = {&byte, 1};
+    int fd = -1;
+    alignas(cmsghdr) char space[CMSG_SPACE(sizeof fd)] = {};
+    msghdr message = {};
+    message.msg_iov = &data;
+    message.msg_iovlen = 1;
+    message.msg_control = space;
+    message.msg_controllen = sizeof space;
+    ssize_t n = -1;
+    do {
+        n = ::recvmsg(kControlFd, &message, MSG_CMSG_CLOEXEC);
+    } while (n < 0 && errno == EINTR);
+    const cmsghdr* header = n == 1 ? CMSG_FIRSTHDR(&message) : nullptr;
+    if (header != nullptr && header->cmsg_level == SOL_SOCKET && header->cmsg_type == SCM_RIGHTS) {
+        std::memcpy(&fd, CMSG_DATA(header), sizeof fd);
+    }
+    return Descriptor(fd);
+}
+
+void limitMemory(std::size_t megabytes)
+{
+#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__) // whose shadow memory is larger than any limit
+    if (megabytes == 0) {
+        return;
+    }
+    const rlimit limit = {megabytes << 20, megabytes << 20};
+    ::setrlimit(RLIMIT_AS, &limit);
+#else
+    (void)megabytes;
+#endif
+}
+
+} // namespace
+
+bool isAgentCommand(int argc, char** argv)
+{
+    return argc == 4 && std::strcmp(argv[1], "--agent") == 0;
+}
+
+int runAgent(int, char** argv)
+{
+    ::prctl(PR_SET_NAME, kAgentProcessName);
+    ::fcntl(kControlFd, F_SETFD, FD_CLOEXEC);
+    limitMemory(std::strtoul(argv[3], nullptr, 10));
+    Log::open(defaultHome(), false);
+    AgentServices services(argv[2]);
+    auto handler = std::make_unique<AgentHandler>(argv[2], services);
+    ChannelThreads threads;
+    while (Descriptor channel = receiveChannel()) {
+        threads.serve(std::move(channel), *handler);
+    }
+    // A provider that still works, or never returns, is left behind with its process; else it is asked to clean up.
+    if (threads.waitForEnd(Clock::now() + kGraceForProviders)) {
+        handler.reset();
+    }
+    ::_exit(0);
+}
+
+} // namespace Pegasus::server

@@ -1,0 +1,106 @@
+#include "pegasus/server/agent/AgentHandler.h"
+
+#include "pegasus/server/agent/AgentMessages.h"
+#include "pegasus/wire/ElementEncoder.h"
+
+namespace Pegasus::server {
+
+namespace {
+
+std::string privateHeader(const HttpRequest& http, const char* name)
+{
+    const std::string* value = http.header(name);
+    return value != nullptr ? percentDecode(*value) : std::string();
+}
+
+cmpi::ProviderRequest providerRequest(const HttpRequest& http, const CimRequest& request)
+{
+    cmpi::ProviderRequest result;
+    result.provider = privateHeader(http, "PG-Provider");
+    result.nameSpace = request.nameSpace;
+    result.principal = String("root"); // the server's clients are its own user and root, and providers ask for one name
+    return result;
+}
+
+} // namespace
+
+cmpi::ProviderModule& AgentHandler::module(const HttpRequest& http)
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    if (!fModule) {
+        fModule = std::make_unique<cmpi::ProviderModule>(fModuleName, privateHeader(http, "PG-Library"), fServices);
+    }
+    return *fModule;
+}
+
+void AgentHandler::handle(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)
+{
+    if (!request.isIntrinsic) {
+        invokeMethod(http, request, answer);
+    } else if (request.method == "EnumerateInstances") {
+        enumerateInstances(http, request, answer);
+    } else if (request.method == "EnumerateInstanceNames") {
+        enumerateInstanceNames(http, request, answer);
+    } else if (request.method == "GetInstance") {
+        getInstance(http, request, answer);
+    } else if (request.method == kUnloadMethod) {
+        unload();
+    } else {
+        throw CIMException(CIM_ERR_NOT_SUPPORTED, String());
+    }
+}
+
+// Success says that the agent may be ended.
+void AgentHandler::unload()
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    if (fModule && fModule->cleanupWhenIdle() != cmpi::ProviderModule::Cleanup::kReleased) {
+        throw CIMException(CIM_ERR_FAILED, String("the provider module is in use"));
+    }
+}
+
+void AgentHandler::enumerateInstances(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)
+{
+    std::string text;
+    module(http).enumerateInstances(providerRequest(http, request), request.parameters.className("ClassName"),
+                                    request.parameters.propertyList(), [&](const CIMInstance& instance) {
+                                        text.clear();
+                                        wire::appendNamedInstance(text, instance);
+                                        answer.write(text);
+                                    });
+}
+
+void AgentHandler::enumerateInstanceNames(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)
+{
+    std::string text;
+    module(http).enumerateInstanceNames(providerRequest(http, request), request.parameters.className("ClassName"),
+                                        [&](const CIMObjectPath& path) {
+                                            text.clear();
+                                            wire::appendInstanceName(text, path);
+                                            answer.write(text);
+                                        });
+}
+
+void AgentHandler::getInstance(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)
+{
+    std::string text;
+    wire::appendInstance(text, module(http).getInstance(providerRequest(http, request),
+                                                        request.parameters.instanceName("InstanceName"),
+                                                        request.parameters.propertyList()));
+    answer.write(text);
+}
+
+void AgentHandler::invokeMethod(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)
+{
+    Array<CIMParamValue> out;
+    const CIMValue result = module(http).invokeMethod(providerRequest(http, request), request.object,
+                                                      CIMName(String(request.method.c_str())), request.arguments, out);
+    std::string text;
+    wire::appendReturnValue(text, result);
+    for (Uint32 i = 0; i < out.size(); ++i) {
+        wire::appendParamValue(text, out[i]);
+    }
+    answer.write(text);
+}
+
+} // namespace Pegasus::server

@@ -1,0 +1,21 @@
+#pragma once
+
+#include "pegasus/server/agent/AgentChannel.h"
+
+#include <Pegasus/Common/CIMName.h>
+#include <Pegasus/Common/CIMPropertyList.h>
+
+namespace Pegasus::server {
+
+// Requests that the server makes for agents itself. Those of clients are passed on as they came where they fit.
+
+// EnumerateInstances, with everything that the provider has, of one class alone.
+AgentRequest makeEnumerateInstancesRequest(const CIMNamespaceName& nameSpace, const CIMName& className,
+                                           const CIMPropertyList& properties);
+AgentRequest makeEnumerateInstanceNamesRequest(const CIMNamespaceName& nameSpace, const CIMName& className);
+
+// Asks whether the module may be let go; any status but success says no.
+AgentRequest makeUnloadRequest();
+extern const char* const kUnloadMethod;
+
+} // namespace Pegasus::server

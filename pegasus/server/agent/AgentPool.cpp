@@ -1,0 +1,237 @@
+#include "pegasus/server/agent/AgentPool.h"
+
+#include "pegasus/cmpi/ProviderModule.h"
+#include "pegasus/server/admin/Log.h"
+#include "pegasus/server/agent/AgentMessages.h"
+
+#include <Pegasus/Common/Exception.h>
+
+#include <algorithm>
+#include <system_error>
+
+namespace Pegasus::server {
+
+namespace {
+
+constexpr std::chrono::seconds kWaitForCause{2};
+constexpr std::chrono::seconds kUnloadPatience{5};
+
+[[noreturn]] void fail(const std::string& text)
+{
+    throw CIMException(CIM_ERR_FAILED, String(text.c_str()));
+}
+
+std::chrono::seconds backOff(unsigned deaths)
+{
+    if (deaths < AgentPool::kFreeRestarts) {
+        return std::chrono::seconds::zero();
+    }
+    const unsigned doublings = std::min(deaths - AgentPool::kFreeRestarts, 10u);
+    return std::min(AgentPool::kFirstBackOff * (1 << doublings), AgentPool::kLastBackOff);
+}
+
+// Runs its function at the end of the scope.
+class AtEnd
+{
+  public:
+    explicit AtEnd(std::function<void()> action) : fAction(std::move(action)) {}
+    ~AtEnd() { fAction(); }
+    AtEnd(const AtEnd&) = delete;
+    AtEnd& operator=(const AtEnd&) = delete;
+
+  private:
+    std::function<void()> fAction;
+};
+
+} // namespace
+
+AgentPool::AgentPool(std::function<AgentSettings()> settings) : fMakeSettings(std::move(settings)) {}
+
+AgentPool::~AgentPool()
+{
+    shutDown();
+}
+
+CimStatus AgentPool::request(const ProviderReference& provider, AgentRequest request, ElementSink& sink)
+{
+    if (provider.interfaceType != "CMPI") {
+        fail("Provider module \"" + provider.module + "\" has the interface type " + provider.interfaceType +
+             "; this server loads CMPI modules only.");
+    }
+    const AgentSettings settings = fMakeSettings();
+    request.provider = provider.provider;
+    request.library = cmpi::findProviderLibrary(settings.providerDirectories, provider.location, provider.module);
+    try {
+        return requestOnce(provider.module, request, sink, settings.patience);
+    } catch (const AgentGone&) {
+        // It died while idle and nobody had noticed yet; the request never reached it.
+    }
+    try {
+        return requestOnce(provider.module, request, sink, settings.patience);
+    } catch (const AgentGone& error) {
+        fail("Lost connection with cimprovagt \"" + provider.module + "\". " + error.what());
+    }
+}
+
+CimStatus AgentPool::requestOnce(const std::string& module, const AgentRequest& request, ElementSink& sink,
+                                 std::chrono::milliseconds patience)
+{
+    const std::shared_ptr<AgentProcess> process = acquire(module);
+    const AtEnd releaser([&] { release(module); });
+    try {
+        std::unique_ptr<AgentChannel> channel = process->takeChannel();
+        CimStatus status = channel->request(request, sink, patience);
+        process->giveBack(std::move(channel));
+        succeeded(module);
+        return status;
+    } catch (const AgentGone&) {
+        process->kill();
+        process->waitForEnd(Clock::now() + kWaitForCause);
+        throw;
+    } catch (const AgentLost& error) {
+        lost(module, process, error.what());
+    } catch (const AgentSilent&) {
+        process->kill();
+        lost(module, process, "ended after " + std::to_string(patience.count() / 1000) + " s without an answer");
+    }
+}
+
+// Returns: the module's running agent, started if there is none; it counts as used until release().
+std::shared_ptr<AgentProcess> AgentPool::acquire(const std::string& name)
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    if (fShutDown) {
+        throw CIMException(CIM_ERR_SERVER_IS_SHUTTING_DOWN, String());
+    }
+    Module& module = fModules[name];
+    if (!module.process || !module.process->isRunning()) {
+        if (Clock::now() < module.nextStart) {
+            fail("The agent of provider module \"" + name + "\" ended " + std::to_string(module.deaths) +
+                 " times without an answer; it is not started again yet.");
+        }
+        try {
+            module.process = std::make_shared<AgentProcess>(name, fMakeSettings().memoryMegabytes);
+        } catch (const std::system_error& error) {
+            fail(error.what());
+        }
+        Log::write(Severity::kInformation, "Started " + std::string(kAgentProcessName) + " \"" + name + "\", process " +
+                                               std::to_string(module.process->pid()) + ".");
+    }
+    ++module.running;
+    return module.process;
+}
+
+void AgentPool::release(const std::string& name)
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    Module& module = fModules[name];
+    --module.running;
+    module.lastUse = Clock::now();
+}
+
+void AgentPool::succeeded(const std::string& name)
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    fModules[name].deaths = 0;
+}
+
+// Tells what became of the agent, once for all requests that it was working on.
+void AgentPool::lost(const std::string& name, const std::shared_ptr<AgentProcess>& process, const std::string& reason)
+{
+    // An agent that broke the protocol but lives on is of no use either.
+    if (!process->waitForEnd(Clock::now() + kWaitForCause)) {
+        process->kill();
+    }
+    process->waitForEnd(Clock::now() + kWaitForCause);
+    const std::string cause = process->causeOfDeath();
+    {
+        const std::lock_guard<std::mutex> lock(fMutex);
+        if (fShutDown) {
+            throw CIMException(CIM_ERR_SERVER_IS_SHUTTING_DOWN, String());
+        }
+        Module& module = fModules[name];
+        if (module.process == process) {
+            module.process.reset();
+            ++module.deaths;
+            module.nextStart = Clock::now() + backOff(module.deaths);
+            Log::write(Severity::kError,
+                       "A failure was detected in provider module " + name + ": " + reason + "; " + cause);
+        }
+    }
+    fail("Lost connection with cimprovagt \"" + name + "\". " + (cause.empty() ? reason : cause));
+}
+
+void AgentPool::shutDown() noexcept
+{
+    std::vector<std::shared_ptr<AgentProcess>> processes;
+    {
+        const std::lock_guard<std::mutex> lock(fMutex);
+        fShutDown = true;
+        for (auto& [name, module] : fModules) {
+            if (module.process) {
+                processes.push_back(std::move(module.process));
+            }
+        }
+    }
+    for (const auto& process : processes) {
+        process->close(); // all at once; the destructors wait for each
+    }
+}
+
+bool AgentPool::mayEnd(AgentProcess& process)
+{
+    try {
+        std::unique_ptr<AgentChannel> channel = process.takeChannel();
+        class : public ElementSink
+        {
+            void write(std::string_view) override {}
+        } nothing;
+        const CimStatus status = channel->request(makeUnloadRequest(), nothing, kUnloadPatience);
+        process.giveBack(std::move(channel));
+        return status.code == 0;
+    } catch (const std::exception&) { // the next real request finds out what is wrong with it
+        return false;
+    }
+}
+
+std::vector<AgentPool::Candidate> AgentPool::findIdle(std::chrono::milliseconds idle)
+{
+    std::vector<Candidate> candidates;
+    const std::lock_guard<std::mutex> lock(fMutex);
+    for (auto& [name, module] : fModules) {
+        if (!module.process || module.running != 0 || Clock::now() < module.lastUse + idle) {
+            continue;
+        }
+        module.lastUse = Clock::now(); // not again at once if it says no
+        candidates.push_back({name, module.process, module.lastUse});
+    }
+    return candidates;
+}
+
+// Takes the agent out of use, unless a request came meanwhile.
+void AgentPool::retire(const Candidate& candidate)
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    Module& module = fModules[candidate.module];
+    if (module.process != candidate.process || module.running != 0 || module.lastUse != candidate.lastUse) {
+        return;
+    }
+    module.process.reset();
+    candidate.process->close();
+    Log::write(Severity::kInformation, "Ended the idle agent of provider module \"" + candidate.module + "\".");
+}
+
+void AgentPool::endIdleAgents()
+{
+    const std::chrono::milliseconds idle = fMakeSettings().idle;
+    if (idle.count() == 0) {
+        return;
+    }
+    for (const Candidate& candidate : findIdle(idle)) {
+        if (mayEnd(*candidate.process)) {
+            retire(candidate);
+        }
+    }
+}
+
+} // namespace Pegasus::server

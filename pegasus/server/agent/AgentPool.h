@@ -1,0 +1,88 @@
+#pragma once
+
+#include "pegasus/server/agent/AgentProcess.h"
+#include "pegasus/server/agent/ProviderReference.h"
+
+#include <functional>
+#include <map>
+
+namespace Pegasus::server {
+
+// What the pool goes by; asked for anew when it is needed.
+struct AgentSettings
+{
+    std::vector<std::string> providerDirectories;
+    std::chrono::milliseconds patience = std::chrono::minutes(10);
+    std::chrono::milliseconds idle = std::chrono::minutes(5); // zero: for ever
+    std::size_t memoryMegabytes = 0;
+};
+
+// The agents, one a provider module: started at a module's first request, ended when idle, started again after a crash.
+//
+// A module whose agent keeps dying is left alone for a while: after kFreeRestarts deaths without a good answer between
+// them, requests fail at once for a time that doubles with each further death.
+//
+// Thread: any.
+class AgentPool
+{
+  public:
+    static constexpr unsigned kFreeRestarts = 3;
+    static constexpr std::chrono::seconds kFirstBackOff{1};
+    static constexpr std::chrono::seconds kLastBackOff{60};
+
+    explicit AgentPool(std::function<AgentSettings()> settings);
+    // Ends all agents. Requires: no request is running.
+    ~AgentPool();
+    AgentPool(const AgentPool&) = delete;
+    AgentPool& operator=(const AgentPool&) = delete;
+
+    // Carries a request to the provider's agent and its answer's elements to the sink. `request.provider` and
+    // `request.library` are filled in here.
+    // Returns: the status that the provider gave.
+    // Throws: CIMException with CIM_ERR_FAILED: no CMPI module, library not found, agent lost or silent (each names
+    // module and cause); whatever the sink throws. Blocks: as long as the provider keeps sending, and for the patience
+    // of silence.
+    CimStatus request(const ProviderReference& provider, AgentRequest request, ElementSink& sink);
+
+    // Makes every running and future request fail.
+    void shutDown() noexcept;
+
+    // Ends the agents that have been idle for long enough; the server calls this now and then.
+    void endIdleAgents();
+
+  private:
+    struct Module
+    {
+        std::shared_ptr<AgentProcess> process;
+        unsigned running = 0;
+        unsigned deaths = 0; // without a good answer between them
+        Deadline nextStart = Deadline::min();
+        Deadline lastUse;
+    };
+
+    struct Candidate
+    {
+        std::string module;
+        std::shared_ptr<AgentProcess> process;
+        Deadline lastUse;
+    };
+
+    // Throws: AgentGone, besides what request() throws.
+    CimStatus requestOnce(const std::string& module, const AgentRequest& request, ElementSink& sink,
+                          std::chrono::milliseconds patience);
+    std::shared_ptr<AgentProcess> acquire(const std::string& module);
+    void release(const std::string& module);
+    void succeeded(const std::string& module);
+    [[noreturn]] void lost(const std::string& module, const std::shared_ptr<AgentProcess>& process,
+                           const std::string& reason);
+    std::vector<Candidate> findIdle(std::chrono::milliseconds idle);
+    bool mayEnd(AgentProcess& process);
+    void retire(const Candidate& candidate);
+
+    std::function<AgentSettings()> fMakeSettings;
+    std::mutex fMutex;
+    std::map<std::string, Module> fModules;
+    bool fShutDown = false;
+};
+
+} // namespace Pegasus::server

@@ -1,0 +1,214 @@
+#include "pegasus/server/agent/AgentProcess.h"
+
+#include <cerrno>
+#include <cstring>
+#include <system_error>
+
+#include <fcntl.h>
+#include <signal.h>
+#include <spawn.h>
+#include <sys/socket.h>
+#include <sys/wait.h>
+
+extern char** environ;
+
+namespace Pegasus::server {
+
+const char* const kAgentProcessName = "cimprovagt";
+
+namespace {
+
+constexpr int kAgentControlFd = 3;
+constexpr std::chrono::seconds kGraceOfDestructor{3};
+
+struct SocketPair
+{
+    Descriptor ours;
+    Descriptor theirs;
+};
+
+SocketPair makeSocketPair()
+{
+    int ends[2];
+    if (::socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, ends) != 0) {
+        throw std::system_error(errno, std::generic_category(), "cannot create a socket pair for an agent");
+    }
+    return {Descriptor(ends[0]), Descriptor(ends[1])};
+}
+
+// What posix_spawn needs; freed with it.
+struct SpawnPlan
+{
+    posix_spawn_file_actions_t actions{};
+    posix_spawnattr_t attributes{};
+
+    explicit SpawnPlan(int control)
+    {
+        ::posix_spawn_file_actions_init(&actions);
+        ::posix_spawnattr_init(&attributes);
+        // dup2 onto itself would keep close-on-exec, so the end is never 3 already: see spawnAgent().
+        ::posix_spawn_file_actions_adddup2(&actions, control, kAgentControlFd);
+        sigset_t none;
+        sigset_t all;
+        ::sigemptyset(&none);
+        ::sigfillset(&all);
+        ::posix_spawnattr_setsigmask(&attributes, &none);
+        ::posix_spawnattr_setsigdefault(&attributes, &all);
+        ::posix_spawnattr_setpgroup(&attributes, 0);
+        ::posix_spawnattr_setflags(&attributes, POSIX_SPAWN_SETSIGMASK | POSIX_SPAWN_SETSIGDEF | POSIX_SPAWN_SETPGROUP);
+    }
+    ~SpawnPlan()
+    {
+        ::posix_spawnattr_destroy(&attributes);
+        ::posix_spawn_file_actions_destroy(&actions);
+    }
+    SpawnPlan(const SpawnPlan&) = delete;
+    SpawnPlan& operator=(const SpawnPlan&) = delete;
+};
+
+pid_t spawnAgent(const std::string& module, std::size_t memoryMegabytes, Descriptor control)
+{
+    if (control.get() == kAgentControlFd) {
+        control.reset(::fcntl(control.release(), F_DUPFD_CLOEXEC, kAgentControlFd + 1));
+    }
+    const SpawnPlan plan(control.get());
+    std::string words[] = {kAgentProcessName, "--agent", module, std::to_string(memoryMegabytes)};
+    char* argv[] = {words[0].data(), words[1].data(), words[2].data(), words[3].data(), nullptr};
+    pid_t pid = -1;
+    // Run through this link the process is never called cimserver, not even before it names itself.
+    const int error = ::posix_spawn(&pid, "/proc/self/exe", &plan.actions, &plan.attributes, argv, environ);
+    if (error != 0) {
+        throw std::system_error(error, std::generic_category(), "cannot start the agent of module \"" + module + "\"");
+    }
+    return pid;
+}
+
+// Hands a descriptor to the agent.
+bool sendDescriptor(int control, int fd)
+{
+    char byte = 0;
+    iovec data = {&byte, 1};
+    alignas(cmsghdr) char space[CMSG_SPACE(sizeof fd)] = {};
+    msghdr message = {};
+    message.msg_iov = &data;
+    message.msg_iovlen = 1;
+    message.msg_control = space;
+    message.msg_controllen = sizeof space;
+    cmsghdr* header = CMSG_FIRSTHDR(&message);
+    header->cmsg_level = SOL_SOCKET;
+    header->cmsg_type = SCM_RIGHTS;
+    header->cmsg_len = CMSG_LEN(sizeof fd);
+    std::memcpy(CMSG_DATA(header), &fd, sizeof fd);
+    ssize_t n = -1;
+    do {
+        n = ::sendmsg(control, &message, MSG_NOSIGNAL);
+    } while (n < 0 && errno == EINTR);
+    return n == 1;
+}
+
+} // namespace
+
+AgentProcess::AgentProcess(const std::string& module, std::size_t memoryMegabytes) : fModule(module)
+{
+    SocketPair control = makeSocketPair();
+    fControl = std::move(control.ours);
+    fPid = spawnAgent(module, memoryMegabytes, std::move(control.theirs));
+    try {
+        fWatcher = std::thread([this] { watch(); });
+    } catch (...) {
+        ::kill(fPid, SIGKILL);
+        ::waitpid(fPid, nullptr, 0);
+        throw;
+    }
+}
+
+AgentProcess::~AgentProcess()
+{
+    close();
+    if (!waitForEnd(Clock::now() + kGraceOfDestructor)) {
+        kill();
+    }
+    fWatcher.join();
+}
+
+void AgentProcess::watch()
+{
+    // The pid stays ours until fEnded is set under the lock: kill() never hits a stranger.
+    siginfo_t info = {};
+    while (::waitid(P_PID, static_cast<id_t>(fPid), &info, WEXITED | WNOWAIT) != 0 && errno == EINTR) {
+    }
+    const std::lock_guard<std::mutex> lock(fMutex);
+    while (::waitpid(fPid, &fStatus, 0) < 0 && errno == EINTR) {
+    }
+    fEnded = true;
+    fIdle.clear();
+    fChanged.notify_all();
+}
+
+std::unique_ptr<AgentChannel> AgentProcess::takeChannel()
+{
+    {
+        const std::lock_guard<std::mutex> lock(fMutex);
+        if (!fIdle.empty()) {
+            std::unique_ptr<AgentChannel> channel = std::move(fIdle.back());
+            fIdle.pop_back();
+            return channel;
+        }
+    }
+    SocketPair pair = makeSocketPair();
+    if (!sendDescriptor(fControl.get(), pair.theirs.get())) {
+        throw AgentGone("the agent takes no request");
+    }
+    return std::make_unique<AgentChannel>(std::move(pair.ours));
+}
+
+void AgentProcess::giveBack(std::unique_ptr<AgentChannel> channel)
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    if (!fEnded) {
+        fIdle.push_back(std::move(channel));
+    }
+}
+
+void AgentProcess::close() noexcept
+{
+    {
+        const std::lock_guard<std::mutex> lock(fMutex);
+        fIdle.clear(); // the agent's threads behind them end
+    }
+    ::shutdown(fControl.get(), SHUT_RDWR);
+}
+
+void AgentProcess::kill() noexcept
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    if (!fEnded) {
+        ::kill(fPid, SIGKILL);
+    }
+}
+
+bool AgentProcess::isRunning() const
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    return !fEnded;
+}
+
+bool AgentProcess::waitForEnd(Deadline deadline) const
+{
+    std::unique_lock<std::mutex> lock(fMutex);
+    return fChanged.wait_until(lock, deadline, [&] { return fEnded; });
+}
+
+std::string AgentProcess::causeOfDeath() const
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    if (!fEnded) {
+        return {};
+    }
+    if (WIFSIGNALED(fStatus)) {
+        return "killed by signal " + std::to_string(WTERMSIG(fStatus)) + " (" + ::strsignal(WTERMSIG(fStatus)) + ")";
+    }
+    return "exit status " + std::to_string(WEXITSTATUS(fStatus));
+}
+
+} // namespace Pegasus::server

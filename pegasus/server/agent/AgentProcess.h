@@ -1,0 +1,64 @@
+#pragma once
+
+#include "pegasus/server/agent/AgentChannel.h"
+
+#include <condition_variable>
+#include <memory>
+#include <mutex>
+#include <string>
+#include <thread>
+#include <vector>
+
+namespace Pegasus::server {
+
+// One running agent: the server's own program in agent mode, which has loaded one provider module.
+//
+// The two are joined by a control socket. Over it the agent receives its end of each channel; when it closes, however
+// the server ended, the agent ends too. A thread waits for the process, so that it never stays a zombie and its cause
+// of death is known.
+//
+// Thread: any.
+class AgentProcess
+{
+  public:
+    // Starts the process. `memoryMegabytes` bounds its address space; 0 does not.
+    // Throws: std::system_error.
+    AgentProcess(const std::string& module, std::size_t memoryMegabytes);
+    // Closes the control socket, gives the process a moment, then kills it.
+    ~AgentProcess();
+    AgentProcess(const AgentProcess&) = delete;
+    AgentProcess& operator=(const AgentProcess&) = delete;
+
+    // An idle channel, or a new one. Throws: AgentGone; std::system_error without descriptors.
+    std::unique_ptr<AgentChannel> takeChannel();
+    void giveBack(std::unique_ptr<AgentChannel> channel);
+
+    // Lets the agent end in good order: it sees the end of its control socket.
+    void close() noexcept;
+    void kill() noexcept;
+    bool isRunning() const;
+    // Returns: false if it still runs at the deadline.
+    bool waitForEnd(Deadline deadline) const;
+    // How it ended, for people: "killed by signal 11 (Segmentation fault)", "exit status 3". Empty while it runs.
+    std::string causeOfDeath() const;
+
+    pid_t pid() const { return fPid; }
+
+  private:
+    void watch();
+
+    std::string fModule;
+    Descriptor fControl;
+    pid_t fPid = -1;
+    mutable std::mutex fMutex;
+    mutable std::condition_variable fChanged;
+    bool fEnded = false;
+    int fStatus = 0;
+    std::vector<std::unique_ptr<AgentChannel>> fIdle;
+    std::thread fWatcher;
+};
+
+// The name under which agents run, as ps shows it.
+extern const char* const kAgentProcessName;
+
+} // namespace Pegasus::server

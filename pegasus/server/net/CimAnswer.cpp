@@ -1,0 +1,121 @@
+#include "pegasus/server/net/CimAnswer.h"
+
+#include "pegasus/wire/ElementEncoder.h"
+
+namespace Pegasus::server {
+
+namespace {
+
+constexpr std::string_view kTail = "</SIMPLERSP>\n</MESSAGE>\n</CIM>\n";
+
+const char* responseElement(const CimRequest& request)
+{
+    return request.isIntrinsic ? "IMETHODRESPONSE" : "METHODRESPONSE";
+}
+
+std::string symbolicName(unsigned code)
+{
+    const bool known = (code >= 1 && code <= 28) && code != 18 && code != 19;
+    return known ? cimStatusCodeToString(static_cast<CIMStatusCode>(code))
+                 : "Unrecognized CIM status code \"" + std::to_string(code) + "\"";
+}
+
+} // namespace
+
+CimStatus makeStatus(CIMStatusCode code, const std::string& text)
+{
+    const auto number = static_cast<unsigned>(code);
+    return {number, symbolicName(number) + (text.empty() ? "" : ": " + text)};
+}
+
+CimStatus statusOf(const CIMException& error)
+{
+    const CIMStatusCode code = error.getCode() == CIM_ERR_SUCCESS ? CIM_ERR_FAILED : error.getCode();
+    return makeStatus(code, std::string(error.getMessage().getCString()));
+}
+
+CimAnswer::CimAnswer(AnswerStream& stream, const CimRequest& request, Envelope envelope)
+    : fStream(stream), fRequest(request), fEnvelope(envelope)
+{
+}
+
+void CimAnswer::open()
+{
+    if (fOpen) {
+        return;
+    }
+    fOpen = true;
+    if (fEnvelope == Envelope::kBare) {
+        return;
+    }
+    std::string head = "<?xml version=\"1.0\" encoding=\"utf-8\" ?>\n<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">\n"
+                       "<MESSAGE ID=\"";
+    wire::appendEscaped(head, std::string_view(fRequest.messageId));
+    head += "\" PROTOCOLVERSION=\"1.0\">\n<SIMPLERSP>\n<";
+    head += responseElement(fRequest);
+    head += " NAME=\"";
+    wire::appendEscaped(head, std::string_view(fRequest.method));
+    head += "\">\n";
+    fStream.write(head);
+}
+
+void CimAnswer::openReturnValue()
+{
+    if (fReturnValueOpen || !fRequest.isIntrinsic || fEnvelope == Envelope::kBare) {
+        return;
+    }
+    fReturnValueOpen = true;
+    fStream.write("<IRETURNVALUE>\n");
+}
+
+void CimAnswer::write(std::string_view elements)
+{
+    open();
+    openReturnValue();
+    fStream.write(elements);
+}
+
+void CimAnswer::close()
+{
+    open();
+    if (fEnvelope == Envelope::kBare) {
+        return;
+    }
+    std::string tail;
+    if (fReturnValueOpen) {
+        tail += "</IRETURNVALUE>\n";
+    }
+    tail += std::string("</") + responseElement(fRequest) + ">\n";
+    tail += kTail;
+    fStream.write(tail);
+}
+
+void CimAnswer::finish()
+{
+    close();
+    fStream.finish();
+}
+
+void CimAnswer::fail(const CimStatus& status, ErrorPlace place)
+{
+    const bool inTrailer = fStream.isChunked() && place != ErrorPlace::kBody;
+    const bool keeps = inTrailer && place == ErrorPlace::kBehindElements;
+    if (!fStream.hasStarted() && !keeps) {
+        fStream.discard();
+        fOpen = fReturnValueOpen = false;
+    }
+    if (inTrailer) {
+        close();
+        fStream.finish(status);
+        return;
+    }
+    open();
+    std::string error = "<ERROR CODE=\"" + std::to_string(status.code) + "\" DESCRIPTION=\"";
+    wire::appendEscaped(error, std::string_view(status.text));
+    error += "\"/>";
+    fStream.write(error);
+    close();
+    fStream.finish();
+}
+
+} // namespace Pegasus::server

@@ -1,0 +1,63 @@
+#pragma once
+
+#include "pegasus/wire/ElementDecoder.h"
+
+#include <Pegasus/Common/CIMPropertyList.h>
+
+#include <string>
+#include <vector>
+
+namespace Pegasus::server {
+
+// The parameters of an intrinsic method, taken from the message when an operation asks for them.
+// Every getter throws wire::XmlError when the parameter does not have the form that it asks for; required ones also
+// when it is absent, with the place of the call.
+class IntrinsicParameters
+{
+  public:
+    IntrinsicParameters() = default;
+    // Requires: decoder outlives this.
+    IntrinsicParameters(wire::XmlElement call, wire::ElementDecoder& decoder) : fCall(call), fDecoder(&decoder) {}
+
+    void add(std::string_view name, wire::XmlElement value);
+
+    CIMName className(std::string_view parameter) const;         // required
+    CIMName optionalClassName(std::string_view parameter) const; // the null name if absent
+    CIMName name(std::string_view parameter) const;              // a string that is a name; required
+    bool boolean(std::string_view parameter, bool defaultValue) const;
+    CIMPropertyList propertyList() const; // PropertyList; the null list if absent
+    CIMObjectPath instanceName(std::string_view parameter) const;
+    CIMInstance instance(std::string_view parameter) const;
+    CIMClass cimClass(std::string_view parameter) const;
+    CIMQualifierDecl qualifierDeclaration(std::string_view parameter) const;
+
+  private:
+    // An absent parameter and one without content are the same.
+    wire::XmlElement find(std::string_view parameter) const;
+    wire::XmlElement require(std::string_view parameter, const char* element) const;
+
+    struct Parameter
+    {
+        std::string_view name;
+        wire::XmlElement value;
+    };
+    std::vector<Parameter> fParameters;
+    wire::XmlElement fCall;
+    wire::ElementDecoder* fDecoder = nullptr;
+};
+
+// One operation request (DSP0200, SIMPLEREQ). Valid as long as the decoder that made it and the text that it came from.
+struct CimRequest
+{
+    std::string messageId;
+    std::string method; // as sent; a legal name
+    bool isIntrinsic = true;
+    CIMNamespaceName nameSpace;
+
+    IntrinsicParameters parameters; // of an intrinsic method
+
+    CIMObjectPath object; // of an extrinsic method: class or instance path without host and namespace
+    Array<CIMParamValue> arguments;
+};
+
+} // namespace Pegasus::server

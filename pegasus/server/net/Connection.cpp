@@ -1,0 +1,129 @@
+#include "pegasus/server/net/Connection.h"
+
+#include "pegasus/server/admin/Log.h"
+
+#include <system_error>
+
+namespace Pegasus::server {
+
+namespace {
+
+constexpr std::chrono::seconds kLinger{2};
+
+wire::XmlLimits xmlLimits(const ConnectionSettings& settings)
+{
+    wire::XmlLimits limits;
+    limits.maxDepth = settings.maxXmlDepth;
+    return limits;
+}
+
+bool wantsClose(const HttpRequest& http)
+{
+    return http.headerHas("Connection", "close");
+}
+
+AnswerStream::Options answerOptions(const HttpRequest& http, const ConnectionSettings& settings)
+{
+    AnswerStream::Options options;
+    const bool takesTrailers = http.headerHas("TE", "chunked") || http.headerHas("TE", "trailers");
+    options.framing =
+        takesTrailers ? AnswerStream::Framing::kChunkedWithTrailer : AnswerStream::Framing::kContentLength;
+    options.maxBufferedBytes = settings.maxBufferedAnswerBytes;
+    options.writePatience = settings.writePatience;
+    options.closes = wantsClose(http);
+    options.extensionPrefix = http.extensionPrefix;
+    return options;
+}
+
+void checkMethod(const HttpRequest& http)
+{
+    if (http.method == "POST") {
+        return;
+    }
+    if (http.method == "GET" || http.method == "HEAD") {
+        throw HttpError(404, HttpError::After::kClose); // there is nothing here but the CIM operations
+    }
+    throw HttpError(400, HttpError::After::kClose);
+}
+
+} // namespace
+
+Connection::Connection(SocketStream& stream, RequestHandler& handler, std::function<ConnectionSettings()> settings,
+                       CimAnswer::Envelope envelope)
+    : fStream(stream), fHandler(handler), fMakeSettings(std::move(settings)), fSettings(fMakeSettings()),
+      fEnvelope(envelope), fReader(stream), fDecoder(xmlLimits(fSettings))
+{
+}
+
+void Connection::serve()
+try {
+    while (serveNext()) {
+    }
+} catch (const std::system_error& error) { // the peer has gone: nobody is left to tell
+    Log::write(Severity::kDebug, std::string("connection ended: ") + error.what());
+} catch (const SocketTimeout& error) {
+    Log::write(Severity::kWarning, std::string("connection closed: ") + error.what());
+} catch (const std::exception& error) {
+    Log::write(Severity::kError, std::string("connection closed: ") + error.what());
+}
+
+// Returns: whether the connection can carry another request.
+bool Connection::serveNext()
+try {
+    fSettings = fMakeSettings();
+    HttpRequest http;
+    if (!fReader.read(http, fSettings.http, fSettings.times)) {
+        return false;
+    }
+    checkMethod(http);
+    const bool closes = wantsClose(http);
+    answer(http);
+    return !closes;
+} catch (const HttpError& error) {
+    Log::write(Severity::kInformation, std::string("request refused: ") + error.what());
+    sendHttpError(fStream, error, fSettings.writePatience);
+    if (error.closes()) {
+        fStream.lingeringClose(kLinger);
+    }
+    return !error.closes();
+}
+
+void Connection::answer(const HttpRequest& http)
+{
+    const CimRequest request = fDecoder.decode(http);
+    AnswerStream stream(fStream, answerOptions(http, fSettings));
+    CimAnswer answer(stream, request, fEnvelope);
+    if (!fHandler.knowsMethod(request)) {
+        answer.fail(makeStatus(CIM_ERR_NOT_SUPPORTED, "Unrecognized intrinsic method: " + request.method),
+                    CimAnswer::ErrorPlace::kBody);
+        return;
+    }
+    try {
+        run(http, request, answer);
+    } catch (const wire::XmlError& error) {
+        if (stream.hasStarted()) {
+            throw std::runtime_error("a parameter was read after the answer had begun");
+        }
+        failFor(error);
+    }
+}
+
+void Connection::run(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)
+try {
+    fHandler.handle(http, request, answer);
+    answer.finish();
+} catch (const CIMException& error) {
+    answer.fail(statusOf(error));
+} catch (const OperationFailed& error) {
+    answer.fail(error.status(), error.place());
+} catch (const wire::XmlError&) {
+    throw;
+} catch (const AnswerTooLarge& error) {
+    answer.fail(makeStatus(CIM_ERR_SERVER_LIMITS_EXCEEDED, error.what()));
+} catch (const Exception& error) {
+    answer.fail(makeStatus(CIM_ERR_FAILED, std::string(error.getMessage().getCString())));
+} catch (const std::bad_alloc&) {
+    answer.fail(makeStatus(CIM_ERR_SERVER_LIMITS_EXCEEDED, "The server is out of memory"));
+}
+
+} // namespace Pegasus::server

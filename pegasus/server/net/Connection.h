@@ -1,0 +1,58 @@
+#pragma once
+
+#include "pegasus/server/net/CimAnswer.h"
+#include "pegasus/server/net/HttpRequestReader.h"
+#include "pegasus/server/net/RequestDecoder.h"
+
+#include <functional>
+
+namespace Pegasus::server {
+
+// What bounds a connection; asked for anew before each request, so that changes take effect at once.
+struct ConnectionSettings
+{
+    HttpLimits http;
+    ReadTimes times;
+    std::chrono::milliseconds writePatience = std::chrono::seconds(20);
+    std::size_t maxXmlDepth = 64;
+    std::size_t maxBufferedAnswerBytes = 256u << 20;
+};
+
+// Carries out one operation.
+class RequestHandler
+{
+  public:
+    virtual ~RequestHandler() = default;
+
+    // Writes the answer's elements. Throws: CIMException or OperationFailed for an error of the operation;
+    // wire::XmlError when a parameter does not have the form that the operation needs.
+    virtual void handle(const HttpRequest& http, const CimRequest& request, CimAnswer& answer) = 0;
+    // Whether unknown intrinsic methods are answered inside the message, as OpenPegasus does, and not in the trailer.
+    virtual bool knowsMethod(const CimRequest& request) const = 0;
+};
+
+// Serves the requests of one connection, one after the other, until the peer closes or breaks the protocol.
+class Connection
+{
+  public:
+    Connection(SocketStream& stream, RequestHandler& handler, std::function<ConnectionSettings()> settings,
+               CimAnswer::Envelope envelope);
+
+    // Blocks: until the connection ends. Throws nothing that a peer could cause.
+    void serve();
+
+  private:
+    bool serveNext();
+    void answer(const HttpRequest& http);
+    void run(const HttpRequest& http, const CimRequest& request, CimAnswer& answer);
+
+    SocketStream& fStream;
+    RequestHandler& fHandler;
+    std::function<ConnectionSettings()> fMakeSettings;
+    ConnectionSettings fSettings;
+    CimAnswer::Envelope fEnvelope;
+    HttpRequestReader fReader;
+    RequestDecoder fDecoder;
+};
+
+} // namespace Pegasus::server

@@ -1,0 +1,193 @@
+#include "pegasus/server/net/HttpRequestReader.h"
+
+#include <boost/beast/http/parser.hpp>
+#include <boost/beast/http/string_body.hpp>
+
+#include <cstring>
+
+namespace Pegasus::server {
+
+namespace http = boost::beast::http;
+
+struct HttpRequestParser::Impl
+{
+    http::request_parser<http::string_body> parser;
+    std::size_t maxHeadBytes = 0;
+    std::size_t headBytes = 0; // parsed so far
+};
+
+namespace {
+
+constexpr std::size_t kReadBytes = 64u << 10;
+
+[[noreturn]] void failFor(const boost::system::error_code& error)
+{
+    using After = HttpError::After;
+    if (error == http::error::body_limit || error == http::error::buffer_overflow) {
+        throw HttpError(413, After::kClose, "", "The request body is larger than maxBodyBytes.");
+    }
+    if (error == http::error::header_limit) {
+        throw HttpError(431, After::kClose, "", "The request head is larger than maxHeaderBytes.");
+    }
+    if (error == http::error::bad_method || error == http::error::bad_target || error == http::error::bad_version) {
+        throw HttpError(501, After::kClose);
+    }
+    throw HttpError(400, After::kClose, "", "The HTTP request is malformed: " + error.message() + ".");
+}
+
+// The `ns=NN` of a Man header: an M-POST's CIM headers are spelled "NN-CIMMethod".
+std::string extensionPrefixOf(const HttpRequest& request)
+{
+    const std::string* man = request.header("Man");
+    const std::size_t at = man != nullptr ? man->find("ns=") : std::string::npos;
+    if (at == std::string::npos) {
+        return {};
+    }
+    const std::size_t end = man->find_first_not_of("0123456789", at + 3);
+    return man->substr(at + 3, std::min(end, man->size()) - at - 3) + "-";
+}
+
+void resolveExtension(HttpRequest& request)
+{
+    request.extensionPrefix = extensionPrefixOf(request);
+    request.method = "POST";
+    const std::size_t size = request.extensionPrefix.size();
+    if (size < 2) {
+        return;
+    }
+    for (auto& header : request.headers) {
+        if (header.first.compare(0, size, request.extensionPrefix) == 0) {
+            header.first.erase(0, size);
+        }
+    }
+}
+
+} // namespace
+
+HttpRequestParser::HttpRequestParser(const HttpLimits& limits) : fImpl(std::make_unique<Impl>())
+{
+    fImpl->maxHeadBytes = limits.maxHeaderBytes;
+    fImpl->parser.header_limit(static_cast<std::uint32_t>(std::min<std::size_t>(limits.maxHeaderBytes, 1u << 30)));
+    fImpl->parser.body_limit(limits.maxBodyBytes);
+}
+
+HttpRequestParser::~HttpRequestParser() = default;
+
+std::size_t HttpRequestParser::parse(std::string_view bytes)
+{
+    boost::system::error_code error;
+    const std::size_t taken = fImpl->parser.put(boost::asio::const_buffer(bytes.data(), bytes.size()), error);
+    if (error && error != http::error::need_more) {
+        failFor(error);
+    }
+    return taken;
+}
+
+// The head is parsed by itself and counted: Beast's own limit starts anew with every piece in which a head arrives.
+std::size_t HttpRequestParser::putHead(std::string_view bytes)
+{
+    const std::size_t taken = parse(bytes);
+    fImpl->headBytes += taken;
+    if (fImpl->headBytes + (isHeaderDone() ? 0 : bytes.size() - taken) > fImpl->maxHeadBytes) {
+        failFor(http::error::header_limit);
+    }
+    fImpl->parser.eager(isHeaderDone());
+    return taken;
+}
+
+std::size_t HttpRequestParser::put(std::string_view bytes)
+{
+    const std::size_t head = isHeaderDone() ? 0 : putHead(bytes);
+    if (!isHeaderDone() || isDone() || head == bytes.size()) {
+        return head;
+    }
+    return head + parse(bytes.substr(head));
+}
+
+bool HttpRequestParser::isHeaderDone() const
+{
+    return fImpl->parser.is_header_done();
+}
+
+bool HttpRequestParser::isDone() const
+{
+    return fImpl->parser.is_done();
+}
+
+bool HttpRequestParser::expectsContinue() const
+{
+    const auto& fields = fImpl->parser.get();
+    const auto expect = fields.find(http::field::expect);
+    return expect != fields.end() && expect->value() == "100-continue";
+}
+
+HttpRequest HttpRequestParser::take()
+{
+    auto message = fImpl->parser.release();
+    HttpRequest request;
+    request.method = std::string(message.method_string());
+    for (const auto& field : message) {
+        request.headers.emplace_back(std::string(field.name_string()), std::string(field.value()));
+    }
+    request.hasBodyLength = request.header("Content-Length") != nullptr || message.chunked();
+    request.body = std::move(message.body());
+    if (request.method == "M-POST") {
+        resolveExtension(request);
+    }
+    return request;
+}
+
+bool HttpRequestReader::fill(Deadline deadline)
+{
+    if (fBegin > 0) {
+        std::memmove(fBuffer.data(), fBuffer.data() + fBegin, fEnd - fBegin);
+        fEnd -= fBegin;
+        fBegin = 0;
+    }
+    if (fEnd == fBuffer.size()) {
+        fBuffer.resize(fBuffer.size() + kReadBytes); // a head larger than the buffer; the parser's limit ends it
+    }
+    const std::size_t n = fStream.readSome(fBuffer.data() + fEnd, fBuffer.size() - fEnd, deadline);
+    fEnd += n;
+    return n > 0;
+}
+
+// Returns: false if there will be none.
+bool HttpRequestReader::waitForRequest(const ReadTimes& times)
+try {
+    return fBegin < fEnd || fill(deadlineAfter(times.idle));
+} catch (const SocketTimeout&) {
+    return false;
+}
+
+bool HttpRequestReader::read(HttpRequest& request, const HttpLimits& limits, const ReadTimes& times)
+try {
+    if (!waitForRequest(times)) {
+        return false;
+    }
+    const Deadline deadline = deadlineAfter(times.request);
+    HttpRequestParser parser(limits);
+    bool continued = false;
+    for (;;) {
+        fBegin += parser.put(std::string_view(fBuffer.data() + fBegin, fEnd - fBegin));
+        if (parser.isDone()) {
+            break;
+        }
+        if (parser.isHeaderDone() && !continued && parser.expectsContinue()) {
+            static const char kContinue[] = "HTTP/1.1 100 Continue\r\n\r\n";
+            iovec part = {const_cast<char*>(kContinue), sizeof kContinue - 1};
+            fStream.writeAll(&part, 1, times.request);
+            continued = true;
+        }
+        if (!fill(deadline)) {
+            throw HttpError(400, HttpError::After::kClose, "request-not-well-formed",
+                            "The connection ended within the request.");
+        }
+    }
+    request = parser.take();
+    return true;
+} catch (const SocketTimeout&) {
+    throw HttpError(408, HttpError::After::kClose, "", "The request did not arrive within requestReadTimeout.");
+}
+
+} // namespace Pegasus::server

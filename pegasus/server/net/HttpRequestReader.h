@@ -1,0 +1,66 @@
+#pragma once
+
+#include "pegasus/server/net/HttpRequest.h"
+#include "pegasus/server/net/SocketStream.h"
+
+#include <functional>
+#include <memory>
+#include <string_view>
+
+namespace Pegasus::server {
+
+// How long a client may take.
+struct ReadTimes
+{
+    std::chrono::milliseconds idle = std::chrono::milliseconds::zero(); // before the first byte; zero: for ever
+    std::chrono::milliseconds request = std::chrono::seconds(30);       // from the first byte to the last
+};
+
+// Takes requests apart as bytes arrive. Bytes behind a request are kept for the next.
+class HttpRequestParser
+{
+  public:
+    explicit HttpRequestParser(const HttpLimits& limits);
+    ~HttpRequestParser();
+
+    // Feeds bytes. Returns: how many were taken; the rest has to be offered again, with more behind it.
+    // Throws: HttpError (501 no request line, 400 bad header, 413, 431).
+    std::size_t put(std::string_view bytes);
+
+    bool isHeaderDone() const;
+    bool isDone() const;
+    // Whether the client waits for "100 Continue" before it sends the body.
+    bool expectsContinue() const;
+
+    // Requires: isDone(). The parser is spent afterwards.
+    HttpRequest take();
+
+  private:
+    std::size_t parse(std::string_view bytes);
+    std::size_t putHead(std::string_view bytes);
+
+    struct Impl;
+    std::unique_ptr<Impl> fImpl;
+};
+
+// Reads one request after the other from a connection.
+class HttpRequestReader
+{
+  public:
+    explicit HttpRequestReader(SocketStream& stream) : fStream(stream) {}
+
+    // Returns: false when the peer has closed, or stayed silent for the idle time, between two requests.
+    // Throws: HttpError, 408 among them; std::system_error when the connection breaks.
+    bool read(HttpRequest& request, const HttpLimits& limits, const ReadTimes& times);
+
+  private:
+    bool waitForRequest(const ReadTimes& times);
+    bool fill(Deadline deadline);
+
+    SocketStream& fStream;
+    std::vector<char> fBuffer;
+    std::size_t fBegin = 0; // what lies between the two has been read and not been parsed
+    std::size_t fEnd = 0;
+};
+
+} // namespace Pegasus::server

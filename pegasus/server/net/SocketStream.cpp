@@ -1,0 +1,124 @@
+#include "pegasus/server/net/SocketStream.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <system_error>
+
+#include <poll.h>
+#include <sys/socket.h>
+
+namespace Pegasus::server {
+
+namespace {
+
+int millisecondsUntil(Deadline deadline)
+{
+    if (deadline == kNoDeadline) {
+        return -1;
+    }
+    const auto left = std::chrono::ceil<std::chrono::milliseconds>(deadline - Clock::now()).count();
+    return static_cast<int>(std::clamp<long long>(left, 0, 3'600'000));
+}
+
+// Returns: false at the deadline.
+bool waitFor(int fd, short events, Deadline deadline)
+{
+    for (;;) {
+        pollfd wait = {fd, events, 0};
+        const int ready = ::poll(&wait, 1, millisecondsUntil(deadline));
+        if (ready > 0) {
+            return true;
+        }
+        if (ready < 0 && errno != EINTR) {
+            throw std::system_error(errno, std::generic_category(), "cannot wait for the connection");
+        }
+        if (deadline != kNoDeadline && Clock::now() >= deadline) {
+            return false;
+        }
+    }
+}
+
+[[noreturn]] void fail(const char* what)
+{
+    throw std::system_error(errno, std::generic_category(), what);
+}
+
+// Takes `sent` bytes off the front of the vectors.
+void advance(iovec*& parts, std::size_t& count, std::size_t sent)
+{
+    while (count > 0 && sent >= parts->iov_len) {
+        sent -= parts->iov_len;
+        ++parts;
+        --count;
+    }
+    if (count > 0) {
+        parts->iov_base = static_cast<char*>(parts->iov_base) + sent;
+        parts->iov_len -= sent;
+    }
+}
+
+} // namespace
+
+bool SocketStream::waitReadable(Deadline deadline)
+{
+    return waitFor(fSocket.get(), POLLIN, deadline);
+}
+
+std::size_t SocketStream::readSome(char* data, std::size_t size, Deadline deadline)
+{
+    for (;;) {
+        const ssize_t n = ::recv(fSocket.get(), data, size, MSG_DONTWAIT);
+        if (n >= 0) {
+            return static_cast<std::size_t>(n);
+        }
+        if (errno == EAGAIN) {
+            if (!waitFor(fSocket.get(), POLLIN, deadline)) {
+                throw SocketTimeout("the peer sends nothing");
+            }
+        } else if (errno != EINTR) {
+            fail("cannot read from the connection");
+        }
+    }
+}
+
+void SocketStream::writeAll(iovec* parts, std::size_t count, std::chrono::milliseconds patience)
+{
+    advance(parts, count, 0);
+    while (count > 0) {
+        msghdr message = {};
+        message.msg_iov = parts;
+        message.msg_iovlen = count;
+        const ssize_t n = ::sendmsg(fSocket.get(), &message, MSG_DONTWAIT | MSG_NOSIGNAL);
+        if (n >= 0) {
+            advance(parts, count, static_cast<std::size_t>(n));
+        } else if (errno == EAGAIN) {
+            if (!waitFor(fSocket.get(), POLLOUT, deadlineAfter(patience))) {
+                throw SocketTimeout("the peer takes nothing");
+            }
+        } else if (errno != EINTR) {
+            fail("cannot write to the connection");
+        }
+    }
+}
+
+void SocketStream::shutDown() noexcept
+{
+    ::shutdown(fSocket.get(), SHUT_RDWR);
+}
+
+void SocketStream::shutDownReading() noexcept
+{
+    ::shutdown(fSocket.get(), SHUT_RD);
+}
+
+void SocketStream::lingeringClose(std::chrono::milliseconds patience) noexcept
+try {
+    ::shutdown(fSocket.get(), SHUT_WR);
+    const Deadline deadline = deadlineAfter(patience);
+    char scrap[4096];
+    while (Clock::now() < deadline && readSome(scrap, sizeof scrap, deadline) > 0) {
+    }
+} catch (const std::exception&) { // broken or too slow: it is closed either way
+}
+
+} // namespace Pegasus::server

@@ -1,0 +1,25 @@
+#pragma once
+
+#include "pegasus/repository/Repository.h"
+#include "pegasus/server/admin/Config.h"
+#include "pegasus/server/agent/AgentPool.h"
+#include "pegasus/server/operations/ProviderRegistry.h"
+
+#include <functional>
+
+namespace Pegasus::server {
+
+// What the operations work on. One per server; it outlives every connection.
+struct ServerCore
+{
+    Config& config;
+    repository::Repository& repository;
+    ProviderRegistry& registry;
+    AgentPool& agents;
+    std::function<void()> requestShutdown; // returns at once; the server ends when its answers have gone out
+};
+
+// Throws: CIM_ERR_INVALID_NAMESPACE.
+void requireNamespace(const ServerCore& core, const CIMNamespaceName& nameSpace);
+
+} // namespace Pegasus::server

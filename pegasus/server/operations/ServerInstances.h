@@ -1,0 +1,37 @@
+#pragma once
+
+#include "pegasus/server/operations/ServerCore.h"
+
+#include <functional>
+#include <memory>
+#include <vector>
+
+namespace Pegasus::server {
+
+// Instances that exist because the server does: namespaces, and the configuration.
+class ServerInstances
+{
+  public:
+    virtual ~ServerInstances() = default;
+
+    // Returns: null if the class is not one of the server's own.
+    // Throws: CIM_ERR_NOT_FOUND when it is, but its definition has not been compiled.
+    static std::unique_ptr<ServerInstances> find(ServerCore& core, const CIMNamespaceName& nameSpace,
+                                                 const CIMName& className);
+
+    // With their paths, without host and namespace.
+    std::vector<CIMInstance> all(const CIMPropertyList& properties) const;
+    // Throws: CIM_ERR_NOT_FOUND.
+    CIMInstance get(const CIMObjectPath& path, const CIMPropertyList& properties) const;
+
+  private:
+    virtual std::vector<CIMInstance> make() const = 0;
+};
+
+bool isNamespaceClass(const CIMName& className);
+
+// Makes the namespace that a __Namespace instance names, relative to the one it is created in; an empty name stands for
+// that one itself. Returns: the instance's path. Throws: CIM_ERR_ALREADY_EXISTS, CIM_ERR_INVALID_PARAMETER.
+CIMObjectPath createNamespace(ServerCore& core, const CIMNamespaceName& nameSpace, const CIMInstance& instance);
+
+} // namespace Pegasus::server

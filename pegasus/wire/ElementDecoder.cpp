@@ -1,0 +1,408 @@
+#include "pegasus/wire/ElementDecoder.h"
+
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/NumberText.h"
+#include "pegasus/common/ObjectReps.h"
+#include "pegasus/common/StringRep.h"
+
+namespace Pegasus::wire {
+namespace {
+
+using Kind = XmlError::Kind;
+
+// The attributes that DSP0201 gives each element; the language of texts is not kept.
+constexpr std::string_view kPropertyAttributes[] = {"NAME",           "CLASSORIGIN",    "PROPAGATED", "TYPE",
+                                                    "EmbeddedObject", "EMBEDDEDOBJECT", "ARRAYSIZE",  "xml:lang"};
+constexpr std::string_view kReferenceAttributes[] = {"NAME", "CLASSORIGIN", "PROPAGATED", "REFERENCECLASS"};
+constexpr std::string_view kQualifierAttributes[] = {"NAME",       "TYPE",       "PROPAGATED",   "OVERRIDABLE",
+                                                     "TOSUBCLASS", "TOINSTANCE", "TRANSLATABLE", "xml:lang"};
+constexpr std::string_view kDeclarationAttributes[] = {"NAME",       "TYPE",       "ISARRAY",      "OVERRIDABLE",
+                                                       "TOSUBCLASS", "TOINSTANCE", "TRANSLATABLE", "ARRAYSIZE"};
+constexpr std::size_t kFirstFlavor = 3; // OVERRIDABLE in both of the above
+constexpr std::string_view kMethodAttributes[] = {"NAME",       "TYPE",           "CLASSORIGIN",
+                                                  "PROPAGATED", "EmbeddedObject", "EMBEDDEDOBJECT"};
+constexpr std::string_view kParameterAttributes[] = {"NAME",           "TYPE",           "ARRAYSIZE",
+                                                     "REFERENCECLASS", "EmbeddedObject", "EMBEDDEDOBJECT"};
+constexpr std::string_view kScopeAttributes[] = {"CLASS",  "ASSOCIATION", "REFERENCE", "PROPERTY",
+                                                 "METHOD", "PARAMETER",   "INDICATION"};
+
+bool isOneOf(const XmlElement& element, std::initializer_list<std::string_view> names)
+{
+    for (const std::string_view name : names) {
+        if (element.is(name)) {
+            return true;
+        }
+    }
+    return false;
+}
+
+[[noreturn]] void failUnexpected(const XmlElement& parent, const XmlElement& child)
+{
+    child.fail(Kind::Invalid, "Expected close of " + std::string(parent.name()) + " element, got " +
+                                  std::string(child.name()) + " instead");
+}
+
+void expectEnd(const XmlElement& parent, const XmlElement& child)
+{
+    if (child) {
+        failUnexpected(parent, child);
+    }
+}
+
+[[noreturn]] void failIllegal(const XmlElement& element, std::string_view attribute)
+{
+    element.fail(Kind::Semantic,
+                 "Illegal value for " + std::string(element.name()) + "." + std::string(attribute) + " attribute");
+}
+
+[[noreturn]] void failMissing(const XmlElement& element, std::string_view attribute)
+{
+    element.fail(Kind::Invalid, "missing " + std::string(element.name()) + "." + std::string(attribute) + " attribute");
+}
+
+// Adds an element's object, whose name must be new.
+template <class Item> void addNew(const XmlElement& element, Array<Item>& items, const Item& item)
+{
+    if (ObjectAccess::find(items, item.getName()) != PEG_NOT_FOUND) {
+        element.fail(Kind::Semantic, "a second " + std::string(element.name()) + " named \"" +
+                                         StringAccess::toUtf8(item.getName().getString()) + "\"");
+    }
+    items.append(item);
+}
+
+// A string property whose qualifiers say so holds embedded objects, also where the attribute is missing.
+CIMType embeddedByQualifier(CIMType type, const Array<CIMQualifier>& qualifiers)
+{
+    static const CIMName kEmbeddedObject("EmbeddedObject");
+    static const CIMName kEmbeddedInstance("EmbeddedInstance");
+    if (type != CIMTYPE_STRING || qualifiers.size() == 0) {
+        return type;
+    }
+    if (ObjectAccess::isTrue(qualifiers, kEmbeddedObject)) {
+        return CIMTYPE_OBJECT;
+    }
+    const Uint32 index = ObjectAccess::find(qualifiers, kEmbeddedInstance);
+    return index != PEG_NOT_FOUND && qualifiers[index].getType() == CIMTYPE_STRING ? CIMTYPE_INSTANCE : type;
+}
+
+Uint32 countFrom(XmlElement child)
+{
+    Uint32 count = 0;
+    for (; child; child = child.nextSibling()) {
+        ++count;
+    }
+    return count;
+}
+
+} // namespace
+
+// ---- attributes
+
+const CIMName& ElementDecoder::nameAttribute(const XmlElement& element, std::string_view attribute,
+                                             std::string_view value)
+{
+    if (value.data() == nullptr) {
+        failMissing(element, attribute);
+    }
+    try {
+        return fNames.name(element.resolved(value, fScratch));
+    } catch (const XmlError&) {
+        throw;
+    } catch (const Exception&) {
+        failIllegal(element, attribute);
+    }
+}
+
+CIMName ElementDecoder::optionalName(const XmlElement& element, std::string_view attribute, std::string_view value)
+{
+    return value.data() == nullptr ? CIMName() : nameAttribute(element, attribute, value);
+}
+
+bool ElementDecoder::boolAttribute(const XmlElement& element, std::string_view attribute, std::string_view value,
+                                   bool ifMissing)
+{
+    if (value.data() == nullptr) {
+        return ifMissing;
+    }
+    if (equalNoCase(value, "true")) {
+        return true;
+    }
+    if (equalNoCase(value, "false")) {
+        return false;
+    }
+    failIllegal(element, attribute);
+}
+
+CIMType ElementDecoder::typeAttribute(const XmlElement& element, std::string_view attribute, std::string_view value)
+{
+    if (value.data() == nullptr) {
+        failMissing(element, attribute);
+    }
+    if (value == "string") {
+        return CIMTYPE_STRING;
+    }
+    for (int type = CIMTYPE_BOOLEAN; type <= CIMTYPE_REFERENCE; ++type) {
+        if (value == cimTypeToString(CIMType(type))) {
+            return CIMType(type);
+        }
+    }
+    failIllegal(element, attribute);
+}
+
+Uint32 ElementDecoder::sizeAttribute(const XmlElement& element, std::string_view value)
+{
+    if (value.data() == nullptr) {
+        return 0;
+    }
+    const auto size = number::parseUnsigned(value);
+    if (!size || *size > fLimits.maxArrayElements) {
+        failIllegal(element, "ARRAYSIZE");
+    }
+    return static_cast<Uint32>(*size);
+}
+
+// `values` begin with OVERRIDABLE, TOSUBCLASS, TOINSTANCE, TRANSLATABLE.
+CIMFlavor ElementDecoder::flavor(const XmlElement& element, const std::string_view* values)
+{
+    CIMFlavor flavor;
+    flavor.addFlavor(boolAttribute(element, "OVERRIDABLE", values[0], true) ? CIMFlavor::OVERRIDABLE
+                                                                            : CIMFlavor::DISABLEOVERRIDE);
+    flavor.addFlavor(boolAttribute(element, "TOSUBCLASS", values[1], true) ? CIMFlavor::TOSUBCLASS
+                                                                           : CIMFlavor::RESTRICTED);
+    if (boolAttribute(element, "TOINSTANCE", values[2], false)) {
+        flavor.addFlavor(CIMFlavor::TOINSTANCE);
+    }
+    if (boolAttribute(element, "TRANSLATABLE", values[3], false)) {
+        flavor.addFlavor(CIMFlavor::TRANSLATABLE);
+    }
+    return flavor;
+}
+
+String ElementDecoder::toString(const XmlElement& element, std::string_view utf8)
+{
+    try {
+        return StringAccess::fromUtf8(utf8);
+    } catch (const Exception&) {
+        element.fail(Kind::NotWellFormed, "text that is not UTF-8 in " + std::string(element.name()) + " element");
+    }
+}
+
+// ---- qualifiers
+
+CIMQualifier ElementDecoder::decodeQualifier(const XmlElement& element)
+{
+    std::string_view values[std::size(kQualifierAttributes)];
+    element.attributes(kQualifierAttributes, values);
+    const CIMName name = nameAttribute(element, "NAME", values[0]);
+    const CIMType type = typeAttribute(element, "TYPE", values[1]);
+    const bool propagated = boolAttribute(element, "PROPAGATED", values[2], false);
+    const XmlElement child = element.firstChild();
+    if (child && !isOneOf(child, {"VALUE", "VALUE.ARRAY"})) {
+        failUnexpected(element, child);
+    }
+    if (child) {
+        expectEnd(element, child.nextSibling());
+    }
+    const CIMValue value = child ? decodeValue(child, type) : CIMValue(type, false);
+    return CIMQualifier(name, value, flavor(element, values + kFirstFlavor), propagated);
+}
+
+// Returns: the first child that is no qualifier.
+XmlElement ElementDecoder::decodeQualifiers(XmlElement child, Array<CIMQualifier>& qualifiers)
+{
+    for (; child.is("QUALIFIER"); child = child.nextSibling()) {
+        addNew(child, qualifiers, decodeQualifier(child));
+    }
+    return child;
+}
+
+CIMScope ElementDecoder::decodeScope(const XmlElement& element)
+{
+    const CIMScope kinds[] = {CIMScope::CLASS,  CIMScope::ASSOCIATION, CIMScope::REFERENCE, CIMScope::PROPERTY,
+                              CIMScope::METHOD, CIMScope::PARAMETER,   CIMScope::INDICATION};
+    std::string_view values[std::size(kScopeAttributes)];
+    element.attributes(kScopeAttributes, values);
+    element.expectNoChildren();
+    CIMScope scope;
+    for (std::size_t i = 0; i < std::size(kinds); ++i) {
+        if (boolAttribute(element, kScopeAttributes[i], values[i], false)) {
+            scope.addScope(kinds[i]);
+        }
+    }
+    return scope;
+}
+
+CIMQualifierDecl ElementDecoder::decodeQualifierDeclaration(const XmlElement& element)
+{
+    element.expectName("QUALIFIER.DECLARATION");
+    std::string_view values[std::size(kDeclarationAttributes)];
+    element.attributes(kDeclarationAttributes, values);
+    const CIMName name = nameAttribute(element, "NAME", values[0]);
+    const CIMType type = typeAttribute(element, "TYPE", values[1]);
+    const bool isArray = boolAttribute(element, "ISARRAY", values[2], false);
+    const Uint32 arraySize = sizeAttribute(element, values[7]);
+    XmlElement child = element.firstChild();
+    CIMScope scope;
+    if (child.is("SCOPE")) {
+        scope = decodeScope(child);
+        child = child.nextSibling();
+    }
+    CIMValue value(type, isArray, arraySize);
+    if (isOneOf(child, {"VALUE", "VALUE.ARRAY"})) {
+        value = decodeValue(child, type);
+        child = child.nextSibling();
+    }
+    expectEnd(element, child);
+    return CIMQualifierDecl(name, value, scope, flavor(element, values + kFirstFlavor), arraySize);
+}
+
+// ---- properties
+
+CIMProperty ElementDecoder::decodeProperty(const XmlElement& element)
+{
+    CIMProperty property = ObjectAccess::wrap<CIMProperty>(new CIMPropertyRep());
+    CIMPropertyRep& rep = ObjectAccess::rep(property);
+    if (element.is("PROPERTY.REFERENCE")) {
+        readReferenceProperty(element, rep);
+    } else {
+        readTypedProperty(element, element.is("PROPERTY.ARRAY"), rep);
+    }
+    return property;
+}
+
+// `values` begin with NAME, CLASSORIGIN, PROPAGATED. Returns: the first child that is no qualifier.
+XmlElement ElementDecoder::beginProperty(const XmlElement& element, const std::string_view* values, CIMPropertyRep& rep)
+{
+    rep.fName = nameAttribute(element, "NAME", values[0]);
+    rep.fClassOrigin = optionalName(element, "CLASSORIGIN", values[1]);
+    rep.fPropagated = boolAttribute(element, "PROPAGATED", values[2], false);
+    return decodeQualifiers(element.firstChild(), rep.fQualifiers);
+}
+
+void ElementDecoder::readTypedProperty(const XmlElement& element, bool isArray, CIMPropertyRep& rep)
+{
+    std::string_view values[std::size(kPropertyAttributes)];
+    element.attributes(kPropertyAttributes, values);
+    const XmlElement child = beginProperty(element, values, rep);
+    const CIMType declared = embeddedType(element, typeAttribute(element, "TYPE", values[3]), values[4], values[5]);
+    const CIMType type = embeddedByQualifier(declared, rep.fQualifiers);
+    if (isArray) {
+        rep.fArraySize = sizeAttribute(element, values[6]);
+    }
+    const bool hasValue = child.is(isArray ? "VALUE.ARRAY" : "VALUE");
+    rep.fValue = hasValue ? decodeValue(child, type) : CIMValue(type, isArray, rep.fArraySize);
+    expectEnd(element, hasValue ? child.nextSibling() : child);
+}
+
+void ElementDecoder::readReferenceProperty(const XmlElement& element, CIMPropertyRep& rep)
+{
+    std::string_view values[std::size(kReferenceAttributes)];
+    element.attributes(kReferenceAttributes, values);
+    const XmlElement child = beginProperty(element, values, rep);
+    rep.fReferenceClassName = optionalName(element, "REFERENCECLASS", values[3]);
+    const bool hasValue = child.is("VALUE.REFERENCE");
+    rep.fValue = hasValue ? CIMValue(decodeReference(child)) : CIMValue(CIMTYPE_REFERENCE, false);
+    expectEnd(element, hasValue ? child.nextSibling() : child);
+}
+
+// Returns: the first child that is no property.
+XmlElement ElementDecoder::decodeProperties(XmlElement child, Array<CIMProperty>& properties)
+{
+    properties.reserveCapacity(countFrom(child));
+    for (; isOneOf(child, {"PROPERTY", "PROPERTY.ARRAY", "PROPERTY.REFERENCE"}); child = child.nextSibling()) {
+        addNew(child, properties, decodeProperty(child));
+    }
+    return child;
+}
+
+// ---- classes
+
+CIMParameter ElementDecoder::decodeParameter(const XmlElement& element)
+{
+    std::string_view values[std::size(kParameterAttributes)];
+    element.attributes(kParameterAttributes, values);
+    const bool isReference = isOneOf(element, {"PARAMETER.REFERENCE", "PARAMETER.REFARRAY"});
+    CIMParameter parameter = ObjectAccess::wrap<CIMParameter>(new CIMParameterRep());
+    CIMParameterRep& rep = ObjectAccess::rep(parameter);
+    rep.fName = nameAttribute(element, "NAME", values[0]);
+    rep.fIsArray = isOneOf(element, {"PARAMETER.ARRAY", "PARAMETER.REFARRAY"});
+    rep.fArraySize = sizeAttribute(element, values[2]);
+    rep.fReferenceClassName = optionalName(element, "REFERENCECLASS", values[3]);
+    rep.fType = isReference ? CIMTYPE_REFERENCE
+                            : embeddedType(element, typeAttribute(element, "TYPE", values[1]), values[4], values[5]);
+    expectEnd(element, decodeQualifiers(element.firstChild(), rep.fQualifiers));
+    return parameter;
+}
+
+CIMMethod ElementDecoder::decodeMethod(const XmlElement& element)
+{
+    std::string_view values[std::size(kMethodAttributes)];
+    element.attributes(kMethodAttributes, values);
+    CIMMethod method = ObjectAccess::wrap<CIMMethod>(new CIMMethodRep());
+    CIMMethodRep& rep = ObjectAccess::rep(method);
+    rep.fName = nameAttribute(element, "NAME", values[0]);
+    rep.fType = embeddedType(element, typeAttribute(element, "TYPE", values[1]), values[4], values[5]);
+    rep.fClassOrigin = optionalName(element, "CLASSORIGIN", values[2]);
+    rep.fPropagated = boolAttribute(element, "PROPAGATED", values[3], false);
+    XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
+    for (; isOneOf(child, {"PARAMETER", "PARAMETER.ARRAY", "PARAMETER.REFERENCE", "PARAMETER.REFARRAY"});
+         child = child.nextSibling())
+    {
+        addNew(child, rep.fParameters, decodeParameter(child));
+    }
+    expectEnd(element, child);
+    return method;
+}
+
+CIMClass ElementDecoder::decodeClass(const XmlElement& element)
+{
+    element.expectName("CLASS");
+    std::string_view values[2];
+    element.attributes({"NAME", "SUPERCLASS"}, values);
+    const CIMName name = nameAttribute(element, "NAME", values[0]);
+    CIMClass cimClass(name, optionalName(element, "SUPERCLASS", values[1]));
+    CIMClassRep& rep = ObjectAccess::rep(cimClass);
+    XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
+    child = decodeProperties(child, rep.fProperties);
+    for (; child.is("METHOD"); child = child.nextSibling()) {
+        addNew(child, rep.fMethods, decodeMethod(child));
+    }
+    expectEnd(element, child);
+    return cimClass;
+}
+
+// ---- instances
+
+CIMInstance ElementDecoder::decodeInstance(const XmlElement& element)
+{
+    element.expectName("INSTANCE");
+    std::string_view values[2];
+    element.attributes({"CLASSNAME", "xml:lang"}, values);
+    CIMInstance instance(nameAttribute(element, "CLASSNAME", values[0]));
+    CIMInstanceRep& rep = ObjectAccess::rep(instance);
+    XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
+    child = decodeProperties(child, rep.fProperties);
+    expectEnd(element, child);
+    return instance;
+}
+
+CIMInstance ElementDecoder::decodeNamedInstance(const XmlElement& element)
+{
+    element.expectName("VALUE.NAMEDINSTANCE");
+    element.expectNoAttributes();
+    const XmlElement name = element.firstChild();
+    if (!name) {
+        element.fail(Kind::Invalid, "expected INSTANCENAME element");
+    }
+    const CIMObjectPath path = decodeInstanceName(name);
+    const XmlElement child = name.nextSibling();
+    if (!child) {
+        element.fail(Kind::Invalid, "expected INSTANCE element");
+    }
+    CIMInstance instance = decodeInstance(child);
+    expectEnd(element, child.nextSibling());
+    instance.setPath(path);
+    return instance;
+}
+
+} // namespace Pegasus::wire

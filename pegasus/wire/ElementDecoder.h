@@ -1,0 +1,100 @@
+#pragma once
+
+#include "pegasus/wire/NameCache.h"
+#include "pegasus/wire/XmlReader.h"
+
+#include <Pegasus/Common/CIMClass.h>
+#include <Pegasus/Common/CIMObject.h>
+#include <Pegasus/Common/CIMParamValue.h>
+#include <Pegasus/Common/CIMQualifierDecl.h>
+
+#include <string>
+#include <string_view>
+
+namespace Pegasus::wire {
+
+// CIM-XML elements (DSP0201) to objects. One decoder serves a whole message, or many: it remembers the names it has
+// seen, so that equal names share one text.
+//
+// Each function takes the element that its comment names and checks everything in it.
+// Throws: XmlError, with the place. Thread: one thread at a time.
+class ElementDecoder
+{
+  public:
+    explicit ElementDecoder(const XmlLimits& limits = XmlLimits()) : fLimits(limits) {}
+
+    // CLASS. The class's path is its name.
+    CIMClass decodeClass(const XmlElement& element);
+    // INSTANCE. The instance's path is its class name.
+    CIMInstance decodeInstance(const XmlElement& element);
+    // VALUE.NAMEDINSTANCE: INSTANCENAME and INSTANCE. Throws: TypeMismatchException when their classes differ.
+    CIMInstance decodeNamedInstance(const XmlElement& element);
+    // QUALIFIER.DECLARATION
+    CIMQualifierDecl decodeQualifierDeclaration(const XmlElement& element);
+
+    // CLASSNAME
+    CIMName decodeClassName(const XmlElement& element);
+    // INSTANCENAME
+    CIMObjectPath decodeInstanceName(const XmlElement& element);
+    // INSTANCEPATH, LOCALINSTANCEPATH, INSTANCENAME, CLASSPATH, LOCALCLASSPATH or CLASSNAME
+    CIMObjectPath decodeObjectPath(const XmlElement& element);
+    // VALUE.REFERENCE
+    CIMObjectPath decodeReference(const XmlElement& element);
+    // LOCALNAMESPACEPATH
+    CIMNamespaceName decodeLocalNamespacePath(const XmlElement& element);
+
+    // PARAMVALUE. Without a PARAMTYPE the value is a string (or a reference) and the result is not typed.
+    CIMParamValue decodeParamValue(const XmlElement& element);
+    // RETURNVALUE
+    CIMValue decodeReturnValue(const XmlElement& element);
+    // VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY, read as `type`. A null element of an array becomes the
+    // type's default, because arrays have no nulls.
+    CIMValue decodeValue(const XmlElement& element, CIMType type);
+
+    // An attribute that holds a name. Throws: XmlError "Illegal value for PROPERTY.NAME attribute", or "missing ...".
+    const CIMName& nameAttribute(const XmlElement& element, std::string_view attribute, std::string_view value);
+    // UTF-8 to text, with its fault at the element.
+    String toString(const XmlElement& element, std::string_view utf8);
+
+    const XmlLimits& limits() const { return fLimits; }
+
+  private:
+    // ElementDecoder.cpp
+    CIMProperty decodeProperty(const XmlElement& element);
+    XmlElement beginProperty(const XmlElement& element, const std::string_view* values, CIMPropertyRep& rep);
+    void readTypedProperty(const XmlElement& element, bool isArray, CIMPropertyRep& rep);
+    void readReferenceProperty(const XmlElement& element, CIMPropertyRep& rep);
+    CIMQualifier decodeQualifier(const XmlElement& element);
+    CIMMethod decodeMethod(const XmlElement& element);
+    CIMParameter decodeParameter(const XmlElement& element);
+    CIMScope decodeScope(const XmlElement& element);
+    XmlElement decodeQualifiers(XmlElement child, Array<CIMQualifier>& qualifiers);
+    XmlElement decodeProperties(XmlElement child, Array<CIMProperty>& properties);
+    CIMName optionalName(const XmlElement& element, std::string_view attribute, std::string_view value);
+    bool boolAttribute(const XmlElement& element, std::string_view attribute, std::string_view value, bool ifMissing);
+    CIMType typeAttribute(const XmlElement& element, std::string_view attribute, std::string_view value);
+    Uint32 sizeAttribute(const XmlElement& element, std::string_view value);
+    CIMFlavor flavor(const XmlElement& element, const std::string_view* values);
+
+    // PathElementDecoder.cpp
+    CIMKeyBinding decodeKeyBinding(const XmlElement& element);
+    CIMKeyBinding decodeKeyValue(const XmlElement& element, const CIMName& name);
+    CIMObjectPath decodeNameIn(const XmlElement& element, const String& host, const CIMNamespaceName& nameSpace);
+
+    // ValueElementDecoder.cpp
+    template <class T> T parseText(const XmlElement& element, std::string_view text);
+    template <class T> CIMValue decodeScalar(const XmlElement& element);
+    template <class T> CIMValue decodeArray(const XmlElement& element);
+    template <class T> T parseUnsigned(const XmlElement& element, std::string_view text);
+    template <class T> T parseSigned(const XmlElement& element, std::string_view text);
+    CIMValue decodeParameterContent(const XmlElement& element, CIMType type);
+    CIMObject decodeEmbedded(const XmlElement& element, std::string_view text);
+    CIMType embeddedType(const XmlElement& element, CIMType type, std::string_view value1, std::string_view value2);
+
+    XmlLimits fLimits;
+    NameCache fNames;
+    std::string fScratch;
+    std::size_t fEmbeddingDepth = 0;
+};
+
+} // namespace Pegasus::wire

@@ -1,0 +1,52 @@
+#pragma once
+
+#include <Pegasus/Common/CIMClass.h>
+#include <Pegasus/Common/CIMObject.h>
+#include <Pegasus/Common/CIMParamValue.h>
+#include <Pegasus/Common/CIMQualifierDecl.h>
+
+#include <string>
+#include <string_view>
+
+namespace Pegasus::wire {
+
+// Objects to CIM-XML elements (DSP0201): each function appends to `out` the element that its comment names,
+// UTF-8, a line feed after every tag that ends a line. Throws: UninitializedObjectException.
+
+// `text` with & < > " ' as entities, and as character references what a parser would otherwise change: control
+// characters, and a blank at the beginning, at the end or beside another blank.
+void appendEscaped(std::string& out, std::string_view text);
+void appendEscaped(std::string& out, const String& text);
+
+// CLASS
+void appendClass(std::string& out, const CIMConstClass& cimClass);
+// INSTANCE
+void appendInstance(std::string& out, const CIMConstInstance& instance);
+// VALUE.NAMEDINSTANCE, from the instance's path and the instance
+void appendNamedInstance(std::string& out, const CIMConstInstance& instance);
+// QUALIFIER.DECLARATION
+void appendQualifierDeclaration(std::string& out, const CIMConstQualifierDecl& declaration);
+// PROPERTY, PROPERTY.ARRAY or PROPERTY.REFERENCE
+void appendProperty(std::string& out, const CIMConstProperty& property);
+
+// CLASSNAME
+void appendClassName(std::string& out, const CIMName& className);
+// INSTANCENAME
+void appendInstanceName(std::string& out, const CIMObjectPath& path);
+// LOCALINSTANCEPATH: namespace and INSTANCENAME
+void appendLocalInstancePath(std::string& out, const CIMNamespaceName& nameSpace, const CIMObjectPath& path);
+// LOCALCLASSPATH: namespace and CLASSNAME
+void appendLocalClassPath(std::string& out, const CIMNamespaceName& nameSpace, const CIMName& className);
+// LOCALNAMESPACEPATH
+void appendLocalNamespacePath(std::string& out, const CIMNamespaceName& nameSpace);
+// VALUE.REFERENCE, with as much of the path as it has
+void appendReference(std::string& out, const CIMObjectPath& path);
+
+// VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY; nothing for a null.
+void appendValue(std::string& out, const CIMValue& value);
+// PARAMVALUE
+void appendParamValue(std::string& out, const CIMParamValue& parameter);
+// RETURNVALUE
+void appendReturnValue(std::string& out, const CIMValue& value);
+
+} // namespace Pegasus::wire

@@ -1,0 +1,162 @@
+#include "pegasus/common/StringRep.h"
+#include "pegasus/wire/ElementDecoder.h"
+
+namespace Pegasus::wire {
+namespace {
+
+using Kind = XmlError::Kind;
+
+XmlElement childOf(const XmlElement& element, std::string_view name)
+{
+    const XmlElement child = element.firstChild();
+    if (!child.is(name)) {
+        (child ? child : element).fail(Kind::Invalid, "expected " + std::string(name) + " element");
+    }
+    return child;
+}
+
+// The sibling that must be there and be the last.
+XmlElement lastAfter(const XmlElement& child)
+{
+    const XmlElement last = child.nextSibling();
+    if (!last) {
+        child.fail(Kind::Invalid, "missing element behind " + std::string(child.name()) + " element");
+    }
+    if (const XmlElement more = last.nextSibling()) {
+        more.fail(Kind::Invalid, "unexpected " + std::string(more.name()) + " element");
+    }
+    return last;
+}
+
+CIMKeyBinding::Type keyType(const XmlElement& element, std::string_view valueType)
+{
+    if (valueType.data() == nullptr || valueType == "string") {
+        return CIMKeyBinding::STRING;
+    }
+    if (valueType == "boolean") {
+        return CIMKeyBinding::BOOLEAN;
+    }
+    if (valueType == "numeric") {
+        return CIMKeyBinding::NUMERIC;
+    }
+    element.fail(Kind::Semantic, "Illegal value for KEYVALUE.VALUETYPE attribute");
+}
+
+} // namespace
+
+CIMName ElementDecoder::decodeClassName(const XmlElement& element)
+{
+    element.expectName("CLASSNAME");
+    std::string_view values[1];
+    element.attributes({"NAME"}, values);
+    element.expectNoChildren();
+    return nameAttribute(element, "NAME", values[0]);
+}
+
+CIMKeyBinding ElementDecoder::decodeKeyValue(const XmlElement& element, const CIMName& name)
+{
+    std::string_view values[2];
+    element.attributes({"VALUETYPE", "TYPE"}, values);
+    const CIMKeyBinding::Type type = keyType(element, values[0]);
+    return CIMKeyBinding(name, toString(element, element.text(fScratch)), type);
+}
+
+CIMKeyBinding ElementDecoder::decodeKeyBinding(const XmlElement& element)
+{
+    std::string_view values[1];
+    element.attributes({"NAME"}, values);
+    const CIMName name = nameAttribute(element, "NAME", values[0]);
+    const XmlElement child = element.onlyChild();
+    if (child.is("KEYVALUE")) {
+        return decodeKeyValue(child, name);
+    }
+    return CIMKeyBinding(name, decodeReference(child).toString(), CIMKeyBinding::REFERENCE);
+}
+
+CIMObjectPath ElementDecoder::decodeInstanceName(const XmlElement& element)
+{
+    return decodeNameIn(element, String(), CIMNamespaceName());
+}
+
+// INSTANCENAME or CLASSNAME, at that place.
+CIMObjectPath ElementDecoder::decodeNameIn(const XmlElement& element, const String& host,
+                                           const CIMNamespaceName& nameSpace)
+{
+    if (element.is("CLASSNAME")) {
+        return CIMObjectPath(host, nameSpace, decodeClassName(element));
+    }
+    element.expectName("INSTANCENAME");
+    std::string_view values[1];
+    element.attributes({"CLASSNAME"}, values);
+    const CIMName className = nameAttribute(element, "CLASSNAME", values[0]);
+    Array<CIMKeyBinding> keys;
+    XmlElement child = element.firstChild();
+    for (; child.is("KEYBINDING"); child = child.nextSibling()) {
+        if (keys.size() == fLimits.maxKeyBindings) {
+            child.fail(Kind::TooLarge, "more than " + std::to_string(fLimits.maxKeyBindings) + " key bindings");
+        }
+        keys.append(decodeKeyBinding(child));
+    }
+    // A single key may stand without its name.
+    if (child && keys.size() == 0 && !child.nextSibling()) {
+        keys.append(child.is("KEYVALUE")
+                        ? decodeKeyValue(child, CIMName())
+                        : CIMKeyBinding(CIMName(), decodeReference(child).toString(), CIMKeyBinding::REFERENCE));
+        child = XmlElement();
+    }
+    if (child) {
+        child.fail(Kind::Invalid,
+                   "Expected close of INSTANCENAME element, got " + std::string(child.name()) + " instead");
+    }
+    return CIMObjectPath(host, nameSpace, className, keys);
+}
+
+CIMNamespaceName ElementDecoder::decodeLocalNamespacePath(const XmlElement& element)
+{
+    element.expectName("LOCALNAMESPACEPATH");
+    element.expectNoAttributes();
+    std::string text;
+    XmlElement child = childOf(element, "NAMESPACE");
+    for (; child; child = child.nextSibling()) {
+        child.expectName("NAMESPACE");
+        child.expectNoChildren();
+        std::string_view values[1];
+        child.attributes({"NAME"}, values);
+        text += (text.empty() ? "" : "/");
+        StringAccess::appendUtf8(text, nameAttribute(child, "NAME", values[0]).getString());
+    }
+    return CIMNamespaceName(toString(element, text));
+}
+
+CIMObjectPath ElementDecoder::decodeObjectPath(const XmlElement& element)
+{
+    if (element.is("INSTANCENAME") || element.is("CLASSNAME")) {
+        return decodeNameIn(element, String(), CIMNamespaceName());
+    }
+    element.expectNoAttributes();
+    if (element.is("LOCALINSTANCEPATH") || element.is("LOCALCLASSPATH")) {
+        const XmlElement nameSpace = childOf(element, "LOCALNAMESPACEPATH");
+        return decodeNameIn(lastAfter(nameSpace), String(), decodeLocalNamespacePath(nameSpace));
+    }
+    if (!element.is("INSTANCEPATH") && !element.is("CLASSPATH")) {
+        element.fail(Kind::Invalid, "expected an object path, got " + std::string(element.name()) + " element");
+    }
+    const XmlElement location = childOf(element, "NAMESPACEPATH");
+    const XmlElement hostElement = childOf(location, "HOST");
+    const String host = toString(hostElement, hostElement.text(fScratch));
+    const CIMNamespaceName nameSpace = decodeLocalNamespacePath(lastAfter(hostElement));
+    try {
+        return decodeNameIn(lastAfter(location), host, nameSpace);
+    } catch (const MalformedObjectNameException&) {
+        hostElement.fail(Kind::Semantic, "Illegal value for HOST element");
+    }
+}
+
+CIMObjectPath ElementDecoder::decodeReference(const XmlElement& element)
+{
+    element.expectName("VALUE.REFERENCE");
+    element.expectNoAttributes();
+    return decodeObjectPath(element.onlyChild());
+}
+
+} // namespace Pegasus::wire

@@ -1,0 +1,273 @@
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/NumberText.h"
+#include "pegasus/common/CIMValueRep.h"
+#include "pegasus/common/StringRep.h"
+#include "pegasus/wire/ElementDecoder.h"
+
+#include <limits>
+
+namespace Pegasus::wire {
+namespace {
+
+using Kind = XmlError::Kind;
+
+// "Uint8", from "uint8".
+template <class T> std::string typeWord()
+{
+    std::string word = cimTypeToString(CIMTypeOf<T>::kType);
+    word.front() = static_cast<char>(word.front() - ('a' - 'A'));
+    return word;
+}
+
+// Counts one embedded object while it is decoded.
+class EmbeddingGuard
+{
+  public:
+    explicit EmbeddingGuard(std::size_t& depth) : fDepth(++depth) {}
+    ~EmbeddingGuard() { --fDepth; }
+    EmbeddingGuard(const EmbeddingGuard&) = delete;
+    EmbeddingGuard& operator=(const EmbeddingGuard&) = delete;
+
+  private:
+    std::size_t& fDepth;
+};
+
+} // namespace
+
+template <class T> T ElementDecoder::parseUnsigned(const XmlElement& element, std::string_view text)
+{
+    const auto parsed = number::parseUnsigned(text);
+    if (!parsed) {
+        element.fail(Kind::Semantic, "Invalid unsigned integer value");
+    }
+    if (*parsed > std::numeric_limits<T>::max()) {
+        element.fail(Kind::Semantic, typeWord<T>() + " value out of range");
+    }
+    return static_cast<T>(*parsed);
+}
+
+template <class T> T ElementDecoder::parseSigned(const XmlElement& element, std::string_view text)
+{
+    const auto parsed = number::parseSigned(text);
+    if (!parsed) {
+        element.fail(Kind::Semantic, "Invalid signed integer value");
+    }
+    if (*parsed > std::numeric_limits<T>::max() || *parsed < std::numeric_limits<T>::min()) {
+        element.fail(Kind::Semantic, typeWord<T>() + " value out of range");
+    }
+    return static_cast<T>(*parsed);
+}
+
+template <> String ElementDecoder::parseText<String>(const XmlElement& element, std::string_view text)
+{
+    return toString(element, text);
+}
+
+template <> Boolean ElementDecoder::parseText<Boolean>(const XmlElement& element, std::string_view text)
+{
+    if (equalNoCase(text, "true")) {
+        return true;
+    }
+    if (equalNoCase(text, "false")) {
+        return false;
+    }
+    element.fail(Kind::Semantic, "Invalid boolean value");
+}
+
+template <> Real32 ElementDecoder::parseText<Real32>(const XmlElement& element, std::string_view text)
+{
+    const auto parsed = number::parseReal32(text);
+    if (!parsed) {
+        element.fail(Kind::Semantic, "Invalid real number value");
+    }
+    return *parsed;
+}
+
+template <> Real64 ElementDecoder::parseText<Real64>(const XmlElement& element, std::string_view text)
+{
+    const auto parsed = number::parseReal64(text);
+    if (!parsed) {
+        element.fail(Kind::Semantic, "Invalid real number value");
+    }
+    return *parsed;
+}
+
+template <> Char16 ElementDecoder::parseText<Char16>(const XmlElement& element, std::string_view text)
+{
+    const String unit = toString(element, text);
+    if (unit.size() != 1) {
+        element.fail(Kind::Semantic, "Invalid char16 value");
+    }
+    return unit[0];
+}
+
+template <> CIMDateTime ElementDecoder::parseText<CIMDateTime>(const XmlElement& element, std::string_view text)
+{
+    if (text.empty()) {
+        return CIMDateTime();
+    }
+    try {
+        return CIMDateTime(toString(element, text));
+    } catch (const XmlError&) {
+        throw;
+    } catch (const Exception&) {
+        element.fail(Kind::Semantic, "Invalid datetime value");
+    }
+}
+
+template <> CIMObject ElementDecoder::parseText<CIMObject>(const XmlElement& element, std::string_view text)
+{
+    return decodeEmbedded(element, text);
+}
+
+template <> CIMInstance ElementDecoder::parseText<CIMInstance>(const XmlElement& element, std::string_view text)
+{
+    const CIMObject object = decodeEmbedded(element, text);
+    if (!object.isInstance()) {
+        element.fail(Kind::Semantic, "an embedded class where an instance is expected");
+    }
+    return CIMInstance(object);
+}
+
+template <class T> T ElementDecoder::parseText(const XmlElement& element, std::string_view text)
+{
+    if constexpr (std::is_unsigned_v<T>) {
+        return parseUnsigned<T>(element, text);
+    } else {
+        return parseSigned<T>(element, text);
+    }
+}
+
+CIMObject ElementDecoder::decodeEmbedded(const XmlElement& element, std::string_view text)
+{
+    const EmbeddingGuard guard(fEmbeddingDepth);
+    if (fEmbeddingDepth > fLimits.maxEmbedding) {
+        element.fail(Kind::TooLarge, "objects embedded more than " + std::to_string(fLimits.maxEmbedding) + " deep");
+    }
+    // A copy: decoding the object uses the scratch text that `text` may be in, and changes what it reads.
+    std::string xml(text);
+    XmlDocument document(fLimits);
+    try {
+        const XmlElement root = document.parseFragment(xml.data(), xml.size());
+        return root.is("CLASS") ? CIMObject(decodeClass(root)) : CIMObject(decodeInstance(root));
+    } catch (const XmlError& error) {
+        element.fail(error.kind(), "in an embedded object: " + StringAccess::toUtf8(error.getMessage()));
+    }
+}
+
+CIMType ElementDecoder::embeddedType(const XmlElement& element, CIMType type, std::string_view value1,
+                                     std::string_view value2)
+{
+    const std::string_view kind = value1.data() != nullptr ? value1 : value2;
+    if (kind.data() == nullptr) {
+        return type;
+    }
+    const bool agree = value1.data() == nullptr || value2.data() == nullptr || value1 == value2;
+    if (type == CIMTYPE_STRING && agree && kind == "instance") {
+        return CIMTYPE_INSTANCE;
+    }
+    if (type == CIMTYPE_STRING && agree && kind == "object") {
+        return CIMTYPE_OBJECT;
+    }
+    element.fail(Kind::Semantic, "Illegal value for " + std::string(element.name()) + ".EmbeddedObject attribute");
+}
+
+// ---- VALUE, VALUE.ARRAY
+
+template <class T> CIMValue ElementDecoder::decodeScalar(const XmlElement& element)
+{
+    return ValueAccess::make(parseText<T>(element, element.text(fScratch)));
+}
+
+template <> CIMValue ElementDecoder::decodeScalar<CIMObjectPath>(const XmlElement& element)
+{
+    element.fail(Kind::Invalid, "expected VALUE.REFERENCE element, got " + std::string(element.name()));
+}
+
+template <class T> CIMValue ElementDecoder::decodeArray(const XmlElement& element)
+{
+    Array<T> array;
+    for (XmlElement child = element.firstChild(); child; child = child.nextSibling()) {
+        if (array.size() == fLimits.maxArrayElements) {
+            child.fail(Kind::TooLarge,
+                       "an array of more than " + std::to_string(fLimits.maxArrayElements) + " elements");
+        }
+        child.expectNoAttributes();
+        if (child.is("VALUE.NULL")) {
+            child.expectNoChildren();
+            array.append(T());
+        } else if constexpr (std::is_same_v<T, CIMObjectPath>) {
+            array.append(decodeReference(child));
+        } else {
+            child.expectName("VALUE");
+            array.append(parseText<T>(child, child.text(fScratch)));
+        }
+    }
+    return ValueAccess::make(std::move(array));
+}
+
+CIMValue ElementDecoder::decodeValue(const XmlElement& element, CIMType type)
+{
+    element.expectNoAttributes();
+    if (element.is("VALUE.REFERENCE")) {
+        return CIMValue(decodeReference(element));
+    }
+    if (element.is("VALUE.REFARRAY")) {
+        return decodeArray<CIMObjectPath>(element);
+    }
+    const bool isArray = element.is("VALUE.ARRAY");
+    if (!isArray) {
+        element.expectName("VALUE");
+    }
+    return visitType(type, [&](auto tag) {
+        using T = typename decltype(tag)::Type;
+        return isArray ? decodeArray<T>(element) : decodeScalar<T>(element);
+    });
+}
+
+// ---- parameters
+
+// What stands in a PARAMVALUE or RETURNVALUE: a value, a path that is a reference, or nothing.
+CIMValue ElementDecoder::decodeParameterContent(const XmlElement& element, CIMType type)
+{
+    const XmlElement child = element.firstChild();
+    if (!child) {
+        return CIMValue(type, false);
+    }
+    const XmlElement only = element.onlyChild();
+    if (only.is("INSTANCENAME") || only.is("CLASSNAME")) {
+        return CIMValue(decodeObjectPath(only));
+    }
+    const bool isReference = only.is("VALUE.REFERENCE") || only.is("VALUE.REFARRAY");
+    if (isReference && type != CIMTYPE_REFERENCE && type != CIMTYPE_STRING) {
+        only.fail(Kind::Semantic, "a reference where " + std::string(cimTypeToString(type)) + " is expected");
+    }
+    return decodeValue(only, type);
+}
+
+CIMParamValue ElementDecoder::decodeParamValue(const XmlElement& element)
+{
+    element.expectName("PARAMVALUE");
+    std::string_view values[4];
+    element.attributes({"NAME", "PARAMTYPE", "EmbeddedObject", "EMBEDDEDOBJECT"}, values);
+    const CIMName name = nameAttribute(element, "NAME", values[0]);
+    const bool isTyped = values[1].data() != nullptr;
+    // A null without a type: the value is the untyped one that a default-constructed CIMValue is.
+    if (!isTyped && !element.firstChild()) {
+        return CIMParamValue(name.getString(), CIMValue(), false);
+    }
+    const CIMType type = isTyped ? typeAttribute(element, "PARAMTYPE", values[1]) : CIMTYPE_STRING;
+    const CIMValue value = decodeParameterContent(element, embeddedType(element, type, values[2], values[3]));
+    return CIMParamValue(name.getString(), value, isTyped);
+}
+
+CIMValue ElementDecoder::decodeReturnValue(const XmlElement& element)
+{
+    element.expectName("RETURNVALUE");
+    std::string_view values[3];
+    element.attributes({"PARAMTYPE", "EmbeddedObject", "EMBEDDEDOBJECT"}, values);
+    const CIMType type = values[0].data() != nullptr ? typeAttribute(element, "PARAMTYPE", values[0]) : CIMTYPE_STRING;
+    return decodeParameterContent(element, embeddedType(element, type, values[1], values[2]));
+}
+
+} // namespace Pegasus::wire

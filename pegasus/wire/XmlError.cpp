@@ -1,0 +1,49 @@
+#include "pegasus/wire/XmlError.h"
+
+#include "pegasus/common/StringRep.h"
+
+namespace Pegasus::wire {
+namespace {
+
+const char* wordFor(XmlError::Kind kind)
+{
+    switch (kind) {
+    case XmlError::Kind::NotWellFormed:
+        return "Not well-formed";
+    case XmlError::Kind::Semantic:
+        return "Semantic error";
+    case XmlError::Kind::TooLarge:
+        return "Limit exceeded";
+    default:
+        return "Validation error";
+    }
+}
+
+// The cause may quote bytes of the message that are no UTF-8.
+String printable(std::string text)
+{
+    try {
+        return StringAccess::fromUtf8(text);
+    } catch (const Exception&) {
+        for (char& c : text) {
+            c = static_cast<unsigned char>(c) < 0x80 ? c : '?';
+        }
+        return StringAccess::fromUtf8(text);
+    }
+}
+
+String messageFor(XmlError::Kind kind, XmlPlace place, const std::string& cause)
+{
+    return printable(std::string(wordFor(kind)) + ": on line " + std::to_string(place.line) + ": " + cause);
+}
+
+} // namespace
+
+XmlError::XmlError(Kind kind, XmlPlace place, const std::string& cause)
+    : Exception(messageFor(kind, place, cause)), fKind(kind), fPlace(place)
+{
+}
+
+XmlError::~XmlError() = default;
+
+} // namespace Pegasus::wire

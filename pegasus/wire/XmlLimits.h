@@ -1,0 +1,28 @@
+#pragma once
+
+#include <cstddef>
+
+namespace Pegasus::wire {
+
+// Bounds on XML that comes from a socket. Each has an error of its own; none is ever reached by a sane message.
+struct XmlLimits
+{
+    // Elements open at once.
+    std::size_t maxDepth = 64;
+    // Attributes of one element.
+    std::size_t maxAttributes = 32;
+    // Bytes of one tag, comment or processing instruction.
+    std::size_t maxTagBytes = 64UL * 1024;
+    // Bytes of character data in one element, as they stand in the message.
+    std::size_t maxTextBytes = 16UL * 1024 * 1024;
+    // Bytes of one element that is decoded as a whole (an instance, a class).
+    std::size_t maxElementBytes = 64UL * 1024 * 1024;
+    // Elements of one array value.
+    std::size_t maxArrayElements = 1024UL * 1024;
+    // Key bindings of one object path, nested ones not counted.
+    std::size_t maxKeyBindings = 256;
+    // Embedded objects in embedded objects.
+    std::size_t maxEmbedding = 8;
+};
+
+} // namespace Pegasus::wire

@@ -1,0 +1,106 @@
+#pragma once
+
+#include "pegasus/wire/XmlError.h"
+#include "pegasus/wire/XmlLimits.h"
+
+#include <cstddef>
+#include <memory>
+#include <string>
+#include <string_view>
+
+namespace pugi {
+struct xml_node_struct;
+} // namespace pugi
+
+namespace Pegasus::wire {
+
+class XmlDocument;
+
+// One element of a parsed document: a cheap copyable view, valid as long as its document.
+// Names and values are views into the message; entity and character references are resolved on reading.
+// Throws: XmlError from every member that reads, with the element's place.
+class XmlElement
+{
+  public:
+    XmlElement() = default;
+
+    // False behind the last sibling, and for the child of an empty element.
+    explicit operator bool() const { return fNode != nullptr; }
+    std::string_view name() const;
+    bool is(std::string_view expectedName) const;
+
+    // The children that are elements. Text beside them is an error.
+    XmlElement firstChild() const;
+    XmlElement nextSibling() const;
+    // The one child. Throws: XmlError when there is none or a second one.
+    XmlElement onlyChild() const;
+    // Requires: no children. Throws: XmlError otherwise.
+    void expectNoChildren() const;
+    void expectName(std::string_view expectedName) const;
+
+    // Reads attributes: values[i] gets the raw text of names[i], or stays with data() == nullptr when it is absent.
+    // Throws: XmlError for an attribute that is not listed or appears twice.
+    template <std::size_t N> void attributes(const std::string_view (&names)[N], std::string_view (&values)[N]) const
+    {
+        readAttributes(names, values, N);
+    }
+    void expectNoAttributes() const { readAttributes(nullptr, nullptr, 0); }
+
+    // The character data of an element without children, with blanks around the raw text taken off and references
+    // resolved. Returns: a view into the message or into `scratch`; valid until either changes.
+    std::string_view text(std::string& scratch) const;
+    // `raw` (an attribute's value) with references resolved; as text().
+    std::string_view resolved(std::string_view raw, std::string& scratch) const;
+
+    [[noreturn]] void fail(XmlError::Kind kind, const std::string& cause) const;
+    XmlPlace place() const;
+
+  private:
+    friend class XmlDocument;
+    XmlElement(pugi::xml_node_struct* node, const XmlDocument* document) : fNode(node), fDocument(document) {}
+
+    void readAttributes(const std::string_view* names, std::string_view* values, std::size_t count) const;
+    std::string_view mixedText(std::string& scratch) const;
+
+    pugi::xml_node_struct* fNode = nullptr;
+    const XmlDocument* fDocument = nullptr;
+};
+
+// A parser that can be used again and again; it works in the caller's memory and keeps nothing of its own but nodes.
+class XmlDocument
+{
+  public:
+    explicit XmlDocument(const XmlLimits& limits = XmlLimits());
+    ~XmlDocument();
+    XmlDocument(const XmlDocument&) = delete;
+    XmlDocument& operator=(const XmlDocument&) = delete;
+
+    // Parses a whole message, XML declaration first, and returns its root element.
+    // The text is changed in place and must outlive the elements. Earlier elements of this document become invalid.
+    // Throws: XmlError (not well formed, over a limit, a DOCTYPE, another encoding than UTF-8).
+    XmlElement parseMessage(char* text, std::size_t size);
+    // The same without an XML declaration: an object embedded in a string.
+    XmlElement parseFragment(char* text, std::size_t size);
+    // The same for one element cut out of a message, where `start` is its place there.
+    // Requires: the text is one balanced element within the limits, as XmlSlicer delivers it.
+    XmlElement parseElement(char* text, std::size_t size, XmlPlace start);
+
+    const XmlLimits& limits() const { return fLimits; }
+
+  private:
+    friend class XmlElement;
+    struct Tree;
+
+    XmlElement parse(char* text, std::size_t size);
+    XmlElement parseChecked(char* text, std::size_t size, bool isMessage);
+    XmlPlace placeOf(const char* position) const;
+    XmlPlace placeAtOffset(std::size_t offset) const;
+
+    XmlLimits fLimits;
+    std::unique_ptr<Tree> fTree;
+    const char* fText = nullptr;
+    std::size_t fSize = 0;
+    XmlPlace fStart;
+};
+
+} // namespace Pegasus::wire

@@ -1,0 +1,56 @@
+#pragma once
+
+#include "pegasus/wire/XmlError.h"
+#include "pegasus/wire/XmlLimits.h"
+
+#include <cstddef>
+#include <string_view>
+
+namespace Pegasus::wire {
+
+// One piece of markup or text at the beginning of some bytes.
+struct XmlToken
+{
+    enum class Type
+    {
+        Incomplete, // more bytes are needed
+        Text,       // everything up to the next '<'
+        StartTag,
+        EmptyTag, // <a/>
+        EndTag,
+        CData,
+        Comment,
+        Declaration, // <?xml ...?>
+        Instruction  // any other <? ?>
+    };
+
+    Type type = Type::Incomplete;
+    std::size_t size = 0;
+};
+
+// Finds where tokens end, and no more: names, attributes and nesting are for the parser.
+// Throws: XmlError (a DOCTYPE, other markup that is none, a token over its limit).
+class XmlScanner
+{
+  public:
+    explicit XmlScanner(const XmlLimits& limits) : fLimits(limits) {}
+
+    // Requires: `bytes` is not empty. `place` is where they begin.
+    XmlToken next(std::string_view bytes, XmlPlace place) const;
+
+    // The name in a tag: behind "<" or "</".
+    static std::string_view tagName(std::string_view tag);
+
+  private:
+    XmlToken markup(std::string_view bytes, XmlPlace place) const;
+    XmlToken tag(std::string_view bytes, XmlPlace place) const;
+    XmlToken upTo(XmlToken::Type type, std::string_view bytes, std::size_t from, std::string_view end,
+                  std::size_t limit, XmlPlace place) const;
+
+    const XmlLimits& fLimits;
+};
+
+// Moves a place over `bytes`.
+XmlPlace advance(XmlPlace place, std::string_view bytes);
+
+} // namespace Pegasus::wire

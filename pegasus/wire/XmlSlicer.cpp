@@ -1,0 +1,245 @@
+#include "pegasus/wire/XmlSlicer.h"
+
+#include "pegasus/wire/XmlText.h"
+
+#include <algorithm>
+
+namespace Pegasus::wire {
+namespace {
+
+using Kind = XmlError::Kind;
+using Type = XmlToken::Type;
+
+// Elements are delivered when so much of them is there, or when the bytes at hand are used up.
+constexpr std::size_t kBatchBytes = 64UL * 1024;
+
+} // namespace
+
+XmlSlicer::XmlSlicer(std::vector<std::string_view> envelope, XmlSliceHandler& handler, const XmlLimits& limits)
+    : fEnvelope(std::move(envelope)), fHandler(handler), fLimits(limits), fScanner(fLimits), fDocument(fLimits)
+{
+}
+
+void XmlSlicer::feed(std::string_view bytes)
+{
+    fBuffer.insert(fBuffer.end(), bytes.begin(), bytes.end());
+    run();
+    fBuffer.erase(fBuffer.begin(), fBuffer.begin() + static_cast<std::ptrdiff_t>(fStart));
+    fScanned -= fStart;
+    fSliceStart -= std::min(fSliceStart, fStart);
+    fStart = 0;
+}
+
+void XmlSlicer::run()
+{
+    while (fScanned < fBuffer.size() && step()) {
+    }
+    flush();
+    if (fSliceDepth > 0) {
+        checkElementSize(fBuffer.size() - fSliceStart);
+    }
+}
+
+void XmlSlicer::checkElementSize(std::size_t size) const
+{
+    if (size > fLimits.maxElementBytes) {
+        throw XmlError(Kind::TooLarge, here(),
+                       "an element of more than " + std::to_string(fLimits.maxElementBytes) + " bytes");
+    }
+}
+
+std::string_view XmlSlicer::rest() const
+{
+    return std::string_view(fBuffer.data() + fScanned, fBuffer.size() - fScanned);
+}
+
+// The place that tokens were found up to.
+XmlPlace XmlSlicer::here() const
+{
+    return advance(fPlace, std::string_view(fBuffer.data() + fStart, fScanned - fStart));
+}
+
+XmlToken XmlSlicer::nextToken() const
+{
+    try {
+        return fScanner.next(rest(), fPlace);
+    } catch (const XmlError&) {
+        return fScanner.next(rest(), here()); // fails again, with the exact place
+    }
+}
+
+// Takes one token. Returns: false when it is not complete.
+bool XmlSlicer::step()
+{
+    const XmlToken token = nextToken();
+    // Text may go on with the next bytes; in a slice that does not matter.
+    const bool isCut = token.type == Type::Text && token.size == rest().size() && fSliceDepth == 0;
+    if (token.type == Type::Incomplete || isCut) {
+        return false;
+    }
+    take(token);
+    return true;
+}
+
+void XmlSlicer::take(const XmlToken& token)
+{
+    if (!fHasDeclaration) {
+        if (token.type != Type::Declaration) {
+            throw XmlError(Kind::Invalid, fPlace, "Expected <?xml ... ?> style declaration");
+        }
+        checkXmlDeclaration(rest().substr(0, token.size), fPlace);
+        fHasDeclaration = true;
+        return consume(token.size);
+    }
+    if (fSliceDepth > 0) {
+        takeInSlice(token);
+    } else {
+        takeInEnvelope(token);
+    }
+}
+
+void XmlSlicer::takeInSlice(const XmlToken& token)
+{
+    fScanned += token.size;
+    if (token.type == Type::StartTag) {
+        ++fSliceDepth;
+    }
+    if (fOpen.size() + fSliceDepth > fLimits.maxDepth) {
+        throw XmlError(Kind::TooLarge, here(),
+                       "elements nested more than " + std::to_string(fLimits.maxDepth) + " deep");
+    }
+    if (token.type == Type::EndTag && --fSliceDepth == 0) {
+        endSlice();
+    }
+}
+
+void XmlSlicer::takeInEnvelope(const XmlToken& token)
+{
+    const std::string_view text = rest().substr(0, token.size);
+    switch (token.type) {
+    case Type::StartTag:
+    case Type::EmptyTag:
+        return isEnvelope(XmlScanner::tagName(text)) ? open(token) : beginSlice(token);
+    case Type::EndTag:
+        flush();
+        consume(0);
+        close(XmlScanner::tagName(text));
+        break;
+    case Type::Text:
+    case Type::CData:
+        if (text.find_first_not_of(" \t\r\n") != std::string_view::npos) {
+            throw XmlError(Kind::Invalid, here(), "unexpected text between elements");
+        }
+        break;
+    case Type::Declaration:
+        throw XmlError(Kind::NotWellFormed, fPlace, "a second XML declaration");
+    default:
+        break;
+    }
+    if (fHasSlices) {
+        fScanned += token.size; // goes along with the elements around it
+    } else {
+        consume(token.size);
+    }
+}
+
+void XmlSlicer::beginSlice(const XmlToken& token)
+{
+    if (fOpen.empty() && fHasRoot) {
+        throw XmlError(Kind::NotWellFormed, here(), "a second root element");
+    }
+    fSliceStart = fScanned;
+    fScanned += token.size;
+    if (token.type == Type::EmptyTag) {
+        endSlice();
+    } else {
+        fSliceDepth = 1;
+    }
+}
+
+void XmlSlicer::endSlice()
+{
+    checkElementSize(fScanned - fSliceStart);
+    fHasSlices = true;
+    fSlicesEnd = fScanned;
+    if (fScanned - fStart >= kBatchBytes) {
+        flush();
+    }
+}
+
+// Delivers the whole elements that have come, which are parsed together: one by one costs the allocator more.
+void XmlSlicer::flush()
+{
+    if (!fHasSlices) {
+        return;
+    }
+    fHasSlices = false;
+    char* text = fBuffer.data() + fStart;
+    const std::size_t size = fSlicesEnd - fStart;
+    // Counted first: parsing changes the text.
+    const XmlPlace end = advance(fPlace, std::string_view(text, size));
+    for (XmlElement element = fDocument.parseElement(text, size, fPlace); element; element = element.nextSibling()) {
+        fHandler.slice(element);
+    }
+    fPlace = end;
+    fStart = fSlicesEnd;
+}
+
+void XmlSlicer::open(const XmlToken& token)
+{
+    flush();
+    consume(0);
+    if (fOpen.empty() && fHasRoot) {
+        throw XmlError(Kind::NotWellFormed, here(), "a second root element");
+    }
+    const std::string name(XmlScanner::tagName(rest().substr(0, token.size)));
+    // The tag by itself is made an element that the parser can read.
+    std::string tag(rest().substr(0, token.size));
+    if (token.type == Type::StartTag) {
+        tag.insert(tag.size() - 1, 1, '/');
+    }
+    fHasRoot = true;
+    fOpen.push_back(name);
+    fHandler.openEnvelope(fDocument.parseElement(tag.data(), tag.size(), fPlace));
+    if (token.type == Type::EmptyTag) {
+        close(name);
+    }
+    consume(token.size);
+}
+
+void XmlSlicer::close(std::string_view name)
+{
+    if (fOpen.empty() || fOpen.back() != name) {
+        throw XmlError(Kind::NotWellFormed, fPlace,
+                       "Closing element does not match opening element: " + std::string(name));
+    }
+    fOpen.pop_back();
+    fHandler.closeEnvelope(name);
+}
+
+// Leaves behind everything up to `size` bytes from where tokens were found.
+void XmlSlicer::consume(std::size_t size)
+{
+    const std::size_t end = fScanned + size;
+    fPlace = advance(fPlace, std::string_view(fBuffer.data() + fStart, end - fStart));
+    fScanned = end;
+    fStart = end;
+}
+
+bool XmlSlicer::isEnvelope(std::string_view name) const
+{
+    return std::find(fEnvelope.begin(), fEnvelope.end(), name) != fEnvelope.end();
+}
+
+void XmlSlicer::finish()
+{
+    if (!fHasDeclaration) {
+        throw XmlError(Kind::Invalid, fPlace, "Expected <?xml ... ?> style declaration");
+    }
+    const bool onlyBlanks = rest().find_first_not_of(" \t\r\n") == std::string_view::npos;
+    if (!fHasRoot || !fOpen.empty() || fSliceDepth > 0 || !onlyBlanks) {
+        throw XmlError(Kind::NotWellFormed, fPlace, "the answer ends before its XML does");
+    }
+}
+
+} // namespace Pegasus::wire

@@ -1,0 +1,171 @@
+#include "pegasus/wire/XmlText.h"
+
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/Utf8.h"
+
+#include <algorithm>
+#include <cstdint>
+
+namespace Pegasus::wire {
+namespace {
+
+constexpr std::string_view kBlanks = " \t\r\n";
+// &#x10FFFF; and a few leading zeros.
+constexpr std::size_t kMaxReferenceBytes = 16;
+
+struct Entity
+{
+    std::string_view name;
+    char character;
+};
+constexpr Entity kEntities[] = {{"lt", '<'}, {"gt", '>'}, {"amp", '&'}, {"quot", '"'}, {"apos", '\''}};
+
+bool isForbidden(char c)
+{
+    return static_cast<unsigned char>(c) < 0x20 && c != '\t' && c != '\n' && c != '\r';
+}
+
+int digitValue(char c)
+{
+    if (c >= '0' && c <= '9') {
+        return c - '0';
+    }
+    const char lower = static_cast<char>(c | 0x20);
+    return lower >= 'a' && lower <= 'f' ? lower - 'a' + 10 : -1;
+}
+
+void appendCode(std::string& out, std::uint32_t code)
+{
+    if (code < 0x10000) {
+        const Char16 unit(static_cast<Uint16>(code));
+        utf8::append(out, &unit, 1);
+        return;
+    }
+    const Char16 pair[] = {Char16(static_cast<Uint16>(0xD800 + ((code - 0x10000) >> 10))),
+                           Char16(static_cast<Uint16>(0xDC00 + ((code - 0x10000) & 0x3FF)))};
+    utf8::append(out, pair, 2);
+}
+
+// `digits` of "#65" or "#x41".
+bool appendCharacter(std::string_view digits, std::string& out)
+{
+    const bool hex = !digits.empty() && digits.front() == 'x';
+    if (hex) {
+        digits.remove_prefix(1);
+    }
+    if (digits.empty()) {
+        return false;
+    }
+    std::uint32_t code = 0;
+    for (const char c : digits) {
+        const int value = digitValue(c);
+        if (value < 0 || (!hex && value > 9)) {
+            return false;
+        }
+        code = code * (hex ? 16 : 10) + static_cast<std::uint32_t>(value);
+        if (code > 0x10FFFF) {
+            return false;
+        }
+    }
+    if (code == 0) {
+        return false;
+    }
+    appendCode(out, code);
+    return true;
+}
+
+bool appendReference(std::string_view reference, std::string& out)
+{
+    if (!reference.empty() && reference.front() == '#') {
+        return appendCharacter(reference.substr(1), out);
+    }
+    const auto* found = std::find_if(std::begin(kEntities), std::end(kEntities),
+                                     [&](const Entity& entity) { return entity.name == reference; });
+    if (found == std::end(kEntities)) {
+        return false;
+    }
+    out += found->character;
+    return true;
+}
+
+// The value of `name` in a declaration; empty when it is not there.
+std::string_view pseudoAttribute(std::string_view declaration, std::string_view name)
+{
+    std::size_t at = declaration.find(name);
+    if (at == std::string_view::npos) {
+        return std::string_view();
+    }
+    at = declaration.find_first_of("\"'", at + name.size());
+    if (at == std::string_view::npos) {
+        return std::string_view();
+    }
+    const std::size_t end = declaration.find(declaration[at], at + 1);
+    return end == std::string_view::npos ? std::string_view() : declaration.substr(at + 1, end - at - 1);
+}
+
+} // namespace
+
+std::string_view trimBlanks(std::string_view text)
+{
+    const std::size_t first = text.find_first_not_of(kBlanks);
+    if (first == std::string_view::npos) {
+        return std::string_view();
+    }
+    return text.substr(first, text.find_last_not_of(kBlanks) - first + 1);
+}
+
+bool needsResolving(std::string_view text)
+{
+    return std::any_of(text.begin(), text.end(), [](char c) { return c == '&' || c == '\r' || isForbidden(c); });
+}
+
+std::string resolveReferences(std::string_view text, std::string& out)
+{
+    for (std::size_t i = 0; i < text.size(); ++i) {
+        const char c = text[i];
+        if (isForbidden(c)) {
+            return "a control character";
+        }
+        if (c == '\r') {
+            out += '\n';
+            i += i + 1 < text.size() && text[i + 1] == '\n' ? 1 : 0;
+        } else if (c != '&') {
+            out += c;
+        } else {
+            const std::size_t end = text.find(';', i);
+            const std::string_view reference = text.substr(i + 1, end == std::string_view::npos ? end : end - i - 1);
+            if (end == std::string_view::npos || reference.size() > kMaxReferenceBytes ||
+                !appendReference(reference, out))
+            {
+                return "a bad reference \"&" + std::string(reference.substr(0, kMaxReferenceBytes)) + "\"";
+            }
+            i = end;
+        }
+    }
+    return std::string();
+}
+
+void appendNormalized(std::string& out, std::string_view text)
+{
+    for (std::size_t i = 0; i < text.size(); ++i) {
+        if (text[i] != '\r') {
+            out += text[i];
+        } else if (i + 1 == text.size() || text[i + 1] != '\n') {
+            out += '\n';
+        }
+    }
+}
+
+void checkXmlDeclaration(std::string_view declaration, XmlPlace place)
+{
+    const std::string_view version = pseudoAttribute(declaration, "version");
+    if (version.substr(0, 2) != "1." || version.size() < 3) {
+        throw XmlError(XmlError::Kind::Invalid, place, "Expected <?xml ... ?> style declaration with version 1.x");
+    }
+    const std::string_view encoding = pseudoAttribute(declaration, "encoding");
+    if (encoding.data() != nullptr && !equalNoCase(encoding, "utf-8")) {
+        throw XmlError(XmlError::Kind::Invalid, place, "unsupported encoding \"" + std::string(encoding) + "\"");
+    }
+}
+
+} // namespace Pegasus::wire

@@ -1,0 +1,28 @@
+#pragma once
+
+#include "pegasus/wire/XmlError.h"
+
+#include <string>
+#include <string_view>
+
+namespace Pegasus::wire {
+
+// Character data as it stands in a message, and what it means.
+
+std::string_view trimBlanks(std::string_view text);
+
+// Is there a reference, a carriage return or a character that XML does not allow?
+bool needsResolving(std::string_view text);
+
+// Appends `text` with the five entities and character references resolved and line ends as line feeds. References to
+// control characters are let through, because servers send them.
+// Returns: empty, or what was wrong (a reference that is none, a control character).
+std::string resolveReferences(std::string_view text, std::string& out);
+
+// Appends text of a CDATA section: only the line ends are changed.
+void appendNormalized(std::string& out, std::string_view text);
+
+// `<?xml version="1.x" encoding="utf-8"?>`; without an encoding it is UTF-8 too. Throws: XmlError.
+void checkXmlDeclaration(std::string_view declaration, XmlPlace place);
+
+} // namespace Pegasus::wire
