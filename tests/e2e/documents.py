@@ -1,6 +1,6 @@
 """The commands of README.md: each line of its sh blocks is run as it stands, in this tree, or skipped with a reason.
 
-Usage: papers.py BUILD_DIRECTORY
+Usage: documents.py BUILD_DIRECTORY
 """
 import os
 import re
