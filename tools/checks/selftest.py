@@ -1,0 +1,96 @@
+#!/usr/bin/env python3
+"""Plants faults in a copy of the tree and runs tools/check there: each fault must be reported.
+
+Usage: selftest.py     (run in the repository's root; the build folder is shared with the copy, and only read)
+
+Prints one line for each fault that no check reported, and the count of those that were found on standard error.
+"""
+import os
+import shutil
+import subprocess
+import sys
+import tempfile
+
+# Includes that break a layer: the folder of the planted source, what it includes.
+WRONG_INCLUDES = [
+    ("include/host", '"host/core/"'),
+    ("src/common", '"src/plugin/"'),
+    ("src/schema", '"pegasus/base/"'),
+    ("host/inmem", '"host/cli/"'),
+    ("pegasus/base", '"pegasus/wire/"'),
+    ("pegasus/repository", '"pegasus/server/net/"'),
+    ("pegasus/cmpi", '"pegasus/server/agent/"'),
+    ("pegasus/server/net", '"pegasus/server/agent/"'),
+    ("providers/linux", "<Pegasus/Common/String.h>"),
+]
+
+# Other faults: the check, the planted file, its text, what the report must hold. {n} is the number of the fault.
+FAULTS = [
+    ("layers", "src/planted/P{n}.h", "#pragma once\n", "the folder src/planted has no row"),
+    ("layers", "src/common/P{n}.cpp", '#include "../plugin/P.h"\n', ":1: \"../plugin/P.h\" is no path"),
+    ("layers", "src/common/P{n}.cpp", "#include <src/common/CoreLog.h>\n", ":1: <src/common/CoreLog.h> is not public"),
+    ("format", "src/common/P{n}.cpp", "int  misplaced;\n", ":1"),
+    ("forbidden", "src/common/P{n}.cpp", 'void f()\n{\n    setenv("A", "", 1);\n}\n', ":3:"),
+    ("forbidden", "src/common/P{n}.cpp", 'void f()\n{\n    std::cout << 1;\n}\n', ":3:"),
+    ("dead", "src/common/P{n}.cpp", "int unused;\n", " is compiled by no target"),
+    ("dead", "src/common/P{n}.h", "#pragma once\n", " is included by nobody"),
+    ("limits", "src/common/P{n}.h", "constexpr int kMaxPlanted = 1;\n", "kMaxPlanted is missing in docs/limits.md"),
+]
+
+
+def tracked(*patterns):
+    """Returns the files of the tree, those that are not committed yet too."""
+    names = ["git", "ls-files", "--cached", "--others", "--exclude-standard", "--", *patterns]
+    return subprocess.run(names, check=True, stdout=subprocess.PIPE, text=True).stdout.splitlines()
+
+
+def with_header(include):
+    """Completes an include that ends in a folder with the name of its first header."""
+    folder = include.strip('"')
+    return f'"{tracked(folder + "*.h")[0]}"' if folder.endswith("/") else include
+
+
+def copy_of_tree(top):
+    """Makes a repository in the folder top that holds the tracked files as they are now."""
+    for file in tracked():
+        if os.path.lexists(file):
+            os.makedirs(os.path.join(top, os.path.dirname(file)), exist_ok=True)
+            shutil.copy2(file, os.path.join(top, file), follow_symlinks=False)
+    os.symlink(os.path.abspath("build"), os.path.join(top, "build"))
+    subprocess.run(["git", "-C", top, "init", "-q"], check=True)
+
+
+def faults():
+    """Yields (check, file, text, what its report holds)."""
+    number = 0
+    for folder, include in WRONG_INCLUDES:
+        include = with_header(include)
+        header = include.strip('"') if include[0] == '"' else "pegasus/include/" + include.strip("<>")
+        yield "layers", f"{folder}/Planted{number}.cpp", f"\n#include {include}\n", f":2: {folder} may not include {header}"
+        number += 1
+    for check, file, text, report in FAULTS:
+        yield check, file.replace("P{n}", f"Planted{number}"), text, report
+        number += 1
+
+
+def main():
+    planted = list(faults())
+    with tempfile.TemporaryDirectory(prefix="vrx-check-") as top:
+        copy_of_tree(top)
+        for _, file, text, _ in planted:
+            path = os.path.join(top, file)
+            os.makedirs(os.path.dirname(path), exist_ok=True)
+            with open(path, "w", encoding="utf-8") as out:
+                out.write(text)
+        subprocess.run(["git", "-C", top, "add", "-A"], check=True)
+        checks = sorted({check for check, *_ in planted})
+        done = subprocess.run(["tools/check", *checks], cwd=top, stdout=subprocess.PIPE, text=True, check=False)
+    lines = done.stdout.splitlines()
+    missed = [(check, file, report) for check, file, _, report in planted
+              if not any(report in line and (file in line or "Planted" in report) for line in lines)]
+    for check, file, report in missed:
+        print(f"{check} does not report {file}: {report}")
+    print(f"self-test: {len(planted) - len(missed)} of {len(planted)} planted faults reported", file=sys.stderr)
+
+
+main()
