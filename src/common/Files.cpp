@@ -1,8 +1,12 @@
 #include "src/common/Files.h"
 
+#include <cerrno>
+#include <cstring>
+
 #include <dirent.h>
 #include <fcntl.h>
 #include <sys/stat.h>
+#include <unistd.h>
 
 namespace NKOLVRX20 {
 
@@ -17,6 +21,19 @@ bool HasFileType(const std::string& path, mode_t type)
 {
     struct stat status = {};
     return ::stat(path.c_str(), &status) == 0 && (status.st_mode & S_IFMT) == type;
+}
+
+// Returns: what makes the opened file one that must not be read; null when nothing does.
+const char* ReasonAgainst(int descriptor)
+{
+    struct stat status = {};
+    if (::fstat(descriptor, &status) != 0) {
+        return std::strerror(errno);
+    }
+    if (!S_ISREG(status.st_mode)) {
+        return "not a regular file";
+    }
+    return status.st_uid == 0 || status.st_uid == ::geteuid() ? nullptr : "owned by another user";
 }
 
 } // namespace
@@ -51,6 +68,27 @@ TFile OpenRegularFile(const std::string& path)
     TFile file(std::fopen(path.c_str(), "r"));
     if (file) {
         static_cast<void>(::fcntl(::fileno(file.get()), F_SETFD, FD_CLOEXEC));
+    }
+    return file;
+}
+
+TFile OpenOwnFile(const std::string& path, std::string& reason)
+{
+    reason.clear();
+    // Without O_NONBLOCK the opening of a pipe would wait for its writer.
+    const int descriptor = ::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_NOFOLLOW | O_NOCTTY | O_CLOEXEC);
+    if (descriptor == -1) {
+        if (errno != ENOENT) {
+            reason = errno == ELOOP ? "a symbolic link" : std::strerror(errno);
+        }
+        return nullptr;
+    }
+    // The descriptor is looked at, not the path: what lies there may change in between.
+    const char* against = ReasonAgainst(descriptor);
+    TFile file(against ? nullptr : ::fdopen(descriptor, "r"));
+    if (!file) {
+        reason = against ? against : std::strerror(errno);
+        static_cast<void>(::close(descriptor));
     }
     return file;
 }

@@ -25,4 +25,11 @@ typedef std::unique_ptr<std::FILE, TFileCloser> TFile;
 // Returns: null when it cannot be opened.
 TFile OpenRegularFile(const std::string& path);
 
+// Opens a file in a directory where other users may write, so that nothing of theirs is read: a regular file that
+// belongs to root or to the user of this process, not reached through a link as its last part. Close-on-exec.
+// Returns: null when it cannot be opened or is something else; the reason then says why, and is empty when there is
+// no such file.
+// Blocks: never, whatever lies there.
+TFile OpenOwnFile(const std::string& path, std::string& reason);
+
 } // namespace NKOLVRX20

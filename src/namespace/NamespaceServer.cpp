@@ -1,8 +1,8 @@
 // The private server as a process: port, configuration, start, stop, what an earlier run left, clean-up.
 #include "src/common/CoreLog.h"
-#include "src/common/Files.h"
 #include "src/namespace/NamespaceConstants.h"
 #include "src/namespace/Removal.h"
+#include "src/namespace/ResidualServer.h"
 #include "src/namespace/ServerTree.h"
 #include "src/namespace/TPEGASUSNamespace.h"
 
@@ -13,8 +13,6 @@
 #include <csignal>
 #include <cstdlib>
 #include <cstring>
-#include <fstream>
-#include <sstream>
 
 #include <arpa/inet.h>
 #include <fcntl.h>
@@ -29,11 +27,9 @@ namespace {
 constexpr unsigned short kHighestPort = 65535;
 constexpr unsigned short kLowestPort = 1024;
 
-constexpr char kServerName[] = "cimserver"; // the program, and how a process listing shows it
 constexpr char kConfigName[] = "cimconfig";
 constexpr unsigned int kStartPauseSeconds = 1;
 constexpr unsigned int kStopPauseSeconds = 3;
-constexpr int kListingTimeoutSeconds = 360;
 
 // A socket that is closed when it goes out of scope.
 class TProbeSocket
@@ -63,42 +59,6 @@ class TProbeSocket
   private:
     int fDescriptor;
 };
-
-// Returns: false when there is no such file. A file without a number gives 0, which no server has.
-bool ReadProcessId(const std::string& path, int& pid)
-{
-    if (!IsRegularFile(path)) {
-        return false;
-    }
-    std::ifstream file(path);
-    file.imbue(std::locale::classic());
-    file >> pid;
-    return file.is_open();
-}
-
-std::string ProcessListing()
-{
-    std::string output;
-    try {
-        TOSSpecific::SpawnProcess("ps", {"-e"}, output, kListingTimeoutSeconds);
-    } catch (const TVRXException&) { // what was captured has to do
-    }
-    return output;
-}
-
-// Returns: whether the listing has the process on a line that names the server.
-bool ListsServer(const std::string& listing, const std::string& pid)
-{
-    std::istringstream lines(listing);
-    for (std::string line; std::getline(lines, line);) {
-        std::string firstToken;
-        if (line.find(kServerName) != std::string::npos && std::istringstream(line) >> firstToken && firstToken == pid)
-        {
-            return true;
-        }
-    }
-    return false;
-}
 
 } // namespace
 
@@ -145,33 +105,23 @@ void TPEGASUSNamespace::callCimserver(unsigned short port)
 
 bool TPEGASUSNamespace::isResidualCimserver(int pid)
 {
-    const std::string listing = ProcessListing();
-    LogProgress(listing);
+    const TProcessListing listing;
     try {
-        return ListsServer(listing, std::to_string(pid));
+        return listing.HasServer(pid);
     } catch (const std::exception& exception) {
         LogFailure(exception.what());
         return false;
     }
 }
 
-std::string TPEGASUSNamespace::StartFilePath() const
-{
-    return "/var/tmp/cimserverkol_tc_" + fConsumerName + "_start.conf";
-}
-
 void TPEGASUSNamespace::killResidualCimserver()
 {
-    const std::string path = StartFilePath();
-    int pid = 0;
-    if (ReadProcessId(path, pid)) {
-        if (isResidualCimserver(pid)) {
-            teminateCimserver(pid);
-        }
-    } else {
-        LogProgress("Error opening ", path);
+    const TStartFile startFile(fConsumerName);
+    const std::optional<int> pid = startFile.ReadProcessId();
+    if (pid && isResidualCimserver(*pid)) {
+        teminateCimserver(*pid);
     }
-    RemovePath(path, kRemoveFile);
+    startFile.Remove();
 }
 
 int TPEGASUSNamespace::teminateCimserver(int pid)

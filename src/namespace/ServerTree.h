@@ -3,6 +3,9 @@
 
 namespace NKOLVRX20 {
 
+// The server's program, and how a process listing names it.
+inline constexpr char kServerName[] = "cimserver";
+
 inline constexpr char kPegasusHome[] = "/pegasus";
 inline constexpr char kProgramDirectory[] = "/pegasus/bin/";
 inline constexpr char kLibraryDirectory[] = "/pegasus/lib";

@@ -199,7 +199,6 @@ class TPEGASUSNamespace : public ICIMNamespace, public boost::enable_shared_from
     void WriteLsiConfiguration() const;
 
     std::string RunServerProgram(const std::string& name, const std::vector<std::string>& arguments) const;
-    std::string StartFilePath() const;
     void StopCimserver();
     void ReleaseCycles();
 

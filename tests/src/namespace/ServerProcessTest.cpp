@@ -9,9 +9,12 @@
 #include <algorithm>
 #include <cstdio>
 #include <cstdlib>
+#include <filesystem>
 #include <fstream>
+#include <functional>
 
 #include <sys/stat.h>
+#include <unistd.h>
 
 namespace NKOLVRX20 {
 namespace {
@@ -211,13 +214,54 @@ TEST_F(ServerProcessTest, HandsOnTheResultOfKill)
     EXPECT_EQ(-1, ns->teminateCimserver(4711));
 }
 
-TEST_F(ServerProcessTest, DoesNotWaitForAStartFileThatIsAPipe)
+TEST_F(ServerProcessTest, ReadsOnlyAStartFileThatNoOtherUserCanHavePutThere)
 {
+    // The directory of start files is everybody's; whoever lays something there must neither stop us nor make us kill.
+    const std::string path = fRig.StartFile();
+    const std::string other = fRig.fRoot.Write("other.conf", "12345\n");
+    const auto write = [&] { std::ofstream(path) << "12345\n"; };
+    struct
+    {
+        const char* fName;
+        std::function<void()> fPut;
+        const char* fReason; // null: the file is read
+        bool fNeedsRoot = false;
+    } const rows[] = {
+        {"our own", write, nullptr},
+        {"a pipe", [&] { ASSERT_EQ(0, ::mkfifo(path.c_str(), 0666)); }, "not a regular file"},
+        {"a directory", [&] { ASSERT_EQ(0, ::mkdir(path.c_str(), 0777)); }, "not a regular file"},
+        {"a link to a good file", [&] { ASSERT_EQ(0, ::symlink(other.c_str(), path.c_str())); }, "a symbolic link"},
+        {"a link to nothing", [&] { ASSERT_EQ(0, ::symlink("/none", path.c_str())); }, "a symbolic link"},
+        {"another user's file",
+         [&] {
+             write();
+             ASSERT_EQ(0, ::chown(path.c_str(), 1, 1));
+         },
+         "owned by another user", true},
+    };
     const auto ns = fRig.MakeNamespaceWithConsumer();
-    ASSERT_EQ(0, ::mkfifo(fRig.StartFile().c_str(), 0600));
-    ns->killResidualCimserver();
-    EXPECT_THAT(fRig.Abbreviate(fRig.fLog.Lines()), ElementsAre("3|Error opening START"));
-    EXPECT_THAT(fRig.fWorld.Traced("run"), IsEmpty());
+    fRig.fWorld.fRun = [](const TSpawnCall&, std::string& output) { output = "12345 ? 00:00:01 cimserver\n"; };
+    for (const auto& row : rows) {
+        if (row.fNeedsRoot && ::geteuid() != 0) {
+            continue;
+        }
+        SCOPED_TRACE(row.fName);
+        fRig.fLog.Take();
+        fRig.fWorld.Take();
+        ASSERT_NO_FATAL_FAILURE(row.fPut());
+        ns->killResidualCimserver();
+        std::filesystem::remove(path);
+        if (row.fReason) {
+            EXPECT_THAT(fRig.Abbreviate(fRig.fLog.Lines()),
+                        ElementsAre("3|Error opening START",
+                                    std::string("3|TPEGASUSNamespace::killResidualCimserver does not read START: ") +
+                                        row.fReason));
+            EXPECT_THAT(fRig.Abbreviate(fRig.fWorld.Trace()), ElementsAre("system " + RemovalOf("START", "-f")));
+        } else {
+            EXPECT_THAT(fRig.fWorld.Traced("kill"), ElementsAre("12345 9"));
+        }
+    }
+    fRig.fWorld.fRun = nullptr;
 }
 
 TEST_F(ServerProcessTest, CleanUpStopsKillsAndRemoves)
