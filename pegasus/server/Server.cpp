@@ -11,6 +11,7 @@
 #include "pegasus/server/net/PeerCheck.h"
 #include "pegasus/server/operations/Dispatcher.h"
 
+#include <memory>
 #include <mutex>
 #include <system_error>
 
@@ -140,7 +141,8 @@ std::vector<Acceptor::Source> listen(const Config& config, ConnectionGroup& remo
     std::vector<Acceptor::Source> sources;
     if (config.flag("enableHttpConnection")) {
         const auto port = static_cast<std::uint16_t>(config.number("httpPort"));
-        sources.push_back({listenOnLoopback(port), tcpPeerUser, &remote});
+        const auto lookup = std::make_shared<TcpPeerLookup>();
+        sources.push_back({listenOnLoopback(port), [lookup](int fd) { return lookup->userOf(fd); }, &remote});
         Log::write(Severity::kInformation, "Listening on 127.0.0.1:" + std::to_string(port) + ".");
     }
     sources.push_back({listenLocally(config.home()), localPeerUser, &local});

@@ -17,7 +17,7 @@ class Acceptor
     struct Source
     {
         Descriptor listener;
-        std::optional<uid_t> (*peerUser)(int fd);
+        std::function<std::optional<uid_t>(int fd)> peerUser; // nothing: unknown
         ConnectionGroup* group;
     };
 

@@ -1,7 +1,5 @@
 #include "pegasus/server/net/PeerCheck.h"
 
-#include "pegasus/base/Descriptor.h"
-
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
@@ -45,6 +43,15 @@ bool isLive(unsigned state, unsigned long inode)
     return inode != 0 && (state == TCP_ESTABLISHED || state == TCP_CLOSE_WAIT);
 }
 
+// Whether the accepted connection still is what its address pair was taken from.
+bool isStillOpen(int fd)
+{
+    tcp_info info = {};
+    socklen_t size = sizeof info;
+    return ::getsockopt(fd, IPPROTO_TCP, TCP_INFO, &info, &size) == 0 &&
+           (info.tcpi_state == TCP_ESTABLISHED || info.tcpi_state == TCP_CLOSE_WAIT);
+}
+
 struct DiagRequest
 {
     nlmsghdr header;
@@ -52,12 +59,13 @@ struct DiagRequest
 };
 
 // Asks for exactly one socket: the one whose source is our peer and whose destination is us.
-DiagRequest makeRequest(const AddressPair& pair)
+DiagRequest makeRequest(const AddressPair& pair, std::uint32_t sequence)
 {
     DiagRequest request = {};
     request.header.nlmsg_len = sizeof request;
     request.header.nlmsg_type = SOCK_DIAG_BY_FAMILY;
     request.header.nlmsg_flags = NLM_F_REQUEST;
+    request.header.nlmsg_seq = sequence;
     request.body.sdiag_family = AF_INET;
     request.body.sdiag_protocol = IPPROTO_TCP;
     request.body.idiag_states = ~0u;
@@ -70,21 +78,27 @@ DiagRequest makeRequest(const AddressPair& pair)
     return request;
 }
 
-bool isAbout(const inet_diag_msg& message, const AddressPair& pair)
+// An IPv6 socket that talks IPv4 reports the mapped address ::ffff:a.b.c.d.
+bool isAddress(const __be32 (&words)[4], int family, in_addr_t address)
 {
-    return message.idiag_family == AF_INET && message.id.idiag_sport == pair.peer.sin_port &&
-           message.id.idiag_dport == pair.own.sin_port && message.id.idiag_src[0] == pair.peer.sin_addr.s_addr &&
-           message.id.idiag_dst[0] == pair.own.sin_addr.s_addr;
+    return family == AF_INET    ? words[0] == address
+           : family == AF_INET6 ? words[0] == 0 && words[1] == 0 && words[2] == htonl(0xffff) && words[3] == address
+                                : false;
 }
 
+bool isAbout(const inet_diag_msg& message, const AddressPair& pair)
+{
+    return message.id.idiag_sport == pair.peer.sin_port && message.id.idiag_dport == pair.own.sin_port &&
+           isAddress(message.id.idiag_src, message.idiag_family, pair.peer.sin_addr.s_addr) &&
+           isAddress(message.id.idiag_dst, message.idiag_family, pair.own.sin_addr.s_addr);
+}
+
+// Returns: the owner in an answer; nothing when the answer is an error or is about a socket that is not live.
 std::optional<uid_t> readDiagAnswer(const char* data, std::size_t size, const AddressPair& pair)
 {
     nlmsghdr header = {};
-    if (size < NLMSG_HDRLEN + sizeof(inet_diag_msg)) {
-        return std::nullopt;
-    }
     std::memcpy(&header, data, sizeof header);
-    if (header.nlmsg_type != SOCK_DIAG_BY_FAMILY || header.nlmsg_len > size) {
+    if (header.nlmsg_type != SOCK_DIAG_BY_FAMILY || size < NLMSG_HDRLEN + sizeof(inet_diag_msg)) {
         return std::nullopt;
     }
     inet_diag_msg message = {};
@@ -93,6 +107,49 @@ std::optional<uid_t> readDiagAnswer(const char* data, std::size_t size, const Ad
         return std::nullopt;
     }
     return message.idiag_uid;
+}
+
+Descriptor openNetlink()
+{
+    Descriptor netlink(::socket(AF_NETLINK, SOCK_RAW | SOCK_CLOEXEC, NETLINK_SOCK_DIAG));
+    if (netlink) {
+        const timeval timeout = {1, 0};
+        ::setsockopt(netlink.get(), SOL_SOCKET, SO_RCVTIMEO, &timeout, sizeof timeout);
+    }
+    return netlink;
+}
+
+// Reads the answer to one request; answers to earlier ones, which came too late, are dropped.
+// Returns: its size; 0 when there is none.
+std::size_t receiveAnswer(const Descriptor& netlink, std::uint32_t sequence, char* answer, std::size_t capacity)
+{
+    for (;;) {
+        const ssize_t size = ::recv(netlink.get(), answer, capacity, 0);
+        if (size < 0 && errno == EINTR) {
+            continue;
+        }
+        nlmsghdr header = {};
+        if (size < static_cast<ssize_t>(sizeof header)) {
+            return 0;
+        }
+        std::memcpy(&header, answer, sizeof header);
+        if (header.nlmsg_seq == sequence) {
+            return header.nlmsg_len <= static_cast<std::size_t>(size) ? static_cast<std::size_t>(size) : 0;
+        }
+    }
+}
+
+// Whether the kernel has no such facility. ENOENT says that it has, and that there is no such socket.
+bool isUnsupported(const char* answer, std::size_t size)
+{
+    nlmsghdr header = {};
+    nlmsgerr error = {};
+    std::memcpy(&header, answer, sizeof header);
+    if (header.nlmsg_type != NLMSG_ERROR || size < NLMSG_HDRLEN + sizeof error.error) {
+        return false;
+    }
+    std::memcpy(&error.error, answer + NLMSG_HDRLEN, sizeof error.error);
+    return error.error != -ENOENT;
 }
 
 std::string hexAddress(const sockaddr_in& address)
@@ -104,28 +161,35 @@ std::string hexAddress(const sockaddr_in& address)
 
 } // namespace
 
-std::optional<uid_t> tcpPeerUserFromNetlink(int fd)
+TcpPeerLookup::Answer TcpPeerLookup::askKernel(int fd)
 {
     const std::optional<AddressPair> pair = addressesOf(fd);
-    const Descriptor netlink(::socket(AF_NETLINK, SOCK_RAW | SOCK_CLOEXEC, NETLINK_SOCK_DIAG));
-    if (!pair || !netlink) {
-        return std::nullopt;
+    if (!pair) {
+        return {true, std::nullopt};
     }
-    timeval patience = {1, 0};
-    ::setsockopt(netlink.get(), SOL_SOCKET, SO_RCVTIMEO, &patience, sizeof patience);
-    const DiagRequest request = makeRequest(*pair);
-    if (::send(netlink.get(), &request, sizeof request, 0) != static_cast<ssize_t>(sizeof request)) {
-        return std::nullopt;
+    if (!fNetlink) {
+        fNetlink = openNetlink();
     }
+    const DiagRequest request = makeRequest(*pair, ++fSequence);
     char answer[4096];
-    ssize_t size = -1;
-    do {
-        size = ::recv(netlink.get(), answer, sizeof answer, 0);
-    } while (size < 0 && errno == EINTR);
-    return size < 0 ? std::nullopt : readDiagAnswer(answer, static_cast<std::size_t>(size), *pair);
+    std::size_t size = 0;
+    if (fNetlink && ::send(fNetlink.get(), &request, sizeof request, 0) == static_cast<ssize_t>(sizeof request)) {
+        size = receiveAnswer(fNetlink, fSequence, answer, sizeof answer);
+    }
+    if (size == 0 || isUnsupported(answer, size)) {
+        fNetlink.reset();
+        return {};
+    }
+    const std::optional<uid_t> user = readDiagAnswer(answer, size, *pair);
+    return {true, isStillOpen(fd) ? user : std::nullopt};
 }
 
-std::optional<uid_t> tcpPeerUserFromTable(int fd, const std::string& table)
+std::optional<uid_t> TcpPeerLookup::userFromNetlink(int fd)
+{
+    return askKernel(fd).user;
+}
+
+std::optional<uid_t> TcpPeerLookup::userFromTable(int fd) const
 {
     const std::optional<AddressPair> pair = addressesOf(fd);
     if (!pair) {
@@ -133,7 +197,7 @@ std::optional<uid_t> tcpPeerUserFromTable(int fd, const std::string& table)
     }
     const std::string source = hexAddress(pair->peer);
     const std::string destination = hexAddress(pair->own);
-    std::ifstream lines(table);
+    std::ifstream lines(fTable);
     for (std::string line; std::getline(lines, line);) {
         char from[32];
         char to[32];
@@ -145,16 +209,16 @@ std::optional<uid_t> tcpPeerUserFromTable(int fd, const std::string& table)
                 5 &&
             source == from && destination == to)
         {
-            return isLive(state, inode) ? std::optional<uid_t>(uid) : std::nullopt;
+            return isLive(state, inode) && isStillOpen(fd) ? std::optional<uid_t>(uid) : std::nullopt;
         }
     }
     return std::nullopt;
 }
 
-std::optional<uid_t> tcpPeerUser(int fd)
+std::optional<uid_t> TcpPeerLookup::userOf(int fd)
 {
-    const std::optional<uid_t> user = tcpPeerUserFromNetlink(fd);
-    return user ? user : tcpPeerUserFromTable(fd);
+    const Answer answer = askKernel(fd);
+    return answer.known ? answer.user : userFromTable(fd);
 }
 
 std::optional<uid_t> localPeerUser(int fd)

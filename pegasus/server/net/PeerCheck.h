@@ -1,5 +1,8 @@
 #pragma once
 
+#include "pegasus/base/Descriptor.h"
+
+#include <cstdint>
 #include <optional>
 #include <string>
 
@@ -7,17 +10,42 @@
 
 namespace Pegasus::server {
 
-// Says who is at the other end of an accepted connection, by the kernel's word, before a byte is read from it.
+// Finds out whose process is at the other end of an accepted TCP connection, by the kernel's word, before a byte is
+// read from it.
 //
-// A loopback TCP peer is looked up as the socket whose own address pair is ours turned round: by NETLINK_SOCK_DIAG, or
-// in /proc/net/tcp where the kernel lacks that. It is believed only with a non-zero inode and in the state ESTABLISHED
-// or CLOSE_WAIT; a peer that has closed already is reported without its user, so it counts as unknown. Returns: the
-// peer's user id, or nothing when the kernel does not answer for it. Blocks: for one exchange with the kernel.
-std::optional<uid_t> tcpPeerUser(int fd);
-std::optional<uid_t> tcpPeerUserFromNetlink(int fd);
-std::optional<uid_t> tcpPeerUserFromTable(int fd, const std::string& table = "/proc/net/tcp");
+// The peer's socket is looked up by its address pair, through NETLINK_SOCK_DIAG, or in /proc/net/tcp where the kernel
+// lacks that. The kernel is believed only about a socket with a non-zero inode in the state ESTABLISHED or CLOSE_WAIT,
+// and only when the accepted connection is still open after the look-up: a peer that resets the connection frees its
+// port, and the pair may then belong to another user's new connection.
+//
+// Thread: one at a time.
+class TcpPeerLookup
+{
+  public:
+    // `table` is read where the kernel has no NETLINK_SOCK_DIAG.
+    explicit TcpPeerLookup(std::string table = "/proc/net/tcp") : fTable(std::move(table)) {}
 
-// The same for a connection on a Unix socket.
+    // Returns: the peer's user id; nothing when the kernel does not report an owner.
+    // Blocks: for one exchange with the kernel, at most 1 s.
+    std::optional<uid_t> userOf(int fd);
+    // The same from one source alone.
+    std::optional<uid_t> userFromNetlink(int fd);
+    std::optional<uid_t> userFromTable(int fd) const;
+
+  private:
+    struct Answer
+    {
+        bool known = false; // whether the kernel answered at all
+        std::optional<uid_t> user;
+    };
+    Answer askKernel(int fd);
+
+    std::string fTable;
+    Descriptor fNetlink; // kept open between look-ups
+    std::uint32_t fSequence = 0;
+};
+
+// Returns: the user at the other end of a Unix socket, as of its connect().
 std::optional<uid_t> localPeerUser(int fd);
 
 // The server's own user and root are served, nobody else.

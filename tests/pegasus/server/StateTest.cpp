@@ -1,10 +1,8 @@
-// What the server keeps and checks: configuration, files, peers, registrations.
+// What the server keeps and checks: configuration, files, registrations.
 #include "pegasus/server/admin/Config.h"
 #include "pegasus/server/admin/PrivateFile.h"
 #include "pegasus/server/admin/StartFile.h"
 #include "pegasus/server/admin/TreeLock.h"
-#include "pegasus/server/net/Listener.h"
-#include "pegasus/server/net/PeerCheck.h"
 #include "pegasus/server/operations/ProviderRegistry.h"
 #include "pegasus/server/operations/RegistrationChecks.h"
 
@@ -15,9 +13,6 @@
 #include <filesystem>
 #include <fstream>
 
-#include <arpa/inet.h>
-#include <netinet/in.h>
-#include <sys/socket.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -160,87 +155,6 @@ TEST_F(StateTest, oneLockATree)
     EXPECT_FALSE(second.acquire(fHome));
     first.release();
     EXPECT_TRUE(second.acquire(fHome));
-}
-
-// A loopback connection; `server` is the accepted end.
-struct Pair
-{
-    Descriptor client;
-    Descriptor server;
-
-    Pair()
-    {
-        const Descriptor listener = listenOnLoopback(0);
-        sockaddr_in address = {};
-        socklen_t size = sizeof address;
-        ::getsockname(listener.get(), reinterpret_cast<sockaddr*>(&address), &size);
-        client.reset(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0));
-        EXPECT_EQ(::connect(client.get(), reinterpret_cast<const sockaddr*>(&address), size), 0);
-        bool exhausted = false;
-        server = acceptConnection(listener, exhausted);
-    }
-
-    std::string line(const char* state, unsigned uid, unsigned inode) const
-    {
-        sockaddr_in own = {};
-        sockaddr_in peer = {};
-        socklen_t size = sizeof own;
-        ::getsockname(server.get(), reinterpret_cast<sockaddr*>(&own), &size);
-        ::getpeername(server.get(), reinterpret_cast<sockaddr*>(&peer), &size);
-        char text[200];
-        std::snprintf(
-            text, sizeof text, "   0: %08X:%04X %08X:%04X %s 00000000:00000000 00:00000000 00000000 %5u 0 %u 1\n",
-            peer.sin_addr.s_addr, ntohs(peer.sin_port), own.sin_addr.s_addr, ntohs(own.sin_port), state, uid, inode);
-        return text;
-    }
-};
-
-TEST_F(StateTest, theKernelSaysWhoThePeerIs)
-{
-    Pair pair;
-    EXPECT_EQ(tcpPeerUserFromNetlink(pair.server.get()), ::geteuid());
-    EXPECT_EQ(tcpPeerUserFromTable(pair.server.get()), ::geteuid());
-    EXPECT_EQ(tcpPeerUser(pair.server.get()), ::geteuid());
-    pair.client.reset(); // reported as nobody's from now on, which must not pass for root's
-    EXPECT_FALSE(tcpPeerUserFromNetlink(pair.server.get()));
-    EXPECT_FALSE(tcpPeerUserFromTable(pair.server.get()));
-}
-
-struct TableRow
-{
-    const char* name;
-    const char* state;
-    unsigned uid;
-    unsigned inode;
-    bool known;
-};
-
-TEST_F(StateTest, theTableIsReadUnderTheSameRule)
-{
-    const Pair pair;
-    const std::string table = fHome + "/tcp";
-    for (const TableRow& row : {TableRow{"established", "01", 1000, 7, true},
-                                {"close wait", "08", 1000, 7, true},
-                                {"no inode", "01", 0, 0, false},
-                                {"fin wait", "04", 1000, 7, false},
-                                {"time wait", "06", 0, 0, false}})
-    {
-        std::ofstream(table) << "  sl  local_address rem_address\n" << pair.line(row.state, row.uid, row.inode);
-        const std::optional<uid_t> user = tcpPeerUserFromTable(pair.server.get(), table);
-        EXPECT_EQ(user.has_value(), row.known) << row.name;
-        EXPECT_EQ(user.value_or(row.uid), row.uid) << row.name;
-    }
-    std::ofstream(table) << Pair().line("01", 1000, 7); // somebody else's connection
-    EXPECT_FALSE(tcpPeerUserFromTable(pair.server.get(), table));
-    EXPECT_FALSE(tcpPeerUserFromTable(pair.server.get(), fHome + "/missing"));
-}
-
-TEST(PeerTest, onlyRootAndTheServersUserMayConnect)
-{
-    EXPECT_TRUE(mayConnect(0));
-    EXPECT_TRUE(mayConnect(::geteuid()));
-    EXPECT_FALSE(mayConnect(::geteuid() + 4711));
-    EXPECT_FALSE(mayConnect(std::nullopt));
 }
 
 using Properties = std::vector<std::pair<const char*, CIMValue>>;
