@@ -14,21 +14,25 @@ Config::Config(const std::string& home) : fHome(home)
     }
 }
 
-const ConfigProperty& Config::require(const std::string& name, const std::string& value) const
+const ConfigProperty& requireConfigProperty(const std::string& name)
 {
     const ConfigProperty* property = findConfigProperty(name);
     if (property == nullptr) {
         throw ConfigError(ConfigError::Kind::kUnknownProperty, "Unrecognized config property: " + name);
     }
-    if (!isValidConfigValue(*property, value, fHome)) {
+    return *property;
+}
+
+void Config::requireValid(const std::string& name, const std::string& value) const
+{
+    if (!isValidConfigValue(requireConfigProperty(name), value, fHome)) {
         throw ConfigError(ConfigError::Kind::kInvalidValue, "Invalid property value: " + name + "=" + value);
     }
-    return *property;
 }
 
 void Config::setFromCommandLine(const std::string& name, const std::string& value)
 {
-    require(name, value);
+    requireValid(name, value);
     const std::lock_guard<std::mutex> lock(fMutex);
     fValues[name] = value;
     ++fGeneration;
@@ -36,11 +40,10 @@ void Config::setFromCommandLine(const std::string& name, const std::string& valu
 
 void Config::setCurrent(const std::string& name, const std::string& value)
 {
-    const ConfigProperty* property = findConfigProperty(name);
-    if (property != nullptr && !property->dynamic) {
+    if (!requireConfigProperty(name).dynamic) {
         throw ConfigError(ConfigError::Kind::kNotDynamic, "NonDynamic config property: " + name);
     }
-    require(name, value);
+    requireValid(name, value);
     const std::lock_guard<std::mutex> lock(fMutex);
     fValues[name] = value;
     ++fGeneration;
@@ -49,13 +52,12 @@ void Config::setCurrent(const std::string& name, const std::string& value)
 
 void Config::resetCurrent(const std::string& name)
 {
-    const ConfigProperty* property = findConfigProperty(name);
-    setCurrent(name, property != nullptr ? property->defaultValue : "");
+    setCurrent(name, requireConfigProperty(name).defaultValue);
 }
 
 void Config::setPlanned(const std::string& name, const std::string& value)
 {
-    require(name, value);
+    requireValid(name, value);
     const std::lock_guard<std::mutex> lock(fMutex);
     ConfigValues values = readConfigFile(plannedConfigPath(fHome));
     values[name] = value;
@@ -64,9 +66,7 @@ void Config::setPlanned(const std::string& name, const std::string& value)
 
 void Config::resetPlanned(const std::string& name)
 {
-    if (findConfigProperty(name) == nullptr) {
-        throw ConfigError(ConfigError::Kind::kUnknownProperty, "Unrecognized config property: " + name);
-    }
+    requireConfigProperty(name);
     const std::lock_guard<std::mutex> lock(fMutex);
     ConfigValues values = readConfigFile(plannedConfigPath(fHome));
     if (values.erase(name) != 0) {
@@ -87,9 +87,10 @@ void Config::saveLocked() const
 
 std::string Config::text(const std::string& name) const
 {
+    const ConfigProperty& property = requireConfigProperty(name);
     const std::lock_guard<std::mutex> lock(fMutex);
     const auto found = fValues.find(name);
-    return found != fValues.end() ? found->second : findConfigProperty(name)->defaultValue;
+    return found != fValues.end() ? found->second : property.defaultValue;
 }
 
 std::size_t Config::number(const std::string& name) const
@@ -109,9 +110,10 @@ std::vector<std::string> Config::directories(const std::string& name) const
 
 std::string Config::planned(const std::string& name) const
 {
+    const ConfigProperty& property = requireConfigProperty(name);
     const ConfigValues values = readConfigFile(plannedConfigPath(fHome));
     const auto found = values.find(name);
-    return found != values.end() ? found->second : findConfigProperty(name)->defaultValue;
+    return found != values.end() ? found->second : property.defaultValue;
 }
 
 } // namespace Pegasus::server

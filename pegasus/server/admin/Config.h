@@ -29,6 +29,9 @@ class ConfigError : public std::runtime_error
     Kind fKind;
 };
 
+// Throws: ConfigError when there is no such property.
+const ConfigProperty& requireConfigProperty(const std::string& name);
+
 // The configuration of a running server: the table's defaults, over them the planned file's values, over them the
 // command line's, over them what cimconfig sets while it runs.
 //
@@ -54,7 +57,7 @@ class Config
     // Writes the current file. Throws: std::system_error.
     void save() const;
 
-    // Requires: the property exists.
+    // Throws: ConfigError when there is no such property.
     std::string text(const std::string& name) const;
     bool flag(const std::string& name) const { return text(name) == "true"; }
     std::size_t number(const std::string& name) const;
@@ -64,11 +67,12 @@ class Config
     // Changes with every change of a current value: what was made from the values stays good as long as it is the same.
     unsigned generation() const { return fGeneration; }
 
-    // The planned value, or the default if none is planned. Reads the file: cimconfig may write it beside us.
+    // The planned value, or the default if none is planned. Reads the file: cimconfig may have changed it.
+    // Throws: ConfigError when there is no such property.
     std::string planned(const std::string& name) const;
 
   private:
-    const ConfigProperty& require(const std::string& name, const std::string& value) const;
+    void requireValid(const std::string& name, const std::string& value) const;
     void saveLocked() const;
 
     std::string fHome;

@@ -65,7 +65,7 @@ class ChannelThreads
     static void run(Descriptor channel, AgentHandler& handler)
     {
         SocketStream stream(std::move(channel));
-        Connection(stream, handler, settings, CimAnswer::Envelope::kBare).serve();
+        serveConnection(stream, handler, settings, CimAnswer::Envelope::kBare);
     }
 
     std::mutex fMutex;

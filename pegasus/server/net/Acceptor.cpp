@@ -17,15 +17,15 @@ constexpr int kRetryMs = 200; // out of descriptors, or refused connections to c
 } // namespace
 
 // Returns: false when it is time to stop. `ready` says which sources have a connection.
-bool Acceptor::waitForWork(bool listening, std::vector<bool>& ready)
+bool Acceptor::waitForWork(std::vector<bool>& ready)
 {
     std::vector<pollfd> waits = {{fStop, POLLIN, 0}};
-    if (listening) {
+    if (fListening) {
         for (const Source& source : fSources) {
             waits.push_back({source.listener.get(), POLLIN, 0});
         }
     }
-    const int timeout = listening && fRefused.empty() ? -1 : kRetryMs;
+    const int timeout = fListening && fRefused.empty() ? -1 : kRetryMs;
     const int count = ::poll(waits.data(), waits.size(), timeout);
     ready.assign(fSources.size(), false);
     if (count < 0) {
@@ -56,17 +56,38 @@ bool Acceptor::accept(Source& source)
     return true;
 }
 
+// Returns: whether it is time to stop, after at most kRetryMs. Needs no memory.
+bool Acceptor::waitForStop() const
+{
+    pollfd wait = {fStop, POLLIN, 0};
+    return ::poll(&wait, 1, kRetryMs) > 0;
+}
+
+// Returns: false when it is time to stop.
+bool Acceptor::serveReady()
+{
+    std::vector<bool> ready;
+    if (!waitForWork(ready)) {
+        return false;
+    }
+    fListening = true;
+    for (std::size_t i = 0; i < fSources.size(); ++i) {
+        if (ready[i] && !accept(fSources[i])) {
+            fListening = false;
+        }
+    }
+    fRefused.expire();
+    return true;
+}
+
 void Acceptor::run()
 {
-    bool listening = true;
-    for (std::vector<bool> ready; waitForWork(listening, ready);) {
-        listening = true;
-        for (std::size_t i = 0; i < fSources.size(); ++i) {
-            if (ready[i] && !accept(fSources[i])) {
-                listening = false;
-            }
+    for (bool stopped = false; !stopped;) {
+        try {
+            stopped = !serveReady();
+        } catch (const std::exception&) { // out of memory: this connection is dropped, the next ones wait a moment
+            stopped = waitForStop();
         }
-        fRefused.expire();
     }
     fSources.clear();
 }

@@ -31,7 +31,9 @@ class Acceptor
     void run();
 
   private:
-    bool waitForWork(bool listening, std::vector<bool>& ready);
+    bool waitForWork(std::vector<bool>& ready);
+    bool waitForStop() const;
+    bool serveReady();
     // Returns: false if there are no descriptors left.
     bool accept(Source& source);
 
@@ -39,6 +41,7 @@ class Acceptor
     int fStop;
     std::function<std::size_t()> fMaxConnections;
     RefusedConnections fRefused;
+    bool fListening = true; // false for a while when connections cannot be accepted
 };
 
 } // namespace Pegasus::server

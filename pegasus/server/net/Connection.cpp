@@ -46,29 +46,52 @@ void checkMethod(const HttpRequest& http)
     throw HttpError(400, HttpError::After::kClose);
 }
 
-} // namespace
-
-Connection::Connection(SocketStream& stream, RequestHandler& handler, std::function<ConnectionSettings()> settings,
-                       CimAnswer::Envelope envelope)
-    : fStream(stream), fHandler(handler), fMakeSettings(std::move(settings)), fSettings(fMakeSettings()),
-      fEnvelope(envelope), fReader(stream), fDecoder(xmlLimits(fSettings))
-{
-}
-
-void Connection::serve()
+// Logs the exception that ended a connection. Requires: called in a handler.
+void logEnd() noexcept
 try {
-    while (serveNext()) {
+    try {
+        throw;
+    } catch (const std::system_error& error) { // the peer has gone: nobody is left to answer
+        Log::write(Severity::kDebug, std::string("connection ended: ") + error.what());
+    } catch (const SocketTimeout& error) {
+        Log::write(Severity::kWarning, std::string("connection closed: ") + error.what());
+    } catch (const std::exception& error) {
+        Log::write(Severity::kError, std::string("connection closed: ") + error.what());
+    } catch (const Exception& error) {
+        Log::write(Severity::kError, "connection closed: " + std::string(error.getMessage().getCString()));
+    } catch (...) {
+        Log::write(Severity::kError, "connection closed: an unknown exception");
     }
-} catch (const std::system_error& error) { // the peer has gone: nobody is left to tell
-    Log::write(Severity::kDebug, std::string("connection ended: ") + error.what());
-} catch (const SocketTimeout& error) {
-    Log::write(Severity::kWarning, std::string("connection closed: ") + error.what());
-} catch (const std::exception& error) {
-    Log::write(Severity::kError, std::string("connection closed: ") + error.what());
+} catch (...) { // no memory left for the line
 }
 
-// Returns: whether the connection can carry another request.
-bool Connection::serveNext()
+class RequestLoop
+{
+  public:
+    RequestLoop(SocketStream& stream, RequestHandler& handler, const std::function<ConnectionSettings()>& settings,
+                CimAnswer::Envelope envelope)
+        : fStream(stream), fHandler(handler), fMakeSettings(settings), fSettings(settings()), fEnvelope(envelope),
+          fReader(stream), fDecoder(xmlLimits(fSettings))
+    {
+    }
+
+    // Returns: whether the connection can carry another request.
+    bool serveNext();
+
+  private:
+    void answer(const HttpRequest& http);
+    void run(const HttpRequest& http, const CimRequest& request, CimAnswer& answer);
+
+    SocketStream& fStream;
+    RequestHandler& fHandler;
+    const std::function<ConnectionSettings()>& fMakeSettings;
+    ConnectionSettings fSettings;
+    CimAnswer::Envelope fEnvelope;
+    HttpRequestReader fReader;
+    RequestDecoder fDecoder;
+};
+
+bool RequestLoop::serveNext()
 try {
     fSettings = fMakeSettings();
     HttpRequest http;
@@ -88,7 +111,7 @@ try {
     return !error.closes();
 }
 
-void Connection::answer(const HttpRequest& http)
+void RequestLoop::answer(const HttpRequest& http)
 {
     const CimRequest request = fDecoder.decode(http);
     AnswerStream stream(fStream, answerOptions(http, fSettings));
@@ -108,7 +131,7 @@ void Connection::answer(const HttpRequest& http)
     }
 }
 
-void Connection::run(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)
+void RequestLoop::run(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)
 try {
     fHandler.handle(http, request, answer);
     answer.finish();
@@ -124,6 +147,18 @@ try {
     answer.fail(makeStatus(CIM_ERR_FAILED, std::string(error.getMessage().getCString())));
 } catch (const std::bad_alloc&) {
     answer.fail(makeStatus(CIM_ERR_SERVER_LIMITS_EXCEEDED, "The server is out of memory"));
+}
+
+} // namespace
+
+void serveConnection(SocketStream& stream, RequestHandler& handler, const std::function<ConnectionSettings()>& settings,
+                     CimAnswer::Envelope envelope) noexcept
+try {
+    RequestLoop loop(stream, handler, settings, envelope);
+    while (loop.serveNext()) {
+    }
+} catch (...) {
+    logEnd();
 }
 
 } // namespace Pegasus::server

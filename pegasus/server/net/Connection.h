@@ -31,28 +31,11 @@ class RequestHandler
     virtual bool knowsMethod(const CimRequest& request) const = 0;
 };
 
-// Serves the requests of one connection, one after the other, until the peer closes or breaks the protocol.
-class Connection
-{
-  public:
-    Connection(SocketStream& stream, RequestHandler& handler, std::function<ConnectionSettings()> settings,
-               CimAnswer::Envelope envelope);
-
-    // Blocks: until the connection ends. Throws nothing that a peer could cause.
-    void serve();
-
-  private:
-    bool serveNext();
-    void answer(const HttpRequest& http);
-    void run(const HttpRequest& http, const CimRequest& request, CimAnswer& answer);
-
-    SocketStream& fStream;
-    RequestHandler& fHandler;
-    std::function<ConnectionSettings()> fMakeSettings;
-    ConnectionSettings fSettings;
-    CimAnswer::Envelope fEnvelope;
-    HttpRequestReader fReader;
-    RequestDecoder fDecoder;
-};
+// Serves the requests of one connection, one after the other, until the peer closes or breaks the protocol. This is the
+// boundary of a connection's thread: whatever is thrown below it is logged and ends the connection, never the process.
+// Requires: stream and handler outlive the call.
+// Blocks: until the connection ends.
+void serveConnection(SocketStream& stream, RequestHandler& handler, const std::function<ConnectionSettings()>& settings,
+                     CimAnswer::Envelope envelope) noexcept;
 
 } // namespace Pegasus::server

@@ -19,7 +19,7 @@ bool ConnectionGroup::serve(Descriptor& socket, std::size_t most)
     try {
         // The thread waits for the lock before it looks at the stream.
         std::thread([this, raw = stream.get()] { run(*raw); }).detach();
-    } catch (const std::system_error& error) {
+    } catch (const std::exception& error) {
         fStreams.erase(entry);
         Log::write(Severity::kError, std::string("cannot start a thread for a connection: ") + error.what());
         return false;
@@ -34,7 +34,7 @@ void ConnectionGroup::run(SocketStream& stream)
         const std::lock_guard<std::mutex> lock(fMutex); // until serve() has put the socket in
     }
     const std::unique_ptr<SocketStream> owner(&stream);
-    Connection(stream, fHandler, fSettings, CimAnswer::Envelope::kMessage).serve();
+    serveConnection(stream, fHandler, fSettings, CimAnswer::Envelope::kMessage);
     const std::lock_guard<std::mutex> lock(fMutex);
     fStreams.erase(&stream);
     fChanged.notify_all();

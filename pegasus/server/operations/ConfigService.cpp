@@ -79,6 +79,7 @@ std::string keyOf(const CIMObjectPath& path)
 
 void update(Config& config, const CimRequest& request, const std::string& name)
 {
+    requireConfigProperty(name); // also when the call asks for no change
     const bool reset = flagArgument(request, "ResetValue");
     const std::string value(argument(request, "PropertyValue").toString().getCString());
     const bool current = flagArgument(request, "SetCurrentValue");

@@ -1,13 +1,17 @@
 // The HTTP layer without a server: bytes in, bytes out.
+#include "pegasus/server/net/Acceptor.h"
 #include "pegasus/server/net/AnswerStream.h"
 #include "pegasus/server/net/CimAnswer.h"
 #include "pegasus/server/net/HttpRequestReader.h"
+#include "pegasus/server/net/Listener.h"
 #include "pegasus/server/net/Utf8Check.h"
 
 #include <gtest/gtest.h>
 
 #include <thread>
 
+#include <netinet/in.h>
+#include <sys/eventfd.h>
 #include <sys/socket.h>
 
 namespace Pegasus::server {
@@ -159,6 +163,84 @@ TEST(SocketStreamTest, waitsForASlowReaderOnlySoLong)
     EXPECT_THROW(stream.writeAll(&part, 1, std::chrono::milliseconds(50)), SocketTimeout);
     char byte;
     EXPECT_THROW(stream.readSome(&byte, 1, deadlineAfter(std::chrono::milliseconds(20))), SocketTimeout);
+}
+
+class FaultyHandler : public RequestHandler
+{
+  public:
+    void handle(const HttpRequest&, const CimRequest&, CimAnswer&) override { throw 42; }
+    bool knowsMethod(const CimRequest&) const override { return true; }
+};
+
+// The other end of a connection that a group serves.
+Descriptor connectionOf(ConnectionGroup& group)
+{
+    int ends[2];
+    EXPECT_EQ(::socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, ends), 0);
+    Descriptor served(ends[0]);
+    EXPECT_TRUE(group.serve(served, 10));
+    return Descriptor(ends[1]);
+}
+
+// What a connection's thread throws must end that connection, and nothing but it.
+TEST(ConnectionGroupTest, anExceptionEndsOnlyItsConnection)
+{
+    FaultyHandler handler;
+    const std::string body =
+        "<?xml version=\"1.0\"?>\n<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"><MESSAGE ID=\"1\" "
+        "PROTOCOLVERSION=\"1.0\"><SIMPLEREQ><IMETHODCALL NAME=\"GetClass\"><LOCALNAMESPACEPATH>"
+        "<NAMESPACE NAME=\"root\"/></LOCALNAMESPACEPATH></IMETHODCALL></SIMPLEREQ></MESSAGE></CIM>";
+    const std::string request = "POST / HTTP/1.1\r\nHost: x\r\nContent-Type: text/xml; charset=utf-8\r\n"
+                                "CIMOperation: MethodCall\r\nCIMMethod: GetClass\r\nCIMObject: root\r\n"
+                                "Content-Length: " +
+                                std::to_string(body.size()) + "\r\n\r\n" + body;
+    const std::pair<const char*, std::function<ConnectionSettings()>> rows[] = {
+        {"no memory for a new connection", []() -> ConnectionSettings { throw std::bad_alloc(); }},
+        {"an exception of the CIM library", []() -> ConnectionSettings { throw Exception(String("x")); }},
+        {"something else, from a request", [] { return ConnectionSettings(); }}};
+    for (const auto& [name, settings] : rows) {
+        SCOPED_TRACE(name);
+        ConnectionGroup group(handler, settings);
+        const Descriptor client = connectionOf(group);
+        ::send(client.get(), request.data(), request.size(), MSG_NOSIGNAL); // fails when it is closed already
+        char byte;
+        EXPECT_LE(::recv(client.get(), &byte, 1, 0), 0);
+        EXPECT_TRUE(group.waitForEnd(deadlineAfter(std::chrono::seconds(10))));
+    }
+}
+
+// The thread that accepts connections is the server's own.
+TEST(AcceptorTest, outlivesAConnectionThatCannotBeServed)
+{
+    FaultyHandler handler;
+    ConnectionGroup group(handler, [] { return ConnectionSettings(); });
+    Descriptor listener = listenOnLoopback(0);
+    sockaddr_in address = {};
+    socklen_t size = sizeof address;
+    ASSERT_EQ(::getsockname(listener.get(), reinterpret_cast<sockaddr*>(&address), &size), 0);
+    std::vector<Acceptor::Source> sources;
+    sources.push_back({std::move(listener), [](int) { return ::geteuid(); }, &group});
+    const Descriptor stop(::eventfd(0, EFD_CLOEXEC));
+    bool first = true;
+    Acceptor acceptor(std::move(sources), stop.get(), [&]() -> std::size_t {
+        if (std::exchange(first, false)) {
+            throw std::bad_alloc();
+        }
+        return 10;
+    });
+    std::thread thread([&] { acceptor.run(); });
+    for (const char* expected : {"", "HTTP/1.1 404 Not Found"}) {
+        const Descriptor client(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0));
+        EXPECT_EQ(::connect(client.get(), reinterpret_cast<const sockaddr*>(&address), size), 0);
+        ::send(client.get(), "GET / HTTP/1.0\r\n\r\n", 18, MSG_NOSIGNAL);
+        char answer[22];
+        const ssize_t n = ::recv(client.get(), answer, sizeof answer, MSG_WAITALL);
+        EXPECT_EQ(std::string(answer, static_cast<std::size_t>(std::max<ssize_t>(n, 0))), expected);
+    }
+    ::eventfd_write(stop.get(), 1);
+    thread.join();
+    group.breakAll();
+    EXPECT_TRUE(group.waitForEnd(deadlineAfter(std::chrono::seconds(10))));
 }
 
 struct Utf8Row

@@ -258,6 +258,33 @@ TEST_F(ProtocolTest, unknownAndUnsupportedOperations)
     }
 }
 
+// A configuration property that does not exist is refused, whatever the call asks to do with it.
+TEST_F(ProtocolTest, anUnknownConfigurationPropertyIsNotFound)
+{
+    fgTree->compileBase();
+    for (const std::string flags : {"", "<PARAMVALUE NAME=\"SetCurrentValue\"><VALUE>TRUE</VALUE></PARAMVALUE>",
+                                    "<PARAMVALUE NAME=\"SetPlannedValue\"><VALUE>TRUE</VALUE></PARAMVALUE>",
+                                    "<PARAMVALUE NAME=\"ResetValue\"><VALUE>TRUE</VALUE></PARAMVALUE>"})
+    {
+        SCOPED_TRACE(flags);
+        const std::string body =
+            "<?xml version=\"1.0\" encoding=\"utf-8\" ?>\n<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"><MESSAGE ID=\"7\" "
+            "PROTOCOLVERSION=\"1.0\"><SIMPLEREQ><METHODCALL NAME=\"UpdatePropertyValue\"><LOCALINSTANCEPATH>"
+            "<LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"PG_Internal\"/></LOCALNAMESPACEPATH>"
+            "<INSTANCENAME CLASSNAME=\"PG_ConfigSetting\"><KEYBINDING NAME=\"PropertyName\"><KEYVALUE "
+            "VALUETYPE=\"string\">nosuch</KEYVALUE></KEYBINDING></INSTANCENAME></LOCALINSTANCEPATH>" +
+            flags + "</METHODCALL></SIMPLEREQ></MESSAGE></CIM>";
+        const HttpAnswer answer = exchange(
+            fgTree->port(), post(kOperation + "CIMMethod: UpdatePropertyValue\r\nCIMObject: "
+                                              "root%2FPG_Internal%3APG_ConfigSetting.PropertyName%3D%22nosuch%22\r\n",
+                                 body));
+        EXPECT_NE(answer.body.find("<ERROR CODE=\"6\" DESCRIPTION=\"CIM_ERR_NOT_FOUND: Configuration property "
+                                   "&quot;nosuch&quot;\"/>"),
+                  std::string::npos)
+            << answer.statusLine << header(answer, "pgerrordetail") << answer.body;
+    }
+}
+
 // Runs `action` as another user. Returns: its exit status.
 template <typename Action> int asNobody(const Action& action)
 {

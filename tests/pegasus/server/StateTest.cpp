@@ -93,6 +93,8 @@ TEST_F(StateTest, plannedValuesRuleTheNextStartAndCurrentOnesThisRun)
         EXPECT_THROW(config.setCurrent("httpPort", "80"), ConfigError);
         EXPECT_THROW(config.setCurrent("maxConnections", "0"), ConfigError);
         EXPECT_THROW(config.setPlanned("nope", "0"), ConfigError);
+        EXPECT_THROW(config.text("nope"), ConfigError);
+        EXPECT_THROW(config.planned("nope"), ConfigError);
         EXPECT_EQ(readConfigFile(currentConfigPath(fHome)).at("maxConnections"), "5");
     }
     Config config(fHome);
