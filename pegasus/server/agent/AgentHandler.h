@@ -1,6 +1,6 @@
 #pragma once
 
-#include "pegasus/cmpi/ProviderModule.h"
+#include "pegasus/cmpi/module/ProviderModule.h"
 #include "pegasus/server/net/Connection.h"
 
 #include <memory>

@@ -1,6 +1,6 @@
 #include "pegasus/server/agent/AgentPool.h"
 
-#include "pegasus/cmpi/ProviderModule.h"
+#include "pegasus/cmpi/module/ProviderLibrary.h"
 #include "pegasus/server/admin/Log.h"
 #include "pegasus/server/agent/AgentMessages.h"
 

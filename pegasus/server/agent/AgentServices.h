@@ -1,6 +1,6 @@
 #pragma once
 
-#include "pegasus/cmpi/BrokerServices.h"
+#include "pegasus/cmpi/services/BrokerServices.h"
 
 #include <Pegasus/Client/CIMClient.h>
 

@@ -1,3 +1,4 @@
+#include "pegasus/cmpi/module/ProviderLibrary.h"
 #include "tests/pegasus/cmpi/MofServices.h"
 
 #include <Pegasus/Common/CIMProperty.h>

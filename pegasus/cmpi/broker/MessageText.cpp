@@ -1,0 +1,69 @@
+#include "pegasus/cmpi/broker/MessageText.h"
+
+#include <vector>
+
+namespace Pegasus::cmpi {
+namespace {
+
+constexpr CMPICount kMaxArguments = 10; // one digit names each
+
+std::string textOf(const char* text)
+{
+    return text == nullptr ? std::string() : std::string(text);
+}
+
+std::string nextArgument(va_list args)
+{
+    const int type = va_arg(args, int);
+    switch (type) {
+    case CMPI_sint8:
+    case CMPI_sint16:
+    case CMPI_sint32:
+        return std::to_string(va_arg(args, int));
+    case CMPI_uint8:
+    case CMPI_uint16:
+    case CMPI_uint32:
+        return std::to_string(va_arg(args, unsigned int));
+    case CMPI_boolean:
+        return va_arg(args, int) != 0 ? "true" : "false";
+    case CMPI_sint64:
+        return std::to_string(va_arg(args, CMPISint64));
+    case CMPI_uint64:
+        return std::to_string(va_arg(args, CMPIUint64));
+    case CMPI_real32:
+    case CMPI_real64:
+        return std::to_string(va_arg(args, double));
+    case CMPI_chars:
+        return textOf(va_arg(args, const char*));
+    case CMPI_string: {
+        const CMPIString* string = va_arg(args, const CMPIString*);
+        return string == nullptr ? std::string() : textOf(static_cast<const char*>(string->hdl));
+    }
+    default: // unknown, but every other kind is passed as a pointer
+        va_arg(args, const void*);
+        return {};
+    }
+}
+
+} // namespace
+
+std::string formatMessage(const char* text, CMPICount count, va_list args)
+{
+    std::vector<std::string> arguments;
+    for (CMPICount i = 0; i < count && i < kMaxArguments; ++i) {
+        arguments.push_back(nextArgument(args));
+    }
+
+    std::string result;
+    for (const char* at = text; at != nullptr && *at != '\0'; ++at) {
+        const bool isPlace = at[0] == '$' && at[1] >= '0' && at[1] <= '9';
+        if (isPlace && static_cast<std::size_t>(at[1] - '0') < arguments.size()) {
+            result += arguments[static_cast<std::size_t>(*++at - '0')];
+        } else {
+            result += *at;
+        }
+    }
+    return result;
+}
+
+} // namespace Pegasus::cmpi

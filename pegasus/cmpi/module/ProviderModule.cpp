@@ -1,0 +1,215 @@
+#include "pegasus/cmpi/module/ProviderModule.h"
+
+#include "pegasus/cmpi/broker/BrokerTables.h"
+#include "pegasus/cmpi/module/ProviderInterfaces.h"
+#include "pegasus/cmpi/module/ProviderLibrary.h"
+#include "pegasus/cmpi/module/VendorCall.h"
+#include "pegasus/cmpi/objects/ArgsObject.h"
+#include "pegasus/cmpi/objects/ContextObject.h"
+#include "pegasus/cmpi/objects/ObjectPathObject.h"
+#include "pegasus/cmpi/objects/ResultObject.h"
+#include "pegasus/cmpi/services/ProviderText.h"
+
+#include <Pegasus/Common/Exception.h>
+
+#include <optional>
+
+namespace Pegasus::cmpi {
+namespace {
+
+// CMPI's own codes have no meaning for a client.
+CIMStatusCode statusCodeOf(CMPIrc code)
+{
+    const bool isCim =
+        (code >= CMPI_RC_ERR_FAILED && code <= CMPI_RC_ERR_METHOD_NOT_FOUND) || (code >= 20 && code <= 29);
+    return isCim ? static_cast<CIMStatusCode>(code) : CIM_ERR_FAILED;
+}
+
+// Requires: the frame of the call that returned the status is still open, since it owns the message.
+void throwUnlessOk(const CMPIStatus& status)
+{
+    if (status.rc == CMPI_RC_OK) {
+        return;
+    }
+    const bool hasText = status.msg != nullptr && status.msg->hdl != nullptr;
+    throw CIMException(statusCodeOf(status.rc),
+                       hasText ? fromUtf8(static_cast<const char*>(status.msg->hdl)) : String::EMPTY);
+}
+
+CIMException notServed(const ProviderRequest& request, CIMStatusCode code, const char* slot)
+{
+    return {code, fromUtf8(("provider " + request.provider + " does not implement " + slot).c_str())};
+}
+
+template <typename Object> Object& asArgument(Object& object)
+{
+    object.lifetime = Lifetime::kArgument;
+    return object;
+}
+
+} // namespace
+
+class ProviderModule::Impl
+{
+  public:
+    Impl(std::string moduleName, const std::string& path, BrokerServices& services)
+        : name(std::move(moduleName)), broker(services, brokerTables()), library(path), interfaces(library, broker)
+    {
+    }
+
+    std::string name;
+    Broker broker; // declared before the library, which keeps its address until it is unloaded
+    ProviderLibrary library;
+    ProviderInterfaces interfaces;
+};
+
+namespace {
+
+// One call into a provider: its frame, its arguments and its result.
+class Call
+{
+  public:
+    Call(Broker& owner, ProviderInterfaces& interfaces, const ProviderRequest& request, const CIMObjectPath& target,
+         ResultObject& resultObject)
+        : fUse(interfaces), fContext(owner, request), fPath(owner, placed(target, request.nameSpace)),
+          fResult(resultObject)
+    {
+        owner.classes().beginRequest();
+        asArgument(fContext);
+        asArgument(fPath);
+    }
+
+    const CMPIContext* context() const { return &fContext; }
+    const CMPIObjectPath* path() const { return &fPath; }
+    const CMPIResult* result() const { return &fResult; }
+
+    // Runs the provider's function.
+    // Throws: the sink's exception, which takes precedence over the provider's status; else that status unless OK.
+    template <typename Function, typename... Arguments> void run(Function* function, Arguments... arguments) const
+    {
+        const CMPIStatus status =
+            callVendor([&] { return function(arguments...); },
+                       [](const char* reason) { throw CIMException(CIM_ERR_FAILED, fromUtf8(reason)); });
+        fResult.rethrow();
+        throwUnlessOk(status);
+    }
+
+  private:
+    static CIMObjectPath placed(CIMObjectPath path, const CIMNamespaceName& nameSpace)
+    {
+        path.setNameSpace(nameSpace);
+        return path;
+    }
+
+    ProviderInterfaces::Use fUse;
+    Frame fFrame;
+    ContextObject fContext;
+    ObjectPathObject fPath;
+    ResultObject& fResult;
+};
+
+CIMObjectPath classPath(const CIMName& className)
+{
+    return {String::EMPTY, CIMNamespaceName(), className};
+}
+
+} // namespace
+
+ProviderModule::ProviderModule(const std::string& moduleName, const std::string& libraryPath, BrokerServices& services)
+    : fImpl(std::make_unique<Impl>(moduleName, libraryPath, services))
+{
+}
+
+ProviderModule::~ProviderModule() = default;
+
+const std::string& ProviderModule::name() const
+{
+    return fImpl->name;
+}
+
+void ProviderModule::enumerateInstances(const ProviderRequest& request, const CIMName& className,
+                                        const CIMPropertyList& properties, const InstanceSink& sink)
+{
+    PropertyFilter filter(properties);
+    ResultObject result(filter, sink, nullptr, nullptr);
+    const Call call(fImpl->broker, fImpl->interfaces, request, classPath(className), result);
+    CMPIInstanceMI& mi = fImpl->interfaces.instance(request.provider);
+    if (mi.ft->enumerateInstances == nullptr) {
+        throw notServed(request, CIM_ERR_NOT_SUPPORTED, "enumerateInstances");
+    }
+    call.run(mi.ft->enumerateInstances, &mi, call.context(), call.result(), call.path(), filter.names());
+}
+
+void ProviderModule::enumerateInstanceNames(const ProviderRequest& request, const CIMName& className,
+                                            const PathSink& sink)
+{
+    const PropertyFilter filter;
+    ResultObject result(filter, nullptr, sink, nullptr);
+    const Call call(fImpl->broker, fImpl->interfaces, request, classPath(className), result);
+    CMPIInstanceMI& mi = fImpl->interfaces.instance(request.provider);
+    if (mi.ft->enumerateInstanceNames == nullptr) {
+        throw notServed(request, CIM_ERR_NOT_SUPPORTED, "enumerateInstanceNames");
+    }
+    call.run(mi.ft->enumerateInstanceNames, &mi, call.context(), call.result(), call.path());
+}
+
+CIMInstance ProviderModule::getInstance(const ProviderRequest& request, const CIMObjectPath& path,
+                                        const CIMPropertyList& properties)
+{
+    std::optional<CIMInstance> found;
+    const auto takeOne = [&found](const CIMInstance& instance) {
+        if (found) {
+            throw CmpiError{CMPI_RC_ERR_FAILED, "getInstance returns one instance"};
+        }
+        found = instance;
+    };
+    PropertyFilter filter(properties);
+    ResultObject result(filter, takeOne, nullptr, nullptr);
+    const Call call(fImpl->broker, fImpl->interfaces, request, path, result);
+    CMPIInstanceMI& mi = fImpl->interfaces.instance(request.provider);
+    if (mi.ft->getInstance == nullptr) {
+        throw notServed(request, CIM_ERR_NOT_SUPPORTED, "getInstance");
+    }
+    call.run(mi.ft->getInstance, &mi, call.context(), call.result(), call.path(), filter.names());
+    if (!found) {
+        throw CIMException(CIM_ERR_NOT_FOUND, path.toString());
+    }
+    return *found;
+}
+
+CIMValue ProviderModule::invokeMethod(const ProviderRequest& request, const CIMObjectPath& path, const CIMName& method,
+                                      const Array<CIMParamValue>& in, Array<CIMParamValue>& out)
+{
+    CIMValue returned;
+    bool hasReturned = false;
+    const auto take = [&](const CIMValue& value) {
+        returned = value;
+        hasReturned = true;
+    };
+    const PropertyFilter filter;
+    ResultObject result(filter, nullptr, nullptr, take);
+    const Call call(fImpl->broker, fImpl->interfaces, request, path, result);
+    ArgsObject input(fImpl->broker, in);
+    ArgsObject output(fImpl->broker);
+    asArgument(input);
+    asArgument(output);
+    CMPIMethodMI& mi = fImpl->interfaces.method(request.provider);
+    if (mi.ft->invokeMethod == nullptr) {
+        throw notServed(request, CIM_ERR_METHOD_NOT_AVAILABLE, "invokeMethod");
+    }
+    const std::string name = utf8(method);
+    call.run(mi.ft->invokeMethod, &mi, call.context(), call.result(), call.path(), name.c_str(),
+             static_cast<const CMPIArgs*>(&input), static_cast<CMPIArgs*>(&output));
+    if (!hasReturned || returned.isNull()) {
+        throw CIMException(CIM_ERR_FAILED, String("The object is not initialized."));
+    }
+    out = output.parameters();
+    return returned;
+}
+
+ProviderModule::Cleanup ProviderModule::cleanupWhenIdle()
+{
+    return fImpl->interfaces.cleanupWhenIdle();
+}
+
+} // namespace Pegasus::cmpi

@@ -1,0 +1,71 @@
+#pragma once
+
+#include "pegasus/cmpi/services/BrokerServices.h"
+#include "pegasus/cmpi/services/ProviderRequest.h"
+
+#include <memory>
+#include <string>
+
+namespace Pegasus::cmpi {
+
+// One vendor library and the providers in it, driven through CMPI.
+//
+// The constructor loads the library. A provider's instance or method interface is made at its first request and kept.
+// The paths of delivered instances, and delivered paths, carry class and keys, without host and namespace.
+//
+// Throws: CIMException with the provider's status code and text; CMPI's own codes become CIM_ERR_FAILED. Also
+//     CIM_ERR_FAILED: "ProviderLoadFailure: ..." when the library has no entry points for the provider, and
+//     "ProviderInitFailure: ..." when its factory fails (the next request tries again).
+// Thread: every member except the destructor may be called on several threads at once. The provider runs on the
+//     caller's thread.
+// Blocks: as long as the provider.
+class ProviderModule
+{
+  public:
+    enum class Cleanup
+    {
+        kReleased,   // every interface has ended; a later request makes new ones
+        kBusy,       // a request is running: ask again later
+        kStayLoaded, // a provider asked to stay for now: ask again later
+        kNeverUnload // a provider asked to stay until the end: do not ask again
+    };
+
+    // Requires: `services` outlives the module.
+    // Throws: CIM_ERR_FAILED "ProviderLoadFailure: (<path>) Cannot load library, error: <the loader's message>".
+    ProviderModule(const std::string& moduleName, const std::string& libraryPath, BrokerServices& services);
+
+    // Ends the interfaces by cleanup(terminating), whatever they answer, then unloads the library.
+    // Requires: no request is running.
+    ~ProviderModule();
+
+    ProviderModule(const ProviderModule&) = delete;
+    ProviderModule& operator=(const ProviderModule&) = delete;
+
+    const std::string& name() const;
+
+    // Passes every instance to the sink as soon as the provider returns it, with the listed properties only. The
+    // provider may still fail after that. An exception of the sink ends the enumeration: the provider's further
+    // instances are refused, and the exception leaves after the provider has returned.
+    // The provider sees one class. For a superclass's properties of subclass instances, the caller passes them as list.
+    void enumerateInstances(const ProviderRequest& request, const CIMName& className, const CIMPropertyList& properties,
+                            const InstanceSink& sink);
+    void enumerateInstanceNames(const ProviderRequest& request, const CIMName& className, const PathSink& sink);
+
+    // Throws: CIM_ERR_NOT_FOUND also when the provider returns nothing.
+    CIMInstance getInstance(const ProviderRequest& request, const CIMObjectPath& path,
+                            const CIMPropertyList& properties);
+
+    // Replaces `out`.
+    // Throws: CIM_ERR_FAILED also when the provider returns no value, or a null.
+    CIMValue invokeMethod(const ProviderRequest& request, const CIMObjectPath& path, const CIMName& method,
+                          const Array<CIMParamValue>& in, Array<CIMParamValue>& out);
+
+    // Asks the interfaces of an idle module to clean up and ends those that agree.
+    Cleanup cleanupWhenIdle();
+
+  private:
+    class Impl;
+    std::unique_ptr<Impl> fImpl;
+};
+
+} // namespace Pegasus::cmpi

@@ -1,0 +1,39 @@
+#pragma once
+
+#include "pegasus/cmpi/objects/ValueCodec.h"
+
+#include <vector>
+
+namespace Pegasus::cmpi {
+
+// A CMPIArray. Its size is fixed; its elements are null until they are set.
+class ArrayObject final : public Owned, public CMPIArray
+{
+  public:
+    // `type` with or without the array bit.
+    // Throws: CMPI_RC_ERR_INVALID_DATA_TYPE; CMPI_RC_ERR_INVALID_PARAMETER for more elements than kMaxElements.
+    ArrayObject(Broker& broker, CMPICount size, CMPIType type);
+    ArrayObject(Broker& broker, CMPIType type, std::vector<CIMValue> elements);
+    ArrayObject(const ArrayObject& other) : ArrayObject(other.fBroker, other.fType, other.fElements) {}
+
+    CMPIType elementType() const { return fType; }
+    const std::vector<CIMValue>& elements() const { return fElements; }
+
+    // Throws: CMPI_RC_ERR_NO_SUCH_PROPERTY beyond the size.
+    CMPIData at(CMPICount index) const;
+    // Throws: also CMPI_RC_ERR_TYPE_MISMATCH.
+    void set(CMPICount index, const CMPIValue* value, CMPIType type);
+
+    Lifetime lifetime = Lifetime::kFrame;
+
+  private:
+    void requireIndex(CMPICount index) const;
+
+    Broker& fBroker;
+    CMPIType fType; // of one element, as the provider named it
+    std::vector<CIMValue> fElements;
+};
+
+extern const CMPIArrayFT kArrayTable;
+
+} // namespace Pegasus::cmpi

@@ -1,0 +1,32 @@
+#pragma once
+
+#include "pegasus/cmpi/objects/TableFunction.h"
+
+#include <Pegasus/Common/CIMDateTime.h>
+
+namespace Pegasus::cmpi {
+
+// A CMPIDateTime. Its binary form is in microseconds: since 1970, or the length of an interval.
+class DateTimeObject final : public Owned, public CMPIDateTime
+{
+  public:
+    explicit DateTimeObject(const CIMDateTime& value);
+    DateTimeObject(const DateTimeObject& other) : DateTimeObject(other.fValue) {}
+
+    const CIMDateTime& value() const { return fValue; }
+
+    Lifetime lifetime = Lifetime::kFrame;
+
+  private:
+    CIMDateTime fValue;
+};
+
+extern const CMPIDateTimeFT kDateTimeTable;
+
+// Throws: CMPI_RC_ERR_INVALID_PARAMETER for a time that CIM cannot express.
+CIMDateTime dateTimeFromBinary(CMPIUint64 microseconds, bool isInterval);
+
+// Throws: CMPI_RC_ERR_INVALID_PARAMETER for a text that is not a CIM datetime.
+CIMDateTime dateTimeFromText(const char* text);
+
+} // namespace Pegasus::cmpi

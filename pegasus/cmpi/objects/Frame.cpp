@@ -1,0 +1,73 @@
+#include "pegasus/cmpi/objects/Frame.h"
+
+namespace Pegasus::cmpi {
+namespace {
+
+thread_local Frame* tCurrent = nullptr;
+
+} // namespace
+
+void Owned::unlink()
+{
+    if (fNext == nullptr) {
+        return;
+    }
+    fPrevious->fNext = fNext;
+    fNext->fPrevious = fPrevious;
+    fPrevious = fNext = nullptr;
+}
+
+Frame::Frame() : fOuter(tCurrent)
+{
+    fObjects.fPrevious = fObjects.fNext = &fObjects;
+    tCurrent = this;
+}
+
+Frame::~Frame()
+{
+    // A provider may end its frames in any order; the end of an outer one has drained and closed this one already.
+    const bool wasOpen = isOpen(this);
+    for (; wasOpen && tCurrent != this; tCurrent = tCurrent->fOuter) {
+        tCurrent->drain();
+    }
+    drain();
+    if (wasOpen) {
+        tCurrent = fOuter;
+    }
+}
+
+Frame& Frame::current()
+{
+    if (tCurrent == nullptr) {
+        static thread_local Frame fgRoot;
+        tCurrent = &fgRoot;
+    }
+    return *tCurrent;
+}
+
+void Frame::adopt(Owned& object)
+{
+    object.fPrevious = &fObjects;
+    object.fNext = fObjects.fNext;
+    fObjects.fNext->fPrevious = &object;
+    fObjects.fNext = &object;
+}
+
+bool Frame::isOpen(const Frame* frame)
+{
+    for (const Frame* open = tCurrent; open != nullptr; open = open->fOuter) {
+        if (open == frame) {
+            return true;
+        }
+    }
+    return false;
+}
+
+void Frame::drain()
+{
+    while (fObjects.fNext != &fObjects) {
+        delete fObjects.fNext;
+    }
+}
+
+} // namespace Pegasus::cmpi

@@ -1,0 +1,77 @@
+#pragma once
+
+#include <utility>
+
+// Who frees what a provider holds, and when. CMPI lets a provider drop every object that the broker makes for it: the
+// broker frees them when the provider's function returns.
+//
+// - Before each call into a provider the broker opens a Frame on the calling thread. Objects that table functions make
+//   during the call (strings, paths, instances, memory blocks) enter the thread's current frame and are freed at its
+//   end, the newest first.
+// - The provider may release an object earlier; it leaves its frame then.
+// - A clone enters no frame: the provider frees it by release, at any time and on any thread.
+// - The arguments of a call (context, path, result, args) live on the broker's stack. A provider's release of them does
+//   nothing.
+// - A provider that loops over many objects may open a frame of its own by mark() and end it by release().
+// - A provider's own thread gets a frame by attachThread() and ends it by detachThread().
+namespace Pegasus::cmpi {
+
+// Base of everything that a frame can free.
+class Owned
+{
+  public:
+    Owned() = default;
+    Owned(const Owned&) = delete;
+    Owned& operator=(const Owned&) = delete;
+    virtual ~Owned() { unlink(); }
+
+    // Leaves the frame that holds it; does nothing when no frame does.
+    void unlink();
+
+  private:
+    friend class Frame;
+    Owned* fPrevious = nullptr; // the neighbours in the frame's ring; null outside of a frame
+    Owned* fNext = nullptr;
+};
+
+// The objects that a thread made since the frame was opened; its end frees those that the provider has not released.
+//
+// Frames of one thread nest as the calls do: an upcall that reaches another provider on this thread opens its own.
+// A thread always has a frame: on a provider's own thread that did not attach, objects live until the thread ends.
+//
+// Thread: a frame belongs to the thread that opened it. CMPI demands that providers do not share an object between
+//     threads except as a clone, so the ring needs no lock.
+class Frame
+{
+  public:
+    // Opens a frame, which becomes the current one.
+    Frame();
+    // Frees the frame's objects, the newest first, and those of frames that were opened later and not closed.
+    ~Frame();
+    Frame(const Frame&) = delete;
+    Frame& operator=(const Frame&) = delete;
+
+    // Returns: the calling thread's innermost open frame.
+    static Frame& current();
+
+    // Makes an object in this frame.
+    // Ownership: the frame's, until the object is deleted or unlinked.
+    template <typename Object, typename... Args> Object* make(Args&&... args)
+    {
+        auto* object = new Object(std::forward<Args>(args)...);
+        adopt(*object);
+        return object;
+    }
+    void adopt(Owned& object);
+
+    // Returns: true when `frame` is an open frame of this thread. For handles that come back from a provider.
+    static bool isOpen(const Frame* frame);
+
+  private:
+    void drain();
+
+    Owned fObjects; // fixed node of the ring; the newest object comes first
+    Frame* fOuter;
+};
+
+} // namespace Pegasus::cmpi

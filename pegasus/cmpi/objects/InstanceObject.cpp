@@ -1,0 +1,261 @@
+#include "pegasus/cmpi/objects/InstanceObject.h"
+
+#include "pegasus/cmpi/objects/Broker.h"
+#include "pegasus/cmpi/objects/KeyCodec.h"
+#include "pegasus/cmpi/objects/NamedValues.h"
+#include "pegasus/cmpi/services/PropertyFilter.h"
+#include "pegasus/cmpi/services/ProviderText.h"
+#include "pegasus/common/ObjectReps.h"
+
+#include <Pegasus/Common/CIMObject.h>
+#include <Pegasus/Common/CIMProperty.h>
+
+#include <utility>
+
+namespace Pegasus::cmpi {
+namespace {
+
+CIMObjectPath placed(const CIMInstance& instance, const CIMNamespaceName& nameSpace)
+{
+    CIMObjectPath path = instance.getPath();
+    path.setClassName(instance.getClassName());
+    if (!nameSpace.isNull()) {
+        path.setNameSpace(nameSpace);
+    }
+    return path;
+}
+
+bool accepts(const PropertySchema& property, const CIMValue& value)
+{
+    if (property.isArray != value.isArray()) {
+        return false;
+    }
+    const CIMType type = value.getType();
+    return type == property.type ||
+           (property.isEmbedded && (type == CIMTYPE_INSTANCE || type == CIMTYPE_OBJECT || type == CIMTYPE_STRING));
+}
+
+// CMPI has one type for embedded objects of either kind; the class says which kind its property has.
+CIMValue asDeclared(const PropertySchema& property, const CIMValue& value)
+{
+    if (!property.isEmbeddedObject || value.getType() != CIMTYPE_INSTANCE || value.isNull()) {
+        return value;
+    }
+    if (!value.isArray()) {
+        CIMInstance instance;
+        value.get(instance);
+        return CIMValue(CIMObject(instance));
+    }
+    Array<CIMInstance> instances;
+    value.get(instances);
+    Array<CIMObject> objects;
+    for (Uint32 i = 0; i < instances.size(); ++i) {
+        objects.append(CIMObject(instances[i]));
+    }
+    return CIMValue(objects);
+}
+
+CIMProperty propertyOf(const PropertySchema& declared, const CIMValue& value)
+{
+    const bool isReference = declared.type == CIMTYPE_REFERENCE && !declared.isArray;
+    return {declared.name, asDeclared(declared, value), 0, isReference ? declared.referenceClass : CIMName()};
+}
+
+} // namespace
+
+InstanceObject::InstanceObject(Broker& owner, const PathState& path)
+    : CMPIInstance{nullptr, &kInstanceTable}, broker(owner), fPath(path)
+{
+    hdl = this;
+    if (fPath.schema != nullptr) {
+        fPlaces.assign(fPath.schema->properties().size(), 0);
+    }
+    takeKeys();
+}
+
+InstanceObject::InstanceObject(Broker& owner, const CIMInstance& instance, const CIMNamespaceName& nameSpace)
+    : InstanceObject(owner, PathState(owner, placed(instance, nameSpace)))
+{
+    takeProperties(instance);
+}
+
+InstanceObject::InstanceObject(const InstanceObject& other)
+    : CMPIInstance{nullptr, &kInstanceTable}, broker(other.broker), fPath(other.fPath), fPlaces(other.fPlaces),
+      fSet(other.fSet), fExtra(other.fExtra)
+{
+    hdl = this;
+}
+
+void InstanceObject::takeKeys()
+{
+    for (const NamedValue& key : fPath.keys) {
+        const std::size_t at = fPath.schema ? fPath.schema->findKey(key.name) : ClassSchema::kNotFound;
+        if (at != ClassSchema::kNotFound) {
+            store(at, convertKey(key.value, fPath.schema->properties()[at].type));
+        } else if (fPath.schema == nullptr) {
+            storeExtra(key.name, key.value);
+        }
+    }
+}
+
+void InstanceObject::takeProperties(const CIMInstance& instance)
+{
+    for (Uint32 i = 0; i < instance.getPropertyCount(); ++i) {
+        const CIMConstProperty property = instance.getProperty(i);
+        if (fPath.schema == nullptr) {
+            storeExtra(property.getName(), property.getValue());
+            continue;
+        }
+        const std::size_t at = fPath.schema->find(utf8(property.getName()));
+        if (at != ClassSchema::kNotFound && accepts(fPath.schema->properties()[at], property.getValue())) {
+            store(at, property.getValue());
+        }
+    }
+}
+
+void InstanceObject::store(std::size_t index, CIMValue value)
+{
+    if (fPlaces[index] != 0) {
+        fSet[fPlaces[index] - 1U] = std::move(value);
+        return;
+    }
+    fSet.push_back(std::move(value));
+    fPlaces[index] = static_cast<std::uint16_t>(fSet.size());
+}
+
+void InstanceObject::storeExtra(const CIMName& name, CIMValue value)
+{
+    for (NamedValue& held : fExtra) {
+        if (held.name.equal(name)) {
+            held.value = std::move(value);
+            return;
+        }
+    }
+    fExtra.push_back({name, std::move(value)});
+}
+
+const CIMValue& InstanceObject::valueAt(std::size_t index) const
+{
+    return fPlaces[index] != 0 ? fSet[fPlaces[index] - 1U] : fPath.schema->properties()[index].initial;
+}
+
+CMPICount InstanceObject::propertyCount() const
+{
+    return static_cast<CMPICount>(fPath.schema ? fPlaces.size() : fExtra.size());
+}
+
+CMPIData InstanceObject::encode(std::size_t index) const
+{
+    const CIMValue& value = fPath.schema ? valueAt(index) : fExtra[index].value;
+    CMPIData data = encodeValue(broker, value);
+    if (fPath.schema != nullptr && fPath.schema->properties()[index].isKey) {
+        data.state = static_cast<CMPIValueState>(data.state | CMPI_keyValue);
+    }
+    return data;
+}
+
+CMPIData InstanceObject::property(const char* name) const
+{
+    requireText(name);
+    if (fPath.schema != nullptr) {
+        const std::size_t at = fPath.schema->find(name);
+        if (at != ClassSchema::kNotFound) {
+            return encode(at);
+        }
+    }
+    for (std::size_t i = 0; i < fExtra.size(); ++i) {
+        if (sameName(utf8(fExtra[i].name), name)) {
+            return encode(i);
+        }
+    }
+    throw CmpiError{CMPI_RC_ERR_NO_SUCH_PROPERTY, {}};
+}
+
+CMPIData InstanceObject::propertyAt(CMPICount index, CMPIString** name) const
+{
+    if (index >= propertyCount()) {
+        throw CmpiError{CMPI_RC_ERR_NO_SUCH_PROPERTY, {}};
+    }
+    if (name != nullptr) {
+        *name = makeName(fPath.schema ? fPath.schema->properties()[index].name : fExtra[index].name);
+    }
+    return encode(index);
+}
+
+void InstanceObject::setProperty(const char* name, const CMPIValue* value, CMPIType type)
+{
+    requireText(name);
+    if (fPath.schema == nullptr) {
+        storeExtra(requireName(name), decodeValue(value, type));
+        return;
+    }
+    const std::size_t at = fPath.schema->find(name);
+    if (at == ClassSchema::kNotFound) {
+        broker.warnOnce("setProperty: class " + fPath.schema->text() + " has no property " + name);
+        return;
+    }
+    const PropertySchema& declared = fPath.schema->properties()[at];
+    CIMValue decoded = type == CMPI_null ? CIMValue(declared.type, declared.isArray) : decodeValue(value, type);
+    if (!accepts(declared, decoded)) {
+        throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE,
+                        "property " + declared.text + " of " + fPath.schema->text() + " has another type"};
+    }
+    store(at, std::move(decoded));
+}
+
+PathState InstanceObject::completePath() const
+{
+    PathState path = fPath;
+    if (path.schema == nullptr) {
+        return path;
+    }
+    for (const std::size_t key : path.schema->keys()) {
+        const CIMValue& value = valueAt(key);
+        const CIMName& name = path.schema->properties()[key].name;
+        if (!value.isNull() && path.findKey(name) == nullptr) {
+            path.keys.push_back({name, value});
+        }
+    }
+    return path;
+}
+
+void InstanceObject::setPath(const PathState& path)
+{
+    if (!path.className.equal(fPath.className)) {
+        throw CmpiError{CMPI_RC_ERR_FAILED, "Incompatible ObjectPath"};
+    }
+    fPath.nameSpace = path.nameSpace;
+    fPath.host = path.host;
+    fPath.keys = path.keys;
+    takeKeys();
+}
+
+CIMInstance InstanceObject::filtered(const PropertyFilter& filter) const
+{
+    CIMInstance result(fPath.className);
+    // Appends without addProperty()'s search for the same name: the schema's names are different already.
+    Array<CIMProperty>& properties = ObjectAccess::rep(result).fProperties;
+    properties.reserveCapacity(static_cast<Uint32>(fSet.size() + fExtra.size()));
+    if (fPath.schema != nullptr) {
+        const auto& declared = fPath.schema->properties();
+        for (std::size_t i = 0; i < declared.size(); ++i) {
+            if ((fPlaces[i] != 0 || !declared[i].initial.isNull()) && filter.passes(*fPath.schema, i)) {
+                properties.append(propertyOf(declared[i], valueAt(i)));
+            }
+        }
+    }
+    for (const NamedValue& extra : fExtra) {
+        if (filter.passes(extra.name)) {
+            properties.append(CIMProperty(extra.name, extra.value));
+        }
+    }
+    result.setPath(completePath().withoutNameSpace());
+    return result;
+}
+
+CIMInstance InstanceObject::value() const
+{
+    return filtered(PropertyFilter());
+}
+
+} // namespace Pegasus::cmpi

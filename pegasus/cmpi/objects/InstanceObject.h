@@ -1,0 +1,65 @@
+#pragma once
+
+#include "pegasus/cmpi/objects/ObjectPathObject.h"
+
+#include <Pegasus/Common/CIMInstance.h>
+
+#include <cstdint>
+#include <vector>
+
+namespace Pegasus::cmpi {
+
+class PropertyFilter;
+
+// A CMPIInstance.
+//
+// An instance of a known class shows every declared property, with its default or null until it is set. It delivers the
+// properties that were set or have a default. An instance of an unknown class has the properties that were set.
+// Path and key properties are separate, as in CMPI: a key that is missing in the path is taken from the property when
+// the path is asked for.
+class InstanceObject final : public Owned, public CMPIInstance
+{
+  public:
+    // The path's keys become properties.
+    InstanceObject(Broker& owner, const PathState& path);
+    // An instance from the server. `nameSpace` is where its class is declared; null takes it from the instance's path.
+    InstanceObject(Broker& owner, const CIMInstance& instance, const CIMNamespaceName& nameSpace = CIMNamespaceName());
+    InstanceObject(const InstanceObject& other);
+
+    CMPICount propertyCount() const;
+    // Throws: CMPI_RC_ERR_NO_SUCH_PROPERTY.
+    CMPIData property(const char* name) const;
+    CMPIData propertyAt(CMPICount index, CMPIString** name) const;
+    // A property that the class lacks is dropped with a warning in the log: providers run against older schemas.
+    // Throws: CMPI_RC_ERR_INVALID_DATA_TYPE when the type is not the declared one.
+    void setProperty(const char* name, const CMPIValue* value, CMPIType type);
+
+    PathState completePath() const;
+    // Throws: CMPI_RC_ERR_FAILED when the class differs.
+    void setPath(const PathState& path);
+
+    // Returns: the instance for the wire: its path has no namespace, its properties are in the class's order.
+    CIMInstance filtered(const PropertyFilter& filter) const;
+    // Returns: the same with all properties, for embedding.
+    CIMInstance value() const;
+
+    Broker& broker;
+    Lifetime lifetime = Lifetime::kFrame;
+
+  private:
+    const CIMValue& valueAt(std::size_t index) const;
+    void store(std::size_t index, CIMValue value);
+    void storeExtra(const CIMName& name, CIMValue value);
+    void takeKeys();
+    void takeProperties(const CIMInstance& instance);
+    CMPIData encode(std::size_t index) const;
+
+    PathState fPath;
+    std::vector<std::uint16_t> fPlaces; // by declared property: 0 when not set, else its index in fSet, plus 1
+    std::vector<CIMValue> fSet;
+    std::vector<NamedValue> fExtra; // the properties, when the class is unknown
+};
+
+extern const CMPIInstanceFT kInstanceTable;
+
+} // namespace Pegasus::cmpi

@@ -1,0 +1,56 @@
+#include "pegasus/cmpi/objects/NamedValues.h"
+
+#include "pegasus/cmpi/objects/StringObject.h"
+#include "pegasus/cmpi/services/ProviderText.h"
+
+namespace Pegasus::cmpi {
+
+void NamedValues::set(const char* name, const CMPIValue* value, CMPIType type)
+{
+    const CIMName parsed = requireName(name);
+    CIMValue decoded = decodeValue(value, type);
+    for (NamedValue& held : fValues) {
+        if (held.name.equal(parsed)) {
+            held.value = decoded;
+            return;
+        }
+    }
+    append(parsed, decoded);
+}
+
+const CIMValue* NamedValues::find(std::string_view name) const
+{
+    for (const NamedValue& held : fValues) {
+        if (sameName(utf8(held.name), name)) {
+            return &held.value;
+        }
+    }
+    return nullptr;
+}
+
+CMPIData NamedValues::get(Broker& broker, const char* name) const
+{
+    const CIMValue* found = find(requireText(name));
+    if (found == nullptr) {
+        throw CmpiError{CMPI_RC_ERR_NO_SUCH_PROPERTY, {}};
+    }
+    return encodeValue(broker, *found);
+}
+
+CMPIData NamedValues::getAt(Broker& broker, CMPICount index, CMPIString** name) const
+{
+    if (index >= fValues.size()) {
+        throw CmpiError{CMPI_RC_ERR_NO_SUCH_PROPERTY, {}};
+    }
+    if (name != nullptr) {
+        *name = makeName(fValues[index].name);
+    }
+    return encodeValue(broker, fValues[index].value);
+}
+
+CMPIString* makeName(const CIMName& name)
+{
+    return Frame::current().make<StringObject>(utf8(name));
+}
+
+} // namespace Pegasus::cmpi

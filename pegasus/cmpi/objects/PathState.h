@@ -1,0 +1,46 @@
+#pragma once
+
+#include "pegasus/cmpi/objects/ValueCodec.h"
+#include "pegasus/cmpi/services/ClassSchema.h"
+
+#include <Pegasus/Common/CIMObjectPath.h>
+
+#include <string_view>
+#include <vector>
+
+namespace Pegasus::cmpi {
+
+// What a CMPIObjectPath and the path of a CMPIInstance hold: the parts of a path, its keys as typed values. The class
+// need not exist: providers make paths to classes of other servers.
+struct PathState
+{
+    // A null or empty text leaves that part unset.
+    // Throws: CMPI_RC_ERR_INVALID_PARAMETER for a text that is not a legal namespace or class name.
+    PathState(Broker& broker, const char* nameSpace, const char* className);
+    // Keys take the types that the class declares; those that do not fit, or of an unknown class, keep their own.
+    PathState(Broker& broker, const CIMObjectPath& path);
+
+    // Replaces the key of that name; a null value removes it.
+    // Throws: CMPI_RC_ERR_INVALID_DATA_TYPE for arrays, instances and untyped nulls; CMPI_RC_ERR_INVALID_PARAMETER when
+    //     the class is known and has no such key.
+    void addKey(const char* name, const CMPIValue* value, CMPIType type);
+    // Returns: the key of that name (case-insensitive), or null.
+    const NamedValue* findKey(std::string_view name) const;
+    const NamedValue* findKey(const CIMName& name) const;
+    // Looks the class up again, after its name or namespace changed.
+    void lookUp(Broker& broker);
+
+    CIMObjectPath withNameSpace() const;
+    CIMObjectPath withoutNameSpace() const; // nor host
+
+    const ClassSchema* schema = nullptr; // null: unknown class. The broker's cache owns it
+    CIMNamespaceName nameSpace;
+    String host;
+    CIMName className;
+    std::vector<NamedValue> keys; // in the order in which they were added
+
+  private:
+    Array<CIMKeyBinding> bindings() const;
+};
+
+} // namespace Pegasus::cmpi

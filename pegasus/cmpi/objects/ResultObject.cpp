@@ -1,0 +1,104 @@
+#include "pegasus/cmpi/objects/ResultObject.h"
+
+#include "pegasus/cmpi/objects/InstanceObject.h"
+#include "pegasus/cmpi/objects/ObjectPathObject.h"
+#include "pegasus/cmpi/objects/ValueCodec.h"
+
+#include <utility>
+
+namespace Pegasus::cmpi {
+namespace {
+
+CMPIResult* noClone(const CMPIResult*, CMPIStatus* rc)
+{
+    return answer(rc, static_cast<CMPIResult*>(nullptr), []() -> CMPIResult* {
+        throw CmpiError{CMPI_RC_ERR_NOT_SUPPORTED, {}};
+    });
+}
+
+CMPIStatus returnData(const CMPIResult* self, const CMPIValue* value, CMPIType type)
+{
+    return perform([&] { objectOf<ResultObject>(self).returnData(value, type); });
+}
+
+CMPIStatus returnInstance(const CMPIResult* self, const CMPIInstance* instance)
+{
+    return perform([&] { objectOf<ResultObject>(self).returnInstance(instance); });
+}
+
+CMPIStatus returnObjectPath(const CMPIResult* self, const CMPIObjectPath* path)
+{
+    return perform([&] { objectOf<ResultObject>(self).returnPath(path); });
+}
+
+CMPIStatus returnDone(const CMPIResult* self)
+{
+    return perform([&] { objectOf<ResultObject>(self).done(); });
+}
+
+CMPIStatus returnError(const CMPIResult*, const CMPIError*)
+{
+    return perform([] { throw CmpiError{CMPI_RC_ERR_NOT_SUPPORTED, {}}; });
+}
+
+} // namespace
+
+const CMPIResultFT kResultTable{kTableVersion,  releaseObject<ResultObject, CMPIResult>,
+                                noClone,        returnData,
+                                returnInstance, returnObjectPath,
+                                returnDone,     returnError};
+
+ResultObject::ResultObject(const PropertyFilter& filter, InstanceSink instances, PathSink paths, ReturnValueSink data)
+    : CMPIResult{nullptr, &kResultTable}, fFilter(filter), fInstances(std::move(instances)), fPaths(std::move(paths)),
+      fData(std::move(data))
+{
+    hdl = this;
+}
+
+template <typename Sink, typename Make> void ResultObject::deliver(const Sink& sink, Make&& make)
+{
+    if (!sink) {
+        throw CmpiError{CMPI_RC_ERR_NOT_SUPPORTED, "the operation does not return this kind of result"};
+    }
+    if (fDone || fFailure) {
+        throw CmpiError{CMPI_RC_ERR_FAILED, "the result is complete"};
+    }
+    const auto element = make();
+    try {
+        sink(element);
+    } catch (const CmpiError&) {
+        throw; // meant for the provider
+    } catch (...) {
+        fFailure = std::current_exception();
+        throw CmpiError{CMPI_RC_ERR_FAILED, "the result is no longer wanted"};
+    }
+}
+
+void ResultObject::returnInstance(const CMPIInstance* instance)
+{
+    deliver(fInstances, [&] { return objectOf<InstanceObject>(instance).filtered(fFilter); });
+}
+
+void ResultObject::returnPath(const CMPIObjectPath* path)
+{
+    deliver(fPaths, [&] { return objectOf<ObjectPathObject>(path).state.withoutNameSpace(); });
+}
+
+void ResultObject::returnData(const CMPIValue* value, CMPIType type)
+{
+    deliver(fData, [&] {
+        if (value == nullptr) {
+            throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, {}};
+        }
+        return decodeValue(value, type);
+    });
+}
+
+void ResultObject::rethrow() const
+{
+    if (fFailure) {
+        std::rethrow_exception(fFailure);
+    }
+}
+
+} // namespace Pegasus::cmpi

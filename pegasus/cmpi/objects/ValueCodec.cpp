@@ -1,0 +1,229 @@
+#include "pegasus/cmpi/objects/ValueCodec.h"
+
+#include "pegasus/cmpi/objects/ArrayElements.h"
+#include "pegasus/cmpi/objects/ArrayObject.h"
+#include "pegasus/cmpi/objects/Broker.h"
+#include "pegasus/cmpi/objects/DateTimeObject.h"
+#include "pegasus/cmpi/objects/InstanceObject.h"
+#include "pegasus/cmpi/objects/ObjectPathObject.h"
+#include "pegasus/cmpi/objects/StringObject.h"
+#include "pegasus/cmpi/services/ProviderText.h"
+
+#include <Pegasus/Common/CIMInstance.h>
+#include <Pegasus/Common/CIMObject.h>
+
+#include <array>
+#include <cstring>
+
+namespace Pegasus::cmpi {
+namespace {
+
+struct TypePair
+{
+    CIMType cim;
+    CMPIType cmpi;
+};
+
+constexpr std::array kTypes{
+    TypePair{CIMTYPE_BOOLEAN, CMPI_boolean}, TypePair{CIMTYPE_UINT8, CMPI_uint8},
+    TypePair{CIMTYPE_SINT8, CMPI_sint8},     TypePair{CIMTYPE_UINT16, CMPI_uint16},
+    TypePair{CIMTYPE_SINT16, CMPI_sint16},   TypePair{CIMTYPE_UINT32, CMPI_uint32},
+    TypePair{CIMTYPE_SINT32, CMPI_sint32},   TypePair{CIMTYPE_UINT64, CMPI_uint64},
+    TypePair{CIMTYPE_SINT64, CMPI_sint64},   TypePair{CIMTYPE_REAL32, CMPI_real32},
+    TypePair{CIMTYPE_REAL64, CMPI_real64},   TypePair{CIMTYPE_CHAR16, CMPI_char16},
+    TypePair{CIMTYPE_STRING, CMPI_string},   TypePair{CIMTYPE_DATETIME, CMPI_dateTime},
+    TypePair{CIMTYPE_REFERENCE, CMPI_ref},   TypePair{CIMTYPE_INSTANCE, CMPI_instance},
+    TypePair{CIMTYPE_OBJECT, CMPI_instance}, TypePair{CIMTYPE_STRING, CMPI_chars},
+    TypePair{CIMTYPE_STRING, CMPI_charsptr},
+};
+
+// The value's memory may end right after the type's own bytes, and need not be aligned for more.
+template <typename T> T read(const CMPIValue* value)
+{
+    T result;
+    std::memcpy(&result, value, sizeof(T)); // NOLINT(bugprone-sizeof-expression): pointers are meant too
+    return result;
+}
+
+template <typename Object, typename Face> CIMValue decodeObject(const CMPIValue* value, CIMType type)
+{
+    const Face* face = read<const Face*>(value);
+    return face == nullptr ? CIMValue(type, false) : CIMValue(objectOf<Object>(face).value());
+}
+
+CIMValue decodeString(const CMPIString* string)
+{
+    if (string == nullptr || string->hdl == nullptr) {
+        return {CIMTYPE_STRING, false};
+    }
+    return fromUtf8(static_cast<const char*>(string->hdl));
+}
+
+CIMValue decodeText(const char* text)
+{
+    return text == nullptr ? CIMValue(CIMTYPE_STRING, false) : CIMValue(fromUtf8(text));
+}
+
+CIMValue decodeArray(const CMPIArray* array, CMPIType type)
+{
+    if (array == nullptr) {
+        return {cimTypeOf(type), true};
+    }
+    const ArrayObject& object = objectOf<ArrayObject>(array);
+    if (cimTypeOf(object.elementType()) != cimTypeOf(type)) {
+        throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, {}};
+    }
+    return arrayOf(cimTypeOf(type), object.elements());
+}
+
+CIMValue decodeScalar(const CMPIValue* value, CMPIType type)
+{
+    switch (type) {
+    case CMPI_boolean:
+        return CIMValue(Boolean{read<CMPIBoolean>(value) != 0});
+    case CMPI_char16:
+        return CIMValue(Char16(read<CMPIChar16>(value)));
+    case CMPI_uint8:
+        return CIMValue(read<Uint8>(value));
+    case CMPI_uint16:
+        return CIMValue(read<Uint16>(value));
+    case CMPI_uint32:
+        return CIMValue(read<Uint32>(value));
+    case CMPI_uint64:
+        return CIMValue(read<Uint64>(value));
+    case CMPI_sint8:
+        return CIMValue(read<Sint8>(value));
+    case CMPI_sint16:
+        return CIMValue(read<Sint16>(value));
+    case CMPI_sint32:
+        return CIMValue(read<Sint32>(value));
+    case CMPI_sint64:
+        return CIMValue(read<Sint64>(value));
+    case CMPI_real32:
+        return CIMValue(read<Real32>(value));
+    case CMPI_real64:
+        return CIMValue(read<Real64>(value));
+    case CMPI_string:
+        return decodeString(read<const CMPIString*>(value));
+    case CMPI_chars:
+        return decodeText(reinterpret_cast<const char*>(value));
+    case CMPI_charsptr:
+        return decodeText(read<const char*>(value));
+    case CMPI_dateTime:
+        return decodeObject<DateTimeObject, CMPIDateTime>(value, CIMTYPE_DATETIME);
+    case CMPI_ref:
+        return decodeObject<ObjectPathObject, CMPIObjectPath>(value, CIMTYPE_REFERENCE);
+    case CMPI_instance:
+        return decodeObject<InstanceObject, CMPIInstance>(value, CIMTYPE_INSTANCE);
+    default:
+        throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, {}};
+    }
+}
+
+template <typename T> T valueOf(const CIMValue& value)
+{
+    T result{};
+    value.get(result);
+    return result;
+}
+
+template <typename T> CMPIData plainData(CMPIType type, T value)
+{
+    CMPIData data{type, CMPI_goodValue, {}};
+    std::memcpy(&data.value, &value, sizeof(T)); // NOLINT(bugprone-sizeof-expression): pointers are meant too
+    return data;
+}
+
+CMPIData encodeScalar(Broker& broker, const CIMValue& value)
+{
+    Frame& frame = Frame::current();
+    switch (value.getType()) {
+    case CIMTYPE_BOOLEAN:
+        return plainData<CMPIBoolean>(CMPI_boolean, valueOf<Boolean>(value) ? 1 : 0);
+    case CIMTYPE_UINT8:
+        return plainData<Uint8>(CMPI_uint8, valueOf<Uint8>(value));
+    case CIMTYPE_SINT8:
+        return plainData<Sint8>(CMPI_sint8, valueOf<Sint8>(value));
+    case CIMTYPE_UINT16:
+        return plainData<Uint16>(CMPI_uint16, valueOf<Uint16>(value));
+    case CIMTYPE_SINT16:
+        return plainData<Sint16>(CMPI_sint16, valueOf<Sint16>(value));
+    case CIMTYPE_UINT32:
+        return plainData<Uint32>(CMPI_uint32, valueOf<Uint32>(value));
+    case CIMTYPE_SINT32:
+        return plainData<Sint32>(CMPI_sint32, valueOf<Sint32>(value));
+    case CIMTYPE_UINT64:
+        return plainData<Uint64>(CMPI_uint64, valueOf<Uint64>(value));
+    case CIMTYPE_SINT64:
+        return plainData<Sint64>(CMPI_sint64, valueOf<Sint64>(value));
+    case CIMTYPE_REAL32:
+        return plainData<Real32>(CMPI_real32, valueOf<Real32>(value));
+    case CIMTYPE_REAL64:
+        return plainData<Real64>(CMPI_real64, valueOf<Real64>(value));
+    case CIMTYPE_CHAR16:
+        return plainData<CMPIChar16>(CMPI_char16, valueOf<Char16>(value));
+    case CIMTYPE_STRING:
+        return plainData<CMPIString*>(CMPI_string, frame.make<StringObject>(utf8(valueOf<String>(value))));
+    case CIMTYPE_DATETIME:
+        return plainData<CMPIDateTime*>(CMPI_dateTime, frame.make<DateTimeObject>(valueOf<CIMDateTime>(value)));
+    case CIMTYPE_REFERENCE:
+        return plainData<CMPIObjectPath*>(CMPI_ref,
+                                          frame.make<ObjectPathObject>(broker, valueOf<CIMObjectPath>(value)));
+    case CIMTYPE_INSTANCE:
+        return plainData<CMPIInstance*>(CMPI_instance, frame.make<InstanceObject>(broker, valueOf<CIMInstance>(value)));
+    case CIMTYPE_OBJECT:
+        return plainData<CMPIInstance*>(CMPI_instance,
+                                        frame.make<InstanceObject>(broker, CIMInstance(valueOf<CIMObject>(value))));
+    default:
+        throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, {}};
+    }
+}
+
+CMPIData encodeArray(Broker& broker, const CIMValue& value)
+{
+    const CMPIType type = cmpiTypeOf(value.getType(), true);
+    auto* array = Frame::current().make<ArrayObject>(broker, type, elementsOf(value));
+    return plainData<CMPIArray*>(type, array);
+}
+
+} // namespace
+
+CMPIType cmpiTypeOf(CIMType type, bool isArray)
+{
+    for (const TypePair& pair : kTypes) {
+        if (pair.cim == type) {
+            return static_cast<CMPIType>(isArray ? pair.cmpi | CMPI_ARRAY : pair.cmpi);
+        }
+    }
+    return CMPI_null;
+}
+
+CIMType cimTypeOf(CMPIType type)
+{
+    const auto simple = static_cast<CMPIType>(type & ~CMPI_ARRAY);
+    for (const TypePair& pair : kTypes) {
+        if (pair.cmpi == simple) {
+            return pair.cim;
+        }
+    }
+    throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, {}};
+}
+
+CIMValue decodeValue(const CMPIValue* value, CMPIType type)
+{
+    const bool isArray = (type & CMPI_ARRAY) != 0;
+    if (value == nullptr) {
+        return {cimTypeOf(type), isArray};
+    }
+    return isArray ? decodeArray(read<const CMPIArray*>(value), type) : decodeScalar(value, type);
+}
+
+CMPIData encodeValue(Broker& broker, const CIMValue& value)
+{
+    if (value.isNull()) {
+        return {cmpiTypeOf(value.getType(), value.isArray()), CMPI_nullValue, {}};
+    }
+    return value.isArray() ? encodeArray(broker, value) : encodeScalar(broker, value);
+}
+
+} // namespace Pegasus::cmpi

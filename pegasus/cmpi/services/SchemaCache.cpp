@@ -1,0 +1,75 @@
+#include "pegasus/cmpi/services/SchemaCache.h"
+
+#include "pegasus/cmpi/services/ProviderText.h"
+
+#include <Pegasus/Common/Exception.h>
+
+#include <mutex>
+
+namespace Pegasus::cmpi {
+namespace {
+
+std::string keyOf(std::string_view nameSpace, std::string_view className)
+{
+    std::string key;
+    key.reserve(nameSpace.size() + className.size() + 1);
+    key.append(nameSpace).append(1, ':').append(className);
+    for (char& c : key) {
+        if (c >= 'A' && c <= 'Z') {
+            c = static_cast<char>(c - 'A' + 'a');
+        }
+    }
+    return key;
+}
+
+} // namespace
+
+const ClassSchema* SchemaCache::find(std::string_view nameSpace, std::string_view className)
+{
+    const std::string key = keyOf(nameSpace, className);
+    std::uint64_t request = 0;
+    {
+        const std::shared_lock lock(fMutex);
+        request = fRequest;
+        const auto found = fEntries.find(key);
+        if (found != fEntries.end() && (found->second.schema || found->second.asked == request)) {
+            return found->second.schema.get();
+        }
+    }
+    std::unique_ptr<ClassSchema> loaded = load(nameSpace, className);
+
+    const std::unique_lock lock(fMutex);
+    Entry& entry = fEntries[key];
+    if (!entry.schema) { // else another thread was first, and its schema may be in use already
+        entry.schema = std::move(loaded);
+        entry.asked = request;
+    }
+    return entry.schema.get();
+}
+
+void SchemaCache::beginRequest()
+{
+    const std::unique_lock lock(fMutex);
+    ++fRequest;
+}
+
+std::unique_ptr<ClassSchema> SchemaCache::load(std::string_view nameSpace, std::string_view className)
+{
+    try {
+        const CIMClass found = fServices.getClass(CIMNamespaceName(fromUtf8(std::string(nameSpace).c_str())),
+                                                  CIMName(fromUtf8(std::string(className).c_str())));
+        return std::make_unique<ClassSchema>(found);
+    } catch (const CIMException& error) {
+        if (error.getCode() == CIM_ERR_NOT_FOUND || error.getCode() == CIM_ERR_INVALID_NAMESPACE) {
+            return nullptr;
+        }
+        fServices.log(BrokerServices::Severity::kWarning, "GetClass " + std::string(className) + " in " +
+                                                              std::string(nameSpace) + ": " + utf8(error.getMessage()));
+    } catch (const Exception& error) {
+        fServices.log(BrokerServices::Severity::kWarning, "GetClass " + std::string(className) + " in " +
+                                                              std::string(nameSpace) + ": " + utf8(error.getMessage()));
+    }
+    return nullptr;
+}
+
+} // namespace Pegasus::cmpi

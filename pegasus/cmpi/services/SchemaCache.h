@@ -1,0 +1,47 @@
+#pragma once
+
+#include "pegasus/cmpi/services/BrokerServices.h"
+#include "pegasus/cmpi/services/ClassSchema.h"
+
+#include <cstdint>
+#include <memory>
+#include <shared_mutex>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+
+namespace Pegasus::cmpi {
+
+// The classes that providers have named so far. Each is asked for once, since the server never changes or removes a
+// class. An unknown class is remembered as such until the next request, because it may have been compiled meanwhile.
+// Thread: all members may be called on any thread at any time.
+class SchemaCache
+{
+  public:
+    // Requires: `services` outlives the cache.
+    explicit SchemaCache(BrokerServices& services) : fServices(services) {}
+
+    // Returns: the class, or null when the server does not know it or fails to answer (the failure is logged).
+    // Ownership: the cache's; the class lives as long as the cache.
+    // Blocks: the first time, as long as BrokerServices::getClass.
+    const ClassSchema* find(std::string_view nameSpace, std::string_view className);
+
+    // Forgets which classes were unknown.
+    void beginRequest();
+
+  private:
+    struct Entry
+    {
+        std::unique_ptr<ClassSchema> schema; // null: unknown in request `asked`
+        std::uint64_t asked = 0;
+    };
+
+    std::unique_ptr<ClassSchema> load(std::string_view nameSpace, std::string_view className);
+
+    BrokerServices& fServices;
+    std::shared_mutex fMutex;                        // guards the next two; never held during an upcall
+    std::unordered_map<std::string, Entry> fEntries; // by "namespace:class" in lower case; entries are never removed
+    std::uint64_t fRequest = 0;                      // number of the current request
+};
+
+} // namespace Pegasus::cmpi
