@@ -248,7 +248,7 @@ void benchInstances(unsigned count, const char* how, const TSending& sending = T
 // What a client does that reads the whole answer before it decodes it.
 Array<CIMInstance> readThenDecode(client::Connection& connection, const std::string& request)
 {
-    const client::Deadline deadline(600000);
+    const auto deadline = base::Deadline::after(std::chrono::minutes(10));
     connection.send(request, deadline);
     std::string text;
     client::HttpResponse response(
@@ -284,7 +284,7 @@ void benchOverlap()
     address.port = peer.port();
     client::Connection connection;
     connection.setAddress(address);
-    connection.open(client::Deadline(10000));
+    connection.open(base::Deadline::after(std::chrono::seconds(10)));
     client::Request request = client::IntrinsicRequest("EnumerateInstances", kNameSpace, true).finish();
     const std::string message = client::encodeMessage(request, "1000", address.text(), {});
     TCost overlapped;

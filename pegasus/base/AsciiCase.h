@@ -1,20 +1,54 @@
 #pragma once
 
+#include <Pegasus/Common/Config.h>
+
 #include <algorithm>
+#include <string>
 #include <string_view>
 
-namespace Pegasus {
+// Case of ASCII letters, for CIM names and the words of protocols. All other bytes stay as they are. The process's
+// locale has no say: in some locales I and i are different letters.
+// Thread: any.
+namespace Pegasus::base {
 
-inline char lowerAscii(char c) noexcept
+constexpr bool isAsciiDigit(char c) noexcept
+{
+    return c >= '0' && c <= '9';
+}
+
+constexpr char lowerAscii(char c) noexcept
 {
     return c >= 'A' && c <= 'Z' ? static_cast<char>(c + ('a' - 'A')) : c;
 }
 
-// Words of protocols. The C library's comparison would follow the process's locale, where I and i may differ.
+constexpr Uint16 lowerAscii(Uint16 unit) noexcept
+{
+    return unit >= 'A' && unit <= 'Z' ? static_cast<Uint16>(unit + ('a' - 'A')) : unit;
+}
+
+constexpr bool isAsciiAlnum(char c) noexcept
+{
+    return isAsciiDigit(c) || (lowerAscii(c) >= 'a' && lowerAscii(c) <= 'z');
+}
+
+// Returns: the text in lower case. Texts that are equal without case have the same folded text.
+inline std::string foldCase(std::string text)
+{
+    for (char& c : text) {
+        c = lowerAscii(c);
+    }
+    return text;
+}
+
 inline bool equalNoCase(std::string_view x, std::string_view y) noexcept
 {
     return std::equal(x.begin(), x.end(), y.begin(), y.end(),
                       [](char a, char b) { return lowerAscii(a) == lowerAscii(b); });
 }
 
-} // namespace Pegasus
+inline bool startsWithNoCase(std::string_view text, std::string_view prefix) noexcept
+{
+    return equalNoCase(text.substr(0, prefix.size()), prefix);
+}
+
+} // namespace Pegasus::base

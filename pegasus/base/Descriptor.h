@@ -4,14 +4,14 @@
 
 #include <unistd.h>
 
-namespace Pegasus::server {
+namespace Pegasus::base {
 
-// Owns one file descriptor; -1 is none.
+// Owns one file descriptor and closes it in the end; -1 means none.
 class Descriptor
 {
   public:
     Descriptor() = default;
-    explicit Descriptor(int fd) : fFd(fd) {}
+    explicit Descriptor(int fd) noexcept : fFd(fd) {}
     Descriptor(Descriptor&& other) noexcept : fFd(std::exchange(other.fFd, -1)) {}
     Descriptor& operator=(Descriptor&& other) noexcept
     {
@@ -20,19 +20,19 @@ class Descriptor
     }
     ~Descriptor() { reset(); }
 
-    int get() const { return fFd; }
-    explicit operator bool() const { return fFd >= 0; }
-    int release() { return std::exchange(fFd, -1); }
-    void reset(int fd = -1)
-    {
-        if (fFd >= 0) {
-            ::close(fFd);
-        }
-        fFd = fd;
-    }
+    int get() const noexcept { return fFd; }
+    explicit operator bool() const noexcept { return fFd >= 0; }
+    // Ownership: passes to the caller.
+    int release() noexcept { return std::exchange(fFd, -1); }
+    // Closes what it owns, then owns `fd`. errno stays as it was, so that it may be read after a failed call.
+    void reset(int fd = -1) noexcept;
 
   private:
     int fFd = -1;
 };
 
-} // namespace Pegasus::server
+} // namespace Pegasus::base
+
+namespace Pegasus::server {
+using base::Descriptor;
+}

@@ -13,7 +13,7 @@
 #include <sys/un.h>
 #include <unistd.h>
 
-namespace Pegasus::wire {
+namespace Pegasus::base {
 
 const char* const kLocalSocketName = "cimxml.socket";
 
@@ -25,44 +25,19 @@ namespace {
                             std::string(operation) + " " + home + "/" + kLocalSocketName);
 }
 
-// A descriptor that is closed on the way out unless it was released.
-class Descriptor
+Descriptor openHome(const std::string& home)
 {
-  public:
-    explicit Descriptor(int fd) : fFd(fd) {}
-    ~Descriptor()
-    {
-        if (fFd >= 0) {
-            ::close(fFd);
-        }
-    }
-    Descriptor(const Descriptor&) = delete;
-    Descriptor& operator=(const Descriptor&) = delete;
-    int get() const { return fFd; }
-    int release()
-    {
-        const int fd = fFd;
-        fFd = -1;
-        return fd;
-    }
-
-  private:
-    int fFd;
-};
-
-int openHome(const std::string& home)
-{
-    const int fd = ::open(home.c_str(), O_PATH | O_DIRECTORY | O_CLOEXEC);
-    if (fd < 0) {
+    Descriptor fd(::open(home.c_str(), O_PATH | O_DIRECTORY | O_CLOEXEC));
+    if (!fd) {
         fail("cannot open the folder of", home);
     }
     return fd;
 }
 
-int newSocket(const std::string& home)
+Descriptor newSocket(const std::string& home)
 {
-    const int fd = ::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0);
-    if (fd < 0) {
+    Descriptor fd(::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0));
+    if (!fd) {
         fail("cannot create a socket for", home);
     }
     return fd;
@@ -93,22 +68,22 @@ std::string localSocketHome()
     return home ? home : "";
 }
 
-int connectLocalSocket(const std::string& home, int timeoutMs)
+Descriptor connectLocalSocket(const std::string& home, const Deadline& deadline)
 {
     const Descriptor folder(openHome(home));
     Descriptor socket(newSocket(home));
-    const int bound = std::max(timeoutMs, 1); // 0 would mean for ever
-    const timeval limit{bound / 1000, (bound % 1000) * 1000L};
-    if (::setsockopt(socket.get(), SOL_SOCKET, SO_SNDTIMEO, &limit, sizeof(limit)) < 0) {
+    const int timeoutMs = std::max(deadline.pollTimeoutMs(), 1); // the kernel reads 0 as for ever
+    const timeval limit{timeoutMs / 1000, (timeoutMs % 1000) * 1000L};
+    if (!deadline.isNever() && ::setsockopt(socket.get(), SOL_SOCKET, SO_SNDTIMEO, &limit, sizeof(limit)) < 0) {
         fail("cannot set the time-out of", home);
     }
     if (connectRetrying(socket.get(), addressIn(folder.get())) < 0) {
         fail("cannot connect to", home);
     }
-    return socket.release();
+    return socket;
 }
 
-int listenLocalSocket(const std::string& home, int backlog)
+Descriptor listenLocalSocket(const std::string& home, int backlog)
 {
     const Descriptor folder(openHome(home));
     Descriptor socket(newSocket(home));
@@ -126,7 +101,7 @@ int listenLocalSocket(const std::string& home, int backlog)
     if (::listen(socket.get(), backlog) < 0) {
         fail("cannot listen on", home);
     }
-    return socket.release();
+    return socket;
 }
 
 void removeLocalSocket(const std::string& home) noexcept
@@ -134,4 +109,4 @@ void removeLocalSocket(const std::string& home) noexcept
     ::unlink((home + "/" + kLocalSocketName).c_str());
 }
 
-} // namespace Pegasus::wire
+} // namespace Pegasus::base

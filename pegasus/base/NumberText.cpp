@@ -7,7 +7,7 @@
 #include <limits>
 #include <system_error>
 
-namespace Pegasus::number {
+namespace Pegasus::base {
 namespace {
 
 bool hasHexPrefix(std::string_view text)
@@ -15,15 +15,10 @@ bool hasHexPrefix(std::string_view text)
     return text.size() > 2 && text[0] == '0' && (text[1] == 'x' || text[1] == 'X');
 }
 
-bool isDigit(char c)
-{
-    return c >= '0' && c <= '9';
-}
-
 std::string_view takeDigits(std::string_view& text)
 {
     std::size_t count = 0;
-    while (count < text.size() && isDigit(text[count])) {
+    while (count < text.size() && isAsciiDigit(text[count])) {
         ++count;
     }
     const std::string_view digits = text.substr(0, count);
@@ -63,7 +58,7 @@ bool isRealShape(std::string_view text)
     return !takeDigits(text).empty() && text.empty();
 }
 
-template <class Real> std::optional<Real> parseNamed(std::string_view text)
+template <typename Real> std::optional<Real> parseNamed(std::string_view text)
 {
     if (equalNoCase(text, "nan")) {
         return std::numeric_limits<Real>::quiet_NaN();
@@ -86,7 +81,7 @@ bool isTiny(std::string_view text)
     return text.find_first_of("123456789") > text.find('.');
 }
 
-template <class Real> std::optional<Real> parseReal(std::string_view text)
+template <typename Real> std::optional<Real> parseReal(std::string_view text)
 {
     if (!isRealShape(text)) {
         return parseNamed<Real>(text);
@@ -162,4 +157,4 @@ std::string formatReal(Real64 value, int digits)
     return std::string(text, result.ptr);
 }
 
-} // namespace Pegasus::number
+} // namespace Pegasus::base

@@ -1,9 +1,10 @@
 #include "pegasus/base/Utf8.h"
 
+#include <algorithm>
 #include <cstdint>
 #include <cstring>
 
-namespace Pegasus::utf8 {
+namespace Pegasus::base {
 namespace {
 
 constexpr std::size_t kBlock = 8;
@@ -13,16 +14,18 @@ bool isContinuation(unsigned char byte)
     return (byte & 0xC0) == 0x80;
 }
 
+bool isAsciiBlock(const char* from) noexcept
+{
+    std::uint64_t block = 0;
+    std::memcpy(&block, from, kBlock);
+    return (block & 0x8080808080808080u) == 0;
+}
+
 // Copies whole blocks of ASCII, the common case. Returns: how many bytes.
 std::size_t copyAsciiBlocks(const char* from, std::size_t size, Char16* to) noexcept
 {
     std::size_t done = 0;
-    for (; size - done >= kBlock; done += kBlock) {
-        std::uint64_t block = 0;
-        std::memcpy(&block, from + done, kBlock);
-        if (block & 0x8080808080808080u) {
-            break;
-        }
+    for (; size - done >= kBlock && isAsciiBlock(from + done); done += kBlock) {
         for (std::size_t i = 0; i < kBlock; ++i) {
             to[done + i] = Char16(static_cast<unsigned char>(from[done + i]));
         }
@@ -33,10 +36,10 @@ std::size_t copyAsciiBlocks(const char* from, std::size_t size, Char16* to) noex
 struct Sequence
 {
     std::uint32_t code;
-    std::size_t length; // 0: not valid
+    std::size_t length; // 0 when it is not valid
 };
 
-// How many bytes a lead byte asks for; 0 for a byte that cannot lead.
+// Returns: how many bytes the sequence of this lead byte has; 0 for a byte that cannot lead.
 std::size_t lengthFromLead(unsigned char lead)
 {
     if (lead < 0x80) {
@@ -51,6 +54,7 @@ std::size_t lengthFromLead(unsigned char lead)
     return lead >= 0xF0 && lead <= 0xF4 ? 4 : 0;
 }
 
+// A surrogate counts as valid here.
 Sequence readSequence(const unsigned char* bytes, std::size_t available)
 {
     const std::size_t length = lengthFromLead(bytes[0]);
@@ -83,7 +87,79 @@ Char16* putCode(Char16* to, std::uint32_t code) noexcept
     return to;
 }
 
-void appendCode(std::string& out, std::uint32_t code)
+bool isHighSurrogate(std::uint32_t unit)
+{
+    return (unit & 0xFC00) == 0xD800;
+}
+
+bool isLowSurrogate(std::uint32_t unit)
+{
+    return (unit & 0xFC00) == 0xDC00;
+}
+
+// Returns: the length of the valid sequence at `at`, 0 when there is none.
+std::size_t validLength(std::string_view bytes, std::size_t at) noexcept
+{
+    const Sequence next = readSequence(reinterpret_cast<const unsigned char*>(bytes.data() + at), bytes.size() - at);
+    return (next.code & 0xFFFFF800u) == 0xD800 ? 0 : next.length;
+}
+
+} // namespace
+
+bool isUtf8(std::string_view bytes) noexcept
+{
+    std::size_t at = 0;
+    while (at < bytes.size()) {
+        if (bytes.size() - at >= kBlock && isAsciiBlock(bytes.data() + at)) {
+            at += kBlock;
+            continue;
+        }
+        const std::size_t length = validLength(bytes, at);
+        if (length == 0) {
+            return false;
+        }
+        at += length;
+    }
+    return true;
+}
+
+std::string repairedUtf8(std::string_view bytes)
+{
+    std::string out;
+    out.reserve(bytes.size());
+    for (std::size_t at = 0; at < bytes.size();) {
+        const std::size_t length = validLength(bytes, at);
+        if (length == 0) {
+            appendUtf8(out, 0xFFFD);
+        } else {
+            out.append(bytes.substr(at, length));
+        }
+        at += std::max<std::size_t>(length, 1);
+    }
+    return out;
+}
+
+Utf8DecodeResult decodeUtf8(const char* from, std::size_t size, Char16* to) noexcept
+{
+    std::size_t at = 0;
+    while (at < size) {
+        const std::size_t copied = copyAsciiBlocks(from + at, size - at, to);
+        at += copied;
+        to += copied;
+        // A block was not all ASCII: decode its bytes, one sequence at a time.
+        for (std::size_t i = 0; i < kBlock && at < size; ++i) {
+            const Sequence next = readSequence(reinterpret_cast<const unsigned char*>(from + at), size - at);
+            if (next.length == 0) {
+                return {to, from + at};
+            }
+            to = putCode(to, next.code);
+            at += next.length;
+        }
+    }
+    return {to, nullptr};
+}
+
+void appendUtf8(std::string& out, std::uint32_t code)
 {
     if (code < 0x80) {
         out.push_back(static_cast<char>(code));
@@ -103,39 +179,7 @@ void appendCode(std::string& out, std::uint32_t code)
     out.push_back(static_cast<char>(0x80 | (code & 0x3F)));
 }
 
-bool isHighSurrogate(std::uint32_t unit)
-{
-    return (unit & 0xFC00) == 0xD800;
-}
-
-bool isLowSurrogate(std::uint32_t unit)
-{
-    return (unit & 0xFC00) == 0xDC00;
-}
-
-} // namespace
-
-DecodeResult decode(const char* from, std::size_t size, Char16* to) noexcept
-{
-    std::size_t at = 0;
-    while (at < size) {
-        const std::size_t copied = copyAsciiBlocks(from + at, size - at, to);
-        at += copied;
-        to += copied;
-        // What stopped the blocks: a few more bytes, one sequence at a time.
-        for (std::size_t i = 0; i < kBlock && at < size; ++i) {
-            const Sequence next = readSequence(reinterpret_cast<const unsigned char*>(from + at), size - at);
-            if (next.length == 0) {
-                return {to, from + at};
-            }
-            to = putCode(to, next.code);
-            at += next.length;
-        }
-    }
-    return {to, nullptr};
-}
-
-void append(std::string& out, const Char16* units, std::size_t count)
+void appendUtf8(std::string& out, const Char16* units, std::size_t count)
 {
     out.reserve(out.size() + count);
     for (std::size_t i = 0; i < count; ++i) {
@@ -144,8 +188,8 @@ void append(std::string& out, const Char16* units, std::size_t count)
             code = 0x10000 + ((code - 0xD800) << 10) + (Uint16(units[i + 1]) - 0xDC00u);
             ++i;
         }
-        appendCode(out, code);
+        appendUtf8(out, code);
     }
 }
 
-} // namespace Pegasus::utf8
+} // namespace Pegasus::base

@@ -1,5 +1,5 @@
+#include "pegasus/base/Text.h"
 #include "pegasus/client/CIMClientRep.h"
-#include "pegasus/common/StringRep.h"
 
 #include <Pegasus/Client/CIMClient.h>
 
@@ -84,7 +84,7 @@ void CIMClient::connect(const String& host, const Uint32 portNumber, const Strin
         return connectLocal();
     }
     client::ServerAddress address;
-    address.host = host.size() > 0 ? StringAccess::toUtf8(host) : "localhost";
+    address.host = host.size() > 0 ? base::utf8(host) : "localhost";
     address.port = portNumber;
     fRep->connect(address);
 }

@@ -2,7 +2,8 @@
 
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/NumberText.h"
-#include "pegasus/common/StringRep.h"
+#include "pegasus/base/PercentCoding.h"
+#include "pegasus/base/Text.h"
 
 #include <Pegasus/Client/CIMClientException.h>
 
@@ -14,7 +15,7 @@
 namespace Pegasus {
 namespace {
 
-using client::Deadline;
+using base::Deadline;
 using client::HttpResponse;
 using client::ResponseFields;
 using client::ResponseReader;
@@ -33,7 +34,7 @@ std::string nextMessageId()
 String toString(std::string_view text)
 {
     try {
-        return StringAccess::fromUtf8(text);
+        return base::fromUtf8(text);
     } catch (const Exception&) {
         String result;
         for (const char c : text) {
@@ -77,21 +78,21 @@ std::string_view takeWord(std::string_view& text)
 bool isXmlInUtf8(std::string_view contentType)
 {
     const std::string_view type = takeWord(contentType);
-    return (equalNoCase(type, "application/xml") || equalNoCase(type, "text/xml")) && takeWord(contentType) == ";" &&
-           equalNoCase(takeWord(contentType), "charset") && takeWord(contentType) == "=" &&
-           equalNoCase(takeWord(contentType), "utf-8");
+    return (base::equalNoCase(type, "application/xml") || base::equalNoCase(type, "text/xml")) &&
+           takeWord(contentType) == ";" && base::equalNoCase(takeWord(contentType), "charset") &&
+           takeWord(contentType) == "=" && base::equalNoCase(takeWord(contentType), "utf-8");
 }
 
 void checkHeader(const ResponseFields& fields)
 {
     if (fields.status != 200) {
         throw CIMClientHTTPErrorException(fields.status, toString(fields.reason), toString(fields.cimError),
-                                          toString(client::percentDecoded(fields.errorDetail)));
+                                          toString(base::percentDecoded(fields.errorDetail)));
     }
     if (!fields.hasCimOperation) {
         throw CIMClientMalformedHTTPException("Missing CIMOperation HTTP header");
     }
-    if (!equalNoCase(fields.cimOperation, "MethodResponse")) {
+    if (!base::equalNoCase(fields.cimOperation, "MethodResponse")) {
         throw CIMClientMalformedHTTPException("Received CIMOperation HTTP header value \"" +
                                               toString(fields.cimOperation) + "\", expected \"MethodResponse\"");
     }
@@ -106,7 +107,7 @@ void checkStatusField(const ResponseFields& fields)
     if (!fields.hasStatusCode) {
         return;
     }
-    const auto code = number::parseUnsigned(fields.statusCode);
+    const auto code = base::parseUnsigned(fields.statusCode);
     if (!code || *code > 0xFFFF) {
         throw CIMClientMalformedHTTPException("Bad CIMStatusCode HTTP header; " + toString(fields.statusCode));
     }
@@ -114,7 +115,7 @@ void checkStatusField(const ResponseFields& fields)
         return;
     }
     const auto status = static_cast<CIMStatusCode>(*code);
-    const String description = toString(client::percentDecoded(fields.statusDescription));
+    const String description = toString(base::percentDecoded(fields.statusDescription));
     throw CIMException(status, description.size() > 0 ? description : String(cimStatusCodeToString(status)));
 }
 
@@ -132,7 +133,7 @@ void CIMClientRep::connect(const client::ServerAddress& address)
     if (fAddress) {
         throw AlreadyConnectedException();
     }
-    const Deadline deadline(fTimeoutMs);
+    const Deadline deadline = Deadline::after(std::chrono::milliseconds(fTimeoutMs));
     fConnection.setAddress(address);
     fConnection.open(deadline);
     fAddress = address;
@@ -167,7 +168,7 @@ void CIMClientRep::exchange(const client::Request& request, const ContentHandler
 
 void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHandler& onContent)
 {
-    const Deadline deadline(fTimeoutMs);
+    const Deadline deadline = Deadline::after(std::chrono::milliseconds(fTimeoutMs));
     if (fTimeoutMs == 0) {
         throw ConnectionTimeoutException();
     }

@@ -45,9 +45,8 @@ class CIMClientRep
     };
 
     void exchangeOnce(const client::Request& request, const ContentHandler& onContent);
-    Outcome sendAndReceive(const std::string& message, client::HttpResponse& response,
-                           const client::Deadline& deadline);
-    Outcome receive(client::HttpResponse& response, const client::Deadline& deadline);
+    Outcome sendAndReceive(const std::string& message, client::HttpResponse& response, const base::Deadline& deadline);
+    Outcome receive(client::HttpResponse& response, const base::Deadline& deadline);
 
     client::ClientLimits fLimits;
     wire::ElementDecoder fDecoder{fLimits.xml}; // kept, so that the names of all answers share their texts

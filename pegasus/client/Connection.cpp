@@ -19,6 +19,8 @@
 namespace Pegasus::client {
 namespace {
 
+using base::Deadline;
+
 String toString(const std::string& text)
 {
     return String(text.c_str());
@@ -97,7 +99,7 @@ void Connection::openTcp(const Deadline& deadline)
 void Connection::openLocal(const Deadline& deadline)
 {
     try {
-        fFd = wire::connectLocalSocket(wire::localSocketHome(), deadline.remainingMs());
+        fFd = base::connectLocalSocket(base::localSocketHome(), deadline).release();
     } catch (const std::system_error&) {
         throw CannotConnectException("Cannot connect to local CIM server. Connection failed.");
     }
@@ -124,7 +126,7 @@ Connection::Result Connection::waitFor(short events, const Deadline& deadline) c
 {
     for (;;) {
         pollfd entry{fFd, events, 0};
-        const int ready = ::poll(&entry, 1, deadline.remainingMs());
+        const int ready = ::poll(&entry, 1, deadline.pollTimeoutMs());
         if (ready > 0) {
             return Result::Done;
         }

@@ -44,7 +44,7 @@ class Connection
     // own settings bounds that. Throws: InvalidLocatorException.
     void setAddress(const ServerAddress& address);
     // Throws: CannotConnectException, also when the deadline passes. Requires: setAddress().
-    void open(const Deadline& deadline);
+    void open(const base::Deadline& deadline);
     void close();
     bool isOpen() const { return fFd >= 0; }
     // Has the server ever sent anything on it?
@@ -52,14 +52,14 @@ class Connection
     // Has the server closed the idle connection, or sent what nobody asked for?
     bool isStale() const;
 
-    Result send(std::string_view bytes, const Deadline& deadline);
+    Result send(std::string_view bytes, const base::Deadline& deadline);
     // Waits for bytes. `received` is how many came.
-    Result receive(char* buffer, std::size_t capacity, const Deadline& deadline, std::size_t& received);
+    Result receive(char* buffer, std::size_t capacity, const base::Deadline& deadline, std::size_t& received);
 
   private:
-    Result waitFor(short events, const Deadline& deadline) const;
-    void openTcp(const Deadline& deadline);
-    void openLocal(const Deadline& deadline);
+    Result waitFor(short events, const base::Deadline& deadline) const;
+    void openTcp(const base::Deadline& deadline);
+    void openLocal(const base::Deadline& deadline);
 
     ServerAddress fAddress;
     std::shared_ptr<addrinfo> fCandidates; // what a host name was looked up to; null for the private socket

@@ -23,7 +23,7 @@ std::string toStd(BeastView text)
 
 bool isNamed(BeastView name, std::string_view expected)
 {
-    return equalNoCase(std::string_view(name.data(), name.size()), expected);
+    return base::equalNoCase(std::string_view(name.data(), name.size()), expected);
 }
 
 [[noreturn]] void throwMalformed(const std::string& cause = std::string())

@@ -1,12 +1,10 @@
 #include "pegasus/client/RequestEncoder.h"
 
-#include "pegasus/common/StringRep.h"
+#include "pegasus/base/PercentCoding.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/wire/ElementEncoder.h"
 
 #include <Pegasus/Common/Exception.h>
-
-#include <cctype>
-#include <cstdio>
 
 namespace Pegasus::client {
 namespace {
@@ -17,15 +15,6 @@ const CIMNamespaceName& notNull(const CIMNamespaceName& nameSpace)
         throw InvalidNamespaceNameException(String());
     }
     return nameSpace;
-}
-
-int hexValue(char c)
-{
-    if (c >= '0' && c <= '9') {
-        return c - '0';
-    }
-    const char lower = static_cast<char>(c | 0x20);
-    return lower >= 'a' && lower <= 'f' ? lower - 'a' + 10 : -1;
 }
 
 std::string body(const Request& request, std::string_view messageId)
@@ -46,7 +35,7 @@ std::string body(const Request& request, std::string_view messageId)
 IntrinsicRequest::IntrinsicRequest(std::string_view method, const CIMNamespaceName& nameSpace, bool isRepeatable)
 {
     fRequest.method = method;
-    fRequest.object = percentEncoded(StringAccess::toUtf8(notNull(nameSpace).getString()));
+    fRequest.object = base::percentEncoded(base::utf8(notNull(nameSpace).getString()), base::PercentSet::kStrict);
     fRequest.isRepeatable = isRepeatable;
     fRequest.call.append("<IMETHODCALL NAME=\"").append(method).append("\">\n");
     wire::appendLocalNamespacePath(fRequest.call, nameSpace);
@@ -157,8 +146,8 @@ Request encodeInvokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPat
     target.setNameSpace(notNull(nameSpace));
     Request request;
     request.isIntrinsic = false;
-    request.method = StringAccess::toUtf8(method.getString());
-    request.object = percentEncoded(StringAccess::toUtf8(target.toString()));
+    request.method = base::utf8(method.getString());
+    request.object = base::percentEncoded(base::utf8(target.toString()), base::PercentSet::kStrict);
     request.call = "<METHODCALL NAME=\"";
     wire::appendEscaped(request.call, method.getString());
     request.call += "\">\n";
@@ -187,44 +176,13 @@ std::string encodeMessage(const Request& request, std::string_view messageId, st
     out.append("content-length: ").append(length).append("\r\n");
     out.append("TE: chunked, trailers\r\n");
     out.append("CIMOperation: MethodCall\r\n");
-    out.append("CIMMethod: ").append(percentEncoded(request.method)).append("\r\n");
+    const std::string method = base::percentEncoded(request.method, base::PercentSet::kStrict);
+    out.append("CIMMethod: ").append(method).append("\r\n");
     out.append("CIMObject: ").append(request.object).append("\r\n");
     if (!localUser.empty()) {
         out.append("PegasusAuthorization: Local \"").append(localUser).append("\"\r\n");
     }
     return out.append("\r\n").append(content);
-}
-
-std::string percentEncoded(std::string_view text)
-{
-    std::string out;
-    for (const char c : text) {
-        const auto byte = static_cast<unsigned char>(c);
-        if (byte < 0x80 && (std::isalnum(byte) || c == '-' || c == '_' || c == '.')) {
-            out += c;
-        } else {
-            char escape[4];
-            std::snprintf(escape, sizeof(escape), "%%%02X", static_cast<unsigned>(byte));
-            out += escape;
-        }
-    }
-    return out;
-}
-
-std::string percentDecoded(std::string_view text)
-{
-    std::string out;
-    for (std::size_t i = 0; i < text.size(); ++i) {
-        const int high = text[i] == '%' && i + 2 < text.size() ? hexValue(text[i + 1]) : -1;
-        const int low = high >= 0 ? hexValue(text[i + 2]) : -1;
-        if (low < 0) {
-            out += text[i];
-            continue;
-        }
-        out += static_cast<char>(high * 16 + low);
-        i += 2;
-    }
-    return out;
 }
 
 } // namespace Pegasus::client

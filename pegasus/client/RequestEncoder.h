@@ -57,9 +57,4 @@ Request encodeInvokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPat
 std::string encodeMessage(const Request& request, std::string_view messageId, std::string_view host,
                           std::string_view localUser);
 
-// Everything but letters, digits and "-_." as %XX.
-std::string percentEncoded(std::string_view text);
-// Bytes that are no valid escape stay as they are.
-std::string percentDecoded(std::string_view text);
-
 } // namespace Pegasus::client

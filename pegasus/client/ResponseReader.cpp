@@ -2,7 +2,7 @@
 
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/NumberText.h"
-#include "pegasus/common/StringRep.h"
+#include "pegasus/base/Text.h"
 
 #include <Pegasus/Client/CIMClientException.h>
 
@@ -37,7 +37,7 @@ constexpr std::string_view kIntrinsicMethods[] = {
 
 [[noreturn]] void throwResponse(const std::string& text)
 {
-    throw CIMClientResponseException(StringAccess::fromUtf8(text));
+    throw CIMClientResponseException(base::fromUtf8(text));
 }
 
 void expectVersion(const XmlElement& tag, std::string_view attribute, std::string_view value)
@@ -133,7 +133,7 @@ void ResponseReader::openMethodResponse(const XmlElement& tag)
     if (isIntrinsic && !isKnown) {
         tag.fail(Kind::Invalid, "Unrecognized IMethodResponse name \"" + name + "\"");
     }
-    if (isIntrinsic != fExpected.isIntrinsic || !equalNoCase(name, fExpected.method)) {
+    if (isIntrinsic != fExpected.isIntrinsic || !base::equalNoCase(name, fExpected.method)) {
         throwResponse("Mismatched response:  Got an answer to \"" + name + "\", expected one to \"" + fExpected.method +
                       "\".");
     }
@@ -164,7 +164,7 @@ void ResponseReader::readError(const XmlElement& element)
 {
     std::string_view values[2];
     element.attributes({"CODE", "DESCRIPTION"}, values);
-    const auto code = number::parseUnsigned(required(element, "CODE", values[0]));
+    const auto code = base::parseUnsigned(required(element, "CODE", values[0]));
     if (!code || *code > 0xFFFF) {
         element.fail(Kind::Invalid, "missing ERROR.CODE attribute");
     }

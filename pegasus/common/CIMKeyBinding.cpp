@@ -1,8 +1,10 @@
 #include "pegasus/base/NumberText.h"
-#include "pegasus/common/StringRep.h"
+#include "pegasus/base/Text.h"
+#include "pegasus/common/RepPointerImpl.h"
 
 #include <Pegasus/Common/CIMObjectPath.h>
 #include <Pegasus/Common/CIMValue.h>
+#include <Pegasus/Common/Exception.h>
 
 namespace Pegasus {
 
@@ -53,15 +55,15 @@ Type typeOf(const CIMValue& value)
 
 Boolean sameNumber(const String& x, const String& y)
 {
-    const std::string text1 = StringAccess::toUtf8(x);
-    const std::string text2 = StringAccess::toUtf8(y);
-    const auto unsigned1 = number::parseUnsigned(text1);
-    const auto unsigned2 = number::parseUnsigned(text2);
+    const std::string text1 = base::utf8(x);
+    const std::string text2 = base::utf8(y);
+    const auto unsigned1 = base::parseUnsigned(text1);
+    const auto unsigned2 = base::parseUnsigned(text2);
     if (unsigned1 && unsigned2) {
         return *unsigned1 == *unsigned2;
     }
-    const auto signed1 = number::parseSigned(text1);
-    const auto signed2 = number::parseSigned(text2);
+    const auto signed1 = base::parseSigned(text1);
+    const auto signed2 = base::parseSigned(text2);
     return signed1 && signed2 ? *signed1 == *signed2 : x == y;
 }
 

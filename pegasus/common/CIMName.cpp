@@ -1,3 +1,4 @@
+#include "pegasus/base/AsciiCase.h"
 #include "pegasus/common/NameAccess.h"
 #include "pegasus/common/StringRep.h"
 
@@ -6,7 +7,7 @@ namespace {
 
 bool isLetter(Uint16 unit)
 {
-    const Uint16 lower = lowerAscii(unit);
+    const Uint16 lower = base::lowerAscii(unit);
     return (lower >= 'a' && lower <= 'z') || unit == '_' || (unit >= 0x80 && unit <= 0xFFEF);
 }
 
@@ -56,7 +57,7 @@ bool sameNoCase(const StringRep& x, const StringRep& y)
         return false;
     }
     for (Uint32 i = x.fSize; i > 0; --i) {
-        if (lowerAscii(x.units()[i - 1]) != lowerAscii(y.units()[i - 1])) {
+        if (base::lowerAscii(x.units()[i - 1]) != base::lowerAscii(y.units()[i - 1])) {
             return false;
         }
     }

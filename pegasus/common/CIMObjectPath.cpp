@@ -1,8 +1,11 @@
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/common/ArrayImpl.h"
 #include "pegasus/common/ObjectPathParser.h"
-#include "pegasus/common/StringRep.h"
+#include "pegasus/common/RepPointerImpl.h"
 
 #include <Pegasus/Common/CIMObjectPath.h>
+#include <Pegasus/Common/Exception.h>
 
 #include <algorithm>
 #include <vector>
@@ -36,7 +39,7 @@ const Rep& repOf(const RepPointer<Rep>& pointer)
 
 String checkedHost(const String& host)
 {
-    if (host.size() > 0 && !path::isHost(StringAccess::toUtf8(host))) {
+    if (host.size() > 0 && !path::isHost(base::utf8(host))) {
         throwMalformed(host, "invalid hostname");
     }
     return host;
@@ -76,20 +79,19 @@ CIMKeyBinding::Type typeOf(path::KeyKind kind)
 RepPointer<Rep> parse(const String& text)
 {
     path::Parts parts;
-    const std::string reason = path::parse(StringAccess::toUtf8(text), parts);
+    const std::string reason = path::parse(base::utf8(text), parts);
     if (!reason.empty()) {
         throwMalformed(text, reason);
     }
     RepPointer<Rep> rep(new Rep());
-    rep->fHost = StringAccess::fromUtf8(parts.host);
+    rep->fHost = base::fromUtf8(parts.host);
     if (!parts.nameSpace.empty()) {
-        rep->fNameSpace = StringAccess::fromUtf8(parts.nameSpace);
+        rep->fNameSpace = base::fromUtf8(parts.nameSpace);
     }
-    rep->fClassName = StringAccess::fromUtf8(parts.className);
+    rep->fClassName = base::fromUtf8(parts.className);
     Array<CIMKeyBinding> keys;
     for (const path::Key& key : parts.keys) {
-        keys.append(
-            CIMKeyBinding(StringAccess::fromUtf8(key.name), StringAccess::fromUtf8(key.value), typeOf(key.kind)));
+        keys.append(CIMKeyBinding(base::fromUtf8(key.name), base::fromUtf8(key.value), typeOf(key.kind)));
     }
     rep->fKeys = sorted(keys);
     return rep;
@@ -98,7 +100,7 @@ RepPointer<Rep> parse(const String& text)
 void appendQuoted(std::string& out, const String& value)
 {
     out += '"';
-    for (const char c : StringAccess::toUtf8(value)) {
+    for (const char c : base::utf8(value)) {
         if (c == '"' || c == '\\') {
             out += '\\';
         }
@@ -109,12 +111,12 @@ void appendQuoted(std::string& out, const String& value)
 
 void appendKey(std::string& out, const CIMKeyBinding& key)
 {
-    StringAccess::appendUtf8(out, key.getName().getString());
+    base::appendUtf8(out, key.getName().getString());
     out += '=';
     if (key.getType() == CIMKeyBinding::STRING || key.getType() == CIMKeyBinding::REFERENCE) {
         appendQuoted(out, key.getValue());
     } else {
-        StringAccess::appendUtf8(out, key.getValue());
+        base::appendUtf8(out, key.getValue());
     }
 }
 
@@ -122,12 +124,12 @@ std::string format(const Rep& rep)
 {
     std::string out;
     if (rep.fHost.size() > 0) {
-        out = "//" + StringAccess::toUtf8(rep.fHost) + "/";
+        out = "//" + base::utf8(rep.fHost) + "/";
     }
     if (rep.fHost.size() > 0 || !rep.fNameSpace.isNull()) {
-        out += StringAccess::toUtf8(rep.fNameSpace.getString()) + ":";
+        out += base::utf8(rep.fNameSpace.getString()) + ":";
     }
-    StringAccess::appendUtf8(out, rep.fClassName.getString());
+    base::appendUtf8(out, rep.fClassName.getString());
     char separator = '.';
     for (Uint32 i = 0; i < rep.fKeys.size(); ++i, separator = ',') {
         out += separator;
@@ -148,7 +150,7 @@ class Hash
     void add(const String& text)
     {
         for (Uint32 i = 0; i < text.size(); ++i) {
-            add(lowerAscii(text.getChar16Data()[i]));
+            add(base::lowerAscii(text.getChar16Data()[i]));
         }
         add(Uint16(0));
     }
@@ -238,7 +240,7 @@ void CIMObjectPath::setKeyBindings(const Array<CIMKeyBinding>& keyBindings)
 
 String CIMObjectPath::toString() const
 {
-    return StringAccess::fromUtf8(format(repOf(fRep)));
+    return base::fromUtf8(format(repOf(fRep)));
 }
 
 Boolean CIMObjectPath::identical(const CIMObjectPath& path) const

@@ -1,6 +1,6 @@
 #include "pegasus/base/NumberText.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/common/CIMValueRep.h"
-#include "pegasus/common/StringRep.h"
 
 namespace Pegasus {
 
@@ -124,22 +124,22 @@ void appendText(std::string& out, Boolean x)
 
 void appendText(std::string& out, Real32 x)
 {
-    out += number::formatReal(Real64(x));
+    out += base::formatReal(Real64(x));
 }
 
 void appendText(std::string& out, Real64 x)
 {
-    out += number::formatReal(x);
+    out += base::formatReal(x);
 }
 
 void appendText(std::string& out, const Char16& x)
 {
-    StringAccess::appendUtf8(out, &x, 1);
+    base::appendUtf8(out, &x, 1);
 }
 
 void appendText(std::string& out, const String& x)
 {
-    StringAccess::appendUtf8(out, x);
+    base::appendUtf8(out, x);
 }
 
 template <class T> void appendText(std::string& out, const T& x)
@@ -147,9 +147,9 @@ template <class T> void appendText(std::string& out, const T& x)
     if constexpr (std::is_integral_v<T>) {
         out += std::to_string(x);
     } else if constexpr (std::is_same_v<T, CIMInstance>) {
-        StringAccess::appendUtf8(out, CIMObject(x).toString());
+        base::appendUtf8(out, CIMObject(x).toString());
     } else {
-        StringAccess::appendUtf8(out, x.toString());
+        base::appendUtf8(out, x.toString());
     }
 }
 
@@ -311,7 +311,7 @@ String CIMValue::toString() const
             out += ' ';
         }
     });
-    return StringAccess::fromUtf8(out);
+    return base::fromUtf8(out);
 }
 
 Boolean operator==(const CIMValue& x, const CIMValue& y)

@@ -1,12 +1,12 @@
 #include "pegasus/common/ObjectPathParser.h"
 
+#include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/NumberText.h"
-#include "pegasus/common/StringRep.h"
+#include "pegasus/base/Text.h"
 
 #include <Pegasus/Common/CIMName.h>
 
 #include <algorithm>
-#include <cctype>
 #include <charconv>
 
 #include <arpa/inet.h>
@@ -19,14 +19,9 @@ using Reason = std::string;
 // References in references: each level doubles the backslashes, so real paths stay far below.
 constexpr unsigned kMaxNesting = 16;
 
-bool isAlnum(char c)
-{
-    return std::isalnum(static_cast<unsigned char>(c)) != 0;
-}
-
 bool isAllDigits(std::string_view text)
 {
-    return !text.empty() && std::all_of(text.begin(), text.end(), [](char c) { return c >= '0' && c <= '9'; });
+    return !text.empty() && std::all_of(text.begin(), text.end(), base::isAsciiDigit);
 }
 
 bool isPort(std::string_view text)
@@ -44,8 +39,8 @@ bool isAddress(int family, std::string_view text)
 
 bool isLabel(std::string_view label)
 {
-    const auto isLabelChar = [](char c) { return isAlnum(c) || c == '-' || c == '_'; };
-    return !label.empty() && (isAlnum(label.front()) || label.front() == '_') &&
+    const auto isLabelChar = [](char c) { return base::isAsciiAlnum(c) || c == '-' || c == '_'; };
+    return !label.empty() && (base::isAsciiAlnum(label.front()) || label.front() == '_') &&
            std::all_of(label.begin(), label.end(), isLabelChar);
 }
 
@@ -129,7 +124,7 @@ Reason PathParser::readNamespace()
         return fParts.host.empty() ? Reason() : "host specified, missing namespace";
     }
     const std::string nameSpace(fText.substr(0, colon));
-    if (!CIMNamespaceName::legal(StringAccess::fromUtf8(nameSpace))) {
+    if (!CIMNamespaceName::legal(base::fromUtf8(nameSpace))) {
         return "invalid namespace name";
     }
     fParts.nameSpace = nameSpace;
@@ -141,7 +136,7 @@ Reason PathParser::readClass()
 {
     const std::size_t dot = fText.find('.');
     const std::string className(fText.substr(0, dot));
-    if (!CIMName::legal(StringAccess::fromUtf8(className))) {
+    if (!CIMName::legal(base::fromUtf8(className))) {
         return "class name " + className + " not a legal CIM name";
     }
     fParts.className = className;
@@ -172,7 +167,7 @@ Reason PathParser::readKey()
     }
     Key key;
     key.name = fText.substr(0, equals);
-    if (!CIMName::legal(StringAccess::fromUtf8(key.name))) {
+    if (!CIMName::legal(base::fromUtf8(key.name))) {
         return "invalid key name:" + key.name;
     }
     fText.remove_prefix(equals + 1);
@@ -210,7 +205,7 @@ Reason PathParser::readPlain(Key& key)
 {
     key.value = fText.substr(0, fText.find(','));
     fText.remove_prefix(key.value.size());
-    const String value = StringAccess::fromUtf8(key.value);
+    const String value = base::fromUtf8(key.value);
     for (const char* word : {"TRUE", "FALSE"}) {
         if (String::equalNoCase(value, word)) {
             key.value = word;
@@ -220,9 +215,9 @@ Reason PathParser::readPlain(Key& key)
     }
     key.kind = KeyKind::Numeric;
     if (!key.value.empty() && key.value.front() == '-') {
-        return number::parseSigned(key.value) ? Reason() : "invalid negative number value " + key.value;
+        return base::parseSigned(key.value) ? Reason() : "invalid negative number value " + key.value;
     }
-    return number::parseUnsigned(key.value) ? Reason() : "invalid number value " + key.value;
+    return base::parseUnsigned(key.value) ? Reason() : "invalid number value " + key.value;
 }
 
 bool PathParser::isPathWithKeys(const std::string& value) const

@@ -1,3 +1,5 @@
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/base/Utf8.h"
 #include "pegasus/common/StringRep.h"
 
@@ -99,7 +101,7 @@ const char* notNull(const char* text)
         std::snprintf(hex, sizeof(hex), " 0x%02X", static_cast<unsigned>(static_cast<unsigned char>(byte)));
         message += hex;
     }
-    throw Exception(StringAccess::fromUtf8(message));
+    throw Exception(base::fromUtf8(message));
 }
 
 StringPointer repFromUtf8(std::string_view utf8)
@@ -108,7 +110,7 @@ StringPointer repFromUtf8(std::string_view utf8)
         return StringPointer();
     }
     StringPointer rep(StringRep::create(utf8.size()));
-    const utf8::DecodeResult result = utf8::decode(utf8.data(), utf8.size(), rep->units());
+    const base::Utf8DecodeResult result = base::decodeUtf8(utf8.data(), utf8.size(), rep->units());
     if (result.invalid) {
         throwNotUtf8(utf8, static_cast<std::size_t>(result.invalid - utf8.data()));
     }
@@ -147,6 +149,11 @@ Uint16 asIs(Uint16 unit)
     return unit;
 }
 
+Uint16 lowered(Uint16 unit)
+{
+    return base::lowerAscii(unit);
+}
+
 } // namespace
 
 // ---- CString
@@ -176,27 +183,6 @@ CString& CString::operator=(const CString& other)
     CString copy(other);
     std::swap(fBytes, copy.fBytes);
     return *this;
-}
-
-// ---- StringAccess
-
-String StringAccess::fromUtf8(std::string_view utf8)
-{
-    String result;
-    result.fRep = repFromUtf8(utf8);
-    return result;
-}
-
-void StringAccess::appendUtf8(std::string& out, const Char16* units, std::size_t count)
-{
-    utf8::append(out, units, count);
-}
-
-std::string StringAccess::toUtf8(const String& text)
-{
-    std::string out;
-    appendUtf8(out, text);
-    return out;
 }
 
 // ---- String
@@ -254,7 +240,7 @@ const Char16* String::getChar16Data() const
 
 CString String::getCString() const
 {
-    const std::string utf8 = StringAccess::toUtf8(*this);
+    const std::string utf8 = base::utf8(*this);
     // An embedded zero stays: the bytes are the whole text.
     auto* bytes = new char[utf8.size() + 1];
     std::memcpy(bytes, utf8.c_str(), utf8.size() + 1);
@@ -379,7 +365,7 @@ void String::toLower()
 {
     makeWritable(fRep, size());
     for (Uint32 i = 0; i < fRep->fSize; ++i) {
-        fRep->units()[i] = lowerAscii(fRep->units()[i]);
+        fRep->units()[i] = base::lowerAscii(fRep->units()[i]);
     }
 }
 
@@ -394,7 +380,7 @@ void String::appendPrintf(const char* format, ...)
     std::vector<char> text(size > 0 ? static_cast<std::size_t>(size) + 1 : 1);
     std::vsnprintf(text.data(), text.size(), format, again);
     va_end(again);
-    append(StringAccess::fromUtf8(text.data()));
+    append(base::fromUtf8(text.data()));
 }
 
 int String::compare(const String& s1, const String& s2)
@@ -409,7 +395,7 @@ int String::compare(const String& s1, const String& s2, Uint32 n)
 
 int String::compareNoCase(const String& s1, const String& s2)
 {
-    return compareUnits(s1, s2, PEG_NOT_FOUND, lowerAscii);
+    return compareUnits(s1, s2, PEG_NOT_FOUND, lowered);
 }
 
 Boolean String::equal(const String& s1, const String& s2)

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "pegasus/base/AsciiCase.h"
 #include "pegasus/common/RepPointerImpl.h"
 
 #include <Pegasus/Common/String.h>
@@ -27,19 +28,8 @@ struct StringRep : RefCounted
 // What the library itself does with strings beyond their public interface.
 struct StringAccess
 {
-    // Throws: Exception "The byte sequence starting at index ... is not valid UTF-8 encoding: ...".
-    static String fromUtf8(std::string_view utf8);
-    static void appendUtf8(std::string& out, const Char16* units, std::size_t count);
-    static void appendUtf8(std::string& out, const String& text) { appendUtf8(out, text.getChar16Data(), text.size()); }
-    static std::string toUtf8(const String& text);
     // Null for an empty text, perhaps.
     static const StringRep* rep(const String& text) noexcept { return text.fRep.get(); }
 };
-
-// ASCII letters only.
-inline Uint16 lowerAscii(Uint16 unit) noexcept
-{
-    return unit >= 'A' && unit <= 'Z' ? static_cast<Uint16>(unit + ('a' - 'A')) : unit;
-}
 
 } // namespace Pegasus

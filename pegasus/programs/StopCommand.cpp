@@ -21,6 +21,7 @@ namespace {
 
 using server::Descriptor;
 
+constexpr std::chrono::milliseconds kConnectTimeout{1000};
 constexpr Uint32 kAnswerTimeoutMs = 60'000;
 constexpr int kEndTimeoutMs = 60'000;
 constexpr int kTermTimeoutMs = 10'000;
@@ -29,7 +30,7 @@ constexpr int kTermTimeoutMs = 10'000;
 pid_t listeningProcess(const std::string& home)
 {
     try {
-        const Descriptor socket(wire::connectLocalSocket(home));
+        const Descriptor socket = base::connectLocalSocket(home, base::Deadline::after(kConnectTimeout));
         ucred peer = {};
         socklen_t size = sizeof peer;
         return ::getsockopt(socket.get(), SOL_SOCKET, SO_PEERCRED, &peer, &size) == 0 ? peer.pid : 0;

@@ -122,7 +122,7 @@ class LocalSocketFile
 {
   public:
     explicit LocalSocketFile(const std::string& home) : fHome(home) {}
-    ~LocalSocketFile() { wire::removeLocalSocket(fHome); }
+    ~LocalSocketFile() { base::removeLocalSocket(fHome); }
     LocalSocketFile(const LocalSocketFile&) = delete;
     LocalSocketFile& operator=(const LocalSocketFile&) = delete;
 
@@ -166,7 +166,7 @@ void endConnections(ConnectionGroup& remote, ConnectionGroup& local, AgentPool& 
     local.breakAll();
     if (!remote.waitForEnd(Clock::now() + kGraceAfterBreak) || !local.waitForEnd(Clock::now() + kGraceAfterBreak)) {
         Log::write(Severity::kError, "Requests do not end; the server ends without them.");
-        wire::removeLocalSocket(defaultHome());
+        base::removeLocalSocket(defaultHome());
         ::_exit(1);
     }
 }

@@ -2,8 +2,8 @@
 
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/NumberText.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/common/ObjectReps.h"
-#include "pegasus/common/StringRep.h"
 
 namespace Pegasus::wire {
 namespace {
@@ -65,7 +65,7 @@ template <class Item> void addNew(const XmlElement& element, Array<Item>& items,
 {
     if (ObjectAccess::find(items, item.getName()) != PEG_NOT_FOUND) {
         element.fail(Kind::Semantic, "a second " + std::string(element.name()) + " named \"" +
-                                         StringAccess::toUtf8(item.getName().getString()) + "\"");
+                                         base::utf8(item.getName().getString()) + "\"");
     }
     items.append(item);
 }
@@ -124,10 +124,10 @@ bool ElementDecoder::boolAttribute(const XmlElement& element, std::string_view a
     if (value.data() == nullptr) {
         return ifMissing;
     }
-    if (equalNoCase(value, "true")) {
+    if (base::equalNoCase(value, "true")) {
         return true;
     }
-    if (equalNoCase(value, "false")) {
+    if (base::equalNoCase(value, "false")) {
         return false;
     }
     failIllegal(element, attribute);
@@ -154,7 +154,7 @@ Uint32 ElementDecoder::sizeAttribute(const XmlElement& element, std::string_view
     if (value.data() == nullptr) {
         return 0;
     }
-    const auto size = number::parseUnsigned(value);
+    const auto size = base::parseUnsigned(value);
     if (!size || *size > fLimits.maxArrayElements) {
         failIllegal(element, "ARRAYSIZE");
     }
@@ -181,7 +181,7 @@ CIMFlavor ElementDecoder::flavor(const XmlElement& element, const std::string_vi
 String ElementDecoder::toString(const XmlElement& element, std::string_view utf8)
 {
     try {
-        return StringAccess::fromUtf8(utf8);
+        return base::fromUtf8(utf8);
     } catch (const Exception&) {
         element.fail(Kind::NotWellFormed, "text that is not UTF-8 in " + std::string(element.name()) + " element");
     }

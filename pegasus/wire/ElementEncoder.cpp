@@ -1,8 +1,8 @@
 #include "pegasus/wire/ElementEncoder.h"
 
 #include "pegasus/base/NumberText.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/common/CIMValueRep.h"
-#include "pegasus/common/StringRep.h"
 
 #include <cmath>
 
@@ -78,7 +78,7 @@ void appendReal(std::string& out, Real64 x, int digits)
     } else if (std::isinf(x)) {
         out += x < 0 ? "-INF" : "INF";
     } else {
-        out += number::formatReal(x, digits);
+        out += base::formatReal(x, digits);
     }
 }
 
@@ -95,7 +95,7 @@ void appendText(std::string& out, Real64 x)
 void appendText(std::string& out, const Char16& x)
 {
     std::string utf8;
-    StringAccess::appendUtf8(utf8, &x, 1);
+    base::appendUtf8(utf8, &x, 1);
     appendEscaped(out, utf8);
 }
 
@@ -106,7 +106,7 @@ void appendText(std::string& out, const String& x)
 
 void appendText(std::string& out, const CIMDateTime& x)
 {
-    StringAccess::appendUtf8(out, x.toString());
+    base::appendUtf8(out, x.toString());
 }
 
 void appendText(std::string& out, const CIMInstance& x)
@@ -445,7 +445,7 @@ void appendLocalClassPath(std::string& out, const CIMNamespaceName& nameSpace, c
 void appendLocalNamespacePath(std::string& out, const CIMNamespaceName& nameSpace)
 {
     out += "<LOCALNAMESPACEPATH>\n";
-    const std::string text = StringAccess::toUtf8(nameSpace.getString());
+    const std::string text = base::utf8(nameSpace.getString());
     for (std::size_t start = 0; start < text.size();) {
         const std::size_t end = std::min(text.find('/', start), text.size());
         out += "<NAMESPACE NAME=\"";

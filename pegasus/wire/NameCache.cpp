@@ -1,6 +1,6 @@
 #include "pegasus/wire/NameCache.h"
 
-#include "pegasus/common/StringRep.h"
+#include "pegasus/base/Text.h"
 
 #include <cstdint>
 
@@ -35,7 +35,7 @@ NameCache::~NameCache() = default;
 const CIMName& NameCache::name(std::string_view utf8)
 {
     if (utf8.size() > kMaxKeptBytes) {
-        fLongName = StringAccess::fromUtf8(utf8);
+        fLongName = base::fromUtf8(utf8);
         return fLongName;
     }
     if (fEntries.empty()) {
@@ -43,7 +43,7 @@ const CIMName& NameCache::name(std::string_view utf8)
     }
     Entry& entry = fEntries[hashOf(utf8) % kSlots];
     if (entry.utf8 != utf8 || entry.name.isNull()) {
-        const CIMName name(StringAccess::fromUtf8(utf8));
+        const CIMName name(base::fromUtf8(utf8));
         entry.utf8 = utf8;
         entry.name = name;
     }

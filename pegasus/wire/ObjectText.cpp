@@ -1,8 +1,9 @@
 // The one member of the CIM objects that writes XML: it stands above them, with the codec.
-#include "pegasus/common/StringRep.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/wire/ElementEncoder.h"
 
 #include <Pegasus/Common/CIMObject.h>
+#include <Pegasus/Common/Exception.h>
 
 namespace Pegasus {
 
@@ -17,7 +18,7 @@ String CIMConstObject::toString() const
     } else {
         wire::appendInstance(text, fInstance);
     }
-    return StringAccess::fromUtf8(text);
+    return base::fromUtf8(text);
 }
 
 } // namespace Pegasus

@@ -1,4 +1,4 @@
-#include "pegasus/common/StringRep.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/wire/ElementDecoder.h"
 
 namespace Pegasus::wire {
@@ -123,7 +123,7 @@ CIMNamespaceName ElementDecoder::decodeLocalNamespacePath(const XmlElement& elem
         std::string_view values[1];
         child.attributes({"NAME"}, values);
         text += (text.empty() ? "" : "/");
-        StringAccess::appendUtf8(text, nameAttribute(child, "NAME", values[0]).getString());
+        base::appendUtf8(text, nameAttribute(child, "NAME", values[0]).getString());
     }
     return CIMNamespaceName(toString(element, text));
 }

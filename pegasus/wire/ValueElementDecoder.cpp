@@ -1,7 +1,7 @@
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/NumberText.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/common/CIMValueRep.h"
-#include "pegasus/common/StringRep.h"
 #include "pegasus/wire/ElementDecoder.h"
 
 #include <limits>
@@ -36,7 +36,7 @@ class EmbeddingGuard
 
 template <class T> T ElementDecoder::parseUnsigned(const XmlElement& element, std::string_view text)
 {
-    const auto parsed = number::parseUnsigned(text);
+    const auto parsed = base::parseUnsigned(text);
     if (!parsed) {
         element.fail(Kind::Semantic, "Invalid unsigned integer value");
     }
@@ -48,7 +48,7 @@ template <class T> T ElementDecoder::parseUnsigned(const XmlElement& element, st
 
 template <class T> T ElementDecoder::parseSigned(const XmlElement& element, std::string_view text)
 {
-    const auto parsed = number::parseSigned(text);
+    const auto parsed = base::parseSigned(text);
     if (!parsed) {
         element.fail(Kind::Semantic, "Invalid signed integer value");
     }
@@ -65,10 +65,10 @@ template <> String ElementDecoder::parseText<String>(const XmlElement& element, 
 
 template <> Boolean ElementDecoder::parseText<Boolean>(const XmlElement& element, std::string_view text)
 {
-    if (equalNoCase(text, "true")) {
+    if (base::equalNoCase(text, "true")) {
         return true;
     }
-    if (equalNoCase(text, "false")) {
+    if (base::equalNoCase(text, "false")) {
         return false;
     }
     element.fail(Kind::Semantic, "Invalid boolean value");
@@ -76,7 +76,7 @@ template <> Boolean ElementDecoder::parseText<Boolean>(const XmlElement& element
 
 template <> Real32 ElementDecoder::parseText<Real32>(const XmlElement& element, std::string_view text)
 {
-    const auto parsed = number::parseReal32(text);
+    const auto parsed = base::parseReal32(text);
     if (!parsed) {
         element.fail(Kind::Semantic, "Invalid real number value");
     }
@@ -85,7 +85,7 @@ template <> Real32 ElementDecoder::parseText<Real32>(const XmlElement& element, 
 
 template <> Real64 ElementDecoder::parseText<Real64>(const XmlElement& element, std::string_view text)
 {
-    const auto parsed = number::parseReal64(text);
+    const auto parsed = base::parseReal64(text);
     if (!parsed) {
         element.fail(Kind::Semantic, "Invalid real number value");
     }
@@ -151,7 +151,7 @@ CIMObject ElementDecoder::decodeEmbedded(const XmlElement& element, std::string_
         const XmlElement root = document.parseFragment(xml.data(), xml.size());
         return root.is("CLASS") ? CIMObject(decodeClass(root)) : CIMObject(decodeInstance(root));
     } catch (const XmlError& error) {
-        element.fail(error.kind(), "in an embedded object: " + StringAccess::toUtf8(error.getMessage()));
+        element.fail(error.kind(), "in an embedded object: " + base::utf8(error.getMessage()));
     }
 }
 

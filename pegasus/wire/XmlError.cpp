@@ -1,6 +1,6 @@
 #include "pegasus/wire/XmlError.h"
 
-#include "pegasus/common/StringRep.h"
+#include "pegasus/base/Text.h"
 
 namespace Pegasus::wire {
 namespace {
@@ -23,12 +23,12 @@ const char* wordFor(XmlError::Kind kind)
 String printable(std::string text)
 {
     try {
-        return StringAccess::fromUtf8(text);
+        return base::fromUtf8(text);
     } catch (const Exception&) {
         for (char& c : text) {
             c = static_cast<unsigned char>(c) < 0x80 ? c : '?';
         }
-        return StringAccess::fromUtf8(text);
+        return base::fromUtf8(text);
     }
 }
 

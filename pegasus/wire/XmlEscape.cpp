@@ -1,4 +1,4 @@
-#include "pegasus/common/StringRep.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/wire/ElementEncoder.h"
 
 namespace Pegasus::wire {
@@ -54,7 +54,7 @@ void appendEscaped(std::string& out, std::string_view text)
 
 void appendEscaped(std::string& out, const String& text)
 {
-    appendEscaped(out, StringAccess::toUtf8(text));
+    appendEscaped(out, base::utf8(text));
 }
 
 } // namespace Pegasus::wire

@@ -1,6 +1,7 @@
 #include "pegasus/wire/XmlText.h"
 
 #include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/NumberText.h"
 #include "pegasus/base/Utf8.h"
 
 #include <algorithm>
@@ -25,27 +26,6 @@ bool isForbidden(char c)
     return static_cast<unsigned char>(c) < 0x20 && c != '\t' && c != '\n' && c != '\r';
 }
 
-int digitValue(char c)
-{
-    if (c >= '0' && c <= '9') {
-        return c - '0';
-    }
-    const char lower = static_cast<char>(c | 0x20);
-    return lower >= 'a' && lower <= 'f' ? lower - 'a' + 10 : -1;
-}
-
-void appendCode(std::string& out, std::uint32_t code)
-{
-    if (code < 0x10000) {
-        const Char16 unit(static_cast<Uint16>(code));
-        utf8::append(out, &unit, 1);
-        return;
-    }
-    const Char16 pair[] = {Char16(static_cast<Uint16>(0xD800 + ((code - 0x10000) >> 10))),
-                           Char16(static_cast<Uint16>(0xDC00 + ((code - 0x10000) & 0x3FF)))};
-    utf8::append(out, pair, 2);
-}
-
 // `digits` of "#65" or "#x41".
 bool appendCharacter(std::string_view digits, std::string& out)
 {
@@ -58,7 +38,7 @@ bool appendCharacter(std::string_view digits, std::string& out)
     }
     std::uint32_t code = 0;
     for (const char c : digits) {
-        const int value = digitValue(c);
+        const int value = base::hexDigitValue(c);
         if (value < 0 || (!hex && value > 9)) {
             return false;
         }
@@ -70,7 +50,7 @@ bool appendCharacter(std::string_view digits, std::string& out)
     if (code == 0) {
         return false;
     }
-    appendCode(out, code);
+    base::appendUtf8(out, code);
     return true;
 }
 
@@ -163,7 +143,7 @@ void checkXmlDeclaration(std::string_view declaration, XmlPlace place)
         throw XmlError(XmlError::Kind::Invalid, place, "Expected <?xml ... ?> style declaration with version 1.x");
     }
     const std::string_view encoding = pseudoAttribute(declaration, "encoding");
-    if (encoding.data() != nullptr && !equalNoCase(encoding, "utf-8")) {
+    if (encoding.data() != nullptr && !base::equalNoCase(encoding, "utf-8")) {
         throw XmlError(XmlError::Kind::Invalid, place, "unsupported encoding \"" + std::string(encoding) + "\"");
     }
 }

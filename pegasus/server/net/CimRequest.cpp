@@ -15,7 +15,7 @@ void IntrinsicParameters::add(std::string_view name, XmlElement value)
 XmlElement IntrinsicParameters::find(std::string_view parameter) const
 {
     for (const Parameter& candidate : fParameters) {
-        if (equalNoCase(candidate.name, parameter)) {
+        if (base::equalNoCase(candidate.name, parameter)) {
             return candidate.value;
         }
     }

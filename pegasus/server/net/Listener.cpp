@@ -49,7 +49,7 @@ Descriptor listenOnLoopback(std::uint16_t port)
 
 Descriptor listenLocally(const std::string& home)
 {
-    Descriptor listener(wire::listenLocalSocket(home, kBacklog));
+    Descriptor listener = base::listenLocalSocket(home, kBacklog);
     ::fcntl(listener.get(), F_SETFL, ::fcntl(listener.get(), F_GETFL) | O_NONBLOCK);
     return listener;
 }

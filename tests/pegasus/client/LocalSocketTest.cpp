@@ -60,23 +60,22 @@ std::string requestOf(int listener)
 
 TEST_F(LocalSocketTest, ClientReachesItAndNamesItsUser)
 {
-    const int listener = wire::listenLocalSocket(fHome, 4);
+    const base::Descriptor listener = base::listenLocalSocket(fHome, 4);
     struct stat status
     {
     };
-    ASSERT_EQ(::stat((fHome + "/" + wire::kLocalSocketName).c_str(), &status), 0);
+    ASSERT_EQ(::stat((fHome + "/" + base::kLocalSocketName).c_str(), &status), 0);
     EXPECT_EQ(status.st_mode & 0777, 0600u);
     std::string request;
-    std::thread server([&] { request = requestOf(listener); });
+    std::thread server([&] { request = requestOf(listener.get()); });
     CIMClient client;
     client.connectLocal();
     EXPECT_THROW(client.getQualifier("root", "Key"), CIMClientMalformedHTTPException);
     server.join();
-    ::close(listener);
     EXPECT_EQ(request.rfind("POST /cimom HTTP/1.1\r\nHOST: \r\n", 0), 0u) << request;
     EXPECT_NE(request.find("\r\nPegasusAuthorization: Local \""), std::string::npos) << request;
 
-    wire::removeLocalSocket(fHome);
+    base::removeLocalSocket(fHome);
     client.disconnect();
     try {
         client.connectLocal();
@@ -88,29 +87,24 @@ TEST_F(LocalSocketTest, ClientReachesItAndNamesItsUser)
 
 TEST_F(LocalSocketTest, ConnectingIsBoundedWithNoTimeLeftToo)
 {
-    const int listener = wire::listenLocalSocket(fHome, 0);
-    std::vector<int> waiting;
+    const base::Descriptor listener = base::listenLocalSocket(fHome, 0);
+    std::vector<base::Descriptor> waiting;
     for (bool isFull = false; !isFull;) { // the kernel takes a few that nobody accepts
         try {
-            waiting.push_back(wire::connectLocalSocket(fHome, waiting.empty() ? 1000 : 0));
+            waiting.push_back(base::connectLocalSocket(
+                fHome, base::Deadline::after(std::chrono::milliseconds(waiting.empty() ? 1000 : 0))));
         } catch (const std::system_error&) {
             isFull = true;
         }
         ASSERT_LT(waiting.size(), 100u);
     }
     EXPECT_FALSE(waiting.empty());
-    for (const int fd : waiting) {
-        ::close(fd);
-    }
-    ::close(listener);
 }
 
 TEST_F(LocalSocketTest, SocketFileLeftOverIsReplaced)
 {
-    ::close(wire::listenLocalSocket(fHome, 1)); // as after a crash: the file stays
-    const int listener = wire::listenLocalSocket(fHome, 1);
-    const int client = wire::connectLocalSocket(fHome, 1000);
-    EXPECT_GE(client, 0);
-    ::close(client);
-    ::close(listener);
+    base::listenLocalSocket(fHome, 1).reset(); // as after a crash: the file stays
+    const base::Descriptor listener = base::listenLocalSocket(fHome, 1);
+    const base::Descriptor client = base::connectLocalSocket(fHome, base::Deadline::after(std::chrono::seconds(1)));
+    EXPECT_TRUE(client);
 }
