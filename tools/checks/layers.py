@@ -3,7 +3,7 @@
 
 Usage: layers.py [--table FILE] < NAMES-OF-FILES     (run in the repository's root; prints one finding a line)
 
-Findings: an include that its folder's row does not list; a quoted include that is no path from the root; an angle
+Findings: an include that its folder's row does not list; a quoted include that is not a path from the root; an angle
 include of a header that is not public; a folder without a row; rows that include each other in a circle; headers of
 different folders that do; exceptions that nothing needs, without a reason, or more than three.
 """
@@ -54,7 +54,7 @@ def included(file, bracket, name, known):
     if bracket == '"':
         if file.startswith(BESIDE_EACH_OTHER):
             return os.path.join(os.path.dirname(file), name), None
-        return (name, None) if name in known else (None, f'"{name}" is no path of a header from the root')
+        return (name, None) if name in known else (None, f'"{name}" is not the path of a header from the root')
     public = PUBLIC.get(name.partition("/")[0])
     if public:
         path = f"{public}/{name}"
