@@ -104,15 +104,19 @@ CimStatus AgentChannel::receive(ElementSink& sink, std::chrono::milliseconds pat
     }
     while (!parser.is_done()) {
         if (kept == fBuffer.size()) {
-            fBuffer.resize(2 * fBuffer.size()); // a long trailer; the parser's limit ends it
+            fBuffer.resize(2 * fBuffer.size()); // a long head or trailer; kMaxAnswerHeadBytes ends it
         }
         kept += readMore(kept, patience);
         boost::system::error_code error;
         const std::size_t taken = parser.put(boost::asio::const_buffer(fBuffer.data(), kept), error);
+        kept -= taken;
+        if (error == http::error::header_limit || kept > kMaxAnswerHeadBytes) {
+            throw AgentLost("a head, chunk extension or trailer of more than " + std::to_string(kMaxAnswerHeadBytes) +
+                            " bytes");
+        }
         if (error && error != http::error::need_more) {
             throw AgentLost("malformed answer: " + error.message());
         }
-        kept -= taken;
         std::memmove(fBuffer.data(), fBuffer.data() + taken, kept);
     }
     if (parser.get().result() != http::status::ok) {

@@ -11,7 +11,7 @@ namespace Pegasus::server {
 // Bounds on one request (named alike in the configuration).
 struct HttpLimits
 {
-    std::size_t maxHeaderBytes = 65536;
+    std::size_t maxHeaderBytes = 65536; // of the head, and again of a chunk's framing and of the trailer
     std::size_t maxBodyBytes = 16u << 20;
 };
 

@@ -95,13 +95,33 @@ std::size_t HttpRequestParser::putHead(std::string_view bytes)
     return taken;
 }
 
+// The parser takes a chunk's size line, and the last one with the trailer, only as a whole. It is offered no more than
+// the limit at once: what does not fit in is refused, however the bytes arrive, and is never kept.
+std::size_t HttpRequestParser::putBody(std::string_view bytes)
+{
+    std::size_t taken = 0;
+    while (taken < bytes.size() && !isDone()) {
+        const std::string_view window = bytes.substr(taken, fImpl->maxHeadBytes);
+        const std::size_t n = parse(window);
+        if (n == 0 && window.size() == fImpl->maxHeadBytes) {
+            throw HttpError(431, HttpError::After::kClose, "",
+                            "A chunk extension or the trailer is larger than maxHeaderBytes.");
+        }
+        if (n == 0) {
+            break;
+        }
+        taken += n;
+    }
+    return taken;
+}
+
 std::size_t HttpRequestParser::put(std::string_view bytes)
 {
     const std::size_t head = isHeaderDone() ? 0 : putHead(bytes);
-    if (!isHeaderDone() || isDone() || head == bytes.size()) {
+    if (!isHeaderDone() || isDone()) {
         return head;
     }
-    return head + parse(bytes.substr(head));
+    return head + putBody(bytes.substr(head));
 }
 
 bool HttpRequestParser::isHeaderDone() const

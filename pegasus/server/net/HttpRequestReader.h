@@ -23,8 +23,9 @@ class HttpRequestParser
     explicit HttpRequestParser(const HttpLimits& limits);
     ~HttpRequestParser();
 
-    // Feeds bytes. Returns: how many were taken; the rest has to be offered again, with more behind it.
-    // Throws: HttpError (501 no request line, 400 bad header, 413, 431).
+    // Feeds bytes. Returns: how many were taken; the rest has to be offered again, with more bytes after it. After the
+    // head, the rest of an unfinished request is shorter than maxHeaderBytes.
+    // Throws: HttpError (501 no request line, 400 bad header, 413 body, 431 head, chunk extension or trailer).
     std::size_t put(std::string_view bytes);
 
     bool isHeaderDone() const;
@@ -38,6 +39,7 @@ class HttpRequestParser
   private:
     std::size_t parse(std::string_view bytes);
     std::size_t putHead(std::string_view bytes);
+    std::size_t putBody(std::string_view bytes);
 
     struct Impl;
     std::unique_ptr<Impl> fImpl;

@@ -1,4 +1,5 @@
-// The HTTP layer without a server: bytes in, bytes out.
+// The HTTP layer without a server: bytes in, bytes out; what bounds them; what ends a connection.
+#include "pegasus/server/agent/AgentChannel.h"
 #include "pegasus/server/net/Acceptor.h"
 #include "pegasus/server/net/AnswerStream.h"
 #include "pegasus/server/net/CimAnswer.h"
@@ -59,6 +60,31 @@ TEST(HttpRequestParserTest, aCutRequestIsNeverDone)
         HttpRequestParser parser(HttpLimits{});
         parser.put(std::string_view(kRequest).substr(0, size));
         EXPECT_FALSE(parser.isDone()) << size;
+    }
+}
+
+// What a peer sends behind the head, however slowly, is bounded while it is kept.
+TEST(HttpRequestParserTest, unparsedBytesAreBounded)
+{
+    const HttpLimits limits = {200, 10'000};
+    const std::string head = "POST / HTTP/1.1\r\nTransfer-Encoding: chunked\r\n\r\n";
+    for (const std::string& start : {"5;" + std::string(), "0;" + std::string(), std::string("0\r\nX: ")}) {
+        for (const std::size_t piece : {std::size_t(1), std::size_t(150), std::size_t(100'000)}) {
+            SCOPED_TRACE(start + " in pieces of " + std::to_string(piece));
+            const std::string bytes = head + start + std::string(5000, 'x');
+            HttpRequestParser parser(limits);
+            std::string pending;
+            std::size_t longest = 0;
+            const auto feed = [&] {
+                for (std::size_t at = 0; at < bytes.size(); at += piece) {
+                    pending += bytes.substr(at, piece);
+                    pending.erase(0, parser.put(pending));
+                    longest = std::max(longest, pending.size());
+                }
+            };
+            EXPECT_THROW(feed(), HttpError);
+            EXPECT_LT(longest, limits.maxHeaderBytes);
+        }
     }
 }
 
@@ -241,6 +267,43 @@ TEST(AcceptorTest, outlivesAConnectionThatCannotBeServed)
     thread.join();
     group.breakAll();
     EXPECT_TRUE(group.waitForEnd(deadlineAfter(std::chrono::seconds(10))));
+}
+
+// An agent runs a vendor's code: its answers are bounded as a client's requests are.
+TEST(AgentChannelTest, unparsedBytesAreBounded)
+{
+    const std::string head = "HTTP/1.1 200 OK\r\nTransfer-Encoding: chunked\r\n\r\n";
+    for (const std::string& start : {std::string("HTTP/1.1 200 OK\r\nX: "), head + "5;", head + "0\r\nX: "}) {
+        SCOPED_TRACE(start);
+        int ends[2];
+        ASSERT_EQ(::socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, ends), 0);
+        std::size_t sent = 0;
+        std::thread agent([&, fd = Descriptor(ends[0])] {
+            std::string bytes = start;
+            for (bytes.resize(64u << 10, 'x'); sent < (16u << 20); bytes.assign(64u << 10, 'x')) {
+                const ssize_t n = ::send(fd.get(), bytes.data(), bytes.size(), MSG_NOSIGNAL);
+                if (n < 0) {
+                    return;
+                }
+                sent += static_cast<std::size_t>(n);
+            }
+        });
+        class : public ElementSink
+        {
+            void write(std::string_view) override {}
+        } nothing;
+        {
+            AgentChannel channel((Descriptor(ends[1])));
+            try {
+                channel.request(AgentRequest(), nothing, std::chrono::seconds(10));
+                ADD_FAILURE() << "accepted";
+            } catch (const AgentLost& error) {
+                EXPECT_STREQ(error.what(), "a head, chunk extension or trailer of more than 1048576 bytes");
+            }
+        }
+        agent.join();
+        EXPECT_LT(sent, 4u << 20);
+    }
 }
 
 struct Utf8Row

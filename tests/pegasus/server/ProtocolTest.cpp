@@ -342,10 +342,16 @@ std::unique_ptr<ServerTree> LimitsTest::fgTree;
 TEST_F(LimitsTest, eachLimitHasItsStatus)
 {
     const std::string spaces(2000, ' ');
+    const std::string kChunked = "POST / HTTP/1.1\r\nHost: x\r\nTransfer-Encoding: chunked\r\n\r\n";
+    const char* const kFraming = "A chunk extension or the trailer is larger than maxHeaderBytes.";
     const ErrorRow rows[] = {
         {"head", "POST / HTTP/1.1\r\nX: " + spaces + "\r\n\r\n", 431, "",
          "The request head is larger than maxHeaderBytes.", true},
         {"head without end", "POST / HTTP/1.1\r\nX: " + spaces + spaces, 431, "", "", true},
+        {"trailer", kChunked + "0\r\nX: " + spaces + "\r\n\r\n", 431, "", kFraming, true},
+        {"trailer without end", kChunked + "0\r\nX: " + spaces + spaces, 431, "", kFraming, true},
+        {"chunk extension", kChunked + "1;" + spaces + "\r\nx\r\n", 431, "", kFraming, true},
+        {"chunk extension without end", kChunked + "1;" + spaces + spaces, 431, "", kFraming, true},
         {"body", post(kCim, getClassBody() + spaces + spaces), 413, "", "The request body is larger than maxBodyBytes.",
          true},
         {"depth",
