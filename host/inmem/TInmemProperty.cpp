@@ -1,6 +1,6 @@
 #include "host/inmem/TInmemProperty.h"
 
-#include "host/inmem/PropertyText.h"
+#include "display/PropertyText.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMPropertyDecl.h>

@@ -1,7 +1,7 @@
 #include "src/schema/TPEGASUSProperty.h"
 
+#include "display/PropertyText.h"
 #include "src/schema/DeclaredType.h"
-#include "src/schema/PropertyDisplay.h"
 
 #include <host/ICIMPropertyDecl.h>
 
@@ -91,17 +91,17 @@ bool TPEGASUSProperty::IsPrevValueDifferent() const
 
 std::string TPEGASUSProperty::ToString() const
 {
-    return JoinDisplayTexts(DisplayTexts(fValue, fDeclaration.lock()));
+    return PropertyText(fValue, fDeclaration.lock());
 }
 
 std::string TPEGASUSProperty::PrevValueToString() const
 {
-    return JoinDisplayTexts(DisplayTexts(fPrevValue, fDeclaration.lock()));
+    return PropertyText(fPrevValue, fDeclaration.lock());
 }
 
 std::vector<std::string> TPEGASUSProperty::ToStringVector() const
 {
-    return DisplayTexts(fValue, fDeclaration.lock());
+    return PropertyTexts(fValue, fDeclaration.lock());
 }
 
 } // namespace NKOLVRX20

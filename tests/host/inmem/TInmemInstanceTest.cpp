@@ -7,18 +7,11 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <climits>
-
 namespace NKOLVRX20 {
 namespace {
 
 typedef TCIMValue::TCIMType TType;
 using testing::ElementsAre;
-
-TCIMValue Strings(const std::vector<std::string>& texts)
-{
-    return TCIMValue(TType::kString, 0, std::vector<TCIMValue>(texts.begin(), texts.end()));
-}
 
 boost::shared_ptr<TFakeClass> FanClass()
 {
@@ -97,66 +90,6 @@ TEST(TInmemInstance, ComparesAndCopiesByClassAndValues)
     EXPECT_TRUE(*static_cast<ICIMInstance*>(one.get()) == *two);
     same->ModifyInstance(two, TCIMContext());
     EXPECT_TRUE(*static_cast<ICIMInstance*>(same.get()) == *two);
-}
-
-struct TTextRow
-{
-    const char* fName;
-    TCIMValue fValue;
-    std::map<std::string, TCIMValue> fQualifiers;
-    std::vector<std::string> fTexts;
-};
-
-const std::map<std::string, TCIMValue> kRanges = {
-    {"ValueMap", Strings({"0", "1..4", "..", "-5", "10..", "word"})},
-    {"Values", Strings({"Unknown", "Low", "Other", "Minus five", "High", "Word"})}};
-
-const TTextRow kTexts[] = {
-    {"null", TCIMValue(TType(TType::kUint32), 0), {{"Units", TCIMValue("Bytes")}}, {}},
-    {"plain", TCIMValue(5), {}, {"5"}},
-    {"mapped", TCIMValue(0), kRanges, {"Unknown"}},
-    {"in a range", TCIMValue(4), kRanges, {"Low"}},
-    {"open range before the rest", TCIMValue(10), kRanges, {"High"}},
-    {"above 63 bits", TCIMValue(ULONG_MAX), kRanges, {"High"}},
-    {"the rest", TCIMValue(7), kRanges, {"Other"}},
-    {"exact before a range", TCIMValue(-5), kRanges, {"Minus five"}},
-    {"mapped string", TCIMValue("word"), kRanges, {"Word"}},
-    {"unmapped string", TCIMValue("words"), kRanges, {"words"}},
-    {"index without a map", TCIMValue(1), {{"Values", Strings({"zero", "one"})}}, {"one"}},
-    {"index out of range", TCIMValue(2), {{"Values", Strings({"zero", "one"})}}, {"2"}},
-    {"more entries than texts", TCIMValue(2), {{"ValueMap", Strings({"1", "2"})}, {"Values", Strings({"one"})}}, {"2"}},
-    {"unit", TCIMValue(5), {{"Units", TCIMValue("Bytes")}, {"PUnit", TCIMValue("byte")}}, {"5 Bytes"}},
-    {"programmatic unit", TCIMValue(1.5), {{"PUnit", TCIMValue("hertz")}}, {"1.5 hertz"}},
-    {"unit of a string", TCIMValue("5"), {{"Units", TCIMValue("Bytes")}}, {"5"}},
-    {"array", TCIMValue(TType(TType::kSint32), 0, {TCIMValue(0), TCIMValue(2)}), kRanges, {"Unknown", "Low"}},
-    {"characters",
-     TCIMValue(TType(TType::kChar16), 0,
-               {TCIMValue(TCIMChar16(0x53)), TCIMValue(TCIMChar16(0xe9)), TCIMValue(TCIMChar16(0x20ac)),
-                TCIMValue(TCIMChar16(0xd800))}),
-     {},
-     {"S", "\xc3\xa9", "\xe2\x82\xac", "\xef\xbf\xbd"}},
-    {"datetime", TCIMValue(TCIMDateTime("00000003040506.000000:000")), {}, {"3 days 04:05:06"}},
-};
-
-TEST(TInmemProperty, TextsComeFromTheDeclaration)
-{
-    for (const TTextRow& row : kTexts) {
-        SCOPED_TRACE(row.fName);
-        const auto fan = boost::make_shared<TFakeClass>("CIM_Fan");
-        const auto declaration = fan->Declare("X", row.fValue.GetType());
-        for (const auto& qualifier : row.fQualifiers) {
-            declaration->SetQualifier(qualifier.first, qualifier.second);
-        }
-        const auto instance = boost::make_shared<TInmemInstance>(fan, TCIMContext());
-        instance->SetPropertyValue("x", row.fValue, TCIMContext());
-        const auto property = instance->GetProperty("x", TCIMContext());
-        EXPECT_EQ(property->ToStringVector(), row.fTexts);
-        std::string joined;
-        for (const std::string& text : row.fTexts) {
-            joined += (joined.empty() ? "" : ", ") + text;
-        }
-        EXPECT_EQ(property->ToString(), joined);
-    }
 }
 
 TEST(TInmemProperty, OutlivesItsClassWithPlainText)

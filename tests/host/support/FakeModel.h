@@ -19,6 +19,8 @@
 #include <map>
 #include <vector>
 
+#include <strings.h>
+
 namespace NKOLVRX20 {
 
 [[noreturn]] inline void ThrowUnused()
@@ -53,7 +55,12 @@ class TFakeQualifier : public ICIMQualifier
     TCIMValue fValue;
 };
 
-// The qualifier block of an element; names are looked up as they were set.
+struct TNameOrder
+{
+    bool operator()(const std::string& x, const std::string& y) const { return strcasecmp(x.c_str(), y.c_str()) < 0; }
+};
+
+// The qualifier block of an element.
 template <typename Interface> class TFakeElement : public Interface
 {
   public:
@@ -86,7 +93,7 @@ template <typename Interface> class TFakeElement : public Interface
     }
 
   private:
-    std::map<std::string, boost::shared_ptr<ICIMQualifier>> fQualifiers;
+    std::map<std::string, boost::shared_ptr<ICIMQualifier>, TNameOrder> fQualifiers;
 };
 
 class TFakePropertyDecl : public TFakeElement<ICIMPropertyDecl>
