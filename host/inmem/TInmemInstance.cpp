@@ -1,5 +1,4 @@
-#include "host/inmem/NormalizedName.h"
-#include "host/inmem/ObjectPathText.h"
+#include "host/inmem/ObjectNames.h"
 #include "host/inmem/TInmemProperty.h"
 
 #include <host/ICIMClass.h>
@@ -31,6 +30,25 @@ std::string ClassNameOf(const ICIMInstance& instance)
 {
     const auto instanceClass = instance.GetClass(TCIMContext());
     return instanceClass ? instanceClass->GetName(TCIMContext()) : std::string();
+}
+
+// Returns: the property's value in the type that the class declares for it, so that the path does not depend on how the
+// value was set; the value itself where it does not convert.
+TCIMValue KeyValue(const ICIMProperty& property)
+{
+    TCIMValue value = property.GetValue(TCIMContext());
+    const auto declaration = property.GetDeclaration(TCIMContext());
+    const auto type = declaration ? declaration->GetType(TCIMContext()) : value.GetType();
+    if (value.IsNull() || value.GetType() == type) {
+        return value;
+    }
+    try {
+        TCIMValue declared(type, 0);
+        declared.Set(value.ToString(10));
+        return declared;
+    } catch (const TVRXException&) {
+        return value;
+    }
 }
 
 // The contract's property has no name of its own: it is its declaration's, unless the property is of this library.
@@ -93,17 +111,17 @@ TCIMReference TInmemInstance::GetReference(TCIMContext context) const
     if (!fClass) {
         return TCIMReference();
     }
-    TCIMContext keys;
+    std::vector<TKeyBinding> keys;
     fClass->EnumerateKeyNames(
         [&](const std::string* name) {
             const auto found = fProperties.find(NormalizedName(*name));
             if (found != fProperties.end()) {
-                keys[*name] = found->second->GetValue(context);
+                keys.emplace_back(*name, KeyValue(*found->second));
             }
             return true;
         },
         context);
-    TCIMReference reference(fClass->GetNamespace(context), keys);
+    TCIMReference reference(fClass->GetNamespace(context), TCIMContext(keys.begin(), keys.end()));
     reference.SetPath(ObjectPathText(fClass->GetName(context), keys));
     return reference;
 }

@@ -1,6 +1,6 @@
 #include "host/inmem/TInmemNamespace.h"
 
-#include "host/inmem/NormalizedName.h"
+#include "host/inmem/ObjectNames.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>

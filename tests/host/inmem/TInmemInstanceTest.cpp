@@ -7,6 +7,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <climits>
+
 namespace NKOLVRX20 {
 namespace {
 
@@ -57,15 +59,56 @@ TEST(TInmemInstance, UnknownPropertiesAreKeptAndMissingOnesThrow)
     EXPECT_THROW(fan->GetProperty("1st", TCIMContext()), TVRXException) << "a refused name left a property";
 }
 
-TEST(TInmemInstance, PathHoldsTheKeysInOrder)
+TEST(TInmemInstance, PathHoldsTheKeysInTheOrderOfTheClass)
 {
     const auto fanClass = FanClass();
     const auto ns = boost::make_shared<TInmemNamespace>();
     fanClass->fNamespace = ns;
     const TCIMReference reference = Fan(fanClass, 7)->BuildPath(TCIMContext());
-    EXPECT_EQ(reference.GetPath(), "CIM_Fan.DeviceID=7,SystemName=\"a\\\"b\\\\c\"");
+    EXPECT_EQ(reference.GetPath(), "CIM_Fan.SystemName=\"a\\\"b\\\\c\",DeviceID=7");
     EXPECT_EQ(reference.GetNamespace(), ns);
     EXPECT_EQ(reference.GetClassName(), "CIM_Fan");
+    EXPECT_EQ(reference.GetKeys().at("DeviceID"), TCIMValue(static_cast<unsigned short>(7)));
+}
+
+struct TKeyRow
+{
+    const char* fName;
+    TType::ECIMType fDeclared;
+    TCIMValue fValue;
+    const char* fText;
+};
+
+const TKeyRow kKeys[] = {
+    {"boolean", TType::kBoolean, TCIMValue(true), "TRUE"},
+    {"boolean set as text", TType::kBoolean, TCIMValue("false"), "FALSE"},
+    {"lowest integer", TType::kSint64, TCIMValue(LONG_MIN), "-9223372036854775808"},
+    {"integer of another width", TType::kUint8, TCIMValue(7), "7"},
+    {"integer set as text", TType::kUint8, TCIMValue("7"), "7"},
+    {"integer that does not convert", TType::kUint8, TCIMValue(300), "300"},
+    {"text in a numeric key", TType::kUint8, TCIMValue("x y"), "\"x y\""},
+    {"text of digits", TType::kString, TCIMValue(7), "\"7\""},
+    {"real64", TType::kReal64, TCIMValue(0.1), "1.0000000000000001e-01"},
+    {"real32", TType::kReal32, TCIMValue(0.5F), "5.0000000000000000e-01"},
+    {"real set as integer", TType::kReal64, TCIMValue(-3), "-3.0000000000000000e+00"},
+    {"longest real", TType::kReal64, TCIMValue(-1.7976931348623157e308), "-1.7976931348623157e+308"},
+    {"char16", TType::kChar16, TCIMValue(TCIMChar16(0x41)), "\"A\""},
+    {"char16 beyond ASCII", TType::kChar16, TCIMValue(TCIMChar16(0xe9)), "\"\xc3\xa9\""},
+    {"datetime", TType::kDatetime, TCIMValue(TCIMDateTime("00000003040506.000000:000")),
+     "\"00000003040506.000000:000\""},
+    {"null", TType::kString, TCIMValue(), "\"\""},
+};
+
+TEST(TInmemInstance, PathHoldsEachKeyInItsDeclaredType)
+{
+    for (const TKeyRow& row : kKeys) {
+        SCOPED_TRACE(row.fName);
+        const auto keyed = boost::make_shared<TFakeClass>("CIM_A");
+        keyed->Declare("K", row.fDeclared, true);
+        const auto instance = boost::make_shared<TInmemInstance>(keyed, TCIMContext());
+        instance->SetPropertyValue("k", row.fValue, TCIMContext());
+        EXPECT_EQ(instance->GetReference(TCIMContext()).GetPath(), std::string("CIM_A.K=") + row.fText);
+    }
 }
 
 TEST(TInmemInstance, EntersAndLeavesItsClass)

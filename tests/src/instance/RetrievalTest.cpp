@@ -135,6 +135,35 @@ TEST_F(RetrievalTest, TheRecordClassLogsWhatItJoins)
               fServed.Log());
 }
 
+// The path of the server's instance and the path that the host makes of the keys are the same text.
+TEST_F(RetrievalTest, AnInstanceIsFoundByItsOwnReference)
+{
+    const std::pair<const char*, CIMValue> keys[] = {
+        {"bText", Pegasus::String("a\"b")},
+        {"Aletter", Pegasus::Char16(0xe9)},
+        {"dReal", Pegasus::Real64(0.1)},
+        {"Csingle", Pegasus::Real32(0.1F)},
+        {"fFlag", true},
+        {"Enumber", Pegasus::Sint64(-5)},
+        {"_g", Pegasus::Uint64(1) << 63},
+        {"H1", CIMValue(Pegasus::CIMDateTime("00000003040506.000000:000"))},
+    };
+    Pegasus::CIMClass keyed{CIMName("CIM_A")};
+    Pegasus::CIMInstance instance{CIMName("CIM_A")};
+    for (const auto& [name, value] : keys) {
+        keyed.addProperty(Property(name, CIMValue(value.getType(), false), "Key"));
+        instance.addProperty(Property(name, value));
+    }
+    instance.setPath(instance.buildPath(keyed));
+    fServed.fModel.addClass(kNsp, keyed);
+    fServed.fModel.addInstance(kNsp, instance);
+    const auto target = fServed.Class("CIM_A");
+    const auto instances = Enumerate(*target);
+    ASSERT_EQ(1U, instances.size());
+    const TCIMReference reference = instances[0]->GetReference({});
+    EXPECT_TRUE(target->GetInstance(reference, {})) << reference.GetPath();
+}
+
 TEST_F(RetrievalTest, OneInstanceIsTheFirstWhosePathMatchesToTheLetter)
 {
     const auto target =
