@@ -1,11 +1,16 @@
 #include "host/core/TCoreLogger.h"
 
+#include "host/core/TUniqueFd.h"
+
 #define SPDLOG_PREVENT_CHILD_FD // the file is close-on-exec
 #include <host/TVRXException.h>
 
 #include <spdlog/logger.h>
 #include <spdlog/sinks/basic_file_sink.h>
 #include <spdlog/sinks/stdout_sinks.h>
+
+#include <fcntl.h>
+#include <sys/stat.h>
 
 namespace NKOLVRX20 {
 
@@ -33,6 +38,23 @@ spdlog::level::level_enum ToLevel(ILogger::EVRXLogSeverity severity)
     }
 }
 
+// The log holds what vendors print, and its folder may be anybody's: it is created for the user alone, and a link, a
+// FIFO or another user's file at its path is refused.
+TUniqueFd OpenPrivateFile(const std::string& path)
+{
+    constexpr mode_t kOwnerOnly = 0600;
+    TUniqueFd file(
+        ::open(path.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY, kOwnerOnly));
+    struct stat status = {};
+    if (!file || ::fstat(file.Get(), &status) != 0 || S_ISFIFO(status.st_mode)) {
+        throw TVRXException(TVRXStatusCode::kBadPath);
+    }
+    if (S_ISREG(status.st_mode) && (status.st_uid != ::geteuid() || ::fchmod(file.Get(), kOwnerOnly) != 0)) {
+        throw TVRXException(TVRXStatusCode::kBadPath);
+    }
+    return file;
+}
+
 } // namespace
 
 TCoreLogger& TCoreLogger::Instance()
@@ -55,10 +77,12 @@ TCoreLogger::~TCoreLogger() = default;
 void TCoreLogger::Configure(const TOptions& options)
 {
     const auto sinks = std::make_shared<TSinks>();
+    TUniqueFd file; // until the sink has opened the very file that was checked
     try {
         if (!options.fFile.empty()) {
-            sinks->fLogger.sinks().push_back(
-                std::make_shared<spdlog::sinks::basic_file_sink_mt>(options.fFile, options.fTruncate));
+            file = OpenPrivateFile(options.fFile);
+            sinks->fLogger.sinks().push_back(std::make_shared<spdlog::sinks::basic_file_sink_mt>(
+                "/proc/self/fd/" + std::to_string(file.Get()), options.fTruncate));
         }
         if (options.fToStandardError) {
             sinks->fLogger.sinks().push_back(std::make_shared<spdlog::sinks::stderr_sink_mt>());

@@ -15,7 +15,7 @@ class TCoreLogger : public ILogger
   public:
     struct TOptions
     {
-        std::string fFile;      // empty for none; created with mode 0666 less the umask
+        std::string fFile;      // empty for none; has mode 0600, and links are not followed
         bool fTruncate = false; // what the file holds already is dropped rather than appended to
         bool fToStandardError = false;
         EVRXLogSeverity fLeastSevere = kInfo; // entries beyond this severity are dropped
