@@ -1,3 +1,11 @@
+# The mark of a deployed tree.
+set(VRX_TREE_SERVER embedded)
+if(PEGASUS_ROOT)
+  set(VRX_TREE_SERVER "installed OpenPegasus")
+endif()
+configure_file(${CMAKE_CURRENT_LIST_DIR}/tree.conf.in ${PROJECT_BINARY_DIR}/tree.conf @ONLY)
+install(FILES ${PROJECT_BINARY_DIR}/tree.conf DESTINATION ${VRX_DEST_PEGASUS})
+
 # What a host's developer gets beside the deployed tree (headers, and a package for find_package), and the Debian
 # package of both. Everything lies under one folder.
 include(CMakePackageConfigHelpers)

@@ -39,7 +39,7 @@ if(NOT CMAKE_CXX_FLAGS MATCHES "-fsanitize")
   target_link_options(vrx_strict_link INTERFACE -Wl,-z,defs)
 endif()
 
-# The deployed tree R: R/vrxhost, R/lib*.so, R/pegasus/{bin,lib,provider,pegSchema}.
+# The deployed tree R: R/vrxhost, R/lib*.so, R/pegasus/{tree.conf,bin,lib,provider,pegSchema}.
 set(VRX_DEST_ROOT .)
 set(VRX_DEST_PEGASUS pegasus)
 set(VRX_DEST_PEGASUS_BIN pegasus/bin)
@@ -47,3 +47,16 @@ set(VRX_DEST_PEGASUS_LIB pegasus/lib)
 set(VRX_DEST_PROVIDER pegasus/provider)
 set(VRX_DEST_SCHEMA pegasus/pegSchema)
 set(CMAKE_BUILD_WITH_INSTALL_RPATH OFF)
+# vrxhost and the server refuse a tree that others may write, and everybody may read one, so the modes must not depend on
+# the umask of who stages it. Files get theirs (644, 755) from install(); a folder would be subject to the umask.
+install(CODE [[
+  foreach(folder "" include include/host lib lib/cmake lib/cmake/pegasus-nsp pegasus pegasus/bin pegasus/lib
+                 pegasus/pegSchema pegasus/pegSchema/PG_InterOp pegasus/pegSchema/PG_Internal
+                 pegasus/provider pegasus/provider/linux)
+    set(path "$ENV{DESTDIR}${CMAKE_INSTALL_PREFIX}/${folder}")
+    if(NOT EXISTS "${path}" OR folder MATCHES "^pegasus")
+      file(MAKE_DIRECTORY "${path}")
+      file(CHMOD "${path}" PERMISSIONS
+        OWNER_READ OWNER_WRITE OWNER_EXECUTE GROUP_READ GROUP_EXECUTE WORLD_READ WORLD_EXECUTE)
+    endif()
+  endforeach()]])

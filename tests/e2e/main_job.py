@@ -14,7 +14,7 @@ from tree import Tree, wait_until
 
 BUILD = sys.argv[1] if len(sys.argv) > 1 else None
 SOURCE = os.path.dirname(os.path.dirname(os.path.dirname(os.path.abspath(__file__))))
-COMPLETE, FAILED, PARTIAL, INTERRUPTED = 0, 1, 3, 130
+COMPLETE, FAILED, USAGE, PARTIAL, INTERRUPTED = 0, 1, 2, 3, 130
 
 
 def instances(document, class_name):
@@ -46,6 +46,20 @@ class TreeTest(unittest.TestCase):
 
     def assert_nothing_left(self):
         self.assertEqual(self.tree.leftovers(), [])
+
+
+class Staging(TreeTest):
+    """What is laid down can be used whatever the umask was: nobody but its owner may write it, everybody may read it."""
+
+    def test_modes_under_every_umask(self):
+        for umask in (0, 0o002, 0o077):
+            root = self.tree.path(f"umask-{umask:o}")
+            subprocess.run(["cmake", "--install", BUILD, "--prefix", root], check=True, stdout=subprocess.DEVNULL,
+                           umask=umask)
+            modes = {path: os.stat(path).st_mode & 0o7777
+                     for folder, _, names in os.walk(root) for path in [folder, *(os.path.join(folder, n) for n in names)]}
+            self.assertEqual({path: f"{mode:o}" for path, mode in modes.items() if mode not in (0o755, 0o644)}, {})
+            self.assertIn(os.path.join(root, "pegasus", "tree.conf"), modes)
 
 
 class HealthyTree(TreeTest):
@@ -135,9 +149,10 @@ class BrokenTree(TreeTest):
 
     def test_no_server_program(self):
         os.unlink(self.tree.path("pegasus", "bin", "cimserver"))
-        got, _, err = self.tree.inventory()
-        self.assertEqual(got, FAILED, err)
+        got, document, err = self.tree.inventory()
+        self.assertEqual(got, USAGE, err)
         self.assertIn("cimserver", err)
+        self.assertFalse(document["complete"])
         self.assert_nothing_left()
 
     def remove_tree(self, *parts):

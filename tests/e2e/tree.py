@@ -12,10 +12,20 @@ RUN_SECONDS = 120
 
 
 class Tree:
-    """A private copy of the deployed tree with a consumer name that no other test uses."""
+    """A private copy of the deployed tree with a consumer name that no other test uses.
+
+    Runs start in a folder that looks like a root, as somebody's source tree or own OpenPegasus does, and must leave it
+    as it is.
+    """
 
     def __init__(self, build):
-        self.root = tempfile.mkdtemp(prefix="vrx-e2e-")
+        self.folder = tempfile.mkdtemp(prefix="vrx-e2e-")
+        self.root = os.path.join(self.folder, "tree")
+        self.elsewhere = os.path.join(self.folder, "elsewhere")
+        self.precious = os.path.join(self.elsewhere, "pegasus", "repository", "precious")
+        os.makedirs(os.path.dirname(self.precious))
+        with open(self.precious, "w", encoding="ascii"):
+            pass
         self.consumer = "e2e-" + uuid.uuid4().hex[:12]
         subprocess.run(["cmake", "--install", build, "--prefix", self.root], check=True, stdout=subprocess.DEVNULL)
 
@@ -31,7 +41,7 @@ class Tree:
 
     def start(self, *arguments, **keywords):
         command = [self.path("vrxhost"), *arguments, "--consumer", self.consumer]
-        return subprocess.Popen(command, cwd=self.root, stdin=subprocess.DEVNULL, stdout=subprocess.PIPE,
+        return subprocess.Popen(command, cwd=self.elsewhere, stdin=subprocess.DEVNULL, stdout=subprocess.PIPE,
                                 stderr=subprocess.PIPE, text=True, **keywords)
 
     def run(self, *arguments):
@@ -68,6 +78,9 @@ class Tree:
             time.sleep(0.05)
         left = [f"process {pid}" for pid in self.processes()]
         left += [path for path in (self.start_file, self.path("pegasus", "repository")) if os.path.lexists(path)]
+        found = [os.path.join(folder, name) for folder, _, names in os.walk(self.elsewhere) for name in names]
+        if found != [self.precious]:
+            left.append(f"{found} instead of {self.precious}")
         return left
 
     def remove(self):
@@ -75,7 +88,7 @@ class Tree:
             os.kill(pid, signal.SIGKILL)
         if os.path.lexists(self.start_file):
             os.unlink(self.start_file)
-        shutil.rmtree(self.root, ignore_errors=True)
+        shutil.rmtree(self.folder, ignore_errors=True)
 
 
 def wait_until(condition, seconds, what):
