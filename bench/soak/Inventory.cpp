@@ -1,6 +1,6 @@
 #include "bench/soak/Inventory.h"
 
-#include "host/cli/Guard.h"
+#include "host/cli/ErrorReport.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>
@@ -17,7 +17,7 @@
 namespace soak {
 
 using namespace NKOLVRX20;
-using vrxhost::Guarded;
+using vrxhost::ErrorOf;
 
 namespace {
 
@@ -36,7 +36,7 @@ std::string TextOf(const ICIMInstance& instance, const std::string& property)
 std::vector<boost::shared_ptr<ICIMInstance>> InstancesOf(ICIMClass& each)
 {
     std::vector<boost::shared_ptr<ICIMInstance>> instances;
-    Guarded([&] {
+    ErrorOf([&] {
         each.EnumerateInstances(
             [&](boost::shared_ptr<ICIMInstance> instance) {
                 instances.push_back(std::move(instance));
@@ -50,7 +50,7 @@ std::vector<boost::shared_ptr<ICIMInstance>> InstancesOf(ICIMClass& each)
 bool HasProbeValues(const ICIMInstance& instance, std::set<unsigned long>& numbers)
 {
     bool right = false;
-    Guarded([&] {
+    ErrorOf([&] {
         const unsigned long number = std::stoul(TextOf(instance, "Id").substr(kIdPrefixBytes));
         const unsigned long value = instance.GetProperty("N1", {})->GetValue({});
         right = number < kProbeCount && value == number * kProbeFactor && numbers.insert(number).second;
@@ -67,7 +67,7 @@ TInventory::TInventory(ICIMNamespace& ns) : fNamespace(ns)
     std::vector<boost::shared_ptr<IProvider>> providers;
     TCIMContext context;
     context["pluginType"] = TCIMValue(kPluginType);
-    Guarded([&] {
+    ErrorOf([&] {
         fNamespace.EnumerateProviders(
             [&](boost::shared_ptr<IProvider> provider) {
                 const std::lock_guard<std::mutex> lock(mutex);
@@ -123,7 +123,7 @@ EAnswer TInventory::InvokeEcho(const std::string& text)
     const TCIMContext inputs = {{"Text", TCIMValue(text)}};
     TCIMContext outputs;
     TCIMValue result;
-    Guarded([&] { result = probe->InvokeMethod(target, "Echo", inputs, outputs, {}); });
+    ErrorOf([&] { result = probe->InvokeMethod(target, "Echo", inputs, outputs, {}); });
     if (result.IsNull()) {
         return EAnswer::kLess;
     }
@@ -149,7 +149,7 @@ pid_t TInventory::ProbeProcess()
     TCIMContext none;
     TCIMValue result;
     if (fProbe) {
-        Guarded([&] { result = fProbe->InvokeMethod("ProcessId", none, {}); });
+        ErrorOf([&] { result = fProbe->InvokeMethod("ProcessId", none, {}); });
     }
     return result.IsNull() ? 0 : static_cast<pid_t>(static_cast<unsigned int>(result));
 }

@@ -5,7 +5,7 @@
 #include "bench/soak/Faults.h"
 #include "bench/soak/Inventory.h"
 #include "bench/soak/Resources.h"
-#include "host/cli/Guard.h"
+#include "host/cli/ErrorReport.h"
 #include "host/cli/TPrivateServer.h"
 #include "host/cli/TSession.h"
 #include "host/core/TProcessLog.h"
@@ -148,7 +148,7 @@ void TSoak::Cycle(EFault fault)
 {
     ::alarm(kHungSeconds);
     TConfig::GetInstance()->setValue("pegasus_multi_thread", fCounts.fCycles % 2 == 0 ? "off" : "on");
-    const std::string error = vrxhost::Guarded([&] {
+    const std::string error = vrxhost::ErrorOf([&] {
         vrxhost::TSession session(fRoot + "/libpegasus.nsp.so", fConsumer);
         UseNamespace(session.GetNamespace(), fault);
         const std::string problem = session.Close();

@@ -1,4 +1,4 @@
-// What vrxhost shows: plain data that owes nothing to the plug-in, so that it outlives it.
+// What vrxhost shows: plain data without a trace of the plug-in's objects, so that it outlives the plug-in.
 #pragma once
 
 #include "host/cli/Options.h"
@@ -14,7 +14,7 @@ struct TPropertyRecord
 {
     std::string fName;
     NKOLVRX20::TCIMValue fValue; // a reference travels as its path text
-    std::string fText;           // for a person; empty for null
+    std::string fText;           // human-readable; empty for null
 };
 
 struct TInstanceRecord
@@ -67,5 +67,13 @@ struct TDocument
     std::vector<std::string> fLosses;        // sentences
     bool fComplete = true;
 };
+
+// Returns: human-readable text; null properties are left out and control bytes are shown as escapes.
+std::string RenderTable(const TDocument& document);
+
+// Returns: one JSON document (UTF-8, ends with a newline) with true types: numbers (64 bits exact), booleans, null,
+// arrays; datetimes and references as strings, a char16 as a one-character string. Bytes outside UTF-8 become U+FFFD, a
+// real that is not finite becomes null.
+std::string RenderJson(const TDocument& document);
 
 } // namespace vrxhost

@@ -11,22 +11,15 @@ namespace {
 namespace fs = std::filesystem;
 
 constexpr char kFooter[] =
-    "Everything runs in the root directory: the working directory if it holds a folder \"pegasus\", else the "
-    "program's.\n"
+    "Everything runs in the root directory, a deployed tree: the program's own folder unless --root names another.\n"
     "Standard output carries the document alone; what was lost is said on standard error.\n"
     "Exit status: 0 complete, 1 failed, 2 wrong usage, 3 partial (something was lost), 130 interrupted.";
 
+// Never the working directory, which may be anybody's.
+// Throws: std::filesystem::filesystem_error.
 fs::path ProgramDirectory()
 {
-    std::error_code error;
-    const fs::path program = fs::read_symlink("/proc/self/exe", error);
-    return error ? fs::current_path() : program.parent_path();
-}
-
-std::string DefaultRoot()
-{
-    const fs::path here = fs::current_path();
-    return fs::is_directory(here / "pegasus") ? here : ProgramDirectory();
+    return fs::read_symlink("/proc/self/exe").parent_path();
 }
 
 // Paths are the user's, from where the program was started; later the root becomes the working directory.
@@ -96,21 +89,26 @@ void FillDefaults(TOptions& options, const std::vector<std::string>& settings)
         MakeAbsolute(*path);
     }
     if (options.fRoot.empty()) {
-        options.fRoot = DefaultRoot();
+        options.fRoot = ProgramDirectory();
     }
     if (options.fPlugin.empty()) {
         options.fPlugin = ProgramDirectory() / kPluginFile;
     }
+}
+
+} // namespace
+
+void SetRoot(const std::string& root, TOptions& options)
+{
+    options.fRoot = root;
     if (options.fLogFile.empty()) {
-        options.fLogFile = fs::path(options.fRoot) / kLogFile;
+        options.fLogFile = fs::path(root) / kLogFile;
     }
-    const fs::path config = fs::path(options.fRoot) / kConfigFile;
+    const fs::path config = fs::path(root) / kConfigFile;
     if (options.fConfigFile.empty() && fs::exists(config)) {
         options.fConfigFile = config;
     }
 }
-
-} // namespace
 
 int ParseOptions(int argc, const char* const* argv, TOptions& options)
 {

@@ -35,11 +35,11 @@ struct TOptions
     ECommand fCommand = ECommand::kInventory;
     std::string fClassName; // of kInstances
     EFormat fFormat = EFormat::kTable;
-    std::string fRoot;   // the directory in which everything runs; see DefaultRoot
-    std::string fPlugin; // empty: kPluginFile beside the program
-    std::string fConsumer;
-    std::string fConfigFile; // empty: kConfigFile in the root, if there is one
-    std::string fLogFile;    // empty: kLogFile in the root
+    std::string fRoot; // the directory in which everything runs
+    std::string fPlugin;
+    std::string fConsumer;   // empty: the default
+    std::string fConfigFile; // empty: none
+    std::string fLogFile;
     std::vector<std::pair<std::string, std::string>> fSettings;
     bool fVerbose = false;
 };
@@ -52,5 +52,8 @@ constexpr char kDefaultConsumer[] = "quvex";
 // Reads the command line; paths come out absolute. Help goes to standard output, errors to standard error.
 // Returns: -1 to go on with the options, else the exit status.
 int ParseOptions(int argc, const char* const* argv, TOptions& options);
+
+// Makes a checked directory the root, and the place of the settings file and the log unless the user named others.
+void SetRoot(const std::string& root, TOptions& options);
 
 } // namespace vrxhost

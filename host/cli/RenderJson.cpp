@@ -1,5 +1,5 @@
 #include "display/PropertyText.h"
-#include "host/cli/Render.h"
+#include "host/cli/Document.h"
 
 #include <nlohmann/json.hpp>
 

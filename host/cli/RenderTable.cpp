@@ -1,4 +1,4 @@
-#include "host/cli/Render.h"
+#include "host/cli/Document.h"
 
 #include <algorithm>
 #include <cstdio>

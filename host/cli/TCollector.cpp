@@ -1,6 +1,6 @@
 #include "host/cli/TCollector.h"
 
-#include "host/cli/Guard.h"
+#include "host/cli/ErrorReport.h"
 #include "host/inmem/TInmemProperty.h"
 
 #include <host/ICIMClass.h>
@@ -114,7 +114,7 @@ std::vector<TProviderRecord> TCollector::Collect(ECommand command, const std::st
 
 void TCollector::Ask(const std::string& what, const std::function<void()>& question)
 {
-    const std::string error = Guarded(question);
+    const std::string error = ErrorOf(question);
     if (!error.empty() && !fIsStopped()) {
         fLosses.Add(what + ": " + error);
     }

@@ -1,6 +1,6 @@
 #include "host/cli/TPluginLibrary.h"
 
-#include "host/cli/Guard.h"
+#include "host/cli/ErrorReport.h"
 
 #include <host/INamespaceProviderManager.h>
 #include <host/PluginSymbols.h>
@@ -48,7 +48,7 @@ bool AwaitThreadCount(std::size_t count)
 
 TPluginLibrary::TPluginLibrary(const std::string& path) : fPath(path), fThreadCountBefore(ThreadCount())
 {
-    const std::string error = Guarded([this] { fHandle = ::dlopen(fPath.c_str(), RTLD_NOW | RTLD_LOCAL); });
+    const std::string error = ErrorOf([this] { fHandle = ::dlopen(fPath.c_str(), RTLD_NOW | RTLD_LOCAL); });
     if (!error.empty()) {
         throw TPluginError("the plug-in " + fPath + " could not be loaded: " + error);
     }
@@ -88,12 +88,12 @@ void TPluginLibrary::Register()
 {
     const TEntryPoint initialize = Symbol(NKOLVRX20::kInitializeSymbol);
     fClearNamespace = Symbol(NKOLVRX20::kClearNamespaceSymbol);
-    std::string error = Guarded([&] { initialize(); });
+    std::string error = ErrorOf([&] { initialize(); });
     if (!error.empty()) {
         throw TPluginError("the plug-in " + fPath + " could not be initialised: " + error);
     }
     error =
-        Guarded([&] { fProvider = TRootObject::GetNamespaceProviderManager()->GetNamespaceProvider(kProviderName); });
+        ErrorOf([&] { fProvider = TRootObject::GetNamespaceProviderManager()->GetNamespaceProvider(kProviderName); });
     if (!error.empty()) {
         throw TPluginError("the plug-in " + fPath + " could not be asked for its name: " + error);
     }
@@ -110,7 +110,7 @@ void TPluginLibrary::Unregister()
 
 std::string TPluginLibrary::Unload()
 {
-    std::string problems = Guarded([this] { fClearNamespace(); });
+    std::string problems = ErrorOf([this] { fClearNamespace(); });
     if (!problems.empty()) {
         problems = "the plug-in could not shut its namespace down: " + problems;
     }

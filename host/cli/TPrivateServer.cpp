@@ -14,7 +14,7 @@ extern "C" {
 #include <sys/pidfd.h> // C only in glibc 2.36
 }
 
-#include "host/cli/Guard.h"
+#include "host/cli/ErrorReport.h"
 #include "host/core/TProcessLog.h"
 #include "host/core/TUniqueFd.h"
 
@@ -64,7 +64,7 @@ std::string TPrivateServer::SetConsumer() const
                                                   "LD_LIBRARY_PATH=" + fRoot + "/pegasus/lib:" + fRoot,
                                                   "PATH=/usr/bin:/bin"};
     std::string output;
-    const std::string error = Guarded([&] {
+    const std::string error = ErrorOf([&] {
         NKOLVRX20::TOSSpecific::SpawnProcess("cimconfig", {"-s", "consumer=" + fConsumer, "-p"},
                                              fRoot + "/pegasus/bin/cimconfig", environment, output,
                                              kConfigTimeoutSeconds);

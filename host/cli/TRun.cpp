@@ -1,8 +1,7 @@
 #include "host/cli/TRun.h"
 
-#include "host/cli/Guard.h"
-#include "host/cli/Render.h"
-#include "host/cli/Say.h"
+#include "host/cli/Document.h"
+#include "host/cli/ErrorReport.h"
 #include "host/cli/TCollector.h"
 #include "host/cli/TSession.h"
 #include "host/core/TProcessControl.h"
@@ -55,7 +54,7 @@ void TRun::Interrupt()
 void TRun::LoadSettings() const
 {
     if (!fOptions.fConfigFile.empty()) {
-        const std::string error = Guarded([&] { TConfig::GetInstance()->Load(fOptions.fConfigFile); });
+        const std::string error = ErrorOf([&] { TConfig::GetInstance()->Load(fOptions.fConfigFile); });
         if (!error.empty()) {
             throw TPluginError("the settings file " + fOptions.fConfigFile + " could not be read: " + error);
         }
@@ -94,7 +93,7 @@ void TRun::UsePlugin()
 
 void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
 {
-    const std::string error = Guarded([&] {
+    const std::string error = ErrorOf([&] {
         TCollector collector(ns, fLosses, [this] { return fStop.IsStopped(); });
         fDocument.fProviders = collector.Collect(fOptions.fCommand, fOptions.fClassName);
     });
@@ -120,7 +119,7 @@ void TRun::Write()
     fWriteError = fOutput.Write(text, fStop.GetFd());
     // A reader that has seen enough is no failure worth a word.
     if (fWriteError != 0 && fWriteError != EPIPE && fWriteError != ECANCELED) {
-        Say(std::string("the document could not be written: ") + std::strerror(fWriteError));
+        ReportError(std::string("the document could not be written: ") + std::strerror(fWriteError));
     }
 }
 
@@ -145,14 +144,14 @@ void TRun::TellLosses()
 {
     const auto sentences = fLosses.GetSentences();
     for (; fToldCount < sentences.size(); ++fToldCount) {
-        Say(sentences[fToldCount]);
+        ReportError(sentences[fToldCount]);
     }
 }
 
 EExitStatus TRun::GetStatus() const
 {
     if (fStop.IsStopped()) {
-        Say("interrupted");
+        ReportError("interrupted");
         return kInterrupted;
     }
     if (fFailed || fWriteError != 0) {

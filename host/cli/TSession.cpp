@@ -1,6 +1,6 @@
 #include "host/cli/TSession.h"
 
-#include "host/cli/Guard.h"
+#include "host/cli/ErrorReport.h"
 #include "host/core/TProcessControl.h"
 #include "host/inmem/TInmemNamespace.h"
 
@@ -35,7 +35,7 @@ TSession::TSession(const std::string& pluginPath, const std::string& consumer)
     : fRepository(boost::make_shared<TInmemNamespace>()), fUpcall(boost::make_shared<TInmemNamespace>()),
       fPlugin(pluginPath)
 {
-    std::string error = Guarded([&] { Allocate(consumer); });
+    std::string error = ErrorOf([&] { Allocate(consumer); });
     if (!error.empty()) {
         if (error.find(TVRXStatusCode(TVRXStatusCode::kDirectoryNotOpened).TranslateStatusCode()) == 0) {
             error += ": " + ProviderTree(pluginPath) + " or a folder in it";

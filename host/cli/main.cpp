@@ -1,6 +1,9 @@
 // vrxhost: a command-line host for a namespace-provider plug-in.
+#include "host/cli/Document.h"
+#include "host/cli/ErrorReport.h"
 #include "host/cli/Options.h"
-#include "host/cli/Say.h"
+#include "host/cli/TDeployedTree.h"
+#include "host/cli/TOwnerCheck.h"
 #include "host/cli/TPluginLibrary.h"
 #include "host/cli/TRun.h"
 #include "host/core/TCoreLogger.h"
@@ -11,7 +14,9 @@
 #include <cerrno>
 #include <csignal>
 #include <cstring>
+#include <filesystem>
 #include <iostream>
+#include <stdexcept>
 
 #include <fcntl.h>
 #include <sys/file.h>
@@ -33,39 +38,64 @@ void OpenLog(const TOptions& options)
     try {
         TCoreLogger::Instance().Configure(log);
     } catch (const NKOLVRX20::TVRXException&) {
-        Say("the log file " + options.fLogFile + " could not be opened; going on without");
+        ReportError("the log file " + options.fLogFile + " could not be opened; the run goes on without");
         log.fFile.clear();
         TCoreLogger::Instance().Configure(log);
     }
 }
 
+// What runs below the root, and below the plug-in where that lies in another tree, is run as the user.
+// Throws: TTreeError.
+void CheckOwners(const TOptions& options)
+{
+    TOwnerCheck owners;
+    owners.CheckTree(options.fRoot);
+    const std::filesystem::path plugin = options.fPlugin;
+    if (!std::filesystem::exists(plugin)) {
+        return; // loading it reports that
+    }
+    owners.CheckFile(plugin);
+    if (plugin.parent_path() != options.fRoot && std::filesystem::exists(plugin.parent_path() / "pegasus")) {
+        owners.CheckTree(plugin.parent_path());
+    }
+}
+
 // Enters the root and keeps every other vrxhost out of it: two hosts would stop each other's server.
-// Returns: the lock, none when it failed and was told.
+// Returns: the lock.
+// Throws: std::runtime_error with the reason as a sentence.
 NKOLVRX20::TUniqueFd EnterRoot(const std::string& root)
 {
     NKOLVRX20::TUniqueFd directory(::open(root.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
     if (!directory || ::fchdir(directory.Get()) != 0) {
-        Say("the root directory " + root + " could not be entered: " + std::strerror(errno));
-    } else if (::flock(directory.Get(), LOCK_EX | LOCK_NB) != 0) {
-        Say(errno == EWOULDBLOCK ? "another vrxhost is at work in " + root
-                                 : "the root directory " + root + " could not be locked: " + std::strerror(errno));
-    } else {
-        return directory;
+        throw std::runtime_error("the root directory " + root + " could not be entered: " + std::strerror(errno));
     }
-    return NKOLVRX20::TUniqueFd();
+    if (::flock(directory.Get(), LOCK_EX | LOCK_NB) != 0) {
+        throw std::runtime_error(errno == EWOULDBLOCK
+                                     ? "another vrxhost is at work in " + root
+                                     : "the root directory " + root + " could not be locked: " + std::strerror(errno));
+    }
+    return directory;
 }
 
-int Main(int argc, const char* const* argv)
+// Before there is a run: the reason, and for a reader of JSON a document without providers.
+EExitStatus Refuse(const TOptions& options, const std::string& reason, EExitStatus status)
 {
-    TOptions options;
-    const int status = ParseOptions(argc, argv, options);
-    if (status >= 0) {
-        return status;
+    ReportError(reason);
+    if (options.fFormat == EFormat::kJson) {
+        TDocument document;
+        document.fCommand = options.fCommand;
+        document.fComplete = false;
+        document.fLosses.push_back(reason);
+        std::cout << RenderJson(document) << std::flush;
     }
+    return status;
+}
+
+EExitStatus Run(TOptions& options)
+{
+    SetRoot(TDeployedTree(options.fRoot).GetRoot(), options);
+    CheckOwners(options);
     const NKOLVRX20::TUniqueFd rootLock = EnterRoot(options.fRoot);
-    if (!rootLock) {
-        return kFailed;
-    }
     std::signal(SIGPIPE, SIG_IGN); // a reader that has gone is a write error here
     OpenLog(options);
     TRun run(options);
@@ -76,6 +106,22 @@ int Main(int argc, const char* const* argv)
     return result;
 }
 
+int Main(int argc, const char* const* argv)
+{
+    TOptions options;
+    const int status = ParseOptions(argc, argv, options);
+    if (status >= 0) {
+        return status;
+    }
+    try {
+        return Run(options);
+    } catch (const TTreeError& e) {
+        return Refuse(options, e.what(), kUsage);
+    } catch (const std::runtime_error& e) {
+        return Refuse(options, e.what(), kFailed);
+    }
+}
+
 } // namespace
 } // namespace vrxhost
 
@@ -84,7 +130,7 @@ int main(int argc, char** argv)
     try {
         return vrxhost::Main(argc, argv);
     } catch (const std::exception& e) {
-        std::cerr << "vrxhost: " << e.what() << std::endl;
+        vrxhost::ReportError(e.what());
         return vrxhost::kFailed;
     }
 }

@@ -1,94 +1,20 @@
 // vrxhost as a program, with a plug-in that misbehaves on demand: what it prints, what it says and how it exits.
-#include "host/core/TChildProcess.h"
 #include "host/core/TUniqueFd.h"
+#include "tests/host/cli/VrxhostProgram.h"
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
-
-#include <filesystem>
-#include <fstream>
-#include <sstream>
 
 #include <fcntl.h>
 #include <sys/file.h>
-#include <sys/stat.h>
-#include <unistd.h>
 
+namespace vrxhost {
 namespace {
 
-namespace fs = std::filesystem;
-using NKOLVRX20::TChildProcess;
-using NKOLVRX20::TProcessOutcome;
-using NKOLVRX20::TProcessRequest;
 using testing::HasSubstr;
 using testing::Not;
 
-constexpr std::chrono::seconds kDeadline{60};
-
-std::string ReadFile(const fs::path& path)
-{
-    std::stringstream text;
-    text << std::ifstream(path).rdbuf();
-    return text.str();
-}
-
-// A root directory of each test's own.
-class Vrxhost : public testing::Test
-{
-  protected:
-    Vrxhost() : fRoot(fs::path(testing::TempDir()) / ("vrxhost-" + std::to_string(::getpid())))
-    {
-        fs::remove_all(fRoot);
-        fs::create_directories(fRoot);
-    }
-    ~Vrxhost() override { fs::remove_all(fRoot); }
-
-    TProcessOutcome Start(const std::vector<std::string>& command) const
-    {
-        TProcessRequest request;
-        request.fProgram = command.front();
-        request.fArguments = command;
-        request.fInheritEnvironment = true;
-        return TChildProcess(request).Run(kDeadline);
-    }
-
-    std::vector<std::string> Command(const std::vector<std::string>& arguments, const std::string& fault = "") const
-    {
-        std::vector<std::string> command = {VRXHOST,     "--root", fRoot,           "--plugin",
-                                            FAKE_PLUGIN, "--set",  "fault=" + fault};
-        command.insert(command.end(), arguments.begin(), arguments.end());
-        return command;
-    }
-
-    TProcessOutcome Run(const std::vector<std::string>& arguments, const std::string& fault = "") const
-    {
-        return Start(Command(arguments, fault));
-    }
-
-    // A program of the tree, as a shell script.
-    void Install(const std::string& name, const std::string& script) const
-    {
-        fs::create_directories(fRoot / "pegasus/bin");
-        std::ofstream(fRoot / "pegasus/bin" / name) << "#!/bin/sh\n" << script;
-        ::chmod((fRoot / "pegasus/bin" / name).c_str(), 0700);
-    }
-
-    bool IsCleared() const { return fs::exists(fRoot / "cleared"); }
-
-    const fs::path fRoot;
-};
-
-testing::AssertionResult HasStatus(const TProcessOutcome& outcome, int status)
-{
-    if (outcome.fEnd == TProcessOutcome::kExited && outcome.fStatus == status) {
-        return testing::AssertionSuccess();
-    }
-    return testing::AssertionFailure() << "end " << outcome.fEnd << ", status " << outcome.fStatus << ", not " << status
-                                       << "\nout: " << outcome.fOutput << "\nerr: " << outcome.fErrorOutput;
-}
-
-TEST_F(Vrxhost, InventoryAsTable)
+TEST_F(VrxhostProgram, InventoryAsTable)
 {
     const auto outcome = Run({"inventory"});
     EXPECT_TRUE(HasStatus(outcome, 0));
@@ -117,7 +43,7 @@ TEST_F(Vrxhost, InventoryAsTable)
     EXPECT_THAT(ReadFile(fRoot / "vrxhost.log"), HasSubstr("consumer quvex"));
 }
 
-TEST_F(Vrxhost, InstancesAsJsonWithTrueTypes)
+TEST_F(VrxhostProgram, InstancesAsJsonWithTrueTypes)
 {
     const auto outcome = Run({"instances", "fake_everytype", "--format", "json"});
     EXPECT_TRUE(HasStatus(outcome, 0));
@@ -153,7 +79,7 @@ TEST_F(Vrxhost, InstancesAsJsonWithTrueTypes)
 )");
 }
 
-TEST_F(Vrxhost, ClassesAndProviders)
+TEST_F(VrxhostProgram, ClassesAndProviders)
 {
     EXPECT_EQ(Run({"classes"}).fOutput, R"(Provider fake (libfake): 3 classes
   Fake_EveryType : CIM_Thing
@@ -199,7 +125,7 @@ const TFaultRow kFaults[] = {
     {"threads", 0, ""},
 };
 
-TEST_F(Vrxhost, EveryFaultOfAPluginIsOneSentenceAndAValidDocument)
+TEST_F(VrxhostProgram, EveryFaultOfAPluginIsOneSentenceAndAValidDocument)
 {
     for (const TFaultRow& row : kFaults) {
         SCOPED_TRACE(row.fFault);
@@ -216,20 +142,20 @@ TEST_F(Vrxhost, EveryFaultOfAPluginIsOneSentenceAndAValidDocument)
     }
 }
 
-TEST_F(Vrxhost, WhatThePluginPrintsDoesNotReachTheDocument)
+TEST_F(VrxhostProgram, WhatThePluginPrintsDoesNotReachTheDocument)
 {
     const auto outcome = Run({"providers"}, "prints");
     EXPECT_THAT(outcome.fOutput, Not(HasSubstr("printed")));
     EXPECT_EQ(outcome.fErrorOutput, "printed by the plug-in\n");
 }
 
-TEST_F(Vrxhost, ProvidersOfSeveralThreadsAreAllListed)
+TEST_F(VrxhostProgram, ProvidersOfSeveralThreadsAreAllListed)
 {
     const auto json = nlohmann::json::parse(Run({"providers", "--format", "json"}, "threads").fOutput);
     EXPECT_EQ(json["providers"].size(), 8u);
 }
 
-TEST_F(Vrxhost, LossesAreLearntFromTheLogAndFromPrograms)
+TEST_F(VrxhostProgram, LossesAreLearntFromTheLogAndFromPrograms)
 {
     const auto outcome = Run({"inventory", "--format", "json"}, "losses");
     EXPECT_TRUE(HasStatus(outcome, 3));
@@ -247,7 +173,7 @@ TEST_F(Vrxhost, LossesAreLearntFromTheLogAndFromPrograms)
     EXPECT_EQ(outcome.fErrorOutput, sentences);
 }
 
-TEST_F(Vrxhost, MissingOrForeignPluginFails)
+TEST_F(VrxhostProgram, MissingOrForeignPluginFails)
 {
     auto command = Command({"inventory"});
     command[4] = "/nonexistent.so";
@@ -277,7 +203,7 @@ const TUsageRow kUsages[] = {
     {{"instances", "Fake_None"}, 1, "there is no class Fake_None"},
 };
 
-TEST_F(Vrxhost, UsageErrorsHaveTheirOwnStatus)
+TEST_F(VrxhostProgram, UsageErrorsHaveTheirOwnStatus)
 {
     for (const TUsageRow& row : kUsages) {
         const auto outcome = Run(row.fArguments);
@@ -290,7 +216,7 @@ TEST_F(Vrxhost, UsageErrorsHaveTheirOwnStatus)
     EXPECT_THAT(help.fOutput, HasSubstr("Exit status: 0 complete"));
 }
 
-TEST_F(Vrxhost, SettingsFileAndLogFile)
+TEST_F(VrxhostProgram, SettingsFileAndLogFile)
 {
     std::ofstream(fRoot / "vrx.conf") << "fault=prints\ncount=2\n";
     const auto outcome = Start({VRXHOST, "--root", fRoot, "--plugin", FAKE_PLUGIN, "instances", "Fake_Many", "--log",
@@ -309,7 +235,7 @@ TEST_F(Vrxhost, SettingsFileAndLogFile)
     EXPECT_THAT(noLog.fErrorOutput, HasSubstr("the log file /dev/null/x could not be opened"));
 }
 
-TEST_F(Vrxhost, ConsumerIsPlannedBeforeTheNamespaceIsOpened)
+TEST_F(VrxhostProgram, ConsumerIsPlannedBeforeTheNamespaceIsOpened)
 {
     Install("cimconfig", "echo \"$*\" >> arguments; echo \"$PEGASUS_HOME\" >> arguments");
     EXPECT_TRUE(HasStatus(Run({"providers", "--consumer", "me"}), 0));
@@ -323,7 +249,7 @@ TEST_F(Vrxhost, ConsumerIsPlannedBeforeTheNamespaceIsOpened)
     EXPECT_TRUE(HasStatus(Run({"providers"}), 0)) << "without a name of its own a host takes what the server has";
 }
 
-TEST_F(Vrxhost, InterruptionEndsWaitingProgramsAndEnumerations)
+TEST_F(VrxhostProgram, InterruptionEndsWaitingProgramsAndEnumerations)
 {
     for (const char* fault : {"interrupt-program", "interrupt-enumeration", "program-at-shutdown"}) {
         SCOPED_TRACE(fault);
@@ -337,14 +263,14 @@ TEST_F(Vrxhost, InterruptionEndsWaitingProgramsAndEnumerations)
     EXPECT_TRUE(fs::exists(fRoot / "shut-down-program-ran"));
 }
 
-TEST_F(Vrxhost, SecondInterruptionEndsAtOnce)
+TEST_F(VrxhostProgram, SecondInterruptionEndsAtOnce)
 {
     EXPECT_TRUE(HasStatus(Run({"inventory"}, "interrupt-twice"), 130));
     EXPECT_FALSE(IsCleared());
 }
 
 // Two at once would stop each other's server.
-TEST_F(Vrxhost, SecondHostInOneRootIsRefused)
+TEST_F(VrxhostProgram, SecondHostInOneRootIsRefused)
 {
     std::ofstream(fRoot / "vrxhost.log") << "of the first";
     const NKOLVRX20::TUniqueFd root(::open(fRoot.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
@@ -355,7 +281,7 @@ TEST_F(Vrxhost, SecondHostInOneRootIsRefused)
     EXPECT_EQ(ReadFile(fRoot / "vrxhost.log"), "of the first");
 }
 
-TEST_F(Vrxhost, ReaderThatLeavesEarlyIsNoCrash)
+TEST_F(VrxhostProgram, ReaderThatLeavesEarlyIsNoCrash)
 {
     std::vector<std::string> command = {"/bin/bash", "-c", "\"$0\" \"$@\" | head -c 1; exit ${PIPESTATUS[0]}"};
     const auto run = Command({"inventory", "--set", "count=5000"});
@@ -368,3 +294,4 @@ TEST_F(Vrxhost, ReaderThatLeavesEarlyIsNoCrash)
 }
 
 } // namespace
+} // namespace vrxhost

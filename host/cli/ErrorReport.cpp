@@ -1,0 +1,46 @@
+#include "host/cli/ErrorReport.h"
+
+#include <host/TVRXException.h>
+
+#include <cstdlib>
+#include <exception>
+#include <iostream>
+#include <memory>
+
+#include <cxxabi.h>
+
+namespace vrxhost {
+namespace {
+
+std::string CurrentTypeName()
+{
+    const std::type_info* type = abi::__cxa_current_exception_type();
+    if (!type) {
+        return "of a foreign language";
+    }
+    const std::unique_ptr<char, void (*)(void*)> name(abi::__cxa_demangle(type->name(), nullptr, nullptr, nullptr),
+                                                      std::free);
+    return std::string("of type ") + (name ? name.get() : type->name());
+}
+
+} // namespace
+
+void ReportError(const std::string& sentence)
+{
+    std::cerr << "vrxhost: " << sentence << std::endl;
+}
+
+std::string DescribeCurrentException()
+{
+    try {
+        throw;
+    } catch (const NKOLVRX20::TVRXException& e) {
+        return std::string(e.what()) + " (status " + std::to_string(e.GetStatusCode()) + ")";
+    } catch (const std::exception& e) {
+        return e.what();
+    } catch (...) {
+        return "an exception " + CurrentTypeName();
+    }
+}
+
+} // namespace vrxhost

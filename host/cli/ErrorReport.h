@@ -1,0 +1,27 @@
+// What went wrong, as text: what an exception says, and how the user hears of it.
+#pragma once
+
+#include <string>
+
+namespace vrxhost {
+
+// Writes a sentence of the host's own to standard error, after "vrxhost: ".
+void ReportError(const std::string& sentence);
+
+// Returns: the text of the exception being handled: a status code with its text, a standard exception's text, or the
+// type's name. Requires: called inside a catch block.
+std::string DescribeCurrentException();
+
+// Runs a call into the plug-in and keeps every exception, of whatever type, from going further.
+// Returns: empty after a normal return, else the exception's text.
+template <typename Call> std::string ErrorOf(const Call& call)
+{
+    try {
+        call();
+        return "";
+    } catch (...) {
+        return DescribeCurrentException();
+    }
+}
+
+} // namespace vrxhost

@@ -1,0 +1,66 @@
+#include "host/cli/TDeployedTree.h"
+
+#include <filesystem>
+#include <fstream>
+
+namespace vrxhost {
+namespace {
+
+namespace fs = std::filesystem;
+
+constexpr char kMark[] = "pegasus/tree.conf";
+constexpr char kServerKey[] = "server = ";
+constexpr char kEmbedded[] = "embedded";
+constexpr char kInstalled[] = "installed OpenPegasus";
+constexpr char kFormatLine[] = "format = 1";
+
+[[noreturn]] void Refuse(const std::string& root, const std::string& reason)
+{
+    throw TTreeError("the root directory " + root + " is not a deployed tree: " + reason);
+}
+
+EServerKind ReadMark(const std::string& root)
+{
+    std::ifstream mark(fs::path(root) / kMark);
+    if (!mark) {
+        Refuse(root, std::string("it has no readable ") + kMark);
+    }
+    bool hasFormat = false;
+    std::string server;
+    for (std::string line; std::getline(mark, line);) {
+        if (line == kFormatLine) {
+            hasFormat = true;
+        } else if (line.rfind(kServerKey, 0) == 0) {
+            server = line.substr(sizeof kServerKey - 1);
+        }
+    }
+    if (!hasFormat || (server != kEmbedded && server != kInstalled)) {
+        Refuse(root, std::string("this program does not know the kind of tree that ") + kMark + " names");
+    }
+    return server == kEmbedded ? EServerKind::kEmbedded : EServerKind::kInstalled;
+}
+
+std::string Resolved(const std::string& root)
+{
+    std::error_code error;
+    const fs::path resolved = fs::canonical(root, error);
+    if (error) {
+        throw TTreeError("the root directory " + root + " could not be entered: " + error.message());
+    }
+    return resolved;
+}
+
+} // namespace
+
+TDeployedTree::TDeployedTree(const std::string& root) : fRoot(Resolved(root)), fKind(ReadMark(fRoot))
+{
+    std::error_code ignored;
+    if (!fs::is_regular_file(fs::path(fRoot) / "pegasus/bin/cimserver", ignored)) {
+        Refuse(fRoot, "it has no program pegasus/bin/cimserver");
+    }
+    if (!fs::is_directory(fs::path(fRoot) / "pegasus/pegSchema", ignored)) {
+        Refuse(fRoot, "it has no folder pegasus/pegSchema");
+    }
+}
+
+} // namespace vrxhost

@@ -1,0 +1,39 @@
+#pragma once
+
+#include <stdexcept>
+#include <string>
+
+namespace vrxhost {
+
+// Whose programs a tree was staged with.
+enum class EServerKind
+{
+    kEmbedded, // this project's
+    kInstalled // an installed OpenPegasus's
+};
+
+// Why a directory is not used as root, as a sentence. Nothing has been changed or run.
+class TTreeError : public std::runtime_error
+{
+  public:
+    using std::runtime_error::runtime_error;
+};
+
+// A root that was staged for vrxhost. The server's repository below it is deleted by each run, so a folder that merely
+// looks similar (a source tree, somebody's own OpenPegasus) must not be taken for one: the mark pegasus/tree.conf,
+// which only staging writes, pegasus/bin/cimserver and pegasus/pegSchema are all required.
+class TDeployedTree
+{
+  public:
+    // Throws: TTreeError.
+    explicit TDeployedTree(const std::string& root);
+
+    const std::string& GetRoot() const { return fRoot; } // absolute, links resolved
+    EServerKind GetServerKind() const { return fKind; }
+
+  private:
+    std::string fRoot;
+    EServerKind fKind;
+};
+
+} // namespace vrxhost
