@@ -1,7 +1,7 @@
 #include "pegasus/repository/ClassChecker.h"
 
+#include "pegasus/repository/CimError.h"
 #include "pegasus/repository/EmbeddedTypes.h"
-#include "pegasus/repository/Failure.h"
 
 namespace Pegasus::repository {
 
@@ -11,7 +11,7 @@ const CIMName kAssociation("Association");
 const CIMName kIndication("Indication");
 const CIMName kKey("Key");
 
-template <class Owner> bool isTrue(const Owner& owner, const CIMName& qualifier)
+template <typename Owner> bool isTrue(const Owner& owner, const CIMName& qualifier)
 {
     const Uint32 index = owner.findQualifier(qualifier);
     if (index == PEG_NOT_FOUND) {
@@ -30,7 +30,7 @@ bool isKind(const CIMConstClass& newClass, const CIMConstClass& superClass, cons
     return isTrue(newClass, qualifier) || (!superClass.isUninitialized() && isTrue(superClass, qualifier));
 }
 
-// Checks one class; holds what its parts need to know of it.
+// Checks one class, part by part.
 class Checker
 {
   public:
@@ -38,7 +38,7 @@ class Checker
     {
     }
 
-    template <class To, class From> void checkQualifiers(To& to, const From& from, const CIMScope& scope) const
+    template <typename To, typename From> void checkQualifiers(To& to, const From& from, const CIMScope& scope) const
     {
         for (Uint32 i = 0; i < from.getQualifierCount(); ++i) {
             to.addQualifier(checkedQualifier(from.getQualifier(i), scope, fLookup));
@@ -55,7 +55,7 @@ class Checker
     const QualifierLookup& fLookup;
 };
 
-template <class Element> void checkOverrides(const Element& element, const Element& inherited)
+template <typename Element> void checkOverrides(const Element& element, const Element& inherited)
 {
     for (Uint32 i = 0; i < element.getQualifierCount(); ++i) {
         const CIMConstQualifier use = element.getQualifier(i);
@@ -66,7 +66,7 @@ template <class Element> void checkOverrides(const Element& element, const Eleme
     }
 }
 
-// A string may become one that holds embedded objects (the standard schema does so).
+// A string may be overridden by one that holds embedded objects, as the DMTF schema does.
 bool isSameKind(const CIMConstProperty& property, const CIMConstProperty& inherited)
 {
     const auto travelsAsString = [](const CIMConstProperty& any) {

@@ -4,7 +4,7 @@ namespace Pegasus::repository {
 
 namespace {
 
-template <class To, class From> void copyQualifiers(To& to, From& from, const ClassOptions& options)
+template <typename To, typename From> void copyQualifiers(To& to, From& from, const ClassOptions& options)
 {
     if (!options.includeQualifiers) {
         return;

@@ -4,10 +4,10 @@
 
 namespace Pegasus::repository {
 
-// The part of a resolved class that the options ask for; shares what it can with it.
+// Returns: the part of a resolved class that the options ask for. It shares unchanged parts with `resolved`.
 CIMClass filterClass(CIMClass resolved, const ClassOptions& options);
 
-// Is the name asked for by a property list?
+// Returns: true when a property list asks for the name; a null list asks for all.
 bool isListed(const CIMPropertyList& list, const CIMName& name);
 
 } // namespace Pegasus::repository

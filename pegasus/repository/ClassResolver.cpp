@@ -4,18 +4,18 @@ namespace Pegasus::repository {
 
 namespace {
 
-// All functions take handles that can be written to because only those give out handles to parts that can be shared;
-// nothing is changed but `to`.
+// The source arguments are non-const handles because only those return parts that can be shared. The functions change
+// `to` alone.
 
-template <class To, class From> void shareQualifiers(To& to, From& from)
+template <typename To, typename From> void shareQualifiers(To& to, From& from)
 {
     for (Uint32 i = 0; i < from.getQualifierCount(); ++i) {
         to.addQualifier(from.getQualifier(i));
     }
 }
 
-// Backwards, as OpenPegasus gives them out.
-template <class To, class From, class Local> void inheritQualifiers(To& to, From& from, Local& local)
+// In reverse order, as OpenPegasus answers.
+template <typename To, class From, typename Local> void inheritQualifiers(To& to, From& from, Local& local)
 {
     for (Uint32 i = from.getQualifierCount(); i-- > 0;) {
         const CIMQualifier inherited = from.getQualifier(i);

@@ -4,14 +4,17 @@
 
 namespace Pegasus::repository {
 
-// A class with everything it inherits, as clients see it.
+// Completes a stored class with what it inherits, as clients see it and in OpenPegasus's order:
 //
-// What it inherits as a whole comes first, in the superclass's order, marked propagated, with the superclass's
-// qualifiers as they are; its own follow as declared. An own element that overrides an inherited one keeps the origin
-// and takes on, in front of its own and marked propagated, the qualifiers that the flavor hands down and that it does
-// not give itself. The same goes for the qualifiers of the class.
+// - Elements that the class does not override come first, in the superclass's order, marked propagated, with the
+//   superclass's qualifiers unchanged.
+// - Its own elements follow as declared. One that overrides an inherited element keeps that element's origin. Before
+// its
+//   own qualifiers it gets the inherited ones whose flavor is ToSubclass and which it does not set, marked propagated.
+// - The qualifiers of the class itself are inherited in the same way.
 //
-// Requires: local passed checkClass() below superClass; superClass is resolved, or uninitialised for a root class.
+// Requires: `local` passed checkClass() with this superclass; `superClass` is resolved, or uninitialised for a root
+//     class.
 // Returns: a class that shares its unchanged parts with both.
 CIMClass resolveClass(CIMClass local, CIMClass superClass);
 

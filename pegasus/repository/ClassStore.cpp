@@ -1,24 +1,24 @@
 #include "pegasus/repository/ClassStore.h"
 
+#include "pegasus/repository/CimError.h"
 #include "pegasus/repository/ClassChecker.h"
 #include "pegasus/repository/ClassFilter.h"
 #include "pegasus/repository/ClassResolver.h"
 #include "pegasus/repository/EmbeddedTypes.h"
-#include "pegasus/repository/Failure.h"
-#include "pegasus/repository/Names.h"
+#include "pegasus/repository/NameKey.h"
 #include "pegasus/wire/ElementEncoder.h"
 
 namespace Pegasus::repository {
 
-ClassStore::ClassStore(Storage& storage, ObjectText& texts, QualifierStore& qualifiers, const Limits& limits)
-    : fStorage(storage), fTexts(texts), fQualifiers(qualifiers), fLimits(limits), fCache(limits.cachedClassCount)
+ClassStore::ClassStore(Storage& storage, ObjectCodec& codec, QualifierStore& qualifiers, const RepositoryLimits& limits)
+    : fStorage(storage), fCodec(codec), fQualifiers(qualifiers), fLimits(limits), fCache(limits.cachedClassCount)
 {
 }
 
 // Recursion ends at a root class; the depth is bounded when classes are created.
 CIMClass ClassStore::resolved(NamespaceId nameSpace, const CIMName& name)
 {
-    const std::string key = folded(name);
+    const std::string key = nameKey(name);
     CIMClass cached = fCache.find(nameSpace, key);
     if (!cached.isUninitialized()) {
         return cached;
@@ -27,7 +27,7 @@ CIMClass ClassStore::resolved(NamespaceId nameSpace, const CIMName& name)
     if (!text) {
         return CIMClass();
     }
-    const CIMClass local = withEmbeddedTypes(fTexts.toClass(*text));
+    const CIMClass local = withEmbeddedTypes(fCodec.decodeClass(*text));
     const CIMName& superName = local.getSuperClassName();
     CIMClass whole = resolveClass(local, superName.isNull() ? CIMClass() : resolved(nameSpace, superName));
     fCache.insert(nameSpace, key, whole);
@@ -53,7 +53,7 @@ std::shared_ptr<const std::string> ClassStore::text(NamespaceId nameSpace, const
 {
     const CIMClass whole = existing(nameSpace, name);
     if (options.propertyList.isNull()) {
-        return fCache.text(nameSpace, folded(name), options);
+        return fCache.text(nameSpace, nameKey(name), options);
     }
     auto made = std::make_shared<std::string>();
     wire::appendClass(*made, filterClass(whole, options));
@@ -63,15 +63,6 @@ std::shared_ptr<const std::string> ClassStore::text(NamespaceId nameSpace, const
 bool ClassStore::has(NamespaceId nameSpace, const CIMName& name)
 {
     return fStorage.findSuperClass(nameSpace, utf8(name)).has_value();
-}
-
-CIMName ClassStore::superClass(NamespaceId nameSpace, const CIMName& name)
-{
-    const std::optional<std::string> superName = fStorage.findSuperClass(nameSpace, utf8(name));
-    if (!superName) {
-        fail(CIM_ERR_NOT_FOUND, utf8(name));
-    }
-    return superName->empty() ? CIMName() : CIMName(superName->c_str());
 }
 
 std::vector<CIMName> ClassStore::listNames(NamespaceId nameSpace, const CIMName& name, bool isDeep)
@@ -91,31 +82,13 @@ void ClassStore::create(NamespaceId nameSpace, const CIMConstClass& newClass)
     if (has(nameSpace, newClass.getClassName())) {
         fail(CIM_ERR_ALREADY_EXISTS, utf8(newClass.getClassName()));
     }
-    put(nameSpace, newClass);
-}
-
-void ClassStore::modify(NamespaceId nameSpace, const CIMConstClass& modified)
-{
-    expectUnused(nameSpace, modified.getClassName());
-    put(nameSpace, modified);
-}
-
-void ClassStore::remove(NamespaceId nameSpace, const CIMName& name)
-{
-    expectUnused(nameSpace, name);
-    fStorage.deleteClass(nameSpace, utf8(name));
-    fCache.remove(nameSpace, folded(name));
-}
-
-// The new class goes into the cache at once: a compiler creates its subclasses next.
-void ClassStore::put(NamespaceId nameSpace, const CIMConstClass& newClass)
-{
     checkDepth(nameSpace, newClass);
     const CIMClass superClass = resolvedSuperClass(nameSpace, newClass);
     const CIMClass local = checkClass(newClass, superClass, fQualifiers.lookupIn(nameSpace));
-    const std::string text = fTexts.fromClass(local);
-    fStorage.putClass(nameSpace, utf8(local.getClassName()), utf8(local.getSuperClassName()), text);
-    fCache.insert(nameSpace, folded(local.getClassName()), resolveClass(local, superClass));
+    const std::string text = fCodec.encodeClass(local);
+    fStorage.insertClass(nameSpace, utf8(local.getClassName()), utf8(local.getSuperClassName()), text);
+    // Into the cache at once: a compiler creates subclasses of it next.
+    fCache.insert(nameSpace, nameKey(local.getClassName()), resolveClass(local, superClass));
 }
 
 CIMClass ClassStore::resolvedSuperClass(NamespaceId nameSpace, const CIMConstClass& newClass)
@@ -141,19 +114,6 @@ void ClassStore::checkDepth(NamespaceId nameSpace, const CIMConstClass& newClass
                  "class is deeper than the limit inheritanceDepth (" + std::to_string(fLimits.inheritanceDepth) + ")");
         }
         above = fStorage.findSuperClass(nameSpace, above).value_or("");
-    }
-}
-
-void ClassStore::expectUnused(NamespaceId nameSpace, const CIMName& name)
-{
-    if (!has(nameSpace, name)) {
-        fail(CIM_ERR_NOT_FOUND, utf8(name));
-    }
-    if (!fStorage.listSubclasses(nameSpace, utf8(name), false).empty()) {
-        fail(CIM_ERR_CLASS_HAS_CHILDREN, utf8(name));
-    }
-    if (fStorage.hasInstances(nameSpace, utf8(name))) {
-        fail(CIM_ERR_CLASS_HAS_INSTANCES, utf8(name));
     }
 }
 

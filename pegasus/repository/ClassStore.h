@@ -1,41 +1,38 @@
 #pragma once
 
-#include "pegasus/repository/ClassCache.h"
 #include "pegasus/repository/QualifierStore.h"
+#include "pegasus/repository/ResolvedClassCache.h"
 
 namespace Pegasus::repository {
 
-// Classes: stored as created, given out resolved. Errors and limits: see Repository. Thread: one thread at a time.
+// Classes: stored as they were created, returned with what they inherit. Errors and limits: see Repository.
+// Requires: what the constructor takes outlives the store.
+// Thread: one thread at a time.
 class ClassStore
 {
   public:
-    ClassStore(Storage& storage, ObjectText& texts, QualifierStore& qualifiers, const Limits& limits);
+    ClassStore(Storage& storage, ObjectCodec& codec, QualifierStore& qualifiers, const RepositoryLimits& limits);
 
-    // With everything inherited. Uninitialised if there is none.
+    // Returns: the class with everything that it inherits; uninitialised when there is none.
     CIMClass resolved(NamespaceId nameSpace, const CIMName& name);
     CIMClass get(NamespaceId nameSpace, const CIMName& name, const ClassOptions& options);
     // The same as a CLASS element.
     std::shared_ptr<const std::string> text(NamespaceId nameSpace, const CIMName& name, const ClassOptions& options);
     bool has(NamespaceId nameSpace, const CIMName& name);
-    CIMName superClass(NamespaceId nameSpace, const CIMName& name);
     std::vector<CIMName> listNames(NamespaceId nameSpace, const CIMName& name, bool isDeep);
 
     void create(NamespaceId nameSpace, const CIMConstClass& newClass);
-    void modify(NamespaceId nameSpace, const CIMConstClass& modified);
-    void remove(NamespaceId nameSpace, const CIMName& name);
 
   private:
     CIMClass existing(NamespaceId nameSpace, const CIMName& name);
-    void put(NamespaceId nameSpace, const CIMConstClass& newClass);
     CIMClass resolvedSuperClass(NamespaceId nameSpace, const CIMConstClass& newClass);
     void checkDepth(NamespaceId nameSpace, const CIMConstClass& newClass);
-    void expectUnused(NamespaceId nameSpace, const CIMName& name);
 
     Storage& fStorage;
-    ObjectText& fTexts;
+    ObjectCodec& fCodec;
     QualifierStore& fQualifiers;
-    const Limits& fLimits;
-    ClassCache fCache;
+    const RepositoryLimits& fLimits;
+    ResolvedClassCache fCache;
 };
 
 } // namespace Pegasus::repository

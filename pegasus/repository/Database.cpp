@@ -8,8 +8,8 @@ namespace Pegasus::repository {
 
 namespace {
 
-// EXCLUSIVE keeps the write-ahead log's index in this process's memory: no further file, no locking per statement.
-// OFF leaves writing back to the kernel, which outlives the process.
+// EXCLUSIVE keeps the index of the write-ahead log in this process's memory: one file less, and no file lock per
+// statement. synchronous=OFF leaves writing to the disk to the kernel, which outlives the process.
 constexpr const char* kPragmas = "PRAGMA locking_mode=EXCLUSIVE;"
                                  "PRAGMA synchronous=OFF;"
                                  "PRAGMA journal_mode=WAL;"
@@ -98,7 +98,7 @@ void Statement::bind(int parameter, std::int64_t value)
 
 void Statement::bind(int parameter, std::string_view value)
 {
-    // A null data pointer would bind NULL where an empty text is meant.
+    // SQLite binds NULL for a null pointer; an empty view is an empty text.
     const char* data = value.data() ? value.data() : "";
     if (sqlite3_bind_text64(fStatement, parameter, data, value.size(), SQLITE_STATIC, SQLITE_UTF8) != SQLITE_OK) {
         fDatabase.fail("bind a text for");

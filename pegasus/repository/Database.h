@@ -10,10 +10,11 @@ struct sqlite3_stmt;
 
 namespace Pegasus::repository {
 
-// One SQLite file, held open by this process alone. A statement that has returned survives the death of the process,
-// not a power cut: nothing waits for the disk.
+// One SQLite file, held open by this process alone. What a statement wrote survives the death of the process once the
+// statement has returned; a power cut may lose it, because nothing waits for the disk.
 //
-// Throws: CIMException CIM_ERR_FAILED from everything that fails. Thread: one thread at a time.
+// Throws: CIMException CIM_ERR_FAILED "cannot <operation> the repository: <SQLite's message>" from every member.
+// Thread: one thread at a time.
 class Database
 {
   public:
@@ -22,6 +23,7 @@ class Database
     Database(const Database&) = delete;
     Database& operator=(const Database&) = delete;
 
+    // Runs statements without parameters and rows.
     void execute(const char* sql);
     sqlite3* handle() const noexcept { return fHandle; }
     [[noreturn]] void fail(const char* operation) const;
@@ -30,7 +32,8 @@ class Database
     sqlite3* fHandle = nullptr;
 };
 
-// The rows of one run of a statement. Texts are valid until the next row.
+// The rows of one run of a statement. The run ends with this object.
+// Requires: one object per statement at a time; it ends before the statement.
 class Rows
 {
   public:
@@ -39,9 +42,11 @@ class Rows
     Rows(const Rows&) = delete;
     Rows& operator=(const Rows&) = delete;
 
-    // Goes to the next row, the first one at first. Returns false behind the last.
+    // Goes to the first or next row.
+    // Returns: false after the last row.
     bool next();
     std::int64_t integer(int column) const;
+    // Ownership: the statement's, until the next row.
     std::string_view text(int column) const;
 
   private:
@@ -58,15 +63,16 @@ class Statement
     Statement(const Statement&) = delete;
     Statement& operator=(const Statement&) = delete;
 
-    // Binds the arguments (integers and texts, which must outlive the rows) to the parameters in order.
-    template <class... Arguments> Rows run(const Arguments&... arguments)
+    // Binds the arguments (integers and texts) to the parameters in order.
+    // Requires: texts outlive the rows.
+    template <typename... Arguments> Rows run(const Arguments&... arguments)
     {
         int parameter = 0;
         (bind(++parameter, arguments), ...);
         return Rows(fDatabase, fStatement);
     }
-    // Runs a statement that gives no rows.
-    template <class... Arguments> void execute(const Arguments&... arguments) { run(arguments...).next(); }
+    // Runs a statement that returns no rows.
+    template <typename... Arguments> void execute(const Arguments&... arguments) { run(arguments...).next(); }
 
   private:
     void bind(int parameter, std::int64_t value);

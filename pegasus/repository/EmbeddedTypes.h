@@ -2,22 +2,21 @@
 
 #include <Pegasus/Common/CIMClass.h>
 
+// MOF declares a property that holds an embedded object as a string with a qualifier; the CIM-XML decoder makes it an
+// object or an instance. The repository uses the types in which OpenPegasus returns such properties: a scalar with
+// EmbeddedInstance is an instance, every other one stays a string.
 namespace Pegasus::repository {
 
-// Properties that hold embedded objects are declared as strings with a qualifier, but come out of the decoder as
-// objects or instances. In the repository they have the types with which OpenPegasus gives them out: a scalar with
-// EmbeddedInstance is an instance, every other one stays a string.
-
-// The type for a property as declared.
+// Returns: the type for a property as declared.
 CIMType embeddedType(const CIMConstProperty& property);
 
-// Its value with that type; a default of another type cannot be kept and becomes null.
+// Returns: the property's value with that type; null when its default has another type.
 CIMValue embeddedValue(const CIMConstProperty& property);
 
-// A decoded class with these types in place of the decoder's.
+// Returns: a decoded class with these types in place of the decoder's.
 CIMClass withEmbeddedTypes(CIMClass decoded);
 
-// May a value of the given type be stored in a property of the declared one?
+// Returns: true when the given value may be stored in the declared property.
 bool isStorableAs(const CIMConstProperty& given, const CIMConstProperty& declared);
 
 } // namespace Pegasus::repository

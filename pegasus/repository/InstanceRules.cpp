@@ -1,11 +1,8 @@
 #include "pegasus/repository/InstanceRules.h"
 
+#include "pegasus/repository/CimError.h"
 #include "pegasus/repository/ClassFilter.h"
 #include "pegasus/repository/EmbeddedTypes.h"
-#include "pegasus/repository/Failure.h"
-#include "pegasus/repository/Names.h"
-
-#include <algorithm>
 
 namespace Pegasus::repository {
 
@@ -47,22 +44,6 @@ CIMKeyBinding keyBinding(const CIMConstProperty& property)
         return CIMKeyBinding(property.getName(), String(), CIMKeyBinding::STRING);
     }
     return CIMKeyBinding(property.getName(), value);
-}
-
-std::string canonicalValue(const CIMKeyBinding& key)
-{
-    switch (key.getType()) {
-    case CIMKeyBinding::REFERENCE: {
-        const CIMObjectPath path(key.getValue());
-        return folded(path.getNameSpace()) + ":" + pathKey(path);
-    }
-    case CIMKeyBinding::BOOLEAN:
-        return foldCase(utf8(key.getValue()));
-    case CIMKeyBinding::NUMERIC:
-        return canonicalNumber(utf8(key.getValue()));
-    default:
-        return utf8(key.getValue());
-    }
 }
 
 } // namespace
@@ -130,18 +111,6 @@ void filterInstance(CIMInstance& stored, const CIMConstClass& shape, const Insta
             property.setClassOrigin(CIMName());
         }
     }
-}
-
-// Each value comes behind its length, so that no value can look like a further key. CIMObjectPath has its keys sorted.
-std::string pathKey(const CIMObjectPath& path)
-{
-    std::string text = folded(path.getClassName());
-    const Array<CIMKeyBinding>& keys = path.getKeyBindings();
-    for (Uint32 i = 0; i < keys.size(); ++i) {
-        const std::string value = canonicalValue(keys[i]);
-        text += "." + folded(keys[i].getName()) + "=" + std::to_string(value.size()) + ":" + value;
-    }
-    return text;
 }
 
 } // namespace Pegasus::repository

@@ -4,27 +4,22 @@
 
 namespace Pegasus::repository {
 
-// The instance to store: every property of its class, those not given in front with the class's defaults and marked
-// propagated, the given ones behind in their order; names spelled and origins set as the class has them.
-//
-// Requires: itsClass is resolved.
+// Returns: the instance to store. It has every property of its class: first those that were not given, with the class's
+//     defaults and marked propagated, then the given ones in their order. Names and origins are the class's.
+// Requires: `itsClass` is resolved.
 // Throws: CIM_ERR_FAILED ("no such property: X", "type mismatch"), CIM_ERR_NOT_SUPPORTED (abstract class).
 CIMInstance completeInstance(const CIMConstInstance& given, const CIMConstClass& itsClass);
 
-// The path of a completed instance, without host and namespace. A null text key counts as empty.
+// Returns: the path of a completed instance, without host and namespace. A null text key counts as empty.
 // Throws: CIM_ERR_FAILED "class has no keys: X", CIM_ERR_INVALID_PARAMETER for a null key of another type.
 CIMObjectPath instancePath(const CIMConstInstance& completed, const CIMConstClass& itsClass);
 
-// Puts the values of `modified` (all, or those listed) into a stored instance; keys stay.
+// Puts the values of `modified` (all, or those listed) into a stored instance.
 // Throws: CIM_ERR_FAILED ("no such property: X", "type mismatch").
 void mergeValues(CIMInstance& stored, const CIMConstInstance& modified, const CIMPropertyList& list);
 
-// Takes out of a stored instance what the options do not ask for. shape: the class whose properties are wanted, or
-// uninitialised for all.
+// Removes from a stored instance what the options leave out.
+// `shape`: the class whose properties are wanted; uninitialised for all.
 void filterInstance(CIMInstance& stored, const CIMConstClass& shape, const InstanceOptions& options);
-
-// One text for all paths that are equal (DSP0004): letter case, key order and the spelling of numbers do not matter.
-// Host and namespace of the path itself are left out.
-std::string pathKey(const CIMObjectPath& path);
 
 } // namespace Pegasus::repository

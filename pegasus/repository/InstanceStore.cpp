@@ -1,13 +1,14 @@
 #include "pegasus/repository/InstanceStore.h"
 
-#include "pegasus/repository/Failure.h"
+#include "pegasus/repository/CimError.h"
 #include "pegasus/repository/InstanceRules.h"
+#include "pegasus/repository/PathKey.h"
 
 namespace Pegasus::repository {
 
 namespace {
 
-// Enough to spread the cost of a query, little enough to keep memory flat.
+// A batch spreads the cost of a query over many instances; both bounds keep its memory small.
 constexpr std::size_t kBatchSize = 64;
 constexpr std::size_t kBatchBytes = 1u << 20;
 
@@ -29,7 +30,7 @@ CIMObjectPath InstanceStore::create(NamespaceId nameSpace, const CIMConstInstanc
     if (fStorage.findInstance(nameSpace, key)) {
         fail(CIM_ERR_ALREADY_EXISTS, utf8(path.toString()));
     }
-    fStorage.insertInstance(nameSpace, utf8(itsClass.getClassName()), key, fTexts.fromInstance(completed));
+    fStorage.insertInstance(nameSpace, utf8(itsClass.getClassName()), key, fCodec.encodeInstance(completed));
     return path;
 }
 
@@ -44,12 +45,12 @@ void InstanceStore::modify(NamespaceId nameSpace, const CIMConstInstance& modifi
 {
     const InstanceRow row = find(nameSpace, modified.getPath());
     const CIMClass itsClass = classOf(nameSpace, modified.getPath().getClassName());
-    CIMInstance stored = fTexts.toInstance(row.body);
+    CIMInstance stored = fCodec.decodeInstance(row.body);
     mergeValues(stored, modified, list);
     if (pathKey(instancePath(stored, itsClass)) != pathKey(modified.getPath())) {
         fail(CIM_ERR_INVALID_PARAMETER, "a key property cannot change");
     }
-    fStorage.updateInstance(row.sequence, fTexts.fromInstance(stored));
+    fStorage.updateInstance(row.sequence, fCodec.encodeInstance(stored));
 }
 
 void InstanceStore::remove(NamespaceId nameSpace, const CIMObjectPath& path)
@@ -91,7 +92,7 @@ InstanceRow InstanceStore::find(NamespaceId nameSpace, const CIMObjectPath& path
 
 CIMInstance InstanceStore::withPath(NamespaceId nameSpace, const std::string& body)
 {
-    CIMInstance instance = fTexts.toInstance(body);
+    CIMInstance instance = fCodec.decodeInstance(body);
     instance.setPath(instancePath(instance, classOf(nameSpace, instance.getClassName())));
     return instance;
 }

@@ -4,12 +4,14 @@
 
 namespace Pegasus::repository {
 
-// Instances of stored classes. Errors and limits: see Repository. Thread: one thread at a time.
+// Instances of stored classes. Errors and limits: see Repository.
+// Requires: what the constructor takes outlives the store.
+// Thread: one thread at a time.
 class InstanceStore
 {
   public:
-    InstanceStore(Storage& storage, ObjectText& texts, ClassStore& classes)
-        : fStorage(storage), fTexts(texts), fClasses(classes)
+    InstanceStore(Storage& storage, ObjectCodec& codec, ClassStore& classes)
+        : fStorage(storage), fCodec(codec), fClasses(classes)
     {
     }
 
@@ -17,8 +19,8 @@ class InstanceStore
     CIMInstance get(NamespaceId nameSpace, const CIMObjectPath& path, const InstanceOptions& options);
     void modify(NamespaceId nameSpace, const CIMConstInstance& modified, const CIMPropertyList& list);
     void remove(NamespaceId nameSpace, const CIMObjectPath& path);
-    // Reads on behind the instance `after` (0 at first), which it moves, until the batch is full.
-    // Returns nothing when there is no more.
+    // Reads the instances that follow `after` (0 at first) until the batch is full, and moves `after` to the last one.
+    // Returns: the batch; empty at the end.
     std::vector<CIMInstance> nextBatch(NamespaceId nameSpace, const CIMName& className, const InstanceOptions& options,
                                        std::int64_t& after);
 
@@ -28,7 +30,7 @@ class InstanceStore
     CIMInstance withPath(NamespaceId nameSpace, const std::string& body);
 
     Storage& fStorage;
-    ObjectText& fTexts;
+    ObjectCodec& fCodec;
     ClassStore& fClasses;
 };
 

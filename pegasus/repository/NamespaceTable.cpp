@@ -1,7 +1,7 @@
 #include "pegasus/repository/NamespaceTable.h"
 
-#include "pegasus/repository/Failure.h"
-#include "pegasus/repository/Names.h"
+#include "pegasus/repository/CimError.h"
+#include "pegasus/repository/NameKey.h"
 
 namespace Pegasus::repository {
 
@@ -19,7 +19,7 @@ NamespaceTable::NamespaceTable(Storage& storage, std::size_t maxCount) : fStorag
 
 NamespaceId NamespaceTable::id(const CIMNamespaceName& name) const
 {
-    const auto found = fIds.find(folded(name));
+    const auto found = fIds.find(nameKey(name));
     if (found == fIds.end()) {
         fail(CIM_ERR_INVALID_NAMESPACE, utf8(name.getString()));
     }
@@ -28,7 +28,7 @@ NamespaceId NamespaceTable::id(const CIMNamespaceName& name) const
 
 bool NamespaceTable::has(const CIMNamespaceName& name) const
 {
-    return fIds.count(folded(name)) != 0;
+    return fIds.count(nameKey(name)) != 0;
 }
 
 std::vector<CIMNamespaceName> NamespaceTable::list() const
@@ -50,19 +50,8 @@ void NamespaceTable::create(const CIMNamespaceName& name)
              "more namespaces than the limit namespaceCount (" + std::to_string(fMaxCount) + ")");
     }
     const NamespaceId number = fStorage.insertNamespace(utf8(name.getString()));
-    fIds[folded(name)] = number;
+    fIds[nameKey(name)] = number;
     fNames[number] = name;
-}
-
-void NamespaceTable::remove(const CIMNamespaceName& name)
-{
-    const NamespaceId number = id(name);
-    if (!fStorage.isNamespaceEmpty(number)) {
-        fail(CIM_ERR_NAMESPACE_NOT_EMPTY, utf8(name.getString()));
-    }
-    fStorage.deleteNamespace(number);
-    fIds.erase(folded(name));
-    fNames.erase(number);
 }
 
 } // namespace Pegasus::repository

@@ -10,24 +10,25 @@
 
 namespace Pegasus::repository {
 
-// The namespaces, held in memory and written through. Errors and limits: see Repository. Thread: one thread at a time.
+// The namespaces, held in memory and written through. Errors and limits: see Repository.
+// Thread: one thread at a time.
 class NamespaceTable
 {
   public:
     // Creates root if it is missing.
+    // Requires: `storage` outlives the table.
     NamespaceTable(Storage& storage, std::size_t maxCount);
 
     NamespaceId id(const CIMNamespaceName& name) const;
     bool has(const CIMNamespaceName& name) const;
-    // In order of creation.
+    // Returns: the names in order of creation.
     std::vector<CIMNamespaceName> list() const;
     void create(const CIMNamespaceName& name);
-    void remove(const CIMNamespaceName& name);
 
   private:
     Storage& fStorage;
     std::size_t fMaxCount;
-    std::map<std::string, NamespaceId> fIds; // by folded name
+    std::map<std::string, NamespaceId> fIds; // by name key
     std::map<NamespaceId, CIMNamespaceName> fNames;
 };
 

@@ -1,6 +1,6 @@
 #include "pegasus/repository/QualifierRules.h"
 
-#include "pegasus/repository/Failure.h"
+#include "pegasus/repository/CimError.h"
 
 namespace Pegasus::repository {
 
@@ -28,7 +28,7 @@ CIMFlavor effectiveFlavor(const CIMFlavor& use, const CIMFlavor& declared)
     return flavor;
 }
 
-// An association or indication is a class as well: a declaration for classes admits it.
+// An association or indication is a class too: a declaration for classes admits it.
 bool admits(const CIMScope& declared, const CIMScope& scope)
 {
     const bool isKindOfClass = scope.equal(CIMScope::ASSOCIATION) || scope.equal(CIMScope::INDICATION);

@@ -7,18 +7,20 @@
 
 namespace Pegasus::repository {
 
-// Looks a qualifier declaration up. Returns false if there is none.
+// Finds the declaration of a qualifier.
+// Returns: false when there is none.
 using QualifierLookup = std::function<bool(const CIMName& name, CIMQualifierDecl& declaration)>;
 
-// The qualifiers of one element: gives each the flavor of its declaration, narrowed by what the use itself says.
-// On the wire a use that says nothing comes with neither "overridable" nor "to subclass".
-//
-// Throws CIM_ERR_FAILED: "undeclared qualifier: X", "bad qualifier type: X",
-// "qualifier invalid in this scope: X scope=CLASS".
+// Checks one use of a qualifier against its declaration.
+// Returns: the use with the flavor of its declaration, narrowed by the flavor of the use. A use without any flavor
+//     arrives from the wire as neither overridable nor to subclass, and takes the declaration's flavor.
+// Throws: CIM_ERR_FAILED: "undeclared qualifier: X", "bad qualifier type: X",
+//     "qualifier invalid in this scope: X scope=CLASS".
 CIMQualifier checkedQualifier(const CIMConstQualifier& use, const CIMScope& scope, const QualifierLookup& lookup);
 
-// Throws CIM_ERR_FAILED "qualifier cannot be overridden: X" if a use differs from the one that it overrides although
-// that one's flavor forbids it.
+// Checks a use against the inherited one that it overrides.
+// Throws: CIM_ERR_FAILED "qualifier cannot be overridden: X" if the value differs although the inherited flavor is
+//     DisableOverride.
 void checkOverride(const CIMConstQualifier& use, const CIMConstQualifier& inherited);
 
 } // namespace Pegasus::repository

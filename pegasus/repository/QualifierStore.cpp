@@ -1,18 +1,19 @@
 #include "pegasus/repository/QualifierStore.h"
 
-#include "pegasus/repository/Failure.h"
-#include "pegasus/repository/Names.h"
+#include "pegasus/repository/CimError.h"
+#include "pegasus/repository/NameKey.h"
 
 namespace Pegasus::repository {
 
 namespace {
 
-// A schema has a hundred declarations; beyond this many it is cheaper to start over than to choose.
+// A schema has about a hundred declarations. Beyond this number the memory starts over: choosing which to drop would
+// cost more than decoding them again.
 constexpr std::size_t kMaxKnown = 4096;
 
 std::string keyOf(NamespaceId nameSpace, const CIMName& name)
 {
-    return std::to_string(nameSpace) + ":" + folded(name);
+    return std::to_string(nameSpace) + ":" + nameKey(name);
 }
 
 } // namespace
@@ -31,14 +32,14 @@ CIMQualifierDecl QualifierStore::find(NamespaceId nameSpace, const CIMName& name
     if (fKnown.size() >= kMaxKnown) {
         fKnown.clear();
     }
-    return fKnown[key] = fTexts.toQualifier(*text);
+    return fKnown[key] = fCodec.decodeQualifier(*text);
 }
 
 std::vector<CIMQualifierDecl> QualifierStore::list(NamespaceId nameSpace)
 {
     std::vector<CIMQualifierDecl> all;
     for (const std::string& text : fStorage.listQualifiers(nameSpace)) {
-        all.push_back(fTexts.toQualifier(text));
+        all.push_back(fCodec.decodeQualifier(text));
     }
     return all;
 }
@@ -52,15 +53,7 @@ void QualifierStore::set(NamespaceId nameSpace, const CIMConstQualifierDecl& dec
     {
         return;
     }
-    fStorage.putQualifier(nameSpace, utf8(name), fTexts.fromQualifier(declaration));
-    fKnown.erase(keyOf(nameSpace, name));
-}
-
-void QualifierStore::remove(NamespaceId nameSpace, const CIMName& name)
-{
-    if (!fStorage.deleteQualifier(nameSpace, utf8(name))) {
-        fail(CIM_ERR_NOT_FOUND, utf8(name));
-    }
+    fStorage.putQualifier(nameSpace, utf8(name), fCodec.encodeQualifier(declaration));
     fKnown.erase(keyOf(nameSpace, name));
 }
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "pegasus/repository/ObjectText.h"
+#include "pegasus/repository/ObjectCodec.h"
 #include "pegasus/repository/QualifierRules.h"
 #include "pegasus/repository/Storage.h"
 
@@ -10,24 +10,27 @@
 
 namespace Pegasus::repository {
 
-// Qualifier declarations, each decoded once. Errors and limits: see Repository. Thread: one thread at a time.
+// Qualifier declarations, each decoded once: every qualifier of every new class is checked against its declaration.
+// Errors and limits: see Repository.
+// Requires: what the constructor takes outlives the store.
+// Thread: one thread at a time.
 class QualifierStore
 {
   public:
-    QualifierStore(Storage& storage, ObjectText& texts) : fStorage(storage), fTexts(texts) {}
+    QualifierStore(Storage& storage, ObjectCodec& codec) : fStorage(storage), fCodec(codec) {}
 
-    // Uninitialised if there is none.
+    // Returns: the declaration; uninitialised when there is none.
     CIMQualifierDecl find(NamespaceId nameSpace, const CIMName& name);
     std::vector<CIMQualifierDecl> list(NamespaceId nameSpace);
     void set(NamespaceId nameSpace, const CIMConstQualifierDecl& declaration);
-    void remove(NamespaceId nameSpace, const CIMName& name);
 
+    // Returns: find() for the rules, bound to a namespace; valid as long as the store.
     QualifierLookup lookupIn(NamespaceId nameSpace);
 
   private:
     Storage& fStorage;
-    ObjectText& fTexts;
-    std::unordered_map<std::string, CIMQualifierDecl> fKnown; // by namespace and folded name
+    ObjectCodec& fCodec;
+    std::unordered_map<std::string, CIMQualifierDecl> fKnown; // by namespace and name key
 };
 
 } // namespace Pegasus::repository

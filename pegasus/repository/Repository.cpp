@@ -1,6 +1,6 @@
 #include "pegasus/repository/Repository.h"
 
-#include "pegasus/repository/Failure.h"
+#include "pegasus/repository/CimError.h"
 #include "pegasus/repository/InstanceStore.h"
 #include "pegasus/repository/NamespaceTable.h"
 
@@ -18,7 +18,7 @@ using Lock = std::lock_guard<std::mutex>;
 
 constexpr const char* kFileName = "/repository.db";
 
-// Like mkdir -p. Only the owner may look into what is created here.
+// Like mkdir -p; only the owner may enter the new directories.
 void makeDirectories(const std::string& directory)
 {
     for (std::size_t end = directory.find('/', 1);; end = directory.find('/', end + 1)) {
@@ -40,28 +40,28 @@ std::string preparedFile(const std::string& directory)
 
 } // namespace
 
-// The stores, and the lock that makes operations run one after the other.
+// The stores, and the lock that makes operations run one after the other. Each member may use those before it.
 class Repository::State
 {
   public:
-    State(const std::string& directory, const Limits& givenLimits)
-        : limits(givenLimits), storage(preparedFile(directory)), texts(limits.objectBytes),
-          namespaces(storage, limits.namespaceCount), qualifiers(storage, texts),
-          classes(storage, texts, qualifiers, limits), instances(storage, texts, classes)
+    State(const std::string& directory, const RepositoryLimits& givenLimits)
+        : limits(givenLimits), storage(preparedFile(directory)), codec(limits.objectBytes),
+          namespaces(storage, limits.namespaceCount), qualifiers(storage, codec),
+          classes(storage, codec, qualifiers, limits), instances(storage, codec, classes)
     {
     }
 
-    const Limits limits;
+    const RepositoryLimits limits;
     std::mutex mutex;
     Storage storage;
-    ObjectText texts;
+    ObjectCodec codec;
     NamespaceTable namespaces;
     QualifierStore qualifiers;
     ClassStore classes;
     InstanceStore instances;
 };
 
-Repository::Repository(const std::string& directory, const Limits& limits)
+Repository::Repository(const std::string& directory, const RepositoryLimits& limits)
     : fState(std::make_unique<State>(directory, limits))
 {
 }
@@ -72,12 +72,6 @@ void Repository::createNamespace(const CIMNamespaceName& nameSpace)
 {
     const Lock lock(fState->mutex);
     fState->namespaces.create(nameSpace);
-}
-
-void Repository::deleteNamespace(const CIMNamespaceName& nameSpace)
-{
-    const Lock lock(fState->mutex);
-    fState->namespaces.remove(nameSpace);
 }
 
 bool Repository::hasNamespace(const CIMNamespaceName& nameSpace) const
@@ -114,12 +108,6 @@ void Repository::setQualifier(const CIMNamespaceName& nameSpace, const CIMConstQ
     fState->qualifiers.set(fState->namespaces.id(nameSpace), declaration);
 }
 
-void Repository::deleteQualifier(const CIMNamespaceName& nameSpace, const CIMName& name)
-{
-    const Lock lock(fState->mutex);
-    fState->qualifiers.remove(fState->namespaces.id(nameSpace), name);
-}
-
 CIMConstClass Repository::getClass(const CIMNamespaceName& nameSpace, const CIMName& className,
                                    const ClassOptions& options) const
 {
@@ -140,12 +128,6 @@ bool Repository::hasClass(const CIMNamespaceName& nameSpace, const CIMName& clas
     return fState->classes.has(fState->namespaces.id(nameSpace), className);
 }
 
-CIMName Repository::superClass(const CIMNamespaceName& nameSpace, const CIMName& className) const
-{
-    const Lock lock(fState->mutex);
-    return fState->classes.superClass(fState->namespaces.id(nameSpace), className);
-}
-
 std::vector<CIMName> Repository::enumerateClassNames(const CIMNamespaceName& nameSpace, const CIMName& className,
                                                      bool deepInheritance) const
 {
@@ -153,34 +135,10 @@ std::vector<CIMName> Repository::enumerateClassNames(const CIMNamespaceName& nam
     return fState->classes.listNames(fState->namespaces.id(nameSpace), className, deepInheritance);
 }
 
-std::vector<CIMConstClass> Repository::enumerateClasses(const CIMNamespaceName& nameSpace, const CIMName& className,
-                                                        bool deepInheritance, const ClassOptions& options) const
-{
-    const Lock lock(fState->mutex);
-    const NamespaceId id = fState->namespaces.id(nameSpace);
-    std::vector<CIMConstClass> found;
-    for (const CIMName& name : fState->classes.listNames(id, className, deepInheritance)) {
-        found.push_back(fState->classes.get(id, name, options));
-    }
-    return found;
-}
-
 void Repository::createClass(const CIMNamespaceName& nameSpace, const CIMConstClass& newClass)
 {
     const Lock lock(fState->mutex);
     fState->classes.create(fState->namespaces.id(nameSpace), newClass);
-}
-
-void Repository::modifyClass(const CIMNamespaceName& nameSpace, const CIMConstClass& modifiedClass)
-{
-    const Lock lock(fState->mutex);
-    fState->classes.modify(fState->namespaces.id(nameSpace), modifiedClass);
-}
-
-void Repository::deleteClass(const CIMNamespaceName& nameSpace, const CIMName& className)
-{
-    const Lock lock(fState->mutex);
-    fState->classes.remove(fState->namespaces.id(nameSpace), className);
 }
 
 CIMObjectPath Repository::createInstance(const CIMNamespaceName& nameSpace, const CIMConstInstance& newInstance)
@@ -209,9 +167,9 @@ void Repository::deleteInstance(const CIMNamespaceName& nameSpace, const CIMObje
     fState->instances.remove(fState->namespaces.id(nameSpace), path);
 }
 
-// The lock is let go between batches; instances created or deleted meanwhile may or may not be seen.
+// The lock is held for one batch at a time: a slow visitor must not stop the server.
 void Repository::enumerateInstances(const CIMNamespaceName& nameSpace, const CIMName& className,
-                                    const InstanceOptions& options, const InstanceSink& sink) const
+                                    const InstanceOptions& options, const InstanceVisitor& visit) const
 {
     std::int64_t after = 0;
     for (;;) {
@@ -224,7 +182,7 @@ void Repository::enumerateInstances(const CIMNamespaceName& nameSpace, const CIM
             return;
         }
         for (const CIMInstance& instance : batch) {
-            if (!sink(instance)) {
+            if (!visit(instance)) {
                 return;
             }
         }

@@ -14,7 +14,7 @@
 
 namespace Pegasus::repository {
 
-// Which parts of a class an answer holds (DSP0200, GetClass). The defaults are those of the operation.
+// Which parts of a class an answer has (DSP0200, GetClass). The defaults are those of the operation.
 struct ClassOptions
 {
     bool localOnly = true;         // leave out inherited qualifiers, properties and methods; overriding ones stay
@@ -23,7 +23,7 @@ struct ClassOptions
     CIMPropertyList propertyList = CIMPropertyList(); // null: all; names that the class lacks are ignored
 };
 
-// Which parts of a stored instance an answer holds. Stored instances carry no qualifiers.
+// Which parts of a stored instance an answer has. Qualifiers of instances are not stored.
 struct InstanceOptions
 {
     bool deepInheritance = true; // false: subclass instances are cut down to the named class's properties
@@ -31,9 +31,9 @@ struct InstanceOptions
     CIMPropertyList propertyList = CIMPropertyList();
 };
 
-// Sizes that bound what one repository keeps; each violation throws CIM_ERR_SERVER_LIMITS_EXCEEDED and names the
-// limit.
-struct Limits
+// Sizes that bound what one repository keeps. Exceeding one throws CIM_ERR_SERVER_LIMITS_EXCEEDED; the message names
+// the limit.
+struct RepositoryLimits
 {
     std::size_t objectBytes = 8u << 20; // encoded size of one class, instance or qualifier declaration
     std::size_t inheritanceDepth = 64;  // classes from a root class to the new one
@@ -41,96 +41,91 @@ struct Limits
     std::size_t cachedClassCount = 1024; // resolved classes held in memory; more are resolved again on demand
 };
 
-// Receives enumerated objects one by one, outside of any lock of the repository.
-// Returns false to end the enumeration early.
-using InstanceSink = std::function<bool(const CIMInstance&)>;
+// Receives enumerated instances one by one. No lock of the repository is held, so the visitor may call it.
+// Returns: false to end the enumeration early.
+using InstanceVisitor = std::function<bool(const CIMInstance&)>;
 
 // The private server's store of namespaces, qualifier declarations, classes and instances.
 //
-// Classes are stored as they were created; what they inherit is resolved on reading. A write is acknowledged when
-// the call returns, and survives the death of the process from then on (not a power cut). A failed write changes
-// nothing.
+// Four levels: this class serialises operations and finds the namespace; one store a kind of object (NamespaceTable,
+// QualifierStore, ClassStore, InstanceStore) applies CIM's rules and keeps caches; Storage maps names and encoded
+// objects to tables; Database and Statement are SQLite.
 //
-// Names compare without regard to case and are given back in the spelling of their creation. Enumerations run in
-// order of creation.
+// Classes are stored as they were created and resolved with what they inherit when they are read. A write that has
+// returned survives the death of the process; a power cut may lose it. A failed write changes nothing.
 //
-// Throws: every operation throws CIMException. Its message is the bare cause (the name, in the simple cases), without
-// the symbolic code in front. CIM_ERR_INVALID_NAMESPACE (message: the namespace) when the namespace does not exist;
-// CIM_ERR_FAILED when the storage fails.
+// Names compare without regard to case and are returned in the spelling of their creation. Enumerations are in order of
+// creation.
 //
-// Thread: all operations may be called from any thread at any time; they run one after the other.
-// Ownership: classes that are given back share their parts with the cache; clone() gives one to change.
-// Blocks: for single file accesses only.
+// Throws: every operation throws CIMException. Its message is the cause alone (in the simple cases the name), without
+//     the symbolic code. CIM_ERR_INVALID_NAMESPACE (message: the namespace) when the namespace does not exist;
+//     CIM_ERR_FAILED when the storage fails.
+// Thread: all operations may be called on any thread at any time; they run one after the other.
+// Ownership: returned classes share their parts with the cache; clone() makes one that may be changed.
+// Blocks: for file accesses of one operation, and while another thread's operation runs.
 class Repository
 {
   public:
-    // Opens the store in directory, which is created with its parents if missing; root exists from the start.
-    // The directory may be deleted while the repository is open: operations go on, nothing stays on disk.
+    // Opens the store in `directory`, which is created with its parents if missing. The namespace root always exists.
+    // The directory may be deleted while the repository is open: operations go on with the deleted file.
     // Requires: no other process has it open.
-    explicit Repository(const std::string& directory, const Limits& limits = {});
+    explicit Repository(const std::string& directory, const RepositoryLimits& limits = {});
     ~Repository();
     Repository(const Repository&) = delete;
     Repository& operator=(const Repository&) = delete;
 
-    // Parents need not exist. Throws CIM_ERR_ALREADY_EXISTS.
+    // Parents need not exist.
+    // Throws: CIM_ERR_ALREADY_EXISTS.
     void createNamespace(const CIMNamespaceName& nameSpace);
-    // Throws CIM_ERR_NAMESPACE_NOT_EMPTY unless it holds neither class, instance nor qualifier declaration.
-    void deleteNamespace(const CIMNamespaceName& nameSpace);
     bool hasNamespace(const CIMNamespaceName& nameSpace) const;
     std::vector<CIMNamespaceName> namespaces() const;
 
-    // Throws CIM_ERR_NOT_FOUND.
+    // Throws: CIM_ERR_NOT_FOUND.
     CIMQualifierDecl getQualifier(const CIMNamespaceName& nameSpace, const CIMName& name) const;
     std::vector<CIMQualifierDecl> enumerateQualifiers(const CIMNamespaceName& nameSpace) const;
-    // Creates the declaration. An existing one is replaced, except that one with another type or array form is kept
-    // silently (as OpenPegasus does).
+    // Creates or replaces the declaration. An existing one of another type or array form stays as it is without an
+    // error, as in OpenPegasus.
     void setQualifier(const CIMNamespaceName& nameSpace, const CIMConstQualifierDecl& declaration);
-    // Throws CIM_ERR_NOT_FOUND.
-    void deleteQualifier(const CIMNamespaceName& nameSpace, const CIMName& name);
 
-    // Throws CIM_ERR_NOT_FOUND.
+    // Throws: CIM_ERR_NOT_FOUND.
     CIMConstClass getClass(const CIMNamespaceName& nameSpace, const CIMName& className,
                            const ClassOptions& options) const;
-    // The same as a CLASS element (DSP0201): what clients ask for again and again is encoded once.
+    // The same as a CLASS element (DSP0201). Forms that clients ask for repeatedly are encoded once.
     std::shared_ptr<const std::string> getClassText(const CIMNamespaceName& nameSpace, const CIMName& className,
                                                     const ClassOptions& options) const;
     bool hasClass(const CIMNamespaceName& nameSpace, const CIMName& className) const;
-    // The null name if the class has none. Throws CIM_ERR_NOT_FOUND.
-    CIMName superClass(const CIMNamespaceName& nameSpace, const CIMName& className) const;
-    // Subclasses of className (of nothing, i.e. root classes, if null): direct ones, or all below when deep.
-    // Throws CIM_ERR_INVALID_CLASS.
+    // Returns: the subclasses of `className`, or the root classes if it is null; with `deepInheritance` all below them
+    //     too.
+    // Throws: CIM_ERR_INVALID_CLASS.
     std::vector<CIMName> enumerateClassNames(const CIMNamespaceName& nameSpace, const CIMName& className,
                                              bool deepInheritance) const;
-    std::vector<CIMConstClass> enumerateClasses(const CIMNamespaceName& nameSpace, const CIMName& className,
-                                                bool deepInheritance, const ClassOptions& options) const;
     // Checks and stores a class. Qualifiers take the flavors of their declarations; a use may narrow them.
-    // Throws CIM_ERR_ALREADY_EXISTS, CIM_ERR_INVALID_SUPERCLASS, CIM_ERR_INVALID_PARAMETER and CIM_ERR_FAILED (rules
-    // of qualifiers, overriding, keys and references).
+    // Throws: CIM_ERR_ALREADY_EXISTS, CIM_ERR_INVALID_SUPERCLASS; CIM_ERR_INVALID_PARAMETER and CIM_ERR_FAILED for the
+    //     rules of qualifiers, overriding, keys and references.
     void createClass(const CIMNamespaceName& nameSpace, const CIMConstClass& newClass);
-    // Replaces a class that has neither subclasses nor instances, under the rules of createClass.
-    // Throws CIM_ERR_NOT_FOUND, CIM_ERR_CLASS_HAS_CHILDREN, CIM_ERR_CLASS_HAS_INSTANCES and createClass's codes.
-    void modifyClass(const CIMNamespaceName& nameSpace, const CIMConstClass& modifiedClass);
-    // Throws CIM_ERR_NOT_FOUND, CIM_ERR_CLASS_HAS_CHILDREN, CIM_ERR_CLASS_HAS_INSTANCES.
-    void deleteClass(const CIMNamespaceName& nameSpace, const CIMName& className);
 
     // Stores an instance with every property of its class: those not given come first, with the class's defaults.
     // Returns: its path, without host and namespace.
-    // Throws CIM_ERR_INVALID_CLASS, CIM_ERR_ALREADY_EXISTS (message: the path), CIM_ERR_FAILED ("no such property: X",
-    // "type mismatch", "class has no keys: X"), CIM_ERR_NOT_SUPPORTED for an abstract class.
+    // Throws: CIM_ERR_INVALID_CLASS, CIM_ERR_ALREADY_EXISTS (message: the path), CIM_ERR_FAILED ("no such property: X",
+    //     "type mismatch", "class has no keys: X"), CIM_ERR_NOT_SUPPORTED for an abstract class.
     CIMObjectPath createInstance(const CIMNamespaceName& nameSpace, const CIMConstInstance& newInstance);
-    // Throws CIM_ERR_INVALID_CLASS, CIM_ERR_NOT_FOUND (message: the path).
+    // Throws: CIM_ERR_INVALID_CLASS, CIM_ERR_NOT_FOUND (message: the path).
     CIMInstance getInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path,
                             const InstanceOptions& options) const;
-    // Replaces the values of the given properties (all of modified, or those that the list names).
-    // Throws CIM_ERR_INVALID_CLASS, CIM_ERR_NOT_FOUND, CIM_ERR_FAILED as createInstance.
+    // Replaces the values of properties of the instance at the path of `modified`: of all that it has, or of those
+    // listed.
+    // Throws: CIM_ERR_INVALID_CLASS, CIM_ERR_NOT_FOUND; CIM_ERR_FAILED as createInstance; CIM_ERR_INVALID_PARAMETER
+    //     when a key would change.
     void modifyInstance(const CIMNamespaceName& nameSpace, const CIMConstInstance& modified,
                         const CIMPropertyList& propertyList);
-    // Throws CIM_ERR_INVALID_CLASS, CIM_ERR_NOT_FOUND.
+    // Throws: CIM_ERR_INVALID_CLASS, CIM_ERR_NOT_FOUND.
     void deleteInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path);
-    // Instances of the class and its subclasses, each with its path set (no host, no namespace), in bounded memory.
-    // Throws CIM_ERR_INVALID_CLASS.
+    // Passes the instances of the class and its subclasses, each with its path (without host and namespace), to the
+    // visitor. Memory stays bounded: they are read in batches. An instance that is created or deleted meanwhile may or
+    // may not be seen.
+    // Throws: CIM_ERR_INVALID_CLASS; what the visitor throws.
     void enumerateInstances(const CIMNamespaceName& nameSpace, const CIMName& className, const InstanceOptions& options,
-                            const InstanceSink& sink) const;
+                            const InstanceVisitor& visit) const;
     std::vector<CIMObjectPath> enumerateInstanceNames(const CIMNamespaceName& nameSpace,
                                                       const CIMName& className) const;
 

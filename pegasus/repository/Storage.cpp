@@ -53,23 +53,15 @@ struct Storage::Statements
     explicit Statements(const Database& db)
         : listNamespaces(db, "SELECT id, name FROM namespaces ORDER BY id"),
           insertNamespace(db, "INSERT INTO namespaces(name) VALUES(?) RETURNING id"),
-          deleteNamespace(db, "DELETE FROM namespaces WHERE id = ?"),
-          namespaceContent(db, "SELECT EXISTS(SELECT 1 FROM qualifiers WHERE namespace = ?1)"
-                               " OR EXISTS(SELECT 1 FROM classes WHERE namespace = ?1)"
-                               " OR EXISTS(SELECT 1 FROM instances WHERE namespace = ?1)"),
           findQualifier(db, "SELECT body FROM qualifiers WHERE namespace = ? AND name = ?"),
           listQualifiers(db, "SELECT body FROM qualifiers WHERE namespace = ? ORDER BY sequence"),
           putQualifier(db, "INSERT INTO qualifiers(namespace, name, body) VALUES(?, ?, ?)"
                            " ON CONFLICT(namespace, name) DO UPDATE SET body = excluded.body"),
-          deleteQualifier(db, "DELETE FROM qualifiers WHERE namespace = ? AND name = ? RETURNING 1"),
           findClass(db, "SELECT body FROM classes WHERE namespace = ? AND name = ?"),
           findSuperClass(db, "SELECT super FROM classes WHERE namespace = ? AND name = ?"),
           listSubclasses(db, "SELECT name FROM classes WHERE namespace = ? AND super = ? ORDER BY sequence"),
           listDeepSubclasses(db, kListDeepSubclasses),
-          putClass(db, "INSERT INTO classes(namespace, name, super, body) VALUES(?, ?, ?, ?)"
-                       " ON CONFLICT(namespace, name) DO UPDATE SET super = excluded.super, body = excluded.body"),
-          deleteClass(db, "DELETE FROM classes WHERE namespace = ? AND name = ?"),
-          hasInstances(db, "SELECT 1 FROM instances WHERE namespace = ? AND class = ? LIMIT 1"),
+          insertClass(db, "INSERT INTO classes(namespace, name, super, body) VALUES(?, ?, ?, ?)"),
           findInstance(db, "SELECT sequence, body FROM instances WHERE namespace = ? AND path = ?"),
           insertInstance(db, "INSERT INTO instances(namespace, class, path, body) VALUES(?, ?, ?, ?)"),
           updateInstance(db, "UPDATE instances SET body = ?2 WHERE sequence = ?1"),
@@ -77,9 +69,9 @@ struct Storage::Statements
     {
     }
 
-    Statement listNamespaces, insertNamespace, deleteNamespace, namespaceContent;
-    Statement findQualifier, listQualifiers, putQualifier, deleteQualifier;
-    Statement findClass, findSuperClass, listSubclasses, listDeepSubclasses, putClass, deleteClass, hasInstances;
+    Statement listNamespaces, insertNamespace;
+    Statement findQualifier, listQualifiers, putQualifier;
+    Statement findClass, findSuperClass, listSubclasses, listDeepSubclasses, insertClass;
     Statement findInstance, insertInstance, updateInstance, deleteInstance, listInstances;
 };
 
@@ -106,19 +98,8 @@ NamespaceId Storage::insertNamespace(const std::string& name)
     Rows rows = fStatements->insertNamespace.run(std::string_view(name));
     rows.next();
     const NamespaceId id = rows.integer(0);
-    rows.next(); // the row is only kept once the statement has ended
+    rows.next(); // SQLite commits the row only when the statement has run to its end
     return id;
-}
-
-void Storage::deleteNamespace(NamespaceId id)
-{
-    fStatements->deleteNamespace.execute(id);
-}
-
-bool Storage::isNamespaceEmpty(NamespaceId id)
-{
-    Rows rows = fStatements->namespaceContent.run(id);
-    return rows.next() && rows.integer(0) == 0;
 }
 
 std::optional<std::string> Storage::findQualifier(NamespaceId id, const std::string& name)
@@ -134,16 +115,6 @@ std::vector<std::string> Storage::listQualifiers(NamespaceId id)
 void Storage::putQualifier(NamespaceId id, const std::string& name, const std::string& body)
 {
     fStatements->putQualifier.execute(id, std::string_view(name), std::string_view(body));
-}
-
-bool Storage::deleteQualifier(NamespaceId id, const std::string& name)
-{
-    Rows rows = fStatements->deleteQualifier.run(id, std::string_view(name));
-    const bool wasThere = rows.next();
-    if (wasThere) {
-        rows.next();
-    }
-    return wasThere;
 }
 
 std::optional<std::string> Storage::findClass(NamespaceId id, const std::string& name)
@@ -162,19 +133,10 @@ std::vector<std::string> Storage::listSubclasses(NamespaceId id, const std::stri
     return allTexts(statement.run(id, std::string_view(name)));
 }
 
-void Storage::putClass(NamespaceId id, const std::string& name, const std::string& superName, const std::string& body)
+void Storage::insertClass(NamespaceId id, const std::string& name, const std::string& superName,
+                          const std::string& body)
 {
-    fStatements->putClass.execute(id, std::string_view(name), std::string_view(superName), std::string_view(body));
-}
-
-void Storage::deleteClass(NamespaceId id, const std::string& name)
-{
-    fStatements->deleteClass.execute(id, std::string_view(name));
-}
-
-bool Storage::hasInstances(NamespaceId id, const std::string& className)
-{
-    return fStatements->hasInstances.run(id, std::string_view(className)).next();
+    fStatements->insertClass.execute(id, std::string_view(name), std::string_view(superName), std::string_view(body));
 }
 
 std::optional<InstanceRow> Storage::findInstance(NamespaceId id, const std::string& path)

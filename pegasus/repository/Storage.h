@@ -3,6 +3,7 @@
 #include "pegasus/repository/Database.h"
 
 #include <cstdint>
+#include <memory>
 #include <optional>
 #include <string>
 #include <utility>
@@ -19,50 +20,47 @@ struct InstanceRow
     std::string body;
 };
 
-// The repository's tables: rows of names and encoded objects, no rules. Names ignore the case of ASCII letters.
+// The repository's tables: rows of names and encoded objects. Rules are one level up, in the stores. Names match
+// without regard to the case of ASCII letters; lists are in order of creation.
 //
-// Throws: CIMException CIM_ERR_FAILED. Thread: one thread at a time.
+// Throws: CIMException CIM_ERR_FAILED when the database fails.
+// Thread: one thread at a time.
 class Storage
 {
   public:
+    // Opens or creates the database file `path` and its tables.
     explicit Storage(const std::string& path);
     ~Storage();
 
     std::vector<std::pair<NamespaceId, std::string>> namespaces();
     NamespaceId insertNamespace(const std::string& name);
-    void deleteNamespace(NamespaceId id);
-    bool isNamespaceEmpty(NamespaceId id);
 
     std::optional<std::string> findQualifier(NamespaceId id, const std::string& name);
     std::vector<std::string> listQualifiers(NamespaceId id);
     // Inserts or replaces.
     void putQualifier(NamespaceId id, const std::string& name, const std::string& body);
-    // Returns false if there was none.
-    bool deleteQualifier(NamespaceId id, const std::string& name);
 
     std::optional<std::string> findClass(NamespaceId id, const std::string& name);
-    // Empty for a class without superclass.
+    // Returns: the superclass's name, empty for a root class; nothing when there is no such class.
     std::optional<std::string> findSuperClass(NamespaceId id, const std::string& name);
-    // Names of the direct subclasses, or of all below; of root classes if name is empty.
+    // Returns: the names of the direct subclasses, or of all below when deep; of root classes when `name` is empty.
     std::vector<std::string> listSubclasses(NamespaceId id, const std::string& name, bool isDeep);
-    void putClass(NamespaceId id, const std::string& name, const std::string& superName, const std::string& body);
-    void deleteClass(NamespaceId id, const std::string& name);
-    bool hasInstances(NamespaceId id, const std::string& className);
+    void insertClass(NamespaceId id, const std::string& name, const std::string& superName, const std::string& body);
 
-    // path: as pathKey() forms it.
+    // `path`: as pathKey() forms it.
     std::optional<InstanceRow> findInstance(NamespaceId id, const std::string& path);
     void insertInstance(NamespaceId id, const std::string& className, const std::string& path, const std::string& body);
     void updateInstance(std::int64_t sequence, const std::string& body);
     void deleteInstance(std::int64_t sequence);
-    // Instances of the class and of all below it that were created behind `after`: at most limit of them, and no
-    // further one when maxBytes are reached.
+    // Returns: instances of the class and of all below it with a sequence beyond `after`: at most `limit` of them, and
+    //     no further one once `maxBytes` are reached.
     std::vector<InstanceRow> listInstances(NamespaceId id, const std::string& className, std::int64_t after,
                                            std::size_t limit, std::size_t maxBytes);
 
   private:
     struct Statements;
     Database fDatabase;
-    std::unique_ptr<Statements> fStatements;
+    std::unique_ptr<Statements> fStatements; // prepared once; end before the database closes
 };
 
 } // namespace Pegasus::repository

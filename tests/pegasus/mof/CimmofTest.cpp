@@ -243,9 +243,8 @@ TEST(CimmofAlone, LeavesAWholeRepositoryWhenTheServerIsKilled)
         before = names.size();
         for (std::size_t i = 0; i < names.size(); ++i) {
             EXPECT_TRUE(names[i].equal(Pegasus::CIMName(("K" + std::to_string(i)).c_str()))) << i;
+            EXPECT_NO_THROW(repository.getClass(nameSpace, names[i], {false, true, true, {}})) << i;
         }
-        EXPECT_EQ(repository.enumerateClasses(nameSpace, Pegasus::CIMName(), true, {false, true, true, {}}).size(),
-                  before);
     }
     EXPECT_GT(before, 0u);
 }

@@ -1,4 +1,4 @@
-#include "pegasus/repository/ClassCache.h"
+#include "pegasus/repository/ResolvedClassCache.h"
 
 #include "pegasus/repository/ClassFilter.h"
 #include "pegasus/wire/ElementEncoder.h"
@@ -7,9 +7,9 @@ namespace Pegasus::repository {
 
 namespace {
 
-std::string keyOf(NamespaceId nameSpace, const std::string& foldedName)
+std::string keyOf(NamespaceId nameSpace, const std::string& nameKey)
 {
-    return std::to_string(nameSpace) + ":" + foldedName;
+    return std::to_string(nameSpace) + ":" + nameKey;
 }
 
 std::size_t formIndex(const ClassOptions& options)
@@ -20,7 +20,7 @@ std::size_t formIndex(const ClassOptions& options)
 
 } // namespace
 
-ClassCache::Entry* ClassCache::touch(const std::string& key)
+ResolvedClassCache::Entry* ResolvedClassCache::touch(const std::string& key)
 {
     const auto found = fByKey.find(key);
     if (found == fByKey.end()) {
@@ -30,16 +30,15 @@ ClassCache::Entry* ClassCache::touch(const std::string& key)
     return &fEntries.front();
 }
 
-CIMClass ClassCache::find(NamespaceId nameSpace, const std::string& foldedName)
+CIMClass ResolvedClassCache::find(NamespaceId nameSpace, const std::string& nameKey)
 {
-    const Entry* entry = touch(keyOf(nameSpace, foldedName));
+    const Entry* entry = touch(keyOf(nameSpace, nameKey));
     return entry ? entry->resolved : CIMClass();
 }
 
-void ClassCache::insert(NamespaceId nameSpace, const std::string& foldedName, const CIMClass& resolved)
+void ResolvedClassCache::insert(NamespaceId nameSpace, const std::string& nameKey, const CIMClass& resolved)
 {
-    remove(nameSpace, foldedName);
-    fEntries.push_front(Entry{keyOf(nameSpace, foldedName), resolved, {}});
+    fEntries.push_front(Entry{keyOf(nameSpace, nameKey), resolved, {}});
     fByKey[fEntries.front().key] = fEntries.begin();
     if (fEntries.size() > fCapacity) {
         fByKey.erase(fEntries.back().key);
@@ -47,10 +46,10 @@ void ClassCache::insert(NamespaceId nameSpace, const std::string& foldedName, co
     }
 }
 
-std::shared_ptr<const std::string> ClassCache::text(NamespaceId nameSpace, const std::string& foldedName,
-                                                    const ClassOptions& options)
+std::shared_ptr<const std::string> ResolvedClassCache::text(NamespaceId nameSpace, const std::string& nameKey,
+                                                            const ClassOptions& options)
 {
-    Entry& entry = *touch(keyOf(nameSpace, foldedName));
+    Entry& entry = *touch(keyOf(nameSpace, nameKey));
     std::shared_ptr<const std::string>& kept = entry.texts[formIndex(options)];
     if (kept) {
         return kept;
@@ -65,21 +64,11 @@ std::shared_ptr<const std::string> ClassCache::text(NamespaceId nameSpace, const
     return kept = made;
 }
 
-void ClassCache::forgetTexts()
+void ResolvedClassCache::forgetTexts()
 {
     for (Entry& entry : fEntries) {
         entry.texts = {};
     }
-}
-
-void ClassCache::remove(NamespaceId nameSpace, const std::string& foldedName)
-{
-    const auto found = fByKey.find(keyOf(nameSpace, foldedName));
-    if (found == fByKey.end()) {
-        return;
-    }
-    fEntries.erase(found->second);
-    fByKey.erase(found);
 }
 
 } // namespace Pegasus::repository

@@ -7,6 +7,7 @@
 
 namespace Pegasus::repository {
 
+// Throws: CIMException with the status code and the UTF-8 text as its message.
 [[noreturn]] inline void fail(CIMStatusCode code, const std::string& text)
 {
     throw CIMException(code, String(text.c_str()));

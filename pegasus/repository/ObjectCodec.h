@@ -11,26 +11,28 @@
 
 namespace Pegasus::repository {
 
-// Objects to the texts in which they are stored, and back: the elements of CIM-XML.
+// Encodes objects as the texts in which they are stored, the elements of CIM-XML, and decodes them.
 //
 // Throws: CIM_ERR_SERVER_LIMITS_EXCEEDED for an object beyond the limit; CIM_ERR_FAILED for a stored text that cannot
-// be read. Thread: one thread at a time.
-class ObjectText
+//     be read.
+// Thread: one thread at a time.
+class ObjectCodec
 {
   public:
-    explicit ObjectText(std::size_t maxBytes);
+    // `maxBytes`: limit of one encoded object.
+    explicit ObjectCodec(std::size_t maxBytes);
 
-    std::string fromClass(const CIMConstClass& object) const;
-    std::string fromInstance(const CIMConstInstance& object) const;
-    std::string fromQualifier(const CIMConstQualifierDecl& object) const;
+    std::string encodeClass(const CIMConstClass& object) const;
+    std::string encodeInstance(const CIMConstInstance& object) const;
+    std::string encodeQualifier(const CIMConstQualifierDecl& object) const;
 
-    CIMClass toClass(std::string text);
-    CIMInstance toInstance(std::string text);
-    CIMQualifierDecl toQualifier(std::string text);
+    CIMClass decodeClass(std::string text);
+    CIMInstance decodeInstance(std::string text);
+    CIMQualifierDecl decodeQualifier(std::string text);
 
   private:
     std::string checked(std::string text) const;
-    template <class Object>
+    template <typename Object>
     Object decode(std::string& text, Object (wire::ElementDecoder::*function)(const wire::XmlElement&));
 
     std::size_t fMaxBytes;

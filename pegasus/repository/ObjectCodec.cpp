@@ -1,13 +1,13 @@
-#include "pegasus/repository/ObjectText.h"
+#include "pegasus/repository/ObjectCodec.h"
 
-#include "pegasus/repository/Failure.h"
+#include "pegasus/repository/CimError.h"
 #include "pegasus/wire/ElementEncoder.h"
 
 namespace Pegasus::repository {
 
 namespace {
 
-// What was accepted once must be readable later, whatever limits the network has.
+// An accepted object must stay readable, so the limits of the network do not apply here.
 wire::XmlLimits storageLimits(std::size_t maxBytes)
 {
     wire::XmlLimits limits;
@@ -19,12 +19,12 @@ wire::XmlLimits storageLimits(std::size_t maxBytes)
 
 } // namespace
 
-ObjectText::ObjectText(std::size_t maxBytes)
+ObjectCodec::ObjectCodec(std::size_t maxBytes)
     : fMaxBytes(maxBytes), fDocument(storageLimits(maxBytes)), fDecoder(storageLimits(maxBytes))
 {
 }
 
-std::string ObjectText::checked(std::string text) const
+std::string ObjectCodec::checked(std::string text) const
 {
     if (text.size() > fMaxBytes) {
         fail(CIM_ERR_SERVER_LIMITS_EXCEEDED,
@@ -33,29 +33,29 @@ std::string ObjectText::checked(std::string text) const
     return text;
 }
 
-std::string ObjectText::fromClass(const CIMConstClass& object) const
+std::string ObjectCodec::encodeClass(const CIMConstClass& object) const
 {
     std::string text;
     wire::appendClass(text, object);
     return checked(std::move(text));
 }
 
-std::string ObjectText::fromInstance(const CIMConstInstance& object) const
+std::string ObjectCodec::encodeInstance(const CIMConstInstance& object) const
 {
     std::string text;
     wire::appendInstance(text, object);
     return checked(std::move(text));
 }
 
-std::string ObjectText::fromQualifier(const CIMConstQualifierDecl& object) const
+std::string ObjectCodec::encodeQualifier(const CIMConstQualifierDecl& object) const
 {
     std::string text;
     wire::appendQualifierDeclaration(text, object);
     return checked(std::move(text));
 }
 
-template <class Object>
-Object ObjectText::decode(std::string& text, Object (wire::ElementDecoder::*function)(const wire::XmlElement&))
+template <typename Object>
+Object ObjectCodec::decode(std::string& text, Object (wire::ElementDecoder::*function)(const wire::XmlElement&))
 {
     try {
         return (fDecoder.*function)(fDocument.parseElement(text.data(), text.size(), {}));
@@ -64,17 +64,17 @@ Object ObjectText::decode(std::string& text, Object (wire::ElementDecoder::*func
     }
 }
 
-CIMClass ObjectText::toClass(std::string text)
+CIMClass ObjectCodec::decodeClass(std::string text)
 {
     return decode<CIMClass>(text, &wire::ElementDecoder::decodeClass);
 }
 
-CIMInstance ObjectText::toInstance(std::string text)
+CIMInstance ObjectCodec::decodeInstance(std::string text)
 {
     return decode<CIMInstance>(text, &wire::ElementDecoder::decodeInstance);
 }
 
-CIMQualifierDecl ObjectText::toQualifier(std::string text)
+CIMQualifierDecl ObjectCodec::decodeQualifier(std::string text)
 {
     return decode<CIMQualifierDecl>(text, &wire::ElementDecoder::decodeQualifierDeclaration);
 }

@@ -1,0 +1,50 @@
+#pragma once
+
+#include "pegasus/repository/Repository.h"
+#include "pegasus/repository/Storage.h"
+
+#include <array>
+#include <list>
+#include <memory>
+#include <string>
+#include <unordered_map>
+
+namespace Pegasus::repository {
+
+// Resolved classes, at most so many; the least recently used one is dropped first. Each keeps the encoded forms that
+// clients asked for. Nothing goes stale: a stored class never changes and is never removed.
+// Thread: one thread at a time.
+class ResolvedClassCache
+{
+  public:
+    explicit ResolvedClassCache(std::size_t capacity) : fCapacity(capacity) {}
+
+    // Returns: the class; uninitialised when it is not in the cache.
+    CIMClass find(NamespaceId nameSpace, const std::string& nameKey);
+    // Requires: the class is not in the cache.
+    void insert(NamespaceId nameSpace, const std::string& nameKey, const CIMClass& resolved);
+    // Returns: the class as a CLASS element, encoded at the first request and kept for a while.
+    // Requires: the class is in the cache; the options have no property list.
+    std::shared_ptr<const std::string> text(NamespaceId nameSpace, const std::string& nameKey,
+                                            const ClassOptions& options);
+
+  private:
+    struct Entry
+    {
+        std::string key;
+        CIMClass resolved;
+        std::array<std::shared_ptr<const std::string>, 8> texts; // by the three switches of ClassOptions
+    };
+
+    static constexpr std::size_t kMaxTextBytes = 8u << 20;
+
+    Entry* touch(const std::string& key);
+    void forgetTexts();
+
+    std::size_t fCapacity;
+    std::size_t fTextBytes = 0; // upper bound of what is kept: a dropped class's texts are not subtracted
+    std::list<Entry> fEntries;  // most recently used first
+    std::unordered_map<std::string, std::list<Entry>::iterator> fByKey;
+};
+
+} // namespace Pegasus::repository
