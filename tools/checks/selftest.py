@@ -19,7 +19,7 @@ WRONG_INCLUDES = [
     ("host/inmem", '"host/cli/"'),
     ("pegasus/base", '"pegasus/wire/"'),
     ("pegasus/repository", '"pegasus/server/net/"'),
-    ("pegasus/cmpi", '"pegasus/server/agent/"'),
+    ("pegasus/cmpi/objects", '"pegasus/server/agent/"'),
     ("pegasus/server/net", '"pegasus/server/agent/"'),
     ("providers/linux", "<Pegasus/Common/String.h>"),
 ]
@@ -39,6 +39,8 @@ FAULTS = [
     ("format", "src/common/P{n}.cpp", "void f(int a)\n{\n" + "    ++a;\n" * 61 + "}\n", ":2: a function of 61 lines"),
     ("wording", "src/common/P{n}.cpp", "// The fault was men" "ded.\n", ":1: \"men" "ded\": fix"),
     ("wording", "docs/P{n}.md", "A text\nthat is" " no name.\n", ":2: \"is" " no\": say"),
+    ("documents", "docs/P{n}.md", "See [this](nowhere.md).\n", ":1: the link to nowhere.md"),
+    ("documents", "docs/P{n}.md", "See\n`pegasus/{wire,nowhere}`.\n", ":2: `pegasus/nowhere` does not exist"),
     ("forbidden", "src/common/P{n}.cpp", 'void f()\n{\n    setenv("A", "", 1);\n}\n', ":3:"),
     ("forbidden", "src/common/P{n}.cpp", 'void f()\n{\n    std::cout << 1;\n}\n', ":3:"),
     ("dead", "src/common/P{n}.cpp", "int unused;\n", " is compiled by no target"),
