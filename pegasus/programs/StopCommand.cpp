@@ -1,70 +1,27 @@
 #include "pegasus/programs/StopCommand.h"
 
-#include "pegasus/base/Descriptor.h"
-#include "pegasus/base/LocalSocket.h"
+#include "pegasus/base/TreeLockFile.h"
+#include "pegasus/server/admin/ProcessHandle.h"
 #include "pegasus/server/admin/StartFile.h"
 
 #include <Pegasus/Client/CIMClient.h>
 
 #include <iostream>
-#include <system_error>
-
-#include <poll.h>
-#include <signal.h>
-#include <sys/socket.h>
-#include <sys/syscall.h>
-#include <sys/types.h>
 
 namespace Pegasus::programs {
 
 namespace {
 
-using server::Descriptor;
-
 constexpr std::chrono::milliseconds kConnectTimeout{1000};
 constexpr Uint32 kAnswerTimeoutMs = 60'000;
-constexpr int kEndTimeoutMs = 60'000;
-constexpr int kTermTimeoutMs = 10'000;
+constexpr std::chrono::seconds kEndTimeout{60};
+constexpr std::chrono::seconds kTermTimeout{10};
 
-// The process that listens on the local socket; it outlives every file that could name it.
-pid_t listeningProcess(const std::string& home)
-{
-    try {
-        const Descriptor socket = base::connectLocalSocket(home, base::Deadline::after(kConnectTimeout));
-        ucred peer = {};
-        socklen_t size = sizeof peer;
-        return ::getsockopt(socket.get(), SOL_SOCKET, SO_PEERCRED, &peer, &size) == 0 ? peer.pid : 0;
-    } catch (const std::system_error&) {
-        return 0;
-    }
-}
-
-// A process by a handle of its own: a later process of the same number is never waited for or hurt.
-class ProcessHandle
-{
-  public:
-    explicit ProcessHandle(pid_t pid) : fHandle(static_cast<int>(::syscall(SYS_pidfd_open, pid, 0))) {}
-
-    bool waitForEnd(int timeoutMs) const
-    {
-        pollfd wait = {fHandle.get(), POLLIN, 0};
-        return !fHandle || ::poll(&wait, 1, timeoutMs) > 0;
-    }
-    void send(int signal) const { ::syscall(SYS_pidfd_send_signal, fHandle.get(), signal, nullptr, 0); }
-
-  private:
-    Descriptor fHandle;
-};
-
-int forceShutdown(const std::string& reason, const ProcessHandle& process, pid_t pid, const std::string& consumer)
+int forceShutdown(const std::string& reason, const server::ProcessHandle& process, const base::TreeLockRecord& record)
 {
     std::cerr << "Error in server shutdown: " << reason << "\nForced shutdown initiated.\n";
-    process.send(SIGTERM);
-    if (!process.waitForEnd(kTermTimeoutMs)) {
-        process.send(SIGKILL);
-        process.waitForEnd(kEndTimeoutMs);
-    }
-    server::StartFile(consumer).removeIfOf(pid);
+    process.end(kTermTimeout);
+    server::StartFile::remove(record.startFile, record.pid);
     return 1;
 }
 
@@ -83,25 +40,25 @@ void askToEnd()
 
 } // namespace
 
-int stopServer(const std::string& home, const std::string& consumer)
+int stopServer(const std::string& home)
 {
-    const pid_t pid = listeningProcess(home);
-    if (pid <= 0) {
+    const base::TreeLockStatus status = base::readTreeLock(home);
+    if (status.state != base::TreeLockState::kHeld || status.record.pid <= 0) {
         std::cerr << "Unable to connect to CIM Server.  CIM Server may not be running.\n";
         return 1;
     }
-    const ProcessHandle process(pid);
+    const server::ProcessHandle process(status.record.pid);
     try {
         askToEnd();
     } catch (const CIMException& error) {
         const bool empty = error.getCode() == CIM_ERR_INVALID_NAMESPACE;
         return forceShutdown(empty ? "The repository may be empty." : std::string(error.getMessage().getCString()),
-                             process, pid, consumer);
+                             process, status.record);
     } catch (const Exception& error) {
-        return forceShutdown(std::string(error.getMessage().getCString()), process, pid, consumer);
+        return forceShutdown(std::string(error.getMessage().getCString()), process, status.record);
     }
-    if (!process.waitForEnd(kEndTimeoutMs)) {
-        return forceShutdown("The server does not end.", process, pid, consumer);
+    if (!process.waitForEnd(kEndTimeout)) {
+        return forceShutdown("The server does not end.", process, status.record);
     }
     std::cout << "CIM Server stopped.\n";
     return 0;

@@ -2,7 +2,7 @@
 #include "pegasus/programs/ServerCommand.h"
 #include "pegasus/programs/StopCommand.h"
 #include "pegasus/server/Server.h"
-#include "pegasus/server/admin/StartFile.h"
+#include "pegasus/server/admin/TreeClaim.h"
 #include "pegasus/server/agent/Agent.h"
 
 #include <Pegasus/Common/Exception.h>
@@ -57,20 +57,11 @@ int start(const ServerCommand& command, const std::string& home)
     return error.empty() ? 0 : 1;
 }
 
-int status(const std::string& consumer)
+int status(const std::string& home)
 {
-    const bool running = server::StartFile(consumer).runningServer().has_value();
+    const bool running = base::readTreeLock(home).state == base::TreeLockState::kHeld;
     std::cout << (running ? "The CIM Server is running.\n" : "The CIM Server is not running.\n");
     return running ? 0 : kNotRunning;
-}
-
-std::string consumerOf(const ServerCommand& command, const std::string& home)
-{
-    server::Config config(home);
-    for (const auto& [name, value] : command.properties) {
-        config.setFromCommandLine(name, value);
-    }
-    return config.text("consumer");
 }
 
 int run(const ServerCommand& command)
@@ -79,9 +70,9 @@ int run(const ServerCommand& command)
     ::setenv("PEGASUS_HOME", home.c_str(), 1); // for the client library and for agents
     switch (command.action) {
     case ServerCommand::Action::kStop:
-        return programs::stopServer(home, consumerOf(command, home));
+        return programs::stopServer(home);
     case ServerCommand::Action::kStatus:
-        return status(consumerOf(command, home));
+        return status(home);
     case ServerCommand::Action::kVersion:
         std::cout << VRX_VERSION << "\n";
         return 0;

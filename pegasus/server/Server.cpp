@@ -3,9 +3,8 @@
 #include "pegasus/base/LocalSocket.h"
 #include "pegasus/server/admin/Housekeeper.h"
 #include "pegasus/server/admin/Log.h"
-#include "pegasus/server/admin/StartFile.h"
 #include "pegasus/server/admin/StopSignal.h"
-#include "pegasus/server/admin/TreeLock.h"
+#include "pegasus/server/admin/TreeClaim.h"
 #include "pegasus/server/net/Acceptor.h"
 #include "pegasus/server/net/Listener.h"
 #include "pegasus/server/net/PeerCheck.h"
@@ -77,46 +76,6 @@ template <typename Settings> class SettingsCache
     Settings fSettings;
 };
 
-// The files that say that this server runs; taken first, removed last.
-class Presence
-{
-  public:
-    explicit Presence(const Config& config) : fHome(config.home()), fStartFile(config.text("consumer")) {}
-    ~Presence()
-    {
-        if (fWritten) {
-            fStartFile.removeIfOf(::getpid());
-        }
-        fLock.release();
-    }
-    Presence(const Presence&) = delete;
-    Presence& operator=(const Presence&) = delete;
-
-    void take(const Config& config)
-    try {
-        if (!fLock.acquire(fHome) || fStartFile.runningServer()) {
-            throw StartError("Unable to start CIMServer. CIMServer is already running.");
-        }
-        config.save();
-    } catch (const std::system_error&) {
-        throw StartError("cimserver not started: Failed to save configuration properties to file: cannot open file: " +
-                         currentConfigPath(fHome) + ". Configuration property not set.");
-    }
-
-    void announce()
-    {
-        fStartFile.write(::getpid());
-        fWritten = true;
-        Log::write(Severity::kInformation, "Wrote the start file " + fStartFile.path() + ".");
-    }
-
-  private:
-    std::string fHome;
-    StartFile fStartFile;
-    TreeLock fLock;
-    bool fWritten = false;
-};
-
 // Removes the local socket when the server ends.
 class LocalSocketFile
 {
@@ -136,16 +95,31 @@ std::string repositoryPath(const Config& config)
     return directory[0] == '/' ? directory : config.home() + "/" + directory;
 }
 
-std::vector<Acceptor::Source> listen(const Config& config, ConnectionGroup& remote, ConnectionGroup& local)
+// The sockets that connections come in by.
+struct Listeners
+{
+    Descriptor remote; // none when the configuration switches TCP off
+    Descriptor local;
+
+    explicit Listeners(const Config& config)
+    {
+        if (config.flag("enableHttpConnection")) {
+            const auto port = static_cast<std::uint16_t>(config.number("httpPort"));
+            remote = listenOnLoopback(port);
+            Log::write(Severity::kInformation, "Listening on 127.0.0.1:" + std::to_string(port) + ".");
+        }
+        local = listenLocally(config.home());
+    }
+};
+
+std::vector<Acceptor::Source> acceptFrom(Listeners listeners, ConnectionGroup& remote, ConnectionGroup& local)
 {
     std::vector<Acceptor::Source> sources;
-    if (config.flag("enableHttpConnection")) {
-        const auto port = static_cast<std::uint16_t>(config.number("httpPort"));
+    if (listeners.remote) {
         const auto lookup = std::make_shared<TcpPeerLookup>();
-        sources.push_back({listenOnLoopback(port), [lookup](int fd) { return lookup->userOf(fd); }, &remote});
-        Log::write(Severity::kInformation, "Listening on 127.0.0.1:" + std::to_string(port) + ".");
+        sources.push_back({std::move(listeners.remote), [lookup](int fd) { return lookup->userOf(fd); }, &remote});
     }
-    sources.push_back({listenLocally(config.home()), localPeerUser, &local});
+    sources.push_back({std::move(listeners.local), localPeerUser, &local});
     return sources;
 }
 
@@ -175,11 +149,14 @@ void endConnections(ConnectionGroup& remote, ConnectionGroup& local, AgentPool& 
 
 void Server::run(LaunchSignal& signal)
 {
-    Presence presence(fConfig);
-    presence.take(fConfig);
+    TreeClaim claim;
+    claim.take(fConfig);
     Log::open(fConfig.home(), !fConfig.flag("daemon"));
     Log::setLevel(logLevel(fConfig));
     StopSignal stop;
+    // The port first: a server that cannot have it leaves the repository as it is.
+    const LocalSocketFile socketFile(fConfig.home());
+    Listeners listeners(fConfig);
     repository::Repository repository(repositoryPath(fConfig));
     ProviderRegistry registry(repository);
     SettingsCache<AgentSettings> agentCache(fConfig, agentSettings);
@@ -190,9 +167,9 @@ void Server::run(LaunchSignal& signal)
     const auto settings = [&] { return connectionCache.get(); };
     ConnectionGroup remote(dispatcher, settings);
     ConnectionGroup local(dispatcher, settings);
-    const LocalSocketFile socketFile(fConfig.home());
-    Acceptor acceptor(listen(fConfig, remote, local), stop.fd(), [&] { return fConfig.number("maxConnections"); });
-    presence.announce();
+    Acceptor acceptor(acceptFrom(std::move(listeners), remote, local), stop.fd(),
+                      [&] { return fConfig.number("maxConnections"); });
+    claim.announce(repositoryPath(fConfig));
     Log::write(Severity::kInformation, "Started CIM Server, process " + std::to_string(::getpid()) + ".");
     const Housekeeper housekeeper(kHousekeepingInterval, [&] {
         Log::setLevel(logLevel(fConfig));

@@ -8,13 +8,6 @@
 
 namespace Pegasus::server {
 
-// The server cannot start. what() is what the launcher prints.
-class StartError : public std::runtime_error
-{
-  public:
-    using std::runtime_error::runtime_error;
-};
-
 // One run of the server, from its configuration to its orderly end.
 //
 // It ends on SIGTERM, SIGINT and SIGHUP, and when a client calls PG_ShutdownService.shutdown: no new request is read,
@@ -25,7 +18,7 @@ class Server
     explicit Server(Config& config) : fConfig(config) {}
 
     // Serves. Tells `signal` when connections are accepted.
-    // Throws: StartError before that.
+    // Throws: StartError, std::exception or Pegasus::Exception before that.
     // Requires: no other thread runs; called once a process (it takes the process's signals).
     void run(LaunchSignal& signal);
 

@@ -25,7 +25,7 @@ std::string folderOf(const std::string& path)
 ConfigValues readConfigFile(const std::string& path)
 {
     ConfigValues values;
-    std::istringstream lines(readSmallFile(path, kMaxConfigFileBytes));
+    std::istringstream lines(readOwnFile(path, kMaxConfigFileBytes));
     for (std::string line; std::getline(lines, line);) {
         const std::size_t equals = line.find('=');
         if (line.empty() || line[0] == '#' || equals == std::string::npos) {

@@ -51,12 +51,13 @@ void writePrivateFile(const std::string& path, const std::string& content)
     }
 }
 
-std::string readSmallFile(const std::string& path, std::size_t maxBytes)
+std::string readOwnFile(const std::string& path, std::size_t maxBytes)
 {
-    // Non-blocking, so that a FIFO in the file's place cannot hold the caller.
-    const Descriptor file(::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC));
+    const Descriptor file(::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
     struct stat info = {};
-    if (!file || ::fstat(file.get(), &info) != 0 || !S_ISREG(info.st_mode)) {
+    if (!file || ::fstat(file.get(), &info) != 0 || !S_ISREG(info.st_mode) ||
+        (info.st_uid != 0 && info.st_uid != ::geteuid()))
+    {
         return {};
     }
     std::string content(maxBytes, '\0');

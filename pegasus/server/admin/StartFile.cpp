@@ -2,8 +2,6 @@
 
 #include "pegasus/server/admin/PrivateFile.h"
 
-#include <charconv>
-
 #include <unistd.h>
 
 namespace Pegasus::server {
@@ -11,51 +9,30 @@ namespace Pegasus::server {
 namespace {
 
 constexpr std::size_t kMaxStartFileBytes = 64;
-constexpr std::size_t kMaxStatBytes = 4096;
 
-// /proc/<pid>/stat reads "<pid> (<name>) <state> ...".
-bool isLivingServer(pid_t pid)
+std::string contentFor(pid_t pid)
 {
-    const std::string stat = readSmallFile("/proc/" + std::to_string(pid) + "/stat", kMaxStatBytes);
-    const std::string name = std::to_string(pid) + " (cimserver) ";
-    return stat.compare(0, name.size(), name) == 0 && stat.size() > name.size() && stat[name.size()] != 'Z' &&
-           stat[name.size()] != 'X';
+    return std::to_string(pid) + "\n";
 }
 
 } // namespace
 
-StartFile::StartFile(const std::string& consumer) : fPath("/var/tmp/cimserverkol_tc_" + consumer + "_start.conf") {}
-
-void StartFile::write(pid_t pid) const
+std::string StartFile::pathOf(const std::string& consumer)
 {
-    writePrivateFile(fPath, std::to_string(pid) + "\n");
+    return "/var/tmp/cimserverkol_tc_" + consumer + "_start.conf";
 }
 
-void StartFile::removeIfOf(pid_t pid) const noexcept
+void StartFile::write(const std::string& path, pid_t pid)
 {
-    try {
-        if (this->pid() == pid) {
-            ::unlink(fPath.c_str());
-        }
-    } catch (...) { // out of memory: the file stays and names a dead process, which every reader checks
+    writePrivateFile(path, contentFor(pid));
+}
+
+void StartFile::remove(const std::string& path, pid_t pid) noexcept
+try {
+    if (readOwnFile(path, kMaxStartFileBytes) == contentFor(pid)) {
+        ::unlink(path.c_str());
     }
-}
-
-std::optional<pid_t> StartFile::pid() const
-{
-    const std::string content = readSmallFile(fPath, kMaxStartFileBytes);
-    pid_t pid = 0;
-    const auto parsed = std::from_chars(content.data(), content.data() + content.size(), pid);
-    if (parsed.ec != std::errc() || pid <= 0) {
-        return std::nullopt;
-    }
-    return pid;
-}
-
-std::optional<pid_t> StartFile::runningServer() const
-{
-    const std::optional<pid_t> pid = this->pid();
-    return pid && isLivingServer(*pid) ? pid : std::nullopt;
+} catch (...) { // out of memory: the file stays and names a process that has ended
 }
 
 } // namespace Pegasus::server

@@ -1,37 +1,26 @@
 #pragma once
 
-#include <optional>
 #include <string>
 
 #include <sys/types.h>
 
 namespace Pegasus::server {
 
-// The file under /var/tmp that says which process serves one consumer: the process id in decimal, one newline.
+// The file under /var/tmp that tells other programs which process serves one consumer: the process id in decimal, one
+// newline. Its path is fixed by the programs that look for it.
 //
-// The path is fixed by the programs that look for it. It lies in a folder that everybody may write to, so what it names
-// is believed only if that process exists and is called cimserver.
+// It lies in a folder that everybody may write to, so this server only writes it: whether a server runs is a matter of
+// the tree's lock.
 class StartFile
 {
   public:
-    explicit StartFile(const std::string& consumer);
+    static std::string pathOf(const std::string& consumer);
 
-    const std::string& path() const { return fPath; }
+    // Throws: std::system_error, also when another user's file or a folder lies at the path.
+    static void write(const std::string& path, pid_t pid);
 
-    // Throws: std::system_error.
-    void write(pid_t pid) const;
-
-    // Removes the file if it names `pid`.
-    void removeIfOf(pid_t pid) const noexcept;
-
-    // Returns: the process id in the file, if there is one.
-    std::optional<pid_t> pid() const;
-
-    // Returns: the process id in the file, if it is a living cimserver (a zombie is not).
-    std::optional<pid_t> runningServer() const;
-
-  private:
-    std::string fPath;
+    // Removes the file if it is root's or the user's own and names `pid`.
+    static void remove(const std::string& path, pid_t pid) noexcept;
 };
 
 } // namespace Pegasus::server

@@ -4,7 +4,6 @@
 #include <system_error>
 
 #include <fcntl.h>
-#include <sys/file.h>
 #include <sys/stat.h>
 
 namespace Pegasus::server {
@@ -24,13 +23,13 @@ bool isSameFile(int fd, const std::string& path)
 
 bool TreeLock::acquire(const std::string& home)
 {
-    fPath = home + "/cimserver.lock";
+    fPath = base::treeLockPath(home);
     for (;;) {
-        fFile.reset(::open(fPath.c_str(), O_RDWR | O_CREAT | O_NOFOLLOW | O_CLOEXEC, 0600));
+        fFile.reset(::open(fPath.c_str(), O_RDWR | O_CREAT | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY | O_CLOEXEC, 0600));
         if (!fFile) {
             throw std::system_error(errno, std::generic_category(), "cannot open " + fPath);
         }
-        if (::flock(fFile.get(), LOCK_EX | LOCK_NB) != 0) {
+        if (!base::takeTreeLock(fFile)) {
             fFile.reset();
             return false;
         }

@@ -1,20 +1,22 @@
 #pragma once
 
-#include "pegasus/base/Descriptor.h"
+#include "pegasus/base/TreeLockFile.h"
 
 #include <string>
 
 namespace Pegasus::server {
 
-// Holds "one server a tree" by a lock on <home>/cimserver.lock. The kernel lets it go when the process ends, however it
-// ends; the file lies beside the repository, which may be deleted at any time.
+// Holds "one server a tree": the lock on <home>/cimserver.lock. The kernel releases it when the process ends, however
+// it ends.
 class TreeLock
 {
   public:
     // Returns: false if another process holds the tree.
     // Throws: std::system_error when the lock file cannot be opened.
     bool acquire(const std::string& home);
-    // Lets go and removes the file.
+    // Requires: acquired. Throws: std::system_error.
+    void write(const base::TreeLockRecord& record) const { base::writeTreeLock(fFile, record); }
+    // Removes the file, then releases the lock. Without a lock it does nothing.
     void release() noexcept;
 
   private:

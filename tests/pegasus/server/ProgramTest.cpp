@@ -48,6 +48,9 @@ void check(const ServerTree& tree, const std::vector<ProgramRow>& rows)
 
 std::string contentOf(const std::string& path)
 {
+    if (!fs::is_regular_file(fs::symlink_status(path))) {
+        return {};
+    }
     std::ifstream file(path);
     return {std::istreambuf_iterator<char>(file), {}};
 }
@@ -163,8 +166,86 @@ TEST(ProgramTest, theStartFileNamesTheServerAndIsPrivate)
     EXPECT_EQ(modeOf(tree.startFile()), 0600u);
     EXPECT_FALSE(fs::is_symlink(tree.startFile()));
     EXPECT_TRUE(isRunning(tree.serverProcess()));
+    EXPECT_EQ(contentOf(tree.startFile()), std::to_string(tree.serverProcess()) + "\n");
     EXPECT_EQ(modeOf(tree.home() + "/cimxml.socket"), 0600u);
     EXPECT_NE(tree.log().find("Wrote the start file " + tree.startFile()), std::string::npos);
+}
+
+struct HostileRow
+{
+    const char* name;
+    void (*put)(const std::string& path);
+    bool isWritten; // whether the server gets its start file after all
+};
+
+// Whatever another user puts where the start file belongs, the server starts and says what it could not do.
+TEST(ProgramTest, startsWhateverLiesAtTheStartFilesPath)
+{
+    const HostileRow rows[] = {
+        {"a folder", [](const std::string& path) { fs::create_directory(path); }, false},
+        {"another user's folder",
+         [](const std::string& path) {
+             fs::create_directories(path + "/x");
+             if (::geteuid() == 0) {
+                 ASSERT_EQ(::chown(path.c_str(), 65534, 65534), 0);
+             }
+         },
+         false},
+        {"a FIFO", [](const std::string& path) { ASSERT_EQ(::mkfifo(path.c_str(), 0666), 0); }, true},
+        {"a link to nothing", [](const std::string& path) { fs::create_symlink("/nonexistent/x", path); }, true},
+        {"a file that names another process",
+         [](const std::string& path) {
+             std::ofstream(path) << ::getpid() << "\n";
+             if (::geteuid() == 0) {
+                 ASSERT_EQ(::chown(path.c_str(), 65534, 65534), 0);
+             }
+         },
+         true}};
+    for (const HostileRow& row : rows) {
+        SCOPED_TRACE(row.name);
+        ServerTree tree;
+        row.put(tree.startFile());
+        check(tree, {{"not running", "cimserver --status", 2, "The CIM Server is not running.\n", ""}});
+        tree.start();
+        EXPECT_EQ(contentOf(tree.startFile()), row.isWritten ? std::to_string(tree.serverProcess()) + "\n" : "");
+        const std::string log = tree.log();
+        const std::string line = "No start file: cannot replace " + tree.startFile();
+        EXPECT_EQ(log.find(line) != std::string::npos, !row.isWritten) << log;
+        EXPECT_EQ(log.find(line), log.rfind(line)) << "said once";
+        check(tree, {{"running", "cimserver --status", 0, "The CIM Server is running.\n", ""},
+                     {"again", "cimserver", 1, "", "Unable to start CIMServer. CIMServer is already running.\n"},
+                     {"stop", "cimserver -s", 1, "",
+                      "Error in server shutdown: The repository may be empty.\nForced shutdown initiated.\n"},
+                     {"stopped", "cimserver --status", 2, "The CIM Server is not running.\n", ""}});
+        EXPECT_EQ(fs::exists(fs::symlink_status(tree.startFile())), !row.isWritten) << "only its own is removed";
+        std::error_code ignored;
+        fs::remove_all(tree.startFile(), ignored);
+    }
+}
+
+// A host that was killed leaves its server behind; the next host deletes the repository and starts a server.
+TEST(ProgramTest, takesThePlaceOfAServerWhoseRepositoryIsGone)
+{
+    for (const bool stopped : {false, true}) {
+        SCOPED_TRACE(stopped ? "the old server does not react" : "the old server ends when asked");
+        ServerTree tree;
+        tree.start();
+        const int old = tree.serverProcess();
+        EXPECT_THROW(tree.start(), std::runtime_error) << "its repository is there";
+        EXPECT_TRUE(isRunning(old));
+        ASSERT_EQ(stopped ? ::kill(old, SIGSTOP) : 0, 0);
+        fs::remove_all(tree.home() + "/repository");
+        const std::string consumer = tree.consumer() + "-b"; // the old one's start file is removed whatever its name
+        tree.start({"consumer=" + consumer});
+        EXPECT_FALSE(isRunning(old));
+        EXPECT_NE(tree.serverProcess(), old);
+        EXPECT_FALSE(fs::exists(tree.startFile()));
+        EXPECT_NE(tree.log().find("Ended the server of process " + std::to_string(old)), std::string::npos);
+        EXPECT_EQ(exchange(tree.port(), intrinsicRequest("EnumerateClassNames", "root", "")).status, 200);
+        check(tree, {{"stop", "cimserver -s", 1, "",
+                      "Error in server shutdown: The repository may be empty.\nForced shutdown initiated.\n"}});
+        EXPECT_FALSE(fs::exists("/var/tmp/cimserverkol_tc_" + consumer + "_start.conf"));
+    }
 }
 
 TEST(ProgramTest, endsInOrderOnSignals)
@@ -211,6 +292,7 @@ TEST(ProgramTest, aTakenPortIsNamed)
                       ": Address already in use (error code 98).\n"}});
     EXPECT_FALSE(fs::exists(tree.startFile()));
     EXPECT_FALSE(fs::exists(tree.home() + "/cimserver.lock"));
+    EXPECT_FALSE(fs::exists(tree.home() + "/repository")) << "the port comes first";
     ::close(taken);
 }
 

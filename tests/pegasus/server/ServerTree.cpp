@@ -1,5 +1,7 @@
 #include "tests/pegasus/server/ServerTree.h"
 
+#include "pegasus/base/TreeLockFile.h"
+
 #include <chrono>
 #include <cstdlib>
 #include <filesystem>
@@ -123,8 +125,8 @@ ServerTree::~ServerTree()
             ::kill(pid, SIGKILL);
         }
     }
-    ::unlink(startFile().c_str());
     std::error_code ignored;
+    fs::remove_all(startFile(), ignored);
     fs::remove_all(fRoot, ignored);
 }
 
@@ -171,7 +173,7 @@ void ServerTree::start(const std::vector<std::string>& properties)
 
 int ServerTree::serverProcess() const
 {
-    return std::atoi(readFile(startFile()).c_str());
+    return Pegasus::base::readTreeLock(fHome).record.pid;
 }
 
 void ServerTree::compile(const std::string& nameSpace, const std::string& file)

@@ -35,7 +35,7 @@ class ServerTree
 
     // Starts the server with further "name=value" words. Throws: std::runtime_error when it says that it cannot.
     void start(const std::vector<std::string>& properties = {});
-    // The server's process; 0 when the start file names none.
+    // The server's process; 0 when none holds the tree.
     int serverProcess() const;
 
     // Compiles the two base schemas. Throws: std::runtime_error with what the compiler says.

@@ -2,7 +2,7 @@
 #include "pegasus/server/admin/Config.h"
 #include "pegasus/server/admin/PrivateFile.h"
 #include "pegasus/server/admin/StartFile.h"
-#include "pegasus/server/admin/TreeLock.h"
+#include "pegasus/server/admin/TreeClaim.h"
 #include "pegasus/server/operations/ProviderRegistry.h"
 #include "pegasus/server/operations/RegistrationChecks.h"
 
@@ -13,7 +13,10 @@
 #include <filesystem>
 #include <fstream>
 
+#include <sched.h>
+#include <signal.h>
 #include <sys/stat.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
 namespace Pegasus::server {
@@ -123,40 +126,88 @@ TEST_F(StateTest, privateFilesReplaceLinksAndAreReadOnlyIfRegular)
     std::ofstream(victim) << "untouched";
     fs::create_symlink(victim, fHome + "/file");
     writePrivateFile(fHome + "/file", "new");
-    EXPECT_EQ(readSmallFile(victim, 100), "untouched");
-    EXPECT_EQ(readSmallFile(fHome + "/file", 100), "new");
-    EXPECT_EQ(readSmallFile(fHome + "/file", 2), "ne");
+    EXPECT_EQ(readOwnFile(victim, 100), "untouched");
+    EXPECT_EQ(readOwnFile(fHome + "/file", 100), "new");
+    EXPECT_EQ(readOwnFile(fHome + "/file", 2), "ne");
     fs::create_symlink(victim, fHome + "/link");
-    EXPECT_EQ(readSmallFile(fHome + "/link", 100), "");
+    EXPECT_EQ(readOwnFile(fHome + "/link", 100), "");
     ASSERT_EQ(::mkfifo((fHome + "/fifo").c_str(), 0600), 0);
-    EXPECT_EQ(readSmallFile(fHome + "/fifo", 100), "");
+    EXPECT_EQ(readOwnFile(fHome + "/fifo", 100), "");
     EXPECT_THROW(writePrivateFile(fHome + "/no/file", "x"), std::system_error);
 }
 
-TEST_F(StateTest, aStartFileIsBelievedOnlyOfAServer)
+TEST_F(StateTest, aStartFileIsRemovedOnlyByTheServerThatItNames)
 {
-    const StartFile file(fs::path(fHome).filename().string());
-    for (const char* content : {"", "x", "-5", "0", "99999999", "1 2"}) {
-        std::ofstream(file.path()) << content;
-        EXPECT_FALSE(file.runningServer()) << content;
+    const std::string path = fHome + "/start.conf";
+    StartFile::write(path, 1234);
+    EXPECT_EQ(readOwnFile(path, 100), "1234\n");
+    StartFile::remove(path, 123);
+    EXPECT_TRUE(fs::exists(path));
+    if (::geteuid() == 0) {
+        ASSERT_EQ(::chown(path.c_str(), 65534, 65534), 0);
+        EXPECT_EQ(readOwnFile(path, 100), "") << "another user's file is not believed";
+        StartFile::remove(path, 1234);
+        EXPECT_TRUE(fs::exists(path));
+        ASSERT_EQ(::chown(path.c_str(), 0, 0), 0);
     }
-    file.write(::getpid());
-    EXPECT_EQ(file.pid(), ::getpid());
-    EXPECT_FALSE(file.runningServer()) << "this process is not called cimserver";
-    file.removeIfOf(1);
-    EXPECT_TRUE(file.pid());
-    file.removeIfOf(::getpid());
-    EXPECT_FALSE(file.pid());
+    StartFile::remove(path, 1234);
+    EXPECT_FALSE(fs::exists(path));
 }
 
 TEST_F(StateTest, oneLockATree)
 {
+    EXPECT_EQ(base::readTreeLock(fHome).state, base::TreeLockState::kAbsent);
     TreeLock first;
     TreeLock second;
     EXPECT_TRUE(first.acquire(fHome));
     EXPECT_FALSE(second.acquire(fHome));
+    first.write({123, 4567, "/x/start file", "/x/repository", 18446744073709551615u, 2});
+    for (int i = 0; i < 2; ++i) { // to look is not to take
+        const base::TreeLockStatus status = base::readTreeLock(fHome);
+        EXPECT_EQ(status.state, base::TreeLockState::kHeld);
+        EXPECT_EQ(status.record.pid, 123);
+        EXPECT_EQ(status.record.port, 4567);
+        EXPECT_EQ(status.record.startFile, "/x/start file");
+        EXPECT_EQ(status.record.repository, "/x/repository");
+        EXPECT_EQ(status.record.device, 18446744073709551615u);
+        EXPECT_EQ(status.record.inode, 2u);
+    }
     first.release();
     EXPECT_TRUE(second.acquire(fHome));
+}
+
+TEST_F(StateTest, aLockFileWithoutItsServerIsFree)
+{
+    std::ofstream(base::treeLockPath(fHome)) << "pid=1\nport=80\n";
+    const base::TreeLockStatus status = base::readTreeLock(fHome);
+    EXPECT_EQ(status.state, base::TreeLockState::kFree);
+    EXPECT_EQ(status.record.pid, 0);
+    fs::remove(base::treeLockPath(fHome));
+    ASSERT_EQ(::mkfifo(base::treeLockPath(fHome).c_str(), 0600), 0);
+    EXPECT_EQ(base::readTreeLock(fHome).state, base::TreeLockState::kAbsent);
+}
+
+// Only a server of this program is ended for its repository's sake.
+TEST_F(StateTest, aTreeThatAnotherProgramHoldsIsLeftAlone)
+{
+    const pid_t child = ::fork();
+    if (child == 0) {
+        ::execlp("sleep", "sleep", "60", nullptr);
+        ::_exit(127);
+    }
+    const std::string program = "/proc/" + std::to_string(child) + "/comm";
+    while (readOwnFile(program, 100) != "sleep\n") { // until the program is another one
+        ::sched_yield();
+    }
+    TreeLock holder;
+    ASSERT_TRUE(holder.acquire(fHome));
+    holder.write({child, 0, "", fHome + "/gone", 1, 2});
+    TreeClaim claim;
+    EXPECT_THROW(claim.take(Config(fHome)), StartError);
+    EXPECT_EQ(::kill(child, SIGKILL), 0);
+    int status = 0;
+    ::waitpid(child, &status, 0);
+    EXPECT_EQ(WTERMSIG(status), SIGKILL);
 }
 
 using Properties = std::vector<std::pair<const char*, CIMValue>>;

@@ -1,0 +1,96 @@
+#include "pegasus/server/admin/TreeClaim.h"
+
+#include "pegasus/server/admin/Log.h"
+#include "pegasus/server/admin/ProcessHandle.h"
+#include "pegasus/server/admin/StartFile.h"
+
+#include <system_error>
+
+#include <fcntl.h>
+#include <sys/stat.h>
+
+namespace Pegasus::server {
+
+namespace {
+
+constexpr int kMaxReplacements = 3; // others may be starting at the same time
+constexpr std::chrono::seconds kOrderlyEndTimeout{1};
+
+// Whether the folder that a server had opened as its repository is no longer what its path names.
+bool isRepositoryGone(const base::TreeLockRecord& record)
+{
+    struct stat info = {};
+    return !record.repository.empty() && (::stat(record.repository.c_str(), &info) != 0 ||
+                                          info.st_dev != record.device || info.st_ino != record.inode);
+}
+
+// Ends the server that holds the tree if its repository is gone. Returns: its process; 0 if it is to be left alone.
+pid_t endLeftOverServer(const std::string& home)
+{
+    const base::TreeLockStatus status = base::readTreeLock(home);
+    const pid_t pid = status.record.pid;
+    const ProcessHandle process(pid);
+    if (status.state != base::TreeLockState::kHeld || !isRepositoryGone(status.record) || !process.runsThisProgram()) {
+        return 0;
+    }
+    process.end(kOrderlyEndTimeout);
+    StartFile::remove(status.record.startFile, pid);
+    return pid;
+}
+
+} // namespace
+
+TreeClaim::~TreeClaim()
+{
+    StartFile::remove(fRecord.startFile, fRecord.pid);
+    fLock.release();
+}
+
+void TreeClaim::lock(const std::string& home)
+{
+    for (int i = 0; !fLock.acquire(home); ++i) {
+        const pid_t ended = i < kMaxReplacements ? endLeftOverServer(home) : 0;
+        if (ended == 0) {
+            throw StartError("Unable to start CIMServer. CIMServer is already running.");
+        }
+        fReplaced = ended;
+    }
+}
+
+void TreeClaim::take(const Config& config)
+try {
+    lock(config.home());
+    fRecord.pid = ::getpid();
+    fRecord.port = config.flag("enableHttpConnection") ? static_cast<std::uint16_t>(config.number("httpPort")) : 0;
+    fRecord.startFile = StartFile::pathOf(config.text("consumer"));
+    fLock.write(fRecord);
+    config.save();
+} catch (const std::system_error&) {
+    throw StartError("cimserver not started: Failed to save configuration properties to file: cannot open file: " +
+                     currentConfigPath(config.home()) + ". Configuration property not set.");
+}
+
+void TreeClaim::announce(const std::string& repository)
+{
+    if (fReplaced != 0) {
+        Log::write(Severity::kWarning,
+                   "Ended the server of process " + std::to_string(fReplaced) + ", whose repository was gone.");
+    }
+    struct stat info = {};
+    fRepository.reset(::open(repository.c_str(), O_PATH | O_DIRECTORY | O_CLOEXEC));
+    if (::fstat(fRepository.get(), &info) == 0) {
+        fRecord.repository = repository;
+        fRecord.device = info.st_dev;
+        fRecord.inode = info.st_ino;
+        fLock.write(fRecord);
+    }
+    try {
+        StartFile::write(fRecord.startFile, fRecord.pid);
+        Log::write(Severity::kInformation, "Wrote the start file " + fRecord.startFile + ".");
+    } catch (const std::system_error& error) {
+        Log::write(Severity::kWarning, std::string("No start file: ") + error.what() +
+                                           "; programs that look for it do not find this server.");
+    }
+}
+
+} // namespace Pegasus::server

@@ -1,0 +1,51 @@
+#pragma once
+
+#include "pegasus/server/admin/Config.h"
+#include "pegasus/server/admin/TreeLock.h"
+
+#include <stdexcept>
+#include <string>
+
+namespace Pegasus::server {
+
+// The server cannot start. what() is the sentence that its launcher prints.
+class StartError : public std::runtime_error
+{
+  public:
+    using std::runtime_error::runtime_error;
+};
+
+// This server's hold on its tree, and the files that tell others about it; removed in the end.
+//
+// A server that finds the tree held by one whose repository has been deleted under it takes its place: that one is left
+// over from a host that has gone, and can serve nobody.
+//
+// Thread: one at a time.
+class TreeClaim
+{
+  public:
+    TreeClaim() = default;
+    ~TreeClaim();
+    TreeClaim(const TreeClaim&) = delete;
+    TreeClaim& operator=(const TreeClaim&) = delete;
+
+    // Takes the lock and writes the current configuration.
+    // Throws: StartError.
+    // Blocks: when it ends a server that is left over, 1 s and until that process has ended.
+    void take(const Config& config);
+
+    // Tells others which process serves, from which repository: completes the lock file and writes the start file. A
+    // start file that cannot be written is a line in the log.
+    // Throws: std::system_error. Requires: taken; the repository's folder exists.
+    void announce(const std::string& repository);
+
+  private:
+    void lock(const std::string& home);
+
+    TreeLock fLock;
+    base::TreeLockRecord fRecord;
+    Descriptor fRepository; // keeps the folder's inode from being given to another one
+    pid_t fReplaced = 0;    // the server whose place this one took
+};
+
+} // namespace Pegasus::server
