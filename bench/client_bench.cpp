@@ -7,10 +7,10 @@
 // the process's memory. Then what decoding during arrival saves, and GetClass calls on one connection. --quick leaves
 // out the biggest answer, --calls all but the calls.
 #include "pegasus/client/Connection.h"
-#include "pegasus/client/HttpResponse.h"
-#include "pegasus/client/RequestEncoder.h"
+#include "pegasus/client/Request.h"
 #include "pegasus/client/ResponseReader.h"
 #include "pegasus/wire/ElementEncoder.h"
+#include "pegasus/wire/HttpAnswerReader.h"
 #include "tests/support/PeerAnswers.h"
 
 #include <Pegasus/Client/CIMClient.h>
@@ -251,8 +251,8 @@ Array<CIMInstance> readThenDecode(client::Connection& connection, const std::str
     const auto deadline = base::Deadline::after(std::chrono::minutes(10));
     connection.send(request, deadline);
     std::string text;
-    client::HttpResponse response(
-        client::ClientLimits(), [](const client::ResponseFields&) {}, [&](std::string_view body) { text += body; });
+    wire::HttpAnswerReader response(
+        wire::HttpAnswerLimits(), [](const wire::HttpAnswerFields&) {}, [&](std::string_view body) { text += body; });
     std::vector<char> buffer(64UL * 1024);
     while (!response.isComplete()) {
         std::size_t received = 0;
@@ -285,8 +285,9 @@ void benchOverlap()
     client::Connection connection;
     connection.setAddress(address);
     connection.open(base::Deadline::after(std::chrono::seconds(10)));
-    client::Request request = client::IntrinsicRequest("EnumerateInstances", kNameSpace, true).finish();
-    const std::string message = client::encodeMessage(request, "1000", address.text(), {});
+    wire::IntrinsicCall call("EnumerateInstances", kNameSpace);
+    const client::Request request = client::makeRequest(call, true);
+    const std::string message = client::encodeHttpRequest(request, "1000", address.text(), {});
     TCost overlapped;
     TCost inTurn;
     for (int run = 0; run < kRuns; ++run) {

@@ -1,7 +1,5 @@
 // A whole HTTP answer, cut at a place that the input chooses: it is read the same way however it arrives.
-#include "pegasus/client/HttpResponse.h"
-
-#include <Pegasus/Common/Exception.h>
+#include "pegasus/wire/HttpAnswerReader.h"
 
 #include <cstdint>
 #include <cstdlib>
@@ -13,24 +11,25 @@ namespace {
 
 std::string read(std::string_view bytes, std::size_t cut)
 {
-    client::ClientLimits limits;
+    wire::HttpAnswerLimits limits;
     limits.maxHeaderBytes = 4096;
+    limits.maxFramingBytes = 4096;
     limits.maxBodyBytes = 64UL * 1024;
     std::string body;
-    client::HttpResponse response(
-        limits, [](const client::ResponseFields&) {}, [&](std::string_view piece) { body.append(piece); });
+    wire::HttpAnswerReader response(
+        limits, [](const wire::HttpAnswerFields&) {}, [&](std::string_view piece) { body.append(piece); });
     try {
         response.feed(bytes.substr(0, cut));
         response.feed(bytes.substr(cut));
         if (!response.endOfConnection()) {
             return "incomplete";
         }
-    } catch (const Exception&) {
+    } catch (const wire::HttpAnswerError&) {
         return "error";
     }
-    const client::ResponseFields& fields = response.fields();
-    return std::to_string(fields.status) + fields.reason + fields.cimOperation + fields.statusCode +
-           fields.statusDescription + body;
+    const wire::HttpAnswerFields& fields = response.fields();
+    return std::to_string(fields.status) + fields.reason + fields.cimOperation.value_or("") +
+           fields.statusCode.value_or("") + fields.statusDescription + body;
 }
 
 } // namespace

@@ -6,8 +6,9 @@
 namespace Pegasus {
 namespace {
 
-using client::IntrinsicRequest;
+using client::makeRequest;
 using wire::ElementDecoder;
+using wire::IntrinsicCall;
 using wire::XmlElement;
 
 void failUnexpected(const XmlElement& element)
@@ -104,102 +105,103 @@ void CIMClient::disconnect()
 CIMClass CIMClient::getClass(const CIMNamespaceName& nameSpace, const CIMName& className, Boolean localOnly,
                              Boolean includeQualifiers, Boolean includeClassOrigin, const CIMPropertyList& propertyList)
 {
-    IntrinsicRequest request("GetClass", nameSpace, kReads);
-    request.className("ClassName", className)
+    IntrinsicCall call("GetClass", nameSpace);
+    call.className("ClassName", className)
         .flag("LocalOnly", localOnly, true)
         .flag("IncludeQualifiers", includeQualifiers, true)
         .flag("IncludeClassOrigin", includeClassOrigin, false)
         .propertyList(propertyList);
-    return readOne(*fRep, request.finish(), "CLASS", &ElementDecoder::decodeClass);
+    return readOne(*fRep, makeRequest(call, kReads), "CLASS", &ElementDecoder::decodeClass);
 }
 
 Array<CIMClass> CIMClient::enumerateClasses(const CIMNamespaceName& nameSpace, const CIMName& className,
                                             Boolean deepInheritance, Boolean localOnly, Boolean includeQualifiers,
                                             Boolean includeClassOrigin)
 {
-    IntrinsicRequest request("EnumerateClasses", nameSpace, kReads);
-    request.className("ClassName", className)
+    IntrinsicCall call("EnumerateClasses", nameSpace);
+    call.className("ClassName", className)
         .flag("DeepInheritance", deepInheritance, false)
         .flag("LocalOnly", localOnly, true)
         .flag("IncludeQualifiers", includeQualifiers, true)
         .flag("IncludeClassOrigin", includeClassOrigin, false);
-    return readAll(*fRep, request.finish(), &ElementDecoder::decodeClass);
+    return readAll(*fRep, makeRequest(call, kReads), &ElementDecoder::decodeClass);
 }
 
 Array<CIMName> CIMClient::enumerateClassNames(const CIMNamespaceName& nameSpace, const CIMName& className,
                                               Boolean deepInheritance)
 {
-    IntrinsicRequest request("EnumerateClassNames", nameSpace, kReads);
-    request.className("ClassName", className).flag("DeepInheritance", deepInheritance, false);
-    return readAll(*fRep, request.finish(), &ElementDecoder::decodeClassName);
+    IntrinsicCall call("EnumerateClassNames", nameSpace);
+    call.className("ClassName", className).flag("DeepInheritance", deepInheritance, false);
+    return readAll(*fRep, makeRequest(call, kReads), &ElementDecoder::decodeClassName);
 }
 
 void CIMClient::createClass(const CIMNamespaceName& nameSpace, const CIMClass& newClass)
 {
-    IntrinsicRequest request("CreateClass", nameSpace, kWrites);
-    request.newClass(newClass);
-    readNothing(*fRep, request.finish());
+    IntrinsicCall call("CreateClass", nameSpace);
+    call.newClass(newClass);
+    readNothing(*fRep, makeRequest(call, kWrites));
 }
 
 CIMInstance CIMClient::getInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& instanceName,
                                    Boolean localOnly, Boolean includeQualifiers, Boolean includeClassOrigin,
                                    const CIMPropertyList& propertyList)
 {
-    IntrinsicRequest request("GetInstance", nameSpace, kReads);
-    request.instanceName(instanceName)
+    IntrinsicCall call("GetInstance", nameSpace);
+    call.instanceName(instanceName)
         .flag("LocalOnly", localOnly, true)
         .flag("IncludeQualifiers", includeQualifiers, false)
         .flag("IncludeClassOrigin", includeClassOrigin, false)
         .propertyList(propertyList);
-    return readOne(*fRep, request.finish(), "INSTANCE", &ElementDecoder::decodeInstance);
+    return readOne(*fRep, makeRequest(call, kReads), "INSTANCE", &ElementDecoder::decodeInstance);
 }
 
 Array<CIMInstance> CIMClient::enumerateInstances(const CIMNamespaceName& nameSpace, const CIMName& className,
                                                  Boolean deepInheritance, Boolean localOnly, Boolean includeQualifiers,
                                                  Boolean includeClassOrigin, const CIMPropertyList& propertyList)
 {
-    IntrinsicRequest request("EnumerateInstances", nameSpace, kReads);
-    request.className("ClassName", className)
+    IntrinsicCall call("EnumerateInstances", nameSpace);
+    call.className("ClassName", className)
         .flag("LocalOnly", localOnly, true)
         .flag("DeepInheritance", deepInheritance, true)
         .flag("IncludeQualifiers", includeQualifiers, false)
         .flag("IncludeClassOrigin", includeClassOrigin, false)
         .propertyList(propertyList);
-    return readAll(*fRep, request.finish(), &ElementDecoder::decodeNamedInstance);
+    return readAll(*fRep, makeRequest(call, kReads), &ElementDecoder::decodeNamedInstance);
 }
 
 Array<CIMObjectPath> CIMClient::enumerateInstanceNames(const CIMNamespaceName& nameSpace, const CIMName& className)
 {
-    IntrinsicRequest request("EnumerateInstanceNames", nameSpace, kReads);
-    request.className("ClassName", className);
-    return readAll(*fRep, request.finish(), &ElementDecoder::decodeInstanceName);
+    IntrinsicCall call("EnumerateInstanceNames", nameSpace);
+    call.className("ClassName", className);
+    return readAll(*fRep, makeRequest(call, kReads), &ElementDecoder::decodeInstanceName);
 }
 
 CIMObjectPath CIMClient::createInstance(const CIMNamespaceName& nameSpace, const CIMInstance& newInstance)
 {
-    IntrinsicRequest request("CreateInstance", nameSpace, kWrites);
-    request.newInstance(newInstance);
-    return readOne(*fRep, request.finish(), "INSTANCENAME", &ElementDecoder::decodeInstanceName);
+    IntrinsicCall call("CreateInstance", nameSpace);
+    call.newInstance(newInstance);
+    return readOne(*fRep, makeRequest(call, kWrites), "INSTANCENAME", &ElementDecoder::decodeInstanceName);
 }
 
 CIMQualifierDecl CIMClient::getQualifier(const CIMNamespaceName& nameSpace, const CIMName& qualifierName)
 {
-    IntrinsicRequest request("GetQualifier", nameSpace, kReads);
-    request.text("QualifierName", qualifierName.getString());
-    return readOne(*fRep, request.finish(), "QUALIFIER.DECLARATION", &ElementDecoder::decodeQualifierDeclaration);
+    IntrinsicCall call("GetQualifier", nameSpace);
+    call.text("QualifierName", qualifierName.getString());
+    return readOne(*fRep, makeRequest(call, kReads), "QUALIFIER.DECLARATION",
+                   &ElementDecoder::decodeQualifierDeclaration);
 }
 
 Array<CIMQualifierDecl> CIMClient::enumerateQualifiers(const CIMNamespaceName& nameSpace)
 {
-    return readAll(*fRep, IntrinsicRequest("EnumerateQualifiers", nameSpace, kReads).finish(),
-                   &ElementDecoder::decodeQualifierDeclaration);
+    IntrinsicCall call("EnumerateQualifiers", nameSpace);
+    return readAll(*fRep, makeRequest(call, kReads), &ElementDecoder::decodeQualifierDeclaration);
 }
 
 void CIMClient::setQualifier(const CIMNamespaceName& nameSpace, const CIMQualifierDecl& qualifierDeclaration)
 {
-    IntrinsicRequest request("SetQualifier", nameSpace, kWrites);
-    request.qualifierDeclaration(qualifierDeclaration);
-    readNothing(*fRep, request.finish());
+    IntrinsicCall call("SetQualifier", nameSpace);
+    call.qualifierDeclaration(qualifierDeclaration);
+    readNothing(*fRep, makeRequest(call, kWrites));
 }
 
 CIMValue CIMClient::invokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPath& instanceName,
@@ -209,7 +211,7 @@ CIMValue CIMClient::invokeMethod(const CIMNamespaceName& nameSpace, const CIMObj
     CIMValue returnValue;
     Array<CIMParamValue> outputs;
     bool isFirst = true;
-    fRep->exchange(client::encodeInvokeMethod(nameSpace, instanceName, methodName, inParameters),
+    fRep->exchange(client::makeMethodRequest(nameSpace, instanceName, methodName, inParameters),
                    [&](const XmlElement& element, ElementDecoder& decoder) {
                        if (isFirst && element.is("RETURNVALUE")) {
                            returnValue = decoder.decodeReturnValue(element);

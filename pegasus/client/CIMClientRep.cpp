@@ -2,8 +2,8 @@
 
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/NumberText.h"
-#include "pegasus/base/PercentCoding.h"
 #include "pegasus/base/Text.h"
+#include "pegasus/wire/ContentType.h"
 
 #include <Pegasus/Client/CIMClientException.h>
 
@@ -16,9 +16,9 @@ namespace Pegasus {
 namespace {
 
 using base::Deadline;
-using client::HttpResponse;
-using client::ResponseFields;
 using client::ResponseReader;
+using wire::HttpAnswerFields;
+using wire::HttpAnswerReader;
 using Result = client::Connection::Result;
 
 constexpr std::size_t kReceiveBytes = 64UL * 1024;
@@ -55,68 +55,47 @@ std::string localUser()
     return found->pw_name;
 }
 
-// The next word of a Content-Type: a token, a quoted text without its quotes, or one of the separators.
-std::string_view takeWord(std::string_view& text)
-{
-    text.remove_prefix(std::min(text.find_first_not_of(" \t"), text.size()));
-    if (text.empty()) {
-        return text;
-    }
-    if (text.front() == '"') {
-        const std::size_t end = text.find('"', 1);
-        const std::string_view word = text.substr(1, end == std::string_view::npos ? end : end - 1);
-        text.remove_prefix(end == std::string_view::npos ? text.size() : end + 1);
-        return word;
-    }
-    const std::size_t size = text.find_first_of(" \t;=") == 0 ? 1 : std::min(text.find_first_of(" \t;="), text.size());
-    const std::string_view word = text.substr(0, size);
-    text.remove_prefix(size);
-    return word;
-}
-
-// application/xml or text/xml, with charset utf-8.
-bool isXmlInUtf8(std::string_view contentType)
-{
-    const std::string_view type = takeWord(contentType);
-    return (base::equalNoCase(type, "application/xml") || base::equalNoCase(type, "text/xml")) &&
-           takeWord(contentType) == ";" && base::equalNoCase(takeWord(contentType), "charset") &&
-           takeWord(contentType) == "=" && base::equalNoCase(takeWord(contentType), "utf-8");
-}
-
-void checkHeader(const ResponseFields& fields)
+void checkHeader(const HttpAnswerFields& fields)
 {
     if (fields.status != 200) {
         throw CIMClientHTTPErrorException(fields.status, toString(fields.reason), toString(fields.cimError),
-                                          toString(base::percentDecoded(fields.errorDetail)));
+                                          toString(fields.errorDetail));
     }
-    if (!fields.hasCimOperation) {
+    if (!fields.cimOperation) {
         throw CIMClientMalformedHTTPException("Missing CIMOperation HTTP header");
     }
-    if (!base::equalNoCase(fields.cimOperation, "MethodResponse")) {
+    if (!base::equalNoCase(*fields.cimOperation, "MethodResponse")) {
         throw CIMClientMalformedHTTPException("Received CIMOperation HTTP header value \"" +
-                                              toString(fields.cimOperation) + "\", expected \"MethodResponse\"");
+                                              toString(*fields.cimOperation) + "\", expected \"MethodResponse\"");
     }
-    if (fields.hasContentType && !isXmlInUtf8(fields.contentType)) {
-        throw CIMClientMalformedHTTPException("Bad Content-Type HTTP header; " + toString(fields.contentType));
+    if (fields.contentType && !wire::isXmlInUtf8(*fields.contentType)) {
+        throw CIMClientMalformedHTTPException("Bad Content-Type HTTP header; " + toString(*fields.contentType));
     }
 }
 
 // The status that a header or trailer field carries.
-void checkStatusField(const ResponseFields& fields)
+void checkStatusField(const HttpAnswerFields& fields)
 {
-    if (!fields.hasStatusCode) {
+    if (!fields.statusCode) {
         return;
     }
-    const auto code = base::parseUnsigned(fields.statusCode);
+    const auto code = base::parseUnsigned(*fields.statusCode);
     if (!code || *code > 0xFFFF) {
-        throw CIMClientMalformedHTTPException("Bad CIMStatusCode HTTP header; " + toString(fields.statusCode));
+        throw CIMClientMalformedHTTPException("Bad CIMStatusCode HTTP header; " + toString(*fields.statusCode));
     }
     if (*code == CIM_ERR_SUCCESS) {
         return;
     }
     const auto status = static_cast<CIMStatusCode>(*code);
-    const String description = toString(base::percentDecoded(fields.statusDescription));
+    const String description = toString(fields.statusDescription);
     throw CIMException(status, description.size() > 0 ? description : String(cimStatusCodeToString(status)));
+}
+
+[[noreturn]] void throwMalformed(const wire::HttpAnswerError& error)
+{
+    const std::string cause = error.what();
+    throw CIMClientMalformedHTTPException(
+        toString("Malformed HTTP response message" + (cause.empty() ? "." : ": " + cause + ".")));
 }
 
 // `on line 2: cause (GetClass answer, column 14)`
@@ -157,6 +136,9 @@ void CIMClientRep::exchange(const client::Request& request, const ContentHandler
     } catch (const wire::XmlError& error) {
         fConnection.close();
         throwXml(request.method, error);
+    } catch (const wire::HttpAnswerError& error) {
+        fConnection.close();
+        throwMalformed(error);
     } catch (const TypeMismatchException&) {
         fConnection.close();
         throw CIMClientResponseException("type mismatch");
@@ -173,15 +155,15 @@ void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHan
         throw ConnectionTimeoutException();
     }
     const client::ExpectedResponse expected{nextMessageId(), request.method, request.isIntrinsic, request.result};
-    const std::string message = client::encodeMessage(request, expected.messageId, fAddress->text(),
-                                                      fAddress->isLocal ? localUser() : std::string());
+    const std::string message = client::encodeHttpRequest(request, expected.messageId, fAddress->text(),
+                                                          fAddress->isLocal ? localUser() : std::string());
     if (fConnection.isOpen() && fConnection.isStale()) {
         fConnection.close();
     }
     bool mayRepeat = fConnection.isOpen() && fConnection.hasReceived() && request.isRepeatable;
     for (;;) {
         ResponseReader reader(expected, fDecoder, onContent);
-        HttpResponse response(fLimits, checkHeader, [&](std::string_view body) { reader.feed(body); });
+        HttpAnswerReader response(fLimits.http, checkHeader, [&](std::string_view body) { reader.feed(body); });
         if (sendAndReceive(message, response, deadline) == Outcome::NothingReceived) {
             if (!mayRepeat) {
                 throw CIMClientMalformedHTTPException(kClosed);
@@ -205,7 +187,7 @@ void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHan
     }
 }
 
-CIMClientRep::Outcome CIMClientRep::sendAndReceive(const std::string& message, HttpResponse& response,
+CIMClientRep::Outcome CIMClientRep::sendAndReceive(const std::string& message, HttpAnswerReader& response,
                                                    const Deadline& deadline)
 {
     if (!fConnection.isOpen()) {
@@ -218,7 +200,7 @@ CIMClientRep::Outcome CIMClientRep::sendAndReceive(const std::string& message, H
     return receive(response, deadline);
 }
 
-CIMClientRep::Outcome CIMClientRep::receive(HttpResponse& response, const Deadline& deadline)
+CIMClientRep::Outcome CIMClientRep::receive(HttpAnswerReader& response, const Deadline& deadline)
 {
     fReceiveBuffer.resize(kReceiveBytes);
     bool isFirst = true;

@@ -1,16 +1,28 @@
 #pragma once
 
-#include "pegasus/client/ClientLimits.h"
 #include "pegasus/client/Connection.h"
-#include "pegasus/client/HttpResponse.h"
-#include "pegasus/client/RequestEncoder.h"
+#include "pegasus/client/Request.h"
 #include "pegasus/client/ResponseReader.h"
+#include "pegasus/wire/HttpAnswerReader.h"
+#include "pegasus/wire/XmlLimits.h"
 
 #include <Pegasus/Common/String.h>
 
 #include <optional>
 #include <string>
 #include <vector>
+
+namespace Pegasus::client {
+
+// Bounds on a server's answer. Over one of HTTP's: CIMClientMalformedHTTPException; over one of XML's:
+// CIMClientXmlException. Both name the limit.
+struct ClientLimits
+{
+    wire::HttpAnswerLimits http;
+    wire::XmlLimits xml;
+};
+
+} // namespace Pegasus::client
 
 namespace Pegasus {
 
@@ -45,8 +57,9 @@ class CIMClientRep
     };
 
     void exchangeOnce(const client::Request& request, const ContentHandler& onContent);
-    Outcome sendAndReceive(const std::string& message, client::HttpResponse& response, const base::Deadline& deadline);
-    Outcome receive(client::HttpResponse& response, const base::Deadline& deadline);
+    Outcome sendAndReceive(const std::string& message, wire::HttpAnswerReader& response,
+                           const base::Deadline& deadline);
+    Outcome receive(wire::HttpAnswerReader& response, const base::Deadline& deadline);
 
     client::ClientLimits fLimits;
     wire::ElementDecoder fDecoder{fLimits.xml}; // kept, so that the names of all answers share their texts

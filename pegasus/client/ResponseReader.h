@@ -1,6 +1,5 @@
 #pragma once
 
-#include "pegasus/client/ClientLimits.h"
 #include "pegasus/wire/ElementDecoder.h"
 #include "pegasus/wire/XmlSlicer.h"
 

@@ -3,6 +3,7 @@
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/NumberText.h"
 #include "pegasus/base/Text.h"
+#include "pegasus/common/EmbeddedKind.h"
 #include "pegasus/common/ObjectReps.h"
 
 namespace Pegasus::wire {
@@ -70,19 +71,17 @@ template <class Item> void addNew(const XmlElement& element, Array<Item>& items,
     items.append(item);
 }
 
-// A string property whose qualifiers say so holds embedded objects, also where the attribute is missing.
-CIMType embeddedByQualifier(CIMType type, const Array<CIMQualifier>& qualifiers)
+// The type of a property's value: embedded objects are known by the attribute, or by the qualifiers alone.
+CIMType valueType(CIMType declared, const Array<CIMQualifier>& qualifiers)
 {
-    static const CIMName kEmbeddedObject("EmbeddedObject");
-    static const CIMName kEmbeddedInstance("EmbeddedInstance");
-    if (type != CIMTYPE_STRING || qualifiers.size() == 0) {
-        return type;
-    }
-    if (ObjectAccess::isTrue(qualifiers, kEmbeddedObject)) {
+    switch (embeddedKind(declared, qualifiers)) {
+    case EmbeddedKind::kObject:
         return CIMTYPE_OBJECT;
+    case EmbeddedKind::kInstance:
+        return CIMTYPE_INSTANCE;
+    default:
+        return declared;
     }
-    const Uint32 index = ObjectAccess::find(qualifiers, kEmbeddedInstance);
-    return index != PEG_NOT_FOUND && qualifiers[index].getType() == CIMTYPE_STRING ? CIMTYPE_INSTANCE : type;
 }
 
 Uint32 countFrom(XmlElement child)
@@ -285,7 +284,7 @@ void ElementDecoder::readTypedProperty(const XmlElement& element, bool isArray, 
     element.attributes(kPropertyAttributes, values);
     const XmlElement child = beginProperty(element, values, rep);
     const CIMType declared = embeddedType(element, typeAttribute(element, "TYPE", values[3]), values[4], values[5]);
-    const CIMType type = embeddedByQualifier(declared, rep.fQualifiers);
+    const CIMType type = valueType(declared, rep.fQualifiers);
     if (isArray) {
         rep.fArraySize = sizeAttribute(element, values[6]);
     }

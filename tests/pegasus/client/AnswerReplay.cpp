@@ -1,6 +1,5 @@
 #include "tests/pegasus/client/AnswerReplay.h"
 
-#include "pegasus/client/HttpResponse.h"
 #include "pegasus/client/ResponseReader.h"
 #include "tests/support/ContentReader.h"
 #include "tests/support/PeerAnswers.h"
@@ -87,8 +86,8 @@ std::string readAnswer(const AnswerCase& answer, const std::vector<std::size_t>&
     client::ResponseReader reader(expected, decoder, [&](const wire::XmlElement& element, wire::ElementDecoder&) {
         encodeAgain(element, decoder, out);
     });
-    client::HttpResponse response(
-        limits, [](const client::ResponseFields&) {}, [&](std::string_view body) { reader.feed(body); });
+    wire::HttpAnswerReader response(
+        limits.http, [](const wire::HttpAnswerFields&) {}, [&](std::string_view body) { reader.feed(body); });
     try {
         std::size_t at = 0;
         for (const std::size_t cut : cuts) {
@@ -100,11 +99,13 @@ std::string readAnswer(const AnswerCase& answer, const std::vector<std::size_t>&
             return "incomplete";
         }
         reader.finish();
+    } catch (const wire::HttpAnswerError& error) {
+        return "EXC " + nameOf(typeid(error)) + ": " + error.what();
     } catch (const Exception& exception) {
         return "EXC " + nameOf(typeid(exception)) + ": " + std::string(exception.getMessage().getCString());
     }
-    if (response.fields().hasStatusCode) {
-        out += "status " + response.fields().statusCode + " " + response.fields().statusDescription;
+    if (response.fields().statusCode) {
+        out += "status " + *response.fields().statusCode + " " + response.fields().statusDescription;
     }
     if (reader.error()) {
         out += "error " + std::to_string(reader.error()->getCode()) + " " +

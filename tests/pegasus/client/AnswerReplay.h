@@ -1,6 +1,6 @@
 #pragma once
 
-#include "pegasus/client/ClientLimits.h"
+#include "pegasus/client/CIMClientRep.h"
 
 #include <string>
 #include <string_view>

@@ -125,9 +125,9 @@ struct LimitCase
 };
 
 const LimitCase kLimits[] = {
-    {"header bytes", [](auto& l) { l.maxHeaderBytes = 64; }, "class", "a header of more than 64 bytes"},
-    {"body bytes", [](auto& l) { l.maxBodyBytes = 100; }, "class", "a body of more than 100 bytes"},
-    {"body bytes in chunks", [](auto& l) { l.maxBodyBytes = 100; }, "instances in chunks",
+    {"header bytes", [](auto& l) { l.http.maxHeaderBytes = 64; }, "class", "a header of more than 64 bytes"},
+    {"body bytes", [](auto& l) { l.http.maxBodyBytes = 100; }, "class", "a body of more than 100 bytes"},
+    {"body bytes in chunks", [](auto& l) { l.http.maxBodyBytes = 100; }, "instances in chunks",
      "a body of more than 100 bytes"},
     {"depth", [](auto& l) { l.xml.maxDepth = 7; }, "instances", "nested more than 7 deep"},
     {"attributes", [](auto& l) { l.xml.maxAttributes = 2; }, "class", "more than 2 attributes"},

@@ -1,13 +1,14 @@
-#include "pegasus/client/HttpResponse.h"
+#include "pegasus/wire/HttpAnswerReader.h"
 
 #include "pegasus/base/AsciiCase.h"
-
-#include <Pegasus/Client/CIMClientException.h>
+#include "pegasus/base/PercentCoding.h"
 
 #include <boost/asio/buffer.hpp>
 #include <boost/beast/http/basic_parser.hpp>
 
-namespace Pegasus::client {
+#include <algorithm>
+
+namespace Pegasus::wire {
 namespace {
 
 namespace http = boost::beast::http;
@@ -21,21 +22,31 @@ std::string toStd(BeastView text)
     return std::string(text.data(), text.size());
 }
 
+std::string decoded(BeastView text)
+{
+    return base::percentDecoded(std::string_view(text.data(), text.size()));
+}
+
 bool isNamed(BeastView name, std::string_view expected)
 {
     return base::equalNoCase(std::string_view(name.data(), name.size()), expected);
 }
 
-[[noreturn]] void throwMalformed(const std::string& cause = std::string())
+[[noreturn]] void throwMalformed()
 {
-    const std::string text = "Malformed HTTP response message" + (cause.empty() ? "." : ": " + cause + ".");
-    throw CIMClientMalformedHTTPException(String(text.c_str()));
+    throw HttpAnswerError("");
 }
 
-// Where the header ends: behind an empty line, whose line ends may be bare line feeds.
-std::size_t headerEnd(std::string_view bytes)
+[[noreturn]] void throwTooLarge(const char* what, std::uint64_t limit)
 {
-    for (std::size_t at = bytes.find('\n'); at != std::string_view::npos; at = bytes.find('\n', at + 1)) {
+    throw HttpAnswerError(std::string(what) + " of more than " + std::to_string(limit) + " bytes");
+}
+
+// Returns: the offset after the empty line that ends the header; its line ends may be bare line feeds. The search
+// begins at `from`.
+std::size_t headerEnd(std::string_view bytes, std::size_t from)
+{
+    for (std::size_t at = bytes.find('\n', from); at != std::string_view::npos; at = bytes.find('\n', at + 1)) {
         if (bytes.substr(at + 1, 1) == "\n") {
             return at + 2;
         }
@@ -46,7 +57,7 @@ std::size_t headerEnd(std::string_view bytes)
     return std::string_view::npos;
 }
 
-// The parser insists on CRLF; servers' headers with bare line feeds are understood too.
+// The parser insists on CRLF; headers with bare line feeds, as some servers send them, are understood too.
 std::string withCrLf(std::string_view header)
 {
     std::string out;
@@ -60,20 +71,28 @@ std::string withCrLf(std::string_view header)
     return out;
 }
 
+void checkStart(std::string_view bytes)
+{
+    const std::string_view start = bytes.substr(0, kProtocol.size());
+    if (start != kProtocol.substr(0, start.size())) {
+        throwMalformed();
+    }
+}
+
 } // namespace
 
-class HttpResponse::Parser : public http::basic_parser<false>
+class HttpAnswerReader::Parser : public http::basic_parser<false>
 {
   public:
-    Parser(const ClientLimits& limits, HeaderHandler onHeader, BodyHandler onBody)
-        : fOnHeader(std::move(onHeader)), fOnBody(std::move(onBody))
+    Parser(const HttpAnswerLimits& limits, HeaderHandler onHeader, BodyHandler onBody)
+        : fMaxFramingBytes(limits.maxFramingBytes), fOnHeader(std::move(onHeader)), fOnBody(std::move(onBody))
     {
         eager(true);
         header_limit(limits.maxHeaderBytes);
         body_limit(limits.maxBodyBytes);
     }
 
-    const ResponseFields& fields() const { return fFields; }
+    const HttpAnswerFields& fields() const { return fFields; }
 
   private:
     void on_request_impl(http::verb, BeastView, BeastView, int, error_code&) override {}
@@ -86,25 +105,28 @@ class HttpResponse::Parser : public http::basic_parser<false>
 
     void on_field_impl(http::field, BeastView name, BeastView value, error_code&) override
     {
+        countTrailer(name.size() + value.size());
         if (isNamed(name, "CIMOperation")) {
-            fFields.hasCimOperation = true;
             fFields.cimOperation = toStd(value);
         } else if (isNamed(name, "Content-Type")) {
-            fFields.hasContentType = true;
             fFields.contentType = toStd(value);
         } else if (isNamed(name, "CIMError")) {
             fFields.cimError = toStd(value);
         } else if (isNamed(name, "PGErrorDetail")) {
-            fFields.errorDetail = toStd(value);
+            fFields.errorDetail = decoded(value);
         } else if (isNamed(name, "CIMStatusCode")) {
-            fFields.hasStatusCode = true;
             fFields.statusCode = toStd(value);
         } else if (isNamed(name, "CIMStatusCodeDescription")) {
-            fFields.statusDescription = toStd(value);
+            fFields.statusDescription = decoded(value);
         }
     }
 
-    void on_header_impl(error_code&) override { fOnHeader(fFields); }
+    void on_header_impl(error_code&) override
+    {
+        fHasHeader = true;
+        fOnHeader(fFields);
+    }
+
     void on_body_init_impl(const boost::optional<std::uint64_t>&, error_code&) override {}
 
     std::size_t on_body_impl(BeastView body, error_code&) override
@@ -113,7 +135,12 @@ class HttpResponse::Parser : public http::basic_parser<false>
         return body.size();
     }
 
-    void on_chunk_header_impl(std::uint64_t, BeastView, error_code&) override {}
+    void on_chunk_header_impl(std::uint64_t, BeastView extensions, error_code&) override
+    {
+        if (extensions.size() > fMaxFramingBytes) {
+            throwTooLarge("chunk framing", fMaxFramingBytes);
+        }
+    }
 
     std::size_t on_chunk_body_impl(std::uint64_t, BeastView body, error_code&) override
     {
@@ -123,19 +150,31 @@ class HttpResponse::Parser : public http::basic_parser<false>
 
     void on_finish_impl(error_code&) override {}
 
+    // How the bytes were split decides what the parser sees at once; the count does not depend on it.
+    void countTrailer(std::size_t fieldBytes)
+    {
+        fTrailerBytes += fHasHeader ? fieldBytes : 0;
+        if (fTrailerBytes > fMaxFramingBytes) {
+            throwTooLarge("a trailer", fMaxFramingBytes);
+        }
+    }
+
+    std::size_t fMaxFramingBytes;
     HeaderHandler fOnHeader;
     BodyHandler fOnBody;
-    ResponseFields fFields;
+    HttpAnswerFields fFields;
+    std::size_t fTrailerBytes = 0;
+    bool fHasHeader = false;
 };
 
-HttpResponse::HttpResponse(const ClientLimits& limits, HeaderHandler onHeader, BodyHandler onBody)
+HttpAnswerReader::HttpAnswerReader(const HttpAnswerLimits& limits, HeaderHandler onHeader, BodyHandler onBody)
     : fLimits(limits), fParser(std::make_unique<Parser>(limits, std::move(onHeader), std::move(onBody)))
 {
 }
 
-HttpResponse::~HttpResponse() = default;
+HttpAnswerReader::~HttpAnswerReader() = default;
 
-void HttpResponse::feed(std::string_view bytes)
+void HttpAnswerReader::feed(std::string_view bytes)
 {
     if (!hasHeader()) {
         feedHeader(bytes);
@@ -143,28 +182,33 @@ void HttpResponse::feed(std::string_view bytes)
     if (bytes.empty()) {
         return;
     }
-    if (isComplete()) {
-        fHasSurplus = true;
-        return;
-    }
     if (fPending.empty()) {
-        return put(bytes);
+        bytes.remove_prefix(put(bytes));
+        fPending = bytes;
+    } else {
+        fPending.append(bytes);
+        fPending.erase(0, put(fPending));
     }
-    std::string joined;
-    joined.swap(fPending);
-    joined.append(bytes);
-    put(joined);
+    if (isComplete()) {
+        fHasSurplus = fHasSurplus || !fPending.empty();
+        fPending.clear();
+    }
+    // Only the framing between pieces of a body waits for more.
+    if (fPending.size() > fLimits.maxFramingBytes) {
+        throwTooLarge("chunk framing", fLimits.maxFramingBytes);
+    }
 }
 
 // Takes bytes up to the end of the header.
-void HttpResponse::feedHeader(std::string_view& bytes)
+void HttpAnswerReader::feedHeader(std::string_view& bytes)
 {
+    constexpr std::size_t kMaxEndBytes = 3; // of a line feed and the empty line after it
     const std::size_t before = fPending.size();
     fPending.append(bytes);
-    checkStart();
-    const std::size_t end = headerEnd(fPending);
+    checkStart(fPending);
+    const std::size_t end = headerEnd(fPending, before - std::min(before, kMaxEndBytes));
     if (std::min(end, fPending.size()) > fLimits.maxHeaderBytes) {
-        throwMalformed("a header of more than " + std::to_string(fLimits.maxHeaderBytes) + " bytes");
+        throwTooLarge("a header", fLimits.maxHeaderBytes);
     }
     bytes.remove_prefix(end == std::string::npos ? bytes.size() : end - before);
     if (end == std::string::npos) {
@@ -178,52 +222,35 @@ void HttpResponse::feedHeader(std::string_view& bytes)
     }
 }
 
-void HttpResponse::checkStart() const
+// Returns: how many bytes were used; the rest must come again, with more after it.
+std::size_t HttpAnswerReader::put(std::string_view bytes)
 {
-    const std::string_view start = std::string_view(fPending).substr(0, kProtocol.size());
-    if (start != kProtocol.substr(0, start.size())) {
-        throwMalformed();
-    }
-}
-
-void HttpResponse::put(std::string_view bytes)
-{
-    while (!bytes.empty() && !isComplete()) {
-        const std::size_t used = putSome(bytes);
+    std::size_t done = 0;
+    while (done < bytes.size() && !isComplete()) {
+        const std::size_t used = putSome(bytes.substr(done));
         if (used == 0) {
             break;
         }
-        bytes.remove_prefix(used);
+        done += used;
     }
-    if (isComplete()) {
-        fHasSurplus = fHasSurplus || !bytes.empty();
-        return;
-    }
-    // Only the framing between pieces of a body waits for more.
-    if (bytes.size() > fLimits.maxHeaderBytes) {
-        throwMalformed("a trailer of more than " + std::to_string(fLimits.maxHeaderBytes) + " bytes");
-    }
-    fPending.assign(bytes.data(), bytes.size());
+    return done;
 }
 
 // Returns: how many bytes were used; 0 when more are needed.
-std::size_t HttpResponse::putSome(std::string_view bytes)
+std::size_t HttpAnswerReader::putSome(std::string_view bytes)
 {
     error_code error;
     const std::size_t used = fParser->put(boost::asio::buffer(bytes.data(), bytes.size()), error);
-    if (error == http::error::need_more) {
-        return used;
-    }
     if (error == http::error::body_limit) {
-        throwMalformed("a body of more than " + std::to_string(fLimits.maxBodyBytes) + " bytes");
+        throwTooLarge("a body", fLimits.maxBodyBytes);
     }
-    if (error) {
+    if (error && error != http::error::need_more) {
         throwMalformed();
     }
     return used;
 }
 
-bool HttpResponse::endOfConnection()
+bool HttpAnswerReader::endOfConnection()
 {
     if (!hasHeader()) {
         return false;
@@ -235,24 +262,24 @@ bool HttpResponse::endOfConnection()
     return isComplete();
 }
 
-bool HttpResponse::hasHeader() const
+bool HttpAnswerReader::hasHeader() const
 {
     return fParser->is_header_done();
 }
 
-bool HttpResponse::isComplete() const
+bool HttpAnswerReader::isComplete() const
 {
     return fParser->is_done();
 }
 
-bool HttpResponse::keepsAlive() const
+bool HttpAnswerReader::keepsAlive() const
 {
     return fParser->keep_alive() && !fHasSurplus;
 }
 
-const ResponseFields& HttpResponse::fields() const
+const HttpAnswerFields& HttpAnswerReader::fields() const
 {
     return fParser->fields();
 }
 
-} // namespace Pegasus::client
+} // namespace Pegasus::wire

@@ -1,0 +1,69 @@
+#include "pegasus/client/Request.h"
+
+#include "pegasus/base/PercentCoding.h"
+#include "pegasus/base/Text.h"
+
+#include <Pegasus/Common/Exception.h>
+
+#include <cstdio>
+
+namespace Pegasus::client {
+namespace {
+
+std::string encoded(const String& object)
+{
+    return base::percentEncoded(base::utf8(object), base::PercentSet::kStrict);
+}
+
+} // namespace
+
+Request makeRequest(wire::IntrinsicCall& call, bool isRepeatable)
+{
+    Request request;
+    request.method = call.method();
+    request.object = encoded(call.nameSpace().getString());
+    request.call = call.finish();
+    request.isRepeatable = isRepeatable;
+    return request;
+}
+
+Request makeMethodRequest(const CIMNamespaceName& nameSpace, const CIMObjectPath& path, const CIMName& method,
+                          const Array<CIMParamValue>& parameters)
+{
+    if (nameSpace.isNull()) {
+        throw InvalidNamespaceNameException(String());
+    }
+    CIMObjectPath target = path;
+    target.setHost(String());
+    target.setNameSpace(nameSpace);
+    Request request;
+    request.isIntrinsic = false;
+    request.method = base::utf8(method);
+    request.object = encoded(target.toString());
+    request.call = wire::encodeMethodCall(nameSpace, path, method, parameters);
+    return request;
+}
+
+std::string encodeHttpRequest(const Request& request, std::string_view messageId, std::string_view host,
+                              std::string_view localUser)
+{
+    const std::string content = wire::encodeRequestMessage(messageId, request.call);
+    char length[16];
+    std::snprintf(length, sizeof(length), "%010zu", content.size());
+    std::string out;
+    out.reserve(content.size() + 512);
+    out.append("POST /cimom HTTP/1.1\r\nHOST: ").append(host).append("\r\n");
+    out.append("Content-Type: application/xml; charset=utf-8\r\n");
+    out.append("content-length: ").append(length).append("\r\n");
+    out.append("TE: chunked, trailers\r\n");
+    out.append("CIMOperation: MethodCall\r\n");
+    const std::string method = base::percentEncoded(request.method, base::PercentSet::kStrict);
+    out.append("CIMMethod: ").append(method).append("\r\n");
+    out.append("CIMObject: ").append(request.object).append("\r\n");
+    if (!localUser.empty()) {
+        out.append("PegasusAuthorization: Local \"").append(localUser).append("\"\r\n");
+    }
+    return out.append("\r\n").append(content);
+}
+
+} // namespace Pegasus::client
