@@ -2,6 +2,7 @@
 
 #include <expat.h>
 
+#include <algorithm>
 #include <exception>
 #include <memory>
 #include <new>
@@ -15,17 +16,42 @@ constexpr unsigned int kMaxDepth = 64;
 constexpr char kTooLarge[] = "the document is larger than 16 MiB";
 constexpr char kTooDeep[] = "elements are nested deeper than 64 levels";
 constexpr char kEntityDeclared[] = "entity declarations are not accepted";
+constexpr char kEntityNotRead[] = "is not known: external DTDs and parameter entities are not read";
+
+constexpr char kAttributeList[] = "<!ATTLIST";
 
 struct TParserDeleter
 {
     void operator()(XML_Parser parser) const { XML_ParserFree(parser); }
 };
-typedef std::unique_ptr<XML_ParserStruct, TParserDeleter> TExpatParser;
+using TExpatParser = std::unique_ptr<XML_ParserStruct, TParserDeleter>;
+
+bool IsPredefined(const std::string& entity)
+{
+    static constexpr const char* kPredefined[] = {"amp", "lt", "gt", "apos", "quot"};
+    return entity[0] == '#' ||
+           std::find(std::begin(kPredefined), std::end(kPredefined), entity) != std::end(kPredefined);
+}
+
+// Returns: the first entity in a well-formed piece of markup that XML itself does not define; empty if there is none.
+std::string FindDeclaredEntity(const std::string& markup)
+{
+    for (std::size_t at = markup.find('&'); at != std::string::npos; at = markup.find('&', at + 1)) {
+        const std::string entity = markup.substr(at + 1, markup.find(';', at) - at - 1);
+        if (!IsPredefined(entity)) {
+            return entity;
+        }
+    }
+    return "";
+}
 
 } // namespace
 
-// What one parse needs; and the bridge from expat's C callbacks. No exception may cross expat's C frames: one thrown
-// by a callback is kept, ends the parse, and leaves Parse.
+// The state of one parse, and the bridge from expat's C callbacks. An exception must stay out of expat's C frames: one
+// that a callback throws is kept, ends the parse, and is thrown again by Parse.
+//
+// After a DTD or parameter entity that it has not read, expat cannot know whether an entity is declared. It then drops
+// references in values of attributes silently, so tags and declarations of attributes are searched for them.
 struct TXmlParser::TState
 {
     explicit TState(TXmlParser& owner) : fOwner(owner) {}
@@ -33,21 +59,26 @@ struct TXmlParser::TState
     TXmlParser& fOwner;
     TExpatParser fExpat;
     unsigned int fDepth = 0;
-    const char* fRefusal = nullptr; // a limit of our own was hit
+    std::string fRefusal; // why this class, rather than expat, ended the parse
     std::exception_ptr fCallbackException;
+    bool fHasUnreadDeclarations = false;
+    std::string fRawMarkup; // collected only after unread declarations
 
     void Install();
     void Stop() { XML_StopParser(fExpat.get(), XML_FALSE); }
-    void Refuse(const char* reason)
+    void Refuse(const std::string& reason)
     {
         fRefusal = reason;
         Stop();
     }
+    void RefuseEntity(const std::string& entity) { Refuse("the entity &" + entity + "; " + kEntityNotRead); }
+    void RefuseEntitiesOfTag();
+    void RefuseEntitiesOfRawMarkup();
 
     // expat delivers what it has already tokenised even after it was stopped.
     template <typename Call> void Deliver(Call call)
     {
-        if (fRefusal || fCallbackException) {
+        if (!fRefusal.empty() || fCallbackException) {
             return;
         }
         try {
@@ -68,6 +99,9 @@ struct TXmlParser::TState
                            const XML_Char* publicId);
     static void OnEntityDeclaration(void* state, const XML_Char*, int, const XML_Char*, int, const XML_Char*,
                                     const XML_Char*, const XML_Char*, const XML_Char*);
+    static int OnUnreadDeclarations(void* state);
+    static void OnSkippedEntity(void* state, const XML_Char* name, int isParameterEntity);
+    static void OnRawMarkup(void* state, const XML_Char* text, int length);
 };
 
 void TXmlParser::TState::Install()
@@ -82,6 +116,26 @@ void TXmlParser::TState::Install()
     XML_SetCharacterDataHandler(fExpat.get(), OnText);
     XML_SetNotationDeclHandler(fExpat.get(), OnNotation);
     XML_SetEntityDeclHandler(fExpat.get(), OnEntityDeclaration);
+    XML_SetNotStandaloneHandler(fExpat.get(), OnUnreadDeclarations);
+    XML_SetSkippedEntityHandler(fExpat.get(), OnSkippedEntity);
+}
+
+void TXmlParser::TState::RefuseEntitiesOfTag()
+{
+    if (fHasUnreadDeclarations) {
+        fRawMarkup.clear();
+        XML_DefaultCurrent(fExpat.get()); // calls OnRawMarkup
+        RefuseEntitiesOfRawMarkup();
+    }
+}
+
+void TXmlParser::TState::RefuseEntitiesOfRawMarkup()
+{
+    const std::string entity = FindDeclaredEntity(fRawMarkup);
+    fRawMarkup.clear();
+    if (!entity.empty()) {
+        RefuseEntity(entity);
+    }
 }
 
 void TXmlParser::TState::OnStart(void* state, const XML_Char* name, const XML_Char** attributes)
@@ -90,6 +144,7 @@ void TXmlParser::TState::OnStart(void* state, const XML_Char* name, const XML_Ch
     if (++self.fDepth > kMaxDepth) {
         return self.Refuse(kTooDeep);
     }
+    self.RefuseEntitiesOfTag();
     self.Deliver([&] {
         std::map<std::string, std::string> byName;
         for (; *attributes; attributes += 2) {
@@ -131,6 +186,36 @@ void TXmlParser::TState::OnEntityDeclaration(void* state, const XML_Char*, int, 
     From(state).Refuse(kEntityDeclared);
 }
 
+int TXmlParser::TState::OnUnreadDeclarations(void* state)
+{
+    TState& self = From(state);
+    self.fHasUnreadDeclarations = true;
+    XML_SetDefaultHandlerExpand(self.fExpat.get(), OnRawMarkup);
+    return XML_STATUS_OK;
+}
+
+void TXmlParser::TState::OnSkippedEntity(void* state, const XML_Char* name, int isParameterEntity)
+{
+    if (!isParameterEntity) {
+        From(state).RefuseEntity(name);
+    }
+}
+
+// Called for a tag when RefuseEntitiesOfTag asks, and for all markup that has no callback of its own. A declaration of
+// attributes arrives token by token.
+void TXmlParser::TState::OnRawMarkup(void* state, const XML_Char* text, int length)
+{
+    TState& self = From(state);
+    const std::string piece(text, static_cast<std::size_t>(length));
+    if (piece == kAttributeList) {
+        self.fRawMarkup.clear();
+    }
+    self.fRawMarkup += piece;
+    if (piece == ">" && self.fRawMarkup.compare(0, sizeof kAttributeList - 1, kAttributeList) == 0) {
+        self.RefuseEntitiesOfRawMarkup();
+    }
+}
+
 TXmlParser::TXmlParser() : fState(new TState(*this)) {}
 
 TXmlParser::~TXmlParser()
@@ -152,7 +237,8 @@ bool TXmlParser::Parse(const char* buffer, std::size_t length)
     if (status == XML_STATUS_OK) {
         return true;
     }
-    FatalError(fState->fRefusal ? fState->fRefusal : XML_ErrorString(XML_GetErrorCode(fState->fExpat.get())));
+    const std::string& refusal = fState->fRefusal;
+    FatalError(refusal.empty() ? XML_ErrorString(XML_GetErrorCode(fState->fExpat.get())) : refusal.c_str());
     return false;
 }
 

@@ -71,6 +71,14 @@ TEST(TXmlParser, ReadsOtherEncodings)
                 ElementsAre("1 <a b=\xc3\xa9>", "1 </a>"));
 }
 
+TEST(TXmlParser, AcceptsAnUnreadDtdAsLongAsNothingRefersToIt)
+{
+    EXPECT_THAT(EventsOf("<!DOCTYPE a SYSTEM 'a.dtd' [<!ATTLIST a b CDATA '&lt;'>"
+                         "<!ELEMENT a ANY><!-- &x; -->%p;]>"
+                         "<!-- &x; --><a c='&amp;&#38;'>&gt;<![CDATA[&x;]]><?p &x;?></a>"),
+                ElementsAre("1 <a b=< c=&&>", "1 '>'", "1 '&x;'", "1 ?p &x;", "1 </a>"));
+}
+
 struct TBadRow
 {
     const char* fName;
@@ -91,6 +99,24 @@ const TBadRow kBad[] = {
     {"external entity",
      "<!DOCTYPE a [<!ENTITY x SYSTEM 'file://etc/passwd'>]>\n<a>&x;</a>",
      {"1 fatal: entity declarations are not accepted"}},
+    {"entity of an unread DTD",
+     "<!DOCTYPE a SYSTEM 'a.dtd'>\n<a>b&x;c</a>",
+     {"2 <a>", "2 'b'", "2 fatal: the entity &x; is not known: external DTDs and parameter entities are not read"}},
+    {"entity of an unread public DTD",
+     "<!DOCTYPE a PUBLIC 'p' 'a.dtd'><a>&x;</a>",
+     {"1 <a>", "1 fatal: the entity &x; is not known: external DTDs and parameter entities are not read"}},
+    {"entity after an unread parameter entity",
+     "<!DOCTYPE a [%p;]><a>&x;</a>",
+     {"1 <a>", "1 fatal: the entity &x; is not known: external DTDs and parameter entities are not read"}},
+    {"entity of an unread DTD in an attribute",
+     "<!DOCTYPE a SYSTEM 'a.dtd'><a><b c='&amp;1&#50;' d='&x;'/></a>",
+     {"1 <a>", "1 fatal: the entity &x; is not known: external DTDs and parameter entities are not read"}},
+    {"entity of an unread DTD in a default value",
+     "<!DOCTYPE a SYSTEM 'a.dtd' [<!ATTLIST a b CDATA 'c&x;'>]><a/>",
+     {"1 fatal: the entity &x; is not known: external DTDs and parameter entities are not read"}},
+    {"entity of a standalone document",
+     "<?xml version='1.0' standalone='yes'?><!DOCTYPE a SYSTEM 'a.dtd'><a b='&x;'/>",
+     {"1 fatal: undefined entity"}},
 };
 
 TEST(TXmlParser, TellsWhatIsWrongAndKeepsWhatCameBefore)
