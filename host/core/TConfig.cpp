@@ -33,10 +33,17 @@ std::string ReadWhole(const std::string& path)
     return text;
 }
 
+// Some editors begin a UTF-8 file with this; it belongs to no key.
+std::string WithoutByteOrderMark(const std::string& text)
+{
+    static constexpr char kMark[] = "\xef\xbb\xbf";
+    return text.compare(0, 3, kMark) == 0 ? text.substr(3) : text;
+}
+
 std::map<std::string, std::string> ParseLines(const std::string& text)
 {
     std::map<std::string, std::string> values;
-    std::istringstream lines(text);
+    std::istringstream lines(WithoutByteOrderMark(text));
     for (std::string line; std::getline(lines, line);) {
         line = Trimmed(line);
         if (line.empty() || line[0] == '#') {

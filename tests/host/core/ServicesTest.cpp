@@ -64,6 +64,18 @@ TEST_F(TConfigTest, ReadsKeyValueLines)
     EXPECT_EQ(fConfig.getValue("absent"), "");
 }
 
+TEST_F(TConfigTest, SkipsAByteOrderMark)
+{
+    const TFile file("\xef\xbb\xbf"
+                     "a=1\n\xef\xbb\xbf"
+                     "b=2\n"),
+        empty("\xef\xbb\xbf");
+    fConfig.Load(file.fPath);
+    fConfig.Load(empty.fPath);
+    EXPECT_EQ(fConfig.getValue("a"), "1");
+    EXPECT_EQ(fConfig.getValue("b"), "") << "only at the beginning is it a mark";
+}
+
 TEST_F(TConfigTest, OverridesGoBeforeFilesAndLaterFilesBeforeEarlier)
 {
     const TFile first("a=1\nb=1\nc=1\n"), second("b=2\nc=2\n");
