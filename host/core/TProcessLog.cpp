@@ -20,6 +20,15 @@ TFailedProgram Describe(const TProcessRequest& request, const TProcessOutcome& o
     return program;
 }
 
+std::size_t TextBytes(const TFailedProgram& program)
+{
+    std::size_t bytes = program.fName.size() + program.fOutput.size() + program.fErrorOutput.size();
+    for (const std::string& argument : program.fArguments) {
+        bytes += argument.size();
+    }
+    return bytes;
+}
+
 std::string LogLine(const TFailedProgram& program, const TProcessOutcome& outcome)
 {
     std::string line = "TOSSpecific::SpawnProcess " + program.fName;
@@ -78,10 +87,12 @@ void TProcessLog::Add(const TProcessRequest& request, const TProcessOutcome& out
 void TProcessLog::Keep(const TFailedProgram& program)
 {
     const std::lock_guard<std::mutex> lock(fMutex);
-    if (fEntries.size() == kMaxEntries) {
+    fBytes += TextBytes(program);
+    fEntries.push_back(program);
+    while (fEntries.size() > kMaxEntries || (fBytes > kMaxBytes && fEntries.size() > 1)) {
+        fBytes -= TextBytes(fEntries.front());
         fEntries.pop_front();
     }
-    fEntries.push_back(program);
 }
 
 std::vector<TFailedProgram> TProcessLog::Take()
@@ -90,6 +101,7 @@ std::vector<TFailedProgram> TProcessLog::Take()
     std::vector<TFailedProgram> taken(std::make_move_iterator(fEntries.begin()),
                                       std::make_move_iterator(fEntries.end()));
     fEntries.clear();
+    fBytes = 0;
     return taken;
 }
 

@@ -30,6 +30,7 @@ class TProcessLog
 {
   public:
     static constexpr std::size_t kMaxEntries = 1000;
+    static constexpr std::size_t kMaxBytes = 8UL * 1024 * 1024; // of their texts; one program is kept whatever its size
 
     static TProcessLog& Instance();
 
@@ -45,6 +46,7 @@ class TProcessLog
 
     std::mutex fMutex;
     std::deque<TFailedProgram> fEntries;
+    std::size_t fBytes = 0; // of the entries' texts
 };
 
 } // namespace NKOLVRX20

@@ -226,6 +226,39 @@ TEST(TProcessLog, FailuresAreLoggedInOneLineAndKeptForTheHost)
     EXPECT_TRUE(TProcessLog::Instance().Take().empty());
 }
 
+TFailedProgram LastOf(const std::vector<TFailedProgram>& programs)
+{
+    return programs.empty() ? TFailedProgram() : programs.back();
+}
+
+TEST(TProcessLog, ForgetsTheOldestBeyondItsEntriesAndItsBytes)
+{
+    const TCapturingLogger log;
+    TProcessLog& processes = TProcessLog::Instance();
+    processes.Take();
+    TProcessRequest request;
+    request.fArguments = {"probe", std::string(kMaxErrorOutputBytes, 'a')};
+    TProcessOutcome outcome;
+    outcome.fEnd = TProcessOutcome::kExited;
+    outcome.fErrorOutput = std::string(kMaxErrorOutputBytes, 'e');
+    const auto addAll = [&](int count) {
+        for (outcome.fStatus = 1; outcome.fStatus <= count; ++outcome.fStatus) {
+            processes.Add(request, outcome);
+        }
+        return processes.Take();
+    };
+    auto kept = addAll(200);
+    EXPECT_EQ(kept.size(), TProcessLog::kMaxBytes / (2 * kMaxErrorOutputBytes) - 1);
+    EXPECT_EQ(LastOf(kept).fStatus, 200);
+    request.fArguments = {"probe", std::string(TProcessLog::kMaxBytes, 'a')};
+    EXPECT_EQ(LastOf(addAll(2)).fStatus, 2) << "larger than all bytes";
+    request.fArguments = {"probe"};
+    outcome.fErrorOutput.clear();
+    kept = addAll(static_cast<int>(TProcessLog::kMaxEntries) + 2);
+    EXPECT_EQ(kept.size(), TProcessLog::kMaxEntries);
+    EXPECT_EQ(kept.front().fStatus, 3);
+}
+
 TEST(SpawnProcess, RunsFromSeveralThreadsAtOnce)
 {
     std::vector<std::future<std::string>> outputs;
