@@ -111,6 +111,18 @@ int HoldLockInGroup(const char* path)
     return 0;
 }
 
+// Joins the group of its parent; then waits for ever.
+int LeaveGroup()
+{
+    if (::setpgid(0, ::getpgid(::getppid())) != 0) {
+        return 1;
+    }
+    std::printf("left");
+    std::fflush(stdout);
+    ::pause();
+    return 0;
+}
+
 } // namespace
 
 int main(int argc, char** argv)
@@ -144,6 +156,9 @@ int main(int argc, char** argv)
     }
     if (mode == "lock") {
         return HoldLockInGroup(value);
+    }
+    if (mode == "leave-group") {
+        return LeaveGroup();
     }
     if (mode == "complain") {
         return std::fputs(value, stderr) < 0 ? 1 : 3;

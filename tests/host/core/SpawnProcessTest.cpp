@@ -95,6 +95,17 @@ TEST(SpawnProcess, GivesArgumentsAndEnvironmentExactly)
     EXPECT_EQ(OutputOf({"environment"}), "");
 }
 
+TEST(SpawnProcess, TheExactFormTakesThePathAsItIs)
+{
+    std::string output;
+    EXPECT_THROW(TOSSpecific::SpawnProcess("true", {}, "true", {}, output, kTimeoutSeconds), TVRXException)
+        << "PATH was searched";
+    for (const int seconds : {0, -1}) {
+        EXPECT_NO_THROW(TOSSpecific::SpawnProcess("true", {}, "/bin/true", {}, output, seconds))
+            << "the shortest time-out is a second";
+    }
+}
+
 TEST(SpawnProcess, SplitsACommandLineAndSearchesThePath)
 {
     std::string output;
@@ -175,6 +186,30 @@ TEST(SpawnProcess, TimeoutThrowsAndHandsOutWhatWasCaptured)
     EXPECT_EQ(::flock(fd, LOCK_EX), 0);
     ::close(fd);
     ::unlink(lock.c_str());
+}
+
+// The kernel reaps the children of such a process itself, and their status is gone.
+TEST(TChildProcess, RunsWhereTheHostIgnoresItsChildren)
+{
+    const auto handler = std::signal(SIGCHLD, SIG_IGN);
+    const auto ended = Probe({"arguments"});
+    const auto endedOutcome = TChildProcess(ended).Run(kTimeout);
+    const auto running = Probe({"write-forever"});
+    const auto runningOutcome = TChildProcess(running).Run(milliseconds(200));
+    std::signal(SIGCHLD, handler);
+    EXPECT_EQ(endedOutcome.fEnd, TProcessOutcome::kUnknown);
+    EXPECT_EQ(endedOutcome.fOutput, "[probe][arguments]");
+    EXPECT_EQ(runningOutcome.fEnd, TProcessOutcome::kTimedOut);
+}
+
+TEST(TChildProcess, TimeoutKillsAChildThatLeftItsGroup)
+{
+    const auto start = std::chrono::steady_clock::now();
+    const auto request = Probe({"leave-group"});
+    const auto outcome = TChildProcess(request).Run(milliseconds(500));
+    EXPECT_EQ(outcome.fEnd, TProcessOutcome::kTimedOut);
+    EXPECT_EQ(outcome.fOutput, "left");
+    EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(10)) << "it ended by itself";
 }
 
 TEST(TChildProcess, ChildThatNeverStopsWritingCannotHoldTheTimeout)
