@@ -456,20 +456,10 @@ String operator+(const String& s1, const String& s2)
     return String(s1).append(s2);
 }
 
+// UTF-8, as OpenPegasus writes it when it is built with ICU.
 std::ostream& operator<<(std::ostream& os, const String& str)
 {
-    const Char16* data = str.getChar16Data();
-    for (Uint32 i = 0; i < str.size(); ++i) {
-        const Uint16 unit = data[i];
-        if (unit > 0 && unit <= 0xFF) {
-            os << static_cast<char>(unit);
-            continue;
-        }
-        char text[8];
-        std::snprintf(text, sizeof(text), "\\x%04X", static_cast<unsigned>(unit));
-        os << text;
-    }
-    return os;
+    return os << base::utf8(str);
 }
 
 } // namespace Pegasus

@@ -13,7 +13,8 @@ class String;
 
 namespace NKOLVRX20 {
 
-// Returns: the text in UTF-8. (The stream operator of Pegasus::String does not write UTF-8.)
+// Returns: the text in UTF-8. (What the stream operator of Pegasus::String writes depends on how OpenPegasus was
+// built.)
 std::string ToStdString(const Pegasus::String& text);
 
 void WriteCoreLog(ILogger::EVRXLogSeverity severity, const std::string& text);

@@ -159,7 +159,7 @@ TEST(ValueConversionTest, EveryTypeArrivesAndGoesBack)
 TEST(ValueConversionTest, StringsOfAnArrayComeAsTheClientLibrarysStreamWritesThem)
 {
     const TElements elements = ToHost(PegArray<Pegasus::String>({Pegasus::String("caf\xC3\xA9 \xE5\x90\x8D")}));
-    EXPECT_EQ("caf\xE9 \\x540D", static_cast<std::string>(elements.at(0)));
+    EXPECT_EQ("caf\xC3\xA9 \xE5\x90\x8D", static_cast<std::string>(elements.at(0)));
 }
 
 TEST(ValueConversionTest, WhatTheHostHasNoTypeForLeavesTheOutputAsItWas)
