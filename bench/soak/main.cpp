@@ -150,6 +150,7 @@ void TSoak::Cycle(EFault fault)
     TConfig::GetInstance()->setValue("pegasus_multi_thread", fCounts.fCycles % 2 == 0 ? "off" : "on");
     const std::string error = vrxhost::ErrorOf([&] {
         vrxhost::TSession session(fRoot + "/libpegasus.nsp.so", fConsumer);
+        session.Open();
         UseNamespace(session.GetNamespace(), fault);
         const std::string problem = session.Close();
         if (!problem.empty()) {

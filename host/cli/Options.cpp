@@ -48,7 +48,7 @@ void AddOptions(CLI::App& app, TOptions& options, std::vector<std::string>& sett
            "Of the document (default table)")
         ->check(CLI::IsMember({"table", "json"}));
     app.add_option("--consumer", options.fConsumer,
-                   "Name that keeps this host's server apart from others' (default quvex)");
+                   "Name that keeps this host's server apart from others' (default: made of the root)");
     app.add_option("--config", options.fConfigFile, "Settings file, lines \"key = value\" (default ROOT/vrx.conf)")
         ->check(CLI::ExistingFile);
     app.add_option("--set", settings, "key=value, before the settings file; may be given several times")
@@ -98,9 +98,11 @@ void FillDefaults(TOptions& options, const std::vector<std::string>& settings)
 
 } // namespace
 
-void SetRoot(const std::string& root, TOptions& options)
+void SetRoot(const TDeployedTree& tree, TOptions& options)
 {
+    const std::string root = tree.GetRoot();
     options.fRoot = root;
+    options.fDefaultConsumer = tree.GetDefaultConsumer();
     if (options.fLogFile.empty()) {
         options.fLogFile = fs::path(root) / kLogFile;
     }

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "host/cli/TDeployedTree.h"
+
 #include <string>
 #include <utility>
 #include <vector>
@@ -37,8 +39,9 @@ struct TOptions
     EFormat fFormat = EFormat::kTable;
     std::string fRoot; // the directory in which everything runs
     std::string fPlugin;
-    std::string fConsumer;   // empty: the default
-    std::string fConfigFile; // empty: none
+    std::string fConsumer;        // empty: fDefaultConsumer
+    std::string fDefaultConsumer; // of the tree's server
+    std::string fConfigFile;      // empty: none
     std::string fLogFile;
     std::vector<std::pair<std::string, std::string>> fSettings;
     bool fVerbose = false;
@@ -47,13 +50,12 @@ struct TOptions
 constexpr char kPluginFile[] = "libpegasus.nsp.so";
 constexpr char kConfigFile[] = "vrx.conf";
 constexpr char kLogFile[] = "vrxhost.log";
-constexpr char kDefaultConsumer[] = "quvex";
 
 // Reads the command line; paths come out absolute. Help goes to standard output, errors to standard error.
 // Returns: -1 to go on with the options, else the exit status.
 int ParseOptions(int argc, const char* const* argv, TOptions& options);
 
-// Makes a checked directory the root, and the place of the settings file and the log unless the user named others.
-void SetRoot(const std::string& root, TOptions& options);
+// Makes a tree the root: the default place of the settings file and the log, and what the default consumer is made of.
+void SetRoot(const TDeployedTree& tree, TOptions& options);
 
 } // namespace vrxhost

@@ -1,5 +1,8 @@
 #include "host/cli/TDeployedTree.h"
 
+#include <cinttypes>
+#include <cstdint>
+#include <cstdio>
 #include <filesystem>
 #include <fstream>
 
@@ -12,6 +15,7 @@ constexpr char kMark[] = "pegasus/tree.conf";
 constexpr char kServerKey[] = "server = ";
 constexpr char kEmbedded[] = "embedded";
 constexpr char kInstalled[] = "installed OpenPegasus";
+constexpr char kInstalledConsumer[] = "quvex";
 constexpr char kFormatLine[] = "format = 1";
 
 [[noreturn]] void Refuse(const std::string& root, const std::string& reason)
@@ -40,6 +44,16 @@ EServerKind ReadMark(const std::string& root)
     return server == kEmbedded ? EServerKind::kEmbedded : EServerKind::kInstalled;
 }
 
+// FNV-1a: the same in every build, because a later one must find the server that an earlier one left running.
+std::uint64_t Hash(const std::string& text)
+{
+    std::uint64_t hash = 14695981039346656037u;
+    for (const char c : text) {
+        hash = (hash ^ static_cast<unsigned char>(c)) * 1099511628211u;
+    }
+    return hash;
+}
+
 std::string Resolved(const std::string& root)
 {
     std::error_code error;
@@ -61,6 +75,16 @@ TDeployedTree::TDeployedTree(const std::string& root) : fRoot(Resolved(root)), f
     if (!fs::is_directory(fs::path(fRoot) / "pegasus/pegSchema", ignored)) {
         Refuse(fRoot, "it has no folder pegasus/pegSchema");
     }
+}
+
+std::string TDeployedTree::GetDefaultConsumer() const
+{
+    if (fKind == EServerKind::kInstalled) {
+        return kInstalledConsumer;
+    }
+    char text[32];
+    std::snprintf(text, sizeof text, "vrxhost-%016" PRIx64, Hash(fRoot));
+    return text;
 }
 
 } // namespace vrxhost

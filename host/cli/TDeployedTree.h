@@ -29,7 +29,10 @@ class TDeployedTree
     explicit TDeployedTree(const std::string& root);
 
     const std::string& GetRoot() const { return fRoot; } // absolute, links resolved
-    EServerKind GetServerKind() const { return fKind; }
+
+    // Returns: the consumer that keeps this tree's server apart from other trees': made of the root's path, or the one
+    // that an installed OpenPegasus was built for.
+    std::string GetDefaultConsumer() const;
 
   private:
     std::string fRoot;

@@ -64,6 +64,7 @@ bool TLossLog::LearnFromAttempt(const std::string& text)
     {
         return false;
     }
+    fForeignServer = connected && fStartFailed;
     fNoServer = !connected || fStartFailed;
     fStartFailed = false;
     if (!fNoServer) {
@@ -96,6 +97,15 @@ void TLossLog::LearnFromPrograms()
     }
 }
 
+void TLossLog::StartOver()
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    fHeldBack.clear();
+    fStartFailed = fNoServer = fForeignServer = false;
+    fSentences.clear();
+    fKnown.clear();
+}
+
 void TLossLog::AddHeldBack()
 {
     const std::lock_guard<std::mutex> lock(fMutex);
@@ -114,6 +124,12 @@ bool TLossLog::HasNoServer() const
 {
     const std::lock_guard<std::mutex> lock(fMutex);
     return fNoServer;
+}
+
+bool TLossLog::HasForeignServer() const
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    return fForeignServer;
 }
 
 std::vector<std::string> TLossLog::GetSentences() const

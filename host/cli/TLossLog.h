@@ -9,8 +9,8 @@
 
 namespace vrxhost {
 
-// The host's core logger while vrxhost runs: hands every line on to the host's own logger, and learns from the
-// plug-in's lines what was lost. Each loss becomes one sentence, told once. Thread: safe.
+// The host's core logger while vrxhost runs: passes every line on to the host's own logger, and learns from the
+// plug-in's lines what was lost. Each loss becomes one sentence, reported once. Thread: safe.
 class TLossLog : public NKOLVRX20::ILogger
 {
   public:
@@ -22,12 +22,18 @@ class TLossLog : public NKOLVRX20::ILogger
     // Enters what the host itself found out.
     void Add(const std::string& sentence);
 
+    // Forgets everything: the namespace is about to be opened once more.
+    void StartOver();
+
     // Enters what was held back in case that another attempt would succeed.
     void AddHeldBack();
 
     // Returns: true when the latest attempt to start the server and to connect to it failed; also when only the start
     // did, because it is somebody else's server then that answers on the port.
     bool HasNoServer() const;
+
+    // Returns: true when the latest attempt connected although the server had failed to start: another one answered.
+    bool HasForeignServer() const;
 
     // Returns: the sentences so far, in the order in which things were lost.
     std::vector<std::string> GetSentences() const;
@@ -45,6 +51,7 @@ class TLossLog : public NKOLVRX20::ILogger
     std::string fHeldBack;     // why the server did not start, when it last failed to
     bool fStartFailed = false; // in this attempt
     bool fNoServer = false;
+    bool fForeignServer = false;
     std::vector<std::string> fSentences;
     std::set<std::string> fKnown;
 };

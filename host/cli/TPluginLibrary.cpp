@@ -108,12 +108,15 @@ void TPluginLibrary::Unregister()
     fProvider.reset();
 }
 
+std::string TPluginLibrary::Clear()
+{
+    const std::string error = ErrorOf([this] { fClearNamespace(); });
+    return error.empty() ? "" : "the plug-in could not shut its namespace down: " + error;
+}
+
 std::string TPluginLibrary::Unload()
 {
-    std::string problems = ErrorOf([this] { fClearNamespace(); });
-    if (!problems.empty()) {
-        problems = "the plug-in could not shut its namespace down: " + problems;
-    }
+    std::string problems = Clear();
     Unregister();
     void* const handle = std::exchange(fHandle, nullptr);
     if (AwaitThreadCount(fThreadCountBefore)) {

@@ -32,7 +32,11 @@ class TPluginLibrary
 
     const boost::shared_ptr<NKOLVRX20::INamespaceProvider>& GetProvider() const { return fProvider; }
 
-    // Lets the namespace go and unloads the library. Everything that came from the plug-in must be gone.
+    // Has the plug-in shut its namespace down. Requires: nothing that came from the namespace is held any more.
+    // Returns: empty, or what went wrong, as a sentence.
+    std::string Clear();
+
+    // Clears and unloads the library. Requires: nothing that came from the plug-in is held any more.
     // Returns: empty, or what went wrong, as sentences; a library that left threads behind stays loaded.
     // Blocks: for the plug-in's own shutdown, and up to a second more for its threads to end.
     std::string Unload();

@@ -3,7 +3,6 @@
 #include "host/cli/Document.h"
 #include "host/cli/ErrorReport.h"
 #include "host/cli/TCollector.h"
-#include "host/cli/TSession.h"
 #include "host/core/TProcessControl.h"
 
 #include <host/TConfig.h>
@@ -11,15 +10,24 @@
 
 #include <cerrno>
 #include <cstring>
+#include <random>
 
 namespace vrxhost {
+namespace {
 
+// Of opening the namespace, when another host took the port; and the longest pause before one, times its number.
+constexpr int kAttempts = 3;
+constexpr int kLongestPauseMs = 500;
+
+} // namespace
+
+using NKOLVRX20::ILogger;
 using NKOLVRX20::TConfig;
 using NKOLVRX20::TProcessControl;
 using NKOLVRX20::TRootObject;
 
 TRun::TRun(const TOptions& options)
-    : fOptions(options), fConsumer(options.fConsumer.empty() ? kDefaultConsumer : options.fConsumer),
+    : fOptions(options), fConsumer(options.fConsumer.empty() ? options.fDefaultConsumer : options.fConsumer),
       fServer(options.fRoot, fConsumer), fStop([this] { Interrupt(); }), fLosses(options.fRoot)
 {
     fDocument.fCommand = options.fCommand;
@@ -73,10 +81,39 @@ void TRun::SetConsumer() const
     }
 }
 
+// The port is chosen before the server binds it, so that another host's server may be the one that answers on it.
+void TRun::OpenNamespace(TSession& session)
+{
+    for (int attempt = 1;; ++attempt) {
+        const std::string error = ErrorOf([&] { session.Open(); });
+        if (fLosses.HasForeignServer() && attempt < kAttempts && PauseBefore(attempt + 1)) {
+            session.Clear();
+            fLosses.StartOver();
+        } else if (!error.empty()) {
+            throw TPluginError(error);
+        } else {
+            return;
+        }
+    }
+}
+
+// A growing and random time, so that hosts that met once do not meet again.
+// Returns: false when interrupted.
+bool TRun::PauseBefore(int attempt) const
+{
+    std::random_device random;
+    const int pauseMs = std::uniform_int_distribution<int>(0, attempt * kLongestPauseMs)(random);
+    TRootObject::GetCoreLogger()->Log(
+        ILogger::kNotice, "vrxhost: another server answered on the chosen port; attempt " + std::to_string(attempt) +
+                              " of " + std::to_string(kAttempts) + " begins in " + std::to_string(pauseMs) + " ms");
+    return !fStop.AwaitStop(pauseMs);
+}
+
 void TRun::UsePlugin()
 {
     TRootObject::SetCoreLogger(&fLosses);
     TSession session(fOptions.fPlugin, fConsumer);
+    OpenNamespace(session);
     if (fLosses.HasNoServer()) {
         throw TPluginError("the namespace has no server of its own");
     }
@@ -88,7 +125,7 @@ void TRun::UsePlugin()
     if (!problem.empty()) {
         fLosses.Add(problem);
     }
-    TellLosses(); // of the shutdown
+    ReportLosses(); // of the shutdown
 }
 
 void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
@@ -112,12 +149,12 @@ void TRun::Write()
     if (fStop.IsStopped()) {
         return;
     }
-    TellLosses();
+    ReportLosses();
     fDocument.fLosses = fLosses.GetSentences();
     fDocument.fComplete = fDocument.fLosses.empty();
     const std::string text = fOptions.fFormat == EFormat::kJson ? RenderJson(fDocument) : RenderTable(fDocument);
     fWriteError = fOutput.Write(text, fStop.GetFd());
-    // A reader that has seen enough is no failure worth a word.
+    // A reader that has seen enough and left is not worth a sentence.
     if (fWriteError != 0 && fWriteError != EPIPE && fWriteError != ECANCELED) {
         ReportError(std::string("the document could not be written: ") + std::strerror(fWriteError));
     }
@@ -135,16 +172,16 @@ void TRun::Fail(const std::string& reason)
     if (fOptions.fFormat == EFormat::kJson) {
         Write();
     } else {
-        TellLosses();
+        ReportLosses();
     }
 }
 
-// Says those that were not said yet.
-void TRun::TellLosses()
+// Those that were not reported yet.
+void TRun::ReportLosses()
 {
     const auto sentences = fLosses.GetSentences();
-    for (; fToldCount < sentences.size(); ++fToldCount) {
-        ReportError(sentences[fToldCount]);
+    for (; fReportedCount < sentences.size(); ++fReportedCount) {
+        ReportError(sentences[fReportedCount]);
     }
 }
 
@@ -157,7 +194,7 @@ EExitStatus TRun::GetStatus() const
     if (fFailed || fWriteError != 0) {
         return kFailed;
     }
-    return fToldCount == 0 ? kComplete : kPartial;
+    return fReportedCount == 0 ? kComplete : kPartial;
 }
 
 } // namespace vrxhost

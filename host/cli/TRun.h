@@ -5,6 +5,7 @@
 #include "host/cli/TDocumentOutput.h"
 #include "host/cli/TLossLog.h"
 #include "host/cli/TPrivateServer.h"
+#include "host/cli/TSession.h"
 #include "host/cli/TStopSignals.h"
 
 #include <host/ICIMNamespace.h>
@@ -30,10 +31,12 @@ class TRun
     void LoadSettings() const;
     void SetConsumer() const;
     void UsePlugin();
+    void OpenNamespace(TSession& session);
+    bool PauseBefore(int attempt) const;
     void Show(NKOLVRX20::ICIMNamespace& ns);
     void Write();
     void Fail(const std::string& reason);
-    void TellLosses();
+    void ReportLosses();
     EExitStatus GetStatus() const;
 
     const TOptions& fOptions;
@@ -44,7 +47,7 @@ class TRun
     TLossLog fLosses;
     TDocument fDocument;
     bool fFailed = false;
-    std::size_t fToldCount = 0; // of the losses
+    std::size_t fReportedCount = 0; // of the losses
     int fWriteError = 0;
 };
 

@@ -32,21 +32,9 @@ TCIMValue AddressOf(const boost::shared_ptr<ICIMNamespace>& ns)
 } // namespace
 
 TSession::TSession(const std::string& pluginPath, const std::string& consumer)
-    : fRepository(boost::make_shared<TInmemNamespace>()), fUpcall(boost::make_shared<TInmemNamespace>()),
-      fPlugin(pluginPath)
+    : fPluginPath(pluginPath), fConsumer(consumer), fRepository(boost::make_shared<TInmemNamespace>()),
+      fUpcall(boost::make_shared<TInmemNamespace>()), fPlugin(pluginPath)
 {
-    std::string error = ErrorOf([&] { Allocate(consumer); });
-    if (!error.empty()) {
-        if (error.find(TVRXStatusCode(TVRXStatusCode::kDirectoryNotOpened).TranslateStatusCode()) == 0) {
-            error += ": " + ProviderTree(pluginPath) + " or a folder in it";
-        }
-        Close();
-        throw TPluginError("the namespace could not be opened: " + error);
-    }
-    if (!fNamespace) {
-        Close();
-        throw TPluginError("the namespace could not be opened: the plug-in returned none");
-    }
 }
 
 TSession::~TSession()
@@ -54,13 +42,32 @@ TSession::~TSession()
     Close();
 }
 
-void TSession::Allocate(const std::string& consumer)
+void TSession::Open()
+{
+    std::string error = ErrorOf([this] { Allocate(); });
+    if (error.find(TVRXStatusCode(TVRXStatusCode::kDirectoryNotOpened).TranslateStatusCode()) == 0) {
+        error += ": " + ProviderTree(fPluginPath) + " or a folder in it";
+    } else if (error.empty() && !fNamespace) {
+        error = "the plug-in returned none";
+    }
+    if (!error.empty()) {
+        throw TPluginError("the namespace could not be opened: " + error);
+    }
+}
+
+void TSession::Allocate()
 {
     TCIMContext context;
     context["repository"] = AddressOf(fRepository);
     context["upcall"] = AddressOf(fUpcall);
-    context["consumer"] = TCIMValue(consumer);
+    context["consumer"] = TCIMValue(fConsumer);
     fNamespace = fPlugin.GetProvider()->AllocateNamespace(context, false, kNamespaceName);
+}
+
+void TSession::Clear()
+{
+    fNamespace.reset();
+    fPlugin.Clear();
 }
 
 std::string TSession::Close()

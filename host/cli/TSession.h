@@ -10,26 +10,37 @@
 
 namespace vrxhost {
 
-// One use of a plug-in: loaded, its namespace allocated, everything let go in the right order.
-// Thread: one at a time.
+// One use of a plug-in: loaded, its namespace opened (more than once, if need be), everything released in the right
+// order. Thread: one at a time.
 class TSession
 {
   public:
-    // Throws: TPluginError when there is no plug-in or no namespace.
+    // Loads the plug-in.
+    // Throws: TPluginError.
     TSession(const std::string& pluginPath, const std::string& consumer);
 
     // As Close, its sentences dropped.
     ~TSession();
 
+    // Allocates the namespace. Requires: none is open.
+    // Throws: TPluginError.
+    // Blocks: for the start of the server, and as long again for each attempt that fails.
+    void Open();
+
+    // Shuts the namespace down, so that it can be opened again. Requires: nothing that came from it is held any more.
+    void Clear();
+
     NKOLVRX20::ICIMNamespace& GetNamespace() { return *fNamespace; }
 
-    // Shuts the namespace down and unloads the plug-in. Nothing that came from it may be held any more.
+    // Shuts the namespace down and unloads the plug-in. Requires: as Clear.
     // Returns: empty, or what went wrong.
     std::string Close();
 
   private:
-    void Allocate(const std::string& consumer);
+    void Allocate();
 
+    const std::string fPluginPath;
+    const std::string fConsumer;
     // The host's namespaces outlive the plug-in's use of their addresses.
     boost::shared_ptr<NKOLVRX20::ICIMNamespace> fRepository;
     boost::shared_ptr<NKOLVRX20::ICIMNamespace> fUpcall;

@@ -31,6 +31,13 @@ TStopSignals::~TStopSignals()
     fFirstThread.join();
 }
 
+bool TStopSignals::AwaitStop(int timeoutMs) const
+{
+    pollfd event = {fEvent.Get(), POLLIN, 0};
+    ::poll(&event, 1, timeoutMs);
+    return fStopped;
+}
+
 void TStopSignals::AwaitSignals()
 {
     for (int number = 0; sigwait(&fSignals, &number) == 0 && !fEnding;) {

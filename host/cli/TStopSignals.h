@@ -27,6 +27,10 @@ class TStopSignals
     // Readable from the first signal on, for poll().
     int GetFd() const { return fEvent.Get(); }
 
+    // Blocks: until the first signal, or for the time.
+    // Returns: IsStopped.
+    bool AwaitStop(int timeoutMs) const;
+
   private:
     void AwaitSignals();
     void AwaitFirst();

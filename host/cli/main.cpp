@@ -93,7 +93,7 @@ EExitStatus Refuse(const TOptions& options, const std::string& reason, EExitStat
 
 EExitStatus Run(TOptions& options)
 {
-    SetRoot(TDeployedTree(options.fRoot).GetRoot(), options);
+    SetRoot(TDeployedTree(options.fRoot), options);
     CheckOwners(options);
     const NKOLVRX20::TUniqueFd rootLock = EnterRoot(options.fRoot);
     std::signal(SIGPIPE, SIG_IGN); // a reader that has gone is a write error here

@@ -3,6 +3,7 @@
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>
 #include <host/ICIMNamespace.h>
+#include <host/ILogger.h>
 #include <host/INamespaceProvider.h>
 #include <host/INamespaceProviderManager.h>
 #include <host/IProvider.h>
@@ -10,14 +11,21 @@
 #include <host/TCIMValue.h>
 #include <host/TRootObject.h>
 
+#include <atomic>
+#include <chrono>
 #include <cstdio>
 #include <exception>
+#include <random>
+#include <stdexcept>
+#include <thread>
 
 #include <dlfcn.h>
 
 using namespace NKOLVRX20;
 
 namespace {
+
+using TEntryPoint = void (*)();
 
 void PrintClass(ICIMClass& each)
 {
@@ -48,15 +56,76 @@ void PrintInventory(ICIMNamespace& ns)
         context);
 }
 
-// Whatever came from the plug-in is gone when this returns.
-void UseProvider(const std::string& consumer)
+// The core logger, which also notices in the process service's lines that cimserver failed to start. The plug-in
+// cannot: its client connects to whatever answers on the port, and that may be the server of another host that chose
+// the same port.
+class TServerWatch : public ILogger
 {
+  public:
+    TServerWatch() : fNext(*TRootObject::GetCoreLogger()) { TRootObject::SetCoreLogger(this); }
+    ~TServerWatch() override { TRootObject::SetCoreLogger(nullptr); }
+
+    void Log(EVRXLogSeverity severity, const std::string& text) override
+    {
+        if (text.find("TOSSpecific::SpawnProcess cimserver httpPort=") == 0) {
+            fFailed = text.find(": exit status 0") == std::string::npos;
+        } else if (text.find(" try to restart cimserver ") != std::string::npos) {
+            fFailed = false; // the plug-in noticed and starts it again itself
+        }
+        fNext.Log(severity, text);
+    }
+
+    bool HasFailed() const { return fFailed; }
+    void Reset() { fFailed = false; }
+
+  private:
+    ILogger& fNext;
+    std::atomic<bool> fFailed{false}; // lines come from several threads
+};
+
+// The plug-in's provider, out of the host's manager again however its use ends: what stayed there would be destroyed by
+// the library's code after the library was unloaded.
+class TRegisteredProvider
+{
+  public:
+    explicit TRegisteredProvider(TEntryPoint initialize)
+    {
+        initialize();
+        fProvider = TRootObject::GetNamespaceProviderManager()->GetNamespaceProvider("pegasus");
+    }
+    ~TRegisteredProvider() { TRootObject::GetNamespaceProviderManager()->UnregisterNamespaceProvider(fProvider); }
+    TRegisteredProvider(const TRegisteredProvider&) = delete;
+    TRegisteredProvider& operator=(const TRegisteredProvider&) = delete;
+
+    INamespaceProvider* operator->() const { return fProvider.get(); }
+
+  private:
+    boost::shared_ptr<INamespaceProvider> fProvider;
+};
+
+// Everything that came from the plug-in is gone when this returns or throws.
+void UseProvider(TEntryPoint initialize, TEntryPoint clearNamespace, const std::string& consumer)
+{
+    constexpr int kAttempts = 3;
+    constexpr int kLongestPauseMs = 500; // times the attempt's number
+    TServerWatch watch;
+    const TRegisteredProvider provider(initialize);
     TCIMContext context;
     context["consumer"] = TCIMValue(consumer);
-    const auto manager = TRootObject::GetNamespaceProviderManager();
-    const auto provider = manager->GetNamespaceProvider("pegasus");
-    PrintInventory(*provider->AllocateNamespace(context, false, "root/cimv2"));
-    manager->UnregisterNamespaceProvider(provider);
+    std::random_device random;
+    for (int attempt = 1; attempt <= kAttempts; ++attempt) {
+        watch.Reset();
+        auto ns = provider->AllocateNamespace(context, false, "root/cimv2");
+        if (!watch.HasFailed()) {
+            PrintInventory(*ns);
+            return;
+        }
+        ns.reset();
+        clearNamespace();
+        std::uniform_int_distribution<int> pauseMs(0, attempt * kLongestPauseMs);
+        std::this_thread::sleep_for(std::chrono::milliseconds(pauseMs(random)));
+    }
+    throw std::runtime_error("cimserver did not start");
 }
 
 } // namespace
@@ -68,13 +137,11 @@ int main(int argc, char** argv)
         std::fprintf(stderr, "%s\n", argc == 2 ? ::dlerror() : "usage: tiny_host CONSUMER");
         return 2;
     }
-    typedef void (*TEntryPoint)();
     const auto initialize = reinterpret_cast<TEntryPoint>(::dlsym(plugin, kInitializeSymbol));
     const auto clearNamespace = reinterpret_cast<TEntryPoint>(::dlsym(plugin, kClearNamespaceSymbol));
     int status = 0;
     try {
-        initialize();
-        UseProvider(argv[1]);
+        UseProvider(initialize, clearNamespace, argv[1]);
     } catch (const std::exception& e) {
         std::fprintf(stderr, "tiny_host: %s\n", e.what());
         status = 1;

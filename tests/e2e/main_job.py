@@ -3,6 +3,7 @@
 Usage: main_job.py BUILD_DIRECTORY [CLASS[.TEST]...]
 """
 import glob
+import json
 import os
 import re
 import signal
@@ -95,6 +96,31 @@ class HealthyTree(TreeTest):
         self.assert_nothing_left()
 
 
+class TwoHosts(TreeTest):
+    """Two hosts choose the same port now and then; each must have its own machine's whole inventory all the same."""
+
+    def setUp(self):
+        super().setUp()
+        self.other = Tree(BUILD)
+        self.addCleanup(self.other.remove)
+
+    def test_at_the_same_moment(self):
+        hosts = [tree.start("inventory", "--format", "json") for tree in (self.tree, self.other)]
+        for host in hosts:
+            out, err = host.communicate(timeout=120)
+            self.assertEqual((host.returncode, err), (COMPLETE, ""))
+            self.assertEqual(len(instances(json.loads(out), "LNX_NetworkPort")), len(interfaces()))
+        self.assert_nothing_left()
+        self.assertEqual(self.other.leftovers(), [])
+
+    def test_another_server_on_the_port(self):
+        self.tree.take_first_port_with(self.other)
+        status, document, err = self.tree.inventory()
+        self.assertEqual((status, err), (COMPLETE, ""))
+        self.assertEqual(len(instances(document, "LNX_NetworkPort")), len(interfaces()))
+        self.assert_nothing_left()
+
+
 class Interrupted(TreeTest):
     def interrupt_once(self, condition, what):
         process = self.tree.start("inventory")
@@ -177,19 +203,34 @@ class VendorExample(TreeTest):
 class Consumer(TreeTest):
     """A host of its own project, built against the installed headers, runs the main job."""
 
-    def test_tiny_host(self):
+    def setUp(self):
+        super().setUp()
         build = self.tree.path("tiny-host")
         subprocess.run(["cmake", "-S", os.path.join(SOURCE, "tests", "consumer"), "-B", build, "-G", "Ninja",
                         f"-DCMAKE_PREFIX_PATH={self.tree.root}"], check=True, stdout=subprocess.DEVNULL, timeout=120)
         subprocess.run(["cmake", "--build", build], check=True, stdout=subprocess.DEVNULL, timeout=300)
         subprocess.run([self.tree.path("pegasus", "bin", "cimconfig"), "-s", f"consumer={self.tree.consumer}", "-p"],
                        check=True, stdout=subprocess.DEVNULL, timeout=60)
-        shown = subprocess.run([os.path.join(build, "tiny_host"), self.tree.consumer], cwd=self.tree.root,
-                               capture_output=True, text=True, timeout=120, check=False)
+
+    def run_host(self, consumer):
+        program = self.tree.path("tiny-host", "tiny_host")
+        return subprocess.run([program, consumer], cwd=self.tree.root, capture_output=True, text=True, timeout=120,
+                              check=False)
+
+    def test_counts_this_machine(self):
+        other = Tree(BUILD)
+        self.addCleanup(other.remove)
+        self.tree.take_first_port_with(other)
+        shown = self.run_host(self.tree.consumer)
         self.assertEqual(shown.returncode, 0, shown.stderr)
         counts = dict(line.rsplit(" ", 1) for line in shown.stdout.splitlines())
         self.assertEqual(int(counts["LNX_NetworkPort"]), len(interfaces()))
         self.assert_nothing_left()
+
+    def test_failed_allocation_ends_in_order(self):
+        shown = self.run_host("a name with blanks")
+        self.assertEqual(shown.returncode, 1, shown.stderr)
+        self.assertIn("tiny_host: ", shown.stderr)
 
 
 if __name__ == "__main__":

@@ -60,6 +60,23 @@ class Tree:
         status, out, err = self.run("inventory", "--format", "json", *arguments)
         return status, json.loads(out), err
 
+    def take_first_port_with(self, other):
+        """The first start of this tree's server fails, because the other tree's has taken the port."""
+        program = self.path("pegasus", "bin", "cimserver")
+        os.rename(program, program + ".real")
+        subprocess.run([other.path("pegasus", "bin", "cimconfig"), "-s", f"consumer={other.consumer}", "-p"], check=True,
+                       stdout=subprocess.DEVNULL)
+        with open(program, "w", encoding="ascii") as file:
+            file.write(f"""#!/bin/sh
+case "$1" in httpPort=*) if [ ! -e {self.root}/taken ]; then
+    touch {self.root}/taken
+    PEGASUS_HOME={other.path("pegasus")} {other.path("pegasus", "bin", "cimserver")} "$@"
+    exit 1
+fi ;; esac
+exec {program}.real "$@"
+""")
+        os.chmod(program, 0o755)
+
     def processes(self):
         """The ids of the processes that run a program of this tree."""
         found = []

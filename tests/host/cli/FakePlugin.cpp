@@ -1,7 +1,8 @@
 // A plug-in for the tests of vrxhost. It behaves well unless the host setting "fault" names how it is to misbehave;
 // what can only be wrong in the library itself is a macro:
 //   FAKE_WITHOUT_ENTRY_POINTS   there is nothing to call
-// Whatever is let go leaves a file "cleared" in the working directory, so that a test sees that the host did shut down.
+// A namespace that is cleared leaves a file "cleared" in the working directory, so that a test sees that the host did
+// shut down.
 #include "host/inmem/TInmemNamespace.h"
 #include "tests/host/support/FakeModel.h"
 
@@ -202,6 +203,19 @@ void LogLosses()
                               "/bin/sh", {}, output, 10);
 }
 
+// The first allocations, as many as the setting says, find that another server answers on the port.
+void MeetForeignServers()
+{
+    static int fgAllocations = 0;
+    std::ofstream("allocations") << ++fgAllocations;
+    if (fgAllocations <= std::atoi(TConfig::GetInstance()->getValue("foreign-servers").c_str())) {
+        std::string output;
+        TOSSpecific::SpawnProcess("cimserver", {"-c", "exit 1"}, "/bin/sh", {}, output, 10);
+        Log(ILogger::kInfo, "TPEGASUSNamespace::GetClass from Pegasus for: A returned exception: not this server's");
+    }
+    Log(ILogger::kInfo, "TPEGASUSNamespace::connect succeeded \n");
+}
+
 } // namespace
 
 class TPEGASUSNamespaceProvider : public INamespaceProvider
@@ -247,6 +261,7 @@ boost::shared_ptr<ICIMNamespace> TPEGASUSNamespaceProvider::AllocateNamespace(TC
                                                                               std::string) const
 {
     fNamespace = boost::make_shared<TFakeNamespace>();
+    MeetForeignServers();
     if (HasFault("throws-standard")) {
         throw std::runtime_error("out of luck");
     }

@@ -40,7 +40,7 @@ TEST_F(VrxhostProgram, InventoryAsTable)
 )");
     EXPECT_EQ(outcome.fErrorOutput, "");
     EXPECT_TRUE(IsCleared());
-    EXPECT_THAT(ReadFile(fRoot / "vrxhost.log"), HasSubstr("consumer quvex"));
+    EXPECT_THAT(ReadFile(fRoot / "vrxhost.log"), HasSubstr("consumer vrxhost-"));
 }
 
 TEST_F(VrxhostProgram, InstancesAsJsonWithTrueTypes)
@@ -223,8 +223,8 @@ TEST_F(VrxhostProgram, SettingsFileAndLogFile)
                                 fRoot / "other.log", "-v"});
     EXPECT_TRUE(HasStatus(outcome, 0));
     EXPECT_THAT(outcome.fOutput, HasSubstr("Fake_Many: 2 instances"));
-    EXPECT_THAT(outcome.fErrorOutput, HasSubstr("consumer quvex")) << "-v shows the log";
-    EXPECT_THAT(ReadFile(fRoot / "other.log"), HasSubstr("consumer quvex"));
+    EXPECT_THAT(outcome.fErrorOutput, HasSubstr("consumer vrxhost-")) << "-v shows the log";
+    EXPECT_THAT(ReadFile(fRoot / "other.log"), HasSubstr("consumer vrxhost-"));
     EXPECT_FALSE(fs::exists(fRoot / "vrxhost.log"));
     std::ofstream(fRoot / "vrx.conf") << "no equals sign";
     const auto bad = Run({"providers"});
@@ -247,6 +247,35 @@ TEST_F(VrxhostProgram, ConsumerIsPlannedBeforeTheNamespaceIsOpened)
     EXPECT_EQ(refused.fErrorOutput,
               "vrxhost: the consumer me could not be set, cimconfig: exit status 1: no such property\n\n");
     EXPECT_TRUE(HasStatus(Run({"providers"}), 0)) << "without a name of its own a host takes what the server has";
+}
+
+// Another tree's server must not be found by this tree's start file.
+TEST_F(VrxhostProgram, DefaultConsumerIsMadeOfTheRootUnlessTheServerIsAnInstalledOne)
+{
+    const auto consumer = [this](const fs::path& root) {
+        EXPECT_TRUE(HasStatus(Start({VRXHOST, "--root", root, "--plugin", FAKE_PLUGIN, "providers"}), 0));
+        const std::string log = ReadFile(root / "vrxhost.log");
+        const std::size_t at = log.find("consumer ");
+        return log.substr(at, log.find('\n', at) - at);
+    };
+    const std::string first = consumer(fRoot);
+    EXPECT_EQ(first, consumer(fRoot));
+    fs::copy(fRoot, fFolder / "copy", fs::copy_options::recursive);
+    EXPECT_NE(first, consumer(fFolder / "copy"));
+    std::ofstream(fRoot / "pegasus/tree.conf") << "format = 1\nserver = installed OpenPegasus\n";
+    EXPECT_EQ(consumer(fRoot), "consumer quvex");
+}
+
+TEST_F(VrxhostProgram, StartsOverWhenAnotherServerTookThePort)
+{
+    const auto healed = Run({"providers", "--format", "json", "--set", "foreign-servers=2"});
+    EXPECT_TRUE(HasStatus(healed, 0));
+    EXPECT_TRUE(nlohmann::json::parse(healed.fOutput)["complete"]) << "losses of the attempts before do not count";
+    EXPECT_EQ(ReadFile(fRoot / "allocations"), "3");
+    const auto failed = Run({"providers", "--set", "foreign-servers=9"});
+    EXPECT_TRUE(HasStatus(failed, 1));
+    EXPECT_EQ(ReadFile(fRoot / "allocations"), "3");
+    EXPECT_THAT(failed.fErrorOutput, HasSubstr("the server did not start, cimserver: exit status 1"));
 }
 
 TEST_F(VrxhostProgram, InterruptionEndsWaitingProgramsAndEnumerations)
