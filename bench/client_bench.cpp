@@ -52,7 +52,7 @@ struct TCost
     double cpu = 1e300;
     double wall = 1e300;
 
-    template <class Work> void measure(Work&& work)
+    template <typename Work> void measure(Work&& work)
     {
         const double cpuStart = threadCpuSeconds();
         const double wallStart = wallSeconds();

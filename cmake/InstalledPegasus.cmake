@@ -12,13 +12,13 @@ target_include_directories(pegasus_client SYSTEM INTERFACE ${PEGASUS_INCLUDE_DIR
 target_compile_definitions(pegasus_client INTERFACE PEGASUS_PLATFORM_LINUX_X86_64_GNU)
 target_link_libraries(pegasus_client INTERFACE ${PEGASUS_pegclient_LIBRARY} ${PEGASUS_pegcommon_LIBRARY})
 
-# The staged tree is complete in itself as far as programs go; the libraries stay where they are installed.
+# The programs are copied into the staged tree; the libraries stay where they are installed.
 set(CMAKE_INSTALL_RPATH_USE_LINK_PATH TRUE PARENT_SCOPE)
 foreach(program cimserver cimmof cimconfig cimprovagt)
   find_program(PEGASUS_${program} ${program} HINTS ${PEGASUS_ROOT}/bin ${PEGASUS_ROOT}/sbin NO_DEFAULT_PATH)
   if(PEGASUS_${program})
     install(PROGRAMS ${PEGASUS_${program}} DESTINATION ${VRX_DEST_PEGASUS_BIN})
-  elseif(NOT program STREQUAL cimprovagt) # agents are a choice of how it was built
+  elseif(NOT program STREQUAL cimprovagt) # only some builds of OpenPegasus have it
     message(FATAL_ERROR "${PEGASUS_ROOT} holds no program ${program}")
   endif()
 endforeach()

@@ -1,4 +1,4 @@
-# Compiler settings that every target of ours shares, and the shape of the staged tree.
+# Compiler settings that all targets share, and the folders of the staged tree.
 include(GNUInstallDirs)
 
 set(CMAKE_CXX_STANDARD 17)
@@ -21,19 +21,19 @@ if(VRX_CCACHE AND NOT CMAKE_CXX_COMPILER_LAUNCHER)
   set(CMAKE_CXX_COMPILER_LAUNCHER ${VRX_CCACHE})
 endif()
 
-# Warnings are errors in our own code; link against vrx_warnings (PRIVATE) to get them.
+# Warnings, as errors: a target of ours links vrx_warnings (PRIVATE).
 add_library(vrx_warnings INTERFACE)
 target_compile_options(vrx_warnings INTERFACE
   -Wall -Wextra -Werror -Wshadow -Wconversion -Wformat=2
   $<$<COMPILE_LANGUAGE:CXX>:-Wnon-virtual-dtor -Woverloaded-virtual -Wold-style-cast>)
 target_compile_definitions(vrx_warnings INTERFACE _GNU_SOURCE)
-# GCC's flow analysis loses its way in code that the sanitizers have instrumented (Boost's headers above all).
+# GCC's flow analysis gives false warnings in code that the sanitizers have instrumented, mostly in Boost's headers.
 if(CMAKE_CXX_FLAGS MATCHES "-fsanitize" AND CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
   target_compile_options(vrx_warnings INTERFACE -Wno-maybe-uninitialized)
 endif()
 
-# A library or program of ours: warnings on, undefined symbols are link errors
-# (sanitizer runtimes live in the executable, so not under a sanitizer).
+# A library or program of ours: undefined symbols are link errors. Under a sanitizer they are allowed, because the
+# sanitizer's runtime is in the executable.
 add_library(vrx_strict_link INTERFACE)
 if(NOT CMAKE_CXX_FLAGS MATCHES "-fsanitize")
   target_link_options(vrx_strict_link INTERFACE -Wl,-z,defs)

@@ -1,5 +1,5 @@
-// Stands in for the fuzzing engine where the compiler has none: feeds each file named on the command line, or each in a
-// folder, to the target once. ctest replays the seeds and old crashes with it.
+// Replaces the fuzzing engine in builds that lack it: feeds each file that the command line names, or that lies in a
+// named folder, to the target once. ctest replays the seeds and old crashes with it.
 #include <cstdint>
 #include <cstdio>
 #include <filesystem>

@@ -7,7 +7,7 @@
 
 namespace test {
 
-// Decodes an answer's content element, whatever it is, and appends it encoded again: text that stands for the object.
+// Decodes a content element of an answer, of any kind, and appends the object's encoding to `out`.
 inline void encodeAgain(const Pegasus::wire::XmlElement& element, Pegasus::wire::ElementDecoder& decoder,
                         std::string& out)
 {

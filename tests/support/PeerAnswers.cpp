@@ -41,7 +41,7 @@ std::string response(const char* element, const PeerRequest& request, const std:
     return message(request, "<" + name + " NAME=\"" + request.method() + "\">\n" + content + "</" + name + ">\n");
 }
 
-// An error's text: control characters and other than ASCII as escapes.
+// An error's text, with escapes for control characters and everything beyond ASCII.
 std::string fieldText(const std::string& text)
 {
     std::string out;

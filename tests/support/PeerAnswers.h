@@ -20,9 +20,9 @@ namespace test {
 
 // 200 with a content-length.
 PeerAnswer httpAnswer(const std::string& body);
-// 200 in chunks of at most `chunkBytes`, with `trailer` ("Name: value\r\n" lines) behind them.
+// 200 in chunks of at most `chunkBytes`, followed by `trailer` ("Name: value\r\n" lines).
 PeerAnswer chunkedAnswer(const std::string& body, std::size_t chunkBytes, const std::string& trailer = std::string());
-// Another status than 200; `fields` are whole header lines.
+// A status other than 200; `fields` are whole header lines.
 PeerAnswer httpErrorAnswer(unsigned status, const std::string& reason, const std::string& fields = std::string());
 
 // ---- CIM-XML that answers a request
@@ -39,8 +39,8 @@ PeerAnswer instancesAnswer(const PeerRequest& request, const std::vector<Pegasus
 PeerAnswer qualifierAnswer(const PeerRequest& request, const Pegasus::CIMQualifierDecl& declaration);
 PeerAnswer methodAnswer(const PeerRequest& request, const Pegasus::CIMValue& returnValue,
                         const std::vector<Pegasus::CIMParamValue>& outputs = {});
-// A CIM error, in the body and with a content-length; or in the trailer behind an empty answer, as servers send it to
-// a client that asks for trailers.
+// A CIM error: in the body, with a content-length; or in the trailer after an empty body, as servers send it to a
+// client that asks for trailers.
 PeerAnswer errorAnswer(const PeerRequest& request, unsigned code, const std::string& description);
 PeerAnswer trailerErrorAnswer(const PeerRequest& request, unsigned code, const std::string& description);
 
@@ -51,26 +51,26 @@ PeerAnswer inPieces(PeerAnswer answer, std::size_t pieceBytes, std::chrono::mill
 PeerAnswer cutAt(PeerAnswer answer, std::size_t bytes);
 // A content-length that is `difference` off; then the connection is closed.
 PeerAnswer withWrongLength(const PeerAnswer& answer, int difference);
-// Every `from` in the answer replaced; the content-length is not adjusted, so keep the size for bodies.
+// Every `from` in the answer replaced. The content-length stays, so a replacement in a body must keep the size.
 PeerAnswer withReplaced(PeerAnswer answer, const std::string& from, const std::string& to);
 PeerAnswer noAnswer();
 PeerAnswer closedConnection();
 PeerAnswer notHttp();
 
-// A server made of objects: what is not in it is answered with the CIM status that a server would send.
-// Requires: filled before the peer starts, or only changed between requests.
+// Answers from the objects that it holds; a request for any other object gets the CIM status that a server would send.
+// Requires: it is filled before the peer starts, and changed between requests only.
 class ServedModel
 {
   public:
     using Method = std::function<PeerAnswer(const PeerRequest&)>;
 
     ServedModel& addClass(const std::string& nameSpace, const Pegasus::CIMClass& cimClass);
-    // Under the instance's own class. Its path should have keys.
+    // Adds the instance to its class. Requires: its path has keys.
     ServedModel& addInstance(const std::string& nameSpace, const Pegasus::CIMInstance& instance);
     ServedModel& addQualifier(const std::string& nameSpace, const Pegasus::CIMQualifierDecl& declaration);
-    // An extrinsic method, whatever it is called on.
+    // An extrinsic method, for every object.
     ServedModel& addMethod(const std::string& name, Method method);
-    // Played instead of the next answers to `method` ("GetClass"), one for each request.
+    // Replaces one of the next answers to `method` ("GetClass"); several faults replace one answer each.
     ServedModel& addFault(const std::string& method, Method fault);
 
     PeerAnswer answer(const PeerRequest& request);

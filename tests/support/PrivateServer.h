@@ -9,25 +9,26 @@
 
 namespace test {
 
-// A real cimserver in a temporary tree of its own, with a consumer name and a port of its own; stopped and removed at
-// the end. The programs come from the build tree.
+// A real cimserver with its own temporary tree, consumer name and port. The destructor stops it and removes the tree.
+// The programs come from the build tree.
 class PrivateServer
 {
   public:
-    // Creates the tree. Throws std::runtime_error.
+    // Creates the tree. Throws: std::runtime_error.
     PrivateServer();
     ~PrivateServer();
     PrivateServer(const PrivateServer&) = delete;
     PrivateServer& operator=(const PrivateServer&) = delete;
 
-    // Throws std::runtime_error with the server's words if it does not start.
+    // Throws: std::runtime_error with the server's message when it fails to start.
     void start();
-    // In good order. Requires: the schema of root/PG_Internal is compiled. Throws std::runtime_error.
+    // Stops the server with "cimserver -s". Requires: the schema of root/PG_Internal is compiled.
+    // Throws: std::runtime_error.
     void stop();
-    // As a crash would; returns when the process is gone.
+    // Kills the server, as a crash would; returns when the process has ended.
     void kill();
 
-    // cimmof, cimconfig or cimserver with these arguments, in the tree's environment.
+    // Runs cimmof, cimconfig or cimserver in the tree's environment.
     ProgramResult run(const std::string& program, std::vector<std::string> arguments) const;
 
     const std::string& directory() const { return fDirectory; }  // of the whole tree

@@ -83,7 +83,7 @@ std::vector<char*> pointers(std::vector<std::string>& texts)
     return result;
 }
 
-// Later entries win for getenv() of the child only if the earlier ones are gone.
+// getenv() in the child finds the first entry of a name, so replaced entries are removed.
 std::vector<std::string> mergedEnvironment(const std::vector<std::string>& added)
 {
     std::vector<std::string> merged = added;

@@ -15,9 +15,10 @@ struct ProgramResult
     std::string err;
 };
 
-// Runs a program to its end. environment holds "NAME=value" entries that come on top of this process's own.
-// A daemon that the program leaves behind does not hold the call up, even if it keeps the output open.
-// Throws std::runtime_error if the program cannot be started or does not end in time (it is killed then).
+// Runs a program to its end. `environment` holds "NAME=value" entries that are added to this process's environment and
+// replace entries of the same name. The call returns when the program ends, even while a daemon that it started keeps
+// its output open.
+// Throws: std::runtime_error when the program cannot be started, or exceeds the limit and is killed.
 ProgramResult runProgram(const std::vector<std::string>& arguments, const std::vector<std::string>& environment,
                          std::chrono::milliseconds limit = std::chrono::seconds(60));
 

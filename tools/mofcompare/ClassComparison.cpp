@@ -16,7 +16,7 @@ std::string utf8(const CIMName& name)
     return name.isNull() ? std::string("(none)") : utf8(name.getString());
 }
 
-// Embedded objects are declared, and travel, as strings.
+// Embedded objects are declared and sent as strings.
 std::string shown(CIMType type)
 {
     const bool isEmbedded = type == CIMTYPE_OBJECT || type == CIMTYPE_INSTANCE;
@@ -29,7 +29,7 @@ std::string shown(const CIMValue& value)
            (value.isNull() ? "null" : "\"" + utf8(value.toString()) + "\"");
 }
 
-// The two flavors that every declaration decides; the rest is compared as it is.
+// The two flavors that every declaration decides.
 std::string shown(const CIMFlavor& flavor)
 {
     std::string text = flavor.hasFlavor(CIMFlavor::OVERRIDABLE) ? "overridable" : "not overridable";
@@ -49,7 +49,7 @@ class Comparison
 
   private:
     void expectEqual(const std::string& where, const std::string& source, const std::string& readBack);
-    template <class Owner> void compareQualifiers(const std::string& where, const Owner& source, const Owner& readBack);
+    template <typename Owner> void compareQualifiers(const std::string& where, const Owner& source, const Owner& readBack);
     void compareQualifier(const std::string& where, const CIMConstQualifier& source, const CIMConstQualifier& readBack);
     void compareProperty(const std::string& where, const CIMConstProperty& source, const CIMConstProperty& readBack);
     void compareMethod(const std::string& where, const CIMConstMethod& source, const CIMConstMethod& readBack);
@@ -82,7 +82,7 @@ void Comparison::compareQualifier(const std::string& where, const CIMConstQualif
     expectEqual(where, shown(flavorOf(source)), shown(readBack.getFlavor()));
 }
 
-template <class Owner>
+template <typename Owner>
 void Comparison::compareQualifiers(const std::string& where, const Owner& source, const Owner& readBack)
 {
     expectEqual(where + " qualifiers", std::to_string(source.getQualifierCount()),

@@ -9,12 +9,12 @@
 
 namespace mofcompare {
 
-// Looks up the declaration of a qualifier in the source. Returns false if there is none.
+// Looks up the declaration of a qualifier in the source. Returns: whether the source has one.
 using Declarations = std::function<bool(const Pegasus::CIMName& name, Pegasus::CIMQualifierDecl& declaration)>;
 
-// What differs between a class as its source declares it and the local part of the class as a server gives it back:
-// one line each, beginning with the element. Names, order, types, values, qualifiers and their flavors all count;
-// a use without flavors in the source has those of its declaration.
+// Returns: the differences between a class in its source and the local part of the class that a server returns, one
+// line each, beginning with the element. It compares names, order, types, values, qualifiers and their flavors; a use
+// without flavors in the source has those of its declaration.
 std::vector<std::string> differences(const Pegasus::CIMConstClass& source, const Pegasus::CIMConstClass& readBack,
                                      const Declarations& declarations);
 

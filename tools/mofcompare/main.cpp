@@ -12,7 +12,7 @@
 //   mofcompare NAMESPACE FILE          through the server's local socket below $PEGASUS_HOME
 //   mofcompare NAMESPACE FILE PORT     through 127.0.0.1:PORT
 //
-// Exit status: 0 all equal, 1 differences (one line each on standard output), 2 it could not be done.
+// Exit status: 0 all equal, 1 differences (one line each on standard output), 2 the comparison failed.
 
 using namespace Pegasus;
 
