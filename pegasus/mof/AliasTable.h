@@ -1,5 +1,7 @@
 #pragma once
 
+#include "pegasus/base/AsciiCase.h"
+
 #include <Pegasus/Common/CIMObjectPath.h>
 
 #include <map>
@@ -7,17 +9,26 @@
 
 namespace Pegasus::mof {
 
-// The instance (or class) paths that the aliases of one compilation stand for. Names ignore letter case.
+// The instance (or class) paths for which the aliases of one compilation stand. Names match without regard to case.
 class AliasTable
 {
   public:
-    // Null if the alias is not defined (yet).
-    const CIMObjectPath* find(const std::string& name) const;
-    // Returns false if the name is taken.
-    bool define(const std::string& name, const CIMObjectPath& path);
+    // Returns: the path, or null when the alias is not defined (yet).
+    // Ownership: the table's; the path stays valid as long as the table.
+    const CIMObjectPath* find(const std::string& name) const
+    {
+        const auto found = fPaths.find(base::foldCase(name));
+        return found == fPaths.end() ? nullptr : &found->second;
+    }
+
+    // Returns: false when the name is defined already; that definition stays.
+    bool define(const std::string& name, const CIMObjectPath& path)
+    {
+        return fPaths.emplace(base::foldCase(name), path).second;
+    }
 
   private:
-    std::map<std::string, CIMObjectPath> fPaths;
+    std::map<std::string, CIMObjectPath> fPaths; // by folded name
 };
 
 } // namespace Pegasus::mof

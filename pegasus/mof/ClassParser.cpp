@@ -1,25 +1,17 @@
 #include "pegasus/mof/ClassParser.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/mof/DataType.h"
 #include "pegasus/mof/ValueBuilder.h"
 
 namespace Pegasus::mof {
-
-namespace {
-
-std::string utf8(const CIMName& name)
-{
-    return std::string(name.getString().getCString());
-}
-
-} // namespace
 
 ParsedClass ClassParser::parse(const Qualifiers& qualifiers)
 {
     ParsedClass parsed;
     const CIMName name = parseName(fCursor, "a class name");
     if (fCursor.skipWord("as")) {
-        parsed.alias = fCursor.expect(TokenKind::Alias, "an alias").text;
+        parsed.alias = fCursor.expect(TokenKind::kAlias, "an alias").text;
     }
     CIMName superClass;
     if (fCursor.skipPunctuation(':')) {
@@ -83,7 +75,7 @@ CIMMethod ClassParser::parseMethod(const CIMName& name, CIMType type)
             const std::size_t offset = fCursor.current().offset;
             const CIMParameter parameter = parseParameter();
             if (method.findParameter(parameter.getName()) != PEG_NOT_FOUND) {
-                fCursor.failAt(offset, "parameter " + utf8(parameter.getName()) + " is given twice");
+                fCursor.failAt(offset, "parameter " + base::utf8(parameter.getName()) + " is given twice");
             }
             method.addParameter(parameter);
         } while (fCursor.skipPunctuation(','));
@@ -114,16 +106,16 @@ void ClassParser::addProperty(CIMClass& owner, const CIMProperty& property, std:
     if (owner.findProperty(property.getName()) == PEG_NOT_FOUND) {
         owner.addProperty(property);
     } else {
-        fCompilation.handler.warn(fCursor.place(offset).text(), "Property " + utf8(property.getName()) +
+        fCompilation.handler.warn(fCursor.place(offset).text(), "Property " + base::utf8(property.getName()) +
                                                                     " already exists in class " +
-                                                                    utf8(owner.getClassName()));
+                                                                    base::utf8(owner.getClassName()));
     }
 }
 
 void ClassParser::addMethod(CIMClass& owner, const CIMMethod& method, std::size_t offset)
 {
     if (owner.findMethod(method.getName()) != PEG_NOT_FOUND) {
-        fCursor.failAt(offset, "method " + utf8(method.getName()) + " is given twice");
+        fCursor.failAt(offset, "method " + base::utf8(method.getName()) + " is given twice");
     }
     owner.addMethod(method);
 }

@@ -9,7 +9,7 @@
 namespace Pegasus::mof {
 
 // Bounds on what a file may demand; each violation is an error at its place that names the limit.
-struct Limits
+struct CompileLimits
 {
     std::size_t fileBytes = 64u << 20;     // one source file
     std::size_t includeDepth = 32;         // files within files
@@ -25,7 +25,7 @@ struct CompileOptions
     CIMNamespaceName nameSpace;                  // target until a `#pragma namespace` names another
     std::vector<std::string> includeDirectories; // searched last, in this order
     bool allowExperimental = false;              // otherwise a class with a true Experimental is skipped with a warning
-    Limits limits = {};
+    CompileLimits limits = {};
 };
 
 // Compiles one MOF file (DSP0004 v2) and what it includes, definition by definition, into a handler.

@@ -43,7 +43,7 @@ void parseArraySuffix(TokenCursor& cursor, ValueType& type)
     if (cursor.skipPunctuation(']')) {
         return;
     }
-    const Token size = cursor.expect(TokenKind::Integer, "an array size or ']'");
+    const Token size = cursor.expect(TokenKind::kInteger, "an array size or ']'");
     const char* end = size.text.data() + size.text.size();
     const auto [stop, error] = std::from_chars(size.text.data(), end, type.arraySize);
     if (error != std::errc() || stop != end || type.arraySize == 0) {
@@ -63,7 +63,7 @@ ValueType parseElementType(TokenCursor& cursor, CIMName& referenceClass)
         cursor.take();
         return type;
     }
-    const Token word = cursor.expect(TokenKind::Identifier, "a type");
+    const Token word = cursor.expect(TokenKind::kIdentifier, "a type");
     if (!cursor.skipWord("ref")) {
         cursor.failAt(word.offset, "unknown type " + word.shown());
     }
@@ -74,7 +74,7 @@ ValueType parseElementType(TokenCursor& cursor, CIMName& referenceClass)
 
 CIMName parseName(TokenCursor& cursor, std::string_view what)
 {
-    return CIMName(cursor.expect(TokenKind::Identifier, what).text.c_str());
+    return CIMName(cursor.expect(TokenKind::kIdentifier, what).text.c_str());
 }
 
 } // namespace Pegasus::mof

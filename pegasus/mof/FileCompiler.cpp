@@ -1,7 +1,7 @@
 #include "pegasus/mof/FileCompiler.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/mof/ClassParser.h"
-#include "pegasus/mof/IncludeSearch.h"
 #include "pegasus/mof/InstanceParser.h"
 #include "pegasus/mof/ValueBuilder.h"
 
@@ -11,12 +11,7 @@ namespace Pegasus::mof {
 
 namespace {
 
-std::string utf8(const String& text)
-{
-    return std::string(text.getCString());
-}
-
-template <class T> bool qualifierValue(const CIMConstClass& owner, const char* name, T& value)
+template <typename T> bool qualifierValue(const CIMConstClass& owner, const char* name, T& value)
 {
     const Uint32 index = owner.findQualifier(CIMName(name));
     if (index == PEG_NOT_FOUND) {
@@ -55,19 +50,19 @@ FileCompiler::FileCompiler(const SourceText& source, Compilation& compilation)
 
 void FileCompiler::run()
 {
-    while (fCursor.current().kind != TokenKind::End) {
+    while (fCursor.current().kind != TokenKind::kEnd) {
         fSubject = fCursor.current().offset;
         try {
             definition();
         } catch (const Exception& error) {
-            fCursor.failAt(fSubject, utf8(error.getMessage()));
+            fCursor.failAt(fSubject, base::utf8(error.getMessage()));
         }
     }
 }
 
 void FileCompiler::definition()
 {
-    if (fCursor.current().kind == TokenKind::Pragma) {
+    if (fCursor.current().kind == TokenKind::kPragma) {
         obeyPragma();
         return;
     }
@@ -89,7 +84,7 @@ void FileCompiler::defineClass(const Qualifiers& qualifiers)
     const ParsedClass parsed = ClassParser(fCursor, fCompilation).parse(qualifiers);
     const CIMName name = parsed.itsClass.getClassName();
     if (isWelcome(parsed.itsClass) && !fCompilation.handler.createClass(parsed.itsClass)) {
-        warn("Class " + utf8(name.getString()) + " already exists in the repository");
+        warn("Class " + base::utf8(name.getString()) + " already exists in the repository");
     }
     if (!parsed.alias.empty() &&
         !fCompilation.aliases.define(parsed.alias, CIMObjectPath(String(), CIMNamespaceName(), name)))
@@ -101,7 +96,8 @@ void FileCompiler::defineClass(const Qualifiers& qualifiers)
 // Classes with a true Experimental or a malformed Version are left out with a warning, as OpenPegasus's compiler does.
 bool FileCompiler::isWelcome(const CIMClass& newClass)
 {
-    const std::string start = "Class " + utf8(newClass.getClassName().getString()) + " was not added or updated: ";
+    const std::string start =
+        "Class " + base::utf8(newClass.getClassName().getString()) + " was not added or updated: ";
     Boolean isExperimental = false;
     if (!fCompilation.options.allowExperimental && qualifierValue(newClass, "Experimental", isExperimental) &&
         isExperimental)
@@ -110,7 +106,7 @@ bool FileCompiler::isWelcome(const CIMClass& newClass)
         return false;
     }
     String version;
-    if (qualifierValue(newClass, "Version", version) && !isVersion(utf8(version))) {
+    if (qualifierValue(newClass, "Version", version) && !isVersion(base::utf8(version))) {
         warn(start + "Invalid version format in mof class or repository class (valid format is m.n.u)");
         return false;
     }
@@ -134,9 +130,9 @@ void FileCompiler::defineQualifier(const Qualifiers& qualifiers)
 void FileCompiler::obeyPragma()
 {
     fCursor.take();
-    const Token name = fCursor.expect(TokenKind::Identifier, "a pragma name");
+    const Token name = fCursor.expect(TokenKind::kIdentifier, "a pragma name");
     fCursor.expectPunctuation('(');
-    const Token parameter = fCursor.expect(TokenKind::String, "a string");
+    const Token parameter = fCursor.expect(TokenKind::kString, "a string");
     fSubject = parameter.offset;
     fCursor.expectPunctuation(')');
     if (name.isWord("include")) {
@@ -150,7 +146,7 @@ void FileCompiler::obeyPragma()
 
 void FileCompiler::include(const std::string& name)
 {
-    const Limits& limits = fCompilation.options.limits;
+    const CompileLimits& limits = fCompilation.options.limits;
     if (fCompilation.includeDepth == limits.includeDepth) {
         fCursor.failAt(fSubject, "include is nested deeper than the limit includeDepth (" +
                                      std::to_string(limits.includeDepth) + ")");

@@ -1,5 +1,6 @@
 #include "pegasus/mof/InstanceParser.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/mof/ValueBuilder.h"
 
 #include <Pegasus/Common/CIMObject.h>
@@ -43,7 +44,7 @@ ParsedInstance InstanceParser::parse()
     parsed.itsClass = parseClass();
     parsed.instance = CIMInstance(parsed.itsClass.getClassName());
     if (fCursor.skipWord("as")) {
-        parsed.alias = fCursor.expect(TokenKind::Alias, "an alias").text;
+        parsed.alias = fCursor.expect(TokenKind::kAlias, "an alias").text;
     }
     fCursor.expectPunctuation('{');
     while (!fCursor.skipPunctuation('}')) {
@@ -55,11 +56,11 @@ ParsedInstance InstanceParser::parse()
 
 CIMClass InstanceParser::parseClass()
 {
-    const Token name = fCursor.expect(TokenKind::Identifier, "a class name");
+    const Token name = fCursor.expect(TokenKind::kIdentifier, "a class name");
     CIMClass found;
     if (!fCompilation.handler.findClass(CIMName(name.text.c_str()), found)) {
         fCursor.failAt(name.offset, "Error getting class " + name.text + " from namespace " +
-                                        std::string(fCompilation.nameSpace.getString().getCString()) +
+                                        base::utf8(fCompilation.nameSpace.getString()) +
                                         ": CIM_ERR_NOT_FOUND: " + name.text);
     }
     return found;
@@ -69,12 +70,12 @@ CIMClass InstanceParser::parseClass()
 void InstanceParser::parseValue(ParsedInstance& parsed)
 {
     fQualifiers.parseList();
-    const Token word = fCursor.expect(TokenKind::Identifier, "a property name");
+    const Token word = fCursor.expect(TokenKind::kIdentifier, "a property name");
     const CIMConstClass itsClass = parsed.itsClass;
     const Uint32 index = itsClass.findProperty(CIMName(word.text.c_str()));
     if (index == PEG_NOT_FOUND) {
-        fCursor.failAt(word.offset, "class " + std::string(itsClass.getClassName().getString().getCString()) +
-                                        " has no such property: " + word.text);
+        fCursor.failAt(word.offset,
+                       "class " + base::utf8(itsClass.getClassName()) + " has no such property: " + word.text);
     }
     const CIMConstProperty declared = itsClass.getProperty(index);
     if (isGiven(parsed, declared.getName())) {
@@ -89,7 +90,7 @@ void InstanceParser::setValue(ParsedInstance& parsed, const CIMConstProperty& de
 {
     const Initializer initializer = parseInitializer(fCursor);
     const Literal& first = initializer.elements.front();
-    if (declared.getType() == CIMTYPE_REFERENCE && first.kind == Literal::Kind::Alias &&
+    if (declared.getType() == CIMTYPE_REFERENCE && first.kind == Literal::Kind::kAlias &&
         !fCompilation.aliases.find(first.text))
     {
         parsed.open.push_back({declared.getName(), first.text, fCursor.place(first.offset)});
@@ -128,7 +129,7 @@ CIMValue InstanceParser::embeddedValue(const Initializer& initializer, const CIM
 // for the quotes within, so the length of a string bounds the depth.
 CIMInstance InstanceParser::parseEmbedded(const Literal& literal)
 {
-    if (literal.kind != Literal::Kind::String) {
+    if (literal.kind != Literal::Kind::kString) {
         fCursor.failAt(literal.offset, "expected a string with the MOF of an instance instead of " + literal.shown());
     }
     const SourceText text("embedded instance", literal.text);
@@ -141,7 +142,7 @@ CIMInstance InstanceParser::parseEmbedded(const Literal& literal)
         if (!parsed.alias.empty() || !parsed.open.empty()) {
             cursor.failAt(0, "an embedded instance has no alias and uses none that is not defined yet");
         }
-        if (cursor.current().kind != TokenKind::End) {
+        if (cursor.current().kind != TokenKind::kEnd) {
             cursor.failExpected("the end of the string");
         }
         return parsed.instance;

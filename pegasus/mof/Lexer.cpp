@@ -1,5 +1,8 @@
 #include "pegasus/mof/Lexer.h"
 
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/NumberText.h"
+
 #include <cstdio>
 #include <cstring>
 
@@ -9,16 +12,6 @@ namespace {
 
 constexpr char kByteOrderMark[] = "\xEF\xBB\xBF";
 
-bool isDigit(char c)
-{
-    return c >= '0' && c <= '9';
-}
-
-bool isHexDigit(char c)
-{
-    return isDigit(c) || (c >= 'a' && c <= 'f') || (c >= 'A' && c <= 'F');
-}
-
 bool startsName(char c)
 {
     return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_';
@@ -26,7 +19,7 @@ bool startsName(char c)
 
 bool continuesName(char c)
 {
-    return startsName(c) || isDigit(c);
+    return startsName(c) || base::isAsciiDigit(c);
 }
 
 bool isBlank(char c)
@@ -91,7 +84,8 @@ char simpleEscape(char letter)
 
 } // namespace
 
-Lexer::Lexer(const SourceText& source, const Limits& limits) : fSource(source), fText(source.text()), fLimits(limits)
+Lexer::Lexer(const SourceText& source, const CompileLimits& limits)
+    : fSource(source), fText(source.text()), fLimits(limits)
 {
     if (fText.compare(0, 3, kByteOrderMark) == 0) {
         fAt = 3;
@@ -102,13 +96,13 @@ Token Lexer::next()
 {
     skipBlanksAndComments();
     if (atEnd()) {
-        return Token{TokenKind::End, "", fAt};
+        return Token{TokenKind::kEnd, "", fAt};
     }
     const char c = peek();
     if (startsName(c)) {
-        return word(TokenKind::Identifier, fAt);
+        return word(TokenKind::kIdentifier, fAt);
     }
-    if (isDigit(c) || c == '+' || c == '-' || c == '.') {
+    if (base::isAsciiDigit(c) || c == '+' || c == '-' || c == '.') {
         return number();
     }
     if (c == '"') {
@@ -118,14 +112,14 @@ Token Lexer::next()
         return character();
     }
     if (c == '$' && startsName(peek(1))) {
-        return word(TokenKind::Alias, ++fAt - 1);
+        return word(TokenKind::kAlias, ++fAt - 1);
     }
     if (isPunctuation(c)) {
-        return Token{TokenKind::Punctuation, std::string(1, c), fAt++};
+        return Token{TokenKind::kPunctuation, std::string(1, c), fAt++};
     }
     if (c == '#') {
-        Token directive = word(TokenKind::Pragma, ++fAt - 1);
-        if (toLower(directive.text) == "pragma") {
+        Token directive = word(TokenKind::kPragma, ++fAt - 1);
+        if (base::equalNoCase(directive.text, "pragma")) {
             return directive;
         }
         fail(directive.offset, "unknown directive '#" + directive.text + "'");
@@ -190,12 +184,12 @@ Token Lexer::number()
     if (fAt - start > fLimits.tokenBytes) {
         fail(start, "number is longer than the limit tokenBytes (" + std::to_string(fLimits.tokenBytes) + ")");
     }
-    return Token{isReal ? TokenKind::Real : TokenKind::Integer, fText.substr(start, fAt - start), start};
+    return Token{isReal ? TokenKind::kReal : TokenKind::kInteger, fText.substr(start, fAt - start), start};
 }
 
 Token Lexer::strings()
 {
-    Token token{TokenKind::String, "", fAt};
+    Token token{TokenKind::kString, "", fAt};
     do {
         stringLiteral(token.text);
         if (token.text.size() > fLimits.stringBytes) {
@@ -246,8 +240,8 @@ void Lexer::hexEscape(std::string& value)
     fAt += 2;
     unsigned unit = 0;
     std::size_t digitCount = 0;
-    for (; digitCount < 4 && isHexDigit(peek()); ++digitCount, ++fAt) {
-        unit = unit * 16 + static_cast<unsigned>(std::stoi(std::string(1, peek()), nullptr, 16));
+    for (; digitCount < 4 && base::hexDigitValue(peek()) >= 0; ++digitCount, ++fAt) {
+        unit = unit * 16 + static_cast<unsigned>(base::hexDigitValue(peek()));
     }
     if (digitCount == 0) {
         fail(start, "\\x needs one to four hexadecimal digits");
@@ -260,7 +254,7 @@ void Lexer::hexEscape(std::string& value)
 
 Token Lexer::character()
 {
-    Token token{TokenKind::Character, "", fAt++};
+    Token token{TokenKind::kCharacter, "", fAt++};
     while (!atEnd() && peek() != '\'' && peek() != '\n') {
         if (peek() == '\\') {
             escape(token.text);

@@ -12,7 +12,7 @@ namespace Pegasus::mof {
 class Lexer
 {
   public:
-    Lexer(const SourceText& source, const Limits& limits);
+    Lexer(const SourceText& source, const CompileLimits& limits);
 
     // Throws MofError at the offending byte.
     Token next();
@@ -34,7 +34,7 @@ class Lexer
 
     const SourceText& fSource;
     const std::string& fText;
-    const Limits& fLimits;
+    const CompileLimits& fLimits;
     std::size_t fAt = 0;
 };
 

@@ -8,13 +8,13 @@ Literal keywordLiteral(TokenCursor& cursor)
 {
     const std::size_t offset = cursor.current().offset;
     if (cursor.skipWord("null")) {
-        return {Literal::Kind::Null, "", offset};
+        return {Literal::Kind::kNull, "", offset};
     }
     if (cursor.skipWord("true")) {
-        return {Literal::Kind::Boolean, "true", offset};
+        return {Literal::Kind::kBoolean, "true", offset};
     }
     if (cursor.skipWord("false")) {
-        return {Literal::Kind::Boolean, "false", offset};
+        return {Literal::Kind::kBoolean, "false", offset};
     }
     cursor.failExpected("a value");
 }
@@ -24,13 +24,13 @@ Literal keywordLiteral(TokenCursor& cursor)
 std::string Literal::shown() const
 {
     switch (kind) {
-    case Kind::Null:
+    case Kind::kNull:
         return "null";
-    case Kind::String:
+    case Kind::kString:
         return "a string";
-    case Kind::Character:
+    case Kind::kCharacter:
         return "a character";
-    case Kind::Alias:
+    case Kind::kAlias:
         return "$" + text;
     default:
         return text;
@@ -44,16 +44,16 @@ Literal parseLiteral(TokenCursor& cursor)
         return Literal{kind, std::move(token.text), token.offset};
     };
     switch (cursor.current().kind) {
-    case TokenKind::Integer:
-        return literal(Literal::Kind::Integer);
-    case TokenKind::Real:
-        return literal(Literal::Kind::Real);
-    case TokenKind::String:
-        return literal(Literal::Kind::String);
-    case TokenKind::Character:
-        return literal(Literal::Kind::Character);
-    case TokenKind::Alias:
-        return literal(Literal::Kind::Alias);
+    case TokenKind::kInteger:
+        return literal(Literal::Kind::kInteger);
+    case TokenKind::kReal:
+        return literal(Literal::Kind::kReal);
+    case TokenKind::kString:
+        return literal(Literal::Kind::kString);
+    case TokenKind::kCharacter:
+        return literal(Literal::Kind::kCharacter);
+    case TokenKind::kAlias:
+        return literal(Literal::Kind::kAlias);
     default:
         return keywordLiteral(cursor);
     }

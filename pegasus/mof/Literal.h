@@ -13,16 +13,16 @@ struct Literal
 {
     enum class Kind
     {
-        Null,
-        Boolean, // text: "true" or "false"
-        Integer,
-        Real,
-        String,
-        Character,
-        Alias
+        kNull,
+        kBoolean, // text: "true" or "false"
+        kInteger,
+        kReal,
+        kString,
+        kCharacter,
+        kAlias
     };
 
-    Kind kind = Kind::Null;
+    Kind kind = Kind::kNull;
     std::string text;
     std::size_t offset = 0;
 
@@ -37,7 +37,7 @@ struct Initializer
     std::vector<Literal> elements; // exactly one if it is no array
     std::size_t offset = 0;
 
-    bool isNull() const { return !isArray && elements.front().kind == Literal::Kind::Null; }
+    bool isNull() const { return !isArray && elements.front().kind == Literal::Kind::kNull; }
 };
 
 // Throw MofError.

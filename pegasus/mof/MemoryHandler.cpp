@@ -1,6 +1,7 @@
 #include "pegasus/mof/MemoryHandler.h"
 
-#include "pegasus/mof/Token.h"
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/Text.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -10,7 +11,7 @@ namespace {
 
 std::string keyOf(const CIMName& name)
 {
-    return toLower(std::string(name.getString().getCString()));
+    return base::foldCase(base::utf8(name));
 }
 
 void inheritProperties(CIMClass& whole, const CIMConstClass& superClass)

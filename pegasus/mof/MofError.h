@@ -41,8 +41,8 @@ class FileError : public std::runtime_error
   public:
     enum class Kind
     {
-        NotOpened,
-        NotReadable // a directory, too large, a device that fails
+        kNotOpened,
+        kNotReadable // a directory, too large, a device that fails
     };
 
     FileError(Kind kind, const std::string& text) : std::runtime_error(text), fKind(kind) {}

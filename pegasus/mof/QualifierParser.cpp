@@ -1,5 +1,6 @@
 #include "pegasus/mof/QualifierParser.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/mof/DataType.h"
 #include "pegasus/mof/ValueBuilder.h"
 
@@ -60,8 +61,7 @@ Qualifiers QualifierParser::parseList()
         }
         const CIMQualifier qualifier = parseUse();
         if (isAmong(list, qualifier.getName())) {
-            fCursor.failAt(offset, "qualifier " + std::string(qualifier.getName().getString().getCString()) +
-                                       " is given twice");
+            fCursor.failAt(offset, "qualifier " + base::utf8(qualifier.getName()) + " is given twice");
         }
         list.push_back(qualifier);
     } while (fCursor.skipPunctuation(','));
@@ -71,7 +71,7 @@ Qualifiers QualifierParser::parseList()
 
 CIMQualifier QualifierParser::parseUse()
 {
-    const Token name = fCursor.expect(TokenKind::Identifier, "a qualifier name");
+    const Token name = fCursor.expect(TokenKind::kIdentifier, "a qualifier name");
     const CIMQualifierDecl declaration = declarationOf(name);
     const CIMValue value = parseParameter(declaration);
     CIMFlavor flavor;
@@ -164,7 +164,7 @@ CIMFlavor QualifierParser::parseUseFlavors(CIMFlavor flavor)
         if (!applyFlavorWord(flavor)) {
             fCursor.failExpected("a flavor");
         }
-    } while (fCursor.current().kind == TokenKind::Identifier);
+    } while (fCursor.current().kind == TokenKind::kIdentifier);
     return flavor;
 }
 

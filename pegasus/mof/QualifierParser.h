@@ -37,7 +37,7 @@ class QualifierParser
 };
 
 // Adds a parsed list to a class, property, method or parameter.
-template <class Owner> void addQualifiers(Owner& owner, const Qualifiers& qualifiers)
+template <typename Owner> void addQualifiers(Owner& owner, const Qualifiers& qualifiers)
 {
     for (const CIMQualifier& qualifier : qualifiers) {
         owner.addQualifier(qualifier);

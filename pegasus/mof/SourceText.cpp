@@ -1,5 +1,7 @@
 #include "pegasus/mof/SourceText.h"
 
+#include "pegasus/base/Descriptor.h"
+
 #include <algorithm>
 #include <cerrno>
 #include <cstring>
@@ -14,25 +16,6 @@ namespace {
 
 // Long lines are cut for the diagnostic: a megabyte on one line helps nobody.
 constexpr std::size_t kShownLineBytes = 240;
-
-class Descriptor
-{
-  public:
-    explicit Descriptor(const std::string& path) : fDescriptor(::open(path.c_str(), O_RDONLY | O_CLOEXEC)) {}
-    ~Descriptor()
-    {
-        if (fDescriptor >= 0) {
-            ::close(fDescriptor);
-        }
-    }
-    Descriptor(const Descriptor&) = delete;
-    Descriptor& operator=(const Descriptor&) = delete;
-
-    int get() const noexcept { return fDescriptor; }
-
-  private:
-    int fDescriptor;
-};
 
 ssize_t readSome(int descriptor, char* buffer, std::size_t size)
 {
@@ -50,31 +33,37 @@ std::string readAll(int descriptor, const std::string& path, std::size_t maxByte
     for (;;) {
         const ssize_t count = readSome(descriptor, buffer, sizeof buffer);
         if (count < 0) {
-            throw FileError(FileError::Kind::NotReadable, "Can't read file " + path + ": " + std::strerror(errno));
+            throw FileError(FileError::Kind::kNotReadable, "Can't read file " + path + ": " + std::strerror(errno));
         }
         if (count == 0) {
             return text;
         }
         text.append(buffer, static_cast<std::size_t>(count));
         if (text.size() > maxBytes) {
-            throw FileError(FileError::Kind::NotReadable, "Can't read file " + path +
-                                                              ": larger than the limit fileBytes (" +
-                                                              std::to_string(maxBytes) + ")");
+            throw FileError(FileError::Kind::kNotReadable, "Can't read file " + path +
+                                                               ": larger than the limit fileBytes (" +
+                                                               std::to_string(maxBytes) + ")");
         }
     }
+}
+
+bool isFile(const std::string& path)
+{
+    struct stat status = {};
+    return ::stat(path.c_str(), &status) == 0 && !S_ISDIR(status.st_mode);
 }
 
 } // namespace
 
 SourceText SourceText::read(const std::string& path, std::size_t maxBytes)
 {
-    const Descriptor file(path);
+    const base::Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
     struct stat status = {};
-    if (file.get() < 0 || ::fstat(file.get(), &status) != 0) {
-        throw FileError(FileError::Kind::NotOpened, "Can't open file " + path);
+    if (!file || ::fstat(file.get(), &status) != 0) {
+        throw FileError(FileError::Kind::kNotOpened, "Can't open file " + path);
     }
     if (S_ISDIR(status.st_mode)) {
-        throw FileError(FileError::Kind::NotReadable, "Can't read file " + path + ": it is a directory");
+        throw FileError(FileError::Kind::kNotReadable, "Can't read file " + path + ": it is a directory");
     }
     return SourceText(path, readAll(file.get(), path, maxBytes));
 }
@@ -117,6 +106,27 @@ SourcePlace SourceText::place(std::size_t offset) const
 void SourceText::fail(std::size_t offset, const std::string& cause) const
 {
     throw MofError(place(offset), cause);
+}
+
+std::string findInclude(const std::string& name, const std::string& includingDirectory,
+                        const std::vector<std::string>& includeDirectories)
+{
+    const bool isAbsolute = !name.empty() && name[0] == '/';
+    if (!isAbsolute && isFile(includingDirectory + name)) {
+        return includingDirectory + name;
+    }
+    if (isFile(name)) {
+        return name;
+    }
+    if (isAbsolute) {
+        return "";
+    }
+    for (const std::string& directory : includeDirectories) {
+        if (isFile(directory + "/" + name)) {
+            return directory + "/" + name;
+        }
+    }
+    return "";
 }
 
 } // namespace Pegasus::mof

@@ -3,6 +3,7 @@
 #include "pegasus/mof/MofError.h"
 
 #include <string>
+#include <vector>
 
 namespace Pegasus::mof {
 
@@ -33,5 +34,11 @@ class SourceText
     mutable std::size_t fCountedOffset = 0; // up to here there are
     mutable std::size_t fCountedBreaks = 0; // so many line ends
 };
+
+// Finds an included file: the first that exists in the including file's directory (with its slash, or empty), the
+// current directory, and the include directories. An absolute name is taken as it is. Returns: its path; empty when
+// there is none.
+std::string findInclude(const std::string& name, const std::string& includingDirectory,
+                        const std::vector<std::string>& includeDirectories);
 
 } // namespace Pegasus::mof

@@ -1,6 +1,6 @@
 #include "pegasus/mof/Token.h"
 
-#include <algorithm>
+#include "pegasus/base/AsciiCase.h"
 
 namespace Pegasus::mof {
 
@@ -8,38 +8,25 @@ namespace {
 
 constexpr std::size_t kShownBytes = 40;
 
-char lower(char c)
-{
-    return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
-}
-
 } // namespace
 
-std::string toLower(std::string_view text)
+bool Token::isWord(std::string_view word) const
 {
-    std::string result(text);
-    std::transform(result.begin(), result.end(), result.begin(), lower);
-    return result;
-}
-
-bool Token::isWord(std::string_view lowerWord) const
-{
-    return kind == TokenKind::Identifier && text.size() == lowerWord.size() &&
-           std::equal(text.begin(), text.end(), lowerWord.begin(), [](char a, char b) { return lower(a) == b; });
+    return kind == TokenKind::kIdentifier && base::equalNoCase(text, word);
 }
 
 std::string Token::shown() const
 {
     switch (kind) {
-    case TokenKind::End:
+    case TokenKind::kEnd:
         return "end of file";
-    case TokenKind::Pragma:
+    case TokenKind::kPragma:
         return "'#pragma'";
-    case TokenKind::String:
+    case TokenKind::kString:
         return "a string";
-    case TokenKind::Character:
+    case TokenKind::kCharacter:
         return "a character";
-    case TokenKind::Alias:
+    case TokenKind::kAlias:
         return "'$" + text.substr(0, kShownBytes) + "'";
     default:
         return "'" + text.substr(0, kShownBytes) + "'";

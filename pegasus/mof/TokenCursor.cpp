@@ -4,7 +4,7 @@
 
 namespace Pegasus::mof {
 
-TokenCursor::TokenCursor(const SourceText& source, const Limits& limits)
+TokenCursor::TokenCursor(const SourceText& source, const CompileLimits& limits)
     : fSource(source), fLimits(limits), fLexer(source, limits)
 {
 }
@@ -34,9 +34,9 @@ bool TokenCursor::skipPunctuation(char sign)
     return true;
 }
 
-bool TokenCursor::skipWord(std::string_view lowerWord)
+bool TokenCursor::skipWord(std::string_view word)
 {
-    if (!atWord(lowerWord)) {
+    if (!atWord(word)) {
         return false;
     }
     take();

@@ -11,23 +11,23 @@ namespace Pegasus::mof {
 class TokenCursor
 {
   public:
-    TokenCursor(const SourceText& source, const Limits& limits);
+    TokenCursor(const SourceText& source, const CompileLimits& limits);
 
     const Token& current();
     // Returns the current token and moves on.
     Token take();
 
     bool atPunctuation(char sign) { return current().isPunctuation(sign); }
-    bool atWord(std::string_view lowerWord) { return current().isWord(lowerWord); }
+    bool atWord(std::string_view word) { return current().isWord(word); }
     // Moves on and returns true if the current token is this one.
     bool skipPunctuation(char sign);
-    bool skipWord(std::string_view lowerWord);
+    bool skipWord(std::string_view word);
 
     // Throw MofError "expected … instead of …" at the current token unless it is of this kind.
     void expectPunctuation(char sign);
     Token expect(TokenKind kind, std::string_view what);
 
-    const Limits& limits() const noexcept { return fLimits; }
+    const CompileLimits& limits() const noexcept { return fLimits; }
     SourcePlace place(std::size_t offset) const { return fSource.place(offset); }
     [[noreturn]] void fail(const std::string& cause) { fSource.fail(current().offset, cause); }
     [[noreturn]] void failAt(std::size_t offset, const std::string& cause) const { fSource.fail(offset, cause); }
@@ -35,7 +35,7 @@ class TokenCursor
 
   private:
     const SourceText& fSource;
-    const Limits& fLimits;
+    const CompileLimits& fLimits;
     Lexer fLexer;
     Token fCurrent;
     bool fIsCut = false; // fCurrent is the current token

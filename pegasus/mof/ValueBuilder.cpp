@@ -1,5 +1,7 @@
 #include "pegasus/mof/ValueBuilder.h"
 
+#include "pegasus/base/Text.h"
+
 #include <Pegasus/Common/CIMDateTime.h>
 #include <Pegasus/Common/Exception.h>
 
@@ -20,8 +22,8 @@ class Converter
     {
     }
 
-    template <class T> T integer(const Literal& literal) const;
-    template <class T> T real(const Literal& literal) const;
+    template <typename T> T integer(const Literal& literal) const;
+    template <typename T> T real(const Literal& literal) const;
     Boolean boolean(const Literal& literal) const;
     Char16 character(const Literal& literal) const;
     String string(const Literal& literal) const;
@@ -69,7 +71,7 @@ bool parseMagnitude(const std::string& text, std::size_t start, Uint64& magnitud
     return parseDigits(begin, end, hasZero ? 8 : 10, magnitude);
 }
 
-template <class T> bool fits(Uint64 magnitude, bool isNegative)
+template <typename T> bool fits(Uint64 magnitude, bool isNegative)
 {
     const auto most = static_cast<Uint64>(std::numeric_limits<T>::max());
     if (!isNegative) {
@@ -78,9 +80,9 @@ template <class T> bool fits(Uint64 magnitude, bool isNegative)
     return magnitude == 0 || (std::is_signed_v<T> && magnitude <= most + 1);
 }
 
-template <class T> T Converter::integer(const Literal& literal) const
+template <typename T> T Converter::integer(const Literal& literal) const
 {
-    require(literal, Literal::Kind::Integer);
+    require(literal, Literal::Kind::kInteger);
     const bool isNegative = literal.text[0] == '-';
     const bool hasSign = isNegative || literal.text[0] == '+';
     Uint64 magnitude = 0;
@@ -90,13 +92,13 @@ template <class T> T Converter::integer(const Literal& literal) const
     return static_cast<T>(isNegative ? Uint64(0) - magnitude : magnitude);
 }
 
-template <class T> T Converter::real(const Literal& literal) const
+template <typename T> T Converter::real(const Literal& literal) const
 {
-    if (literal.kind == Literal::Kind::Integer) {
+    if (literal.kind == Literal::Kind::kInteger) {
         return static_cast<T>(literal.text[0] == '-' ? static_cast<Real64>(integer<Sint64>(literal))
                                                      : static_cast<Real64>(integer<Uint64>(literal)));
     }
-    require(literal, Literal::Kind::Real);
+    require(literal, Literal::Kind::kReal);
     const char* begin = literal.text.data() + (literal.text[0] == '+' ? 1 : 0);
     const char* end = literal.text.data() + literal.text.size();
     T value = 0;
@@ -109,16 +111,16 @@ template <class T> T Converter::real(const Literal& literal) const
 
 Boolean Converter::boolean(const Literal& literal) const
 {
-    require(literal, Literal::Kind::Boolean);
+    require(literal, Literal::Kind::kBoolean);
     return literal.text == "true";
 }
 
 Char16 Converter::character(const Literal& literal) const
 {
-    if (literal.kind == Literal::Kind::Integer) {
+    if (literal.kind == Literal::Kind::kInteger) {
         return Char16(integer<Uint16>(literal));
     }
-    require(literal, Literal::Kind::Character);
+    require(literal, Literal::Kind::kCharacter);
     const String text = cimString(fCursor, literal.text, literal.offset);
     if (text.size() != 1) {
         invalid(literal);
@@ -128,7 +130,7 @@ Char16 Converter::character(const Literal& literal) const
 
 String Converter::string(const Literal& literal) const
 {
-    require(literal, Literal::Kind::String);
+    require(literal, Literal::Kind::kString);
     return cimString(fCursor, literal.text, literal.offset);
 }
 
@@ -138,13 +140,13 @@ CIMDateTime Converter::dateTime(const Literal& literal) const
         return CIMDateTime(string(literal));
     } catch (const Exception& error) {
         fCursor.failAt(literal.offset,
-                       "Invalid datetime value: " + literal.text + ": " + std::string(error.getMessage().getCString()));
+                       "Invalid datetime value: " + literal.text + ": " + base::utf8(error.getMessage()));
     }
 }
 
 CIMObjectPath Converter::reference(const Literal& literal) const
 {
-    if (literal.kind == Literal::Kind::Alias) {
+    if (literal.kind == Literal::Kind::kAlias) {
         const CIMObjectPath* path = fAliases.find(literal.text);
         if (!path) {
             fCursor.failAt(literal.offset, "alias $" + literal.text + " is not defined");
@@ -154,11 +156,11 @@ CIMObjectPath Converter::reference(const Literal& literal) const
     try {
         return CIMObjectPath(string(literal));
     } catch (const Exception& error) {
-        fCursor.failAt(literal.offset, "Invalid reference value: " + std::string(error.getMessage().getCString()));
+        fCursor.failAt(literal.offset, "Invalid reference value: " + base::utf8(error.getMessage()));
     }
 }
 
-template <class T, class Convert>
+template <typename T, typename Convert>
 CIMValue assemble(const TokenCursor& cursor, const Initializer& initializer, const Convert& convert)
 {
     if (!initializer.isArray) {
@@ -167,7 +169,7 @@ CIMValue assemble(const TokenCursor& cursor, const Initializer& initializer, con
     Array<T> values;
     values.reserveCapacity(static_cast<Uint32>(initializer.elements.size()));
     for (const Literal& literal : initializer.elements) {
-        if (literal.kind == Literal::Kind::Null) {
+        if (literal.kind == Literal::Kind::kNull) {
             cursor.failAt(literal.offset, "an array cannot hold null elements");
         }
         values.append(convert(literal));
@@ -191,13 +193,14 @@ void checkShape(const TokenCursor& cursor, const Initializer& initializer, const
     }
 }
 
-template <class T>
+template <typename T>
 CIMValue assembleInteger(const TokenCursor& cursor, const Initializer& initializer, const Converter& c)
 {
     return assemble<T>(cursor, initializer, [&c](const Literal& l) { return c.integer<T>(l); });
 }
 
-template <class T> CIMValue assembleReal(const TokenCursor& cursor, const Initializer& initializer, const Converter& c)
+template <typename T>
+CIMValue assembleReal(const TokenCursor& cursor, const Initializer& initializer, const Converter& c)
 {
     return assemble<T>(cursor, initializer, [&c](const Literal& l) { return c.real<T>(l); });
 }
@@ -259,9 +262,9 @@ CIMValue buildValue(const TokenCursor& cursor, const AliasTable& aliases, const 
 String cimString(const TokenCursor& cursor, const std::string& text, std::size_t offset)
 {
     try {
-        return String(text.data(), static_cast<Uint32>(text.size()));
+        return base::fromUtf8(text);
     } catch (const Exception& error) {
-        cursor.failAt(offset, std::string(error.getMessage().getCString()));
+        cursor.failAt(offset, base::utf8(error.getMessage()));
     }
 }
 

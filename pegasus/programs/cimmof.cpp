@@ -39,7 +39,7 @@ Status compileOne(const std::string& file, const mof::CompileOptions& options, m
         return kFailed;
     } catch (const mof::FileError& error) {
         std::cerr << error.what() << "\n";
-        return error.kind() == mof::FileError::Kind::NotOpened ? kNoFile : kUnreadableFile;
+        return error.kind() == mof::FileError::Kind::kNotOpened ? kNoFile : kUnreadableFile;
     } catch (const Exception& error) {
         std::cerr << file << ": error: " << utf8(error.getMessage()) << "\n";
         return kFailed;

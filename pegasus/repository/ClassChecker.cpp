@@ -1,5 +1,6 @@
 #include "pegasus/repository/ClassChecker.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
 #include "pegasus/repository/EmbeddedTypes.h"
 
@@ -111,7 +112,7 @@ CIMProperty Checker::checkProperty(const CIMConstProperty& property, bool isAsso
         fail(CIM_ERR_INVALID_PARAMETER, "Non-association class contains reference property");
     }
     if (property.isArray() && isTrue(property, kKey)) {
-        fail(CIM_ERR_INVALID_PARAMETER, "key property " + utf8(property.getName()) + " is an array");
+        fail(CIM_ERR_INVALID_PARAMETER, "key property " + base::utf8(property.getName()) + " is an array");
     }
     CIMProperty checked(property.getName(), embeddedValue(property), property.getArraySize(),
                         property.getReferenceClassName());

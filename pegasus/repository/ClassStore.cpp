@@ -1,5 +1,6 @@
 #include "pegasus/repository/ClassStore.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
 #include "pegasus/repository/ClassChecker.h"
 #include "pegasus/repository/ClassFilter.h"
@@ -38,7 +39,7 @@ CIMClass ClassStore::existing(NamespaceId nameSpace, const CIMName& name)
 {
     CIMClass whole = resolved(nameSpace, name);
     if (whole.isUninitialized()) {
-        fail(CIM_ERR_NOT_FOUND, utf8(name));
+        fail(CIM_ERR_NOT_FOUND, base::utf8(name));
     }
     return whole;
 }
@@ -62,16 +63,16 @@ std::shared_ptr<const std::string> ClassStore::text(NamespaceId nameSpace, const
 
 bool ClassStore::has(NamespaceId nameSpace, const CIMName& name)
 {
-    return fStorage.findSuperClass(nameSpace, utf8(name)).has_value();
+    return fStorage.findSuperClass(nameSpace, base::utf8(name)).has_value();
 }
 
 std::vector<CIMName> ClassStore::listNames(NamespaceId nameSpace, const CIMName& name, bool isDeep)
 {
     if (!name.isNull() && !has(nameSpace, name)) {
-        fail(CIM_ERR_INVALID_CLASS, utf8(name));
+        fail(CIM_ERR_INVALID_CLASS, base::utf8(name));
     }
     std::vector<CIMName> names;
-    for (const std::string& text : fStorage.listSubclasses(nameSpace, utf8(name), isDeep)) {
+    for (const std::string& text : fStorage.listSubclasses(nameSpace, base::utf8(name), isDeep)) {
         names.emplace_back(text.c_str());
     }
     return names;
@@ -80,13 +81,13 @@ std::vector<CIMName> ClassStore::listNames(NamespaceId nameSpace, const CIMName&
 void ClassStore::create(NamespaceId nameSpace, const CIMConstClass& newClass)
 {
     if (has(nameSpace, newClass.getClassName())) {
-        fail(CIM_ERR_ALREADY_EXISTS, utf8(newClass.getClassName()));
+        fail(CIM_ERR_ALREADY_EXISTS, base::utf8(newClass.getClassName()));
     }
     checkDepth(nameSpace, newClass);
     const CIMClass superClass = resolvedSuperClass(nameSpace, newClass);
     const CIMClass local = checkClass(newClass, superClass, fQualifiers.lookupIn(nameSpace));
     const std::string text = fCodec.encodeClass(local);
-    fStorage.insertClass(nameSpace, utf8(local.getClassName()), utf8(local.getSuperClassName()), text);
+    fStorage.insertClass(nameSpace, base::utf8(local.getClassName()), base::utf8(local.getSuperClassName()), text);
     // Into the cache at once: a compiler creates subclasses of it next.
     fCache.insert(nameSpace, nameKey(local.getClassName()), resolveClass(local, superClass));
 }
@@ -99,7 +100,7 @@ CIMClass ClassStore::resolvedSuperClass(NamespaceId nameSpace, const CIMConstCla
     }
     CIMClass superClass = resolved(nameSpace, superName);
     if (superClass.isUninitialized() || superName.equal(newClass.getClassName())) {
-        fail(CIM_ERR_INVALID_SUPERCLASS, utf8(superName));
+        fail(CIM_ERR_INVALID_SUPERCLASS, base::utf8(superName));
     }
     return superClass;
 }
@@ -107,7 +108,7 @@ CIMClass ClassStore::resolvedSuperClass(NamespaceId nameSpace, const CIMConstCla
 void ClassStore::checkDepth(NamespaceId nameSpace, const CIMConstClass& newClass)
 {
     std::size_t depth = 1;
-    std::string above = utf8(newClass.getSuperClassName());
+    std::string above = base::utf8(newClass.getSuperClassName());
     while (!above.empty()) {
         if (++depth > fLimits.inheritanceDepth) {
             fail(CIM_ERR_SERVER_LIMITS_EXCEEDED,

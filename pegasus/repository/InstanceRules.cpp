@@ -1,5 +1,6 @@
 #include "pegasus/repository/InstanceRules.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
 #include "pegasus/repository/ClassFilter.h"
 #include "pegasus/repository/EmbeddedTypes.h"
@@ -12,7 +13,7 @@ CIMConstProperty declaredProperty(const CIMConstClass& itsClass, const CIMName& 
 {
     const Uint32 index = itsClass.findProperty(name);
     if (index == PEG_NOT_FOUND) {
-        fail(CIM_ERR_FAILED, "no such property: " + utf8(name));
+        fail(CIM_ERR_FAILED, "no such property: " + base::utf8(name));
     }
     return itsClass.getProperty(index);
 }
@@ -38,7 +39,7 @@ CIMKeyBinding keyBinding(const CIMConstProperty& property)
     const CIMType type = value.getType();
     const bool isText = type == CIMTYPE_STRING || type == CIMTYPE_CHAR16 || type == CIMTYPE_DATETIME;
     if (value.isNull() && !isText) {
-        fail(CIM_ERR_INVALID_PARAMETER, "key property " + utf8(property.getName()) + " is null");
+        fail(CIM_ERR_INVALID_PARAMETER, "key property " + base::utf8(property.getName()) + " is null");
     }
     if (value.isNull()) {
         return CIMKeyBinding(property.getName(), String(), CIMKeyBinding::STRING);
@@ -51,7 +52,7 @@ CIMKeyBinding keyBinding(const CIMConstProperty& property)
 CIMInstance completeInstance(const CIMConstInstance& given, const CIMConstClass& itsClass)
 {
     if (itsClass.isAbstract()) {
-        fail(CIM_ERR_NOT_SUPPORTED, "abstract class cannot have instances: " + utf8(itsClass.getClassName()));
+        fail(CIM_ERR_NOT_SUPPORTED, "abstract class cannot have instances: " + base::utf8(itsClass.getClassName()));
     }
     CIMInstance completed(itsClass.getClassName());
     for (Uint32 i = 0; i < itsClass.getPropertyCount(); ++i) {
@@ -71,7 +72,7 @@ CIMObjectPath instancePath(const CIMConstInstance& completed, const CIMConstClas
     Array<CIMName> keyNames;
     itsClass.getKeyNames(keyNames);
     if (keyNames.size() == 0) {
-        fail(CIM_ERR_FAILED, "class has no keys: " + utf8(itsClass.getClassName()));
+        fail(CIM_ERR_FAILED, "class has no keys: " + base::utf8(itsClass.getClassName()));
     }
     Array<CIMKeyBinding> keys;
     for (Uint32 i = 0; i < keyNames.size(); ++i) {
@@ -89,7 +90,7 @@ void mergeValues(CIMInstance& stored, const CIMConstInstance& modified, const CI
         }
         const Uint32 index = stored.findProperty(property.getName());
         if (index == PEG_NOT_FOUND) {
-            fail(CIM_ERR_FAILED, "no such property: " + utf8(property.getName()));
+            fail(CIM_ERR_FAILED, "no such property: " + base::utf8(property.getName()));
         }
         CIMProperty target = stored.getProperty(index);
         if (property.getType() != target.getType() || property.isArray() != target.isArray()) {

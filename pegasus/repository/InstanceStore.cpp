@@ -1,5 +1,6 @@
 #include "pegasus/repository/InstanceStore.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
 #include "pegasus/repository/InstanceRules.h"
 #include "pegasus/repository/PathKey.h"
@@ -28,9 +29,9 @@ CIMObjectPath InstanceStore::create(NamespaceId nameSpace, const CIMConstInstanc
     CIMObjectPath path = instancePath(completed, itsClass);
     const std::string key = pathKey(path);
     if (fStorage.findInstance(nameSpace, key)) {
-        fail(CIM_ERR_ALREADY_EXISTS, utf8(path.toString()));
+        fail(CIM_ERR_ALREADY_EXISTS, base::utf8(path.toString()));
     }
-    fStorage.insertInstance(nameSpace, utf8(itsClass.getClassName()), key, fCodec.encodeInstance(completed));
+    fStorage.insertInstance(nameSpace, base::utf8(itsClass.getClassName()), key, fCodec.encodeInstance(completed));
     return path;
 }
 
@@ -63,7 +64,9 @@ std::vector<CIMInstance> InstanceStore::nextBatch(NamespaceId nameSpace, const C
 {
     const CIMClass itsClass = classOf(nameSpace, className);
     std::vector<CIMInstance> batch;
-    for (const InstanceRow& row : fStorage.listInstances(nameSpace, utf8(className), after, kBatchSize, kBatchBytes)) {
+    for (const InstanceRow& row :
+         fStorage.listInstances(nameSpace, base::utf8(className), after, kBatchSize, kBatchBytes))
+    {
         after = row.sequence;
         batch.push_back(withPath(nameSpace, row.body));
         filterInstance(batch.back(), options.deepInheritance ? CIMClass() : itsClass, options);
@@ -75,7 +78,7 @@ CIMClass InstanceStore::classOf(NamespaceId nameSpace, const CIMName& name)
 {
     CIMClass itsClass = fClasses.resolved(nameSpace, name);
     if (itsClass.isUninitialized()) {
-        fail(CIM_ERR_INVALID_CLASS, utf8(name));
+        fail(CIM_ERR_INVALID_CLASS, base::utf8(name));
     }
     return itsClass;
 }
@@ -85,7 +88,7 @@ InstanceRow InstanceStore::find(NamespaceId nameSpace, const CIMObjectPath& path
     classOf(nameSpace, path.getClassName());
     const std::optional<InstanceRow> row = fStorage.findInstance(nameSpace, pathKey(path));
     if (!row) {
-        fail(CIM_ERR_NOT_FOUND, utf8(withoutNamespace(path).toString()));
+        fail(CIM_ERR_NOT_FOUND, base::utf8(withoutNamespace(path).toString()));
     }
     return *row;
 }

@@ -1,6 +1,7 @@
 #pragma once
 
-#include "pegasus/repository/CimError.h"
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/Text.h"
 
 #include <Pegasus/Common/CIMName.h>
 
@@ -10,25 +11,15 @@
 // all spellings of a name.
 namespace Pegasus::repository {
 
-inline std::string foldCase(std::string text)
-{
-    for (char& c : text) {
-        if (c >= 'A' && c <= 'Z') {
-            c = static_cast<char>(c - 'A' + 'a');
-        }
-    }
-    return text;
-}
-
 // Returns: the key of a name; empty for a null name.
 inline std::string nameKey(const CIMName& name)
 {
-    return foldCase(utf8(name));
+    return base::foldCase(base::utf8(name));
 }
 
 inline std::string nameKey(const CIMNamespaceName& name)
 {
-    return foldCase(utf8(name.getString()));
+    return base::foldCase(base::utf8(name));
 }
 
 } // namespace Pegasus::repository

@@ -1,5 +1,6 @@
 #include "pegasus/repository/NamespaceTable.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
 #include "pegasus/repository/NameKey.h"
 
@@ -8,7 +9,7 @@ namespace Pegasus::repository {
 NamespaceTable::NamespaceTable(Storage& storage, std::size_t maxCount) : fStorage(storage), fMaxCount(maxCount)
 {
     for (const auto& [number, name] : fStorage.namespaces()) {
-        fIds[foldCase(name)] = number;
+        fIds[base::foldCase(name)] = number;
         fNames[number] = CIMNamespaceName(name.c_str());
     }
     const CIMNamespaceName root("root");
@@ -21,7 +22,7 @@ NamespaceId NamespaceTable::id(const CIMNamespaceName& name) const
 {
     const auto found = fIds.find(nameKey(name));
     if (found == fIds.end()) {
-        fail(CIM_ERR_INVALID_NAMESPACE, utf8(name.getString()));
+        fail(CIM_ERR_INVALID_NAMESPACE, base::utf8(name.getString()));
     }
     return found->second;
 }
@@ -43,13 +44,13 @@ std::vector<CIMNamespaceName> NamespaceTable::list() const
 void NamespaceTable::create(const CIMNamespaceName& name)
 {
     if (has(name)) {
-        fail(CIM_ERR_ALREADY_EXISTS, utf8(name.getString()));
+        fail(CIM_ERR_ALREADY_EXISTS, base::utf8(name.getString()));
     }
     if (fIds.size() >= fMaxCount) {
         fail(CIM_ERR_SERVER_LIMITS_EXCEEDED,
              "more namespaces than the limit namespaceCount (" + std::to_string(fMaxCount) + ")");
     }
-    const NamespaceId number = fStorage.insertNamespace(utf8(name.getString()));
+    const NamespaceId number = fStorage.insertNamespace(base::utf8(name.getString()));
     fIds[nameKey(name)] = number;
     fNames[number] = name;
 }

@@ -1,5 +1,6 @@
 #include "pegasus/repository/ObjectCodec.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
 #include "pegasus/wire/ElementEncoder.h"
 
@@ -60,7 +61,7 @@ Object ObjectCodec::decode(std::string& text, Object (wire::ElementDecoder::*fun
     try {
         return (fDecoder.*function)(fDocument.parseElement(text.data(), text.size(), {}));
     } catch (const wire::XmlError& error) {
-        fail(CIM_ERR_FAILED, "cannot read the repository: " + utf8(error.getMessage()));
+        fail(CIM_ERR_FAILED, "cannot read the repository: " + base::utf8(error.getMessage()));
     }
 }
 

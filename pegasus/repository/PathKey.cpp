@@ -1,5 +1,6 @@
 #include "pegasus/repository/PathKey.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/repository/NameKey.h"
 
 #include <charconv>
@@ -33,11 +34,11 @@ std::string canonicalValue(const CIMKeyBinding& key)
         return nameKey(path.getNameSpace()) + ":" + pathKey(path);
     }
     case CIMKeyBinding::BOOLEAN:
-        return foldCase(utf8(key.getValue()));
+        return base::foldCase(base::utf8(key.getValue()));
     case CIMKeyBinding::NUMERIC:
-        return canonicalNumber(utf8(key.getValue()));
+        return canonicalNumber(base::utf8(key.getValue()));
     default:
-        return utf8(key.getValue());
+        return base::utf8(key.getValue());
     }
 }
 

@@ -1,5 +1,6 @@
 #include "pegasus/repository/QualifierRules.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
 
 namespace Pegasus::repository {
@@ -41,14 +42,14 @@ CIMQualifier checkedQualifier(const CIMConstQualifier& use, const CIMScope& scop
 {
     CIMQualifierDecl declaration;
     if (!lookup(use.getName(), declaration)) {
-        fail(CIM_ERR_FAILED, "undeclared qualifier: " + utf8(use.getName()));
+        fail(CIM_ERR_FAILED, "undeclared qualifier: " + base::utf8(use.getName()));
     }
     if (use.getType() != declaration.getType() || use.isArray() != declaration.isArray()) {
-        fail(CIM_ERR_FAILED, "bad qualifier type: " + utf8(use.getName()));
+        fail(CIM_ERR_FAILED, "bad qualifier type: " + base::utf8(use.getName()));
     }
     if (!admits(declaration.getScope(), scope)) {
-        fail(CIM_ERR_FAILED,
-             "qualifier invalid in this scope: " + utf8(use.getName()) + " scope=" + utf8(scope.toString()));
+        fail(CIM_ERR_FAILED, "qualifier invalid in this scope: " + base::utf8(use.getName()) +
+                                 " scope=" + base::utf8(scope.toString()));
     }
     return CIMQualifier(use.getName(), use.getValue(), effectiveFlavor(use.getFlavor(), declaration.getFlavor()));
 }
@@ -59,7 +60,7 @@ void checkOverride(const CIMConstQualifier& use, const CIMConstQualifier& inheri
     if (flavor.hasFlavor(CIMFlavor::TOSUBCLASS) && !flavor.hasFlavor(CIMFlavor::OVERRIDABLE) &&
         use.getValue() != inherited.getValue())
     {
-        fail(CIM_ERR_FAILED, "qualifier cannot be overridden: " + utf8(use.getName()));
+        fail(CIM_ERR_FAILED, "qualifier cannot be overridden: " + base::utf8(use.getName()));
     }
 }
 

@@ -1,5 +1,6 @@
 #include "pegasus/repository/QualifierStore.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
 #include "pegasus/repository/NameKey.h"
 
@@ -25,7 +26,7 @@ CIMQualifierDecl QualifierStore::find(NamespaceId nameSpace, const CIMName& name
     if (known != fKnown.end()) {
         return known->second;
     }
-    const std::optional<std::string> text = fStorage.findQualifier(nameSpace, utf8(name));
+    const std::optional<std::string> text = fStorage.findQualifier(nameSpace, base::utf8(name));
     if (!text) {
         return CIMQualifierDecl();
     }
@@ -53,7 +54,7 @@ void QualifierStore::set(NamespaceId nameSpace, const CIMConstQualifierDecl& dec
     {
         return;
     }
-    fStorage.putQualifier(nameSpace, utf8(name), fCodec.encodeQualifier(declaration));
+    fStorage.putQualifier(nameSpace, base::utf8(name), fCodec.encodeQualifier(declaration));
     fKnown.erase(keyOf(nameSpace, name));
 }
 

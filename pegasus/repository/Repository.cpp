@@ -1,5 +1,6 @@
 #include "pegasus/repository/Repository.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
 #include "pegasus/repository/InstanceStore.h"
 #include "pegasus/repository/NamespaceTable.h"
@@ -91,7 +92,7 @@ CIMQualifierDecl Repository::getQualifier(const CIMNamespaceName& nameSpace, con
     const Lock lock(fState->mutex);
     CIMQualifierDecl found = fState->qualifiers.find(fState->namespaces.id(nameSpace), name);
     if (found.isUninitialized()) {
-        fail(CIM_ERR_NOT_FOUND, utf8(name));
+        fail(CIM_ERR_NOT_FOUND, base::utf8(name));
     }
     return found;
 }

@@ -1,19 +1,16 @@
 #include "tools/mofcompare/ClassComparison.h"
 
+#include "pegasus/base/Text.h"
+
 using namespace Pegasus;
 
 namespace mofcompare {
 
 namespace {
 
-std::string utf8(const String& text)
+std::string shown(const CIMName& name)
 {
-    return std::string(text.getCString());
-}
-
-std::string utf8(const CIMName& name)
-{
-    return name.isNull() ? std::string("(none)") : utf8(name.getString());
+    return name.isNull() ? "(none)" : base::utf8(name);
 }
 
 // Embedded objects are declared and sent as strings.
@@ -26,7 +23,7 @@ std::string shown(CIMType type)
 std::string shown(const CIMValue& value)
 {
     return shown(value.getType()) + (value.isArray() ? "[] " : " ") +
-           (value.isNull() ? "null" : "\"" + utf8(value.toString()) + "\"");
+           (value.isNull() ? "null" : "\"" + base::utf8(value.toString()) + "\"");
 }
 
 // The two flavors that every declaration decides.
@@ -49,7 +46,8 @@ class Comparison
 
   private:
     void expectEqual(const std::string& where, const std::string& source, const std::string& readBack);
-    template <typename Owner> void compareQualifiers(const std::string& where, const Owner& source, const Owner& readBack);
+    template <typename Owner>
+    void compareQualifiers(const std::string& where, const Owner& source, const Owner& readBack);
     void compareQualifier(const std::string& where, const CIMConstQualifier& source, const CIMConstQualifier& readBack);
     void compareProperty(const std::string& where, const CIMConstProperty& source, const CIMConstProperty& readBack);
     void compareMethod(const std::string& where, const CIMConstMethod& source, const CIMConstMethod& readBack);
@@ -77,7 +75,7 @@ CIMFlavor Comparison::flavorOf(const CIMConstQualifier& use) const
 void Comparison::compareQualifier(const std::string& where, const CIMConstQualifier& source,
                                   const CIMConstQualifier& readBack)
 {
-    expectEqual(where, utf8(source.getName()), utf8(readBack.getName()));
+    expectEqual(where, shown(source.getName()), shown(readBack.getName()));
     expectEqual(where, shown(source.getValue()), shown(readBack.getValue()));
     expectEqual(where, shown(flavorOf(source)), shown(readBack.getFlavor()));
 }
@@ -88,7 +86,7 @@ void Comparison::compareQualifiers(const std::string& where, const Owner& source
     expectEqual(where + " qualifiers", std::to_string(source.getQualifierCount()),
                 std::to_string(readBack.getQualifierCount()));
     for (Uint32 i = 0; i < source.getQualifierCount() && i < readBack.getQualifierCount(); ++i) {
-        compareQualifier(where + " [" + utf8(source.getQualifier(i).getName()) + "]", source.getQualifier(i),
+        compareQualifier(where + " [" + shown(source.getQualifier(i).getName()) + "]", source.getQualifier(i),
                          readBack.getQualifier(i));
     }
 }
@@ -96,61 +94,61 @@ void Comparison::compareQualifiers(const std::string& where, const Owner& source
 void Comparison::compareProperty(const std::string& where, const CIMConstProperty& source,
                                  const CIMConstProperty& readBack)
 {
-    expectEqual(where, utf8(source.getName()), utf8(readBack.getName()));
+    expectEqual(where, shown(source.getName()), shown(readBack.getName()));
     expectEqual(where, shown(source.getValue()), shown(readBack.getValue()));
     expectEqual(where + " array size", std::to_string(source.getArraySize()), std::to_string(readBack.getArraySize()));
-    expectEqual(where + " reference class", utf8(source.getReferenceClassName()),
-                utf8(readBack.getReferenceClassName()));
+    expectEqual(where + " reference class", shown(source.getReferenceClassName()),
+                shown(readBack.getReferenceClassName()));
     compareQualifiers(where, source, readBack);
 }
 
 void Comparison::compareParameter(const std::string& where, const CIMConstParameter& source,
                                   const CIMConstParameter& readBack)
 {
-    expectEqual(where, utf8(source.getName()), utf8(readBack.getName()));
+    expectEqual(where, shown(source.getName()), shown(readBack.getName()));
     expectEqual(where, shown(source.getType()), shown(readBack.getType()));
     expectEqual(where + " array", std::to_string(source.isArray()), std::to_string(readBack.isArray()));
     expectEqual(where + " array size", std::to_string(source.getArraySize()), std::to_string(readBack.getArraySize()));
-    expectEqual(where + " reference class", utf8(source.getReferenceClassName()),
-                utf8(readBack.getReferenceClassName()));
+    expectEqual(where + " reference class", shown(source.getReferenceClassName()),
+                shown(readBack.getReferenceClassName()));
     compareQualifiers(where, source, readBack);
 }
 
 void Comparison::compareMethod(const std::string& where, const CIMConstMethod& source, const CIMConstMethod& readBack)
 {
-    expectEqual(where, utf8(source.getName()), utf8(readBack.getName()));
+    expectEqual(where, shown(source.getName()), shown(readBack.getName()));
     expectEqual(where, shown(source.getType()), shown(readBack.getType()));
     compareQualifiers(where, source, readBack);
     expectEqual(where + " parameters", std::to_string(source.getParameterCount()),
                 std::to_string(readBack.getParameterCount()));
     for (Uint32 i = 0; i < source.getParameterCount() && i < readBack.getParameterCount(); ++i) {
-        compareParameter(where + "(" + utf8(source.getParameter(i).getName()) + ")", source.getParameter(i),
+        compareParameter(where + "(" + shown(source.getParameter(i).getName()) + ")", source.getParameter(i),
                          readBack.getParameter(i));
     }
 }
 
 void Comparison::compareClass(const CIMConstClass& source, const CIMConstClass& readBack)
 {
-    const std::string where = utf8(source.getClassName());
-    expectEqual(where, utf8(source.getClassName()), utf8(readBack.getClassName()));
-    expectEqual(where + " superclass", utf8(source.getSuperClassName()), utf8(readBack.getSuperClassName()));
+    const std::string where = shown(source.getClassName());
+    expectEqual(where, shown(source.getClassName()), shown(readBack.getClassName()));
+    expectEqual(where + " superclass", shown(source.getSuperClassName()), shown(readBack.getSuperClassName()));
     compareQualifiers(where, source, readBack);
     expectEqual(where + " properties", std::to_string(source.getPropertyCount()),
                 std::to_string(readBack.getPropertyCount()));
     for (Uint32 i = 0; i < source.getPropertyCount() && i < readBack.getPropertyCount(); ++i) {
-        compareProperty(where + "." + utf8(source.getProperty(i).getName()), source.getProperty(i),
+        compareProperty(where + "." + shown(source.getProperty(i).getName()), source.getProperty(i),
                         readBack.getProperty(i));
     }
     expectEqual(where + " methods", std::to_string(source.getMethodCount()), std::to_string(readBack.getMethodCount()));
     for (Uint32 i = 0; i < source.getMethodCount() && i < readBack.getMethodCount(); ++i) {
-        compareMethod(where + "." + utf8(source.getMethod(i).getName()), source.getMethod(i), readBack.getMethod(i));
+        compareMethod(where + "." + shown(source.getMethod(i).getName()), source.getMethod(i), readBack.getMethod(i));
     }
 }
 
 std::string shown(const CIMConstQualifierDecl& declaration)
 {
-    return utf8(declaration.getName()) + " " + shown(declaration.getValue()) + " [" +
-           std::to_string(declaration.getArraySize()) + "] " + utf8(declaration.getScope().toString()) + ", " +
+    return shown(declaration.getName()) + " " + shown(declaration.getValue()) + " [" +
+           std::to_string(declaration.getArraySize()) + "] " + base::utf8(declaration.getScope().toString()) + ", " +
            shown(declaration.getFlavor());
 }
 
@@ -169,7 +167,7 @@ std::vector<std::string> differences(const CIMConstQualifierDecl& source, const 
     if (shown(source) == shown(readBack)) {
         return {};
     }
-    return {"qualifier " + utf8(source.getName()) + ": " + shown(source) + " in the source, " + shown(readBack) +
+    return {"qualifier " + shown(source.getName()) + ": " + shown(source) + " in the source, " + shown(readBack) +
             " read back"};
 }
 

@@ -1,3 +1,4 @@
+#include "pegasus/base/Text.h"
 #include "pegasus/mof/Compiler.h"
 #include "pegasus/mof/MemoryHandler.h"
 #include "tools/mofcompare/ClassComparison.h"
@@ -82,7 +83,7 @@ int main(int argc, char** argv)
     } catch (const mof::MofError& error) {
         std::cerr << error.diagnostic();
     } catch (const Exception& error) {
-        std::cerr << "mofcompare: " << std::string(error.getMessage().getCString()) << "\n";
+        std::cerr << "mofcompare: " << base::utf8(error.getMessage()) << "\n";
     } catch (const std::exception& error) {
         std::cerr << "mofcompare: " << error.what() << "\n";
     }

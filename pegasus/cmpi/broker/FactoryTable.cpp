@@ -1,3 +1,5 @@
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/broker/BrokerTables.h"
 #include "pegasus/cmpi/broker/MessageText.h"
 #include "pegasus/cmpi/broker/ObjectKinds.h"
@@ -6,7 +8,6 @@
 #include "pegasus/cmpi/objects/DateTimeObject.h"
 #include "pegasus/cmpi/objects/InstanceObject.h"
 #include "pegasus/cmpi/objects/StringObject.h"
-#include "pegasus/cmpi/services/ProviderText.h"
 
 #include <cstdarg>
 
@@ -88,18 +89,18 @@ CMPIBoolean classPathIsA(const CMPIBroker* broker, const CMPIObjectPath* path, c
         if (path == nullptr || className == nullptr) {
             throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, {}};
         }
-        if (!CIMName::legal(fromUtf8(className))) {
+        if (!CIMName::legal(base::fromUtf8Repaired(className))) {
             throw CmpiError{CMPI_RC_ERR_INVALID_CLASS, {}};
         }
         const PathState& state = objectOf<ObjectPathObject>(path).state;
-        if (sameName(utf8(state.className), className)) {
+        if (base::equalNoCase(base::utf8(state.className), className)) {
             return 1;
         }
-        const std::string nameSpace = utf8(state.nameSpace.getString());
+        const std::string nameSpace = base::utf8(state.nameSpace.getString());
         for (const ClassSchema* at = state.schema; at != nullptr && !at->superClass().isNull();
-             at = owner.classes().find(nameSpace, utf8(at->superClass())))
+             at = owner.classes().find(nameSpace, base::utf8(at->superClass())))
         {
-            if (sameName(utf8(at->superClass()), className)) {
+            if (base::equalNoCase(base::utf8(at->superClass()), className)) {
                 return 1;
             }
         }

@@ -1,5 +1,7 @@
 #include "pegasus/cmpi/broker/MessageText.h"
 
+#include <array>
+#include <charconv>
 #include <vector>
 
 namespace Pegasus::cmpi {
@@ -10,6 +12,14 @@ constexpr CMPICount kMaxArguments = 10; // one digit names each
 std::string textOf(const char* text)
 {
     return text == nullptr ? std::string() : std::string(text);
+}
+
+// As printf's %f in the C locale.
+std::string fixedPoint(double value)
+{
+    std::array<char, 512> text{}; // the longest double has 309 digits before the point
+    const auto end = std::to_chars(text.data(), text.data() + text.size(), value, std::chars_format::fixed, 6).ptr;
+    return {text.data(), end};
 }
 
 std::string nextArgument(va_list args)
@@ -32,7 +42,7 @@ std::string nextArgument(va_list args)
         return std::to_string(va_arg(args, CMPIUint64));
     case CMPI_real32:
     case CMPI_real64:
-        return std::to_string(va_arg(args, double));
+        return fixedPoint(va_arg(args, double));
     case CMPI_chars:
         return textOf(va_arg(args, const char*));
     case CMPI_string: {

@@ -1,5 +1,6 @@
 #include "pegasus/cmpi/broker/ObjectKinds.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/broker/BrokerTables.h"
 #include "pegasus/cmpi/objects/ArgsObject.h"
 #include "pegasus/cmpi/objects/ArrayObject.h"
@@ -9,7 +10,6 @@
 #include "pegasus/cmpi/objects/InstanceObject.h"
 #include "pegasus/cmpi/objects/ResultObject.h"
 #include "pegasus/cmpi/objects/StringObject.h"
-#include "pegasus/cmpi/services/ProviderText.h"
 
 #include <array>
 #include <cstdio>
@@ -66,14 +66,15 @@ std::string describe(const void* object)
     if (kind == "CMPIString") {
         text += ' ' + static_cast<const StringObject*>(static_cast<const CMPIString*>(object))->text();
     } else if (kind == "CMPIObjectPath") {
-        text += ' ' + utf8(objectOf<ObjectPathObject>(static_cast<const CMPIObjectPath*>(object)).value().toString());
+        text +=
+            ' ' + base::utf8(objectOf<ObjectPathObject>(static_cast<const CMPIObjectPath*>(object)).value().toString());
     } else if (kind == "CMPIInstance") {
-        text += ' ' + utf8(objectOf<InstanceObject>(static_cast<const CMPIInstance*>(object))
-                               .completePath()
-                               .withNameSpace()
-                               .toString());
+        text += ' ' + base::utf8(objectOf<InstanceObject>(static_cast<const CMPIInstance*>(object))
+                                     .completePath()
+                                     .withNameSpace()
+                                     .toString());
     } else if (kind == "CMPIDateTime") {
-        text += ' ' + utf8(objectOf<DateTimeObject>(static_cast<const CMPIDateTime*>(object)).value().toString());
+        text += ' ' + base::utf8(objectOf<DateTimeObject>(static_cast<const CMPIDateTime*>(object)).value().toString());
     }
     return text;
 }

@@ -1,10 +1,10 @@
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/broker/BrokerTables.h"
 #include "pegasus/cmpi/objects/ArgsObject.h"
 #include "pegasus/cmpi/objects/ContextObject.h"
 #include "pegasus/cmpi/objects/EnumerationObject.h"
 #include "pegasus/cmpi/objects/InstanceObject.h"
 #include "pegasus/cmpi/objects/StringObject.h"
-#include "pegasus/cmpi/services/ProviderText.h"
 
 #include <memory>
 #include <utility>
@@ -26,7 +26,7 @@ struct Target
         if (nameSpace.isNull() && context != nullptr) {
             const std::string text = objectOf<ContextObject>(context).text(CMPIInitNameSpace);
             if (!text.empty()) {
-                nameSpace = CIMNamespaceName(fromUtf8(text.c_str()));
+                nameSpace = CIMNamespaceName(base::fromUtf8Repaired(text));
             }
         }
         path = state.withoutNameSpace();
@@ -187,9 +187,9 @@ CMPIStatus setProperty(const CMPIBroker* broker, const CMPIContext* context, con
     return perform([&] {
         Broker& owner = Broker::of(broker);
         const Target target(context, path);
-        const std::string nameSpace = utf8(target.nameSpace.getString());
+        const std::string nameSpace = base::utf8(target.nameSpace.getString());
         PathState state = objectOf<ObjectPathObject>(path).state;
-        state.schema = owner.classes().find(nameSpace, utf8(target.className()));
+        state.schema = owner.classes().find(nameSpace, base::utf8(target.className()));
         InstanceObject changed(owner, state);
         changed.setProperty(name, value, type);
         const char* names[] = {name, nullptr};

@@ -1,9 +1,9 @@
 #include "pegasus/cmpi/module/ProviderInterfaces.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/module/ProviderLibrary.h"
 #include "pegasus/cmpi/objects/Broker.h"
 #include "pegasus/cmpi/objects/ContextObject.h"
-#include "pegasus/cmpi/services/ProviderText.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -14,7 +14,7 @@ namespace {
 
 CIMException noInterface(const std::string& provider, const char* kind, CIMStatusCode code)
 {
-    return {code, fromUtf8(("provider " + provider + " has no " + kind + " interface").c_str())};
+    return {code, base::fromUtf8Repaired("provider " + provider + " has no " + kind + " interface")};
 }
 
 template <typename Interface> CMPIrc end(Interface*& mi, const CMPIContext& context, bool terminating)

@@ -1,7 +1,7 @@
 #include "pegasus/cmpi/module/ProviderLibrary.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/module/VendorCall.h"
-#include "pegasus/cmpi/services/ProviderText.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -18,7 +18,7 @@ constexpr std::array kKinds{"Instance", "Association", "Method", "Property", "In
 
 CIMException failure(const std::string& text)
 {
-    return {CIM_ERR_FAILED, fromUtf8(text.c_str())};
+    return {CIM_ERR_FAILED, base::fromUtf8Repaired(text)};
 }
 
 std::string factoryOf(const std::string& provider, const std::string& kind)

@@ -1,5 +1,6 @@
 #include "pegasus/cmpi/module/ProviderModule.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/broker/BrokerTables.h"
 #include "pegasus/cmpi/module/ProviderInterfaces.h"
 #include "pegasus/cmpi/module/ProviderLibrary.h"
@@ -8,7 +9,6 @@
 #include "pegasus/cmpi/objects/ContextObject.h"
 #include "pegasus/cmpi/objects/ObjectPathObject.h"
 #include "pegasus/cmpi/objects/ResultObject.h"
-#include "pegasus/cmpi/services/ProviderText.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -33,12 +33,12 @@ void throwUnlessOk(const CMPIStatus& status)
     }
     const bool hasText = status.msg != nullptr && status.msg->hdl != nullptr;
     throw CIMException(statusCodeOf(status.rc),
-                       hasText ? fromUtf8(static_cast<const char*>(status.msg->hdl)) : String::EMPTY);
+                       hasText ? base::fromUtf8Repaired(static_cast<const char*>(status.msg->hdl)) : String::EMPTY);
 }
 
 CIMException notServed(const ProviderRequest& request, CIMStatusCode code, const char* slot)
 {
-    return {code, fromUtf8(("provider " + request.provider + " does not implement " + slot).c_str())};
+    return {code, base::fromUtf8Repaired("provider " + request.provider + " does not implement " + slot)};
 }
 
 template <typename Object> Object& asArgument(Object& object)
@@ -89,7 +89,7 @@ class Call
     {
         const CMPIStatus status =
             callVendor([&] { return function(arguments...); },
-                       [](const char* reason) { throw CIMException(CIM_ERR_FAILED, fromUtf8(reason)); });
+                       [](const char* reason) { throw CIMException(CIM_ERR_FAILED, base::fromUtf8Repaired(reason)); });
         fResult.rethrow();
         throwUnlessOk(status);
     }
@@ -197,7 +197,7 @@ CIMValue ProviderModule::invokeMethod(const ProviderRequest& request, const CIMO
     if (mi.ft->invokeMethod == nullptr) {
         throw notServed(request, CIM_ERR_METHOD_NOT_AVAILABLE, "invokeMethod");
     }
-    const std::string name = utf8(method);
+    const std::string name = base::utf8(method);
     call.run(mi.ft->invokeMethod, &mi, call.context(), call.result(), call.path(), name.c_str(),
              static_cast<const CMPIArgs*>(&input), static_cast<CMPIArgs*>(&output));
     if (!hasReturned || returned.isNull()) {

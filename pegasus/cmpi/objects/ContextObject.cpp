@@ -1,6 +1,6 @@
 #include "pegasus/cmpi/objects/ContextObject.h"
 
-#include "pegasus/cmpi/services/ProviderText.h"
+#include "pegasus/base/Text.h"
 
 namespace Pegasus::cmpi {
 namespace {
@@ -64,7 +64,7 @@ std::string ContextObject::text(const char* name) const
     if (found != nullptr && found->getType() == CIMTYPE_STRING && !found->isArray()) {
         found->get(result);
     }
-    return utf8(result);
+    return base::utf8(result);
 }
 
 } // namespace Pegasus::cmpi

@@ -1,7 +1,7 @@
 #include "pegasus/cmpi/objects/DateTimeObject.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/objects/StringObject.h"
-#include "pegasus/cmpi/services/ProviderText.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -26,7 +26,7 @@ CMPIUint64 getBinaryFormat(const CMPIDateTime* self, CMPIStatus* rc)
 CMPIString* getStringFormat(const CMPIDateTime* self, CMPIStatus* rc)
 {
     return answer(rc, static_cast<CMPIString*>(nullptr), [&]() -> CMPIString* {
-        return Frame::current().make<StringObject>(utf8(objectOf<DateTimeObject>(self).value().toString()));
+        return Frame::current().make<StringObject>(base::utf8(objectOf<DateTimeObject>(self).value().toString()));
     });
 }
 
@@ -55,16 +55,16 @@ CIMDateTime dateTimeFromBinary(CMPIUint64 microseconds, bool isInterval)
     try {
         return {isInterval ? microseconds : microseconds + unixEpoch(), isInterval};
     } catch (const Exception& error) {
-        throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, utf8(error.getMessage())};
+        throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, base::utf8(error.getMessage())};
     }
 }
 
 CIMDateTime dateTimeFromText(const char* text)
 {
     try {
-        return {fromUtf8(requireText(text))};
+        return {base::fromUtf8Repaired(requireText(text))};
     } catch (const Exception& error) {
-        throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, utf8(error.getMessage())};
+        throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, base::utf8(error.getMessage())};
     }
 }
 

@@ -1,10 +1,11 @@
 #include "pegasus/cmpi/objects/InstanceObject.h"
 
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/objects/Broker.h"
 #include "pegasus/cmpi/objects/KeyCodec.h"
 #include "pegasus/cmpi/objects/NamedValues.h"
 #include "pegasus/cmpi/services/PropertyFilter.h"
-#include "pegasus/cmpi/services/ProviderText.h"
 #include "pegasus/common/ObjectReps.h"
 
 #include <Pegasus/Common/CIMObject.h>
@@ -106,7 +107,7 @@ void InstanceObject::takeProperties(const CIMInstance& instance)
             storeExtra(property.getName(), property.getValue());
             continue;
         }
-        const std::size_t at = fPath.schema->find(utf8(property.getName()));
+        const std::size_t at = fPath.schema->find(base::utf8(property.getName()));
         if (at != ClassSchema::kNotFound && accepts(fPath.schema->properties()[at], property.getValue())) {
             store(at, property.getValue());
         }
@@ -164,7 +165,7 @@ CMPIData InstanceObject::property(const char* name) const
         }
     }
     for (std::size_t i = 0; i < fExtra.size(); ++i) {
-        if (sameName(utf8(fExtra[i].name), name)) {
+        if (base::equalNoCase(base::utf8(fExtra[i].name), name)) {
             return encode(i);
         }
     }

@@ -1,7 +1,8 @@
 #include "pegasus/cmpi/objects/NamedValues.h"
 
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/objects/StringObject.h"
-#include "pegasus/cmpi/services/ProviderText.h"
 
 namespace Pegasus::cmpi {
 
@@ -21,7 +22,7 @@ void NamedValues::set(const char* name, const CMPIValue* value, CMPIType type)
 const CIMValue* NamedValues::find(std::string_view name) const
 {
     for (const NamedValue& held : fValues) {
-        if (sameName(utf8(held.name), name)) {
+        if (base::equalNoCase(base::utf8(held.name), name)) {
             return &held.value;
         }
     }
@@ -50,7 +51,7 @@ CMPIData NamedValues::getAt(Broker& broker, CMPICount index, CMPIString** name) 
 
 CMPIString* makeName(const CIMName& name)
 {
-    return Frame::current().make<StringObject>(utf8(name));
+    return Frame::current().make<StringObject>(base::utf8(name));
 }
 
 } // namespace Pegasus::cmpi

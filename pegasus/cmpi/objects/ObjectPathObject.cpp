@@ -1,10 +1,10 @@
 #include "pegasus/cmpi/objects/ObjectPathObject.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/objects/Broker.h"
 #include "pegasus/cmpi/objects/KeyCodec.h"
 #include "pegasus/cmpi/objects/NamedValues.h"
 #include "pegasus/cmpi/objects/StringObject.h"
-#include "pegasus/cmpi/services/ProviderText.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -20,8 +20,9 @@ PathState& stateOf(const CMPIObjectPath* self)
 
 CMPIString* textOf(const CMPIObjectPath* self, CMPIStatus* rc, String (*part)(const PathState&))
 {
-    return answer(rc, static_cast<CMPIString*>(nullptr),
-                  [&]() -> CMPIString* { return Frame::current().make<StringObject>(utf8(part(stateOf(self)))); });
+    return answer(rc, static_cast<CMPIString*>(nullptr), [&]() -> CMPIString* {
+        return Frame::current().make<StringObject>(base::utf8(part(stateOf(self))));
+    });
 }
 
 CMPIStatus setNameSpace(const CMPIObjectPath* self, const char* text)
@@ -41,7 +42,7 @@ CMPIString* getNameSpace(const CMPIObjectPath* self, CMPIStatus* rc)
 CMPIStatus setHostname(const CMPIObjectPath* self, const char* text)
 {
     return perform([&] {
-        const String host = fromUtf8(requireText(text));
+        const String host = base::fromUtf8Repaired(requireText(text));
         const CIMObjectPath path(host, CIMNamespaceName(), CIMName("Any")); // throws for a text that is not a host
         stateOf(self).host = host;
     });

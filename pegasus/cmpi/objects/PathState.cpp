@@ -1,15 +1,16 @@
 #include "pegasus/cmpi/objects/PathState.h"
 
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/objects/Broker.h"
 #include "pegasus/cmpi/objects/KeyCodec.h"
 #include "pegasus/cmpi/objects/TableFunction.h"
-#include "pegasus/cmpi/services/ProviderText.h"
 
 #include <Pegasus/Common/Exception.h>
 
 #include <algorithm>
-#include <cerrno>
-#include <cstdlib>
+#include <charconv>
+#include <string>
 
 namespace Pegasus::cmpi {
 namespace {
@@ -20,9 +21,9 @@ CIMNamespaceName nameSpaceOf(const char* text)
         return {};
     }
     try {
-        return {fromUtf8(text)};
+        return {base::fromUtf8Repaired(text)};
     } catch (const Exception& error) {
-        throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, utf8(error.getMessage())};
+        throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, base::utf8(error.getMessage())};
     }
 }
 
@@ -31,20 +32,30 @@ CIMName classOf(const char* text)
     return text == nullptr || *text == '\0' ? CIMName() : requireName(text);
 }
 
+template <typename Number> bool parse(const std::string& text, std::size_t start, int radix, Number& number)
+{
+    const char* const end = text.data() + text.size();
+    const auto [stop, error] = std::from_chars(text.data() + start, end, number, radix);
+    return error == std::errc() && stop == end;
+}
+
+// The wire does not check the text of a numeric key, so that it may be anything: then the key stays text.
 CIMValue numberOf(const String& text)
 {
-    const std::string digits = utf8(text);
-    const char* const begin = digits.c_str();
-    char* end = nullptr;
-    errno = 0;
-    const bool isHex = digits.find_first_of("xX") != std::string::npos;
-    const Uint64 bits = digits[0] == '-' ? static_cast<Uint64>(std::strtoll(begin, &end, 10))
-                                         : std::strtoull(begin, &end, isHex ? 16 : 10);
-    if (errno == 0 && end != begin && *end == '\0') {
-        return digits[0] == '-' ? CIMValue(static_cast<Sint64>(bits)) : CIMValue(bits);
+    const std::string digits = base::utf8(text);
+    const bool isHex = base::startsWithNoCase(digits, "0x");
+    Sint64 negative = 0;
+    if (!digits.empty() && digits[0] == '-' && parse(digits, 0, 10, negative)) {
+        return CIMValue(negative);
     }
-    const double real = std::strtod(begin, &end);
-    return end != begin && *end == '\0' ? CIMValue(real) : CIMValue(text);
+    Uint64 positive = 0;
+    if (parse(digits, isHex ? 2 : 0, isHex ? 16 : 10, positive)) {
+        return CIMValue(positive);
+    }
+    Real64 real = 0;
+    const char* const end = digits.data() + digits.size();
+    const auto [stop, error] = std::from_chars(digits.data(), end, real);
+    return error == std::errc() && stop == end ? CIMValue(real) : CIMValue(text);
 }
 
 CIMValue valueOfBinding(const CIMKeyBinding& binding)
@@ -67,7 +78,7 @@ CIMValue valueOfBinding(const CIMKeyBinding& binding)
 CIMValue typedKey(const ClassSchema* schema, const CIMKeyBinding& binding)
 {
     CIMValue value = valueOfBinding(binding);
-    const std::size_t at = schema ? schema->find(utf8(binding.getName())) : ClassSchema::kNotFound;
+    const std::size_t at = schema ? schema->find(base::utf8(binding.getName())) : ClassSchema::kNotFound;
     if (at == ClassSchema::kNotFound) {
         return value;
     }
@@ -103,7 +114,7 @@ PathState::PathState(Broker& broker, const CIMObjectPath& path)
 void PathState::lookUp(Broker& broker)
 {
     const bool isNamed = !className.isNull() && !nameSpace.isNull();
-    schema = isNamed ? broker.classes().find(utf8(nameSpace.getString()), utf8(className)) : nullptr;
+    schema = isNamed ? broker.classes().find(base::utf8(nameSpace.getString()), base::utf8(className)) : nullptr;
 }
 
 void PathState::addKey(const char* name, const CMPIValue* value, CMPIType type)
@@ -135,7 +146,7 @@ void PathState::addKey(const char* name, const CMPIValue* value, CMPIType type)
 const NamedValue* PathState::findKey(std::string_view name) const
 {
     for (const NamedValue& key : keys) {
-        if (sameName(utf8(key.name), name)) {
+        if (base::equalNoCase(base::utf8(key.name), name)) {
             return &key;
         }
     }

@@ -1,7 +1,7 @@
 #include "pegasus/cmpi/objects/TableFunction.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/objects/StringObject.h"
-#include "pegasus/cmpi/services/ProviderText.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -29,9 +29,9 @@ CMPIStatus currentFailure() noexcept
     } catch (const CmpiError& error) {
         return makeStatus(error.code, error.text);
     } catch (const CIMException& error) {
-        return makeStatus(static_cast<CMPIrc>(error.getCode()), utf8(error.getMessage()));
+        return makeStatus(static_cast<CMPIrc>(error.getCode()), base::utf8(error.getMessage()));
     } catch (const Exception& error) {
-        return makeStatus(CMPI_RC_ERROR_SYSTEM, utf8(error.getMessage()));
+        return makeStatus(CMPI_RC_ERROR_SYSTEM, base::utf8(error.getMessage()));
     } catch (const std::exception& error) {
         return makeStatus(CMPI_RC_ERROR_SYSTEM, error.what());
     } catch (...) {
@@ -52,7 +52,7 @@ CIMName requireName(const char* text)
     try {
         return CIMName(requireText(text));
     } catch (const Exception& error) {
-        throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, utf8(error.getMessage())};
+        throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, base::utf8(error.getMessage())};
     }
 }
 

@@ -1,5 +1,6 @@
 #include "pegasus/cmpi/objects/ValueCodec.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/objects/ArrayElements.h"
 #include "pegasus/cmpi/objects/ArrayObject.h"
 #include "pegasus/cmpi/objects/Broker.h"
@@ -7,7 +8,6 @@
 #include "pegasus/cmpi/objects/InstanceObject.h"
 #include "pegasus/cmpi/objects/ObjectPathObject.h"
 #include "pegasus/cmpi/objects/StringObject.h"
-#include "pegasus/cmpi/services/ProviderText.h"
 
 #include <Pegasus/Common/CIMInstance.h>
 #include <Pegasus/Common/CIMObject.h>
@@ -56,12 +56,12 @@ CIMValue decodeString(const CMPIString* string)
     if (string == nullptr || string->hdl == nullptr) {
         return {CIMTYPE_STRING, false};
     }
-    return fromUtf8(static_cast<const char*>(string->hdl));
+    return base::fromUtf8Repaired(static_cast<const char*>(string->hdl));
 }
 
 CIMValue decodeText(const char* text)
 {
-    return text == nullptr ? CIMValue(CIMTYPE_STRING, false) : CIMValue(fromUtf8(text));
+    return text == nullptr ? CIMValue(CIMTYPE_STRING, false) : CIMValue(base::fromUtf8Repaired(text));
 }
 
 CIMValue decodeArray(const CMPIArray* array, CMPIType type)
@@ -163,7 +163,7 @@ CMPIData encodeScalar(Broker& broker, const CIMValue& value)
     case CIMTYPE_CHAR16:
         return plainData<CMPIChar16>(CMPI_char16, valueOf<Char16>(value));
     case CIMTYPE_STRING:
-        return plainData<CMPIString*>(CMPI_string, frame.make<StringObject>(utf8(valueOf<String>(value))));
+        return plainData<CMPIString*>(CMPI_string, frame.make<StringObject>(base::utf8(valueOf<String>(value))));
     case CIMTYPE_DATETIME:
         return plainData<CMPIDateTime*>(CMPI_dateTime, frame.make<DateTimeObject>(valueOf<CIMDateTime>(value)));
     case CIMTYPE_REFERENCE:

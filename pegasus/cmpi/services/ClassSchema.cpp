@@ -1,6 +1,7 @@
 #include "pegasus/cmpi/services/ClassSchema.h"
 
-#include "pegasus/cmpi/services/ProviderText.h"
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/Text.h"
 
 #include <Pegasus/Common/CIMProperty.h>
 #include <Pegasus/Common/CIMQualifier.h>
@@ -36,32 +37,34 @@ bool isEmbeddedInstance(const CIMConstProperty& property)
             property.findQualifier(CIMName("EmbeddedInstance")) != PEG_NOT_FOUND);
 }
 
-std::size_t hashOf(std::string_view name)
+} // namespace
+
+std::size_t ClassSchema::NoCaseHash::operator()(std::string_view name) const noexcept
 {
     std::size_t hash = 14695981039346656037U; // FNV-1a over the letters without their case
     for (const char c : name) {
-        hash = (hash ^ (static_cast<unsigned char>(c) | 0x20U)) * 1099511628211U;
+        hash = (hash ^ static_cast<unsigned char>(base::lowerAscii(c))) * 1099511628211U;
     }
     return hash;
 }
 
-} // namespace
-
 ClassSchema::ClassSchema(const CIMClass& source)
-    : fName(source.getClassName()), fText(utf8(fName)), fSuperClass(source.getSuperClassName())
+    : fName(source.getClassName()), fText(base::utf8(fName)), fSuperClass(source.getSuperClassName())
 {
     fProperties.reserve(source.getPropertyCount());
     for (Uint32 i = 0; i < source.getPropertyCount(); ++i) {
         addProperty(source.getProperty(i));
     }
-    index();
+    for (std::size_t i = 0; i < fProperties.size(); ++i) {
+        fIndices.emplace(fProperties[i].text, i);
+    }
 }
 
 void ClassSchema::addProperty(const CIMConstProperty& property)
 {
     PropertySchema added;
     added.name = property.getName();
-    added.text = utf8(added.name);
+    added.text = base::utf8(added.name);
     added.type = property.getType();
     added.isArray = property.isArray();
     added.isKey = isTrue(property, "Key");
@@ -75,31 +78,10 @@ void ClassSchema::addProperty(const CIMConstProperty& property)
     fProperties.push_back(std::move(added));
 }
 
-void ClassSchema::index()
-{
-    std::size_t size = 4;
-    while (size < fProperties.size() * 2) {
-        size *= 2;
-    }
-    fBuckets.assign(size, 0);
-    for (std::size_t i = 0; i < fProperties.size(); ++i) {
-        std::size_t at = hashOf(fProperties[i].text) & (size - 1);
-        while (fBuckets[at] != 0) {
-            at = (at + 1) & (size - 1);
-        }
-        fBuckets[at] = static_cast<std::uint32_t>(i + 1);
-    }
-}
-
 std::size_t ClassSchema::find(std::string_view name) const
 {
-    const std::size_t mask = fBuckets.size() - 1;
-    for (std::size_t at = hashOf(name) & mask; fBuckets[at] != 0; at = (at + 1) & mask) {
-        if (sameName(fProperties[fBuckets[at] - 1].text, name)) {
-            return fBuckets[at] - 1;
-        }
-    }
-    return kNotFound;
+    const auto found = fIndices.find(name);
+    return found == fIndices.end() ? kNotFound : found->second;
 }
 
 std::size_t ClassSchema::findKey(const CIMName& name) const

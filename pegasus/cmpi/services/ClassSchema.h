@@ -1,12 +1,15 @@
 #pragma once
 
+#include "pegasus/base/AsciiCase.h"
+
 #include <Pegasus/Common/CIMClass.h>
 #include <Pegasus/Common/CIMName.h>
 #include <Pegasus/Common/CIMValue.h>
 
-#include <cstdint>
+#include <cstddef>
 #include <string>
 #include <string_view>
+#include <unordered_map>
 #include <vector>
 
 namespace Pegasus::cmpi {
@@ -33,6 +36,8 @@ class ClassSchema
     static constexpr std::size_t kNotFound = static_cast<std::size_t>(-1);
 
     explicit ClassSchema(const CIMClass& source);
+    ClassSchema(const ClassSchema&) = delete;
+    ClassSchema& operator=(const ClassSchema&) = delete;
 
     const CIMName& name() const { return fName; }
     const std::string& text() const { return fText; }
@@ -47,15 +52,23 @@ class ClassSchema
     std::size_t findKey(const CIMName& name) const;
 
   private:
+    struct NoCaseHash
+    {
+        std::size_t operator()(std::string_view name) const noexcept;
+    };
+    struct NoCaseEqual
+    {
+        bool operator()(std::string_view x, std::string_view y) const noexcept { return base::equalNoCase(x, y); }
+    };
+
     void addProperty(const CIMConstProperty& property);
-    void index();
 
     CIMName fName;
     std::string fText;
     CIMName fSuperClass;
     std::vector<PropertySchema> fProperties;
     std::vector<std::size_t> fKeys;
-    std::vector<std::uint32_t> fBuckets; // open addressing, a power of two; 0 is free, else index + 1
+    std::unordered_map<std::string_view, std::size_t, NoCaseHash, NoCaseEqual> fIndices; // keys view fProperties
 };
 
 } // namespace Pegasus::cmpi

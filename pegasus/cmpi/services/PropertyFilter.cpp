@@ -1,6 +1,6 @@
 #include "pegasus/cmpi/services/PropertyFilter.h"
 
-#include "pegasus/cmpi/services/ProviderText.h"
+#include "pegasus/base/Text.h"
 
 #include <algorithm>
 
@@ -13,7 +13,7 @@ PropertyFilter::PropertyFilter(const CIMPropertyList& list) : fAll(list.isNull()
     }
     for (Uint32 i = 0; i < list.size(); ++i) {
         fList.push_back(list[i]);
-        fTexts.push_back(utf8(list[i]));
+        fTexts.push_back(base::utf8(list[i]));
     }
     for (const std::string& text : fTexts) {
         fNames.push_back(text.c_str());

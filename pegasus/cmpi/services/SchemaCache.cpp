@@ -1,6 +1,7 @@
 #include "pegasus/cmpi/services/SchemaCache.h"
 
-#include "pegasus/cmpi/services/ProviderText.h"
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/Text.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -11,15 +12,7 @@ namespace {
 
 std::string keyOf(std::string_view nameSpace, std::string_view className)
 {
-    std::string key;
-    key.reserve(nameSpace.size() + className.size() + 1);
-    key.append(nameSpace).append(1, ':').append(className);
-    for (char& c : key) {
-        if (c >= 'A' && c <= 'Z') {
-            c = static_cast<char>(c - 'A' + 'a');
-        }
-    }
-    return key;
+    return base::foldCase(std::string(nameSpace).append(1, ':').append(className));
 }
 
 } // namespace
@@ -56,20 +49,25 @@ void SchemaCache::beginRequest()
 std::unique_ptr<ClassSchema> SchemaCache::load(std::string_view nameSpace, std::string_view className)
 {
     try {
-        const CIMClass found = fServices.getClass(CIMNamespaceName(fromUtf8(std::string(nameSpace).c_str())),
-                                                  CIMName(fromUtf8(std::string(className).c_str())));
+        const CIMClass found = fServices.getClass(CIMNamespaceName(base::fromUtf8Repaired(nameSpace)),
+                                                  CIMName(base::fromUtf8Repaired(className)));
         return std::make_unique<ClassSchema>(found);
     } catch (const CIMException& error) {
         if (error.getCode() == CIM_ERR_NOT_FOUND || error.getCode() == CIM_ERR_INVALID_NAMESPACE) {
             return nullptr;
         }
-        fServices.log(BrokerServices::Severity::kWarning, "GetClass " + std::string(className) + " in " +
-                                                              std::string(nameSpace) + ": " + utf8(error.getMessage()));
+        logFailure(nameSpace, className, error);
     } catch (const Exception& error) {
-        fServices.log(BrokerServices::Severity::kWarning, "GetClass " + std::string(className) + " in " +
-                                                              std::string(nameSpace) + ": " + utf8(error.getMessage()));
+        logFailure(nameSpace, className, error);
     }
     return nullptr;
+}
+
+void SchemaCache::logFailure(std::string_view nameSpace, std::string_view className, const Exception& error)
+{
+    fServices.log(BrokerServices::Severity::kWarning, "GetClass " + std::string(className) + " in " +
+                                                          std::string(nameSpace) + ": " +
+                                                          base::utf8(error.getMessage()));
 }
 
 } // namespace Pegasus::cmpi

@@ -37,6 +37,7 @@ class SchemaCache
     };
 
     std::unique_ptr<ClassSchema> load(std::string_view nameSpace, std::string_view className);
+    void logFailure(std::string_view nameSpace, std::string_view className, const Exception& error);
 
     BrokerServices& fServices;
     std::shared_mutex fMutex;                        // guards the next two; never held during an upcall

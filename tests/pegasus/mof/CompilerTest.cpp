@@ -262,23 +262,24 @@ TEST(Compiler, NamesTheLimitThatATextExceeds)
     {
         const char* name;
         std::string text;
-        void (*tighten)(Limits&);
+        void (*tighten)(CompileLimits&);
         const char* within; // a text that the same limit lets through
     };
     const Row rows[] = {
-        {"tokenBytes", "class Abcdefghijklmnop {};", [](Limits& l) { l.tokenBytes = 15; }, "class Abcdefghijklmno {};"},
-        {"stringBytes", "[Description(\"abcdefgh\" \"ij\")] class A {};", [](Limits& l) { l.stringBytes = 9; },
+        {"tokenBytes", "class Abcdefghijklmnop {};", [](CompileLimits& l) { l.tokenBytes = 15; },
+         "class Abcdefghijklmno {};"},
+        {"stringBytes", "[Description(\"abcdefgh\" \"ij\")] class A {};", [](CompileLimits& l) { l.stringBytes = 9; },
          "[Description(\"abcdefgh\" \"i\")] class A {};"},
-        {"arrayElementCount", "class A { uint8 a[] = {1,2,3}; };", [](Limits& l) { l.arrayElementCount = 2; },
+        {"arrayElementCount", "class A { uint8 a[] = {1,2,3}; };", [](CompileLimits& l) { l.arrayElementCount = 2; },
          "class A { uint8 a[] = {1,2}; };"},
-        {"arrayElementCount", "class A { uint8 a[3]; };", [](Limits& l) { l.arrayElementCount = 2; },
+        {"arrayElementCount", "class A { uint8 a[3]; };", [](CompileLimits& l) { l.arrayElementCount = 2; },
          "class A { uint8 a[2]; };"},
-        {"memberCount", "class A { uint8 a; uint8 b; uint8 c; };", [](Limits& l) { l.memberCount = 2; },
+        {"memberCount", "class A { uint8 a; uint8 b; uint8 c; };", [](CompileLimits& l) { l.memberCount = 2; },
          "class A { uint8 a; uint8 b; };"},
-        {"memberCount", "class A { uint8 a(uint8 a, uint8 b, uint8 c); };", [](Limits& l) { l.memberCount = 2; },
+        {"memberCount", "class A { uint8 a(uint8 a, uint8 b, uint8 c); };", [](CompileLimits& l) { l.memberCount = 2; },
          "class A { uint8 a(uint8 a, uint8 b); };"},
         {"memberCount", "[Version(\"1.0.0\"), Description(\"d\"), Experimental(false)] class A {};",
-         [](Limits& l) { l.memberCount = 2; }, "[Version(\"1.0.0\"), Description(\"d\")] class A {};"},
+         [](CompileLimits& l) { l.memberCount = 2; }, "[Version(\"1.0.0\"), Description(\"d\")] class A {};"},
     };
     for (const Row& row : rows) {
         CompileOptions tight = options();

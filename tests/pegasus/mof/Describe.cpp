@@ -36,7 +36,7 @@ std::string originText(const CIMName& origin)
     return origin.isNull() ? "" : "@" + utf8(origin.getString());
 }
 
-template <class Owner> std::string qualifiersText(const Owner& owner)
+template <typename Owner> std::string qualifiersText(const Owner& owner)
 {
     std::string text;
     for (Uint32 i = 0; i < owner.getQualifierCount(); ++i) {
