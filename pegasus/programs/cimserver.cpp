@@ -3,6 +3,7 @@
 #include "pegasus/programs/StopCommand.h"
 #include "pegasus/server/Server.h"
 #include "pegasus/server/admin/TreeClaim.h"
+#include "pegasus/server/admin/TreeOwners.h"
 #include "pegasus/server/agent/Agent.h"
 
 #include <Pegasus/Common/Exception.h>
@@ -43,6 +44,7 @@ int start(const ServerCommand& command, const std::string& home)
     if (command.foreground) {
         config.setFromCommandLine("daemon", "false");
     }
+    server::requireOwnTree(config);
     std::string error;
     if (config.flag("daemon")) {
         error = server::launchDaemon([&](server::LaunchSignal& signal) { serve(config, signal, error); }).error;
@@ -94,6 +96,9 @@ int main(int argc, char** argv)
     }
     try {
         return run(programs::parseServerCommand(std::vector<std::string>(argv + 1, argv + argc)));
+    } catch (const server::StartError& error) {
+        std::cerr << error.what() << "\n";
+        return 1;
     } catch (const std::exception& error) {
         std::cerr << "cimserver not started: " << error.what() << "\n";
         return 1;

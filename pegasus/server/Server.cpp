@@ -47,7 +47,7 @@ AgentSettings agentSettings(const Config& config)
     settings.providerDirectories = config.directories("providerDir");
     settings.patience = config.seconds("providerTimeout");
     settings.idle = config.seconds("agentIdleTimeout");
-    settings.memoryMegabytes = config.number("agentMemoryMegabytes");
+    settings.process = {config.number("agentMemoryMegabytes"), config.flag("strictOwners")};
     return settings;
 }
 

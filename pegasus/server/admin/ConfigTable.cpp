@@ -20,6 +20,8 @@ const std::vector<ConfigProperty>& configTable()
         {"consumer", "quvex", Kind::kConsumer, false, "for whom the server runs; names the start file in /var/tmp"},
         {"providerDir", "lib", Kind::kDirectoryList, true, "where provider libraries are searched, in this order"},
         {"repositoryDir", "repository", Kind::kDirectory, false, "where classes and instances are kept"},
+        {"strictOwners", "true", Kind::kBoolean, false,
+         "refuse a tree, program or provider library that users other than root and this one can change"},
         {"logLevel", "INFORMATION", Kind::kLogLevel, true, "least severity that is logged"},
         {"shutdownTimeout", "3", Kind::kCount, true, "seconds that running requests get at the end"},
         {"idleConnectionTimeout", "0", Kind::kCountOrZero, true,

@@ -56,7 +56,7 @@ std::string readOwnFile(const std::string& path, std::size_t maxBytes)
     const Descriptor file(::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
     struct stat info = {};
     if (!file || ::fstat(file.get(), &info) != 0 || !S_ISREG(info.st_mode) ||
-        (info.st_uid != 0 && info.st_uid != ::geteuid()))
+        (info.st_uid != 0 && info.st_uid != ::geteuid()) || (info.st_mode & S_IWOTH) != 0)
     {
         return {};
     }

@@ -9,8 +9,8 @@ namespace Pegasus::server {
 // Throws: std::system_error.
 void writePrivateFile(const std::string& path, const std::string& content);
 
-// Returns: at most `maxBytes` of the file; empty if it is missing, unreadable, not a regular file, or not root's or the
-// user's own. A link is not followed, and a FIFO does not hold the caller.
+// Returns: at most `maxBytes` of the file; empty if it is missing, unreadable, not a regular file, not root's or the
+// user's own, or writable by everybody. A link is not followed, and a FIFO does not hold the caller.
 std::string readOwnFile(const std::string& path, std::size_t maxBytes);
 
 } // namespace Pegasus::server

@@ -113,7 +113,7 @@ void limitMemory(std::size_t megabytes)
 
 bool isAgentCommand(int argc, char** argv)
 {
-    return argc == 4 && std::strcmp(argv[1], "--agent") == 0;
+    return argc == 5 && std::strcmp(argv[1], "--agent") == 0;
 }
 
 int runAgent(int, char** argv)
@@ -123,7 +123,7 @@ int runAgent(int, char** argv)
     limitMemory(std::strtoul(argv[3], nullptr, 10));
     Log::open(defaultHome(), false);
     AgentServices services(argv[2]);
-    auto handler = std::make_unique<AgentHandler>(argv[2], services);
+    auto handler = std::make_unique<AgentHandler>(argv[2], services, std::strcmp(argv[4], "any") != 0);
     ChannelThreads threads;
     while (Descriptor channel = receiveChannel()) {
         threads.serve(std::move(channel), *handler);

@@ -1,5 +1,6 @@
 #include "pegasus/server/agent/AgentHandler.h"
 
+#include "pegasus/base/OwnedPath.h"
 #include "pegasus/server/agent/AgentMessages.h"
 #include "pegasus/wire/ElementEncoder.h"
 
@@ -28,9 +29,26 @@ cmpi::ProviderModule& AgentHandler::module(const HttpRequest& http)
 {
     const std::lock_guard<std::mutex> lock(fMutex);
     if (!fModule) {
-        fModule = std::make_unique<cmpi::ProviderModule>(fModuleName, privateHeader(http, "PG-Library"), fServices);
+        const std::string library = privateHeader(http, "PG-Library");
+        if (fStrictOwners) {
+            requireOwned(library);
+        }
+        fModule = std::make_unique<cmpi::ProviderModule>(fModuleName, library, fServices);
     }
     return *fModule;
+}
+
+// Whoever can change the library, or put another one into its folder, would run as this user.
+void AgentHandler::requireOwned(const std::string& library) const
+{
+    std::string fault = base::ownershipFault(library.substr(0, library.rfind('/') + 1));
+    if (fault.empty()) {
+        fault = base::ownershipFault(library);
+    }
+    if (!fault.empty()) {
+        const std::string text = "Provider module \"" + fModuleName + "\" is not loaded: " + fault;
+        throw CIMException(CIM_ERR_FAILED, String(text.c_str()));
+    }
 }
 
 void AgentHandler::handle(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)

@@ -12,8 +12,10 @@ namespace Pegasus::server {
 class AgentHandler : public RequestHandler
 {
   public:
+    // `strictOwners`: refuse a library that users other than root and this one can change.
     // Requires: services outlive this.
-    AgentHandler(const std::string& module, cmpi::BrokerServices& services) : fModuleName(module), fServices(services)
+    AgentHandler(const std::string& module, cmpi::BrokerServices& services, bool strictOwners)
+        : fModuleName(module), fServices(services), fStrictOwners(strictOwners)
     {
     }
 
@@ -22,6 +24,7 @@ class AgentHandler : public RequestHandler
 
   private:
     cmpi::ProviderModule& module(const HttpRequest& http);
+    void requireOwned(const std::string& library) const;
     void unload();
     void enumerateInstances(const HttpRequest& http, const CimRequest& request, CimAnswer& answer);
     void enumerateInstanceNames(const HttpRequest& http, const CimRequest& request, CimAnswer& answer);
@@ -30,6 +33,7 @@ class AgentHandler : public RequestHandler
 
     std::string fModuleName;
     cmpi::BrokerServices& fServices;
+    bool fStrictOwners;
     std::mutex fMutex; // held while the library is loaded
     std::unique_ptr<cmpi::ProviderModule> fModule;
 };

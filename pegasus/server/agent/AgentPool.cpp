@@ -110,7 +110,7 @@ std::shared_ptr<AgentProcess> AgentPool::acquire(const std::string& name)
                  " times without an answer; it is not started again yet.");
         }
         try {
-            module.process = std::make_shared<AgentProcess>(name, fMakeSettings().memoryMegabytes);
+            module.process = std::make_shared<AgentProcess>(name, fMakeSettings().process);
         } catch (const std::system_error& error) {
             fail(error.what());
         }

@@ -14,7 +14,7 @@ struct AgentSettings
     std::vector<std::string> providerDirectories;
     std::chrono::milliseconds patience = std::chrono::minutes(10);
     std::chrono::milliseconds idle = std::chrono::minutes(5); // zero: for ever
-    std::size_t memoryMegabytes = 0;
+    AgentProcess::Options process;
 };
 
 // The agents, one a provider module: started at a module's first request, ended when idle, started again after a crash.

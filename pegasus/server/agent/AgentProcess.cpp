@@ -66,14 +66,15 @@ struct SpawnPlan
     SpawnPlan& operator=(const SpawnPlan&) = delete;
 };
 
-pid_t spawnAgent(const std::string& module, std::size_t memoryMegabytes, Descriptor control)
+pid_t spawnAgent(const std::string& module, const AgentProcess::Options& options, Descriptor control)
 {
     if (control.get() == kAgentControlFd) {
         control.reset(::fcntl(control.release(), F_DUPFD_CLOEXEC, kAgentControlFd + 1));
     }
     const SpawnPlan plan(control.get());
-    std::string words[] = {kAgentProcessName, "--agent", module, std::to_string(memoryMegabytes)};
-    char* argv[] = {words[0].data(), words[1].data(), words[2].data(), words[3].data(), nullptr};
+    std::string words[] = {kAgentProcessName, "--agent", module, std::to_string(options.memoryMegabytes),
+                           options.strictOwners ? "strict" : "any"};
+    char* argv[] = {words[0].data(), words[1].data(), words[2].data(), words[3].data(), words[4].data(), nullptr};
     pid_t pid = -1;
     // Run through this link the process is never called cimserver, not even before it names itself.
     const int error = ::posix_spawn(&pid, "/proc/self/exe", &plan.actions, &plan.attributes, argv, environ);
@@ -108,11 +109,11 @@ bool sendDescriptor(int control, int fd)
 
 } // namespace
 
-AgentProcess::AgentProcess(const std::string& module, std::size_t memoryMegabytes) : fModule(module)
+AgentProcess::AgentProcess(const std::string& module, const Options& options) : fModule(module)
 {
     SocketPair control = makeSocketPair();
     fControl = std::move(control.ours);
-    fPid = spawnAgent(module, memoryMegabytes, std::move(control.theirs));
+    fPid = spawnAgent(module, options, std::move(control.theirs));
     try {
         fWatcher = std::thread([this] { watch(); });
     } catch (...) {

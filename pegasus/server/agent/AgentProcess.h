@@ -21,9 +21,14 @@ namespace Pegasus::server {
 class AgentProcess
 {
   public:
-    // Starts the process. `memoryMegabytes` bounds its address space; 0 does not.
-    // Throws: std::system_error.
-    AgentProcess(const std::string& module, std::size_t memoryMegabytes);
+    struct Options
+    {
+        std::size_t memoryMegabytes = 0; // bounds its address space; 0 does not
+        bool strictOwners = true;        // whether a library that other users can change is refused
+    };
+
+    // Starts the process. Throws: std::system_error.
+    AgentProcess(const std::string& module, const Options& options);
     // Closes the control socket, gives the process a moment, then kills it.
     ~AgentProcess();
     AgentProcess(const AgentProcess&) = delete;

@@ -11,6 +11,7 @@
 #include <memory>
 
 #include <signal.h>
+#include <sys/stat.h>
 
 namespace servertest {
 namespace {
@@ -163,6 +164,35 @@ TEST_F(AgentTest, anErrorLeavesNothingDelivered)
     EXPECT_EQ(answer.body.find("IRETURNVALUE"), std::string::npos);
     EXPECT_EQ(answer.trailers.at("cimstatuscodedescription"),
               "CIM_ERR_ACCESS_DENIED%3A%20the%20probe%20says%20no%3A%20%C3%A9");
+}
+
+// Whoever can change a library, or the folder that it is taken from, would run as the server's user.
+TEST_F(AgentTest, aLibraryThatOthersCanChangeIsNotLoaded)
+{
+    for (const bool strict : {true, false}) {
+        SCOPED_TRACE(strict ? "strict" : "strictOwners=false");
+        ServerTree tree;
+        tree.start({strict ? "strictOwners=true" : "strictOwners=false"});
+        tree.installProbe();
+        CIMClient client;
+        client.connect("127.0.0.1", tree.port(), String(), String());
+        const std::string folder = tree.home() + "/provider/probe";
+        const auto load = [&] { return errorOf([&] { call(client, "Probe_Bulk", "ProcessId"); }); };
+        for (const auto& [path, open, closed] :
+             {std::tuple(folder + "/libprobe.so", 0666u, 0644u), {folder, 0777u, 0755u}})
+        {
+            ASSERT_EQ(::chmod(path.c_str(), open), 0);
+            char mode[8];
+            std::snprintf(mode, sizeof mode, "%04o", open);
+            const std::string said = load();
+            const std::string refusal = "CIM_ERR_FAILED: Provider module \"ProbeModule\" is not loaded: " + path;
+            EXPECT_EQ(said.rfind(strict ? refusal : "no error", 0), 0u) << said;
+            EXPECT_EQ(said.find(std::string(", mode ") + mode + ") can be changed by users other") != std::string::npos,
+                      strict);
+            ASSERT_EQ(::chmod(path.c_str(), closed), 0);
+        }
+        EXPECT_EQ(load(), "no error");
+    }
 }
 
 TEST_F(AgentTest, aDeathIsReportedWithModuleAndCauseAndTheOthersGoOn)

@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
@@ -246,6 +247,72 @@ TEST(ProgramTest, takesThePlaceOfAServerWhoseRepositoryIsGone)
                       "Error in server shutdown: The repository may be empty.\nForced shutdown initiated.\n"}});
         EXPECT_FALSE(fs::exists("/var/tmp/cimserverkol_tc_" + consumer + "_start.conf"));
     }
+}
+
+// Whoever can change the tree would run as the user who starts the server.
+TEST(ProgramTest, refusesATreeThatOthersCanChange)
+{
+    ServerTree tree;
+    const std::string home = tree.home();
+    fs::create_directories(home + "/bin");
+    fs::create_directories(home + "/provider/vendor");
+    std::ofstream(home + "/lib/liba.so") << "x";
+    struct Row
+    {
+        const char* name;
+        std::string path;
+        unsigned mode;
+        bool foreign; // belongs to another user
+        const char* property;
+    };
+    const Row rows[] = {
+        {"home", home, 0777, false, "logLevel=ERROR"},
+        {"home of another user", home, 0755, true, "logLevel=ERROR"},
+        {"folder above", fs::path(home).parent_path().string(), 0777, false, "logLevel=ERROR"},
+        {"programs", home + "/bin", 0777, false, "logLevel=ERROR"},
+        {"libraries", home + "/lib", 0755, true, "logLevel=ERROR"},
+        {"a library", home + "/lib/liba.so", 0646, false, "logLevel=ERROR"},
+        {"providers", home + "/provider", 0777, false, "logLevel=ERROR"},
+        {"a provider's folder", home + "/provider/vendor", 0777, false, "providerDir=provider/vendor"},
+    };
+    for (const Row& row : rows) {
+        SCOPED_TRACE(row.name);
+        if (row.foreign && ::geteuid() != 0) {
+            std::cout << "[  SKIPPED ] " << row.name << ": needs root, to give files away\n";
+            continue;
+        }
+        struct stat before = {};
+        ASSERT_EQ(::stat(row.path.c_str(), &before), 0);
+        ASSERT_EQ(::chmod(row.path.c_str(), row.mode), 0);
+        ASSERT_EQ(row.foreign ? ::chown(row.path.c_str(), 65534, 65534) : 0, 0);
+        const ProgramResult refused = tree.run("cimserver", {row.property});
+        EXPECT_EQ(refused.exitStatus, 1);
+        EXPECT_EQ(refused.err.rfind("cimserver not started: " + row.path + " (owner ", 0), 0u) << refused.err;
+        EXPECT_EQ(std::count(refused.err.begin(), refused.err.end(), '\n'), 1) << refused.err;
+        EXPECT_FALSE(fs::exists(home + "/cimserver.lock"));
+        EXPECT_NO_THROW(tree.start({row.property, "strictOwners=false"}));
+        EXPECT_EQ(::kill(tree.serverProcess(), SIGTERM), 0);
+        EXPECT_TRUE(eventually([&] { return !fs::exists(home + "/cimserver.lock"); }));
+        ASSERT_EQ(row.foreign ? ::chown(row.path.c_str(), before.st_uid, before.st_gid) : 0, 0);
+        ASSERT_EQ(::chmod(row.path.c_str(), before.st_mode & 07777), 0);
+    }
+    EXPECT_NO_THROW(tree.start());
+}
+
+// A laboratory's exception is the user's own to make: another user's configuration file does not count.
+TEST(ProgramTest, anotherUsersConfigurationIsNotRead)
+{
+    if (::geteuid() != 0) {
+        GTEST_SKIP() << "needs root, to give files away";
+    }
+    ServerTree tree;
+    const std::string planned = tree.home() + "/cimserver_planned.conf";
+    ASSERT_EQ(::chmod(tree.home().c_str(), 0777), 0);
+    std::ofstream(planned) << "strictOwners=false\n";
+    ASSERT_EQ(::chown(planned.c_str(), 65534, 65534), 0);
+    EXPECT_EQ(tree.run("cimserver", {}).exitStatus, 1);
+    ASSERT_EQ(::chown(planned.c_str(), 0, 0), 0);
+    EXPECT_NO_THROW(tree.start());
 }
 
 TEST(ProgramTest, endsInOrderOnSignals)
