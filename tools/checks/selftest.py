@@ -45,7 +45,7 @@ FAULTS = [
     ("forbidden", "src/common/P{n}.cpp", 'void f()\n{\n    std::cout << 1;\n}\n', ":3:"),
     ("dead", "src/common/P{n}.cpp", "int unused;\n", " is compiled by no target"),
     ("dead", "src/common/P{n}.h", "#pragma once\n", " is included by nobody"),
-    ("limits", "src/common/P{n}.h", "constexpr int kMaxPlanted = 1;\n", "kMaxPlanted is missing in docs/limits.md"),
+    ("limits", "src/common/P{n}.h", "constexpr int kMaxPlanted = 1;\n", "is missing in docs/limits.md"),
 ]
 
 
