@@ -100,7 +100,7 @@ CIMParameter ClassParser::parseParameter()
     return parameter;
 }
 
-// A second property of one name is left out, as OpenPegasus's compiler does.
+// Leaves out a second property of one name with a warning, as OpenPegasus's compiler does.
 void ClassParser::addProperty(CIMClass& owner, const CIMProperty& property, std::size_t offset)
 {
     if (owner.findProperty(property.getName()) == PEG_NOT_FOUND) {

@@ -10,14 +10,15 @@
 
 namespace Pegasus::mof {
 
-// A class and the alias that its declaration gave it, if any.
+// A class and the alias that its declaration gave it; empty for none.
 struct ParsedClass
 {
     CIMClass itsClass;
     std::string alias;
 };
 
-// Parses classes, associations and indications: they differ in their qualifiers only. Throws MofError.
+// Parses classes, associations and indications, which differ in their qualifiers only.
+// Throws: MofError from every member.
 class ClassParser
 {
   public:
@@ -26,7 +27,7 @@ class ClassParser
     {
     }
 
-    // The text behind the word "class", up to and with the semicolon.
+    // Parses what follows the word "class", up to and including the semicolon.
     ParsedClass parse(const Qualifiers& qualifiers);
 
   private:

@@ -6,7 +6,8 @@
 
 namespace Pegasus::mof {
 
-// What the files of one compilation share.
+// What the files of one compilation share: the target, the aliases and the waiting instances. An included file is
+// compiled in the middle of the including one and may use and define aliases of it.
 struct Compilation
 {
     Compilation(const CompileOptions& given, DefinitionHandler& target)

@@ -8,7 +8,7 @@
 
 namespace Pegasus::mof {
 
-// Bounds on what a file may demand; each violation is an error at its place that names the limit.
+// Bounds on what a file may demand. Exceeding one is an error at its place; the message names the limit.
 struct CompileLimits
 {
     std::size_t fileBytes = 64u << 20;     // one source file
@@ -30,11 +30,18 @@ struct CompileOptions
 
 // Compiles one MOF file (DSP0004 v2) and what it includes, definition by definition, into a handler.
 //
+// It is one pass: a definition is parsed, typed and delivered before the next one is read. A qualifier takes its type
+// from its declaration and an instance's value from its class, both as the handler knows them at that moment, so both
+// must come first in the text. Only aliases may be used before their definition: such instances wait.
+//
 // An include is looked for in the including file's directory, the current directory and the include directories.
-// Throws MofError at the first error; what came before it has been delivered, nothing of the failed definition has.
+//
+// Throws: MofError at the first error; definitions before it have been delivered, nothing of the failed one. FileError
+//     when `path` cannot be read. Pegasus::Exception of the handler's useNamespace() for the initial namespace.
+// Blocks: as long as the handler, and for reading files.
 void compileFile(const std::string& path, const CompileOptions& options, DefinitionHandler& handler);
 
-// As compileFile, for text in memory; name stands for the file in messages and its directory for includes.
+// As compileFile, for text in memory. `name` stands for the file in messages; its directory is searched for includes.
 void compileText(const std::string& text, const std::string& name, const CompileOptions& options,
                  DefinitionHandler& handler);
 

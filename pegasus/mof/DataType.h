@@ -7,16 +7,18 @@
 
 namespace Pegasus::mof {
 
-// Is the word one of DSP0004's data types? Sets type if so.
+// The parts of a declaration that say a type. All functions but the first throw MofError.
+
+// Returns: true for the word of a DSP0004 data type, and sets `type`.
 bool isDataType(const Token& word, CIMType& type);
 
-// "[]", "[n]" or nothing. Throws MofError.
+// Parses "[]", "[n]" or nothing, and completes `type`.
 void parseArraySuffix(TokenCursor& cursor, ValueType& type);
 
-// A type at the cursor, or a class name and REF, which also sets referenceClass. Throws MofError.
+// Parses a data type, or a class name and REF, which also sets `referenceClass`.
 ValueType parseElementType(TokenCursor& cursor, CIMName& referenceClass);
 
-// A CIM name at the cursor; what says which in the message. Throws MofError.
+// Parses a CIM name; `what` describes it in the message.
 CIMName parseName(TokenCursor& cursor, std::string_view what);
 
 } // namespace Pegasus::mof

@@ -25,7 +25,7 @@ template <typename T> bool qualifierValue(const CIMConstClass& owner, const char
     return true;
 }
 
-// m.n.u, digits all (DSP0004, Version). The DMTF's own files leave out the last part now and then.
+// Returns: true for m.n.u, all digits (DSP0004, Version). Some files of the DMTF leave out the last parts.
 bool isVersion(const std::string& text)
 {
     int dotCount = 0;
@@ -93,7 +93,7 @@ void FileCompiler::defineClass(const Qualifiers& qualifiers)
     }
 }
 
-// Classes with a true Experimental or a malformed Version are left out with a warning, as OpenPegasus's compiler does.
+// Leaves out classes with a true Experimental or a malformed Version, with a warning, as OpenPegasus's compiler does.
 bool FileCompiler::isWelcome(const CIMClass& newClass)
 {
     const std::string start =

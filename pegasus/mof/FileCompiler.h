@@ -9,13 +9,15 @@
 
 namespace Pegasus::mof {
 
-// Compiles the definitions of one file in order; an include is a further FileCompiler of the same compilation.
+// Compiles the definitions of one file in order. An include is compiled by a further FileCompiler of the same
+// compilation.
+// Requires: what the constructor takes outlives the compiler.
 class FileCompiler
 {
   public:
     FileCompiler(const SourceText& source, Compilation& compilation);
 
-    // Throws MofError.
+    // Throws: MofError at the first error.
     void run();
 
   private:
@@ -32,7 +34,7 @@ class FileCompiler
     const SourceText& fSource;
     Compilation& fCompilation;
     TokenCursor fCursor;
-    std::size_t fSubject = 0; // offset of what an error of the current definition is about, unless it knows better
+    std::size_t fSubject = 0; // where an error is reported that has no place of its own, such as the handler's
 };
 
 } // namespace Pegasus::mof

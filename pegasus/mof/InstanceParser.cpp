@@ -18,7 +18,7 @@ bool isGiven(const ParsedInstance& parsed, const CIMName& name)
            std::any_of(parsed.open.begin(), parsed.open.end(), isSame);
 }
 
-// A class that comes from a server may have the types already.
+// A class from a server may have the embedded types; one from MOF has strings with a qualifier.
 bool isEmbeddedObject(const CIMConstProperty& declared)
 {
     return declared.getType() == CIMTYPE_OBJECT ||
@@ -66,7 +66,7 @@ CIMClass InstanceParser::parseClass()
     return found;
 }
 
-// Qualifiers of instances have no meaning any more (DSP0004, 7.9): they are read and dropped.
+// Qualifiers of instances have lost their meaning (DSP0004, 7.9): they are parsed and dropped.
 void InstanceParser::parseValue(ParsedInstance& parsed)
 {
     fQualifiers.parseList();
@@ -125,8 +125,8 @@ CIMValue InstanceParser::embeddedValue(const Initializer& initializer, const CIM
     return declared.isArray() ? CIMValue(instances) : CIMValue(instances[0]);
 }
 
-// An embedded instance is a string that holds its MOF (DSP0004, EmbeddedInstance). Each nesting takes longer escapes
-// for the quotes within, so the length of a string bounds the depth.
+// An embedded instance is a string that holds its MOF (DSP0004, EmbeddedInstance). Recursion is bounded by the length
+// of a string: each level doubles the escapes of the quotes within.
 CIMInstance InstanceParser::parseEmbedded(const Literal& literal)
 {
     if (literal.kind != Literal::Kind::kString) {

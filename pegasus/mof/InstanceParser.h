@@ -5,7 +5,8 @@
 
 namespace Pegasus::mof {
 
-// Parses instances; the types of their values come from their classes. Throws MofError.
+// Parses instances. The types of their values come from their classes.
+// Throws: MofError from every member.
 class InstanceParser
 {
   public:
@@ -14,7 +15,7 @@ class InstanceParser
     {
     }
 
-    // The text behind the word "instance", up to and with the semicolon.
+    // Parses what follows the word "instance", up to and including the semicolon.
     ParsedInstance parse();
 
   private:

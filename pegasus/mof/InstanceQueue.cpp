@@ -43,7 +43,7 @@ void InstanceQueue::finish() const
     throw MofError(reference.place, "alias $" + reference.alias + " is not defined");
 }
 
-// Goes on until a whole round changes nothing: each alias that gets a path may be what another instance waits for.
+// Repeats until a whole round changes nothing: another instance may wait for an alias that this round gave its path.
 void InstanceQueue::settle()
 {
     bool hasProgress = true;

@@ -10,7 +10,7 @@
 
 namespace Pegasus::mof {
 
-// A reference property whose value is an alias that was not defined yet.
+// A reference property whose value is an alias without a path yet.
 struct OpenReference
 {
     CIMName property;
@@ -28,16 +28,18 @@ struct ParsedInstance
     SourcePlace place;
 };
 
-// Delivers instances to the handler. One that uses an alias from further down (DSP0004 permits it, in circles too)
-// waits until that alias has a path; an alias has one as soon as the keys of its instance are known.
+// Delivers instances to the handler. DSP0004 lets an instance use an alias that is defined further down, in circles
+// too. Such an instance waits until the alias has a path, which it has as soon as the keys of its own instance are
+// known. Requires: what the constructor takes outlives the queue.
 class InstanceQueue
 {
   public:
     InstanceQueue(DefinitionHandler& handler, AliasTable& aliases) : fHandler(handler), fAliases(aliases) {}
 
-    // Throws MofError for an alias that is taken; passes the handler's exceptions on.
+    // Delivers the instance and those that waited for it, or lets it wait.
+    // Throws: MofError for an alias that is defined already; what the handler throws.
     void submit(ParsedInstance parsed);
-    // Throws MofError at a reference whose alias never came.
+    // Throws: MofError at a reference whose alias was never defined.
     void finish() const;
 
   private:

@@ -43,7 +43,8 @@ std::string shownByte(char c)
     return text;
 }
 
-// A code unit as UTF-8. Each half of a surrogate pair takes three bytes; CIM strings put the halves together again.
+// Appends a UTF-16 code unit as UTF-8. Each half of a surrogate pair becomes three bytes; String joins the halves
+// again.
 void appendCodeUnit(std::string& value, unsigned unit)
 {
     if (unit < 0x80u) {
@@ -59,7 +60,7 @@ void appendCodeUnit(std::string& value, unsigned unit)
     value += static_cast<char>(0x80u | (unit & 0x3Fu));
 }
 
-// What a one-letter escape stands for, or NUL if it is none.
+// Returns: what a one-letter escape stands for; NUL for another letter.
 char simpleEscape(char letter)
 {
     switch (letter) {
@@ -164,7 +165,8 @@ Token Lexer::word(TokenKind kind, std::size_t start)
     return Token{kind, fText.substr(first, fAt - first), start};
 }
 
-// Takes everything that can belong to a number; whether it is one in which base is decided where its value is made.
+// Takes every character that can belong to a number. Its value is made, and its spelling checked, where the type is
+// known.
 Token Lexer::number()
 {
     const std::size_t start = fAt;

@@ -6,15 +6,15 @@
 
 namespace Pegasus::mof {
 
-// Cuts a source text into tokens; blanks and comments go, adjacent string literals become one token.
-//
-// Ownership: keeps references to the text and the limits.
+// Cuts a source text into tokens. Blanks and comments are dropped; adjacent string literals become one token.
+// Requires: the text and the limits outlive the lexer.
 class Lexer
 {
   public:
     Lexer(const SourceText& source, const CompileLimits& limits);
 
-    // Throws MofError at the offending byte.
+    // Returns: the next token; kEnd at the end, repeatedly.
+    // Throws: MofError at the offending byte.
     Token next();
 
   private:

@@ -8,7 +8,7 @@
 
 namespace Pegasus::mof {
 
-// A constant as written, before it is known which type it must have.
+// A constant as written. Its type is known only where it is used.
 struct Literal
 {
     enum class Kind
@@ -26,25 +26,25 @@ struct Literal
     std::string text;
     std::size_t offset = 0;
 
-    // How a diagnostic shows it: 256, "a string", …
+    // Returns: how a diagnostic shows it: 256, "a string", …
     std::string shown() const;
 };
 
-// What stands behind an equal sign, or in a qualifier's parentheses or braces.
+// What follows an equal sign, or stands in a qualifier's parentheses or braces.
 struct Initializer
 {
     bool isArray = false;
-    std::vector<Literal> elements; // exactly one if it is no array
+    std::vector<Literal> elements; // exactly one unless it is an array
     std::size_t offset = 0;
 
     bool isNull() const { return !isArray && elements.front().kind == Literal::Kind::kNull; }
 };
 
-// Throw MofError.
+// These functions throw MofError.
 Literal parseLiteral(TokenCursor& cursor);
-// The braces of an array are expected at the cursor.
+// Parses an array in braces.
 Initializer parseArrayInitializer(TokenCursor& cursor);
-// Either form.
+// Parses either form.
 Initializer parseInitializer(TokenCursor& cursor);
 
 } // namespace Pegasus::mof

@@ -8,8 +8,8 @@
 
 namespace Pegasus::mof {
 
-// Keeps definitions in memory, one namespace at a time, and checks no more than that superclasses exist.
-// For looking at a file without a server.
+// Keeps definitions in memory, one namespace at a time, for checking and comparing a file without a server. Of CIM's
+// rules it checks that superclasses exist.
 class MemoryHandler : public DefinitionHandler
 {
   public:
@@ -22,7 +22,7 @@ class MemoryHandler : public DefinitionHandler
     void warn(const std::string& place, const std::string& text) override;
 
     const std::map<std::string, CIMQualifierDecl>& qualifiers() const noexcept { return fQualifiers; }
-    // As declared, in order.
+    // As declared, in the order of the text.
     const std::vector<CIMClass>& classes() const noexcept { return fClasses; }
     const std::vector<CIMInstance>& instances() const noexcept { return fInstances; }
     // "place: warning: text"

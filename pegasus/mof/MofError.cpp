@@ -14,7 +14,7 @@ MofError::MofError(SourcePlace place, const std::string& cause)
 
 namespace {
 
-// Blanks up to the column; tabs stay tabs, so that the caret lines up in any terminal.
+// Returns: blanks up to the column. Tabs stay tabs, so that the caret lines up in any terminal.
 std::string caretIndent(const std::string& lineText, std::size_t column)
 {
     std::string indent;

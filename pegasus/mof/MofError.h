@@ -6,15 +6,15 @@
 
 namespace Pegasus::mof {
 
-// A place in a source text; lines and columns count from 1, columns in bytes.
+// A place in a source text. Lines and columns count from 1, columns in bytes.
 struct SourcePlace
 {
     std::string file;
     std::size_t line = 1;
     std::size_t column = 1;
-    std::string lineText; // the whole line, for the caret; empty where none can be shown
+    std::string lineText; // the whole line, for the caret; empty when it is too long to show
 
-    // "file:line:column"
+    // Returns: "file:line:column".
     std::string text() const;
 };
 
@@ -27,7 +27,7 @@ class MofError : public std::runtime_error
     const SourcePlace& place() const noexcept { return fPlace; }
     const std::string& cause() const noexcept { return fCause; }
 
-    // "file:line:column: error: cause", the line, and a caret below the column; ends with a newline.
+    // Returns: "file:line:column: error: cause", the line, and a caret below the column; ends with a newline.
     std::string diagnostic() const;
 
   private:

@@ -157,7 +157,7 @@ CIMScope QualifierParser::parseScopes()
     return scopes;
 }
 
-// The words behind a use: they stand side by side.
+// Parses the flavors after the colon of a use: words without commas.
 CIMFlavor QualifierParser::parseUseFlavors(CIMFlavor flavor)
 {
     do {

@@ -12,15 +12,16 @@ namespace Pegasus::mof {
 
 using Qualifiers = std::vector<CIMQualifier>;
 
-// Parses uses and declarations of qualifiers. All functions throw MofError.
+// Parses uses and declarations of qualifiers.
+// Throws: MofError from every member.
 class QualifierParser
 {
   public:
     QualifierParser(TokenCursor& cursor, Compilation& compilation) : fCursor(cursor), fCompilation(compilation) {}
 
-    // A list in brackets, or nothing. A use without flavors of its own has the flavor NONE; its declaration decides.
+    // Parses a list in brackets, or nothing. A use without flavors has the flavor NONE: its declaration decides.
     Qualifiers parseList();
-    // The text behind the word "qualifier", up to and with the semicolon.
+    // Parses what follows the word "qualifier", up to and including the semicolon.
     CIMQualifierDecl parseDeclaration();
 
   private:

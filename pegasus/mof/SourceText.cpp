@@ -14,7 +14,7 @@ namespace Pegasus::mof {
 
 namespace {
 
-// Long lines are cut for the diagnostic: a megabyte on one line helps nobody.
+// A diagnostic leaves out longer lines: the place and the cause would be lost in them.
 constexpr std::size_t kShownLineBytes = 240;
 
 ssize_t readSome(int descriptor, char* buffer, std::size_t size)

@@ -6,24 +6,27 @@
 
 namespace Pegasus::mof {
 
-// A parser's view of a text: one token of look-ahead, and the ways to insist on the next one.
-// A token is only cut when it is looked at, so that a fault behind a definition does not spoil the definition.
+// A parser's view of a text: the current token, and functions that expect or skip it.
+// A token is cut when it is looked at. So a definition is delivered before an error right after it is found.
+// Requires: the text and the limits outlive the cursor.
 class TokenCursor
 {
   public:
     TokenCursor(const SourceText& source, const CompileLimits& limits);
 
     const Token& current();
-    // Returns the current token and moves on.
+    // Returns: the current token, and moves on.
     Token take();
 
     bool atPunctuation(char sign) { return current().isPunctuation(sign); }
     bool atWord(std::string_view word) { return current().isWord(word); }
-    // Moves on and returns true if the current token is this one.
+    // Moves on if the current token is this one.
+    // Returns: whether it was.
     bool skipPunctuation(char sign);
     bool skipWord(std::string_view word);
 
-    // Throw MofError "expected … instead of …" at the current token unless it is of this kind.
+    // Moves on.
+    // Throws: MofError "expected … instead of …" at the current token unless it is of this kind.
     void expectPunctuation(char sign);
     Token expect(TokenKind kind, std::string_view what);
 

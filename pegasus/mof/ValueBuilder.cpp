@@ -13,7 +13,7 @@ namespace Pegasus::mof {
 
 namespace {
 
-// Converts the literals of one value; holds what every conversion needs.
+// Converts the literals of one value to one type.
 class Converter
 {
   public:
@@ -53,7 +53,7 @@ bool parseDigits(const char* begin, const char* end, int base, Uint64& magnitude
     return error == std::errc() && stop == end && begin != end;
 }
 
-// DSP0004: 0x… hexadecimal, …b binary, 0… octal, else decimal; the sign is gone already.
+// DSP0004: 0x… hexadecimal, …b binary, 0… octal, else decimal. `start` is after the sign.
 bool parseMagnitude(const std::string& text, std::size_t start, Uint64& magnitude)
 {
     const char* begin = text.data() + start;

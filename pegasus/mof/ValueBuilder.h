@@ -8,7 +8,7 @@
 
 namespace Pegasus::mof {
 
-// The type that a value must take on.
+// The type that a value must have.
 struct ValueType
 {
     CIMType type = CIMTYPE_BOOLEAN;
@@ -16,11 +16,13 @@ struct ValueType
     Uint32 arraySize = 0; // the fixed number of elements, 0 for any
 };
 
-// Gives a written constant its type. Throws MofError at the literal that does not fit; references look into aliases.
+// Converts a written constant to its type. References to aliases take their paths from `aliases`.
+// Throws: MofError at the literal that does not fit.
 CIMValue buildValue(const TokenCursor& cursor, const AliasTable& aliases, const Initializer& initializer,
                     const ValueType& type);
 
-// UTF-8 to CIM text. Throws MofError at offset if the bytes are not valid UTF-8.
+// Converts UTF-8 to CIM text.
+// Throws: MofError at `offset` when the bytes are not valid UTF-8.
 String cimString(const TokenCursor& cursor, const std::string& text, std::size_t offset);
 
 } // namespace Pegasus::mof
