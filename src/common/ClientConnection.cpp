@@ -12,6 +12,7 @@ namespace NKOLVRX20 {
 namespace {
 
 constexpr Pegasus::Uint32 kCreationTimeoutMs = 10000;
+// About 18 hours: every call is expected to set a timeout of its own.
 constexpr Pegasus::Uint32 kConnectedTimeoutMs = 65535000;
 constexpr int kTries = 3;
 constexpr unsigned int kPauseSeconds = 1;
@@ -55,6 +56,14 @@ void TClientConnection::Connect(const std::string& host, unsigned short port, co
         }
     }
     throw TVRXException(TVRXStatusCode::kServerConnectionFailed);
+}
+
+Pegasus::CIMClient& TClientOwner::ConnectedClient() const
+{
+    if (!isConnected()) {
+        throw Pegasus::NotConnectedException();
+    }
+    return *getPegClient();
 }
 
 } // namespace NKOLVRX20

@@ -54,4 +54,23 @@ class TClientConnection
     bool fConnected = false;
 };
 
+// What a namespace and a provider have in common: a client of their own, for all calls made on their behalf.
+class TClientOwner
+{
+  public:
+    bool isConnected() const { return fConnection.IsConnected(); }
+    // Returns: the client; null before it was made. Ownership: stays here.
+    Pegasus::CIMClient* getPegClient() const { return fConnection.GetClient(); }
+    // Returns: the client.
+    // Throws: Pegasus::NotConnectedException when it was never connected, so that a caller's handler for a failed call
+    // answers for this too.
+    Pegasus::CIMClient& ConnectedClient() const;
+
+  protected:
+    explicit TClientOwner(const TConnectionTexts& texts) : fConnection(texts) {}
+    ~TClientOwner() = default;
+
+    TClientConnection fConnection;
+};
+
 } // namespace NKOLVRX20

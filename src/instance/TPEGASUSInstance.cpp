@@ -1,12 +1,12 @@
 #include "src/instance/TPEGASUSInstance.h"
 
-#include "src/common/ConnectedClient.h"
+#include "src/common/ClientConnection.h"
 #include "src/common/CoreLog.h"
 #include "src/instance/MethodResult.h"
-#include "src/namespace/TPEGASUSNamespace.h"
-#include "src/schema/TPEGASUSClass.h"
 
+#include <host/ICIMClass.h>
 #include <host/ICIMMethodDecl.h>
+#include <host/ICIMNamespace.h>
 #include <host/ICIMParameterDecl.h>
 #include <host/ICIMQualifier.h>
 #include <host/TVRXException.h>
@@ -29,6 +29,17 @@ boost::shared_ptr<ICIMParameterDecl> ParameterDeclOf(const ICIMClass& instanceCl
     return parameterDecl;
 }
 
+// Returns: the namespace, which is the one that has the client for methods.
+// Throws: boost::bad_weak_ptr when it has gone.
+boost::shared_ptr<ICIMNamespace> NamespaceOf(const ICIMClass& instanceClass)
+{
+    auto ns = instanceClass.GetNamespace({});
+    if (!ns) {
+        throw boost::bad_weak_ptr();
+    }
+    return ns;
+}
+
 Pegasus::CIMParamValue ReferenceParameter(const std::string& name, const TCIMValue& value)
 {
     const Pegasus::CIMObjectPath path(Pegasus::String(value.ToString(kDecimal).c_str()));
@@ -47,8 +58,7 @@ TPEGASUSInstance::~TPEGASUSInstance() = default;
 
 void TPEGASUSInstance::AddToNamespace(TCIMContext context)
 {
-    const auto instanceClass = boost::dynamic_pointer_cast<TPEGASUSClass>(GetClass(context));
-    instanceClass->AddInstance(boost::dynamic_pointer_cast<TPEGASUSInstance>(shared_from_this()));
+    GetClass(context)->AddInstance(shared_from_this());
 }
 
 std::string TPEGASUSInstance::GetPegasusNSPStr() const
@@ -77,12 +87,12 @@ TCIMValue TPEGASUSInstance::InvokeMethod(const std::string& name, TCIMContext& p
 {
     const Pegasus::CIMName method(name.c_str());
     const auto inputs = InputsFor(name, parameters);
-    const auto instanceClass = boost::dynamic_pointer_cast<TPEGASUSClass>(GetClass({}));
-    const auto ns = instanceClass->LockNamespace();
+    const auto instanceClass = GetClass({});
+    const auto ns = NamespaceOf(*instanceClass);
     Pegasus::Array<Pegasus::CIMParamValue> outputs;
     Pegasus::CIMValue returned;
     try {
-        Pegasus::CIMClient& client = ConnectedClient(*ns);
+        Pegasus::CIMClient& client = dynamic_cast<const TClientOwner&>(*ns).ConnectedClient();
         client.setTimeout(kMethodTimeoutMs);
         returned = client.invokeMethod(*fPegNameSpace, *fPegInstanceName, method, inputs, outputs);
     } catch (const Pegasus::Exception& exception) {

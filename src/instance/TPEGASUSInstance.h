@@ -8,8 +8,6 @@
 
 namespace NKOLVRX20 {
 
-class TPEGASUSClass;
-
 // One instance of the server: the host's in-memory instance, and what is needed to reach it on the server again.
 // Ownership: always held by boost::shared_ptr; made by TPEGASUSClass::AllocateInstance. Keeps its class alive.
 // Thread: one at a time.

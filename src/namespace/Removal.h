@@ -1,3 +1,5 @@
+// Removing files through a shell, and which names may stand in such a command. The commands end in "-rf" and hold the
+// names to the letter: a blank or a star could delete something else.
 #pragma once
 
 #include <string>
@@ -11,5 +13,11 @@ inline constexpr char kRemoveFile[] = "-f";
 // command's form is part of what hosts rely on.
 // Requires: a path that is safe in a shell command.
 void RemovePath(const std::string& path, const char* options);
+
+// Returns: false for the empty name, and for one with a control byte, a blank or a character special to a shell.
+bool IsSafeDirectory(const std::string& path);
+
+// The same for a part of a file name, which holds no slash either, and may be empty.
+bool IsSafeNamePart(const std::string& name);
 
 } // namespace NKOLVRX20

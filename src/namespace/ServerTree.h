@@ -1,28 +1,41 @@
-// Where things lie below the root directory (the server's) and below the module path (the plug-in's).
 #pragma once
 
+#include <string>
+#include <vector>
+
 namespace NKOLVRX20 {
+
+// The vendors' directories, below the root directory (for the server) and below the module path (for discovery).
+inline constexpr char kProviderDirectory[] = "/pegasus/provider";
 
 // The server's program, and how a process listing names it.
 inline constexpr char kServerName[] = "cimserver";
 
-inline constexpr char kPegasusHome[] = "/pegasus";
-inline constexpr char kProgramDirectory[] = "/pegasus/bin/";
-inline constexpr char kLibraryDirectory[] = "/pegasus/lib";
-inline constexpr char kRepositoryDirectory[] = "/pegasus/repository";
-inline constexpr char kProviderDirectory[] = "/pegasus/provider";
-inline constexpr char kLsiDirectory[] = "/pegasus/provider/lsi_mir/";
-inline constexpr char kSchemaDirectory[] = "/pegasus/pegSchema";
+// The private server's files below the root directory: its programs, its repository, the vendors' libraries.
+class TServerTree
+{
+  public:
+    // The search path that the programs get begins with this process's own, as it is now.
+    explicit TServerTree(const std::string& root);
 
-// Parts of the file names by which a vendor announces a provider.
-inline constexpr char kClassesExtension[] = ".classes.xml";
-inline constexpr char kSpecificationExtension[] = ".properties.mof";
-inline constexpr char kRegistrationExtension[] = ".registration.mof";
+    const std::string& Root() const { return fRoot; }
+    std::string VendorDirectory() const { return fRoot + kProviderDirectory; }
+    // Returns: the LSI provider's directory, with a trailing slash.
+    std::string LsiDirectory() const { return VendorDirectory() + "/lsi_mir/"; }
 
-inline constexpr char kInternalNamespace[] = "root/PG_Internal";
-inline constexpr char kInterOpNamespace[] = "root/PG_InterOp";
+    // Runs one of the server's programs to its end, in the server's environment.
+    // Returns: what it wrote to its standard output. Its exit status is the process service's business.
+    // Throws: TVRXException 12 when it cannot be run.
+    // Blocks: until the program ends, at most 32767 seconds.
+    std::string Run(const std::string& program, const std::vector<std::string>& arguments) const;
 
-// Seconds that one of the server's programs may take.
-inline constexpr int kProgramTimeoutSeconds = 32767;
+    // Removes the server's repository and the LSI provider's.
+    // Requires: a root that is safe in a shell command.
+    void RemoveRepositories() const;
+
+  private:
+    const std::string fRoot;
+    const std::vector<std::string> fEnvironment;
+};
 
 } // namespace NKOLVRX20

@@ -2,8 +2,8 @@
 
 #include "src/common/CoreLog.h"
 #include "src/namespace/NamespaceConstants.h"
-#include "src/namespace/SafeNames.h"
-#include "src/namespace/ServerTree.h"
+#include "src/namespace/Removal.h"
+// Upwards, on purpose: the host asks a namespace for its provider, and that is the entry's one object.
 #include "src/plugin/TPEGASUSNamespaceProvider.h"
 #include "src/provider/TPEGASUSProvider.h"
 #include "src/schema/TPEGASUSClass.h"
@@ -13,37 +13,18 @@
 #include <host/ICIMInstance.h>
 #include <host/TVRXException.h>
 
-#include <cstdlib>
-
 namespace NKOLVRX20 {
 
 namespace {
 
 constexpr char kHostAddress[] = "127.0.0.1";
 
-// Vendors whose libraries the server must find.
-constexpr const char* kLibraryVendors[] = {"/broadcom", "/mellanox", "/intelCDM", "/brocade", "/fusionio", "/nvidia"};
-constexpr char kProgramVendor[] = "/mellanox";
-
-std::string LibraryPath(const std::string& root)
-{
-    std::string path = root + kLibraryDirectory + ":" + root;
-    for (const char* vendor : kLibraryVendors) {
-        path += ":" + root + kProviderDirectory + vendor;
-    }
-    return path;
-}
-
-std::string ProgramPath(const std::string& root)
-{
-    const char* inherited = std::getenv("PATH");
-    return std::string(inherited ? inherited : "") + ":" + root + ":" + root + kProviderDirectory + kProgramVendor;
-}
-
-std::vector<std::string> ServerEnvironment(const std::string& root)
-{
-    return {"PEGASUS_HOME=" + root + kPegasusHome, "LD_LIBRARY_PATH=" + LibraryPath(root), "PATH=" + ProgramPath(root)};
-}
+constexpr TConnectionTexts kConnectionTexts = {
+    "TPEGASUSNamespace:Pegasus Client Creation Fail: ",
+    "TPEGASUSNamespace::connect enter",
+    "TPEGASUSNamespace::connect succeeded \n",
+    "TPEGASUSNamespace::connect failed: ",
+};
 
 // Returns: the namespace whose shared pointer's address the context holds as an unsigned 64-bit number, or null.
 boost::shared_ptr<ICIMNamespace> NamespaceFromContext(const TCIMContext& context, const std::string& key)
@@ -61,23 +42,23 @@ boost::shared_ptr<ICIMNamespace> NamespaceFromContext(const TCIMContext& context
     return pointer ? *pointer : nullptr;
 }
 
-// Runs one step of the destructor.
+// Runs one step of the destructor: what it throws is logged, so that the next step still runs.
 template <typename TStep> void RunShutdownStep(const char* name, TStep step) noexcept
 {
     try {
         step();
     } catch (...) {
-        LogCaughtException(kShutdownStepFailedText, name, ": ");
+        LogCaughtException("TPEGASUSNamespace::~TPEGASUSNamespace failed at ", name, ": ");
     }
 }
 
 } // namespace
 
 TPEGASUSNamespace::TPEGASUSNamespace(TCIMContext context, std::string name)
-    : fName(name), fRootDirectory(GetVRXRootPath()), fServerProgramDirectory(fRootDirectory + kProgramDirectory),
-      fServerEnvironment(ServerEnvironment(fRootDirectory)), fHostAddress(kHostAddress), fPort(kPreferredPort),
-      fRefused(!IsSafeDirectory(fRootDirectory)), fRepositoryNamespace(NamespaceFromContext(context, "repository")),
-      fUpcallNamespace(NamespaceFromContext(context, "upcall")), fConnection(kNamespaceConnectionTexts)
+    : TClientOwner(kConnectionTexts), fName(name), fTree(GetVRXRootPath()), fHostAddress(kHostAddress),
+      fPort(kPreferredPort), fRefused(!IsSafeDirectory(fTree.Root())),
+      fRepositoryNamespace(NamespaceFromContext(context, "repository")),
+      fUpcallNamespace(NamespaceFromContext(context, "upcall"))
 {
 }
 
@@ -91,14 +72,17 @@ TPEGASUSNamespace::~TPEGASUSNamespace()
     RunShutdownStep("release", [this] { ReleaseCycles(); });
 }
 
+// Providers and classes hold each other, and so do classes and their instances; whatever the host still holds must not
+// keep all of it alive.
 void TPEGASUSNamespace::ReleaseCycles()
 {
     for (const auto& provider : fProviders) {
         provider->SetCollectedClasses({});
     }
-    for (const auto& entry : fClasses) {
-        entry.second->ReleaseLinks();
-    }
+    fClasses.Visit([](const boost::shared_ptr<TPEGASUSClass>& entered) {
+        entered->ReleaseLinks();
+        return true;
+    });
     if (fRootClass) {
         fRootClass->ReleaseLinks();
     }

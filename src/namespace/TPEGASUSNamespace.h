@@ -1,6 +1,8 @@
 #pragma once
 
 #include "src/common/ClientConnection.h"
+#include "src/namespace/ServerTree.h"
+#include "src/schema/NamedMap.h"
 
 #include <host/ICIMNamespace.h>
 
@@ -33,7 +35,9 @@ class TPEGASUSQualifierDecl;
 // Ownership: always held by boost::shared_ptr. Owns the client, the providers and the classes; classes point back
 // weakly. The destructor also takes apart the cycles between providers and their classes.
 // Thread: one at a time. Threads of its own exist only inside FindProviders and EnumerateProviders.
-class TPEGASUSNamespace : public ICIMNamespace, public boost::enable_shared_from_this<TPEGASUSNamespace>
+class TPEGASUSNamespace : public ICIMNamespace,
+                          public TClientOwner,
+                          public boost::enable_shared_from_this<TPEGASUSNamespace>
 {
   public:
     // Reads "repository" and "upcall" from the context; starts nothing.
@@ -139,9 +143,6 @@ class TPEGASUSNamespace : public ICIMNamespace, public boost::enable_shared_from
 
     void Init();
     void connect(const std::string& host, unsigned short port, const std::string& user, const std::string& password);
-    bool isConnected() const { return fConnection.IsConnected(); }
-    // Returns: the client; null before Init. Ownership: the namespace's.
-    Pegasus::CIMClient* getPegClient() const { return fConnection.GetClient(); }
 
     // --- MOF ---
 
@@ -188,9 +189,6 @@ class TPEGASUSNamespace : public ICIMNamespace, public boost::enable_shared_from
     void SetAllowRedefinition(bool allow) { fAllowRedefinition = allow; }
 
   private:
-    typedef std::map<std::string, boost::shared_ptr<TPEGASUSClass>> TClassMap;
-    typedef std::map<std::string, boost::shared_ptr<TPEGASUSQualifierDecl>> TQualifierDeclMap;
-
     void RefuseUnsafeNames();
     void StartServerAndConnect();
     bool TryToStartServer(int attempt);
@@ -198,39 +196,31 @@ class TPEGASUSNamespace : public ICIMNamespace, public boost::enable_shared_from
     void CompileBaseSchema();
     void WriteLsiConfiguration() const;
 
-    std::string RunServerProgram(const std::string& name, const std::vector<std::string>& arguments) const;
     void StopCimserver();
     void ReleaseCycles();
 
     void RegisterProviders();
     boost::shared_ptr<ICIMClass> CollectClass(const std::string& entry,
                                               const boost::shared_ptr<TPEGASUSProvider>& provider);
-    void VisitProvidersInOrder(const TProviderVisitor& visitor);
-    void VisitProvidersOnThreads(const TProviderVisitor& visitor);
 
     ICIMNamespace& RepositoryNamespace() const;
 
-    boost::shared_ptr<TPEGASUSClass> FindClass(const std::string& key) const;
     bool AskServerForClass(const std::string& cimNamespace, const std::string& name, Pegasus::CIMClass& answer);
-    boost::shared_ptr<ICIMClass> FetchClass(const std::string& name, const std::string& key,
-                                            const TCIMContext& context);
+    boost::shared_ptr<ICIMClass> FetchClass(const std::string& name, const TCIMContext& context);
     bool MirrorClass(const Pegasus::CIMClass& source, const TCIMContext& callerContext, TCIMContext& classContext);
 
     const std::string fName;
-    const std::string fRootDirectory;
-    const std::string fServerProgramDirectory;
-    const std::vector<std::string> fServerEnvironment;
+    const TServerTree fTree;
     const std::string fHostAddress;
     unsigned short fPort;
     std::string fConsumerName;
     bool fRefused; // an unsafe root directory or consumer name: nothing may be removed or started
     boost::shared_ptr<ICIMNamespace> fRepositoryNamespace;
     boost::weak_ptr<ICIMNamespace> fUpcallNamespace;
-    TClientConnection fConnection;
     boost::shared_ptr<TPEGASUSClass> fRootClass;
     std::vector<boost::shared_ptr<TPEGASUSProvider>> fProviders; // in discovery order
-    TClassMap fClasses;                                          // by normalised name
-    TQualifierDeclMap fQualifierDecls;                           // by normalised name
+    TNamedMap<TPEGASUSClass> fClasses;
+    TNamedMap<TPEGASUSQualifierDecl> fQualifierDecls;
     bool fAllowRedefinition = false;
     unsigned int fSuperClassDepth = 0; // of the chain that GetClass is following
 };

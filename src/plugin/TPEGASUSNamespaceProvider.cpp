@@ -2,6 +2,7 @@
 
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
+#include "src/common/Directories.h"
 #include "src/namespace/TPEGASUSNamespace.h"
 
 #include <host/ICIMNamespace.h>
@@ -34,8 +35,7 @@ namespace {
 
 std::string& TPEGASUSNamespaceProvider::GetfgModulePathName()
 {
-    static std::string fgModulePathName;
-    return fgModulePathName;
+    return ModulePath();
 }
 
 boost::shared_ptr<TPEGASUSNamespaceProvider> TPEGASUSNamespaceProvider::GetInstance()

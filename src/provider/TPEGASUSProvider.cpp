@@ -45,7 +45,7 @@ bool IsNotToBeCollected(const ICIMClass& collected)
 } // namespace
 
 TPEGASUSProvider::TPEGASUSProvider()
-    : fProviderInfo(boost::make_shared<TProviderInfo>()), fConnection(kProviderConnectionTexts)
+    : TClientOwner(kProviderConnectionTexts), fProviderInfo(boost::make_shared<TProviderInfo>())
 {
 }
 

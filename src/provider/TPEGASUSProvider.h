@@ -21,7 +21,7 @@ namespace NKOLVRX20 {
 // own.
 // Ownership: shared by the namespace's list, the classes bound to it, and the host.
 // Thread: one at a time.
-class TPEGASUSProvider : public IProvider
+class TPEGASUSProvider : public IProvider, public TClientOwner
 {
   public:
     TPEGASUSProvider();
@@ -43,12 +43,9 @@ class TPEGASUSProvider : public IProvider
     void initPegasusClient();
     void connectPegasusClient(const std::string& host, unsigned short port, const std::string& user,
                               const std::string& password);
-    // Returns: the client; null before initPegasusClient. Ownership: the provider's.
-    Pegasus::CIMClient* getPegClient() const { return fConnection.GetClient(); }
     // Returns: the namespace name as the client library wants it.
     // Throws: Pegasus::InvalidNamespaceNameException when the requested-class file gave none or a bad one.
     Pegasus::CIMNamespaceName GetPegNamespace() const;
-    bool isConnected() const { return fConnection.IsConnected(); }
 
     // Returns: whether a class of exactly this name, case included, was collected.
     bool IsClassesProvided(const std::string& className) const;
@@ -98,7 +95,6 @@ class TPEGASUSProvider : public IProvider
     bool fDiagnosticOnly = false;
     boost::shared_ptr<TProviderInfo> fProviderInfo;
     bool fInitialized = false;
-    TClientConnection fConnection;
 };
 
 } // namespace NKOLVRX20

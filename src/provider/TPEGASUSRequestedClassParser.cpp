@@ -1,9 +1,9 @@
 #include "src/provider/TPEGASUSRequestedClassParser.h"
 
 #include "src/common/CoreLog.h"
+#include "src/common/Names.h"
 
 #include <algorithm>
-#include <cctype>
 
 namespace NKOLVRX20 {
 
@@ -34,14 +34,6 @@ const TElementRule* FindRule(const std::string& element)
     const auto rule = std::find_if(std::begin(kElementRules), std::end(kElementRules),
                                    [&element](const TElementRule& candidate) { return element == candidate.fElement; });
     return rule == std::end(kElementRules) ? nullptr : rule;
-}
-
-std::string LowerCase(std::string text)
-{
-    for (char& character : text) {
-        character = static_cast<char>(std::tolower(static_cast<unsigned char>(character)));
-    }
-    return text;
 }
 
 } // namespace

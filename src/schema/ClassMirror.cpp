@@ -1,9 +1,7 @@
 #include "src/schema/ClassMirror.h"
 
-#include "src/common/ConnectedClient.h"
 #include "src/common/CoreLog.h"
 #include "src/instance/ValueConversion.h"
-#include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/QualifierBits.h"
 #include "src/schema/TPEGASUSClass.h"
 #include "src/schema/TPEGASUSMethodDecl.h"
@@ -41,6 +39,8 @@ template <typename TStep> void Guarded(const char* failureText, const std::strin
 }
 
 } // namespace
+
+TClassMirror::TClassMirror(TPEGASUSClass& target) : fTarget(target), fNamespace(target.GetOwningNamespace()) {}
 
 void TClassMirror::Mirror(const Pegasus::CIMClass& source)
 {
@@ -99,13 +99,13 @@ boost::shared_ptr<ICIMQualifierDecl> TClassMirror::FetchDeclaration(const Pegasu
                                                                     const std::string& name)
 {
     try {
-        const auto source = ConnectedClient(fNamespace).getQualifier(fTarget.GetPegasusNSP(), qualifier);
+        const auto source = fNamespace.ConnectedClient().getQualifier(fTarget.GetPegasusNSP(), qualifier);
         const TCIMValue defaultValue = source.getValue().isNull()
                                            ? TCIMValue(pegTypeToVRXType(source.getType(), source.isArray()), 0)
                                            : ValueOf(source, name);
-        auto declaration = fNamespace.AllocateQualifierDecl(
-            NameOf(source), defaultValue, ScopeFromText(ToStdString(source.getScope().toString())),
-            FlavorFromText(ToStdString(source.getFlavor().toString())), {});
+        auto declaration = fNamespace.AllocateQualifierDecl(NameOf(source), defaultValue,
+                                                            ScopeFromText(ToStdString(source.getScope().toString())),
+                                                            FlavorFromText(ToStdString(source.getFlavor().toString())));
         fNamespace.AddQualifierDecl(boost::dynamic_pointer_cast<TPEGASUSQualifierDecl>(declaration));
         return declaration;
     } catch (...) {

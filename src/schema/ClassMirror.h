@@ -9,8 +9,8 @@
 namespace NKOLVRX20 {
 
 class TPEGASUSClass;
+class TOwningNamespace;
 class TPEGASUSMethodDecl;
-class TPEGASUSNamespace;
 class TPEGASUSQualifierDecl;
 
 // Carries the declarations of a server's class over into the host's image of it: qualifiers first, because a reference
@@ -20,7 +20,7 @@ class TPEGASUSQualifierDecl;
 class TClassMirror
 {
   public:
-    TClassMirror(TPEGASUSClass& target, TPEGASUSNamespace& ns) : fTarget(target), fNamespace(ns) {}
+    explicit TClassMirror(TPEGASUSClass& target);
 
     // Throws: Pegasus::UninitializedObjectException when the source holds no class.
     // Blocks: up to the client's time-out for each qualifier that is new.
@@ -46,7 +46,7 @@ class TClassMirror
     boost::shared_ptr<ICIMQualifierDecl> FetchDeclaration(const Pegasus::CIMName& qualifier, const std::string& name);
 
     TPEGASUSClass& fTarget;
-    TPEGASUSNamespace& fNamespace;
+    const TOwningNamespace& fNamespace;
     std::set<std::string> fUnknownQualifiers;
 };
 

@@ -1,10 +1,5 @@
-// The class itself: its name, its place, its instances, and what is not served.
 #include "src/schema/TPEGASUSClass.h"
 
-#include "src/instance/TPEGASUSInstance.h"
-#include "src/namespace/TPEGASUSNamespace.h"
-
-#include <host/ICIMInstance.h>
 #include <host/TVRXException.h>
 
 #include <utility>
@@ -23,7 +18,7 @@ void TPEGASUSClass::Validate(TCIMContext) {}
 
 void TPEGASUSClass::AddToNamespace(TCIMContext)
 {
-    LockNamespace()->AddClass(shared_from_this());
+    fNamespace.AddClass(shared_from_this());
 }
 
 void TPEGASUSClass::RemoveFromNamespace(TCIMContext)
@@ -43,22 +38,12 @@ std::string TPEGASUSClass::GetName(TCIMContext) const
 
 boost::shared_ptr<ICIMNamespace> TPEGASUSClass::GetNamespace(TCIMContext) const
 {
-    return fNamespace.lock();
-}
-
-boost::shared_ptr<TPEGASUSNamespace> TPEGASUSClass::LockNamespace() const
-{
-    return boost::shared_ptr<TPEGASUSNamespace>(fNamespace);
+    return fNamespace.Get();
 }
 
 void TPEGASUSClass::SetPropertyValue(const std::string&, TCIMValue, TCIMContext)
 {
     throw TVRXException(TVRXStatusCode::kNotSupported);
-}
-
-boost::shared_ptr<ICIMInstance> TPEGASUSClass::AllocateInstance(TCIMContext context)
-{
-    return boost::make_shared<TPEGASUSInstance>(shared_from_this(), context);
 }
 
 bool TPEGASUSClass::operator==(const ICIMClass& other) const
@@ -82,36 +67,6 @@ bool TPEGASUSClass::hasCollected() const
 }
 
 void TPEGASUSClass::SetCollected() {}
-
-void TPEGASUSClass::AddInstance(boost::shared_ptr<ICIMInstance> instance)
-{
-    const auto owner = instance->GetClass({});
-    if (owner && owner.get() != this) {
-        fInstanceOwners.insert(owner);
-    }
-    fInstances.emplace(instance->GetReference({}).GetPath(), instance);
-}
-
-// By identity: the path may have changed since the instance was added.
-void TPEGASUSClass::RemoveInstance(boost::shared_ptr<ICIMInstance> instance)
-{
-    for (auto entry = fInstances.begin(); entry != fInstances.end();) {
-        entry = entry->second == instance ? fInstances.erase(entry) : std::next(entry);
-    }
-}
-
-// The containers are emptied first: two classes may hold each other's instances.
-void TPEGASUSClass::ClearInstances()
-{
-    const auto owners = std::exchange(fInstanceOwners, {});
-    const auto instances = std::exchange(fInstances, {});
-    for (const auto& owner : owners) {
-        owner->ClearInstances();
-    }
-    for (const auto& child : fChildClasses) {
-        child->ClearInstances();
-    }
-}
 
 void TPEGASUSClass::ReleaseLinks()
 {

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "src/schema/NamedMap.h"
+#include "src/schema/OwningNamespace.h"
 #include "src/schema/TQualifiedElement.h"
 
 #include <Pegasus/Client/CIMClient.h>
@@ -153,8 +155,7 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
 
     // --- the class's place ---
 
-    // Throws: boost::bad_weak_ptr when it is gone.
-    boost::shared_ptr<TPEGASUSNamespace> LockNamespace() const;
+    const TOwningNamespace& GetOwningNamespace() const { return fNamespace; }
     const Pegasus::CIMNamespaceName& GetPegasusNSP() const { return fPegasusNsp; }
     const std::string& GetPegasusNSPStr() const { return fPegasusNspText; }
     // The provider that serves the class; null when none was bound to it.
@@ -179,22 +180,21 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     void EnterProperty(const boost::shared_ptr<ICIMPropertyDecl>& declaration, const TCIMValue& value);
 
   private:
-    struct TRetrieval;
-
-    void OverridePropertyDecl(const std::string& key, const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration);
-    void AddNewPropertyDecl(const std::string& key, const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration);
+    // The existing declaration, of the same name, may be null.
+    void OverridePropertyDecl(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing,
+                              const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration);
+    void AddNewPropertyDecl(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing,
+                            const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration);
     [[noreturn]] void RefuseOverride(const std::string& name, const char* reason, unsigned int status) const;
-
-    std::string RetrievalNamespaceName() const;
 
     boost::weak_ptr<TPEGASUSClass> fSuperClass;
     std::vector<boost::shared_ptr<ICIMClass>> fChildClasses;
     std::set<boost::shared_ptr<ICIMClass>> fInstanceOwners;
     std::multimap<std::string, boost::shared_ptr<ICIMInstance>> fInstances; // by path text
-    std::map<std::string, boost::shared_ptr<TPEGASUSPropertyDecl>> fPropertyDecls;
-    std::map<std::string, boost::shared_ptr<ICIMProperty>> fProperties;
-    std::map<std::string, boost::shared_ptr<TPEGASUSMethodDecl>> fMethodDecls;
-    boost::weak_ptr<TPEGASUSNamespace> fNamespace;
+    TNamedMap<TPEGASUSPropertyDecl> fPropertyDecls;
+    TNamedMap<ICIMProperty> fProperties; // those with a value on the class itself
+    TNamedMap<TPEGASUSMethodDecl> fMethodDecls;
+    TOwningNamespace fNamespace;
     std::string fPegasusNspText;
     const std::string fName;
     Pegasus::CIMNamespaceName fPegasusNsp;

@@ -1,9 +1,7 @@
 #include "src/schema/TPEGASUSMethodDecl.h"
 
-#include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSClass.h"
 #include "src/schema/TPEGASUSParameterDecl.h"
-#include "src/schema/VisitInOrder.h"
 
 #include <utility>
 
@@ -45,13 +43,12 @@ boost::shared_ptr<ICIMParameterDecl> TPEGASUSMethodDecl::AllocateParameterDecl(c
 
 boost::shared_ptr<ICIMParameterDecl> TPEGASUSMethodDecl::GetParameterDecl(const std::string& name, TCIMContext) const
 {
-    const auto entry = fParameters.find(TPEGASUSNamespace::NormalizeName(name));
-    return entry == fParameters.end() ? nullptr : entry->second;
+    return fParameters.Find(name);
 }
 
 void TPEGASUSMethodDecl::EnumerateParameterDecls(TParameterDeclVisitor visitor, TCIMContext) const
 {
-    VisitInOrder(fParameters, visitor);
+    fParameters.Visit(visitor);
 }
 
 bool TPEGASUSMethodDecl::operator==(const ICIMMethodDecl& other) const
@@ -71,7 +68,7 @@ ICIMMethodDecl& TPEGASUSMethodDecl::operator=(const ICIMMethodDecl&)
 
 void TPEGASUSMethodDecl::AddParameterDecl(const boost::shared_ptr<TPEGASUSParameterDecl>& declaration)
 {
-    fParameters[TPEGASUSNamespace::NormalizeName(declaration->GetName({}))] = declaration;
+    fParameters.Put(declaration->GetName({}), declaration);
 }
 
 } // namespace NKOLVRX20

@@ -1,12 +1,12 @@
 #pragma once
 
+#include "src/schema/NamedMap.h"
 #include "src/schema/TQualifiedElement.h"
 
 #include <host/ICIMMethodDecl.h>
 
 #include <boost/weak_ptr.hpp>
 
-#include <map>
 #include <string>
 
 namespace NKOLVRX20 {
@@ -51,7 +51,7 @@ class TPEGASUSMethodDecl : public TQualifiedElement<TPEGASUSMethodDecl, ICIMMeth
     boost::weak_ptr<TPEGASUSClass> fOwner;
     const std::string fName;
     const TCIMValue::TCIMType fReturnType;
-    std::map<std::string, boost::shared_ptr<TPEGASUSParameterDecl>> fParameters; // by normalised name
+    TNamedMap<TPEGASUSParameterDecl> fParameters;
 };
 
 } // namespace NKOLVRX20

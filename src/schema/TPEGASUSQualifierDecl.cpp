@@ -1,6 +1,5 @@
 #include "src/schema/TPEGASUSQualifierDecl.h"
 
-#include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/DeclaredType.h"
 #include "src/schema/QualifierBits.h"
 
@@ -21,7 +20,7 @@ void TPEGASUSQualifierDecl::Validate(TCIMContext) {}
 
 void TPEGASUSQualifierDecl::AddToNamespace(TCIMContext)
 {
-    boost::shared_ptr<TPEGASUSNamespace>(fNamespace)->AddQualifierDecl(shared_from_this());
+    fNamespace.AddQualifierDecl(shared_from_this());
 }
 
 void TPEGASUSQualifierDecl::RemoveQualifierDecl(TCIMContext)
@@ -36,7 +35,7 @@ std::string TPEGASUSQualifierDecl::GetName(TCIMContext) const
 
 boost::shared_ptr<ICIMNamespace> TPEGASUSQualifierDecl::GetNamespace(TCIMContext) const
 {
-    return fNamespace.lock();
+    return fNamespace.Get();
 }
 
 TCIMValue::TCIMType TPEGASUSQualifierDecl::GetType(TCIMContext) const

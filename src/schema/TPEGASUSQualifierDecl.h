@@ -1,16 +1,15 @@
 #pragma once
 
+#include "src/schema/OwningNamespace.h"
+
 #include <host/ICIMQualifierDecl.h>
 
 #include <boost/enable_shared_from_this.hpp>
 #include <boost/shared_ptr.hpp>
-#include <boost/weak_ptr.hpp>
 
 #include <string>
 
 namespace NKOLVRX20 {
-
-class TPEGASUSNamespace;
 
 // The declaration of a qualifier, as the server has it.
 // Ownership: points to its namespace weakly.
@@ -53,7 +52,7 @@ class TPEGASUSQualifierDecl : public ICIMQualifierDecl, public boost::enable_sha
     TCIMValue fDefaultValue;
     const EScope fScope;
     EFlavor fFlavor;
-    boost::weak_ptr<TPEGASUSNamespace> fNamespace;
+    TOwningNamespace fNamespace;
 };
 
 } // namespace NKOLVRX20

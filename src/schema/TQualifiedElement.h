@@ -1,7 +1,7 @@
 #pragma once
 
+#include "src/schema/NamedMap.h"
 #include "src/schema/TPEGASUSQualifier.h"
-#include "src/schema/TQualifierSet.h"
 
 #include <host/ICIMNamedElement.h>
 #include <host/TVRXException.h>
@@ -21,7 +21,16 @@ class TQualifiedElement : public TInterface, public boost::enable_shared_from_th
   public:
     using TInterface::operator=;
 
-    void AddQualifier(boost::shared_ptr<ICIMQualifier> qualifier, TCIMContext) override { fQualifiers.Add(qualifier); }
+    // Takes the place of a qualifier of the same name.
+    // Throws: TVRXException 14 for null or a qualifier that another plug-in made, 25 for a bad name.
+    void AddQualifier(boost::shared_ptr<ICIMQualifier> qualifier, TCIMContext) override
+    {
+        const auto own = boost::dynamic_pointer_cast<TPEGASUSQualifier>(qualifier);
+        if (!own) {
+            throw TVRXException(TVRXStatusCode::kTypeMismatch);
+        }
+        fQualifiers.Put(own->GetName({}), own);
+    }
 
     // Throws: TVRXException 14 for a null declaration.
     boost::shared_ptr<ICIMQualifier> AllocateQualifier(boost::shared_ptr<const ICIMQualifierDecl> declaration,
@@ -53,10 +62,10 @@ class TQualifiedElement : public TInterface, public boost::enable_shared_from_th
         return qualifier;
     }
 
-    void EnumerateQualifiers(TQualifierVisitor visitor, TCIMContext) const override { fQualifiers.Enumerate(visitor); }
+    void EnumerateQualifiers(TQualifierVisitor visitor, TCIMContext) const override { fQualifiers.Visit(visitor); }
 
   private:
-    TQualifierSet fQualifiers;
+    TNamedMap<TPEGASUSQualifier> fQualifiers;
 };
 
 // Returns: whether the element carries the qualifier with the boolean value true.

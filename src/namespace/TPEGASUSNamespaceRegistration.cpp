@@ -1,17 +1,15 @@
-// Making the providers known to the server, fetching their classes, and listing them to the host.
+// Compiling MOF files, making the providers known to the server, fetching their classes, and listing them to the host.
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
-#include "src/common/ProviderThreads.h"
+#include "src/common/Files.h"
 #include "src/namespace/NamespaceConstants.h"
-#include "src/namespace/ServerTree.h"
+#include "src/namespace/ProviderThreads.h"
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/provider/TPEGASUSProvider.h"
 #include "src/schema/TPEGASUSClass.h"
 
 #include <host/ICIMClass.h>
 #include <host/TVRXException.h>
-
-#include <boost/bind/bind.hpp>
 
 namespace NKOLVRX20 {
 
@@ -21,17 +19,6 @@ constexpr char kTimeOutTag[] = "TimeOut";
 constexpr char kTag[] = "Tag";
 constexpr char kPluginTypeKey[] = "pluginType";
 constexpr signed char kPluginTypeOfProviders = 7;
-
-// The body of a provider's thread: nothing may leave it.
-void RunForProvider(const char* operation, const boost::shared_ptr<TPEGASUSProvider>& provider,
-                    const boost::function<void()>& task)
-{
-    try {
-        task();
-    } catch (...) {
-        LogCaughtException(operation, " failed for provider ", provider->GetPath(), ": ");
-    }
-}
 
 // Returns: whether a host that asks with this context asks for this kind of provider.
 bool AsksForProviders(const TCIMContext& context)
@@ -47,19 +34,50 @@ bool AsksForProviders(const TCIMContext& context)
     return static_cast<signed char>(entry->second) == kPluginTypeOfProviders;
 }
 
+void VisitInOrder(const std::vector<boost::shared_ptr<TPEGASUSProvider>>& providers, const TProviderVisitor& visitor)
+{
+    for (const auto& provider : providers) {
+        if (!visitor(provider)) {
+            return;
+        }
+    }
+}
+
 } // namespace
+
+void TPEGASUSNamespace::callCimmof(const std::string& cimNamespace, const std::string& mofPath)
+{
+    LogProgress(fTree.Run("cimmof", {"-n", cimNamespace, "-aE", mofPath}));
+}
+
+std::vector<std::string> TPEGASUSNamespace::FindMofFiles(const std::string& directory, const std::string& pattern)
+{
+    std::vector<std::string> names;
+    ReadDirectory(directory, names);
+    std::vector<std::string> paths;
+    for (const std::string& name : names) {
+        if (name.find(pattern) != std::string::npos) {
+            paths.push_back(directory + "/" + name);
+        }
+    }
+    return paths;
+}
+
+std::vector<std::string> TPEGASUSNamespace::BuildMofPath(const std::string& path, const std::string& pattern)
+{
+    const std::string::size_type slash = path.rfind('/');
+    if (slash == std::string::npos) {
+        throw TVRXException(TVRXStatusCode::kBadPath);
+    }
+    return FindMofFiles(path.substr(0, slash), pattern);
+}
 
 void TPEGASUSNamespace::RegisterProviders()
 {
     LogProgress("before reg...");
     if (IsMultiThreaded()) {
-        std::vector<boost::function<void()>> tasks;
-        for (const auto& provider : fProviders) {
-            const boost::function<void()> task =
-                boost::bind(&TPEGASUSNamespace::regProvider, this, provider->GetPath(), provider);
-            tasks.push_back(boost::bind(&RunForProvider, "TPEGASUSNamespace::regProvider", provider, task));
-        }
-        RunOnThreads(tasks);
+        RunOnThreads("TPEGASUSNamespace::regProvider", fProviders,
+                     [this](const auto& provider) { regProvider(provider->GetPath(), provider); });
     } else {
         for (const auto& provider : fProviders) {
             regProvider(provider->GetPath(), provider);
@@ -146,33 +164,14 @@ void TPEGASUSNamespace::EnumerateProviders(TProviderVisitor visitor, TCIMContext
     }
     LogProgress("TPEGASUSNamespace::EnumerateProviders: fProviders.size() = ", fProviders.size());
     LogProgress("before inventory pegasus NSP");
+    // A copy, because the visitor may drop the namespace.
+    const auto providers = fProviders;
     if (IsMultiThreaded()) {
-        VisitProvidersOnThreads(visitor);
+        RunOnThreads("TPEGASUSNamespace::EnumerateProviders", providers, visitor);
     } else {
-        VisitProvidersInOrder(visitor);
+        VisitInOrder(providers, visitor);
     }
     LogProgress("after inventory pegasus NSP");
-}
-
-// A walk on a copy: the visitor may drop the namespace.
-void TPEGASUSNamespace::VisitProvidersInOrder(const TProviderVisitor& visitor)
-{
-    const auto providers = fProviders;
-    for (const auto& provider : providers) {
-        if (!visitor(provider)) {
-            return;
-        }
-    }
-}
-
-void TPEGASUSNamespace::VisitProvidersOnThreads(const TProviderVisitor& visitor)
-{
-    std::vector<boost::function<void()>> tasks;
-    for (const auto& provider : fProviders) {
-        const boost::function<void()> task = [visitor, provider] { visitor(provider); };
-        tasks.push_back(boost::bind(&RunForProvider, "TPEGASUSNamespace::EnumerateProviders", provider, task));
-    }
-    RunOnThreads(tasks);
 }
 
 } // namespace NKOLVRX20

@@ -1,9 +1,9 @@
 // Which providers are installed: one for each requested-class file in a vendor's directory.
 #include "src/common/CoreLog.h"
+#include "src/common/Directories.h"
 #include "src/common/Files.h"
-#include "src/namespace/ServerTree.h"
+#include "src/namespace/NamespaceConstants.h"
 #include "src/namespace/TPEGASUSNamespace.h"
-#include "src/plugin/TPEGASUSNamespaceProvider.h"
 #include "src/provider/TPEGASUSProvider.h"
 #include "src/provider/TPEGASUSRequestedClassParser.h"
 
@@ -59,7 +59,7 @@ std::unique_ptr<char[]> AllocateFileBuffer(std::size_t bytes)
 
 void TPEGASUSNamespace::FindProviders()
 {
-    const std::string root = TPEGASUSNamespaceProvider::GetfgModulePathName() + kProviderDirectory;
+    const std::string root = ModulePath() + kProviderDirectory;
     std::vector<std::string> paths = FindXmlFiles(root, kClassesExtension);
     LogProgress("TPEGASUSNamespace::Prefilter: ", paths.size(), " providers.");
     filterProviders(paths);

@@ -1,8 +1,6 @@
 // A class among its superclasses, subclasses and associations.
-#include "src/common/ConnectedClient.h"
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
-#include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSClass.h"
 
 #include <algorithm>
@@ -21,27 +19,25 @@ bool TPEGASUSClass::IsAbstract(TCIMContext) const
 
 bool TPEGASUSClass::IsRootClass(TCIMContext) const
 {
-    const auto ns = LockNamespace();
-    return ns->isConnected() && ns->GetRootClass().get() == this;
+    return fNamespace.IsConnected() && fNamespace.GetRootClass().get() == this;
 }
 
 boost::shared_ptr<ICIMClass> TPEGASUSClass::GetSuperClass(TCIMContext context) const
 {
-    const auto ns = LockNamespace();
-    if (!ns->isConnected()) {
+    if (!fNamespace.IsConnected()) {
         return nullptr;
     }
     std::string superName;
     try {
         const Pegasus::CIMClass answer =
-            ConnectedClient(*ns).getClass(fPegasusNsp, Pegasus::CIMName(fName.c_str()), true, true, false);
+            fNamespace.ConnectedClient().getClass(fPegasusNsp, Pegasus::CIMName(fName.c_str()), true, true, false);
         superName = ToStdString(answer.getSuperClassName().getString());
     } catch (const Pegasus::Exception& exception) {
         LogFailure("TPEGASUSClass::GetSuperClass from Pegasus for: ", fName,
                    " returned exception: ", ToStdString(exception.getMessage()));
         throw TVRXException(TVRXStatusCode::kServerConnectionFailed);
     }
-    return ns->GetClass(superName, context);
+    return fNamespace.GetClass(superName, context);
 }
 
 // A walk on a copy that keeps this class: the visitor may make the namespace fetch more classes, or drop it. The

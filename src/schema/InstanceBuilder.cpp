@@ -1,10 +1,10 @@
-#include "src/instance/InstanceBuilder.h"
+#include "src/schema/InstanceBuilder.h"
 
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
+#include "src/common/Names.h"
 #include "src/instance/TPEGASUSInstance.h"
 #include "src/instance/ValueConversion.h"
-#include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSClass.h"
 
 #include <host/ICIMProperty.h>
@@ -21,11 +21,11 @@ constexpr char kInstanceIdName[] = "InstanceID";
 constexpr char kSlotClass[] = "OMC_ProcessorSlot";
 constexpr char kSlotNumber[] = "Number";
 
-// Takes the text apart at the first hit. Returns: what follows the first character of it; nothing without a hit.
+// Returns: the text after the first character of the first match; nothing without a match.
 std::optional<std::string> TextAfter(const std::string& text, const std::string& wanted)
 {
-    const auto hit = text.find(wanted);
-    return hit == std::string::npos ? std::nullopt : std::make_optional(text.substr(hit + 1));
+    const auto match = text.find(wanted);
+    return match == std::string::npos ? std::nullopt : std::make_optional(text.substr(match + 1));
 }
 
 // Reads the class that a key reference names out of the path of the instance that holds it:
@@ -43,7 +43,7 @@ boost::shared_ptr<ICIMClass> ReferencedClass(const TPEGASUSClass& holder, const 
                                              const std::string& property)
 {
     const auto name = ReferencedClassName(ToStdString(source.getPath().toString()), property);
-    return name ? holder.LockNamespace()->GetClass(*name, {{kNspKey, holder.GetPegasusNSPStr()}}) : nullptr;
+    return name ? holder.GetOwningNamespace().GetClass(*name, {{kNspKey, holder.GetPegasusNSPStr()}}) : nullptr;
 }
 
 // One property on its way from the server's instance to the host's.
@@ -62,7 +62,7 @@ class TPropertyTransfer
 
     void To(TPEGASUSInstance& target)
     {
-        fName = TPEGASUSNamespace::NormalizeName(fServerName);
+        fName = NormalizedName(fServerName);
         target.SetPropertyValue(fName, Value(), {});
         if (fServerName == kSlotNumber && fClass.GetName({}) == kSlotClass) {
             Narrow(target);

@@ -1,11 +1,10 @@
 // Start-up: from a constructed namespace to a connected one with the base schema and the vendors' files in place.
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
+#include "src/common/Directories.h"
+#include "src/namespace/NamespaceConstants.h"
 #include "src/namespace/Removal.h"
-#include "src/namespace/SafeNames.h"
-#include "src/namespace/ServerTree.h"
 #include "src/namespace/TPEGASUSNamespace.h"
-#include "src/plugin/TPEGASUSNamespaceProvider.h"
 #include "src/schema/TPEGASUSClass.h"
 
 #include <host/TOSSpecific.h>
@@ -19,7 +18,6 @@ namespace NKOLVRX20 {
 
 namespace {
 
-constexpr std::size_t kRootPathBytes = 1024;
 constexpr char kConsumerKey[] = "consumer";
 constexpr char kDefaultConsumer[] = "quvex";
 
@@ -58,8 +56,7 @@ std::string BrocadeVersion()
 
 std::string TPEGASUSNamespace::GetVRXRootPath()
 {
-    char path[kRootPathBytes];
-    return ::getcwd(path, sizeof path) ? path : "";
+    return WorkingDirectory();
 }
 
 void TPEGASUSNamespace::Initialize(TCIMContext context)
@@ -83,7 +80,7 @@ void TPEGASUSNamespace::RefuseUnsafeNames()
     fRefused = true;
     LogFailure(
         "TPEGASUSNamespace::Initialize failed: ", unsafeRoot ? "unsafe root directory: \"" : "unsafe consumer name: \"",
-        unsafeRoot ? fRootDirectory : fConsumerName, "\"");
+        unsafeRoot ? fTree.Root() : fConsumerName, "\"");
     throw TVRXException(TVRXStatusCode::kBadPath);
 }
 
@@ -114,6 +111,17 @@ bool TPEGASUSNamespace::TryToStartServer(int attempt)
     }
 }
 
+void TPEGASUSNamespace::Init()
+{
+    fConnection.Init();
+}
+
+void TPEGASUSNamespace::connect(const std::string& host, unsigned short port, const std::string& user,
+                                const std::string& password)
+{
+    fConnection.Connect(host, port, user, password);
+}
+
 void TPEGASUSNamespace::CreateRootClass()
 {
     TCIMContext context;
@@ -123,25 +131,24 @@ void TPEGASUSNamespace::CreateRootClass()
 
 void TPEGASUSNamespace::CompileBaseSchema()
 {
-    const std::string schema = TPEGASUSNamespaceProvider::GetfgModulePathName() + kSchemaDirectory;
-    callCimmof(kInternalNamespace, schema + "/PG_Internal/PG_Internal.mof");
+    const std::string schema = ModulePath() + "/pegasus/pegSchema";
+    callCimmof("root/PG_Internal", schema + "/PG_Internal/PG_Internal.mof");
     callCimmof(kInterOpNamespace, schema + "/PG_InterOp/PG_InterOp.mof");
 }
 
 void TPEGASUSNamespace::preConfig()
 {
-    const std::string vendors = fRootDirectory + kProviderDirectory;
     callCimconfig();
     RemovePath(kLsiConfiguration, kRemoveTree);
     if (BrocadeVersion().find(kBrocadeVersion) == std::string::npos) {
-        RemovePath(vendors + kBrocadeLibrary, kRemoveTree);
+        RemovePath(fTree.VendorDirectory() + kBrocadeLibrary, kRemoveTree);
     }
     WriteLsiConfiguration();
 }
 
 void TPEGASUSNamespace::WriteLsiConfiguration() const
 {
-    const std::string directory = fRootDirectory + kLsiDirectory;
+    const std::string directory = fTree.LsiDirectory();
     std::ofstream file(kLsiConfiguration, std::ios::trunc);
     if (file) {
         file << "DATA_DIR=" << directory << "\nLIBRARY_DIR=" << directory;

@@ -1,11 +1,9 @@
 // The properties and methods that a class declares, and the rules for adding one.
 #include "src/common/CoreLog.h"
-#include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSClass.h"
 #include "src/schema/TPEGASUSMethodDecl.h"
 #include "src/schema/TPEGASUSProperty.h"
 #include "src/schema/TPEGASUSPropertyDecl.h"
-#include "src/schema/VisitInOrder.h"
 
 #include <boost/make_shared.hpp>
 
@@ -20,17 +18,11 @@ constexpr char kRepeatableName[] = "PortType";
 constexpr char kOverrideQualifier[] = "OVERRIDE";
 constexpr char kKeyQualifier[] = "KEY";
 
-template <typename TMap> typename TMap::mapped_type FindDeclared(const TMap& map, const std::string& name)
-{
-    const auto entry = map.find(TPEGASUSNamespace::NormalizeName(name));
-    return entry == map.end() ? nullptr : entry->second;
-}
-
 } // namespace
 
 void TPEGASUSClass::EnumerateKeyNames(TKeyNameVisitor visitor, TCIMContext context) const
 {
-    VisitInOrder(fPropertyDecls, [&](const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration) {
+    fPropertyDecls.Visit([&](const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration) {
         const std::string name = declaration->GetName(context);
         return !HasTrueQualifier(*declaration, kKeyQualifier) || visitor(&name);
     });
@@ -44,7 +36,7 @@ boost::shared_ptr<ICIMPropertyDecl> TPEGASUSClass::AllocatePropertyDecl(const st
 
 boost::shared_ptr<ICIMPropertyDecl> TPEGASUSClass::GetPropertyDecl(const std::string& name, TCIMContext) const
 {
-    const auto declaration = FindDeclared(fPropertyDecls, name);
+    const auto declaration = fPropertyDecls.Find(name);
     if (!declaration && name != kCollectionTimeProperty) {
         throw TVRXException(TVRXStatusCode::kUnknownProperty);
     }
@@ -53,12 +45,12 @@ boost::shared_ptr<ICIMPropertyDecl> TPEGASUSClass::GetPropertyDecl(const std::st
 
 void TPEGASUSClass::EnumeratePropertyDecls(TPropertyDeclVisitor visitor, TCIMContext) const
 {
-    VisitInOrder(fPropertyDecls, visitor);
+    fPropertyDecls.Visit(visitor);
 }
 
 boost::shared_ptr<ICIMProperty> TPEGASUSClass::GetProperty(const std::string& name, TCIMContext) const
 {
-    auto property = FindDeclared(fProperties, name);
+    auto property = fProperties.Find(name);
     if (!property) {
         throw TVRXException(TVRXStatusCode::kUnknownProperty);
     }
@@ -67,7 +59,7 @@ boost::shared_ptr<ICIMProperty> TPEGASUSClass::GetProperty(const std::string& na
 
 void TPEGASUSClass::EnumerateStaticProperties(TPropertyVisitor visitor, TCIMContext) const
 {
-    VisitInOrder(fProperties, visitor);
+    fProperties.Visit(visitor);
 }
 
 boost::shared_ptr<ICIMMethodDecl> TPEGASUSClass::AllocateMethodDecl(const std::string& name,
@@ -78,12 +70,12 @@ boost::shared_ptr<ICIMMethodDecl> TPEGASUSClass::AllocateMethodDecl(const std::s
 
 boost::shared_ptr<ICIMMethodDecl> TPEGASUSClass::GetMethodDecl(const std::string& name, TCIMContext) const
 {
-    return FindDeclared(fMethodDecls, name);
+    return fMethodDecls.Find(name);
 }
 
 void TPEGASUSClass::EnumerateMethodDecls(TMethodDeclVisitor visitor, TCIMContext) const
 {
-    VisitInOrder(fMethodDecls, visitor);
+    fMethodDecls.Visit(visitor);
 }
 
 void TPEGASUSClass::AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declaration)
@@ -97,13 +89,13 @@ void TPEGASUSClass::AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declarat
         LogFailure("TPEGASUS: Attempt to add reference property ", name, " to non-association class ", fName);
         throw TVRXException(TVRXStatusCode::kReferenceInNonAssociation);
     }
-    const std::string key = TPEGASUSNamespace::NormalizeName(name);
+    const auto existing = fPropertyDecls.Find(name);
     if (!own->GetQualifier(kOverrideQualifier, {})) {
-        AddNewPropertyDecl(key, own);
+        AddNewPropertyDecl(existing, own);
         return;
     }
     try {
-        OverridePropertyDecl(key, own);
+        OverridePropertyDecl(existing, own);
     } catch (const TVRXException& exception) {
         if (exception.GetStatusCode() == TVRXStatusCode::kUnknownProperty) {
             throw;
@@ -114,24 +106,23 @@ void TPEGASUSClass::AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declarat
     }
 }
 
-void TPEGASUSClass::OverridePropertyDecl(const std::string& key,
+void TPEGASUSClass::OverridePropertyDecl(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing,
                                          const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration)
 {
     const std::string name = declaration->GetName({});
-    const auto existing = fPropertyDecls.find(key);
-    if (existing == fPropertyDecls.end()) {
+    if (!existing) {
         LogFailure("TPEGASUS: Attempt to override property ", name, " in class ", fName,
                    ": property doesn't exist in base class");
-        AddNewPropertyDecl(key, declaration);
+        AddNewPropertyDecl(existing, declaration);
         return;
     }
-    if (existing->second->GetType({}) != declaration->GetType({})) {
+    if (existing->GetType({}) != declaration->GetType({})) {
         RefuseOverride(name, ": different types", TVRXStatusCode::kTypeMismatch);
     }
-    if (existing->second->GetClass({}) == shared_from_this()) {
+    if (existing->GetClass({}) == shared_from_this()) {
         RefuseOverride(name, ": original was defined in this class", TVRXStatusCode::kAlreadyExists);
     }
-    existing->second = declaration;
+    fPropertyDecls.Put(name, declaration);
 }
 
 void TPEGASUSClass::RefuseOverride(const std::string& name, const char* reason, unsigned int status) const
@@ -140,36 +131,36 @@ void TPEGASUSClass::RefuseOverride(const std::string& name, const char* reason, 
     throw TVRXException(status);
 }
 
-void TPEGASUSClass::AddNewPropertyDecl(const std::string& key,
+void TPEGASUSClass::AddNewPropertyDecl(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing,
                                        const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration)
 {
     const std::string name = declaration->GetName({});
     const bool isRepeatable = name.find(kRepeatableName) != std::string::npos;
-    if (!isRepeatable && fPropertyDecls.count(key) != 0) {
+    if (existing && !isRepeatable) {
         LogFailure("TPEGASUS: Attempt to add property ", name, " to class ", fName, ": already exists");
         throw TVRXException(TVRXStatusCode::kAlreadyExists);
     }
-    fPropertyDecls[key] = declaration;
+    fPropertyDecls.Put(name, declaration);
 }
 
 void TPEGASUSClass::AdoptPropertyDecl(const std::string& name)
 {
     const auto superClass = fSuperClass.lock();
-    const auto inherited = superClass ? FindDeclared(superClass->fPropertyDecls, name) : nullptr;
-    if (inherited) {
-        fPropertyDecls.emplace(TPEGASUSNamespace::NormalizeName(name), inherited);
+    const auto inherited = superClass ? superClass->fPropertyDecls.Find(name) : nullptr;
+    if (inherited && !fPropertyDecls.Find(name)) {
+        fPropertyDecls.Put(name, inherited);
     }
 }
 
 void TPEGASUSClass::EnterProperty(const boost::shared_ptr<ICIMPropertyDecl>& declaration, const TCIMValue& value)
 {
-    fProperties[TPEGASUSNamespace::NormalizeName(declaration->GetName({}))] =
-        boost::make_shared<TPEGASUSProperty>(value, declaration, shared_from_this());
+    fProperties.Put(declaration->GetName({}),
+                    boost::make_shared<TPEGASUSProperty>(value, declaration, shared_from_this()));
 }
 
 void TPEGASUSClass::EnterMethodDecl(const boost::shared_ptr<TPEGASUSMethodDecl>& declaration)
 {
-    fMethodDecls[TPEGASUSNamespace::NormalizeName(declaration->GetName({}))] = declaration;
+    fMethodDecls.Put(declaration->GetName({}), declaration);
 }
 
 void TPEGASUSClass::RemovePropertyDecl(boost::shared_ptr<ICIMPropertyDecl>) {}

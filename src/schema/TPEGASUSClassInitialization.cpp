@@ -1,8 +1,6 @@
 // How a new class gets its settings and its declarations from the server.
-#include "src/common/ConnectedClient.h"
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
-#include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/ClassMirror.h"
 #include "src/schema/TPEGASUSClass.h"
 
@@ -36,9 +34,8 @@ void TPEGASUSClass::Initialize(const std::string& cimNamespace, const std::strin
         if (fName == kRootClassName) {
             return;
         }
-        const auto ns = LockNamespace();
-        TClassMirror(*this, *ns)
-            .Mirror(ConnectedClient(*ns).getClass(fPegasusNsp, Pegasus::CIMName(fName.c_str()), false, true, false));
+        TClassMirror(*this).Mirror(
+            fNamespace.ConnectedClient().getClass(fPegasusNsp, Pegasus::CIMName(fName.c_str()), false, true, false));
     } catch (const Pegasus::Exception& exception) {
         LogFailure("TPEGASUSClass::Initialize - Unable to retrieve class: ", fName,
                    "\tdetail: ", ToStdString(exception.getMessage()));

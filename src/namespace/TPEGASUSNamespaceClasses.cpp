@@ -1,7 +1,6 @@
-// The cache of classes: looked up by normalised name, fetched from the server on first use.
+// The classes of this namespace: served from the cache, fetched from the server on first use.
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
-#include "src/namespace/DefinitionSlot.h"
 #include "src/namespace/NamespaceConstants.h"
 #include "src/namespace/TPEGASUSNamespace.h"
 #include "src/schema/TPEGASUSClass.h"
@@ -9,9 +8,6 @@
 #include <Pegasus/Client/CIMClient.h>
 #include <host/TVRXException.h>
 
-#include <boost/make_shared.hpp>
-
-#include <cctype>
 #include <iostream>
 
 namespace NKOLVRX20 {
@@ -22,29 +18,6 @@ constexpr Pegasus::Uint32 kGetClassTimeoutMs = 5000;
 // No real schema comes near; a server that names classes as each other's superclass would never end.
 constexpr unsigned int kMaxSuperClassDepth = 128;
 constexpr unsigned char kDecimal = 10;
-
-bool IsNameStart(unsigned char character)
-{
-    return character == '_' || std::isalpha(character) != 0;
-}
-
-bool IsNamePart(unsigned char character)
-{
-    return character == '_' || std::isalnum(character) != 0;
-}
-
-bool IsLegalName(const std::string& name)
-{
-    if (!name.empty() && !IsNameStart(static_cast<unsigned char>(name.front()))) {
-        return false;
-    }
-    for (const char character : name) {
-        if (!IsNamePart(static_cast<unsigned char>(character))) {
-            return false;
-        }
-    }
-    return true;
-}
 
 std::string TextFromContext(const TCIMContext& context, const std::string& key, const std::string& fallback)
 {
@@ -74,25 +47,6 @@ class TDepthCount
 
 } // namespace
 
-std::string TPEGASUSNamespace::NormalizeName(const std::string& name)
-{
-    std::string normalized = name;
-    for (char& character : normalized) {
-        character = static_cast<char>(std::tolower(static_cast<unsigned char>(character)));
-    }
-    if (!IsLegalName(normalized)) {
-        LogFailure("PEGASUS: CIM name '", name, "' is invalid");
-        throw TVRXException(TVRXStatusCode::kInvalidName);
-    }
-    return normalized;
-}
-
-boost::shared_ptr<TPEGASUSClass> TPEGASUSNamespace::FindClass(const std::string& key) const
-{
-    const auto entry = fClasses.find(key);
-    return entry == fClasses.end() ? nullptr : entry->second;
-}
-
 boost::shared_ptr<ICIMClass> TPEGASUSNamespace::GetClass(const std::string& name, TCIMContext context)
 {
     if (!isConnected() || name.empty()) {
@@ -102,16 +56,14 @@ boost::shared_ptr<ICIMClass> TPEGASUSNamespace::GetClass(const std::string& name
         LogProgress("TPEGASUSNamespace::GetClass ", name, " : return <root>");
         return fRootClass;
     }
-    const std::string key = NormalizeName(name);
-    if (const auto cached = FindClass(key)) {
+    if (const auto cached = fClasses.Find(name)) {
         LogProgress("TPEGASUSNamespace::GetClass ", name, " Found in TPEGASUSNamespace");
         return cached;
     }
-    return FetchClass(name, key, context);
+    return FetchClass(name, context);
 }
 
-boost::shared_ptr<ICIMClass> TPEGASUSNamespace::FetchClass(const std::string& name, const std::string& key,
-                                                           const TCIMContext& context)
+boost::shared_ptr<ICIMClass> TPEGASUSNamespace::FetchClass(const std::string& name, const TCIMContext& context)
 {
     const TDepthCount depth(fSuperClassDepth);
     if (fSuperClassDepth > kMaxSuperClassDepth) {
@@ -129,7 +81,7 @@ boost::shared_ptr<ICIMClass> TPEGASUSNamespace::FetchClass(const std::string& na
     if (!AskServerForClass(cimNamespace, name, answer) || !MirrorClass(answer, context, classContext)) {
         return nullptr;
     }
-    const auto mirrored = FindClass(key);
+    const auto mirrored = fClasses.Find(name);
     if (mirrored) {
         LogProgress("TPEGASUSNamespace::GetClass ", name, " Now it is Found in TPEGASUSNamespace");
     } else {
@@ -180,39 +132,6 @@ bool TPEGASUSNamespace::MirrorClass(const Pegasus::CIMClass& source, const TCIMC
         return false;
     }
     return true;
-}
-
-boost::shared_ptr<ICIMClass> TPEGASUSNamespace::AllocateClass(const std::string&, boost::shared_ptr<ICIMClass>,
-                                                              TCIMContext)
-{
-    return nullptr;
-}
-
-boost::shared_ptr<ICIMClass> TPEGASUSNamespace::AllocateClass(const std::string& name, const std::string& cimNamespace,
-                                                              const std::string& timeout,
-                                                              boost::shared_ptr<ICIMClass> superClass, TCIMContext&)
-{
-    const auto parent = superClass ? boost::dynamic_pointer_cast<TPEGASUSClass>(superClass) : fRootClass;
-    const auto allocated = boost::make_shared<TPEGASUSClass>(shared_from_this(), name, parent);
-    allocated->Initialize(cimNamespace, timeout, parent);
-    return allocated;
-}
-
-void TPEGASUSNamespace::AddClass(boost::shared_ptr<TPEGASUSClass> newClass)
-{
-    boost::shared_ptr<TPEGASUSClass>& slot =
-        DefinitionSlot(fClasses, newClass->GetName({}), fAllowRedefinition, "TPEGASUSNamespace: class ");
-    if (slot) {
-        newClass->SetChildClasses(slot->GetChildClasses());
-    }
-    slot = newClass;
-}
-
-void TPEGASUSNamespace::EnumerateRootClasses(TClassVisitor visitor, TCIMContext context)
-{
-    if (isConnected() && fRootClass) {
-        fRootClass->EnumerateSubClasses(visitor, true, context);
-    }
 }
 
 } // namespace NKOLVRX20

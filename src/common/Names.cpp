@@ -1,0 +1,45 @@
+#include "src/common/Names.h"
+
+#include "src/common/CoreLog.h"
+
+#include <host/TVRXException.h>
+
+#include <algorithm>
+#include <cctype>
+
+namespace NKOLVRX20 {
+
+namespace {
+
+bool IsNamePart(char character)
+{
+    return character == '_' || std::isalnum(static_cast<unsigned char>(character)) != 0;
+}
+
+bool IsLegalName(const std::string& name)
+{
+    const bool startsWithDigit = !name.empty() && std::isdigit(static_cast<unsigned char>(name.front())) != 0;
+    return !startsWithDigit && std::all_of(name.begin(), name.end(), IsNamePart);
+}
+
+} // namespace
+
+std::string LowerCase(std::string text)
+{
+    for (char& character : text) {
+        character = static_cast<char>(std::tolower(static_cast<unsigned char>(character)));
+    }
+    return text;
+}
+
+std::string NormalizedName(const std::string& name)
+{
+    std::string normalized = LowerCase(name);
+    if (!IsLegalName(normalized)) {
+        LogFailure("PEGASUS: CIM name '", name, "' is invalid");
+        throw TVRXException(TVRXStatusCode::kInvalidName);
+    }
+    return normalized;
+}
+
+} // namespace NKOLVRX20

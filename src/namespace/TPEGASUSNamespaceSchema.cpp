@@ -1,0 +1,100 @@
+// The definitions of this namespace, classes and qualifier declarations: making them and entering them.
+#include "src/common/CoreLog.h"
+#include "src/common/Names.h"
+#include "src/namespace/TPEGASUSNamespace.h"
+#include "src/schema/TPEGASUSClass.h"
+#include "src/schema/TPEGASUSQualifierDecl.h"
+
+#include <host/TVRXException.h>
+
+#include <boost/make_shared.hpp>
+
+namespace NKOLVRX20 {
+
+namespace {
+
+// Returns: the definition of that name that a new one takes the place of; null when the name is new.
+// Throws: TVRXException 25 for a bad name; 16, after a log line, when the name is taken and may not be replaced.
+template <typename TDefinition>
+boost::shared_ptr<TDefinition> FindReplaced(const TNamedMap<TDefinition>& definitions, const std::string& name,
+                                            bool mayReplace, const char* kind)
+{
+    auto present = definitions.Find(name);
+    if (present && !mayReplace) {
+        LogProgress("TPEGASUSNamespace: ", kind, name, " already defined");
+        throw TVRXException(TVRXStatusCode::kAlreadyExists);
+    }
+    return present;
+}
+
+} // namespace
+
+std::string TPEGASUSNamespace::NormalizeName(const std::string& name)
+{
+    return NormalizedName(name);
+}
+
+boost::shared_ptr<ICIMClass> TPEGASUSNamespace::AllocateClass(const std::string&, boost::shared_ptr<ICIMClass>,
+                                                              TCIMContext)
+{
+    return nullptr;
+}
+
+boost::shared_ptr<ICIMClass> TPEGASUSNamespace::AllocateClass(const std::string& name, const std::string& cimNamespace,
+                                                              const std::string& timeout,
+                                                              boost::shared_ptr<ICIMClass> superClass, TCIMContext&)
+{
+    const auto parent = superClass ? boost::dynamic_pointer_cast<TPEGASUSClass>(superClass) : fRootClass;
+    const auto allocated = boost::make_shared<TPEGASUSClass>(shared_from_this(), name, parent);
+    allocated->Initialize(cimNamespace, timeout, parent);
+    return allocated;
+}
+
+void TPEGASUSNamespace::AddClass(boost::shared_ptr<TPEGASUSClass> newClass)
+{
+    const std::string name = newClass->GetName({});
+    if (const auto replaced = FindReplaced(fClasses, name, fAllowRedefinition, "class ")) {
+        newClass->SetChildClasses(replaced->GetChildClasses());
+    }
+    fClasses.Put(name, newClass);
+}
+
+void TPEGASUSNamespace::EnumerateRootClasses(TClassVisitor visitor, TCIMContext context)
+{
+    if (isConnected() && fRootClass) {
+        fRootClass->EnumerateSubClasses(visitor, true, context);
+    }
+}
+
+boost::shared_ptr<ICIMQualifierDecl> TPEGASUSNamespace::AllocateQualifierDecl(const std::string& name,
+                                                                              TCIMValue defaultValue,
+                                                                              ICIMQualifierDecl::EScope scope,
+                                                                              ICIMQualifierDecl::EFlavor flavor,
+                                                                              TCIMContext)
+{
+    return boost::make_shared<TPEGASUSQualifierDecl>(shared_from_this(), name, defaultValue, scope, flavor);
+}
+
+void TPEGASUSNamespace::AddQualifierDecl(boost::shared_ptr<TPEGASUSQualifierDecl> declaration)
+{
+    const std::string name = declaration->GetName({});
+    FindReplaced(fQualifierDecls, name, fAllowRedefinition, "qualifier ");
+    fQualifierDecls.Put(name, declaration);
+}
+
+boost::shared_ptr<TPEGASUSQualifierDecl> TPEGASUSNamespace::FindQualifierDecl(const std::string& name) const
+{
+    return fQualifierDecls.Find(name);
+}
+
+boost::shared_ptr<ICIMQualifierDecl> TPEGASUSNamespace::GetQualifierDecl(const std::string& name, TCIMContext context)
+{
+    return GetUpcallNamespace()->GetQualifierDecl(name, context);
+}
+
+void TPEGASUSNamespace::EnumerateQualifierDecls(TQualifierDeclVisitor visitor, TCIMContext)
+{
+    fQualifierDecls.Visit(visitor);
+}
+
+} // namespace NKOLVRX20

@@ -1,0 +1,45 @@
+#pragma once
+
+#include "src/common/Names.h"
+
+#include <boost/shared_ptr.hpp>
+
+#include <map>
+#include <string>
+
+namespace NKOLVRX20 {
+
+// Named elements of one owner, found without regard to case and visited in byte order of their normalised names.
+// Every operation that takes a name throws TVRXException 25 for one that is not a CIM name.
+template <typename TElement> class TNamedMap
+{
+  public:
+    typedef boost::shared_ptr<TElement> TPointer;
+
+    // Returns: null when there is none of that name.
+    TPointer Find(const std::string& name) const
+    {
+        const auto entry = fElements.find(NormalizedName(name));
+        return entry == fElements.end() ? nullptr : entry->second;
+    }
+
+    // The element takes the place of one of the same name.
+    void Put(const std::string& name, const TPointer& element) { fElements[NormalizedName(name)] = element; }
+
+    // Calls the visitor with each element until it returns false. The walk is on a copy: the visitor may change or
+    // destroy this map.
+    template <typename TVisitor> void Visit(const TVisitor& visitor) const
+    {
+        const auto elements = fElements;
+        for (const auto& entry : elements) {
+            if (!visitor(entry.second)) {
+                return;
+            }
+        }
+    }
+
+  private:
+    std::map<std::string, TPointer> fElements; // by normalised name
+};
+
+} // namespace NKOLVRX20
