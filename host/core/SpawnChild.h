@@ -19,12 +19,12 @@ struct TProcessRequest
     bool fInheritEnvironment = false;      // instead of fEnvironment
 };
 
-// Opens a close-on-exec pipe above the standard streams whose read end does not block.
+// Opens a close-on-exec pipe above the standard streams. Its read end is non-blocking.
 // Returns: an errno, 0 for success.
 int OpenPipe(TUniqueFd& readEnd, TUniqueFd& writeEnd);
 
 // Starts a child with default signal dispositions, an empty mask, its own process group, standard input from /dev/null,
-// the two descriptors as standard output and error, and no other descriptor.
+// and the two descriptors as standard output and error. The child inherits only these three.
 // Returns: an errno, also of a failed exec; 0 for success, pid is then the child's.
 int SpawnChild(const TProcessRequest& request, int output, int errorOutput, pid_t& pid);
 

@@ -27,7 +27,7 @@ bool IsDigit(char c)
     return c >= '0' && c <= '9';
 }
 
-// A field without significance is written as asterisks, all of it.
+// An insignificant field consists of asterisks.
 bool IsField(const std::string& text, TField field)
 {
     const bool unspecified = text[field.fAt] == '*';
@@ -40,7 +40,7 @@ bool IsField(const std::string& text, TField field)
     return true;
 }
 
-// Microseconds alone may lose significance digit by digit, from the right.
+// Only microseconds lose significance digit by digit, from the right.
 bool IsMicroseconds(const std::string& text)
 {
     std::size_t i = kMicroseconds.fAt;

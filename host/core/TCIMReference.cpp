@@ -5,8 +5,8 @@
 namespace NKOLVRX20 {
 namespace {
 
-// "//host[:port]/ns:Class.k=v" or "ns:Class.k=v" or "Class.k=v": where the class name begins. A colon inside a key
-// value does not count, so the search ends at the first dot or, in a path without keys, at the end.
+// Returns: where the class name begins in "//host[:port]/ns:Class.k=v", "ns:Class.k=v" or "Class.k=v". The search ends
+// where the keys begin, because their values may hold colons.
 std::size_t ClassNameAt(const std::string& path, std::size_t from)
 {
     const std::size_t colon = path.find(':', from);

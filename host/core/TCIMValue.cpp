@@ -1,17 +1,11 @@
 #include "host/core/TCIMValueRep.h"
 
 #include <host/TCIMValue.h>
-#include <host/TVRXException.h>
 
 #include <boost/make_shared.hpp>
 
 namespace NKOLVRX20 {
 namespace {
-
-[[noreturn]] void ThrowTypeMismatch()
-{
-    throw TVRXException(TVRXStatusCode::kTypeMismatch);
-}
 
 bool IsElementCode(TCIMValue::TCIMType type)
 {

@@ -2,7 +2,6 @@
 #include "host/core/TCIMValueRep.h"
 
 #include <host/TCIMValue.h>
-#include <host/TVRXException.h>
 
 #include <cmath>
 #include <limits>
@@ -11,12 +10,7 @@
 namespace NKOLVRX20 {
 namespace {
 
-[[noreturn]] void ThrowTypeMismatch()
-{
-    throw TVRXException(TVRXStatusCode::kTypeMismatch);
-}
-
-// A real outside the integer's range is undefined behaviour in C++; here it saturates, and no number is 0.
+// Converting a real outside the integer's range is undefined behaviour in C++; here it saturates, and NaN becomes 0.
 template <typename To, typename From> To SaturatingCast(From value)
 {
     if (std::isnan(value)) {

@@ -1,4 +1,4 @@
-// TCIMValue's equality and order: both from one three-way comparison, so that they never disagree.
+// TCIMValue's equality and order, from one comparison, so that they always agree.
 #include "host/core/TCIMValueRep.h"
 
 #include <host/TCIMValue.h>
@@ -13,7 +13,7 @@ namespace {
 template <typename Value> int Compare(const Value& left, const Value& right)
 {
     if constexpr (std::is_floating_point_v<Value>) {
-        // Not-a-number is equal to itself and before every number; else sorting would be undefined.
+        // NaN is equal to itself and less than every number, so that sorting stays defined.
         const bool leftNan = std::isnan(left), rightNan = std::isnan(right);
         if (leftNan || rightNan) {
             return int(rightNan) - int(leftNan);
@@ -49,7 +49,7 @@ bool TCIMValue::operator<(const TCIMValue& other) const
     }
     return std::visit(
         [&other](const auto& value) {
-            typedef std::decay_t<decltype(value)> TAlternative;
+            using TAlternative = std::decay_t<decltype(value)>;
             const auto& otherValue = std::get<TAlternative>(other.fRep->fData);
             if constexpr (std::is_same_v<TAlternative, std::monostate>) {
                 return false;

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <host/TCIMValue.h>
+#include <host/TVRXException.h>
 
 #include <boost/weak_ptr.hpp>
 
@@ -8,16 +9,20 @@
 
 namespace NKOLVRX20 {
 
-// What a TCIMValue points to. Values share a representation and never change it; whoever writes makes a new one.
-// The exception is a lent one, whose element vector was handed out for writing: it belongs to one value alone, and
+[[noreturn]] inline void ThrowTypeMismatch()
+{
+    throw TVRXException(TVRXStatusCode::kTypeMismatch);
+}
+
+// The shared, immutable representation of TCIMValues: a value that is written gets a new one.
+// The exception is a lent representation, whose element vector was handed out for writing: it belongs to one value, and
 // copies of that value copy it.
 struct TCIMValue::TRep
 {
     // The alternatives' indices are the scalar type codes; index 0 is null, the last one an array.
-    typedef std::variant<std::monostate, bool, unsigned char, signed char, unsigned short, short, unsigned int, int,
-                         unsigned long, long, float, double, TCIMChar16, std::string, TCIMDateTime, TCIMReference,
-                         std::vector<TCIMValue>>
-        TData;
+    using TData = std::variant<std::monostate, bool, unsigned char, signed char, unsigned short, short, unsigned int,
+                               int, unsigned long, long, float, double, TCIMChar16, std::string, TCIMDateTime,
+                               TCIMReference, std::vector<TCIMValue>>;
 
     TRep(TCIMType elementType, TData data) : fElementType(elementType), fData(std::move(data)) {}
     explicit TRep(TData data) : fElementType(TCIMType::ECIMType(data.index())), fData(std::move(data)) {}

@@ -1,8 +1,7 @@
-// TCIMValue's text forms, locale-free in both directions.
+// TCIMValue's text forms. Both directions ignore the locale.
 #include "host/core/TCIMValueRep.h"
 
 #include <host/TCIMValue.h>
-#include <host/TVRXException.h>
 
 #include <boost/make_shared.hpp>
 
@@ -13,11 +12,6 @@
 
 namespace NKOLVRX20 {
 namespace {
-
-[[noreturn]] void ThrowTypeMismatch()
-{
-    throw TVRXException(TVRXStatusCode::kTypeMismatch);
-}
 
 template <typename Number> Number ParseNumber(const std::string& text)
 {

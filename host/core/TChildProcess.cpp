@@ -1,5 +1,7 @@
 #include "host/core/TChildProcess.h"
 
+#include "host/core/TProcessControl.h"
+
 #include <algorithm>
 #include <cerrno>
 #include <csignal>
@@ -8,19 +10,17 @@
 #include <sys/wait.h>
 
 extern "C" {
-#include <sys/pidfd.h> // C only in glibc 2.36
+#include <sys/pidfd.h> // glibc 2.36 declares it for C only
 }
-
-#include "host/core/TProcessControl.h"
 
 namespace NKOLVRX20 {
 namespace {
 
-// How often the child is looked at where the kernel cannot announce its exit.
+// The interval between looks at the child on kernels that cannot announce its exit.
 constexpr std::chrono::milliseconds kExitPollInterval{20};
 
-// Read at a time: more than a pipe holds, so that nothing is missed after the exit, but bounded, so that a program that
-// never stops writing cannot keep the deadline from being looked at.
+// Reads in one go: more than a pipe holds, so that all output is read after the exit; bounded, so that the deadline is
+// checked even while a program keeps writing.
 constexpr int kMaxReadsAtOnce = 16;
 
 } // namespace
@@ -88,7 +88,7 @@ bool TChildProcess::PollOnce(TClock::time_point deadline)
         return false;
     }
     const auto wait = fPidFd ? left : std::min(left, kExitPollInterval);
-    // A negative descriptor is skipped, so closed pipes and a missing pid descriptor need no special case.
+    // poll skips negative descriptors: closed pipes and a missing pid descriptor.
     pollfd fds[] = {{fOutputPipe.fRead.Get(), POLLIN, 0},
                     {fErrorPipe.fRead.Get(), POLLIN, 0},
                     {fPidFd.Get(), POLLIN, 0},
@@ -130,7 +130,7 @@ void TChildProcess::DrainBoth()
     Drain(fErrorPipe.fRead, fOutcome.fErrorOutput, kMaxErrorOutputBytes);
 }
 
-// The group, and the child itself in case that it left the group.
+// Kills the group, and the child itself in case it left the group.
 void TChildProcess::Kill()
 {
     ::killpg(fPid, SIGKILL);

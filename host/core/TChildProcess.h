@@ -12,17 +12,17 @@
 
 namespace NKOLVRX20 {
 
-// What became of it.
+// How a run ended, and what the child wrote.
 struct TProcessOutcome
 {
     enum EEnd
     {
         kExited,   // fStatus is the exit status
         kSignaled, // fStatus is the signal
-        kUnknown,  // it ended, but this process's SIGCHLD disposition threw the status away
+        kUnknown,  // it ended; the kernel dropped the status because this process ignores SIGCHLD
         kNotRun,   // fStatus is the errno of the failed start
         kTimedOut, // killed
-        kCancelled // killed, or not started, because programs are cancelled (TProcessControl)
+        kCancelled // killed or refused while programs are cancelled (TProcessControl)
     };
 
     EEnd fEnd = kNotRun;
@@ -34,7 +34,7 @@ struct TProcessOutcome
     bool IsSuccess() const { return fEnd == kExited && fStatus == 0; }
 };
 
-// Captured beyond these, output is read and dropped, so that the child does not stall.
+// Further output is read and dropped, so that the child keeps running.
 constexpr std::size_t kMaxOutputBytes = 16UL * 1024 * 1024;
 constexpr std::size_t kMaxErrorOutputBytes = 64UL * 1024;
 
@@ -45,14 +45,14 @@ class TChildProcess
   public:
     explicit TChildProcess(const TProcessRequest& request);
 
-    // Never throws for what the child does; see TProcessOutcome.
+    // Returns: the outcome, also of a child that fails or cannot be started.
     // Throws: std::bad_alloc.
-    // Blocks: until the child exits (not until its last descendant closes the pipes), the time is over or programs are
-    // cancelled.
+    // Blocks: until the child itself exits (its descendants may keep the pipes open), the timeout expires or programs
+    // are cancelled.
     TProcessOutcome Run(std::chrono::milliseconds timeout);
 
   private:
-    typedef std::chrono::steady_clock TClock;
+    using TClock = std::chrono::steady_clock;
 
     struct TPipe
     {
@@ -73,7 +73,7 @@ class TChildProcess
     TPipe fOutputPipe;
     TPipe fErrorPipe;
     pid_t fPid = -1;
-    TUniqueFd fPidFd; // readable when the child has exited; none on kernels before 5.3
+    TUniqueFd fPidFd; // readable when the child has exited; empty on kernels before 5.3
     TProcessOutcome fOutcome;
 };
 

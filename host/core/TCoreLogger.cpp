@@ -1,8 +1,8 @@
+#define SPDLOG_PREVENT_CHILD_FD // makes spdlog open the file close-on-exec
 #include "host/core/TCoreLogger.h"
 
 #include "host/core/TUniqueFd.h"
 
-#define SPDLOG_PREVENT_CHILD_FD // the file is close-on-exec
 #include <host/TVRXException.h>
 
 #include <spdlog/logger.h>
@@ -59,7 +59,7 @@ TUniqueFd OpenPrivateFile(const std::string& path)
 
 TCoreLogger& TCoreLogger::Instance()
 {
-    // Never destroyed: a plug-in's static destructors may still log.
+    // Lives until the process ends: a plug-in's static destructors may still log.
     static TCoreLogger* fgInstance = new TCoreLogger;
     return *fgInstance;
 }
@@ -92,7 +92,7 @@ void TCoreLogger::Configure(const TOptions& options)
     }
     sinks->fLogger.set_pattern(kPattern);
     sinks->fLogger.set_level(ToLevel(options.fLeastSevere));
-    sinks->fLogger.flush_on(spdlog::level::trace); // a process that dies must not take its last lines along
+    sinks->fLogger.flush_on(spdlog::level::trace); // the last lines before a crash are the ones that matter
     std::atomic_store(&fSinks, sinks);
 }
 

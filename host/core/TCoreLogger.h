@@ -15,16 +15,16 @@ class TCoreLogger : public ILogger
   public:
     struct TOptions
     {
-        std::string fFile;      // empty for none; has mode 0600, and links are not followed
-        bool fTruncate = false; // what the file holds already is dropped rather than appended to
+        std::string fFile;      // gets mode 0600; links are refused; empty for none
+        bool fTruncate = false; // replaces the file's content instead of appending
         bool fToStandardError = false;
-        EVRXLogSeverity fLeastSevere = kInfo; // entries beyond this severity are dropped
+        EVRXLogSeverity fLeastSevere = kInfo; // less severe entries (higher numbers) are dropped
     };
 
     static TCoreLogger& Instance();
 
     // Replaces what was configured before.
-    // Throws: TVRXException 3 when the file cannot be opened for writing; the configuration is then unchanged.
+    // Throws: TVRXException 3 when the file cannot be opened for writing; the configuration then stays as it was.
     void Configure(const TOptions& options);
 
     void Log(EVRXLogSeverity severity, const std::string& text) override;

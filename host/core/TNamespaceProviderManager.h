@@ -7,7 +7,8 @@
 
 namespace NKOLVRX20 {
 
-// The process's one namespace-provider manager. A provider's own operations are never called under the lock.
+// The process's one namespace-provider manager.
+// Thread: safe. Operations of a provider are called after the lock is released, so they may call the manager.
 class TNamespaceProviderManager : public INamespaceProviderManager
 {
   public:

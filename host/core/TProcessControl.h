@@ -8,8 +8,8 @@
 
 namespace NKOLVRX20 {
 
-// What leaves TOSSpecific::SpawnProcess while programs are cancelled. On purpose no TVRXException: a plug-in that
-// retries after one of those must not retry against a host that is shutting down.
+// Thrown by TOSSpecific::SpawnProcess while programs are cancelled. It is unrelated to TVRXException on purpose: a
+// plug-in retries after a TVRXException, and a host that is shutting down wants the call to end.
 class TProgramsCancelled : public std::exception
 {
   public:
@@ -17,15 +17,15 @@ class TProgramsCancelled : public std::exception
     const char* what() const noexcept override;
 };
 
-// The host's switch for all child processes: while cancelled, running programs are killed and none is started. It turns
-// once: programs are cancelled when a user interrupts the host's work, and resumed for the shutdown, which runs some.
-// Thread: safe.
+// The host's switch for all child processes: while cancelled, running programs are killed and new ones are refused.
+// It turns once: programs are cancelled when a user interrupts the host's work, and resumed for the shutdown, which
+// runs some. Thread: safe.
 class TProcessControl
 {
   public:
     static TProcessControl& Instance();
 
-    // No effect after Resume.
+    // Ignored after Resume.
     void Cancel();
     void Resume();
     bool IsCancelled() const { return fCancelled; }

@@ -10,21 +10,22 @@
 
 namespace NKOLVRX20 {
 
-// A program that did not do its work, as the host tells it to its user.
+// A program that failed, as the host reports it to the user.
 struct TFailedProgram
 {
     std::string fName;                   // argv[0]
-    std::vector<std::string> fArguments; // without argv[0]
+    std::vector<std::string> fArguments; // argv[1] and following
     TProcessOutcome::EEnd fEnd = TProcessOutcome::kUnknown;
     int fStatus = 0;
-    std::string fOutput; // its beginning: some programs tell their failures here
+    std::string fOutput; // its beginning: some programs report failures here
     std::string fErrorOutput;
 
     // Returns: "exit status 250", "signal 11 (Segmentation fault)", "not started: No such file or directory" ...
     std::string GetReason() const;
 };
 
-// The host's memory of failed programs, beside the log line that each gets. The oldest go when there are too many.
+// The host's memory of failed programs, in addition to the log line that each gets. The oldest entries are dropped when
+// a limit is reached.
 // Thread: safe.
 class TProcessLog
 {
@@ -34,8 +35,8 @@ class TProcessLog
 
     static TProcessLog& Instance();
 
-    // Keeps a program that failed, then logs it, or one that wrote to standard error, as one line of severity 3; so a
-    // logger can take what its line is about.
+    // Keeps a program that failed, then logs one line of severity 3 about it. A program that succeeded but wrote to
+    // standard error is only logged. The entry comes first, so that a logger can take it when it sees the line.
     void Add(const TProcessRequest& request, const TProcessOutcome& outcome);
 
     // Returns: the failed programs since the last call, in the order in which they ended.

@@ -12,7 +12,7 @@
 namespace NKOLVRX20 {
 namespace {
 
-// A property that its class does not declare is kept all the same; it has no texts then.
+// Returns: null for a property that the class does not declare: it is kept and shown with its plain text.
 boost::shared_ptr<ICIMPropertyDecl> FindDeclaration(const boost::shared_ptr<ICIMClass>& instanceClass,
                                                     const std::string& name, const TCIMContext& context)
 {
@@ -32,8 +32,8 @@ std::string ClassNameOf(const ICIMInstance& instance)
     return instanceClass ? instanceClass->GetName(TCIMContext()) : std::string();
 }
 
-// Returns: the property's value in the type that the class declares for it, so that the path does not depend on how the
-// value was set; the value itself where it does not convert.
+// Returns: the property's value in the type that the class declares for it, so that a key has one text however it was
+// set. A value that fails to convert stays as it is.
 TCIMValue KeyValue(const ICIMProperty& property)
 {
     TCIMValue value = property.GetValue(TCIMContext());
@@ -51,7 +51,7 @@ TCIMValue KeyValue(const ICIMProperty& property)
     }
 }
 
-// The contract's property has no name of its own: it is its declaration's, unless the property is of this library.
+// The contract gives a property the name of its declaration; a property of this library also has its own.
 std::string NameOf(const ICIMProperty& property)
 {
     if (const auto* own = dynamic_cast<const TInmemProperty*>(&property)) {
@@ -82,7 +82,7 @@ TInmemInstance::TInmemInstance(boost::shared_ptr<ICIMClass> instanceClass, TCIMC
 
 TInmemInstance::~TInmemInstance() = default;
 
-// Values are kept as they were set, whatever the declarations say; there is nothing to hold against them.
+// Every value is accepted, whatever the declarations say.
 void TInmemInstance::Validate(TCIMContext) {}
 
 void TInmemInstance::AddToNamespace(TCIMContext)

@@ -22,7 +22,7 @@ boost::shared_ptr<Object> Find(const std::map<std::string, boost::shared_ptr<Obj
     return found == objects.end() ? boost::shared_ptr<Object>() : found->second;
 }
 
-// Visitors may change the namespace, so they are shown a copy's entries.
+// Visitors may change the namespace, so a copy of the entries is visited.
 template <typename Objects, typename Visitor> void VisitEach(const Objects objects, const Visitor& visitor)
 {
     for (const auto& object : objects) {

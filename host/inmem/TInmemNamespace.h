@@ -9,23 +9,22 @@
 namespace NKOLVRX20 {
 
 // A namespace whose classes, qualifier declarations and instances are kept in memory. The host gives it to a plug-in
-// as upcall namespace (where the plug-in looks up qualifier declarations) and as repository (where the plug-in sends
-// what it does not serve itself).
-// Thread: one at a time.
+// as upcall namespace (where the plug-in looks up qualifier declarations) and as repository (where the plug-in
+// delegates the operations that it leaves to the host). Thread: one at a time.
 class TInmemNamespace : public ICIMNamespace
 {
   public:
-    // Enter an object; one of the same name or path is replaced.
+    // Add an object, or replace the one of the same name or path.
     void AddClass(const boost::shared_ptr<ICIMClass>& newClass);
     void AddQualifierDecl(const boost::shared_ptr<ICIMQualifierDecl>& declaration);
     void AddInstance(const boost::shared_ptr<ICIMInstance>& instance);
 
-    // Returns: null; no plug-in made it.
+    // Returns: null: the host itself made this namespace.
     boost::shared_ptr<INamespaceProvider> GetNamespaceProvider(TCIMContext context) override;
     void SetUpcallNamespace(boost::shared_ptr<ICIMNamespace> upcall, TCIMContext context) override;
     // Throws: TVRXException 31.
     void AddUnderlyingNamespace(boost::shared_ptr<ICIMNamespace> underlying, TCIMContext context) override;
-    // Throws: TVRXException 31: it keeps classes but has no kind of its own.
+    // Throws: TVRXException 31. Classes are made elsewhere and added.
     boost::shared_ptr<ICIMClass> AllocateClass(const std::string& name, boost::shared_ptr<ICIMClass> superClass,
                                                TCIMContext context) override;
     boost::shared_ptr<ICIMClass> GetClass(const std::string& name, TCIMContext context) override;
@@ -48,7 +47,7 @@ class TInmemNamespace : public ICIMNamespace
     void DeleteInstance(const TCIMReference& reference, TCIMContext context) override;
     // Throws: TVRXException 6 when there is no such instance.
     void ModifyInstance(const TCIMReference& reference, TCIMContext values, TCIMContext context) override;
-    // Throws: TVRXException 31: no query language is known here.
+    // Throws: TVRXException 31.
     void ExecuteQuery(TInstanceVisitor visitor, std::string& language, std::string& query,
                       TCIMContext context) override;
     void ClearInstances() override;

@@ -7,17 +7,17 @@
 namespace NKOLVRX20 {
 
 // A property of an instance in memory: a value, the previous one, and the declaration that gives it its texts.
-// Ownership: does not keep the declaration or the class alive.
+// Ownership: weak pointers to the declaration and the class.
 class TInmemProperty : public ICIMProperty
 {
   public:
     TInmemProperty(const std::string& name, TCIMValue value, const boost::shared_ptr<ICIMPropertyDecl>& declaration,
                    const boost::shared_ptr<ICIMClass>& instanceClass);
 
-    // Returns: the name in the declaration's spelling; without a declaration as the instance was told it.
+    // Returns: the declaration's name, or the name that the instance was given where the class declares none.
     std::string GetName() const;
 
-    // The value's type; of a null without type the declaration's.
+    // Returns: the value's type; for a null of unknown type the declaration's.
     TCIMValue::TCIMType GetType(TCIMContext context) const override;
     bool IsArray(TCIMContext context) const override;
     bool IsDefaultValue(TCIMContext context) const override;

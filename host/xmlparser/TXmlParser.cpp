@@ -47,11 +47,12 @@ std::string FindDeclaredEntity(const std::string& markup)
 
 } // namespace
 
-// The state of one parse, and the bridge from expat's C callbacks. An exception must stay out of expat's C frames: one
+// The state of one parse, and the bridge from expat's C callbacks. Exceptions must stay out of expat's C frames: one
 // that a callback throws is kept, ends the parse, and is thrown again by Parse.
 //
-// After a DTD or parameter entity that it has not read, expat cannot know whether an entity is declared. It then drops
-// references in values of attributes silently, so tags and declarations of attributes are searched for them.
+// After an unread DTD or parameter entity, expat assumes that unknown entities are declared there, and silently drops
+// references to them in attribute values. So the raw text of tags and attribute declarations is searched for
+// references.
 struct TXmlParser::TState
 {
     explicit TState(TXmlParser& owner) : fOwner(owner) {}

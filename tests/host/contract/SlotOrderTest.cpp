@@ -62,9 +62,9 @@ void ExpectOrder(const std::vector<TOperation>& operations)
         #Name #Signature, SlotOf(static_cast<Result(Class::*) Signature>(&Class::Name))                                \
     }
 
-typedef boost::shared_ptr<ICIMQualifier> TQualifier;
-typedef boost::shared_ptr<const ICIMQualifierDecl> TConstQualifierDecl;
-typedef ICIMQualifierDecl::EFlavor EFlavor;
+using TQualifier = boost::shared_ptr<ICIMQualifier>;
+using TConstQualifierDecl = boost::shared_ptr<const ICIMQualifierDecl>;
+using EFlavor = ICIMQualifierDecl::EFlavor;
 
 TEST(SlotOrder, NamespaceProvider)
 {

@@ -75,7 +75,7 @@ const TEndRow kEnds[] = {
     {"killed", {"signal", "9"}, TProcessOutcome::kSignaled, 9, "signal 9 (Killed)"},
 };
 
-TEST(TChildProcess, TellsHowItEnded)
+TEST(TChildProcess, ReportsHowItEnded)
 {
     for (const TEndRow& row : kEnds) {
         SCOPED_TRACE(row.fName);

@@ -10,7 +10,7 @@
 namespace NKOLVRX20 {
 namespace {
 
-typedef TCIMValue::TCIMType TType;
+using TType = TCIMValue::TCIMType;
 
 constexpr unsigned long kMaxUint64 = std::numeric_limits<unsigned long>::max();
 constexpr long kMinSint64 = std::numeric_limits<long>::min();

@@ -12,7 +12,7 @@
 namespace NKOLVRX20 {
 namespace {
 
-typedef TCIMValue::TCIMType TType;
+using TType = TCIMValue::TCIMType;
 using testing::ElementsAre;
 
 boost::shared_ptr<TFakeClass> FanClass()

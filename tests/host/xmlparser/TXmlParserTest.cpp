@@ -119,7 +119,7 @@ const TBadRow kBad[] = {
      {"1 fatal: undefined entity"}},
 };
 
-TEST(TXmlParser, TellsWhatIsWrongAndKeepsWhatCameBefore)
+TEST(TXmlParser, ReportsWhatIsWrongAndKeepsWhatCameBefore)
 {
     for (const TBadRow& row : kBad) {
         SCOPED_TRACE(row.fName);
