@@ -59,8 +59,12 @@ void AddOptions(CLI::App& app, TOptions& options, std::vector<std::string>& sett
             return SplitSetting(text, ignored) ? std::string() : "key=value is expected, not \"" + text + "\"";
         });
     app.add_option("--log", options.fLogFile, "The host's log, begun anew (default ROOT/vrxhost.log)");
-    app.add_option("--plugin", options.fPlugin, "The plug-in (default libpegasus.nsp.so beside the program)");
+    app.add_option("--plugin", options.fPlugin, "The plug-in (default ROOT/libpegasus.nsp.so)");
     app.add_option("--root", options.fRoot, "The root directory")->check(CLI::ExistingDirectory);
+    app.add_option(
+        "--state", options.fState,
+        "A private root, with links to the root's files, for what a run writes (default: the root when it can be "
+        "written, else $XDG_STATE_HOME/vrxhost, ~/.local/state/vrxhost or a folder in /tmp)");
     app.add_flag("-v,--verbose", options.fVerbose, "Show the log on standard error too");
 }
 
@@ -85,14 +89,13 @@ void FillDefaults(TOptions& options, const std::vector<std::string>& settings)
     for (const std::string& setting : settings) {
         SplitSetting(setting, options);
     }
-    for (std::string* path : {&options.fConfigFile, &options.fLogFile, &options.fPlugin, &options.fRoot}) {
+    for (std::string* path :
+         {&options.fConfigFile, &options.fLogFile, &options.fPlugin, &options.fRoot, &options.fState})
+    {
         MakeAbsolute(*path);
     }
     if (options.fRoot.empty()) {
         options.fRoot = ProgramDirectory();
-    }
-    if (options.fPlugin.empty()) {
-        options.fPlugin = ProgramDirectory() / kPluginFile;
     }
 }
 
@@ -103,6 +106,9 @@ void SetRoot(const TDeployedTree& tree, TOptions& options)
     const std::string root = tree.GetRoot();
     options.fRoot = root;
     options.fDefaultConsumer = tree.GetDefaultConsumer();
+    if (options.fPlugin.empty()) {
+        options.fPlugin = fs::path(root) / kPluginFile;
+    }
     if (options.fLogFile.empty()) {
         options.fLogFile = fs::path(root) / kLogFile;
     }

@@ -37,7 +37,8 @@ struct TOptions
     ECommand fCommand = ECommand::kInventory;
     std::string fClassName; // of kInstances
     EFormat fFormat = EFormat::kTable;
-    std::string fRoot; // the directory in which everything runs
+    std::string fRoot;  // the directory in which everything runs
+    std::string fState; // the user's choice of a private root; empty for none
     std::string fPlugin;
     std::string fConsumer;        // empty: fDefaultConsumer
     std::string fDefaultConsumer; // of the tree's server
@@ -55,7 +56,8 @@ constexpr char kLogFile[] = "vrxhost.log";
 // Returns: -1 to go on with the options, else the exit status.
 int ParseOptions(int argc, const char* const* argv, TOptions& options);
 
-// Makes a tree the root: the default place of the settings file and the log, and what the default consumer is made of.
+// Makes a tree the root: the default place of the plug-in, the settings file and the log, and what the default consumer
+// is made of.
 void SetRoot(const TDeployedTree& tree, TOptions& options);
 
 } // namespace vrxhost

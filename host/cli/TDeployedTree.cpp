@@ -77,14 +77,16 @@ TDeployedTree::TDeployedTree(const std::string& root) : fRoot(Resolved(root)), f
     }
 }
 
+std::string TDeployedTree::GetId() const
+{
+    char text[32];
+    std::snprintf(text, sizeof text, "%016" PRIx64, Hash(fRoot));
+    return text;
+}
+
 std::string TDeployedTree::GetDefaultConsumer() const
 {
-    if (fKind == EServerKind::kInstalled) {
-        return kInstalledConsumer;
-    }
-    char text[32];
-    std::snprintf(text, sizeof text, "vrxhost-%016" PRIx64, Hash(fRoot));
-    return text;
+    return fKind == EServerKind::kInstalled ? kInstalledConsumer : "vrxhost-" + GetId();
 }
 
 } // namespace vrxhost

@@ -29,6 +29,7 @@ class TDeployedTree
     explicit TDeployedTree(const std::string& root);
 
     const std::string& GetRoot() const { return fRoot; } // absolute, links resolved
+    std::string GetId() const;                           // made of the root: letters and digits
 
     // Returns: the consumer that keeps this tree's server apart from other trees': made of the root's path, or the one
     // that an installed OpenPegasus was built for.

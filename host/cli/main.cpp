@@ -5,6 +5,7 @@
 #include "host/cli/TDeployedTree.h"
 #include "host/cli/TOwnerCheck.h"
 #include "host/cli/TPluginLibrary.h"
+#include "host/cli/TPrivateRoot.h"
 #include "host/cli/TRun.h"
 #include "host/core/TCoreLogger.h"
 #include "host/core/TUniqueFd.h"
@@ -46,9 +47,8 @@ void OpenLog(const TOptions& options)
 
 // What runs below the root, and below the plug-in where that lies in another tree, is run as the user.
 // Throws: TTreeError.
-void CheckOwners(const TOptions& options)
+void CheckOwners(const TOptions& options, TOwnerCheck& owners)
 {
-    TOwnerCheck owners;
     owners.CheckTree(options.fRoot);
     const std::filesystem::path plugin = options.fPlugin;
     if (!std::filesystem::exists(plugin)) {
@@ -93,9 +93,13 @@ EExitStatus Refuse(const TOptions& options, const std::string& reason, EExitStat
 
 EExitStatus Run(TOptions& options)
 {
-    SetRoot(TDeployedTree(options.fRoot), options);
-    CheckOwners(options);
-    const NKOLVRX20::TUniqueFd rootLock = EnterRoot(options.fRoot);
+    const TPrivateRoot root(TDeployedTree(options.fRoot), options.fState);
+    TOwnerCheck owners;
+    owners.CheckFile(root.GetPath());
+    const NKOLVRX20::TUniqueFd rootLock = EnterRoot(root.GetPath());
+    root.Lay();
+    SetRoot(TDeployedTree(root.GetPath()), options);
+    CheckOwners(options, owners);
     std::signal(SIGPIPE, SIG_IGN); // a reader that has gone is a write error here
     OpenLog(options);
     TRun run(options);

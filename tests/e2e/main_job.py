@@ -6,6 +6,7 @@ import glob
 import json
 import os
 import re
+import shutil
 import signal
 import subprocess
 import sys
@@ -94,6 +95,44 @@ class HealthyTree(TreeTest):
         self.assertEqual(status, COMPLETE)
         self.assertEqual(len(instances(document, "LNX_NetworkPort")), len(interfaces()))
         self.assert_nothing_left()
+
+
+class InstalledTree(TreeTest):
+    """A tree that is root's, used by somebody who may not write it."""
+
+    NOBODY = 65534
+
+    def setUp(self):
+        super().setUp()
+        if os.geteuid() != 0 or not shutil.which("setpriv"):
+            self.skipTest("needs root and setpriv, to run as an ordinary user")
+        self.state = os.path.join(self.tree.folder, "state")
+        os.mkdir(self.state)
+        os.chown(self.state, self.NOBODY, self.NOBODY)
+        os.chmod(self.tree.folder, 0o755)
+        self.tree.prefix = ["setpriv", f"--reuid={self.NOBODY}", f"--regid={self.NOBODY}", "--clear-groups", "env",
+                            f"XDG_STATE_HOME={self.state}"]
+
+    def content(self):
+        return {os.path.join(folder, name): os.lstat(os.path.join(folder, name)).st_mtime_ns
+                for folder, folders, names in os.walk(self.tree.root) for name in folders + names}
+
+    def test_ordinary_user(self):
+        before = self.content()
+        for _ in range(2):  # the second run finds what the first one left
+            status, document, err = self.tree.inventory()
+            self.assertEqual((status, err), (COMPLETE, ""))
+            self.assertEqual(len(instances(document, "LNX_NetworkPort")), len(interfaces()))
+            self.assert_nothing_left()
+        self.assertEqual(self.content(), before)
+        root, = glob.glob(os.path.join(self.state, "vrxhost", "*"))
+        self.assertTrue(os.path.exists(os.path.join(root, "vrxhost.log")))
+        self.assertFalse(os.path.lexists(os.path.join(root, "pegasus", "repository")))
+
+    def test_state_directory_that_cannot_be_made(self):
+        status, document, err = self.tree.inventory("--state", os.path.join(self.tree.root, "state"))
+        self.assertEqual(status, USAGE)
+        self.assertEqual(document["losses"], [err[len("vrxhost: "):].rstrip()])
 
 
 class TwoHosts(TreeTest):

@@ -27,6 +27,7 @@ class Tree:
         with open(self.precious, "w", encoding="ascii"):
             pass
         self.consumer = "e2e-" + uuid.uuid4().hex[:12]
+        self.prefix = []  # of the command, as to run it as another user
         subprocess.run(["cmake", "--install", build, "--prefix", self.root], check=True, stdout=subprocess.DEVNULL)
 
     def path(self, *parts):
@@ -40,7 +41,7 @@ class Tree:
         return f"/var/tmp/cimserverkol_tc_{self.consumer}_start.conf"
 
     def start(self, *arguments, **keywords):
-        command = [self.path("vrxhost"), *arguments, "--consumer", self.consumer]
+        command = [*self.prefix, self.path("vrxhost"), *arguments, "--consumer", self.consumer]
         return subprocess.Popen(command, cwd=self.elsewhere, stdin=subprocess.DEVNULL, stdout=subprocess.PIPE,
                                 stderr=subprocess.PIPE, text=True, **keywords)
 

@@ -4,9 +4,6 @@
 #include <gmock/gmock.h>
 #include <nlohmann/json.hpp>
 
-#include <functional>
-#include <map>
-
 #include <sys/stat.h>
 
 namespace vrxhost {
@@ -16,16 +13,6 @@ using testing::HasSubstr;
 using testing::StartsWith;
 
 constexpr uid_t kForeignUser = 54321; // has no entry and owns nothing else
-
-// Every path below a folder with its content.
-std::map<std::string, std::string> Snapshot(const fs::path& folder)
-{
-    std::map<std::string, std::string> found;
-    for (const auto& entry : fs::recursive_directory_iterator(folder)) {
-        found[entry.path()] = entry.is_regular_file() ? ReadFile(entry.path()) : "";
-    }
-    return found;
-}
 
 class Root : public VrxhostProgram
 {

@@ -8,6 +8,7 @@
 #include <chrono>
 #include <filesystem>
 #include <fstream>
+#include <map>
 #include <sstream>
 #include <string>
 #include <vector>
@@ -33,6 +34,16 @@ inline testing::AssertionResult HasStatus(const TProcessOutcome& outcome, int st
     }
     return testing::AssertionFailure() << "end " << outcome.fEnd << ", status " << outcome.fStatus << ", not " << status
                                        << "\nout: " << outcome.fOutput << "\nerr: " << outcome.fErrorOutput;
+}
+
+// Every path below a folder with its content.
+inline std::map<std::string, std::string> Snapshot(const fs::path& folder)
+{
+    std::map<std::string, std::string> found;
+    for (const auto& entry : fs::recursive_directory_iterator(folder)) {
+        found[entry.path()] = entry.is_regular_file() ? ReadFile(entry.path()) : "";
+    }
+    return found;
 }
 
 class VrxhostProgram : public testing::Test

@@ -1,0 +1,97 @@
+// A root of the user's own, for a tree that a run must not or cannot write.
+#include "tests/host/cli/VrxhostProgram.h"
+
+#include <gmock/gmock.h>
+
+#include <sys/stat.h>
+
+namespace vrxhost {
+namespace {
+
+using testing::HasSubstr;
+
+class PrivateRoot : public VrxhostProgram
+{
+  protected:
+    PrivateRoot()
+    {
+        Install("cimconfig", "echo $PEGASUS_HOME > home; echo settings > $PEGASUS_HOME/cimserver_planned.conf");
+        fs::create_directories(fRoot / "pegasus/provider/acme/data");
+        std::ofstream(fRoot / "pegasus/provider/acme/acme.classes.xml") << "classes";
+        std::ofstream(fRoot / "pegasus/provider/acme/data/table") << "table";
+        std::ofstream(fRoot / "vrx.conf") << "count=2\n";
+        fs::copy_file(FAKE_PLUGIN, fRoot / "libpegasus.nsp.so");
+        for (const auto& entry : fs::recursive_directory_iterator(fRoot)) {
+            fs::permissions(entry, fs::perms(0755));
+        }
+    }
+
+    TProcessOutcome RunHere(const std::vector<std::string>& arguments) const
+    {
+        std::vector<std::string> command = {VRXHOST, "--root", fRoot, "--state", fState, "instances", "Fake_Many"};
+        command.insert(command.end(), arguments.begin(), arguments.end());
+        return Start(command);
+    }
+
+    const fs::path fState = fFolder / "of the user" / "state";
+};
+
+// The plug-in's module path and its working directory are the private root then; the tree stays as it is.
+TEST_F(PrivateRoot, HoldsEverythingThatIsWritten)
+{
+    const auto before = Snapshot(fRoot);
+    const auto outcome = RunHere({});
+    EXPECT_TRUE(HasStatus(outcome, 0));
+    EXPECT_THAT(outcome.fOutput, HasSubstr("Fake_Many: 2 instances")) << "the tree's settings hold";
+    EXPECT_TRUE(Snapshot(fRoot) == before);
+    EXPECT_EQ(ReadFile(fState / "home"), (fState / "pegasus\n").string());
+    EXPECT_EQ(ReadFile(fState / "pegasus/cimserver_planned.conf"), "settings\n");
+    for (const char* written : {"cleared", "vrxhost.log"}) {
+        EXPECT_TRUE(fs::exists(fState / written)) << written;
+    }
+    for (const char* folder : {"pegasus/provider/acme", "pegasus/provider/acme/data", "pegasus/bin"}) {
+        EXPECT_FALSE(fs::is_symlink(fState / folder)) << folder << ": a removal below it would reach the tree";
+    }
+    for (const char* file : {"libpegasus.nsp.so", "pegasus/provider/acme/data/table", "pegasus/bin/cimserver"}) {
+        EXPECT_TRUE(fs::is_symlink(fState / file)) << file;
+    }
+}
+
+TEST_F(PrivateRoot, FollowsTheTreeAndKeepsWhatIsNotALink)
+{
+    ASSERT_TRUE(HasStatus(RunHere({}), 0));
+    fs::remove(fState / "pegasus/provider/acme/acme.classes.xml"); // as the plug-in removes a vendor's file
+    fs::remove_all(fRoot / "pegasus/provider/acme/data");
+    std::ofstream(fRoot / "pegasus/provider/acme/new.mof") << "new";
+    std::ofstream(fState / "pegasus/provider/acme/state") << "the vendor's";
+    ASSERT_TRUE(HasStatus(RunHere({}), 0));
+    EXPECT_EQ(ReadFile(fState / "pegasus/provider/acme/acme.classes.xml"), "classes");
+    EXPECT_EQ(ReadFile(fState / "pegasus/provider/acme/new.mof"), "new");
+    EXPECT_EQ(ReadFile(fState / "pegasus/provider/acme/state"), "the vendor's");
+    EXPECT_FALSE(fs::exists(fState / "pegasus/provider/acme/data"));
+}
+
+// Its repository would be deleted.
+TEST_F(PrivateRoot, IsNeverAFolderOfSomethingElse)
+{
+    fs::create_directories(fState / "pegasus/repository");
+    std::ofstream(fState / "pegasus/repository/precious") << "somebody's work";
+    const auto before = Snapshot(fFolder);
+    const auto foreign = RunHere({});
+    EXPECT_TRUE(HasStatus(foreign, 2));
+    EXPECT_THAT(foreign.fErrorOutput, HasSubstr("holds a folder pegasus that vrxhost did not make"));
+    EXPECT_TRUE(Snapshot(fFolder) == before);
+}
+
+TEST_F(PrivateRoot, PlaceThatCannotBeUsedIsOneSentence)
+{
+    const auto outcome = Start({VRXHOST, "--root", fRoot, "--state", "/proc/none", "providers"});
+    EXPECT_TRUE(HasStatus(outcome, 2));
+    EXPECT_THAT(outcome.fErrorOutput, HasSubstr("the state directory /proc/none cannot be made or written"));
+    fs::create_directories(fState);
+    fs::permissions(fState, fs::perms(0777));
+    EXPECT_TRUE(HasStatus(RunHere({}), 2)) << "others may write it";
+}
+
+} // namespace
+} // namespace vrxhost
