@@ -106,9 +106,8 @@ void ClassParser::addProperty(CIMClass& owner, const CIMProperty& property, std:
     if (owner.findProperty(property.getName()) == PEG_NOT_FOUND) {
         owner.addProperty(property);
     } else {
-        fCompilation.handler.warn(fCursor.place(offset).text(), "Property " + base::utf8(property.getName()) +
-                                                                    " already exists in class " +
-                                                                    base::utf8(owner.getClassName()));
+        fCursor.warn(offset, "Property " + base::utf8(property.getName()) + " already exists in class " +
+                                 base::utf8(owner.getClassName()));
     }
 }
 

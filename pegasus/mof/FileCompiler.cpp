@@ -44,7 +44,10 @@ bool isVersion(const std::string& text)
 } // namespace
 
 FileCompiler::FileCompiler(const SourceText& source, Compilation& compilation)
-    : fSource(source), fCompilation(compilation), fCursor(source, compilation.options.limits)
+    : fSource(source), fCompilation(compilation),
+      fCursor(source, compilation.options.limits, [&compilation](const SourcePlace& place, const std::string& text) {
+          compilation.handler.warn(place.text(), text);
+      })
 {
 }
 
@@ -181,7 +184,7 @@ void FileCompiler::changeNamespace(const std::string& name)
 
 void FileCompiler::warn(const std::string& text)
 {
-    fCompilation.handler.warn(fCursor.place(fSubject).text(), text);
+    fCursor.warn(fSubject, text);
 }
 
 } // namespace Pegasus::mof

@@ -11,11 +11,19 @@ namespace Pegasus::mof {
 
 namespace {
 
-bool isGiven(const ParsedInstance& parsed, const CIMName& name)
+// Returns: true when the property had a value or waited for one.
+bool removeProperty(ParsedInstance& parsed, const CIMName& name)
 {
+    const Uint32 index = parsed.instance.findProperty(name);
+    if (index != PEG_NOT_FOUND) {
+        parsed.instance.removeProperty(index);
+        return true;
+    }
     const auto isSame = [&name](const OpenReference& reference) { return reference.property.equal(name); };
-    return parsed.instance.findProperty(name) != PEG_NOT_FOUND ||
-           std::any_of(parsed.open.begin(), parsed.open.end(), isSame);
+    const auto removed = std::remove_if(parsed.open.begin(), parsed.open.end(), isSame);
+    const bool wasOpen = removed != parsed.open.end();
+    parsed.open.erase(removed, parsed.open.end());
+    return wasOpen;
 }
 
 // A class from a server may have the embedded types; one from MOF has strings with a qualifier.
@@ -30,6 +38,13 @@ bool isEmbeddedInstance(const CIMConstProperty& declared)
     return declared.getType() == CIMTYPE_INSTANCE ||
            (declared.getType() == CIMTYPE_STRING &&
             declared.findQualifier(CIMName("EmbeddedInstance")) != PEG_NOT_FOUND);
+}
+
+// The place of an embedded instance is that of the string; this leads from there to the place within.
+std::string inEmbedded(const SourcePlace& place)
+{
+    return "in the embedded instance, line " + std::to_string(place.line) + ", column " + std::to_string(place.column) +
+           ": ";
 }
 
 } // namespace
@@ -78,8 +93,8 @@ void InstanceParser::parseValue(ParsedInstance& parsed)
                        "class " + base::utf8(itsClass.getClassName()) + " has no such property: " + word.text);
     }
     const CIMConstProperty declared = itsClass.getProperty(index);
-    if (isGiven(parsed, declared.getName())) {
-        fCursor.failAt(word.offset, "property " + word.text + " is given twice");
+    if (removeProperty(parsed, declared.getName())) {
+        fCursor.warn(word.offset, "property " + word.text + " is given twice: the last value holds");
     }
     fCursor.expectPunctuation('=');
     setValue(parsed, declared);
@@ -88,12 +103,10 @@ void InstanceParser::parseValue(ParsedInstance& parsed)
 
 void InstanceParser::setValue(ParsedInstance& parsed, const CIMConstProperty& declared)
 {
-    const Initializer initializer = parseInitializer(fCursor);
-    const Literal& first = initializer.elements.front();
-    if (declared.getType() == CIMTYPE_REFERENCE && first.kind == Literal::Kind::kAlias &&
-        !fCompilation.aliases.find(first.text))
-    {
-        parsed.open.push_back({declared.getName(), first.text, fCursor.place(first.offset)});
+    const Initializer initializer = parseInitializer(fCursor, EmptyArray::kAccepted);
+    if (declared.getType() == CIMTYPE_REFERENCE && isOpen(initializer)) {
+        const Literal& alias = initializer.elements.front();
+        parsed.open.push_back({declared.getName(), alias.text, fCursor.place(alias.offset)});
         return;
     }
     if (!initializer.isNull() && (isEmbeddedObject(declared) || isEmbeddedInstance(declared))) {
@@ -105,6 +118,12 @@ void InstanceParser::setValue(ParsedInstance& parsed, const CIMConstProperty& de
     parsed.instance.addProperty(
         CIMProperty(declared.getName(), buildValue(fCursor, fCompilation.aliases, initializer, type), type.arraySize,
                     declared.getReferenceClassName(), declared.getClassOrigin()));
+}
+
+bool InstanceParser::isOpen(const Initializer& initializer) const
+{
+    return !initializer.isArray && initializer.elements.front().kind == Literal::Kind::kAlias &&
+           !fCompilation.aliases.find(initializer.elements.front().text);
 }
 
 CIMValue InstanceParser::embeddedValue(const Initializer& initializer, const CIMConstProperty& declared)
@@ -134,7 +153,9 @@ CIMInstance InstanceParser::parseEmbedded(const Literal& literal)
     }
     const SourceText text("embedded instance", literal.text);
     try {
-        TokenCursor cursor(text, fCursor.limits());
+        TokenCursor cursor(text, fCursor.limits(), [&](const SourcePlace& place, const std::string& warning) {
+            fCursor.warn(literal.offset, inEmbedded(place) + warning);
+        });
         if (!cursor.skipWord("instance")) {
             cursor.failExpected("'instance'");
         }
@@ -147,8 +168,7 @@ CIMInstance InstanceParser::parseEmbedded(const Literal& literal)
         }
         return parsed.instance;
     } catch (const MofError& error) {
-        fCursor.failAt(literal.offset, "in the embedded instance, line " + std::to_string(error.place().line) +
-                                           ", column " + std::to_string(error.place().column) + ": " + error.cause());
+        fCursor.failAt(literal.offset, inEmbedded(error.place()) + error.cause());
     }
 }
 

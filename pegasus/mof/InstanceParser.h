@@ -22,6 +22,7 @@ class InstanceParser
     CIMClass parseClass();
     void parseValue(ParsedInstance& parsed);
     void setValue(ParsedInstance& parsed, const CIMConstProperty& declared);
+    bool isOpen(const Initializer& initializer) const;
     CIMValue embeddedValue(const Initializer& initializer, const CIMConstProperty& declared);
     CIMInstance parseEmbedded(const Literal& literal);
 

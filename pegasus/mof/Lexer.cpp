@@ -85,8 +85,8 @@ char simpleEscape(char letter)
 
 } // namespace
 
-Lexer::Lexer(const SourceText& source, const CompileLimits& limits)
-    : fSource(source), fText(source.text()), fLimits(limits)
+Lexer::Lexer(const SourceText& source, const CompileLimits& limits, WarningSink warn)
+    : fSource(source), fText(source.text()), fLimits(limits), fWarn(std::move(warn))
 {
     if (fText.compare(0, 3, kByteOrderMark) == 0) {
         fAt = 3;
@@ -148,9 +148,9 @@ void Lexer::skipBlockComment()
 {
     const std::size_t end = fText.find("*/", fAt + 2);
     if (end == std::string::npos) {
-        fail(fAt, "comment is not closed");
+        fWarn(fSource.place(fAt), "comment is not closed: it takes the rest of the file");
     }
-    fAt = end + 2;
+    fAt = end == std::string::npos ? fText.size() : end + 2;
 }
 
 Token Lexer::word(TokenKind kind, std::size_t start)
@@ -216,52 +216,66 @@ void Lexer::stringLiteral(std::string& value)
         if (peek() == '"') {
             break;
         }
-        escape(value);
+        if (!escape(value)) {
+            keepBackslash(value);
+        }
     }
     ++fAt;
 }
 
-void Lexer::escape(std::string& value)
+// Returns: false when the backslash begins no escape; nothing is taken then.
+bool Lexer::escape(std::string& value)
 {
     const char letter = peek(1);
     if (letter == 'x' || letter == 'X') {
-        hexEscape(value);
-        return;
+        return hexEscape(value);
     }
     const char meaning = simpleEscape(letter);
     if (meaning == '\0') {
-        fail(fAt, "unknown escape sequence \\" + std::string(letter == '\0' ? "" : std::string(1, letter)));
+        return false;
     }
     value += meaning;
     fAt += 2;
+    return true;
 }
 
-void Lexer::hexEscape(std::string& value)
+bool Lexer::hexEscape(std::string& value)
 {
-    const std::size_t start = fAt;
-    fAt += 2;
+    constexpr std::size_t kMaxDigits = 4;
+    const std::size_t digits = fAt + 2;
+    std::size_t end = digits;
     unsigned unit = 0;
-    std::size_t digitCount = 0;
-    for (; digitCount < 4 && base::hexDigitValue(peek()) >= 0; ++digitCount, ++fAt) {
-        unit = unit * 16 + static_cast<unsigned>(base::hexDigitValue(peek()));
+    for (; end < digits + kMaxDigits && end < fText.size() && base::hexDigitValue(fText[end]) >= 0; ++end) {
+        unit = unit * 16 + static_cast<unsigned>(base::hexDigitValue(fText[end]));
     }
-    if (digitCount == 0) {
-        fail(start, "\\x needs one to four hexadecimal digits");
+    if (end == digits) {
+        return false;
     }
     if (unit == 0) {
-        fail(start, "\\x0 is not a character");
+        fail(fAt, "\\x0 is not a character");
     }
     appendCodeUnit(value, unit);
+    fAt = end;
+    return true;
+}
+
+// OpenPegasus's compiler keeps the backslash of an unknown escape. Files with paths of another system rely on it.
+void Lexer::keepBackslash(std::string& value)
+{
+    const bool isShown = peek(1) > ' ' && peek(1) < 0x7F;
+    fWarn(fSource.place(fAt), "unknown escape sequence \\" + std::string(isShown ? 1 : 0, peek(1)) +
+                                  ": the backslash is part of the string");
+    value += fText[fAt++];
 }
 
 Token Lexer::character()
 {
     Token token{TokenKind::kCharacter, "", fAt++};
     while (!atEnd() && peek() != '\'' && peek() != '\n') {
-        if (peek() == '\\') {
-            escape(token.text);
-        } else {
+        if (peek() != '\\') {
             token.text += fText[fAt++];
+        } else if (!escape(token.text)) {
+            fail(fAt, "unknown escape sequence in a character literal");
         }
         if (token.text.size() > 4) {
             break;

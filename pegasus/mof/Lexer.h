@@ -4,14 +4,20 @@
 #include "pegasus/mof/SourceText.h"
 #include "pegasus/mof/Token.h"
 
+#include <functional>
+#include <string>
+
 namespace Pegasus::mof {
+
+// Reports what does not stop the compilation.
+using WarningSink = std::function<void(const SourcePlace& place, const std::string& text)>;
 
 // Cuts a source text into tokens. Blanks and comments are dropped; adjacent string literals become one token.
 // Requires: the text and the limits outlive the lexer.
 class Lexer
 {
   public:
-    Lexer(const SourceText& source, const CompileLimits& limits);
+    Lexer(const SourceText& source, const CompileLimits& limits, WarningSink warn);
 
     // Returns: the next token; kEnd at the end, repeatedly.
     // Throws: MofError at the offending byte.
@@ -25,8 +31,9 @@ class Lexer
     Token strings();
     Token character();
     void stringLiteral(std::string& value);
-    void escape(std::string& value);
-    void hexEscape(std::string& value);
+    bool escape(std::string& value);
+    bool hexEscape(std::string& value);
+    void keepBackslash(std::string& value);
 
     bool atEnd() const noexcept { return fAt >= fText.size(); }
     char peek(std::size_t ahead = 0) const noexcept { return fAt + ahead < fText.size() ? fText[fAt + ahead] : '\0'; }
@@ -35,6 +42,7 @@ class Lexer
     const SourceText& fSource;
     const std::string& fText;
     const CompileLimits& fLimits;
+    WarningSink fWarn;
     std::size_t fAt = 0;
 };
 

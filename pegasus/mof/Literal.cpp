@@ -59,12 +59,15 @@ Literal parseLiteral(TokenCursor& cursor)
     }
 }
 
-Initializer parseArrayInitializer(TokenCursor& cursor)
+Initializer parseArrayInitializer(TokenCursor& cursor, EmptyArray empty)
 {
     Initializer result;
     result.isArray = true;
     result.offset = cursor.current().offset;
     cursor.expectPunctuation('{');
+    if (empty == EmptyArray::kAccepted && cursor.skipPunctuation('}')) {
+        return result;
+    }
     do {
         if (result.elements.size() == cursor.limits().arrayElementCount) {
             cursor.fail("array has more elements than the limit arrayElementCount (" +
@@ -76,10 +79,10 @@ Initializer parseArrayInitializer(TokenCursor& cursor)
     return result;
 }
 
-Initializer parseInitializer(TokenCursor& cursor)
+Initializer parseInitializer(TokenCursor& cursor, EmptyArray empty)
 {
     if (cursor.atPunctuation('{')) {
-        return parseArrayInitializer(cursor);
+        return parseArrayInitializer(cursor, empty);
     }
     Initializer result;
     result.offset = cursor.current().offset;

@@ -40,11 +40,18 @@ struct Initializer
     bool isNull() const { return !isArray && elements.front().kind == Literal::Kind::kNull; }
 };
 
+// OpenPegasus's compiler accepts "{}" in instances only.
+enum class EmptyArray
+{
+    kAccepted,
+    kRefused
+};
+
 // These functions throw MofError.
 Literal parseLiteral(TokenCursor& cursor);
 // Parses an array in braces.
-Initializer parseArrayInitializer(TokenCursor& cursor);
+Initializer parseArrayInitializer(TokenCursor& cursor, EmptyArray empty = EmptyArray::kRefused);
 // Parses either form.
-Initializer parseInitializer(TokenCursor& cursor);
+Initializer parseInitializer(TokenCursor& cursor, EmptyArray empty = EmptyArray::kRefused);
 
 } // namespace Pegasus::mof

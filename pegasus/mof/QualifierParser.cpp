@@ -39,6 +39,15 @@ void choose(CIMFlavor& flavor, const CIMFlavor& chosen, const CIMFlavor& opposit
     flavor.addFlavor(chosen);
 }
 
+// OpenPegasus's compiler takes one value in parentheses for an array and one in braces for a scalar; vendors use both.
+Initializer reshaped(Initializer initializer, const ValueType& type)
+{
+    if (initializer.elements.size() == 1 && !initializer.isNull()) {
+        initializer.isArray = type.isArray;
+    }
+    return initializer;
+}
+
 bool isAmong(const Qualifiers& qualifiers, const CIMName& name)
 {
     return std::any_of(qualifiers.begin(), qualifiers.end(),
@@ -95,10 +104,10 @@ CIMValue QualifierParser::parseParameter(const CIMQualifierDecl& declaration)
 {
     const ValueType type{declaration.getType(), declaration.isArray(), declaration.getArraySize()};
     if (fCursor.atPunctuation('{')) {
-        return buildValue(fCursor, fCompilation.aliases, parseArrayInitializer(fCursor), type);
+        return buildValue(fCursor, fCompilation.aliases, reshaped(parseArrayInitializer(fCursor), type), type);
     }
     if (fCursor.skipPunctuation('(')) {
-        const Initializer initializer = parseInitializer(fCursor);
+        const Initializer initializer = reshaped(parseInitializer(fCursor), type);
         fCursor.expectPunctuation(')');
         return buildValue(fCursor, fCompilation.aliases, initializer, type);
     }

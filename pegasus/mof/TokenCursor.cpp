@@ -4,8 +4,8 @@
 
 namespace Pegasus::mof {
 
-TokenCursor::TokenCursor(const SourceText& source, const CompileLimits& limits)
-    : fSource(source), fLimits(limits), fLexer(source, limits)
+TokenCursor::TokenCursor(const SourceText& source, const CompileLimits& limits, const WarningSink& warn)
+    : fSource(source), fLimits(limits), fWarn(warn), fLexer(source, limits, warn)
 {
 }
 

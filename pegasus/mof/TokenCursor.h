@@ -12,7 +12,7 @@ namespace Pegasus::mof {
 class TokenCursor
 {
   public:
-    TokenCursor(const SourceText& source, const CompileLimits& limits);
+    TokenCursor(const SourceText& source, const CompileLimits& limits, const WarningSink& warn);
 
     const Token& current();
     // Returns: the current token, and moves on.
@@ -35,10 +35,12 @@ class TokenCursor
     [[noreturn]] void fail(const std::string& cause) { fSource.fail(current().offset, cause); }
     [[noreturn]] void failAt(std::size_t offset, const std::string& cause) const { fSource.fail(offset, cause); }
     [[noreturn]] void failExpected(std::string_view what);
+    void warn(std::size_t offset, const std::string& text) const { fWarn(fSource.place(offset), text); }
 
   private:
     const SourceText& fSource;
     const CompileLimits& fLimits;
+    WarningSink fWarn;
     Lexer fLexer;
     Token fCurrent;
     bool fIsCut = false; // fCurrent is the current token

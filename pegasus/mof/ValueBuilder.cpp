@@ -120,7 +120,9 @@ Char16 Converter::character(const Literal& literal) const
     if (literal.kind == Literal::Kind::kInteger) {
         return Char16(integer<Uint16>(literal));
     }
-    require(literal, Literal::Kind::kCharacter);
+    if (literal.kind != Literal::Kind::kString) { // "A" for 'A' is accepted, as by OpenPegasus's compiler
+        require(literal, Literal::Kind::kCharacter);
+    }
     const String text = cimString(fCursor, literal.text, literal.offset);
     if (text.size() != 1) {
         invalid(literal);
@@ -170,9 +172,11 @@ CIMValue assemble(const TokenCursor& cursor, const Initializer& initializer, con
     values.reserveCapacity(static_cast<Uint32>(initializer.elements.size()));
     for (const Literal& literal : initializer.elements) {
         if (literal.kind == Literal::Kind::kNull) {
-            cursor.failAt(literal.offset, "an array cannot hold null elements");
+            cursor.warn(literal.offset, "an array holds no nulls: the element becomes the type's default");
+            values.append(T());
+        } else {
+            values.append(convert(literal));
         }
-        values.append(convert(literal));
     }
     return CIMValue(values);
 }
