@@ -160,7 +160,8 @@ void FileCompiler::include(const std::string& name)
     }
     const std::string path = findInclude(name, fSource.directory(), fCompilation.options.includeDirectories);
     if (path.empty()) {
-        fCursor.failAt(fSubject, "Could not open include file " + name);
+        warn("Could not open include file " + name); // and goes on, as OpenPegasus's compiler does
+        return;
     }
     try {
         const SourceText source = SourceText::read(path, limits.fileBytes);
