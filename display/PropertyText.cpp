@@ -41,7 +41,7 @@ TWideInteger WideValue(const TCIMValue& integer)
     return static_cast<long>(integer);
 }
 
-// A negative number's bits are those of its own width: -1 as a sint8 has eight.
+// Returns: the bits in the integer's own width: a sint8 of -1 has eight, where sign extension would make 64.
 unsigned long BitsOf(const TCIMValue& integer)
 {
     switch (integer.GetType()) {
@@ -105,6 +105,7 @@ TTexts QualifierTexts(const ICIMPropertyDecl& declaration, const char* name)
     return texts;
 }
 
+// Units is deprecated in favour of PUnit (DSP0004, 5.6.3), but reads better.
 std::string UnitText(const ICIMPropertyDecl& declaration)
 {
     const std::string units = QualifierValue(declaration, "Units").ToString(kDecimal);
@@ -124,6 +125,7 @@ class TTextRules
 
     std::string Text(const TCIMValue& value) const
     {
+        // ValueMap may have more entries than Values has texts; such a value has no text of its own.
         const auto index = ValueIndex(value);
         if (index && *index < fValues.size()) {
             return fValues[*index];

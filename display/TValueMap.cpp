@@ -9,6 +9,7 @@ namespace NKOLVRX20 {
 namespace {
 
 constexpr std::string_view kRangeMark = "..";
+// What an open end of a range stands for.
 constexpr TWideInteger kLowest = std::numeric_limits<long>::min();
 constexpr TWideInteger kHighest = std::numeric_limits<unsigned long>::max();
 
@@ -80,11 +81,13 @@ bool TValueMap::TEntry::Covers(TWideInteger number) const
 
 std::optional<std::size_t> TValueMap::Find(TWideInteger number) const
 {
+    // Values without ValueMap count from 0, and so do BitValues without BitMap.
     if (fEntries.empty()) {
         return number < 0 ? std::nullopt : std::make_optional(static_cast<std::size_t>(number));
     }
     std::optional<std::size_t> best;
     for (std::size_t i = 0; i < fEntries.size(); ++i) {
+        // Only a kind of higher precedence replaces an earlier entry.
         if (fEntries[i].Covers(number) && (!best || fEntries[i].fKind < fEntries[*best].fKind)) {
             best = i;
         }

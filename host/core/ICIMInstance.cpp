@@ -2,6 +2,7 @@
 
 namespace NKOLVRX20 {
 
+// The interface's only body. It also anchors the type information of ICIMInstance in this library.
 TCIMReference ICIMInstance::BuildPath(TCIMContext context) const
 {
     return GetReference(context);

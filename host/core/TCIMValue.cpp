@@ -37,7 +37,7 @@ TCIMValue::TCIMValue(TCIMType type, unsigned int)
     if (type > TCIMType::kReferenceArray) {
         ThrowTypeMismatch();
     }
-    if (type == TCIMType::kNone) {
+    if (type == TCIMType::kNone) { // the null of unknown type has no representation
         return;
     }
     TRep::TData data;
@@ -72,6 +72,7 @@ TCIMValue& TCIMValue::operator=(const TCIMValue& other)
     if (this == &other) {
         return *this;
     }
+    // Whoever holds the lent vector may still write it, so a copy must not share it.
     if (other.fRep && other.fRep->fLent) {
         fRep = boost::make_shared<TRep>(*other.fRep);
         fRep->fLent = false;
@@ -113,6 +114,7 @@ TCIMValue::operator std::vector<TCIMValue>&()
     if (!IsArray()) {
         ThrowTypeMismatch();
     }
+    // The caller may write the vector at any later time: from now on the representation belongs to this value alone.
     if (!fRep->fLent) {
         fRep = boost::make_shared<TRep>(*fRep);
         fRep->fLent = true;

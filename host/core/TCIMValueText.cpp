@@ -1,4 +1,4 @@
-// TCIMValue's text forms. Both directions ignore the locale.
+// The text forms of TCIMValue and TCIMChar16. Both directions ignore the locale.
 #include "host/core/TCIMValueRep.h"
 
 #include <host/TCIMValue.h>
@@ -62,6 +62,7 @@ struct TTextWriter
         char text[kNumberChars];
         std::to_chars_result end{};
         if constexpr (std::is_floating_point_v<Number>) {
+            // The shortest digits that read back as the same number.
             end = std::to_chars(text, text + kNumberChars, value, std::chars_format::general);
         } else {
             end = std::to_chars(text, text + kNumberChars, value, fRadix);
@@ -84,12 +85,15 @@ struct TTextWriter
 
 } // namespace
 
+TCIMChar16::TCIMChar16(const std::string& decimalText) : fCode(ParseNumber<unsigned short>(decimalText)) {}
+
 void TCIMValue::Set(const std::string& text)
 {
     if (IsArray()) {
         if (!text.empty()) {
             ThrowTypeMismatch();
         }
+        // GetType is the element's code; the array's code makes an empty array again.
         *this = TCIMValue(TCIMType(TCIMType::ECIMType(GetType() + TCIMType::kArrayOffset)), 0);
         return;
     }

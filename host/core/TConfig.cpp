@@ -69,7 +69,7 @@ TConfig* TConfig::GetInstance()
 std::string TConfig::getValue(const std::string& key) const
 {
     const std::lock_guard<std::mutex> lock(fMutex);
-    for (const auto* values : {&fOverrides, &fFileValues}) {
+    for (const auto* values : {&fOverrides, &fFileValues}) { // in order of precedence
         const auto found = values->find(key);
         if (found != values->end()) {
             return found->second;
@@ -80,7 +80,7 @@ std::string TConfig::getValue(const std::string& key) const
 
 void TConfig::Load(const std::string& path)
 {
-    const auto values = ParseLines(ReadWhole(path));
+    const auto values = ParseLines(ReadWhole(path)); // all lines are read before the first one takes effect
     const std::lock_guard<std::mutex> lock(fMutex);
     for (const auto& entry : values) {
         fFileValues[entry.first] = entry.second;

@@ -26,6 +26,7 @@ void TNamespaceProviderManager::UnregisterNamespaceProvider(boost::shared_ptr<IN
 boost::shared_ptr<INamespaceProvider> TNamespaceProviderManager::GetNamespaceProvider(const std::string& name) const
 {
     const auto providers = Snapshot();
+    // The latest registration of a name wins: a library that was loaded again replaces its earlier copy.
     for (auto provider = providers.rbegin(); provider != providers.rend(); ++provider) {
         if ((*provider)->GetName(TCIMContext()) == name) {
             return *provider;

@@ -25,7 +25,7 @@ void TProcessControl::Cancel()
     if (fResumed) {
         return;
     }
-    fCancelled = true;
+    fCancelled = true; // before the wake-up, so that whoever wakes sees it
     ::eventfd_write(fWake.Get(), 1);
 }
 
@@ -34,7 +34,7 @@ void TProcessControl::Resume()
     const std::lock_guard<std::mutex> lock(fMutex);
     fResumed = true;
     fCancelled = false;
-    eventfd_t ignored = 0;
+    eventfd_t ignored = 0; // waiters only poll; this read alone resets the descriptor
     ::eventfd_read(fWake.Get(), &ignored);
 }
 

@@ -8,6 +8,7 @@
 namespace NKOLVRX20 {
 namespace {
 
+// Of standard output only the beginning is kept: its whole may be 16 MiB, and failures are reported in the first lines.
 TFailedProgram Describe(const TProcessRequest& request, const TProcessOutcome& outcome)
 {
     TFailedProgram program;
@@ -87,6 +88,7 @@ void TProcessLog::Add(const TProcessRequest& request, const TProcessOutcome& out
 void TProcessLog::Keep(const TFailedProgram& program)
 {
     const std::lock_guard<std::mutex> lock(fMutex);
+    // The new entry stays even if it exceeds kMaxBytes alone: the failure at hand is the one that the user asks about.
     fBytes += TextBytes(program);
     fEntries.push_back(program);
     while (fEntries.size() > kMaxEntries || (fBytes > kMaxBytes && fEntries.size() > 1)) {

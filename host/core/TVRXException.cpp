@@ -38,6 +38,7 @@ const char* TVRXStatusCode::TranslateStatusCode() const noexcept
     }
 }
 
+// Out of line, so that host and plug-ins share one type information: what one throws, the other can catch.
 TVRXException::~TVRXException() = default;
 
 const char* TVRXException::what() const noexcept

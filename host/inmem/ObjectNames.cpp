@@ -31,6 +31,7 @@ std::string RealText(double number)
 
 std::string KeyText(const TCIMValue& value)
 {
+    // An unset key keeps its place in the path.
     if (value.IsNull()) {
         return Quoted("");
     }
@@ -53,6 +54,7 @@ std::string KeyText(const TCIMValue& value)
 
 } // namespace
 
+// CIM names are folded by ASCII, whatever the process's locale is.
 std::string NormalizedName(const std::string& name)
 {
     std::string key = name;

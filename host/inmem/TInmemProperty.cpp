@@ -22,6 +22,7 @@ std::string TInmemProperty::GetName() const
 
 TCIMValue::TCIMType TInmemProperty::GetType(TCIMContext context) const
 {
+    // A value knows its element's code; the property's type is the array's.
     if (fValue.IsArray()) {
         return TCIMValue::TCIMType::ECIMType(fValue.GetType() + TCIMValue::TCIMType::kArrayOffset);
     }
