@@ -3,9 +3,12 @@
 #include "pegasus/base/Text.h"
 #include "pegasus/mof/ClassParser.h"
 #include "pegasus/mof/InstanceParser.h"
+#include "pegasus/mof/SkippedDefinitions.h"
 #include "pegasus/mof/ValueBuilder.h"
 
 #include <Pegasus/Common/Exception.h>
+
+#include <optional>
 
 namespace Pegasus::mof {
 
@@ -53,13 +56,25 @@ FileCompiler::FileCompiler(const SourceText& source, Compilation& compilation)
 
 void FileCompiler::run()
 {
-    while (fCursor.current().kind != TokenKind::kEnd) {
-        fSubject = fCursor.current().offset;
-        try {
-            definition();
-        } catch (const Exception& error) {
-            fCursor.failAt(fSubject, base::utf8(error.getMessage()));
+    std::optional<std::size_t> current; // where the definition starts that is being compiled
+    try {
+        while (fCursor.current().kind != TokenKind::kEnd) {
+            current = fSubject = fCursor.current().offset;
+            compileDefinition();
         }
+    } catch (MofError& error) {
+        error.addSkipped(countDefinitionsAfter(fSource, fCursor.limits(), current));
+        throw;
+    }
+}
+
+// The handler knows no places: its errors are about the subject of the definition.
+void FileCompiler::compileDefinition()
+{
+    try {
+        definition();
+    } catch (const Exception& error) {
+        fCursor.failAt(fSubject, base::utf8(error.getMessage()));
     }
 }
 

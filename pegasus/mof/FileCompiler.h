@@ -21,6 +21,7 @@ class FileCompiler
     void run();
 
   private:
+    void compileDefinition();
     void definition();
     void defineClass(const std::vector<CIMQualifier>& qualifiers);
     void defineInstance();

@@ -23,6 +23,10 @@ class Lexer
     // Throws: MofError at the offending byte.
     Token next();
 
+    // Where next() starts; after an error, where it stopped.
+    std::size_t offset() const noexcept { return fAt; }
+    void goTo(std::size_t offset) noexcept { fAt = offset; }
+
   private:
     void skipBlanksAndComments();
     void skipBlockComment();

@@ -36,6 +36,10 @@ std::string MofError::diagnostic() const
     if (!fPlace.lineText.empty()) {
         text += fPlace.lineText + "\n" + caretIndent(fPlace.lineText, fPlace.column) + "^\n";
     }
+    if (fSkippedCount != 0) {
+        text += std::to_string(fSkippedCount) + (fSkippedCount == 1 ? " definition after it was not compiled\n"
+                                                                    : " definitions after it were not compiled\n");
+    }
     return text;
 }
 

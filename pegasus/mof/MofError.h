@@ -27,12 +27,17 @@ class MofError : public std::runtime_error
     const SourcePlace& place() const noexcept { return fPlace; }
     const std::string& cause() const noexcept { return fCause; }
 
-    // Returns: "file:line:column: error: cause", the line, and a caret below the column; ends with a newline.
+    // Adds definitions that follow the error in a file and were not compiled because of it.
+    void addSkipped(std::size_t definitionCount) noexcept { fSkippedCount += definitionCount; }
+
+    // Returns: "file:line:column: error: cause", the line, a caret below the column, and how many definitions were
+    //     skipped, if any; ends with a newline.
     std::string diagnostic() const;
 
   private:
     SourcePlace fPlace;
     std::string fCause;
+    std::size_t fSkippedCount = 0;
 };
 
 // A source file that could not be opened or, once open, not be read.

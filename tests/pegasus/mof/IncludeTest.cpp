@@ -107,6 +107,20 @@ TEST(Include, GoesOnWithoutAMissingFile)
                                      file + ":3:18: warning: Could not open include file sub"));
 }
 
+TEST(Include, CountsWhatAnErrorKeepsFromBeingCompiledInEveryFile)
+{
+    const TemporaryDirectory tree;
+    tree.write("inner.mof", "class A { fault }; class B {};");
+    const std::string file = tree.write("outer.mof", "class C {};\n#pragma include (\"inner.mof\")\nclass D {};");
+    MemoryHandler handler;
+    try {
+        compileFile(file, {}, handler);
+        ADD_FAILURE() << "no error";
+    } catch (const MofError& error) {
+        EXPECT_THAT(error.diagnostic(), testing::EndsWith("^\n2 definitions after it were not compiled\n"));
+    }
+}
+
 TEST(Include, ReportsAnUnreadableTopFileAsSuch)
 {
     const TemporaryDirectory tree;

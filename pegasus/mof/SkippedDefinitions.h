@@ -1,0 +1,16 @@
+#pragma once
+
+#include "pegasus/mof/Lexer.h"
+
+#include <cstddef>
+#include <optional>
+
+namespace Pegasus::mof {
+
+// Returns: how many definitions (classes, instances, qualifier declarations) follow the faulty one, which starts at
+//     `faulty`, up to the end of the file; all of the file without one. The text may have any faults, so the count goes
+//     by the keywords with which definitions begin. Included files are not looked at.
+std::size_t countDefinitionsAfter(const SourceText& source, const CompileLimits& limits,
+                                  std::optional<std::size_t> faulty);
+
+} // namespace Pegasus::mof
