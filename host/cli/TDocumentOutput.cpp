@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <chrono>
 #include <climits>
 #include <system_error>
 
@@ -11,6 +12,8 @@
 
 namespace vrxhost {
 namespace {
+
+constexpr std::chrono::milliseconds kTimeAfterStop{500};
 
 [[noreturn]] void ThrowErrno(const char* operation)
 {
@@ -36,24 +39,32 @@ TDocumentOutput::~TDocumentOutput()
 
 int TDocumentOutput::Write(const std::string& text, int stopFd)
 {
+    using TClock = std::chrono::steady_clock;
+    bool stopped = false;
+    TClock::time_point deadline; // once stopped
     for (std::size_t written = 0; written < text.size();) {
-        pollfd fds[] = {{fFd.Get(), POLLOUT, 0}, {stopFd, POLLIN, 0}};
-        if (::poll(fds, 2, -1) < 0) {
+        const auto left = std::chrono::ceil<std::chrono::milliseconds>(deadline - TClock::now());
+        pollfd fds[] = {{fFd.Get(), POLLOUT, 0}, {stopped ? -1 : stopFd, POLLIN, 0}};
+        const int ready = ::poll(fds, 2, stopped ? static_cast<int>(std::max<long>(left.count(), 0)) : -1);
+        if (ready == 0) {
+            return ECANCELED;
+        }
+        if (ready < 0) {
             if (errno != EINTR) {
                 return errno;
             }
-            continue;
-        }
-        if (fds[1].revents != 0) {
-            return ECANCELED;
-        }
-        // A writable pipe takes this much without blocking.
-        const std::size_t count = std::min<std::size_t>(text.size() - written, PIPE_BUF);
-        const ssize_t result = ::write(fFd.Get(), text.data() + written, count);
-        if (result >= 0) {
-            written += static_cast<std::size_t>(result);
-        } else if (errno != EINTR && errno != EAGAIN) {
-            return errno;
+        } else if (fds[1].revents != 0) {
+            stopped = true;
+            deadline = TClock::now() + kTimeAfterStop;
+        } else {
+            // A writable pipe takes this much without blocking.
+            const std::size_t count = std::min<std::size_t>(text.size() - written, PIPE_BUF);
+            const ssize_t result = ::write(fFd.Get(), text.data() + written, count);
+            if (result >= 0) {
+                written += static_cast<std::size_t>(result);
+            } else if (errno != EINTR && errno != EAGAIN) {
+                return errno;
+            }
         }
     }
     return 0;

@@ -15,8 +15,8 @@ class TDocumentOutput
     TDocumentOutput();
     ~TDocumentOutput();
 
-    // Writes all of it, unless stopFd becomes readable first.
-    // Returns: an errno (EPIPE when the reader has gone, ECANCELED when stopped), 0 for success.
+    // Writes all of it. Once stopFd is readable, the reader has half a second left to take the rest.
+    // Returns: an errno (EPIPE when the reader has gone, ECANCELED when it was too slow after a stop), 0 for success.
     int Write(const std::string& text, int stopFd);
 
   private:

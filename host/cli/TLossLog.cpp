@@ -34,8 +34,10 @@ void TLossLog::Log(EVRXLogSeverity severity, const std::string& text)
 {
     NKOLVRX20::TCoreLogger::Instance().Log(severity, text);
     const std::lock_guard<std::mutex> lock(fMutex);
-    LearnFromPrograms();
-    Learn(severity, text);
+    if (!fFrozen) {
+        LearnFromPrograms();
+        Learn(severity, text);
+    }
 }
 
 void TLossLog::Learn(EVRXLogSeverity severity, const std::string& text)
@@ -104,6 +106,12 @@ void TLossLog::StartOver()
     fStartFailed = fNoServer = fForeignServer = false;
     fSentences.clear();
     fKnown.clear();
+}
+
+void TLossLog::Freeze()
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    fFrozen = true;
 }
 
 void TLossLog::AddHeldBack()

@@ -25,6 +25,9 @@ class TLossLog : public NKOLVRX20::ILogger
     // Forgets everything: the namespace is about to be opened once more.
     void StartOver();
 
+    // From now on lines are passed on and nothing is learned: what an interruption breaks is not a loss.
+    void Freeze();
+
     // Enters what was held back in case that another attempt would succeed.
     void AddHeldBack();
 
@@ -52,6 +55,7 @@ class TLossLog : public NKOLVRX20::ILogger
     bool fStartFailed = false; // in this attempt
     bool fNoServer = false;
     bool fForeignServer = false;
+    bool fFrozen = false;
     std::vector<std::string> fSentences;
     std::set<std::string> fKnown;
 };

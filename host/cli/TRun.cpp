@@ -1,6 +1,5 @@
 #include "host/cli/TRun.h"
 
-#include "host/cli/Document.h"
 #include "host/cli/ErrorReport.h"
 #include "host/cli/TCollector.h"
 #include "host/core/TProcessControl.h"
@@ -8,8 +7,7 @@
 #include <host/TConfig.h>
 #include <host/TRootObject.h>
 
-#include <cerrno>
-#include <cstring>
+#include <chrono>
 #include <random>
 
 namespace vrxhost {
@@ -18,6 +16,8 @@ namespace {
 // Of opening the namespace, when another host took the port; and the longest pause before one, times its number.
 constexpr int kAttempts = 3;
 constexpr int kLongestPauseMs = 500;
+
+constexpr std::chrono::seconds kGraceOfAttempt{4}; // longer than the pauses of one attempt that is left in order
 
 } // namespace
 
@@ -28,9 +28,9 @@ using NKOLVRX20::TRootObject;
 
 TRun::TRun(const TOptions& options)
     : fOptions(options), fConsumer(options.fConsumer.empty() ? options.fDefaultConsumer : options.fConsumer),
-      fServer(options.fRoot, fConsumer), fStop([this] { Interrupt(); }), fLosses(options.fRoot)
+      fServer(options.fRoot, fConsumer), fLosses(options.fRoot), fStop([this] { Interrupt(); }),
+      fReport(options, fStop, fLosses)
 {
-    fDocument.fCommand = options.fCommand;
 }
 
 TRun::~TRun()
@@ -47,16 +47,32 @@ EExitStatus TRun::Execute()
             UsePlugin();
         }
     } catch (const TPluginError& e) {
-        Fail(e.what());
+        fReport.Fail(e.what());
     }
-    return GetStatus();
+    return fReport.Finish();
 }
 
-// On the signal thread: waiting programs end, waiting calls fail, and the main thread finds its way out.
+// On the signal thread: waiting programs end and no further one starts, which leads the plug-in out of its attempts;
+// then waiting calls fail. Without its server the plug-in would first try to connect again and again, so during an
+// attempt the server is ended only when the way out takes too long.
 void TRun::Interrupt()
 {
+    fLosses.Freeze();
     TProcessControl::Instance().Cancel();
-    fServer.End();
+    std::unique_lock<std::mutex> lock(fPhaseMutex);
+    fPhaseChanged.wait_for(lock, kGraceOfAttempt, [this] { return fPhase != EPhase::kOpening; });
+    const bool isNeeded = fPhase != EPhase::kEnding;
+    lock.unlock();
+    if (isNeeded) {
+        fServer.End();
+    }
+}
+
+void TRun::Enter(EPhase phase)
+{
+    const std::lock_guard<std::mutex> lock(fPhaseMutex);
+    fPhase = phase;
+    fPhaseChanged.notify_all();
 }
 
 void TRun::LoadSettings() const
@@ -85,7 +101,9 @@ void TRun::SetConsumer() const
 void TRun::OpenNamespace(TSession& session)
 {
     for (int attempt = 1;; ++attempt) {
+        Enter(EPhase::kOpening);
         const std::string error = ErrorOf([&] { session.Open(); });
+        Enter(error.empty() ? EPhase::kOpen : EPhase::kEnding);
         if (fLosses.HasForeignServer() && attempt < kAttempts && PauseBefore(attempt + 1)) {
             session.Clear();
             fLosses.StartOver();
@@ -118,83 +136,28 @@ void TRun::UsePlugin()
         throw TPluginError("the namespace has no server of its own");
     }
     Show(session.GetNamespace());
+    Enter(EPhase::kEnding);
     const std::string problem = session.Close();
-    if (fStop.IsStopped()) {
-        return;
-    }
     if (!problem.empty()) {
         fLosses.Add(problem);
     }
-    ReportLosses(); // of the shutdown
 }
 
 void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
 {
+    std::vector<TProviderRecord> providers;
     const std::string error = ErrorOf([&] {
         TCollector collector(ns, fLosses, [this] { return fStop.IsStopped(); });
-        fDocument.fProviders = collector.Collect(fOptions.fCommand, fOptions.fClassName);
+        providers = collector.Collect(fOptions.fCommand, fOptions.fClassName);
     });
     if (!error.empty()) {
         fLosses.Add("the inventory is incomplete: " + error);
     }
-    if (fOptions.fCommand == ECommand::kInstances && fDocument.fProviders.empty()) {
-        Fail("there is no class " + fOptions.fClassName);
+    if (fOptions.fCommand == ECommand::kInstances && providers.empty()) {
+        fReport.Fail("there is no class " + fOptions.fClassName);
     } else {
-        Write();
+        fReport.Show(std::move(providers));
     }
-}
-
-void TRun::Write()
-{
-    if (fStop.IsStopped()) {
-        return;
-    }
-    ReportLosses();
-    fDocument.fLosses = fLosses.GetSentences();
-    fDocument.fComplete = fDocument.fLosses.empty();
-    const std::string text = fOptions.fFormat == EFormat::kJson ? RenderJson(fDocument) : RenderTable(fDocument);
-    fWriteError = fOutput.Write(text, fStop.GetFd());
-    // A reader that has seen enough and left is not worth a sentence.
-    if (fWriteError != 0 && fWriteError != EPIPE && fWriteError != ECANCELED) {
-        ReportError(std::string("the document could not be written: ") + std::strerror(fWriteError));
-    }
-}
-
-// There is no inventory; a reader of JSON still gets a document.
-void TRun::Fail(const std::string& reason)
-{
-    if (fStop.IsStopped()) {
-        return;
-    }
-    fFailed = true;
-    fLosses.AddHeldBack();
-    fLosses.Add(reason);
-    if (fOptions.fFormat == EFormat::kJson) {
-        Write();
-    } else {
-        ReportLosses();
-    }
-}
-
-// Those that were not reported yet.
-void TRun::ReportLosses()
-{
-    const auto sentences = fLosses.GetSentences();
-    for (; fReportedCount < sentences.size(); ++fReportedCount) {
-        ReportError(sentences[fReportedCount]);
-    }
-}
-
-EExitStatus TRun::GetStatus() const
-{
-    if (fStop.IsStopped()) {
-        ReportError("interrupted");
-        return kInterrupted;
-    }
-    if (fFailed || fWriteError != 0) {
-        return kFailed;
-    }
-    return fReportedCount == 0 ? kComplete : kPartial;
 }
 
 } // namespace vrxhost

@@ -1,16 +1,16 @@
 #pragma once
 
-#include "host/cli/Document.h"
 #include "host/cli/Options.h"
-#include "host/cli/TDocumentOutput.h"
 #include "host/cli/TLossLog.h"
 #include "host/cli/TPrivateServer.h"
+#include "host/cli/TReport.h"
 #include "host/cli/TSession.h"
 #include "host/cli/TStopSignals.h"
 
 #include <host/ICIMNamespace.h>
 
-#include <cstddef>
+#include <condition_variable>
+#include <mutex>
 #include <string>
 
 namespace vrxhost {
@@ -27,28 +27,33 @@ class TRun
     EExitStatus Execute();
 
   private:
+    // Where a run stands, for the signal thread: what helps to end it depends on that.
+    enum class EPhase
+    {
+        kBefore,  // no server yet
+        kOpening, // the plug-in starts and stops servers by its own plan
+        kOpen,    // the server answers calls
+        kEnding   // the plug-in stops the server itself
+    };
+
     void Interrupt();
+    void Enter(EPhase phase);
     void LoadSettings() const;
     void SetConsumer() const;
     void UsePlugin();
     void OpenNamespace(TSession& session);
     bool PauseBefore(int attempt) const;
     void Show(NKOLVRX20::ICIMNamespace& ns);
-    void Write();
-    void Fail(const std::string& reason);
-    void ReportLosses();
-    EExitStatus GetStatus() const;
 
     const TOptions& fOptions;
     const std::string fConsumer;
     const TPrivateServer fServer;
-    TStopSignals fStop; // before every other thread
-    TDocumentOutput fOutput;
     TLossLog fLosses;
-    TDocument fDocument;
-    bool fFailed = false;
-    std::size_t fReportedCount = 0; // of the losses
-    int fWriteError = 0;
+    std::mutex fPhaseMutex;
+    std::condition_variable fPhaseChanged;
+    EPhase fPhase = EPhase::kBefore;
+    TStopSignals fStop; // after what its thread uses
+    TReport fReport;
 };
 
 } // namespace vrxhost

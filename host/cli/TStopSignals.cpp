@@ -10,6 +10,20 @@
 
 namespace vrxhost {
 
+namespace {
+
+// Not through the streams, whose lock a blocked write of another thread may hold: the second signal must be heard.
+void Announce()
+{
+    constexpr char kSentence[] = "vrxhost: stopping ...\n";
+    pollfd error = {STDERR_FILENO, POLLOUT, 0};
+    if (::poll(&error, 1, 0) == 1) {
+        static_cast<void>(!::write(STDERR_FILENO, kSentence, sizeof kSentence - 1));
+    }
+}
+
+} // namespace
+
 TStopSignals::TStopSignals(std::function<void()> onFirst)
     : fOnFirst(std::move(onFirst)), fEvent(::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK))
 {
@@ -41,9 +55,11 @@ bool TStopSignals::AwaitStop(int timeoutMs) const
 void TStopSignals::AwaitSignals()
 {
     for (int number = 0; sigwait(&fSignals, &number) == 0 && !fEnding;) {
-        if (fStopped.exchange(true)) {
+        if (fStopped) {
             ::_exit(kInterrupted);
         }
+        Announce();
+        fStopped = true;
         ::eventfd_write(fEvent.Get(), 1);
     }
 }

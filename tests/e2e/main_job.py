@@ -2,6 +2,7 @@
 
 Usage: main_job.py BUILD_DIRECTORY [CLASS[.TEST]...]
 """
+import concurrent.futures
 import glob
 import json
 import os
@@ -10,9 +11,10 @@ import shutil
 import signal
 import subprocess
 import sys
+import time
 import unittest
 
-from tree import Tree, wait_until
+from tree import Tree
 
 BUILD = sys.argv[1] if len(sys.argv) > 1 else None
 SOURCE = os.path.dirname(os.path.dirname(os.path.dirname(os.path.abspath(__file__))))
@@ -160,20 +162,40 @@ class TwoHosts(TreeTest):
         self.assert_nothing_left()
 
 
-class Interrupted(TreeTest):
-    def interrupt_once(self, condition, what):
-        process = self.tree.start("inventory")
-        try:
-            wait_until(condition, 60, what)
-            process.send_signal(signal.SIGINT)
-            process.communicate(timeout=60)
-        finally:
-            process.kill()
-        self.assertEqual(process.returncode, INTERRUPTED)
-        self.assert_nothing_left()
+class Interrupted(unittest.TestCase):
+    """^C at any moment: an announcement, a whole document, nothing left, and an end after two of the plug-in's pauses."""
 
-    def test_while_the_server_is_up(self):
-        self.interrupt_once(lambda: os.path.exists(self.tree.start_file), "the server's start")
+    STEP_SECONDS = 0.25
+    WHOLE_RUN_SECONDS = 10
+    END_SECONDS = 6.5
+
+    def interrupt_after(self, seconds):
+        """Returns what is wrong."""
+        tree = Tree(BUILD)
+        try:
+            process = tree.start("inventory", "--format", "json")
+            try:
+                process.wait(seconds)
+            except subprocess.TimeoutExpired:
+                process.send_signal(signal.SIGINT)
+            sent = time.monotonic()
+            out, err = process.communicate(timeout=60)
+            took = time.monotonic() - sent
+            document = json.loads(out)
+            wrong = [f"{took:.1f} s"] if took > self.END_SECONDS else []
+            if process.returncode != (COMPLETE if document["complete"] else INTERRUPTED):
+                wrong.append(f"status {process.returncode}")
+            if process.returncode == INTERRUPTED and err != "vrxhost: stopping ...\nvrxhost: interrupted\n":
+                wrong.append(err)
+            return wrong + tree.leftovers()
+        finally:
+            tree.remove()
+
+    def test_at_every_moment(self):
+        delays = [self.STEP_SECONDS * step for step in range(1, int(self.WHOLE_RUN_SECONDS / self.STEP_SECONDS))]
+        with concurrent.futures.ThreadPoolExecutor(4) as pool:
+            found = dict(zip(delays, pool.map(self.interrupt_after, delays)))
+        self.assertEqual({delay: wrong for delay, wrong in found.items() if wrong}, {})
 
 
 class BrokenTree(TreeTest):

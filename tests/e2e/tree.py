@@ -107,12 +107,3 @@ exec {program}.real "$@"
         if os.path.lexists(self.start_file):
             os.unlink(self.start_file)
         shutil.rmtree(self.folder, ignore_errors=True)
-
-
-def wait_until(condition, seconds, what):
-    deadline = time.monotonic() + seconds
-    while time.monotonic() < deadline:
-        if condition():
-            return
-        time.sleep(0.02)
-    raise AssertionError(f"{what} did not happen within {seconds} s")

@@ -151,6 +151,9 @@ class TFakeNamespace : public TInmemNamespace
             each->ClearInstances(); // a class and its instances hold each other
         }
         std::ofstream("cleared") << "cleared";
+        if (HasFault("interrupt-at-shutdown")) {
+            ::kill(::getpid(), SIGINT);
+        }
         if (HasFault("program-at-shutdown")) {
             TOSSpecific::SpawnProcess("touch shut-down-program-ran", 10);
         }

@@ -278,16 +278,36 @@ TEST_F(VrxhostProgram, StartsOverWhenAnotherServerTookThePort)
     EXPECT_THAT(failed.fErrorOutput, HasSubstr("the server did not start, cimserver: exit status 1"));
 }
 
+struct TInterruptionRow
+{
+    const char* fFault;
+    int fStatus;
+    std::size_t fClassesShown;
+    bool fAnnounced;
+};
+
+const TInterruptionRow kInterruptions[] = {
+    {"interrupt-program", 130, 0, true},
+    {"program-at-shutdown", 130, 0, true},
+    {"interrupt-enumeration", 130, 2, true}, // what was collected is shown
+    {"interrupt-at-shutdown", 0, 3, false},  // the document was complete before
+};
+
 TEST_F(VrxhostProgram, InterruptionEndsWaitingProgramsAndEnumerations)
 {
-    for (const char* fault : {"interrupt-program", "interrupt-enumeration", "program-at-shutdown"}) {
-        SCOPED_TRACE(fault);
+    for (const TInterruptionRow& row : kInterruptions) {
+        SCOPED_TRACE(row.fFault);
         fs::remove(fRoot / "cleared");
-        const auto outcome = Run({"inventory"}, fault);
-        EXPECT_TRUE(HasStatus(outcome, 130));
-        EXPECT_EQ(outcome.fOutput, "");
-        EXPECT_EQ(outcome.fErrorOutput, "vrxhost: interrupted\n");
+        const auto outcome = Run({"inventory", "--format", "json"}, row.fFault);
+        EXPECT_TRUE(HasStatus(outcome, row.fStatus));
         EXPECT_TRUE(IsCleared());
+        const auto json = nlohmann::json::parse(outcome.fOutput);
+        EXPECT_EQ(json["complete"], row.fStatus == 0);
+        EXPECT_EQ(json["providers"].empty() ? 0 : json["providers"][0]["classes"].size(), row.fClassesShown);
+        if (row.fAnnounced) {
+            EXPECT_EQ(outcome.fErrorOutput, "vrxhost: stopping ...\nvrxhost: interrupted\n");
+            EXPECT_EQ(json["losses"], nlohmann::json({"interrupted"}));
+        }
     }
     EXPECT_TRUE(fs::exists(fRoot / "shut-down-program-ran"));
 }

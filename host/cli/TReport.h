@@ -1,0 +1,49 @@
+#pragma once
+
+#include "host/cli/Document.h"
+#include "host/cli/Options.h"
+#include "host/cli/TDocumentOutput.h"
+#include "host/cli/TLossLog.h"
+#include "host/cli/TStopSignals.h"
+
+#include <cstddef>
+#include <string>
+#include <vector>
+
+namespace vrxhost {
+
+// What the user gets of a run: one document on standard output, the losses on standard error, and the exit status that
+// follows from both.
+// Thread: one at a time.
+class TReport
+{
+  public:
+    // The arguments outlive the object.
+    TReport(const TOptions& options, const TStopSignals& stop, TLossLog& losses);
+
+    // Writes the document; after an interruption it is marked as partial. Later calls do nothing.
+    // Blocks: while the reader does not read; after an interruption half a second at most.
+    void Show(std::vector<TProviderRecord> providers);
+
+    // There is no inventory: shows the reason, and a document without providers.
+    void Fail(const std::string& reason);
+
+    // Reports the losses since the document. Requires: the plug-in's work is over.
+    // Returns: the document's status when it was written whole, also if an interruption came later.
+    EExitStatus Finish();
+
+  private:
+    void Write(const std::string& text);
+    void ReportLosses();
+
+    const TOptions& fOptions;
+    const TStopSignals& fStop;
+    TLossLog& fLosses;
+    TDocumentOutput fOutput;
+    bool fShown = false;
+    bool fInterrupted = false; // before the document was written whole
+    bool fFailed = false;
+    std::size_t fReportedCount = 0; // of the losses
+};
+
+} // namespace vrxhost
