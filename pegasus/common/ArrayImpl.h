@@ -23,13 +23,13 @@ struct ArrayHeader
 
 namespace array_detail {
 
-template <class T> T* elements(ArrayHeader* header) noexcept
+template <typename T> T* elements(ArrayHeader* header) noexcept
 {
     static_assert(sizeof(ArrayHeader) % alignof(T) == 0, "elements follow the header");
     return reinterpret_cast<T*>(header + 1);
 }
 
-template <class T> ArrayHeader* allocate(std::size_t capacity)
+template <typename T> ArrayHeader* allocate(std::size_t capacity)
 {
     if (capacity > (PEG_NOT_FOUND - sizeof(ArrayHeader)) / sizeof(T)) {
         throw std::bad_alloc();
@@ -40,7 +40,7 @@ template <class T> ArrayHeader* allocate(std::size_t capacity)
     return header;
 }
 
-template <class T> void destroyRange(T* first, Uint32 count) noexcept
+template <typename T> void destroyRange(T* first, Uint32 count) noexcept
 {
     if constexpr (!std::is_trivially_destructible_v<T>) {
         for (Uint32 i = 0; i < count; ++i) {
@@ -57,7 +57,7 @@ inline bool isOnlyHolder(const ArrayHeader& header) noexcept
     return header.fRefs.load(std::memory_order_acquire) == 1;
 }
 
-template <class T> void release(ArrayHeader* header) noexcept
+template <typename T> void release(ArrayHeader* header) noexcept
 {
     if (!header || (!isOnlyHolder(*header) && header->fRefs.fetch_sub(1, std::memory_order_acq_rel) != 1)) {
         return;
@@ -76,60 +76,60 @@ inline void checkIndex(Uint32 index, Uint32 size)
 
 } // namespace array_detail
 
-template <class T> Array<T>::Array(const Array<T>& x) noexcept : fHeader(x.fHeader)
+template <typename T> Array<T>::Array(const Array<T>& x) noexcept : fHeader(x.fHeader)
 {
     if (fHeader) {
         fHeader->fRefs.fetch_add(1, std::memory_order_relaxed);
     }
 }
 
-template <class T> Array<T>::Array(Uint32 size) : Array(size, T()) {}
+template <typename T> Array<T>::Array(Uint32 size) : Array(size, T()) {}
 
-template <class T> Array<T>::Array(Uint32 size, const T& x)
+template <typename T> Array<T>::Array(Uint32 size, const T& x)
 {
     grow(size, x);
 }
 
-template <class T> Array<T>::Array(const T* items, Uint32 size)
+template <typename T> Array<T>::Array(const T* items, Uint32 size)
 {
     insert(0, items, size);
 }
 
-template <class T> Array<T>::~Array()
+template <typename T> Array<T>::~Array()
 {
     array_detail::release<T>(fHeader);
 }
 
-template <class T> Array<T>& Array<T>::operator=(const Array<T>& x) noexcept
+template <typename T> Array<T>& Array<T>::operator=(const Array<T>& x) noexcept
 {
     Array<T> copy(x);
     swap(copy);
     return *this;
 }
 
-template <class T> void Array<T>::clear()
+template <typename T> void Array<T>::clear()
 {
     Array<T> empty;
     swap(empty);
 }
 
-template <class T> Uint32 Array<T>::size() const noexcept
+template <typename T> Uint32 Array<T>::size() const noexcept
 {
     return fHeader ? fHeader->fSize : 0;
 }
 
-template <class T> Uint32 Array<T>::getCapacity() const noexcept
+template <typename T> Uint32 Array<T>::getCapacity() const noexcept
 {
     return fHeader ? fHeader->fCapacity : 0;
 }
 
-template <class T> const T* Array<T>::getData() const noexcept
+template <typename T> const T* Array<T>::getData() const noexcept
 {
     return fHeader ? array_detail::elements<T>(fHeader) : nullptr;
 }
 
 // Makes the elements this array's own with room for `capacity`; moves them when they already were.
-template <class T> void Array<T>::reserveCapacity(Uint32 capacity)
+template <typename T> void Array<T>::reserveCapacity(Uint32 capacity)
 {
     const bool own = fHeader && array_detail::isOnlyHolder(*fHeader);
     if (own ? fHeader->fCapacity >= capacity : (!fHeader && capacity == 0)) {
@@ -150,14 +150,14 @@ template <class T> void Array<T>::reserveCapacity(Uint32 capacity)
     swap(bigger);
 }
 
-template <class T> T* Array<T>::writable()
+template <typename T> T* Array<T>::writable()
 {
     reserveCapacity(size());
     return fHeader ? array_detail::elements<T>(fHeader) : nullptr;
 }
 
 // Opens a gap of default elements; the array is this one's own afterwards. Returns: the gap.
-template <class T> T* Array<T>::makeRoom(Uint32 index, Uint32 count)
+template <typename T> T* Array<T>::makeRoom(Uint32 index, Uint32 count)
 {
     const Uint32 oldSize = size();
     if (index > oldSize || count > PEG_NOT_FOUND - 1 - oldSize) {
@@ -177,7 +177,7 @@ template <class T> T* Array<T>::makeRoom(Uint32 index, Uint32 count)
     return items + index;
 }
 
-template <class T> void Array<T>::grow(Uint32 size, const T& x)
+template <typename T> void Array<T>::grow(Uint32 size, const T& x)
 {
     const T copy(x); // NOLINT(performance-unnecessary-copy-initialization): x may be one of ours
     T* gap = makeRoom(this->size(), size);
@@ -186,51 +186,51 @@ template <class T> void Array<T>::grow(Uint32 size, const T& x)
     }
 }
 
-template <class T> T& Array<T>::operator[](Uint32 index)
+template <typename T> T& Array<T>::operator[](Uint32 index)
 {
     array_detail::checkIndex(index, size());
     return writable()[index];
 }
 
-template <class T> const T& Array<T>::operator[](Uint32 index) const
+template <typename T> const T& Array<T>::operator[](Uint32 index) const
 {
     array_detail::checkIndex(index, size());
     return getData()[index];
 }
 
-template <class T> void Array<T>::append(const T& x)
+template <typename T> void Array<T>::append(const T& x)
 {
     insert(size(), x);
 }
 
-template <class T> void Array<T>::append(const T* x, Uint32 size)
+template <typename T> void Array<T>::append(const T* x, Uint32 size)
 {
     insert(this->size(), x, size);
 }
 
-template <class T> void Array<T>::appendArray(const Array<T>& x)
+template <typename T> void Array<T>::appendArray(const Array<T>& x)
 {
     const Array<T> kept(x); // NOLINT(performance-unnecessary-copy-initialization): x may be *this
     insert(size(), kept.getData(), kept.size());
 }
 
-template <class T> void Array<T>::prepend(const T& x)
+template <typename T> void Array<T>::prepend(const T& x)
 {
     insert(0, x);
 }
 
-template <class T> void Array<T>::prepend(const T* x, Uint32 size)
+template <typename T> void Array<T>::prepend(const T* x, Uint32 size)
 {
     insert(0, x, size);
 }
 
-template <class T> void Array<T>::insert(Uint32 index, const T& x)
+template <typename T> void Array<T>::insert(Uint32 index, const T& x)
 {
     T copy(x);
     *makeRoom(index, 1) = std::move(copy);
 }
 
-template <class T> void Array<T>::insert(Uint32 index, const T* x, Uint32 size)
+template <typename T> void Array<T>::insert(Uint32 index, const T* x, Uint32 size)
 {
     // The caller's elements may be this array's own.
     const T* own = getData();
@@ -244,12 +244,12 @@ template <class T> void Array<T>::insert(Uint32 index, const T* x, Uint32 size)
     }
 }
 
-template <class T> void Array<T>::remove(Uint32 index)
+template <typename T> void Array<T>::remove(Uint32 index)
 {
     remove(index, 1);
 }
 
-template <class T> void Array<T>::remove(Uint32 index, Uint32 size)
+template <typename T> void Array<T>::remove(Uint32 index, Uint32 size)
 {
     const Uint32 oldSize = this->size();
     if (size == 0) {

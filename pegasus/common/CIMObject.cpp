@@ -5,7 +5,7 @@ namespace Pegasus {
 namespace {
 
 // Calls `action` with the class or the instance that the object is.
-template <class Object, class Class, class Instance, class Action>
+template <typename Object, typename Class, typename Instance, typename Action>
 decltype(auto) visitObject(const Object& object, Class& cimClass, Instance& instance, Action&& action)
 {
     if (object.isClass()) {

@@ -24,7 +24,7 @@ template class RepPointer<CIMValueRep>;
 namespace {
 
 // Objects travel by clone, so that the holder's later changes are not seen; everything else is a value already.
-template <class T> T passed(const T& x)
+template <typename T> T passed(const T& x)
 {
     if constexpr (std::is_same_v<T, CIMObject> || std::is_same_v<T, CIMInstance>) {
         if (x.isUninitialized()) {
@@ -36,7 +36,7 @@ template <class T> T passed(const T& x)
     }
 }
 
-template <class T> Array<T> passed(const Array<T>& x)
+template <typename T> Array<T> passed(const Array<T>& x)
 {
     if constexpr (std::is_same_v<T, CIMObject> || std::is_same_v<T, CIMInstance>) {
         Array<T> copies;
@@ -72,7 +72,7 @@ struct SharedNulls
     RepPointer<CIMValueRep> ofType[CIMTYPE_INSTANCE + 1];
 };
 
-template <class T> void getScalar(const RepPointer<CIMValueRep>& rep, T& x)
+template <typename T> void getScalar(const RepPointer<CIMValueRep>& rep, T& x)
 {
     const CIMType type = rep ? CIMType(rep->fType) : CIMTYPE_BOOLEAN;
     if (type != CIMTypeOf<T>::kType || (rep && rep->fIsArray)) {
@@ -83,7 +83,7 @@ template <class T> void getScalar(const RepPointer<CIMValueRep>& rep, T& x)
     }
 }
 
-template <class T> void getArray(const RepPointer<CIMValueRep>& rep, Array<T>& x)
+template <typename T> void getArray(const RepPointer<CIMValueRep>& rep, Array<T>& x)
 {
     if (!rep || !rep->fIsArray || CIMType(rep->fType) != CIMTypeOf<T>::kType) {
         throw TypeMismatchException();
@@ -93,7 +93,7 @@ template <class T> void getArray(const RepPointer<CIMValueRep>& rep, Array<T>& x
     }
 }
 
-template <class T> Boolean sameElement(const T& x, const T& y)
+template <typename T> Boolean sameElement(const T& x, const T& y)
 {
     if constexpr (std::is_same_v<T, CIMObject> || std::is_same_v<T, CIMInstance>) {
         return x.identical(y);
@@ -104,7 +104,7 @@ template <class T> Boolean sameElement(const T& x, const T& y)
     }
 }
 
-template <class T> Boolean sameElements(const Array<T>& x, const Array<T>& y)
+template <typename T> Boolean sameElements(const Array<T>& x, const Array<T>& y)
 {
     if (x.size() != y.size()) {
         return false;
@@ -142,7 +142,7 @@ void appendText(std::string& out, const String& x)
     base::appendUtf8(out, x);
 }
 
-template <class T> void appendText(std::string& out, const T& x)
+template <typename T> void appendText(std::string& out, const T& x)
 {
     if constexpr (std::is_integral_v<T>) {
         out += std::to_string(x);
@@ -243,6 +243,7 @@ void CIMValue::setNullValue(CIMType type, Boolean isArray, Uint32 arraySize)
     fRep = isPlain ? kShared.ofType[type] : makeNull(type, isArray, arraySize);
 }
 
+// NOLINTBEGIN(bugprone-macro-parentheses): T is a type
 #define PEGASUS_VALUE_SET_GET(PARAMETER, T)                                                                            \
     void CIMValue::set(PARAMETER x)                                                                                    \
     {                                                                                                                  \
@@ -252,7 +253,7 @@ void CIMValue::setNullValue(CIMType type, Boolean isArray, Uint32 arraySize)
     {                                                                                                                  \
         *this = CIMValue(x);                                                                                           \
     }                                                                                                                  \
-    void CIMValue::get(T& x) const /* NOLINT(bugprone-macro-parentheses) */                                            \
+    void CIMValue::get(T& x) const                                                                                     \
     {                                                                                                                  \
         getScalar(fRep, x);                                                                                            \
     }                                                                                                                  \
@@ -260,6 +261,7 @@ void CIMValue::setNullValue(CIMType type, Boolean isArray, Uint32 arraySize)
     {                                                                                                                  \
         getArray(fRep, x);                                                                                             \
     }
+// NOLINTEND(bugprone-macro-parentheses)
 PEGASUS_VALUE_SET_GET(Boolean, Boolean)
 PEGASUS_VALUE_SET_GET(Uint8, Uint8)
 PEGASUS_VALUE_SET_GET(Sint8, Sint8)

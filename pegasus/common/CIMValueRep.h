@@ -12,7 +12,7 @@
 namespace Pegasus {
 
 // Element type T's number among the CIM types.
-template <class T> struct CIMTypeOf;
+template <typename T> struct CIMTypeOf;
 #define PEGASUS_CIM_TYPE_OF(T, NUMBER)                                                                                 \
     template <> struct CIMTypeOf<T>                                                                                    \
     {                                                                                                                  \
@@ -50,9 +50,9 @@ struct CIMValueRep : RefCounted
     CIMValueRep(const CIMValueRep&) = delete;
     ~CIMValueRep();
 
-    template <class Held> static constexpr bool kInPlace = sizeof(Held) <= sizeof(fStorage);
+    template <typename Held> static constexpr bool kInPlace = sizeof(Held) <= sizeof(fStorage);
 
-    template <class Held> Held& held() noexcept
+    template <typename Held> Held& held() noexcept
     {
         if constexpr (kInPlace<Held>) {
             return *std::launder(reinterpret_cast<Held*>(fStorage));
@@ -60,9 +60,9 @@ struct CIMValueRep : RefCounted
             return **std::launder(reinterpret_cast<Held**>(fStorage));
         }
     }
-    template <class Held> const Held& held() const noexcept { return const_cast<CIMValueRep*>(this)->held<Held>(); }
+    template <typename Held> const Held& held() const noexcept { return const_cast<CIMValueRep*>(this)->held<Held>(); }
 
-    template <class Held> void hold(Held value)
+    template <typename Held> void hold(Held value)
     {
         if constexpr (kInPlace<Held>) {
             new (fStorage) Held(std::move(value));
@@ -71,7 +71,7 @@ struct CIMValueRep : RefCounted
         }
         fIsNull = false;
     }
-    template <class Held> void drop() noexcept
+    template <typename Held> void drop() noexcept
     {
         if constexpr (kInPlace<Held>) {
             held<Held>().~Held();
@@ -82,11 +82,11 @@ struct CIMValueRep : RefCounted
 };
 
 // Calls `visitor` with a tag of the element type that `type` stands for.
-template <class T> struct TypeTag
+template <typename T> struct TypeTag
 {
     using Type = T;
 };
-template <class Visitor> decltype(auto) visitType(CIMType type, Visitor&& visitor)
+template <typename Visitor> decltype(auto) visitType(CIMType type, Visitor&& visitor)
 {
     switch (type) {
     case CIMTYPE_UINT8:
@@ -130,13 +130,13 @@ template <class Visitor> decltype(auto) visitType(CIMType type, Visitor&& visito
 struct ValueAccess
 {
     // A value that takes the object as it is.
-    template <class T> static CIMValue make(T scalar) { return makeHeld<T, T>(std::move(scalar), false); }
-    template <class T> static CIMValue make(Array<T> array) { return makeHeld<T, Array<T>>(std::move(array), true); }
+    template <typename T> static CIMValue make(T scalar) { return makeHeld<T, T>(std::move(scalar), false); }
+    template <typename T> static CIMValue make(Array<T> array) { return makeHeld<T, Array<T>>(std::move(array), true); }
     // Requires: not null, and exactly this type. T may be an Array.
-    template <class Held> static const Held& held(const CIMValue& value) { return value.fRep->held<Held>(); }
+    template <typename Held> static const Held& held(const CIMValue& value) { return value.fRep->held<Held>(); }
 
   private:
-    template <class T, class Held> static CIMValue makeHeld(Held held, bool isArray)
+    template <typename T, typename Held> static CIMValue makeHeld(Held held, bool isArray)
     {
         CIMValue value;
         value.fRep = RepPointer<CIMValueRep>(new CIMValueRep());

@@ -83,8 +83,8 @@ struct CIMClassRep : RefCounted
 // Sub-objects by name, in lists that hold handles. `what` names the kind in "already exists: property "p"".
 struct ObjectAccess
 {
-    template <class Handle> static auto& rep(const Handle& handle) { return handle.fRep.checked(); }
-    template <class Handle, class Rep> static Handle wrap(Rep* adopted)
+    template <typename Handle> static auto& rep(const Handle& handle) { return handle.fRep.checked(); }
+    template <typename Handle, typename Rep> static Handle wrap(Rep* adopted)
     {
         Handle handle;
         handle.fRep = RepPointer<Rep>(adopted);
@@ -93,7 +93,7 @@ struct ObjectAccess
     static const CIMClass& classIn(const CIMConstObject& object) { return object.fClass; }
     static const CIMInstance& instanceIn(const CIMConstObject& object) { return object.fInstance; }
 
-    template <class Item> static Uint32 find(const Array<Item>& items, const CIMName& name)
+    template <typename Item> static Uint32 find(const Array<Item>& items, const CIMName& name)
     {
         const Item* data = items.getData();
         for (Uint32 i = 0; i < items.size(); ++i) {
@@ -104,7 +104,7 @@ struct ObjectAccess
         return PEG_NOT_FOUND;
     }
 
-    template <class Item> static void add(Array<Item>& items, const Item& item, const char* what)
+    template <typename Item> static void add(Array<Item>& items, const Item& item, const char* what)
     {
         const CIMName& name = item.getName();
         if (find(items, name) != PEG_NOT_FOUND) {
@@ -114,9 +114,9 @@ struct ObjectAccess
     }
 
     // The handle itself: a change through it is a change of the list's object.
-    template <class Item> static Item at(const Array<Item>& items, Uint32 index) { return items[index]; }
+    template <typename Item> static Item at(const Array<Item>& items, Uint32 index) { return items[index]; }
 
-    template <class Item> static Array<Item> clone(const Array<Item>& items)
+    template <typename Item> static Array<Item> clone(const Array<Item>& items)
     {
         Array<Item> copies;
         copies.reserveCapacity(items.size());
@@ -126,7 +126,7 @@ struct ObjectAccess
         return copies;
     }
 
-    template <class Item> static bool identical(const Array<Item>& x, const Array<Item>& y)
+    template <typename Item> static bool identical(const Array<Item>& x, const Array<Item>& y)
     {
         if (x.size() != y.size()) {
             return false;

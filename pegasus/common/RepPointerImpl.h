@@ -20,12 +20,12 @@ struct RefCounted
     std::atomic<Uint32> fRefs{1};
 };
 
-template <class Rep> void RepPointer<Rep>::retain(Rep* rep) noexcept
+template <typename Rep> void RepPointer<Rep>::retain(Rep* rep) noexcept
 {
     rep->fRefs.fetch_add(1, std::memory_order_relaxed);
 }
 
-template <class Rep> void RepPointer<Rep>::release(Rep* rep) noexcept
+template <typename Rep> void RepPointer<Rep>::release(Rep* rep) noexcept
 {
     // The last holder needs no atomic write: nobody else can take a count any more.
     if (rep->fRefs.load(std::memory_order_acquire) == 1 || rep->fRefs.fetch_sub(1, std::memory_order_acq_rel) == 1) {
@@ -33,7 +33,7 @@ template <class Rep> void RepPointer<Rep>::release(Rep* rep) noexcept
     }
 }
 
-template <class Rep> Rep& RepPointer<Rep>::checked() const
+template <typename Rep> Rep& RepPointer<Rep>::checked() const
 {
     if (!fRep) {
         throw UninitializedObjectException();
@@ -42,7 +42,7 @@ template <class Rep> Rep& RepPointer<Rep>::checked() const
 }
 
 // A representation that may be changed: its own copy when it is shared, a new one when there is none.
-template <class Rep> Rep& writable(RepPointer<Rep>& pointer)
+template <typename Rep> Rep& writable(RepPointer<Rep>& pointer)
 {
     if (!pointer) {
         pointer = RepPointer<Rep>(new Rep());

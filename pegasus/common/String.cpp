@@ -129,7 +129,7 @@ int signOf(int difference)
     return difference < 0 ? -1 : (difference > 0 ? 1 : 0);
 }
 
-template <class Fold> int compareUnits(const String& s1, const String& s2, Uint32 n, Fold fold)
+template <typename Fold> int compareUnits(const String& s1, const String& s2, Uint32 n, Fold fold)
 {
     const Uint32 count1 = std::min(s1.size(), n);
     const Uint32 count2 = std::min(s2.size(), n);

@@ -15,7 +15,7 @@ template <typename To, typename From> void shareQualifiers(To& to, From& from)
 }
 
 // In reverse order, as OpenPegasus answers.
-template <typename To, class From, typename Local> void inheritQualifiers(To& to, From& from, Local& local)
+template <typename To, typename From, typename Local> void inheritQualifiers(To& to, From& from, Local& local)
 {
     for (Uint32 i = from.getQualifierCount(); i-- > 0;) {
         const CIMQualifier inherited = from.getQualifier(i);

@@ -7,7 +7,7 @@
 namespace lnx {
 namespace {
 
-template <class T> constexpr CMPIType typeOf();
+template <typename T> constexpr CMPIType typeOf();
 template <> constexpr CMPIType typeOf<bool>()
 {
     return CMPI_boolean;
@@ -62,7 +62,7 @@ template <> constexpr CMPIType typeOf<std::string>()
 }
 
 // What a broker's function wants to see of a value: the text itself, or a pointer to as many bytes as the type has.
-template <class T> const CMPIValue* pointerTo(const T& value)
+template <typename T> const CMPIValue* pointerTo(const T& value)
 {
     if constexpr (std::is_same_v<T, std::string>) {
         return reinterpret_cast<const CMPIValue*>(value.c_str());
@@ -71,7 +71,7 @@ template <class T> const CMPIValue* pointerTo(const T& value)
     }
 }
 
-template <class Object> void release(Object* object)
+template <typename Object> void release(Object* object)
 {
     if (object != nullptr) {
         object->ft->release(object);
@@ -84,12 +84,12 @@ class ValuePasser
   public:
     explicit ValuePasser(const CMPIBroker& broker) : fBroker(broker) {}
 
-    template <class T, class Use> CMPIStatus pass(const T& value, Use&& use) const
+    template <typename T, typename Use> CMPIStatus pass(const T& value, Use&& use) const
     {
         return use(pointerTo(value), typeOf<T>());
     }
 
-    template <class Use> CMPIStatus pass(const DateTime& value, Use&& use) const
+    template <typename Use> CMPIStatus pass(const DateTime& value, Use&& use) const
     {
         CMPIStatus status{CMPI_RC_OK, nullptr};
         CMPIDateTime* made =
@@ -97,7 +97,7 @@ class ValuePasser
         return usedOnce(made, status, CMPI_dateTime, use);
     }
 
-    template <class T, class Use> CMPIStatus pass(const std::vector<T>& values, Use&& use) const
+    template <typename T, typename Use> CMPIStatus pass(const std::vector<T>& values, Use&& use) const
     {
         constexpr CMPIType kElement = std::is_same_v<T, std::string> ? CMPIType{CMPI_string} : typeOf<T>();
         CMPIStatus status{CMPI_RC_OK, nullptr};
@@ -110,7 +110,7 @@ class ValuePasser
         return usedOnce(array, status, static_cast<CMPIType>(CMPI_ARRAY | kElement), use);
     }
 
-    template <class Object, class Use>
+    template <typename Object, typename Use>
     static CMPIStatus usedOnce(Object* object, CMPIStatus status, CMPIType type, Use&& use)
     {
         if (object != nullptr && status.rc == CMPI_RC_OK) {
@@ -122,13 +122,16 @@ class ValuePasser
 
   private:
     // Text in an array is a string object: not every broker takes plain text there.
-    template <class Use> CMPIStatus passElement(const std::string& value, Use&& use) const
+    template <typename Use> CMPIStatus passElement(const std::string& value, Use&& use) const
     {
         CMPIStatus status{CMPI_RC_OK, nullptr};
         CMPIString* made = fBroker.eft->newString(&fBroker, value.c_str(), &status);
         return usedOnce(made, status, CMPI_string, use);
     }
-    template <class T, class Use> CMPIStatus passElement(const T& value, Use&& use) const { return pass(value, use); }
+    template <typename T, typename Use> CMPIStatus passElement(const T& value, Use&& use) const
+    {
+        return pass(value, use);
+    }
 
     const CMPIBroker& fBroker;
 };

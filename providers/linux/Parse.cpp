@@ -8,7 +8,7 @@ namespace {
 
 constexpr std::string_view kBlanks = " \t\n\r\f\v";
 
-template <class T> std::optional<T> parsed(std::string_view text, int base)
+template <typename T> std::optional<T> parsed(std::string_view text, int base)
 {
     T value{};
     const char* const end = text.data() + text.size();

@@ -22,7 +22,7 @@ std::optional<std::uint64_t> toNatural(std::string_view text); // decimal, or he
 std::optional<double> toReal(std::string_view text);
 
 // Returns: the value in the narrower type, when it fits.
-template <class T, class From> std::optional<T> narrowed(const std::optional<From>& value)
+template <typename T, typename From> std::optional<T> narrowed(const std::optional<From>& value)
 {
     if (!value) {
         return std::nullopt;

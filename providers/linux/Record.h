@@ -51,7 +51,7 @@ class Record
 
     void key(const char* name, Value value) { fProperties.push_back({name, std::move(value), true}); }
     void set(const char* name, Value value) { fProperties.push_back({name, std::move(value), false}); }
-    template <class T> void set(const char* name, const std::optional<T>& value)
+    template <typename T> void set(const char* name, const std::optional<T>& value)
     {
         if (value) {
             set(name, Value(*value));

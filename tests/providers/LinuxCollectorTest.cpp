@@ -31,7 +31,7 @@ struct Shown
         }
         return text;
     }
-    template <class T> std::string operator()(const std::vector<T>& values) const
+    template <typename T> std::string operator()(const std::vector<T>& values) const
     {
         std::string text;
         for (const T& value : values) {
@@ -39,7 +39,7 @@ struct Shown
         }
         return text;
     }
-    template <class T> std::string operator()(T number) const
+    template <typename T> std::string operator()(T number) const
     {
         std::ostringstream text;
         text << +number;

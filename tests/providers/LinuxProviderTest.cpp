@@ -146,7 +146,7 @@ TEST_F(LinuxProvider, CountsProcesses)
     }
 }
 
-template <class Call> CIMStatusCode codeOf(Call&& call)
+template <typename Call> CIMStatusCode codeOf(Call&& call)
 {
     try {
         call();

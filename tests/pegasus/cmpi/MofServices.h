@@ -1,7 +1,7 @@
 #pragma once
 
-#include "pegasus/cmpi/services/BrokerServices.h"
 #include "pegasus/cmpi/module/ProviderModule.h"
+#include "pegasus/cmpi/services/BrokerServices.h"
 #include "pegasus/mof/MemoryHandler.h"
 
 #include <functional>

@@ -24,7 +24,7 @@ using testing::HasSubstr;
 constexpr const char* kProvider = "Conformance";
 
 // "code: text" of what the call threw, "" when it did not.
-template <class Call> std::string errorOf(Call&& call)
+template <typename Call> std::string errorOf(Call&& call)
 {
     try {
         call();

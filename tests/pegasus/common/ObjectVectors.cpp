@@ -14,7 +14,7 @@ namespace {
 constexpr const char* kDone = "no exception";
 
 // A call on a default-constructed object.
-template <class T, class Call> Evaluator on(Call call)
+template <typename T, typename Call> Evaluator on(Call call)
 {
     return [call](const Vector&) {
         T object;

@@ -46,7 +46,7 @@ json unitAt(Uint32 index)
     return changeable == fixed ? json(changeable) : json("they differ");
 }
 
-template <class Make> Evaluator sizeOf(Make make)
+template <typename Make> Evaluator sizeOf(Make make)
 {
     return [make](const Vector&) { return make().size(); };
 }

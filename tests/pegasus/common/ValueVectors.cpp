@@ -8,12 +8,12 @@ using namespace Pegasus;
 namespace test {
 namespace {
 
-template <class T> Evaluator shown(const T& x)
+template <typename T> Evaluator shown(const T& x)
 {
     return [value = CIMValue(x)](const Vector&) { return describe(value); };
 }
 
-template <class T> CIMValue arrayOf(std::initializer_list<T> items)
+template <typename T> CIMValue arrayOf(std::initializer_list<T> items)
 {
     return CIMValue(Array<T>(items.begin(), static_cast<Uint32>(items.size())));
 }
@@ -57,7 +57,7 @@ const std::map<std::string, CIMValue>& kinds()
 }
 
 // get() into a variable that holds `before`.
-template <class T> T got(const CIMValue& value, T before)
+template <typename T> T got(const CIMValue& value, T before)
 {
     value.get(before);
     return before;
@@ -174,7 +174,7 @@ void addComparisons(VectorTable& table)
 }
 
 // A value that is changed by `change`.
-template <class Change> Evaluator changed(const CIMValue& before, Change change)
+template <typename Change> Evaluator changed(const CIMValue& before, Change change)
 {
     return [=](const Vector&) {
         CIMValue value = before;

@@ -53,7 +53,7 @@ std::string encode(const CIMConstClass& cimClass)
 }
 
 // The recorded classes carry the effective flavors, so a use tells its declaration.
-template <class Owner> void declareQualifiers(Repository& repository, const Owner& owner)
+template <typename Owner> void declareQualifiers(Repository& repository, const Owner& owner)
 {
     for (Uint32 i = 0; i < owner.getQualifierCount(); ++i) {
         const CIMConstQualifier use = owner.getQualifier(i);
