@@ -32,7 +32,3 @@ class Descriptor
 };
 
 } // namespace Pegasus::base
-
-namespace Pegasus::server {
-using base::Descriptor;
-}

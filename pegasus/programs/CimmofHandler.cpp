@@ -1,5 +1,7 @@
 #include "pegasus/programs/CimmofHandler.h"
 
+#include "pegasus/base/Text.h"
+
 #include <iostream>
 
 namespace Pegasus::cimmof {
@@ -8,11 +10,6 @@ namespace {
 
 // Instances of more classes than this in turn ask the server again.
 constexpr std::size_t kMaxRememberedClasses = 256;
-
-std::string utf8(const String& text)
-{
-    return std::string(text.getCString());
-}
 
 // The message that stays in front of whatever the server said.
 [[noreturn]] void failAdding(const String& what, const Exception& cause)
@@ -40,7 +37,7 @@ void ServerHandler::useNamespace(const CIMNamespaceName& nameSpace)
 
 bool ServerHandler::findQualifier(const CIMName& name, CIMQualifierDecl& declaration)
 {
-    const std::string key = utf8(name.getString());
+    const std::string key = base::utf8(name.getString());
     const auto known = fQualifiers.find(key);
     if (known != fQualifiers.end()) {
         declaration = known->second;
@@ -60,7 +57,7 @@ bool ServerHandler::findQualifier(const CIMName& name, CIMQualifierDecl& declara
 
 bool ServerHandler::findClass(const CIMName& name, CIMClass& found)
 {
-    const std::string key = utf8(name.getString());
+    const std::string key = base::utf8(name.getString());
     const auto known = fClasses.find(key);
     if (known != fClasses.end()) {
         found = known->second;

@@ -1,5 +1,6 @@
 #include "pegasus/programs/ConfigActions.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/server/admin/Config.h"
 
 #include <Pegasus/Client/CIMClient.h>
@@ -22,15 +23,10 @@ CIMObjectPath pathOf(const std::string& name)
     return CIMObjectPath(String(), CIMNamespaceName(), CIMName(kClass), keys);
 }
 
-std::string utf8(const String& text)
-{
-    return std::string(text.getCString());
-}
-
 std::string textOf(const CIMInstance& instance, const char* property)
 {
     const Uint32 position = instance.findProperty(CIMName(property));
-    return position == PEG_NOT_FOUND ? "" : utf8(instance.getProperty(position).getValue().toString());
+    return position == PEG_NOT_FOUND ? "" : base::utf8(instance.getProperty(position).getValue().toString());
 }
 
 bool connect(CIMClient& client)
@@ -61,7 +57,7 @@ void updateOnServer(CIMClient& client, const ConfigCommand& command)
 
 int reportServerError(const CIMException& error, bool whileSetting)
 {
-    const std::string text = utf8(error.getMessage());
+    const std::string text = base::utf8(error.getMessage());
     switch (error.getCode()) {
     case CIM_ERR_NOT_FOUND:
         std::cout << "Specified property name was not found.\n";
@@ -172,7 +168,7 @@ try {
     return 0;
 } catch (const CIMException& error) {
     std::cout << "Failed to list the config properties. \n";
-    std::cerr << utf8(error.getMessage()) << "\n";
+    std::cerr << base::utf8(error.getMessage()) << "\n";
     return 1;
 }
 

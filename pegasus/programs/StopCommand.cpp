@@ -1,5 +1,6 @@
 #include "pegasus/programs/StopCommand.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/base/TreeLockFile.h"
 #include "pegasus/server/admin/ProcessHandle.h"
 #include "pegasus/server/admin/StartFile.h"
@@ -52,10 +53,10 @@ int stopServer(const std::string& home)
         askToEnd();
     } catch (const CIMException& error) {
         const bool empty = error.getCode() == CIM_ERR_INVALID_NAMESPACE;
-        return forceShutdown(empty ? "The repository may be empty." : std::string(error.getMessage().getCString()),
-                             process, status.record);
+        return forceShutdown(empty ? "The repository may be empty." : base::utf8(error.getMessage()), process,
+                             status.record);
     } catch (const Exception& error) {
-        return forceShutdown(std::string(error.getMessage().getCString()), process, status.record);
+        return forceShutdown(base::utf8(error.getMessage()), process, status.record);
     }
     if (!process.waitForEnd(kEndTimeout)) {
         return forceShutdown("The server does not end.", process, status.record);

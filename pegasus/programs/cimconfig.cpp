@@ -1,4 +1,5 @@
 // Shows and changes the private server's configuration.
+#include "pegasus/base/Text.h"
 #include "pegasus/programs/ConfigActions.h"
 #include "pegasus/server/admin/ConfigFile.h"
 
@@ -50,7 +51,7 @@ int main(int argc, char** argv)
     } catch (const std::exception& error) {
         std::cerr << "cimconfig: " << error.what() << "\n";
     } catch (const Exception& error) {
-        std::cerr << "cimconfig: " << error.getMessage().getCString() << "\n";
+        std::cerr << "cimconfig: " << base::utf8(error.getMessage()) << "\n";
     }
     return 1;
 }

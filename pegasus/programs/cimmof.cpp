@@ -1,3 +1,4 @@
+#include "pegasus/base/Text.h"
 #include "pegasus/mof/Compiler.h"
 #include "pegasus/mof/MemoryHandler.h"
 #include "pegasus/programs/CimmofHandler.h"
@@ -24,11 +25,6 @@ enum Status
     kHelpShown = 255
 };
 
-std::string utf8(const String& text)
-{
-    return std::string(text.getCString());
-}
-
 Status compileOne(const std::string& file, const mof::CompileOptions& options, mof::DefinitionHandler& handler)
 {
     try {
@@ -41,7 +37,7 @@ Status compileOne(const std::string& file, const mof::CompileOptions& options, m
         std::cerr << error.what() << "\n";
         return error.kind() == mof::FileError::Kind::kNotOpened ? kNoFile : kUnreadableFile;
     } catch (const Exception& error) {
-        std::cerr << file << ": error: " << utf8(error.getMessage()) << "\n";
+        std::cerr << file << ": error: " << base::utf8(error.getMessage()) << "\n";
         return kFailed;
     }
 }
@@ -114,7 +110,7 @@ int main(int argc, char** argv)
                   << argv[0] << ": Use '--help' to obtain command syntax.\n";
         return kBadCommandLine;
     } catch (const Exception& error) {
-        std::cerr << "cimmof: " << utf8(error.getMessage()) << "\n";
+        std::cerr << "cimmof: " << base::utf8(error.getMessage()) << "\n";
     } catch (const std::exception& error) {
         std::cerr << "cimmof: " << error.what() << "\n";
     }

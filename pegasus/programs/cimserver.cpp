@@ -1,4 +1,5 @@
 // The private CIM server: starts, stops and asks after it. As "cimprovagt --agent" it is a provider agent.
+#include "pegasus/base/Text.h"
 #include "pegasus/programs/ServerCommand.h"
 #include "pegasus/programs/StopCommand.h"
 #include "pegasus/server/Server.h"
@@ -29,7 +30,7 @@ bool serve(server::Config& config, server::LaunchSignal& signal, std::string& er
     } catch (const std::exception& failure) {
         error = std::string("cimserver not started: ") + failure.what();
     } catch (const Exception& failure) {
-        error = "cimserver not started: " + std::string(failure.getMessage().getCString());
+        error = "cimserver not started: " + base::utf8(failure.getMessage());
     }
     signal.failed(error);
     return false;

@@ -1,7 +1,7 @@
 #include "pegasus/server/Server.h"
 
 #include "pegasus/base/LocalSocket.h"
-#include "pegasus/server/admin/Housekeeper.h"
+#include "pegasus/server/ServerSettings.h"
 #include "pegasus/server/admin/Log.h"
 #include "pegasus/server/admin/StopSignal.h"
 #include "pegasus/server/admin/TreeClaim.h"
@@ -10,9 +10,11 @@
 #include "pegasus/server/net/PeerCheck.h"
 #include "pegasus/server/operations/Dispatcher.h"
 
+#include <condition_variable>
+#include <functional>
 #include <memory>
 #include <mutex>
-#include <system_error>
+#include <thread>
 
 namespace Pegasus::server {
 
@@ -21,59 +23,39 @@ namespace {
 constexpr std::chrono::seconds kGraceAfterBreak{5};
 constexpr std::chrono::seconds kHousekeepingInterval{2};
 
-Severity logLevel(const Config& config)
-{
-    const std::string level = config.text("logLevel");
-    return level == "ERROR"     ? Severity::kError
-           : level == "WARNING" ? Severity::kWarning
-           : level == "DEBUG"   ? Severity::kDebug
-                                : Severity::kInformation;
-}
-
-ConnectionSettings connectionSettings(const Config& config)
-{
-    ConnectionSettings settings;
-    settings.http = {config.number("maxHeaderBytes"), config.number("maxBodyBytes")};
-    settings.times = {config.seconds("idleConnectionTimeout"), config.seconds("requestReadTimeout")};
-    settings.writePatience = config.seconds("socketWriteTimeout");
-    settings.maxXmlDepth = config.number("maxXmlDepth");
-    settings.maxBufferedAnswerBytes = config.number("maxBufferedAnswerBytes");
-    return settings;
-}
-
-AgentSettings agentSettings(const Config& config)
-{
-    AgentSettings settings;
-    settings.providerDirectories = config.directories("providerDir");
-    settings.patience = config.seconds("providerTimeout");
-    settings.idle = config.seconds("agentIdleTimeout");
-    settings.process = {config.number("agentMemoryMegabytes"), config.flag("strictOwners")};
-    return settings;
-}
-
-// Settings made from the configuration, made anew only when it has changed: they are asked for at every request.
-template <typename Settings> class SettingsCache
+// Calls a function at an interval, on a thread of its own, as long as it exists.
+class Housekeeper
 {
   public:
-    SettingsCache(const Config& config, Settings (*make)(const Config&)) : fConfig(config), fMake(make) {}
-
-    Settings get()
+    explicit Housekeeper(std::function<void()> work)
     {
-        const std::lock_guard<std::mutex> lock(fMutex);
-        const unsigned generation = fConfig.generation();
-        if (generation != fGeneration) {
-            fSettings = fMake(fConfig);
-        }
-        fGeneration = generation;
-        return fSettings;
+        fThread = std::thread([this, call = std::move(work)] {
+            std::unique_lock<std::mutex> lock(fMutex);
+            while (!fChanged.wait_for(lock, kHousekeepingInterval, [&] { return fEnded; })) {
+                lock.unlock();
+                call();
+                lock.lock();
+            }
+        });
     }
+    // Blocks: until a running call has returned.
+    ~Housekeeper()
+    {
+        {
+            const std::lock_guard<std::mutex> lock(fMutex);
+            fEnded = true;
+        }
+        fChanged.notify_all();
+        fThread.join();
+    }
+    Housekeeper(const Housekeeper&) = delete;
+    Housekeeper& operator=(const Housekeeper&) = delete;
 
   private:
-    const Config& fConfig;
-    Settings (*fMake)(const Config&);
     std::mutex fMutex;
-    unsigned fGeneration = 0;
-    Settings fSettings;
+    std::condition_variable fChanged;
+    bool fEnded = false;
+    std::thread fThread;
 };
 
 // Removes the local socket when the server ends.
@@ -89,24 +71,18 @@ class LocalSocketFile
     std::string fHome;
 };
 
-std::string repositoryPath(const Config& config)
-{
-    const std::string directory = config.text("repositoryDir");
-    return directory[0] == '/' ? directory : config.home() + "/" + directory;
-}
-
 // The sockets that connections come in by.
 struct Listeners
 {
-    Descriptor remote; // none when the configuration switches TCP off
-    Descriptor local;
+    base::Descriptor remote; // none when the configuration switches TCP off
+    base::Descriptor local;
 
     explicit Listeners(const Config& config)
     {
         if (config.flag("enableHttpConnection")) {
             const auto port = static_cast<std::uint16_t>(config.number("httpPort"));
             remote = listenOnLoopback(port);
-            Log::write(Severity::kInformation, "Listening on 127.0.0.1:" + std::to_string(port) + ".");
+            Log::write(LogLevel::kInformation, "Listening on 127.0.0.1:" + std::to_string(port) + ".");
         }
         local = listenLocally(config.home());
     }
@@ -127,7 +103,7 @@ std::vector<Acceptor::Source> acceptFrom(Listeners listeners, ConnectionGroup& r
 void endConnections(ConnectionGroup& remote, ConnectionGroup& local, AgentPool& agents, std::chrono::seconds grace)
 {
     remote.endReading();
-    const Deadline deadline = Clock::now() + grace;
+    const base::Deadline deadline = base::Deadline::after(grace);
     const bool remoteEnded = remote.waitForEnd(deadline);
     // Agents call back over local connections as long as they work for remote ones.
     local.endReading();
@@ -138,8 +114,10 @@ void endConnections(ConnectionGroup& remote, ConnectionGroup& local, AgentPool& 
     }
     remote.breakAll();
     local.breakAll();
-    if (!remote.waitForEnd(Clock::now() + kGraceAfterBreak) || !local.waitForEnd(Clock::now() + kGraceAfterBreak)) {
-        Log::write(Severity::kError, "Requests do not end; the server ends without them.");
+    if (!remote.waitForEnd(base::Deadline::after(kGraceAfterBreak)) ||
+        !local.waitForEnd(base::Deadline::after(kGraceAfterBreak)))
+    {
+        Log::write(LogLevel::kError, "Requests do not end; the server ends without them.");
         base::removeLocalSocket(defaultHome());
         ::_exit(1);
     }
@@ -170,15 +148,15 @@ void Server::run(LaunchSignal& signal)
     Acceptor acceptor(acceptFrom(std::move(listeners), remote, local), stop.fd(),
                       [&] { return fConfig.number("maxConnections"); });
     claim.announce(repositoryPath(fConfig));
-    Log::write(Severity::kInformation, "Started CIM Server, process " + std::to_string(::getpid()) + ".");
-    const Housekeeper housekeeper(kHousekeepingInterval, [&] {
+    Log::write(LogLevel::kInformation, "Started CIM Server, process " + std::to_string(::getpid()) + ".");
+    const Housekeeper housekeeper([&] {
         Log::setLevel(logLevel(fConfig));
         agents.endIdleAgents();
     });
     signal.ready();
     acceptor.run();
     endConnections(remote, local, agents, fConfig.seconds("shutdownTimeout"));
-    Log::write(Severity::kInformation, "CIM Server stopped.");
+    Log::write(LogLevel::kInformation, "CIM Server stopped.");
 }
 
 } // namespace Pegasus::server

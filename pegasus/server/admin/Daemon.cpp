@@ -106,8 +106,8 @@ LaunchResult launchDaemon(const std::function<void(LaunchSignal&)>& server)
     if (::pipe2(ends, O_CLOEXEC) != 0) {
         throw std::system_error(errno, std::generic_category(), "cannot create a pipe");
     }
-    Descriptor reading(ends[0]);
-    Descriptor writing(ends[1]);
+    base::Descriptor reading(ends[0]);
+    base::Descriptor writing(ends[1]);
     const pid_t child = ::fork();
     if (child < 0) {
         throw std::system_error(errno, std::generic_category(), "cannot create a process");

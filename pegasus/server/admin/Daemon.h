@@ -20,7 +20,7 @@ class LaunchSignal
 {
   public:
     LaunchSignal() = default;
-    explicit LaunchSignal(Descriptor pipe) : fPipe(std::move(pipe)) {}
+    explicit LaunchSignal(base::Descriptor pipe) : fPipe(std::move(pipe)) {}
 
     void ready();
     void failed(const std::string& error);
@@ -28,7 +28,7 @@ class LaunchSignal
   private:
     void send(char kind, const std::string& text);
 
-    Descriptor fPipe;
+    base::Descriptor fPipe;
 };
 
 // Runs `server` in a process of its own session with standard input, output and error on /dev/null, umask 077 and no

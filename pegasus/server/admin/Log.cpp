@@ -17,10 +17,10 @@ namespace {
 struct LogState
 {
     std::mutex mutex;
-    Descriptor file;
+    base::Descriptor file;
     std::string path;
     bool toStandardError = false;
-    std::atomic<Severity> least{Severity::kInformation};
+    std::atomic<LogLevel> least{LogLevel::kInformation};
 };
 
 LogState& state()
@@ -44,7 +44,7 @@ void rotateWhenFull(LogState& log)
     reopen(log);
 }
 
-const char* label(Severity severity)
+const char* label(LogLevel severity)
 {
     static const char* const kLabels[] = {"error", "warning", "info", "debug"};
     return kLabels[static_cast<int>(severity)];
@@ -60,7 +60,7 @@ std::string stamp()
     return std::string(text, size);
 }
 
-std::string formatLine(Severity severity, const std::string& text)
+std::string formatLine(LogLevel severity, const std::string& text)
 {
     std::string line = stamp() + " [" + std::to_string(::getpid()) + "] " + label(severity) + ": ";
     for (const char c : text) {
@@ -92,12 +92,12 @@ try {
 } catch (...) {
 }
 
-void Log::setLevel(Severity least) noexcept
+void Log::setLevel(LogLevel least) noexcept
 {
     state().least = least;
 }
 
-void Log::write(Severity severity, const std::string& text) noexcept
+void Log::write(LogLevel severity, const std::string& text) noexcept
 try {
     LogState& log = state();
     if (severity > log.least) {

@@ -4,7 +4,7 @@
 
 namespace Pegasus::server {
 
-enum class Severity
+enum class LogLevel
 {
     kError,
     kWarning,
@@ -23,8 +23,8 @@ class Log
 
     // Until opened, lines are dropped. `alsoToStandardError` serves a server in the foreground.
     static void open(const std::string& home, bool alsoToStandardError) noexcept;
-    static void setLevel(Severity least) noexcept;
-    static void write(Severity severity, const std::string& text) noexcept;
+    static void setLevel(LogLevel least) noexcept;
+    static void write(LogLevel severity, const std::string& text) noexcept;
 };
 
 } // namespace Pegasus::server

@@ -36,7 +36,7 @@ void writePrivateFile(const std::string& path, const std::string& content)
 {
     const std::string temporary = path + ".new." + std::to_string(::getpid());
     ::unlink(temporary.c_str());
-    const Descriptor file(::open(temporary.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600));
+    const base::Descriptor file(::open(temporary.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600));
     if (!file) {
         fail("cannot create", temporary);
     }
@@ -53,7 +53,7 @@ void writePrivateFile(const std::string& path, const std::string& content)
 
 std::string readOwnFile(const std::string& path, std::size_t maxBytes)
 {
-    const Descriptor file(::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
+    const base::Descriptor file(::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
     struct stat info = {};
     if (!file || ::fstat(file.get(), &info) != 0 || !S_ISREG(info.st_mode) ||
         (info.st_uid != 0 && info.st_uid != ::geteuid()) || (info.st_mode & S_IWOTH) != 0)

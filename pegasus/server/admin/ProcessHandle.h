@@ -29,7 +29,7 @@ class ProcessHandle
     void send(int signal) const;
 
     pid_t fPid;
-    Descriptor fHandle;
+    base::Descriptor fHandle;
 };
 
 } // namespace Pegasus::server

@@ -12,12 +12,12 @@ namespace Pegasus::server {
 
 namespace {
 
-Descriptor checked(int fd, const char* what)
+base::Descriptor checked(int fd, const char* what)
 {
     if (fd < 0) {
         throw std::system_error(errno, std::generic_category(), what);
     }
-    return Descriptor(fd);
+    return base::Descriptor(fd);
 }
 
 sigset_t endingSignals()
@@ -30,7 +30,7 @@ sigset_t endingSignals()
     return signals;
 }
 
-void post(const Descriptor& event) noexcept
+void post(const base::Descriptor& event) noexcept
 {
     ::eventfd_write(event.get(), 1);
 }

@@ -24,9 +24,9 @@ class StopSignal
   private:
     void waitForSignal();
 
-    Descriptor fEvent;
-    Descriptor fSignals;
-    Descriptor fEnd;
+    base::Descriptor fEvent;
+    base::Descriptor fSignals;
+    base::Descriptor fEnd;
     std::thread fWaiter;
 };
 

@@ -73,7 +73,7 @@ try {
 void TreeClaim::announce(const std::string& repository)
 {
     if (fReplaced != 0) {
-        Log::write(Severity::kWarning,
+        Log::write(LogLevel::kWarning,
                    "Ended the server of process " + std::to_string(fReplaced) + ", whose repository was gone.");
     }
     struct stat info = {};
@@ -86,9 +86,9 @@ void TreeClaim::announce(const std::string& repository)
     }
     try {
         StartFile::write(fRecord.startFile, fRecord.pid);
-        Log::write(Severity::kInformation, "Wrote the start file " + fRecord.startFile + ".");
+        Log::write(LogLevel::kInformation, "Wrote the start file " + fRecord.startFile + ".");
     } catch (const std::system_error& error) {
-        Log::write(Severity::kWarning, std::string("No start file: ") + error.what() +
+        Log::write(LogLevel::kWarning, std::string("No start file: ") + error.what() +
                                            "; programs that look for it do not find this server.");
     }
 }

@@ -44,8 +44,8 @@ class TreeClaim
 
     TreeLock fLock;
     base::TreeLockRecord fRecord;
-    Descriptor fRepository; // keeps the folder's inode from being given to another one
-    pid_t fReplaced = 0;    // the server whose place this one took
+    base::Descriptor fRepository; // keeps the folder's inode from being given to another one
+    pid_t fReplaced = 0;          // the server whose place this one took
 };
 
 } // namespace Pegasus::server

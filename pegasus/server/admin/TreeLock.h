@@ -20,7 +20,7 @@ class TreeLock
     void release() noexcept;
 
   private:
-    Descriptor fFile;
+    base::Descriptor fFile;
     std::string fPath;
 };
 

@@ -29,14 +29,14 @@ constexpr std::chrono::seconds kGraceForProviders{2};
 class ChannelThreads
 {
   public:
-    void serve(Descriptor channel, AgentHandler& handler)
+    void serve(base::Descriptor channel, AgentHandler& handler)
     {
         {
             const std::lock_guard<std::mutex> lock(fMutex);
             ++fCount;
         }
         std::thread([this, &handler, fd = channel.release()] {
-            run(Descriptor(fd), handler);
+            run(base::Descriptor(fd), handler);
             const std::lock_guard<std::mutex> lock(fMutex);
             --fCount;
             fChanged.notify_all();
@@ -44,10 +44,10 @@ class ChannelThreads
     }
 
     // Returns: false if some still run at the deadline.
-    bool waitForEnd(Deadline deadline)
+    bool waitForEnd(const base::Deadline& deadline)
     {
         std::unique_lock<std::mutex> lock(fMutex);
-        return fChanged.wait_until(lock, deadline, [&] { return fCount == 0; });
+        return fChanged.wait_until(lock, deadline.time(), [&] { return fCount == 0; });
     }
 
   private:
@@ -57,12 +57,12 @@ class ChannelThreads
         ConnectionSettings settings;
         settings.http = {16u << 20, 1u << 30};
         settings.times = {std::chrono::milliseconds::zero(), std::chrono::milliseconds::zero()};
-        settings.writePatience = std::chrono::milliseconds::zero();
+        settings.writeTimeout = std::chrono::milliseconds::zero();
         settings.maxXmlDepth = 1024;
         return settings;
     }
 
-    static void run(Descriptor channel, AgentHandler& handler)
+    static void run(base::Descriptor channel, AgentHandler& handler)
     {
         SocketStream stream(std::move(channel));
         serveConnection(stream, handler, settings, CimAnswer::Envelope::kBare);
@@ -74,7 +74,7 @@ class ChannelThreads
 };
 
 // Returns: the next channel; none when the server has gone.
-Descriptor receiveChannel()
+base::Descriptor receiveChannel()
 {
     char byte = 0;
     iovec data = {&byte, 1};
@@ -93,7 +93,7 @@ Descriptor receiveChannel()
     if (header != nullptr && header->cmsg_level == SOL_SOCKET && header->cmsg_type == SCM_RIGHTS) {
         std::memcpy(&fd, CMSG_DATA(header), sizeof fd);
     }
-    return Descriptor(fd);
+    return base::Descriptor(fd);
 }
 
 void limitMemory(std::size_t megabytes)
@@ -125,11 +125,11 @@ int runAgent(int, char** argv)
     AgentServices services(argv[2]);
     auto handler = std::make_unique<AgentHandler>(argv[2], services, std::strcmp(argv[4], "any") != 0);
     ChannelThreads threads;
-    while (Descriptor channel = receiveChannel()) {
+    while (base::Descriptor channel = receiveChannel()) {
         threads.serve(std::move(channel), *handler);
     }
     // A provider that still works, or never returns, is left behind with its process; else it is asked to clean up.
-    if (threads.waitForEnd(Clock::now() + kGraceForProviders)) {
+    if (threads.waitForEnd(base::Deadline::after(kGraceForProviders))) {
         handler.reset();
     }
     ::_exit(0);

@@ -6,7 +6,7 @@ namespace Pegasus::server {
 // descriptor 3. Returns: the exit status, when the server has closed the control socket.
 int runAgent(int argc, char** argv);
 
-// Whether the program was started so.
+// Returns: whether the program was started in agent mode.
 bool isAgentCommand(int argc, char** argv);
 
 } // namespace Pegasus::server

@@ -1,80 +1,73 @@
 #include "pegasus/server/agent/AgentChannel.h"
 
-#include <boost/beast/http/empty_body.hpp>
-#include <boost/beast/http/parser.hpp>
+#include "pegasus/base/PercentCoding.h"
+#include "pegasus/wire/HttpAnswerReader.h"
 
 #include <charconv>
-#include <cstring>
 #include <limits>
 #include <system_error>
 
 namespace Pegasus::server {
 
-namespace http = boost::beast::http;
-
 namespace {
 
 constexpr std::size_t kReadBytes = 128u << 10;
 constexpr std::uint32_t kMaxAnswerHeadBytes = 1u << 20; // the trailer carries the provider's error text
+constexpr unsigned kOk = 200;
 
-using AnswerParser = http::response_parser<http::empty_body>;
+// Instances may be of any number: only what surrounds them is bounded.
+constexpr wire::HttpAnswerLimits kAnswerLimits = {kMaxAnswerHeadBytes, kMaxAnswerHeadBytes,
+                                                  std::numeric_limits<std::uint64_t>::max()};
 
-CimStatus statusIn(const AnswerParser::value_type& message)
+std::string encoded(const std::string& text)
 {
-    CimStatus status;
-    const auto code = message.find("CIMStatusCode");
-    if (code == message.end()) {
-        return status;
+    return base::percentEncoded(text, base::PercentSet::kUnreserved);
+}
+
+CimStatus statusIn(const wire::HttpAnswerFields& fields)
+{
+    if (fields.status != kOk) { // the agent could not read our request
+        throw AgentLost("HTTP " + std::to_string(fields.status) +
+                        (fields.errorDetail.empty() ? "" : ": " + fields.errorDetail));
     }
-    const auto text = code->value();
-    std::from_chars(text.data(), text.data() + text.size(), status.code);
-    const auto description = message.find("CIMStatusCodeDescription");
-    if (description != message.end()) {
-        status.text = percentDecode(std::string(description->value()));
+    CimStatus status;
+    if (fields.statusCode) {
+        const std::string& code = *fields.statusCode;
+        std::from_chars(code.data(), code.data() + code.size(), status.code);
+        status.text = fields.statusDescription;
     }
     return status;
 }
 
-// The agent could not read our request: its words are all there is.
-[[noreturn]] void failFor(const AnswerParser::value_type& message)
-{
-    std::string text = "HTTP " + std::to_string(message.result_int());
-    const auto detail = message.find("PGErrorDetail");
-    if (detail != message.end()) {
-        text += ": " + percentDecode(std::string(detail->value()));
-    }
-    throw AgentLost(text);
-}
-
 } // namespace
 
-CimStatus AgentChannel::request(const AgentRequest& request, ElementSink& sink, std::chrono::milliseconds patience)
+CimStatus AgentChannel::request(const AgentRequest& request, ElementSink& sink, std::chrono::milliseconds timeout)
 {
-    send(request, patience);
-    return receive(sink, patience);
+    send(request, timeout);
+    return receive(sink, timeout);
 }
 
-void AgentChannel::send(const AgentRequest& request, std::chrono::milliseconds patience)
+void AgentChannel::send(const AgentRequest& request, std::chrono::milliseconds timeout)
 try {
     std::string head = "POST /agent HTTP/1.1\r\nHost: agent\r\nContent-Type: application/xml; charset=utf-8\r\n"
                        "TE: chunked, trailers\r\nCIMOperation: MethodCall\r\nCIMMethod: " +
-                       percentEncode(request.method) + "\r\nCIMObject: " + percentEncode(request.object) +
-                       "\r\nPG-Provider: " + percentEncode(request.provider) +
-                       "\r\nPG-Library: " + percentEncode(request.library) +
+                       encoded(request.method) + "\r\nCIMObject: " + encoded(request.object) +
+                       "\r\nPG-Provider: " + encoded(request.provider) + "\r\nPG-Library: " + encoded(request.library) +
                        "\r\nContent-Length: " + std::to_string(request.body.size()) + "\r\n\r\n";
     iovec parts[] = {{head.data(), head.size()}, {const_cast<char*>(request.body.data()), request.body.size()}};
-    fStream.writeAll(parts, std::size(parts), patience);
+    fStream.writeAll(parts, std::size(parts), timeout);
 } catch (const std::system_error& error) {
     throw AgentGone(error.what());
 } catch (const SocketTimeout&) {
     throw AgentSilent();
 }
 
-std::size_t AgentChannel::readMore(std::size_t kept, std::chrono::milliseconds patience)
+// Returns: the next bytes of the answer.
+std::string_view AgentChannel::readMore(std::chrono::milliseconds timeout)
 {
     std::size_t n = 0;
     try {
-        n = fStream.readSome(fBuffer.data() + kept, fBuffer.size() - kept, deadlineAfter(patience));
+        n = fStream.readSome(fBuffer.data(), fBuffer.size(), base::Deadline::afterOrNever(timeout));
     } catch (const std::system_error& error) {
         throw AgentLost(error.what());
     } catch (const SocketTimeout&) {
@@ -83,46 +76,24 @@ std::size_t AgentChannel::readMore(std::size_t kept, std::chrono::milliseconds p
     if (n == 0) {
         throw AgentLost("the agent closed the connection");
     }
-    return n;
+    return {fBuffer.data(), n};
 }
 
-CimStatus AgentChannel::receive(ElementSink& sink, std::chrono::milliseconds patience)
+CimStatus AgentChannel::receive(ElementSink& sink, std::chrono::milliseconds timeout)
 {
-    AnswerParser parser;
-    parser.eager(true);
-    parser.header_limit(kMaxAnswerHeadBytes);
-    parser.body_limit(std::numeric_limits<std::uint64_t>::max());
-    // Called with the bytes of each chunk as they lie in the buffer: nothing is copied on the way to the client.
-    auto pass = [&](std::uint64_t, boost::beast::string_view bytes, boost::system::error_code&) {
-        sink.write({bytes.data(), bytes.size()});
-        return bytes.size();
-    };
-    parser.on_chunk_body(pass);
-    std::size_t kept = 0;
-    if (fBuffer.empty()) {
-        fBuffer.resize(kReadBytes);
-    }
-    while (!parser.is_done()) {
-        if (kept == fBuffer.size()) {
-            fBuffer.resize(2 * fBuffer.size()); // a long head or trailer; kMaxAnswerHeadBytes ends it
+    fBuffer.resize(kReadBytes);
+    // The sink gets the bytes of each chunk as they lie in the buffer: nothing is copied on the way to the client.
+    wire::HttpAnswerReader reader(
+        kAnswerLimits, [](const wire::HttpAnswerFields&) {}, [&](std::string_view bytes) { sink.write(bytes); });
+    while (!reader.isComplete()) {
+        const std::string_view bytes = readMore(timeout);
+        try {
+            reader.feed(bytes);
+        } catch (const wire::HttpAnswerError& error) {
+            throw AgentLost(std::string("malformed answer: ") + error.what());
         }
-        kept += readMore(kept, patience);
-        boost::system::error_code error;
-        const std::size_t taken = parser.put(boost::asio::const_buffer(fBuffer.data(), kept), error);
-        kept -= taken;
-        if (error == http::error::header_limit || kept > kMaxAnswerHeadBytes) {
-            throw AgentLost("a head, chunk extension or trailer of more than " + std::to_string(kMaxAnswerHeadBytes) +
-                            " bytes");
-        }
-        if (error && error != http::error::need_more) {
-            throw AgentLost("malformed answer: " + error.message());
-        }
-        std::memmove(fBuffer.data(), fBuffer.data() + taken, kept);
     }
-    if (parser.get().result() != http::status::ok) {
-        failFor(parser.get());
-    }
-    return statusIn(parser.get());
+    return statusIn(reader.fields());
 }
 
 } // namespace Pegasus::server

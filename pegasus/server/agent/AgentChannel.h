@@ -7,7 +7,7 @@
 
 namespace Pegasus::server {
 
-// The agent at the other end ended, or said something that is no answer. what() says which.
+// The agent at the other end has ended, or its answer is malformed. what() says which.
 class AgentLost : public std::runtime_error
 {
   public:
@@ -21,7 +21,7 @@ class AgentGone : public AgentLost
     using AgentLost::AgentLost;
 };
 
-// The agent sent nothing for the whole patience.
+// The agent sent nothing for the whole timeout.
 class AgentSilent : public std::runtime_error
 {
   public:
@@ -40,29 +40,32 @@ struct AgentRequest
 
 // The server's end of a socket pair to an agent: carries one request at a time.
 //
-// The protocol is the public one, CIM-XML over HTTP, but for two things: the headers PG-Provider and PG-Library say who
-// is meant, and the answer's body is only the elements within IRETURNVALUE or METHODRESPONSE, so that they can be
-// passed on unread, whatever their number.
+// The protocol is the public one, CIM-XML over HTTP, with two differences: the headers PG-Provider and PG-Library name
+// the provider and its library, and the answer's body is only the elements within IRETURNVALUE or METHODRESPONSE, so
+// that they can be passed on unread, whatever their number.
+//
+// Thread: one at a time, except shutDown().
 class AgentChannel
 {
   public:
-    explicit AgentChannel(Descriptor socket) : fStream(std::move(socket)) {}
+    explicit AgentChannel(base::Descriptor socket) : fStream(std::move(socket)) {}
 
     // Passes the answer's elements to the sink as they come. Returns: the operation's status.
-    // Throws: AgentLost, AgentGone; AgentSilent when nothing comes for `patience` (zero: any time). After an exception,
-    // the sink's own included, the channel is out of step and must be dropped.
-    CimStatus request(const AgentRequest& request, ElementSink& sink, std::chrono::milliseconds patience);
+    // Throws: AgentLost, AgentGone; AgentSilent when nothing comes for `timeout` (0: any time); what the sink throws.
+    // After an exception the rest of the answer is still under way, and the channel must be dropped.
+    // Blocks: as long as the agent keeps sending.
+    CimStatus request(const AgentRequest& request, ElementSink& sink, std::chrono::milliseconds timeout);
 
     // Makes a waiting request() fail. Thread: any.
     void shutDown() noexcept { fStream.shutDown(); }
 
   private:
-    void send(const AgentRequest& request, std::chrono::milliseconds patience);
-    std::size_t readMore(std::size_t kept, std::chrono::milliseconds patience);
-    CimStatus receive(ElementSink& sink, std::chrono::milliseconds patience);
+    void send(const AgentRequest& request, std::chrono::milliseconds timeout);
+    std::string_view readMore(std::chrono::milliseconds timeout);
+    CimStatus receive(ElementSink& sink, std::chrono::milliseconds timeout);
 
     SocketStream fStream;
-    std::vector<char> fBuffer; // what has been read of the answer and not been parsed
+    std::vector<char> fBuffer; // for what is read of the answer
 };
 
 } // namespace Pegasus::server

@@ -1,6 +1,7 @@
 #include "pegasus/server/agent/AgentHandler.h"
 
 #include "pegasus/base/OwnedPath.h"
+#include "pegasus/base/PercentCoding.h"
 #include "pegasus/server/agent/AgentMessages.h"
 #include "pegasus/wire/ElementEncoder.h"
 
@@ -11,7 +12,7 @@ namespace {
 std::string privateHeader(const HttpRequest& http, const char* name)
 {
     const std::string* value = http.header(name);
-    return value != nullptr ? percentDecode(*value) : std::string();
+    return value != nullptr ? base::percentDecoded(*value) : std::string();
 }
 
 cmpi::ProviderRequest providerRequest(const HttpRequest& http, const CimRequest& request)

@@ -1,14 +1,18 @@
 #pragma once
 
 #include "pegasus/cmpi/module/ProviderModule.h"
-#include "pegasus/server/net/Connection.h"
+#include "pegasus/server/net/RequestLoop.h"
 
 #include <memory>
 #include <mutex>
 
 namespace Pegasus::server {
 
-// Carries out an agent's requests on its provider module, which is loaded by the first.
+// Carries out an agent's requests on its provider module, which the first request loads.
+//
+// Throws (handle): CIMException for an error of the operation or when the module cannot be loaded; what the answer
+// throws.
+// Thread: any.
 class AgentHandler : public RequestHandler
 {
   public:

@@ -7,14 +7,15 @@
 
 namespace Pegasus::server {
 
-// Requests that the server makes for agents itself. Those of clients are passed on as they came where they fit.
+// Requests that the server makes for agents itself. A client's GetInstance and method calls are passed on as they came.
+// Thread: any.
 
 // EnumerateInstances, with everything that the provider has, of one class alone.
 AgentRequest makeEnumerateInstancesRequest(const CIMNamespaceName& nameSpace, const CIMName& className,
                                            const CIMPropertyList& properties);
 AgentRequest makeEnumerateInstanceNamesRequest(const CIMNamespaceName& nameSpace, const CIMName& className);
 
-// Asks whether the module may be let go; any status but success says no.
+// Asks whether the module may be unloaded. A status other than success refuses.
 AgentRequest makeUnloadRequest();
 extern const char* const kUnloadMethod;
 

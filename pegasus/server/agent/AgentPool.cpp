@@ -14,7 +14,7 @@ namespace Pegasus::server {
 namespace {
 
 constexpr std::chrono::seconds kWaitForCause{2};
-constexpr std::chrono::seconds kUnloadPatience{5};
+constexpr std::chrono::seconds kUnloadTimeout{5};
 
 [[noreturn]] void fail(const std::string& text)
 {
@@ -31,13 +31,13 @@ std::chrono::seconds backOff(unsigned deaths)
 }
 
 // Runs its function at the end of the scope.
-class AtEnd
+class ScopeGuard
 {
   public:
-    explicit AtEnd(std::function<void()> action) : fAction(std::move(action)) {}
-    ~AtEnd() { fAction(); }
-    AtEnd(const AtEnd&) = delete;
-    AtEnd& operator=(const AtEnd&) = delete;
+    explicit ScopeGuard(std::function<void()> action) : fAction(std::move(action)) {}
+    ~ScopeGuard() { fAction(); }
+    ScopeGuard(const ScopeGuard&) = delete;
+    ScopeGuard& operator=(const ScopeGuard&) = delete;
 
   private:
     std::function<void()> fAction;
@@ -62,37 +62,37 @@ CimStatus AgentPool::request(const ProviderReference& provider, AgentRequest req
     request.provider = provider.provider;
     request.library = cmpi::findProviderLibrary(settings.providerDirectories, provider.location, provider.module);
     try {
-        return requestOnce(provider.module, request, sink, settings.patience);
+        return requestOnce(provider.module, request, sink, settings.timeout);
     } catch (const AgentGone&) {
         // It died while idle and nobody had noticed yet; the request never reached it.
     }
     try {
-        return requestOnce(provider.module, request, sink, settings.patience);
+        return requestOnce(provider.module, request, sink, settings.timeout);
     } catch (const AgentGone& error) {
         fail("Lost connection with cimprovagt \"" + provider.module + "\". " + error.what());
     }
 }
 
 CimStatus AgentPool::requestOnce(const std::string& module, const AgentRequest& request, ElementSink& sink,
-                                 std::chrono::milliseconds patience)
+                                 std::chrono::milliseconds timeout)
 {
     const std::shared_ptr<AgentProcess> process = acquire(module);
-    const AtEnd releaser([&] { release(module); });
+    const ScopeGuard releaser([&] { release(module); });
     try {
         std::unique_ptr<AgentChannel> channel = process->takeChannel();
-        CimStatus status = channel->request(request, sink, patience);
+        CimStatus status = channel->request(request, sink, timeout);
         process->giveBack(std::move(channel));
         succeeded(module);
         return status;
     } catch (const AgentGone&) {
         process->kill();
-        process->waitForEnd(Clock::now() + kWaitForCause);
+        process->waitForEnd(base::Deadline::after(kWaitForCause));
         throw;
     } catch (const AgentLost& error) {
         lost(module, process, error.what());
     } catch (const AgentSilent&) {
         process->kill();
-        lost(module, process, "ended after " + std::to_string(patience.count() / 1000) + " s without an answer");
+        lost(module, process, "ended after " + std::to_string(timeout.count() / 1000) + " s without an answer");
     }
 }
 
@@ -114,7 +114,7 @@ std::shared_ptr<AgentProcess> AgentPool::acquire(const std::string& name)
         } catch (const std::system_error& error) {
             fail(error.what());
         }
-        Log::write(Severity::kInformation, "Started " + std::string(kAgentProcessName) + " \"" + name + "\", process " +
+        Log::write(LogLevel::kInformation, "Started " + std::string(kAgentProcessName) + " \"" + name + "\", process " +
                                                std::to_string(module.process->pid()) + ".");
     }
     ++module.running;
@@ -135,14 +135,14 @@ void AgentPool::succeeded(const std::string& name)
     fModules[name].deaths = 0;
 }
 
-// Tells what became of the agent, once for all requests that it was working on.
+// Reports what became of the agent; counted and logged once for all requests that it was working on.
 void AgentPool::lost(const std::string& name, const std::shared_ptr<AgentProcess>& process, const std::string& reason)
 {
-    // An agent that broke the protocol but lives on is of no use either.
-    if (!process->waitForEnd(Clock::now() + kWaitForCause)) {
+    // An agent that broke the protocol is ended too.
+    if (!process->waitForEnd(base::Deadline::after(kWaitForCause))) {
         process->kill();
     }
-    process->waitForEnd(Clock::now() + kWaitForCause);
+    process->waitForEnd(base::Deadline::after(kWaitForCause));
     const std::string cause = process->causeOfDeath();
     {
         const std::lock_guard<std::mutex> lock(fMutex);
@@ -154,7 +154,7 @@ void AgentPool::lost(const std::string& name, const std::shared_ptr<AgentProcess
             module.process.reset();
             ++module.deaths;
             module.nextStart = Clock::now() + backOff(module.deaths);
-            Log::write(Severity::kError,
+            Log::write(LogLevel::kError,
                        "A failure was detected in provider module " + name + ": " + reason + "; " + cause);
         }
     }
@@ -186,7 +186,7 @@ bool AgentPool::mayEnd(AgentProcess& process)
         {
             void write(std::string_view) override {}
         } nothing;
-        const CimStatus status = channel->request(makeUnloadRequest(), nothing, kUnloadPatience);
+        const CimStatus status = channel->request(makeUnloadRequest(), nothing, kUnloadTimeout);
         process.giveBack(std::move(channel));
         return status.code == 0;
     } catch (const std::exception&) { // the next real request finds out what is wrong with it
@@ -202,7 +202,7 @@ std::vector<AgentPool::Candidate> AgentPool::findIdle(std::chrono::milliseconds 
         if (!module.process || module.running != 0 || Clock::now() < module.lastUse + idle) {
             continue;
         }
-        module.lastUse = Clock::now(); // not again at once if it says no
+        module.lastUse = Clock::now(); // not asked again at once when it refuses
         candidates.push_back({name, module.process, module.lastUse});
     }
     return candidates;
@@ -218,7 +218,7 @@ void AgentPool::retire(const Candidate& candidate)
     }
     module.process.reset();
     candidate.process->close();
-    Log::write(Severity::kInformation, "Ended the idle agent of provider module \"" + candidate.module + "\".");
+    Log::write(LogLevel::kInformation, "Ended the idle agent of provider module \"" + candidate.module + "\".");
 }
 
 void AgentPool::endIdleAgents()

@@ -8,19 +8,19 @@
 
 namespace Pegasus::server {
 
-// What the pool goes by; asked for anew when it is needed.
+// Pool settings, read again on every use.
 struct AgentSettings
 {
     std::vector<std::string> providerDirectories;
-    std::chrono::milliseconds patience = std::chrono::minutes(10);
-    std::chrono::milliseconds idle = std::chrono::minutes(5); // zero: for ever
+    std::chrono::milliseconds timeout = std::chrono::minutes(10); // of a provider's silence
+    std::chrono::milliseconds idle = std::chrono::minutes(5);     // until an idle agent is ended; 0: never
     AgentProcess::Options process;
 };
 
 // The agents, one a provider module: started at a module's first request, ended when idle, started again after a crash.
 //
-// A module whose agent keeps dying is left alone for a while: after kFreeRestarts deaths without a good answer between
-// them, requests fail at once for a time that doubles with each further death.
+// After kFreeRestarts deaths of a module's agent without a good answer between them, requests fail at once for a time
+// that doubles with each further death.
 //
 // Thread: any.
 class AgentPool
@@ -39,37 +39,39 @@ class AgentPool
     // Carries a request to the provider's agent and its answer's elements to the sink. `request.provider` and
     // `request.library` are filled in here.
     // Returns: the status that the provider gave.
-    // Throws: CIMException with CIM_ERR_FAILED: no CMPI module, library not found, agent lost or silent (each names
-    // module and cause); whatever the sink throws. Blocks: as long as the provider keeps sending, and for the patience
-    // of silence.
+    // Throws: CIMException with CIM_ERR_FAILED and a text that names module and cause: the module is of another
+    // interface type than CMPI, its library is not found, the agent is lost or silent; what the sink throws.
+    // Blocks: as long as the provider keeps sending, and for the timeout of its silence.
     CimStatus request(const ProviderReference& provider, AgentRequest request, ElementSink& sink);
 
-    // Makes every running and future request fail.
+    // Makes every running and future request fail. Blocks: for the grace period of agents that hang.
     void shutDown() noexcept;
 
-    // Ends the agents that have been idle for long enough; the server calls this now and then.
+    // Ends the agents that have been idle for long enough. To be called now and then.
     void endIdleAgents();
 
   private:
+    using Clock = base::Deadline::Clock;
+
     struct Module
     {
         std::shared_ptr<AgentProcess> process;
         unsigned running = 0;
         unsigned deaths = 0; // without a good answer between them
-        Deadline nextStart = Deadline::min();
-        Deadline lastUse;
+        Clock::time_point nextStart = Clock::time_point::min();
+        Clock::time_point lastUse;
     };
 
     struct Candidate
     {
         std::string module;
         std::shared_ptr<AgentProcess> process;
-        Deadline lastUse;
+        Clock::time_point lastUse;
     };
 
     // Throws: AgentGone, besides what request() throws.
     CimStatus requestOnce(const std::string& module, const AgentRequest& request, ElementSink& sink,
-                          std::chrono::milliseconds patience);
+                          std::chrono::milliseconds timeout);
     std::shared_ptr<AgentProcess> acquire(const std::string& module);
     void release(const std::string& module);
     void succeeded(const std::string& module);

@@ -23,8 +23,8 @@ constexpr std::chrono::seconds kGraceOfDestructor{3};
 
 struct SocketPair
 {
-    Descriptor ours;
-    Descriptor theirs;
+    base::Descriptor ours;
+    base::Descriptor theirs;
 };
 
 SocketPair makeSocketPair()
@@ -33,7 +33,7 @@ SocketPair makeSocketPair()
     if (::socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, ends) != 0) {
         throw std::system_error(errno, std::generic_category(), "cannot create a socket pair for an agent");
     }
-    return {Descriptor(ends[0]), Descriptor(ends[1])};
+    return {base::Descriptor(ends[0]), base::Descriptor(ends[1])};
 }
 
 // What posix_spawn needs; freed with it.
@@ -66,7 +66,7 @@ struct SpawnPlan
     SpawnPlan& operator=(const SpawnPlan&) = delete;
 };
 
-pid_t spawnAgent(const std::string& module, const AgentProcess::Options& options, Descriptor control)
+pid_t spawnAgent(const std::string& module, const AgentProcess::Options& options, base::Descriptor control)
 {
     if (control.get() == kAgentControlFd) {
         control.reset(::fcntl(control.release(), F_DUPFD_CLOEXEC, kAgentControlFd + 1));
@@ -126,7 +126,7 @@ AgentProcess::AgentProcess(const std::string& module, const Options& options) : 
 AgentProcess::~AgentProcess()
 {
     close();
-    if (!waitForEnd(Clock::now() + kGraceOfDestructor)) {
+    if (!waitForEnd(base::Deadline::after(kGraceOfDestructor))) {
         kill();
     }
     fWatcher.join();
@@ -175,7 +175,7 @@ void AgentProcess::close() noexcept
 {
     {
         const std::lock_guard<std::mutex> lock(fMutex);
-        fIdle.clear(); // the agent's threads behind them end
+        fIdle.clear(); // the agent's threads at their other ends end
     }
     ::shutdown(fControl.get(), SHUT_RDWR);
 }
@@ -194,10 +194,10 @@ bool AgentProcess::isRunning() const
     return !fEnded;
 }
 
-bool AgentProcess::waitForEnd(Deadline deadline) const
+bool AgentProcess::waitForEnd(const base::Deadline& deadline) const
 {
     std::unique_lock<std::mutex> lock(fMutex);
-    return fChanged.wait_until(lock, deadline, [&] { return fEnded; });
+    return fChanged.wait_until(lock, deadline.time(), [&] { return fEnded; });
 }
 
 std::string AgentProcess::causeOfDeath() const

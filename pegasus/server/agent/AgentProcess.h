@@ -14,8 +14,8 @@ namespace Pegasus::server {
 // One running agent: the server's own program in agent mode, which has loaded one provider module.
 //
 // The two are joined by a control socket. Over it the agent receives its end of each channel; when it closes, however
-// the server ended, the agent ends too. A thread waits for the process, so that it never stays a zombie and its cause
-// of death is known.
+// the server ended, the agent ends too. A thread waits for the process, so that no zombie stays and the cause of its
+// end is known.
 //
 // Thread: any.
 class AgentProcess
@@ -29,22 +29,23 @@ class AgentProcess
 
     // Starts the process. Throws: std::system_error.
     AgentProcess(const std::string& module, const Options& options);
-    // Closes the control socket, gives the process a moment, then kills it.
+    // Closes the control socket, and kills the process when it has not ended after a grace period.
     ~AgentProcess();
     AgentProcess(const AgentProcess&) = delete;
     AgentProcess& operator=(const AgentProcess&) = delete;
 
-    // An idle channel, or a new one. Throws: AgentGone; std::system_error without descriptors.
+    // Returns: an idle channel, or a new one. Throws: AgentGone; std::system_error without descriptors.
     std::unique_ptr<AgentChannel> takeChannel();
     void giveBack(std::unique_ptr<AgentChannel> channel);
 
-    // Lets the agent end in good order: it sees the end of its control socket.
+    // Asks the agent to end: it sees the end of its control socket.
     void close() noexcept;
     void kill() noexcept;
     bool isRunning() const;
     // Returns: false if it still runs at the deadline.
-    bool waitForEnd(Deadline deadline) const;
-    // How it ended, for people: "killed by signal 11 (Segmentation fault)", "exit status 3". Empty while it runs.
+    bool waitForEnd(const base::Deadline& deadline) const;
+    // Returns: how it ended, human-readable: "killed by signal 11 (Segmentation fault)", "exit status 3". Empty while
+    // it runs.
     std::string causeOfDeath() const;
 
     pid_t pid() const { return fPid; }
@@ -53,7 +54,7 @@ class AgentProcess
     void watch();
 
     std::string fModule;
-    Descriptor fControl;
+    base::Descriptor fControl;
     pid_t fPid = -1;
     mutable std::mutex fMutex;
     mutable std::condition_variable fChanged;

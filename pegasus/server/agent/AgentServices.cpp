@@ -86,8 +86,8 @@ CIMObjectPath AgentServices::createInstance(const CIMNamespaceName& nameSpace, c
 
 void AgentServices::log(Severity severity, const std::string& text) noexcept
 try {
-    static_assert(static_cast<int>(Severity::kDebug) == static_cast<int>(server::Severity::kDebug));
-    Log::write(static_cast<server::Severity>(severity), "provider module \"" + fModule + "\": " + text);
+    static_assert(static_cast<int>(Severity::kDebug) == static_cast<int>(LogLevel::kDebug));
+    Log::write(static_cast<LogLevel>(severity), "provider module \"" + fModule + "\": " + text);
 } catch (...) { // out of memory
 }
 

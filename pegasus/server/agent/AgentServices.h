@@ -12,6 +12,9 @@ namespace Pegasus::server {
 
 // Upcalls of an agent's providers: requests of an ordinary client to the server's local socket, on as many connections
 // as calls run at once.
+//
+// Throws: CIMException with the operation's status; another Pegasus::Exception when the server cannot be reached.
+// Thread: any. Blocks: kUpcallTimeoutMs at most.
 class AgentServices : public cmpi::BrokerServices
 {
   public:
@@ -29,7 +32,7 @@ class AgentServices : public cmpi::BrokerServices
     void log(Severity severity, const std::string& text) noexcept override;
 
   private:
-    // Runs a call on a client of its own; a client whose call failed without a CIM status is dropped.
+    // Runs a call on a client of its own. A client whose call failed without a CIM status is dropped.
     template <typename Call> auto withClient(const Call& call);
     std::unique_ptr<CIMClient> takeClient();
     void giveBack(std::unique_ptr<CIMClient> client);

@@ -7,14 +7,55 @@
 #include <cerrno>
 
 #include <poll.h>
+#include <sys/socket.h>
 
 namespace Pegasus::server {
 
 namespace {
 
 constexpr int kRetryMs = 200; // out of descriptors, or refused connections to close
+constexpr std::chrono::seconds kRefusalLogInterval{1};
 
 } // namespace
+
+void RefusedConnections::refuse(base::Descriptor connection)
+{
+    static const char kAnswer[] = "HTTP/1.1 503 Service Unavailable\r\nPGErrorDetail: "
+                                  "maxConnections%20are%20being%20served%20already.\r\n"
+                                  "Content-Length: 0\r\nConnection: close\r\n\r\n";
+    if (::send(connection.get(), kAnswer, sizeof kAnswer - 1, MSG_DONTWAIT | MSG_NOSIGNAL) < 0) {
+        return;
+    }
+    ::shutdown(connection.get(), SHUT_WR);
+    if (fWaiting.size() == kMaxCount) {
+        fWaiting.pop_front();
+    }
+    fWaiting.push_back({std::move(connection), base::Deadline::after(kMoment)});
+}
+
+void RefusedConnections::expire()
+{
+    while (!fWaiting.empty() && fWaiting.front().deadline.hasPassed()) {
+        fWaiting.pop_front();
+    }
+}
+
+void RefusalLog::note(std::optional<uid_t> user)
+{
+    const auto now = base::Deadline::Clock::now();
+    if (now < fNext) {
+        ++fUnreported;
+        return;
+    }
+    fNext = now + kRefusalLogInterval;
+    std::string line = user ? "Refused a connection of user " + std::to_string(*user) + "."
+                            : "Refused a connection: the kernel does not say whose it is.";
+    if (fUnreported > 0) {
+        line += " Others refused since the last such line: " + std::to_string(fUnreported) + ".";
+    }
+    fUnreported = 0;
+    Log::write(LogLevel::kWarning, line);
+}
 
 // Returns: false when it is time to stop. `ready` says which sources have a connection.
 bool Acceptor::waitForWork(std::vector<bool>& ready)
@@ -40,14 +81,13 @@ bool Acceptor::waitForWork(std::vector<bool>& ready)
 bool Acceptor::accept(Source& source)
 {
     bool exhausted = false;
-    Descriptor connection = acceptConnection(source.listener, exhausted);
+    base::Descriptor connection = acceptConnection(source.listener, exhausted);
     if (!connection) {
         return !exhausted;
     }
     const std::optional<uid_t> user = source.peerUser(connection.get());
     if (!mayConnect(user)) {
-        Log::write(Severity::kWarning, user ? "Refused a connection of user " + std::to_string(*user) + "."
-                                            : "Refused a connection: the kernel does not say whose it is.");
+        fRefusalLog.note(user);
         return true;
     }
     if (!source.group->serve(connection, fMaxConnections())) {

@@ -1,5 +1,7 @@
 #include "pegasus/server/net/AnswerStream.h"
 
+#include "pegasus/base/PercentCoding.h"
+
 #include <cstdio>
 
 namespace Pegasus::server {
@@ -17,7 +19,7 @@ std::string trailerOf(const CimStatus& status)
         return {};
     }
     return "CIMStatusCode: " + std::to_string(status.code) +
-           "\r\nCIMStatusCodeDescription: " + percentEncode(status.text) + "\r\n";
+           "\r\nCIMStatusCodeDescription: " + base::percentEncoded(status.text, base::PercentSet::kUnreserved) + "\r\n";
 }
 
 } // namespace
@@ -62,7 +64,7 @@ void AnswerStream::write(std::string_view bytes)
     }
 }
 
-// Sends what is pending and `more` as one chunk, and `ending` behind it.
+// Sends what is pending and `more` as one chunk, then `ending`.
 void AnswerStream::sendChunk(std::string_view more, std::string_view ending)
 {
     const std::string head = fStarted ? std::string() : makeHead(0);
@@ -76,7 +78,7 @@ void AnswerStream::sendChunk(std::string_view more, std::string_view ending)
                      part(more),
                      part(size == 0 ? "" : "\r\n"),
                      part(ending)};
-    fStream.writeAll(parts, std::size(parts), fOptions.writePatience);
+    fStream.writeAll(parts, std::size(parts), fOptions.writeTimeout);
     fPending.clear();
 }
 
@@ -85,7 +87,7 @@ void AnswerStream::sendWhole()
     const std::string head = makeHead(fPending.size());
     fStarted = true;
     iovec parts[] = {part(head), part(fPending)};
-    fStream.writeAll(parts, std::size(parts), fOptions.writePatience);
+    fStream.writeAll(parts, std::size(parts), fOptions.writeTimeout);
     fPending.clear();
 }
 
@@ -98,18 +100,18 @@ void AnswerStream::finish(const CimStatus& status)
     }
 }
 
-void sendHttpError(SocketStream& stream, const HttpError& error, std::chrono::milliseconds patience)
+void sendHttpError(SocketStream& stream, const HttpError& error, std::chrono::milliseconds timeout)
 {
     std::string head = "HTTP/1.1 " + std::to_string(error.status()) + " " + httpReason(error.status()) + "\r\n";
     if (!error.cimError().empty()) {
         head += "CIMError: " + error.cimError() + "\r\n";
     }
     if (!error.detail().empty()) {
-        head += "PGErrorDetail: " + percentEncode(error.detail()) + "\r\n";
+        head += "PGErrorDetail: " + base::percentEncoded(error.detail(), base::PercentSet::kUnreserved) + "\r\n";
     }
     head += error.closes() ? "Content-Length: 0\r\nConnection: close\r\n\r\n" : "Content-Length: 0\r\n\r\n";
     iovec whole = part(head);
-    stream.writeAll(&whole, 1, patience);
+    stream.writeAll(&whole, 1, timeout);
 }
 
 } // namespace Pegasus::server

@@ -8,14 +8,14 @@
 
 namespace Pegasus::server {
 
-// A CIM status with its text, symbolic name in front ("CIM_ERR_NOT_FOUND: Nope").
+// The outcome of an operation. The text begins with the code's symbolic name: "CIM_ERR_NOT_FOUND: Nope".
 struct CimStatus
 {
     unsigned code = 0; // 0 is success
     std::string text;
 };
 
-// An answer grew past what may be kept in memory for a client that needs its length first.
+// An answer is larger than what is kept in memory for a client that needs its length first.
 class AnswerTooLarge : public std::runtime_error
 {
   public:
@@ -24,8 +24,11 @@ class AnswerTooLarge : public std::runtime_error
 
 // The body of one "200 OK" answer, streamed to the peer.
 //
-// Chunked, it goes out in blocks of about kChunkBytes as it is written; a status can follow in the trailer. With a
-// length, it is kept until finish() and a status has to be part of the body.
+// Chunked, it is sent in blocks of about kChunkBytes as it is written; a status can follow in the trailer. With a
+// length, it is kept until finish(), and a status has to be part of the body.
+//
+// Throws: SocketTimeout; std::system_error when the connection breaks.
+// Thread: one at a time.
 class AnswerStream
 {
   public:
@@ -41,22 +44,23 @@ class AnswerStream
     {
         Framing framing = Framing::kChunkedWithTrailer;
         std::size_t maxBufferedBytes = 256u << 20; // of an answer with a length
-        std::chrono::milliseconds writePatience = std::chrono::seconds(20);
-        bool closes = false; // the connection ends behind the answer
-        std::string extensionPrefix;
+        std::chrono::milliseconds writeTimeout = std::chrono::seconds(20);
+        bool closes = false;         // whether the connection ends after the answer
+        std::string extensionPrefix; // of an M-POST: HttpRequest::extensionPrefix
         const char* operation = "MethodResponse";
     };
 
     AnswerStream(SocketStream& stream, Options options);
 
-    // Throws: SocketTimeout, std::system_error, AnswerTooLarge.
+    // Throws: AnswerTooLarge.
     void write(std::string_view bytes);
-    // Ends the answer. Requires: no status other than success with a length.
+    // Ends the answer. Requires: with a length, the status is success.
     void finish(const CimStatus& status = {});
 
     bool isChunked() const { return fOptions.framing == Framing::kChunkedWithTrailer; }
-    // Whether bytes have left already; until then discard() takes back what was written.
+    // Whether bytes have been sent already.
     bool hasStarted() const { return fStarted; }
+    // Takes back what has been written and not been sent.
     void discard() { fPending.clear(); }
 
   private:
@@ -70,7 +74,7 @@ class AnswerStream
     bool fStarted = false;
 };
 
-// Sends an HTTP error with an empty body.
-void sendHttpError(SocketStream& stream, const HttpError& error, std::chrono::milliseconds patience);
+// Sends an HTTP error with an empty body. Throws: SocketTimeout; std::system_error when the connection breaks.
+void sendHttpError(SocketStream& stream, const HttpError& error, std::chrono::milliseconds timeout);
 
 } // namespace Pegasus::server

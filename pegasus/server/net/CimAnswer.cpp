@@ -1,5 +1,6 @@
 #include "pegasus/server/net/CimAnswer.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/wire/ElementEncoder.h"
 
 namespace Pegasus::server {
@@ -31,7 +32,7 @@ CimStatus makeStatus(CIMStatusCode code, const std::string& text)
 CimStatus statusOf(const CIMException& error)
 {
     const CIMStatusCode code = error.getCode() == CIM_ERR_SUCCESS ? CIM_ERR_FAILED : error.getCode();
-    return makeStatus(code, std::string(error.getMessage().getCString()));
+    return makeStatus(code, base::utf8(error.getMessage()));
 }
 
 CimAnswer::CimAnswer(AnswerStream& stream, const CimRequest& request, Envelope envelope)
@@ -99,7 +100,7 @@ void CimAnswer::finish()
 void CimAnswer::fail(const CimStatus& status, ErrorPlace place)
 {
     const bool inTrailer = fStream.isChunked() && place != ErrorPlace::kBody;
-    const bool keeps = inTrailer && place == ErrorPlace::kBehindElements;
+    const bool keeps = inTrailer && place == ErrorPlace::kAfterElements;
     if (!fStream.hasStarted() && !keeps) {
         fStream.discard();
         fOpen = fReturnValueOpen = false;

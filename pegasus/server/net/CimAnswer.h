@@ -11,17 +11,21 @@
 
 namespace Pegasus::server {
 
-// What operations write to: whole elements, children of IRETURNVALUE or of METHODRESPONSE.
+// What operations write to.
 class ElementSink
 {
   public:
     virtual ~ElementSink() = default;
-    // Throws: whatever ends the request, such as a client that has gone.
+    // Whole elements, children of IRETURNVALUE or of METHODRESPONSE.
+    // Throws: whatever ends the request, such as SocketTimeout.
     virtual void write(std::string_view elements) = 0;
 };
 
 // The response message (DSP0201, SIMPLERSP) to one request, streamed: the envelope is written around what operations
-// write, and an error goes where the client looks for it.
+// write, and an error is put where the client looks for it.
+//
+// Throws: what AnswerStream throws.
+// Thread: one at a time.
 class CimAnswer : public ElementSink
 {
   public:
@@ -31,19 +35,21 @@ class CimAnswer : public ElementSink
         kBare     // the elements alone: an agent's answer, which the server wraps
     };
 
+    // Requires: stream and request outlive this.
     CimAnswer(AnswerStream& stream, const CimRequest& request, Envelope envelope);
 
     void write(std::string_view elements) override;
 
-    // Ends a good answer.
+    // Ends the answer of an operation that succeeded.
     void finish();
     enum class ErrorPlace
     {
-        kTrailer,        // behind nothing: what was written is taken back if none of it has left yet
-        kBehindElements, // in the trailer, behind what was written
-        kBody            // an ERROR element in the message, although the client could read a trailer
+        kTrailer,       // in the trailer; what was written is taken back if none of it has been sent yet
+        kAfterElements, // in the trailer; what was written stays
+        kBody           // an ERROR element in the message, also when the client reads trailers
     };
-    // Ends the answer with an error. A client that reads no trailer finds it in the body, and nothing else.
+    // Ends the answer with an error. For a client that does not read trailers it is an ERROR element, in place of what
+    // was written.
     void fail(const CimStatus& status, ErrorPlace place = ErrorPlace::kTrailer);
 
   private:
@@ -58,7 +64,8 @@ class CimAnswer : public ElementSink
     bool fReturnValueOpen = false;
 };
 
-// An operation failed with a status whose text is complete already: an agent's. What other agents gave may stay.
+// An operation failed with a status whose text is complete: an agent's. `place` says whether what other agents gave
+// stays.
 class OperationFailed : public std::runtime_error
 {
   public:
@@ -74,7 +81,8 @@ class OperationFailed : public std::runtime_error
     CimAnswer::ErrorPlace fPlace;
 };
 
-// The status that clients see: the symbolic name before the text.
+// The status that clients see: the symbolic name before the text. Success, as the code of an error, becomes
+// CIM_ERR_FAILED.
 CimStatus statusOf(const CIMException& error);
 CimStatus makeStatus(CIMStatusCode code, const std::string& text);
 

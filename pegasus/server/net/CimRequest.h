@@ -9,9 +9,11 @@
 
 namespace Pegasus::server {
 
-// The parameters of an intrinsic method, taken from the message when an operation asks for them.
-// Every getter throws wire::XmlError when the parameter does not have the form that it asks for; required ones also
-// when it is absent, with the place of the call.
+// The parameters of an intrinsic method, decoded from the message when an operation asks for them.
+//
+// Throws: wire::XmlError when a parameter does not have the form that is asked for; with the place of the call when a
+// required one is absent.
+// Thread: one at a time.
 class IntrinsicParameters
 {
   public:

@@ -8,20 +8,20 @@
 
 namespace Pegasus::server {
 
-bool ConnectionGroup::serve(Descriptor& socket, std::size_t most)
+bool ConnectionGroup::serve(base::Descriptor& socket, std::size_t most)
 {
     const std::lock_guard<std::mutex> lock(fMutex);
     if (fStreams.size() >= most || fEnding) {
         return false;
     }
-    auto stream = std::make_unique<SocketStream>(Descriptor());
+    auto stream = std::make_unique<SocketStream>(base::Descriptor());
     const auto entry = fStreams.insert(stream.get()).first;
     try {
         // The thread waits for the lock before it looks at the stream.
         std::thread([this, raw = stream.get()] { run(*raw); }).detach();
     } catch (const std::exception& error) {
         fStreams.erase(entry);
-        Log::write(Severity::kError, std::string("cannot start a thread for a connection: ") + error.what());
+        Log::write(LogLevel::kError, std::string("cannot start a thread for a connection: ") + error.what());
         return false;
     }
     *stream.release() = SocketStream(std::move(socket));
@@ -57,10 +57,10 @@ void ConnectionGroup::breakAll()
     }
 }
 
-bool ConnectionGroup::waitForEnd(Deadline deadline)
+bool ConnectionGroup::waitForEnd(const base::Deadline& deadline)
 {
     std::unique_lock<std::mutex> lock(fMutex);
-    return fChanged.wait_until(lock, deadline, [&] { return fStreams.empty(); });
+    return fChanged.wait_until(lock, deadline.time(), [&] { return fStreams.empty(); });
 }
 
 } // namespace Pegasus::server

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "pegasus/server/net/Connection.h"
+#include "pegasus/server/net/RequestLoop.h"
 
 #include <condition_variable>
 #include <mutex>
@@ -8,31 +8,33 @@
 
 namespace Pegasus::server {
 
-// The connections that came over one listener, each with a thread of its own.
+// The connections that came over one listener, each with a thread of its own. The threads are detached: waitForEnd()
+// says when the last one is done with the group.
 //
 // Thread: any.
 class ConnectionGroup
 {
   public:
+    // Requires: the handler outlives this.
     ConnectionGroup(RequestHandler& handler, std::function<ConnectionSettings()> settings)
         : fHandler(handler), fSettings(std::move(settings))
     {
     }
-    // Requires: every connection has ended.
+    // Requires: waitForEnd() has returned true.
     ~ConnectionGroup() = default;
     ConnectionGroup(const ConnectionGroup&) = delete;
     ConnectionGroup& operator=(const ConnectionGroup&) = delete;
 
-    // Serves a connection. Returns: false if `most` are being served already, or no thread can be had; `socket` is the
-    // caller's then.
-    bool serve(Descriptor& socket, std::size_t most);
+    // Serves a connection. Returns: false if `most` are being served already, or no thread can be started.
+    // Ownership: `socket` passes to the group only when the connection is served.
+    bool serve(base::Descriptor& socket, std::size_t most);
 
-    // Lets no connection read a further request; answers that are under way go out.
+    // Ends reading on every connection: running requests are answered, no further ones are read.
     void endReading();
     // Breaks every connection.
     void breakAll();
-    // Returns: false if some are left at the deadline.
-    bool waitForEnd(Deadline deadline);
+    // Returns: false if some are left at the deadline. Blocks: until then.
+    bool waitForEnd(const base::Deadline& deadline);
 
   private:
     void run(SocketStream& stream);

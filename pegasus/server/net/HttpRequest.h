@@ -3,6 +3,7 @@
 #include <cstddef>
 #include <stdexcept>
 #include <string>
+#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -25,16 +26,16 @@ struct HttpRequest
     std::string extensionPrefix; // "NN-" of an M-POST, for the answer's headers
 
     // Returns: null if absent.
-    const std::string* header(const char* name) const;
-    // Whether a comma-separated header holds a word, whatever its parameters.
-    bool headerHas(const char* name, const char* word) const;
+    const std::string* header(std::string_view name) const;
+    // Returns: whether a comma-separated header holds a word, whatever its parameters.
+    bool headerHas(std::string_view name, std::string_view word) const;
 };
 
-// A request that gets an HTTP error instead of an answer.
+// A request that is answered with an HTTP error.
 class HttpError : public std::runtime_error
 {
   public:
-    // Whether the stream is still in step behind this request.
+    // Whether the next request can be found on the connection.
     enum class After
     {
         kKeepOpen,
@@ -58,10 +59,5 @@ class HttpError : public std::runtime_error
 
 // Returns: "Not Found" for 404.
 const char* httpReason(unsigned status);
-
-// Percent-encoding of header values (RFC 3986 unreserved characters stay).
-std::string percentEncode(const std::string& text);
-// Ill-formed escapes stay as they are.
-std::string percentDecode(const std::string& text);
 
 } // namespace Pegasus::server

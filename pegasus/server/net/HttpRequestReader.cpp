@@ -83,7 +83,7 @@ std::size_t HttpRequestParser::parse(std::string_view bytes)
     return taken;
 }
 
-// The head is parsed by itself and counted: Beast's own limit starts anew with every piece in which a head arrives.
+// The head is parsed by itself and counted: Beast's own limit starts again with every piece in which a head arrives.
 std::size_t HttpRequestParser::putHead(std::string_view bytes)
 {
     const std::size_t taken = parse(bytes);
@@ -157,7 +157,7 @@ HttpRequest HttpRequestParser::take()
     return request;
 }
 
-bool HttpRequestReader::fill(Deadline deadline)
+bool HttpRequestReader::fill(const base::Deadline& deadline)
 {
     if (fBegin > 0) {
         std::memmove(fBuffer.data(), fBuffer.data() + fBegin, fEnd - fBegin);
@@ -175,7 +175,7 @@ bool HttpRequestReader::fill(Deadline deadline)
 // Returns: false if there will be none.
 bool HttpRequestReader::waitForRequest(const ReadTimes& times)
 try {
-    return fBegin < fEnd || fill(deadlineAfter(times.idle));
+    return fBegin < fEnd || fill(base::Deadline::afterOrNever(times.idle));
 } catch (const SocketTimeout&) {
     return false;
 }
@@ -185,7 +185,7 @@ try {
     if (!waitForRequest(times)) {
         return false;
     }
-    const Deadline deadline = deadlineAfter(times.request);
+    const base::Deadline deadline = base::Deadline::afterOrNever(times.request);
     HttpRequestParser parser(limits);
     bool continued = false;
     for (;;) {

@@ -9,14 +9,15 @@
 
 namespace Pegasus::server {
 
-// How long a client may take.
+// How long a client may take; 0 is no bound.
 struct ReadTimes
 {
-    std::chrono::milliseconds idle = std::chrono::milliseconds::zero(); // before the first byte; zero: for ever
+    std::chrono::milliseconds idle = std::chrono::milliseconds::zero(); // before the first byte
     std::chrono::milliseconds request = std::chrono::seconds(30);       // from the first byte to the last
 };
 
-// Takes requests apart as bytes arrive. Bytes behind a request are kept for the next.
+// Takes one request apart as its bytes arrive, split anywhere.
+// Thread: one at a time.
 class HttpRequestParser
 {
   public:
@@ -30,7 +31,7 @@ class HttpRequestParser
 
     bool isHeaderDone() const;
     bool isDone() const;
-    // Whether the client waits for "100 Continue" before it sends the body.
+    // Returns: whether the client waits for "100 Continue" before it sends the body. Requires: isHeaderDone().
     bool expectsContinue() const;
 
     // Requires: isDone(). The parser is spent afterwards.
@@ -45,19 +46,22 @@ class HttpRequestParser
     std::unique_ptr<Impl> fImpl;
 };
 
-// Reads one request after the other from a connection.
+// Reads one request after the other from a connection. Bytes after a request are kept for the next.
+// Thread: one at a time.
 class HttpRequestReader
 {
   public:
+    // Requires: the stream outlives this.
     explicit HttpRequestReader(SocketStream& stream) : fStream(stream) {}
 
     // Returns: false when the peer has closed, or stayed silent for the idle time, between two requests.
     // Throws: HttpError, 408 among them; std::system_error when the connection breaks.
+    // Blocks: as long as `times` allow.
     bool read(HttpRequest& request, const HttpLimits& limits, const ReadTimes& times);
 
   private:
     bool waitForRequest(const ReadTimes& times);
-    bool fill(Deadline deadline);
+    bool fill(const base::Deadline& deadline);
 
     SocketStream& fStream;
     std::vector<char> fBuffer;

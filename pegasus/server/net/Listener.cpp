@@ -16,7 +16,7 @@ namespace Pegasus::server {
 
 namespace {
 
-constexpr int kBacklog = 128;
+constexpr int kBacklog = 4096; // the kernel cuts it down to net.core.somaxconn
 
 [[noreturn]] void failToBind(std::uint16_t port)
 {
@@ -27,9 +27,9 @@ constexpr int kBacklog = 128;
 
 } // namespace
 
-Descriptor listenOnLoopback(std::uint16_t port)
+base::Descriptor listenOnLoopback(std::uint16_t port)
 {
-    Descriptor listener(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0));
+    base::Descriptor listener(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0));
     if (!listener) {
         failToBind(port);
     }
@@ -47,16 +47,16 @@ Descriptor listenOnLoopback(std::uint16_t port)
     return listener;
 }
 
-Descriptor listenLocally(const std::string& home)
+base::Descriptor listenLocally(const std::string& home)
 {
-    Descriptor listener = base::listenLocalSocket(home, kBacklog);
+    base::Descriptor listener = base::listenLocalSocket(home, kBacklog);
     ::fcntl(listener.get(), F_SETFL, ::fcntl(listener.get(), F_GETFL) | O_NONBLOCK);
     return listener;
 }
 
-Descriptor acceptConnection(const Descriptor& listener, bool& exhausted)
+base::Descriptor acceptConnection(const base::Descriptor& listener, bool& exhausted)
 {
-    Descriptor connection(::accept4(listener.get(), nullptr, nullptr, SOCK_CLOEXEC));
+    base::Descriptor connection(::accept4(listener.get(), nullptr, nullptr, SOCK_CLOEXEC));
     exhausted = !connection && (errno == EMFILE || errno == ENFILE || errno == ENOBUFS || errno == ENOMEM);
     if (connection) {
         const int yes = 1;

@@ -9,13 +9,13 @@ namespace Pegasus::server {
 
 // Returns: a non-blocking socket that listens on 127.0.0.1 and nowhere else.
 // Throws: std::runtime_error "Bind failed: Failed to bind socket on port N: <reason> (error code E)."
-Descriptor listenOnLoopback(std::uint16_t port);
+base::Descriptor listenOnLoopback(std::uint16_t port);
 
 // Returns: a non-blocking socket that listens at <home>/cimxml.socket, mode 0600. Throws: std::system_error.
-Descriptor listenLocally(const std::string& home);
+base::Descriptor listenLocally(const std::string& home);
 
-// Returns: the next connection; none if there is none just now, or it broke already.
-// Sets `exhausted` when there are no descriptors left for it.
-Descriptor acceptConnection(const Descriptor& listener, bool& exhausted);
+// Returns: the next connection; an empty descriptor when none waits, or it broke already. Sets `exhausted` when the
+// process has no descriptors left for it.
+base::Descriptor acceptConnection(const base::Descriptor& listener, bool& exhausted);
 
 } // namespace Pegasus::server

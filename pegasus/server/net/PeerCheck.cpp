@@ -109,9 +109,9 @@ std::optional<uid_t> readDiagAnswer(const char* data, std::size_t size, const Ad
     return message.idiag_uid;
 }
 
-Descriptor openNetlink()
+base::Descriptor openNetlink()
 {
-    Descriptor netlink(::socket(AF_NETLINK, SOCK_RAW | SOCK_CLOEXEC, NETLINK_SOCK_DIAG));
+    base::Descriptor netlink(::socket(AF_NETLINK, SOCK_RAW | SOCK_CLOEXEC, NETLINK_SOCK_DIAG));
     if (netlink) {
         const timeval timeout = {1, 0};
         ::setsockopt(netlink.get(), SOL_SOCKET, SO_RCVTIMEO, &timeout, sizeof timeout);
@@ -121,7 +121,7 @@ Descriptor openNetlink()
 
 // Reads the answer to one request; answers to earlier ones, which came too late, are dropped.
 // Returns: its size; 0 when there is none.
-std::size_t receiveAnswer(const Descriptor& netlink, std::uint32_t sequence, char* answer, std::size_t capacity)
+std::size_t receiveAnswer(const base::Descriptor& netlink, std::uint32_t sequence, char* answer, std::size_t capacity)
 {
     for (;;) {
         const ssize_t size = ::recv(netlink.get(), answer, capacity, 0);

@@ -41,7 +41,7 @@ class TcpPeerLookup
     Answer askKernel(int fd);
 
     std::string fTable;
-    Descriptor fNetlink; // kept open between look-ups
+    base::Descriptor fNetlink; // kept open between look-ups
     std::uint32_t fSequence = 0;
 };
 

@@ -1,8 +1,9 @@
 #include "pegasus/server/net/RequestDecoder.h"
 
-#include "pegasus/server/net/Utf8Check.h"
-
-#include <strings.h>
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/PercentCoding.h"
+#include "pegasus/base/Text.h"
+#include "pegasus/wire/ContentType.h"
 
 namespace Pegasus::server {
 
@@ -30,20 +31,13 @@ const std::string& requireHeader(const HttpRequest& http, const char* name)
     return *value;
 }
 
-// application/xml or text/xml, in UTF-8.
 void checkContentType(const HttpRequest& http)
 {
     const std::string* value = http.header("Content-Type");
     if (value == nullptr) {
         refuse("header-mismatch", "Missing Content-Type HTTP header.");
     }
-    std::string plain;
-    for (const char c : *value) {
-        if (c != '"' && c != ' ' && c != '\t') {
-            plain += static_cast<char>(::tolower(static_cast<unsigned char>(c)));
-        }
-    }
-    if (plain != "application/xml;charset=utf-8" && plain != "text/xml;charset=utf-8") {
+    if (!wire::isXmlInUtf8(*value)) {
         refuse("header-mismatch", "Content-Type value \"" + *value + "\" is not supported.");
     }
 }
@@ -60,7 +54,7 @@ void checkHeaders(const HttpRequest& http)
     if (operation == nullptr) {
         refuse("", "");
     }
-    if (::strcasecmp(operation->c_str(), "MethodCall") != 0) {
+    if (!base::equalNoCase(*operation, "MethodCall")) {
         refuse("unsupported-operation", "CIMOperation value \"" + *operation + "\" is not supported.");
     }
     checkContentType(http);
@@ -102,13 +96,13 @@ std::string requestObject(const CimRequest& request)
         text.append(String(":"));
         text.append(request.object.toString());
     }
-    return std::string(text.getCString());
+    return base::utf8(text);
 }
 
 // Texts that name the same object: alike but for case, or paths that are equal.
 bool namesObject(const std::string& header, const CimRequest& request)
 {
-    if (::strcasecmp(header.c_str(), requestObject(request).c_str()) == 0) {
+    if (base::equalNoCase(header, requestObject(request))) {
         return true;
     }
     try {
@@ -125,12 +119,12 @@ bool namesObject(const std::string& header, const CimRequest& request)
 
 void checkMatch(const HttpRequest& http, const CimRequest& request)
 {
-    const std::string method = percentDecode(*http.header("CIMMethod"));
-    if (::strcasecmp(method.c_str(), request.method.c_str()) != 0) {
+    const std::string method = base::percentDecoded(*http.header("CIMMethod"));
+    if (!base::equalNoCase(method, request.method)) {
         refuse("header-mismatch",
                "CIMMethod value \"" + method + "\" does not match CIM request method \"" + request.method + "\".");
     }
-    const std::string object = percentDecode(*http.header("CIMObject"));
+    const std::string object = base::percentDecoded(*http.header("CIMObject"));
     if (!namesObject(object, request)) {
         refuse("header-mismatch", "CIMObject value \"" + object + "\" does not match CIM request object \"" +
                                       requestObject(request) + "\".");
@@ -149,7 +143,7 @@ std::string requiredAttribute(XmlElement element, std::string_view value, const 
 
 void failFor(const XmlError& error)
 {
-    const std::string detail(error.getMessage().getCString());
+    const std::string detail = base::utf8(error.getMessage());
     switch (error.kind()) {
     case XmlError::Kind::NotWellFormed:
         refuse("request-not-well-formed", detail);
@@ -166,7 +160,7 @@ CimRequest RequestDecoder::decode(const HttpRequest& http)
     if (fText.capacity() > kKeptTextBytes) {
         fText = std::string();
     }
-    if (!isUtf8(http.body)) {
+    if (!base::isUtf8(http.body)) {
         refuse("request-not-valid", "Invalid UTF-8 character detected.");
     }
     fText.assign(http.body); // the parser works in place, and an agent may get the body as it came
@@ -181,8 +175,8 @@ CimRequest RequestDecoder::decode(const HttpRequest& http)
         return request;
     } catch (const XmlError& error) {
         failFor(error);
-    } catch (const Exception& error) { // a name or a path that is none
-        refuse("request-not-valid", std::string(error.getMessage().getCString()));
+    } catch (const Exception& error) { // an invalid name or path
+        refuse("request-not-valid", base::utf8(error.getMessage()));
     }
 }
 

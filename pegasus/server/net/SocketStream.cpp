@@ -1,6 +1,5 @@
 #include "pegasus/server/net/SocketStream.h"
 
-#include <algorithm>
 #include <cerrno>
 #include <system_error>
 
@@ -11,28 +10,19 @@ namespace Pegasus::server {
 
 namespace {
 
-int millisecondsUntil(Deadline deadline)
-{
-    if (deadline == kNoDeadline) {
-        return -1;
-    }
-    const auto left = std::chrono::ceil<std::chrono::milliseconds>(deadline - Clock::now()).count();
-    return static_cast<int>(std::clamp<long long>(left, 0, 3'600'000));
-}
-
 // Returns: false at the deadline.
-bool waitFor(int fd, short events, Deadline deadline)
+bool waitFor(int fd, short events, const base::Deadline& deadline)
 {
     for (;;) {
         pollfd wait = {fd, events, 0};
-        const int ready = ::poll(&wait, 1, millisecondsUntil(deadline));
+        const int ready = ::poll(&wait, 1, deadline.pollTimeoutMs());
         if (ready > 0) {
             return true;
         }
         if (ready < 0 && errno != EINTR) {
             throw std::system_error(errno, std::generic_category(), "cannot wait for the connection");
         }
-        if (deadline != kNoDeadline && Clock::now() >= deadline) {
+        if (deadline.hasPassed()) {
             return false;
         }
     }
@@ -59,12 +49,7 @@ void advance(iovec*& parts, std::size_t& count, std::size_t sent)
 
 } // namespace
 
-bool SocketStream::waitReadable(Deadline deadline)
-{
-    return waitFor(fSocket.get(), POLLIN, deadline);
-}
-
-std::size_t SocketStream::readSome(char* data, std::size_t size, Deadline deadline)
+std::size_t SocketStream::readSome(char* data, std::size_t size, const base::Deadline& deadline)
 {
     for (;;) {
         const ssize_t n = ::recv(fSocket.get(), data, size, MSG_DONTWAIT);
@@ -81,7 +66,7 @@ std::size_t SocketStream::readSome(char* data, std::size_t size, Deadline deadli
     }
 }
 
-void SocketStream::writeAll(iovec* parts, std::size_t count, std::chrono::milliseconds patience)
+void SocketStream::writeAll(iovec* parts, std::size_t count, std::chrono::milliseconds timeout)
 {
     advance(parts, count, 0);
     while (count > 0) {
@@ -92,7 +77,7 @@ void SocketStream::writeAll(iovec* parts, std::size_t count, std::chrono::millis
         if (n >= 0) {
             advance(parts, count, static_cast<std::size_t>(n));
         } else if (errno == EAGAIN) {
-            if (!waitFor(fSocket.get(), POLLOUT, deadlineAfter(patience))) {
+            if (!waitFor(fSocket.get(), POLLOUT, base::Deadline::afterOrNever(timeout))) {
                 throw SocketTimeout("the peer takes nothing");
             }
         } else if (errno != EINTR) {
@@ -111,12 +96,12 @@ void SocketStream::shutDownReading() noexcept
     ::shutdown(fSocket.get(), SHUT_RD);
 }
 
-void SocketStream::lingeringClose(std::chrono::milliseconds patience) noexcept
+void SocketStream::lingeringClose(std::chrono::milliseconds timeout) noexcept
 try {
     ::shutdown(fSocket.get(), SHUT_WR);
-    const Deadline deadline = deadlineAfter(patience);
+    const base::Deadline deadline = base::Deadline::after(timeout);
     char scrap[4096];
-    while (Clock::now() < deadline && readSome(scrap, sizeof scrap, deadline) > 0) {
+    while (!deadline.hasPassed() && readSome(scrap, sizeof scrap, deadline) > 0) {
     }
 } catch (const std::exception&) { // broken or too slow: it is closed either way
 }

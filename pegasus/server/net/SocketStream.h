@@ -1,5 +1,6 @@
 #pragma once
 
+#include "pegasus/base/Deadline.h"
 #include "pegasus/base/Descriptor.h"
 
 #include <chrono>
@@ -10,56 +11,44 @@
 
 namespace Pegasus::server {
 
-using Clock = std::chrono::steady_clock;
-using Deadline = Clock::time_point;
-
-inline constexpr Deadline kNoDeadline = Deadline::max();
-
-// A deadline from now; zero is none.
-inline Deadline deadlineAfter(std::chrono::milliseconds wait)
-{
-    return wait.count() == 0 ? kNoDeadline : Clock::now() + wait;
-}
-
+// The peer did not send, or did not take, anything in time.
 class SocketTimeout : public std::runtime_error
 {
   public:
     using std::runtime_error::runtime_error;
 };
 
-// A connected stream socket with bounded waits.
+// A connected stream socket with bounded waits. It owns the socket.
 //
 // Throws: SocketTimeout; std::system_error when the connection breaks.
-// Thread: one reads and writes; shutDown() may come from any.
+// Thread: one reads and writes; shutDown() and shutDownReading() may come from any.
 class SocketStream
 {
   public:
-    explicit SocketStream(Descriptor socket) : fSocket(std::move(socket)) {}
+    explicit SocketStream(base::Descriptor socket) : fSocket(std::move(socket)) {}
 
-    // Returns: bytes read, at least one; 0 at the end of the stream.
-    std::size_t readSome(char* data, std::size_t size, Deadline deadline);
+    // Returns: the number of bytes read, at least one; 0 at the end of the stream.
+    // Blocks: until the deadline.
+    std::size_t readSome(char* data, std::size_t size, const base::Deadline& deadline);
 
-    // Waits until something can be read (or the stream has ended) or the deadline passes.
-    // Returns: false at the deadline.
-    bool waitReadable(Deadline deadline);
+    // Sends everything. The vectors are changed.
+    // Blocks: for as long as the peer takes something at least every `timeout`; 0 waits without a bound.
+    void writeAll(iovec* parts, std::size_t count, std::chrono::milliseconds timeout);
 
-    // Sends everything. `patience` bounds each wait for the peer to take more; zero is for ever.
-    // The vectors are changed.
-    void writeAll(iovec* parts, std::size_t count, std::chrono::milliseconds patience);
-
-    // Ends both directions, so that whoever waits on the socket returns.
+    // Ends both directions, so that a thread that waits on the socket returns.
     void shutDown() noexcept;
     // Ends reading only: a running answer can still be sent.
     void shutDownReading() noexcept;
 
-    // Closes after our last bytes had a chance to arrive, although the peer still sends: reads and drops until the peer
-    // closes, at most for `patience`.
-    void lingeringClose(std::chrono::milliseconds patience) noexcept;
+    // Lets our last bytes arrive although the peer still sends: ends writing, then reads and drops what comes until the
+    // peer closes. Closing at once would reset the connection and lose them.
+    // Blocks: at most for `timeout`.
+    void lingeringClose(std::chrono::milliseconds timeout) noexcept;
 
     int fd() const { return fSocket.get(); }
 
   private:
-    Descriptor fSocket;
+    base::Descriptor fSocket;
 };
 
 } // namespace Pegasus::server

@@ -1,5 +1,6 @@
 #include "pegasus/server/operations/ConfigService.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/server/admin/Log.h"
 
 #include <system_error>
@@ -71,7 +72,7 @@ std::string keyOf(const CIMObjectPath& path)
     const Array<CIMKeyBinding>& keys = path.getKeyBindings();
     for (Uint32 i = 0; i < keys.size(); ++i) {
         if (keys[i].getName() == CIMName("PropertyName")) {
-            return std::string(keys[i].getValue().getCString());
+            return base::utf8(keys[i].getValue());
         }
     }
     return {};
@@ -81,7 +82,7 @@ void update(Config& config, const CimRequest& request, const std::string& name)
 {
     requireConfigProperty(name); // also when the call asks for no change
     const bool reset = flagArgument(request, "ResetValue");
-    const std::string value(argument(request, "PropertyValue").toString().getCString());
+    const std::string value = base::utf8(argument(request, "PropertyValue").toString());
     const bool current = flagArgument(request, "SetCurrentValue");
     const bool planned = flagArgument(request, "SetPlannedValue");
     if (current) {
@@ -129,7 +130,7 @@ CIMValue invokeConfigMethod(ServerCore& core, const CimRequest& request)
     } catch (const std::system_error& error) {
         fail(CIM_ERR_FAILED, error.what());
     }
-    Log::write(Severity::kInformation, "Configuration property " + name + " is now " + core.config.text(name) + ".");
+    Log::write(LogLevel::kInformation, "Configuration property " + name + " is now " + core.config.text(name) + ".");
     return CIMValue(Boolean(true));
 }
 

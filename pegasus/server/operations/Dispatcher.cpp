@@ -1,10 +1,7 @@
 #include "pegasus/server/operations/Dispatcher.h"
 
-#include "pegasus/server/operations/InstanceOperations.h"
-#include "pegasus/server/operations/MethodOperation.h"
-#include "pegasus/server/operations/SchemaOperations.h"
-
-#include <strings.h>
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/server/operations/Operations.h"
 
 namespace Pegasus::server {
 
@@ -67,11 +64,11 @@ constexpr Entry kOperations[] = {
     {"EnumerationCount", notSupported},
 };
 
-// Returns: null if there is none.
+// Returns: null for an unknown method.
 Operation findOperation(const CimRequest& request)
 {
     for (const Entry& entry : kOperations) {
-        if (::strcasecmp(entry.name, request.method.c_str()) == 0) {
+        if (base::equalNoCase(entry.name, request.method)) {
             return entry.operation;
         }
     }

@@ -1,7 +1,7 @@
-#include "pegasus/server/operations/InstanceOperations.h"
-
+#include "pegasus/base/Text.h"
 #include "pegasus/server/agent/AgentMessages.h"
 #include "pegasus/server/operations/InstanceSources.h"
+#include "pegasus/server/operations/Operations.h"
 #include "pegasus/server/operations/ServerInstances.h"
 #include "pegasus/wire/ElementEncoder.h"
 
@@ -33,7 +33,7 @@ class FirstError
     void rethrow() const
     {
         if (fStatus.code != 0) {
-            throw OperationFailed(fStatus, CimAnswer::ErrorPlace::kBehindElements);
+            throw OperationFailed(fStatus, CimAnswer::ErrorPlace::kAfterElements);
         }
     }
 
@@ -74,7 +74,7 @@ void getInstance(ServerCore& core, const HttpRequest& http, const CimRequest& re
     if (const auto provider = core.registry.find(request.nameSpace, path.getClassName(), ProviderType::kInstance)) {
         AgentRequest passed;
         passed.method = request.method;
-        passed.object = std::string(request.nameSpace.getString().getCString());
+        passed.object = base::utf8(request.nameSpace);
         passed.body = http.body;
         failUnlessGood(core.agents.request(*provider, passed, answer));
         return;

@@ -7,19 +7,22 @@
 
 namespace Pegasus::server {
 
-// Where the instances of a class and its subclasses come from: some classes have providers, the rest is stored.
+// Where the instances of a class and its subclasses come from: some classes have providers, those of the others are
+// stored. Made for one request.
+//
+// Thread: one at a time.
 class InstanceSources
 {
   public:
-    // Throws: CIM_ERR_INVALID_CLASS.
+    // Requires: the core outlives this. Throws: CIM_ERR_INVALID_CLASS.
     InstanceSources(const ServerCore& core, const CIMNamespaceName& nameSpace, const CIMName& className);
 
     // The classes with a provider, the named one first if it has one.
     const std::vector<std::pair<CIMName, ProviderReference>>& provided() const { return fProvided; }
     bool isProvided(const CIMName& className) const;
 
-    // The property list for one provided class: without deep inheritance a subclass's instances are cut down to the
-    // named class's properties.
+    // Returns: the property list for one provided class. Without deep inheritance a subclass's instances are cut down
+    // to the named class's properties.
     CIMPropertyList propertiesOf(const CIMName& providedClass, const repository::InstanceOptions& options) const;
 
   private:

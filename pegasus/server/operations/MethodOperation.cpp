@@ -1,6 +1,6 @@
-#include "pegasus/server/operations/MethodOperation.h"
-
+#include "pegasus/base/PercentCoding.h"
 #include "pegasus/server/operations/ConfigService.h"
+#include "pegasus/server/operations/Operations.h"
 #include "pegasus/wire/ElementEncoder.h"
 
 namespace Pegasus::server::operations {
@@ -30,7 +30,7 @@ void passToProvider(ServerCore& core, const HttpRequest& http, const CimRequest&
     }
     AgentRequest passed;
     passed.method = request.method;
-    passed.object = percentDecode(*http.header("CIMObject"));
+    passed.object = base::percentDecoded(*http.header("CIMObject"));
     passed.body = http.body;
     const CimStatus status = core.agents.request(*provider, passed, answer);
     if (status.code != 0) {

@@ -1,27 +1,21 @@
 #include "pegasus/server/operations/ProviderRegistry.h"
 
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/server/operations/RegistrationChecks.h"
 
 #include <Pegasus/Common/Exception.h>
 
 #include <algorithm>
-#include <cctype>
 #include <map>
 
 namespace Pegasus::server {
 
 namespace {
 
-std::string fold(std::string text)
-{
-    std::transform(text.begin(), text.end(), text.begin(),
-                   [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
-    return text;
-}
-
 std::string indexKey(const std::string& nameSpace, const std::string& className)
 {
-    return fold(nameSpace[0] == '/' ? nameSpace.substr(1) : nameSpace) + ":" + fold(className);
+    return base::foldCase(nameSpace[0] == '/' ? nameSpace.substr(1) : nameSpace) + ":" + base::foldCase(className);
 }
 
 CIMNamespaceName interop()
@@ -149,7 +143,7 @@ void ProviderRegistry::checkNotTaken(const CIMInstance& capabilities)
     }
 }
 
-// Reads the registrations anew. Requires: fMutex held.
+// Reads the registrations, unless that has been done. Requires: fMutex held.
 void ProviderRegistry::load()
 {
     if (fLoaded) {
@@ -164,7 +158,7 @@ void ProviderRegistry::load()
     for (const CIMInstance& capabilities : storedInstances(fRepository, kCapabilitiesClass)) {
         const auto module = modules.find(stringProperty(capabilities, "ProviderModuleName"));
         if (module == modules.end()) {
-            continue; // its module was deleted behind it
+            continue; // its module has been deleted since
         }
         ProviderReference provider = module->second;
         provider.provider = stringProperty(capabilities, "ProviderName");
@@ -182,8 +176,7 @@ std::optional<ProviderReference> ProviderRegistry::find(const CIMNamespaceName& 
 {
     const std::lock_guard<std::mutex> lock(fMutex);
     load();
-    const auto found = fIndex.find(
-        indexKey(std::string(nameSpace.getString().getCString()), std::string(className.getString().getCString())));
+    const auto found = fIndex.find(indexKey(base::utf8(nameSpace), base::utf8(className)));
     if (found == fIndex.end()) {
         return std::nullopt;
     }

@@ -28,7 +28,7 @@ class ProviderRegistry
     // Requires: the repository outlives this.
     explicit ProviderRegistry(repository::Repository& repository) : fRepository(repository) {}
 
-    // Whether instances of this class are registrations, which only registerInstance() stores.
+    // Returns: whether instances of this class are registrations, which only registerInstance() stores.
     static bool isRegistration(const CIMNamespaceName& nameSpace, const CIMName& className);
 
     // Checks and stores a registration. Returns: its path.
@@ -37,6 +37,8 @@ class ProviderRegistry
     // what the repository throws.
     CIMObjectPath registerInstance(const CIMInstance& instance);
 
+    // Returns: the provider of a class itself; nothing when it has none, whatever its superclass has.
+    // Throws: what the repository throws.
     std::optional<ProviderReference> find(const CIMNamespaceName& nameSpace, const CIMName& className,
                                           ProviderType type);
 

@@ -1,5 +1,7 @@
 #include "pegasus/server/operations/RegistrationChecks.h"
 
+#include "pegasus/base/Text.h"
+
 #include <Pegasus/Common/Exception.h>
 
 #include <algorithm>
@@ -75,7 +77,7 @@ std::string stringProperty(const CIMConstInstance& instance, const char* name)
     if (value.getType() == CIMTYPE_STRING && !value.isArray() && !value.isNull()) {
         value.get(text);
     }
-    return std::string(text.getCString());
+    return base::utf8(text);
 }
 
 std::vector<std::string> stringsProperty(const CIMConstInstance& instance, const char* name)
@@ -87,7 +89,7 @@ std::vector<std::string> stringsProperty(const CIMConstInstance& instance, const
     }
     std::vector<std::string> result;
     for (Uint32 i = 0; i < texts.size(); ++i) {
-        result.emplace_back(texts[i].getCString());
+        result.push_back(base::utf8(texts[i]));
     }
     return result;
 }

@@ -1,17 +1,7 @@
-#include "pegasus/server/operations/SchemaOperations.h"
-
+#include "pegasus/server/operations/Operations.h"
 #include "pegasus/wire/ElementEncoder.h"
 
-namespace Pegasus::server {
-
-void requireNamespace(const ServerCore& core, const CIMNamespaceName& nameSpace)
-{
-    if (!core.repository.hasNamespace(nameSpace)) {
-        throw CIMException(CIM_ERR_INVALID_NAMESPACE, nameSpace.getString());
-    }
-}
-
-namespace operations {
+namespace Pegasus::server::operations {
 
 namespace {
 
@@ -89,6 +79,4 @@ void setQualifier(ServerCore& core, const CimRequest& request, ElementSink&)
     core.repository.setQualifier(request.nameSpace, request.parameters.qualifierDeclaration("QualifierDeclaration"));
 }
 
-} // namespace operations
-
-} // namespace Pegasus::server
+} // namespace Pegasus::server::operations

@@ -10,6 +10,7 @@
 namespace Pegasus::server {
 
 // What the operations work on. One per server; it outlives every connection.
+// Thread: any; each part is safe by itself.
 struct ServerCore
 {
     Config& config;
@@ -20,6 +21,11 @@ struct ServerCore
 };
 
 // Throws: CIM_ERR_INVALID_NAMESPACE.
-void requireNamespace(const ServerCore& core, const CIMNamespaceName& nameSpace);
+inline void requireNamespace(const ServerCore& core, const CIMNamespaceName& nameSpace)
+{
+    if (!core.repository.hasNamespace(nameSpace)) {
+        throw CIMException(CIM_ERR_INVALID_NAMESPACE, nameSpace.getString());
+    }
+}
 
 } // namespace Pegasus::server

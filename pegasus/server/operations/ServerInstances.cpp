@@ -1,9 +1,9 @@
 #include "pegasus/server/operations/ServerInstances.h"
 
+#include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/server/operations/ConfigService.h"
 #include "pegasus/server/operations/RegistrationChecks.h"
-
-#include <strings.h>
 
 namespace Pegasus::server {
 
@@ -27,11 +27,11 @@ class NamespaceInstances : public ServerInstances
     // Those below `fAbove`, by their names from there on.
     std::vector<CIMInstance> make() const override
     {
-        const std::string prefix = std::string(fAbove.getString().getCString()) + "/";
+        const std::string prefix = base::utf8(fAbove) + "/";
         std::vector<CIMInstance> instances;
         for (const CIMNamespaceName& nameSpace : fCore.repository.namespaces()) {
-            const std::string name(nameSpace.getString().getCString());
-            if (name.size() <= prefix.size() || ::strncasecmp(name.c_str(), prefix.c_str(), prefix.size()) != 0) {
+            const std::string name = base::utf8(nameSpace);
+            if (name.size() <= prefix.size() || !base::startsWithNoCase(name, prefix)) {
                 continue;
             }
             const std::string below = name.substr(prefix.size());
@@ -47,7 +47,7 @@ class NamespaceInstances : public ServerInstances
     CIMNamespaceName fAbove;
 };
 
-// Takes away what the list does not name.
+// Removes the properties that the list does not name.
 void cutDown(CIMInstance& instance, const CIMPropertyList& properties)
 {
     if (properties.isNull()) {
@@ -107,7 +107,7 @@ CIMInstance ServerInstances::get(const CIMObjectPath& path, const CIMPropertyLis
 
 CIMObjectPath createNamespace(ServerCore& core, const CIMNamespaceName& nameSpace, const CIMInstance& instance)
 {
-    std::string name(nameSpace.getString().getCString());
+    std::string name = base::utf8(nameSpace);
     const std::string below = stringProperty(instance, "Name");
     if (!below.empty()) {
         name += "/" + below;

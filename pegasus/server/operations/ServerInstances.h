@@ -8,7 +8,9 @@
 
 namespace Pegasus::server {
 
-// Instances that exist because the server does: namespaces, and the configuration.
+// Instances that the server makes up itself: namespaces, and the configuration. They are made at each call.
+//
+// Thread: one at a time.
 class ServerInstances
 {
   public:
@@ -19,7 +21,7 @@ class ServerInstances
     static std::unique_ptr<ServerInstances> find(ServerCore& core, const CIMNamespaceName& nameSpace,
                                                  const CIMName& className);
 
-    // With their paths, without host and namespace.
+    // Returns: the instances, with their paths without host and namespace.
     std::vector<CIMInstance> all(const CIMPropertyList& properties) const;
     // Throws: CIM_ERR_NOT_FOUND.
     CIMInstance get(const CIMObjectPath& path, const CIMPropertyList& properties) const;
@@ -28,6 +30,7 @@ class ServerInstances
     virtual std::vector<CIMInstance> make() const = 0;
 };
 
+// Returns: whether the class is __Namespace.
 bool isNamespaceClass(const CIMName& className);
 
 // Makes the namespace that a __Namespace instance names, relative to the one it is created in; an empty name stands for

@@ -1,6 +1,6 @@
 #include "tests/pegasus/server/HttpExchange.h"
 
-#include "pegasus/server/net/HttpRequest.h"
+#include "pegasus/base/PercentCoding.h"
 
 #include <algorithm>
 #include <cstdlib>
@@ -44,7 +44,7 @@ bool waitReadable(int fd, Deadline deadline)
 std::string header(const HttpAnswer& answer, const std::string& name)
 {
     const auto found = answer.headers.find(name);
-    return found == answer.headers.end() ? "" : Pegasus::server::percentDecode(found->second);
+    return found == answer.headers.end() ? "" : Pegasus::base::percentDecoded(found->second);
 }
 
 RawConnection::RawConnection(std::uint16_t port) : fSocket(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0))
@@ -193,8 +193,8 @@ std::string intrinsicRequest(const std::string& method, const std::string& nameS
     for (std::string part; std::getline(parts, part, '/');) {
         path += "<NAMESPACE NAME=\"" + part + "\"/>\n";
     }
-    return post(headers + "CIMOperation: MethodCall\r\nCIMMethod: " + method +
-                    "\r\nCIMObject: " + Pegasus::server::percentEncode(nameSpace) + "\r\n",
+    return post(headers + "CIMOperation: MethodCall\r\nCIMMethod: " + method + "\r\nCIMObject: " +
+                    Pegasus::base::percentEncoded(nameSpace, Pegasus::base::PercentSet::kUnreserved) + "\r\n",
                 "<?xml version=\"1.0\" encoding=\"utf-8\" ?>\n<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">\n"
                 "<MESSAGE ID=\"1\" PROTOCOLVERSION=\"1.0\">\n<SIMPLEREQ>\n<IMETHODCALL NAME=\"" +
                     method + "\">\n<LOCALNAMESPACEPATH>\n" + path + "</LOCALNAMESPACEPATH>\n" + parameters +

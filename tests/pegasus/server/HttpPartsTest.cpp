@@ -5,7 +5,6 @@
 #include "pegasus/server/net/CimAnswer.h"
 #include "pegasus/server/net/HttpRequestReader.h"
 #include "pegasus/server/net/Listener.h"
-#include "pegasus/server/net/Utf8Check.h"
 
 #include <gtest/gtest.h>
 
@@ -111,28 +110,20 @@ TEST(HttpRequestTest, findsWordsInListHeaders)
     }
 }
 
-TEST(HttpRequestTest, percentCodingIsUndone)
-{
-    const std::string text = "a b/c:\"%\xc3\xa9\n~";
-    EXPECT_EQ(percentDecode(percentEncode(text)), text);
-    EXPECT_EQ(percentDecode("%4"), "%4");
-    EXPECT_EQ(percentDecode("%zz%41"), "%zzA");
-}
-
 // What an answer looks like on the wire.
 template <typename Write> std::string sent(AnswerStream::Options options, const Write& write)
 {
     int ends[2];
     EXPECT_EQ(::socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, ends), 0);
     std::string bytes;
-    std::thread reader([&, fd = Descriptor(ends[0])] {
+    std::thread reader([&, fd = base::Descriptor(ends[0])] {
         char part[65536];
         for (ssize_t n; (n = ::read(fd.get(), part, sizeof part)) > 0;) {
             bytes.append(part, static_cast<std::size_t>(n));
         }
     });
     {
-        SocketStream stream((Descriptor(ends[1])));
+        SocketStream stream((base::Descriptor(ends[1])));
         AnswerStream answer(stream, options);
         write(answer);
     }
@@ -182,13 +173,13 @@ TEST(SocketStreamTest, waitsForASlowReaderOnlySoLong)
 {
     int ends[2];
     ASSERT_EQ(::socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, ends), 0);
-    const Descriptor reader(ends[0]);
-    SocketStream stream((Descriptor(ends[1])));
+    const base::Descriptor reader(ends[0]);
+    SocketStream stream((base::Descriptor(ends[1])));
     std::string data(16u << 20, 'x');
     iovec part = {data.data(), data.size()};
     EXPECT_THROW(stream.writeAll(&part, 1, std::chrono::milliseconds(50)), SocketTimeout);
     char byte;
-    EXPECT_THROW(stream.readSome(&byte, 1, deadlineAfter(std::chrono::milliseconds(20))), SocketTimeout);
+    EXPECT_THROW(stream.readSome(&byte, 1, base::Deadline::afterOrNever(std::chrono::milliseconds(20))), SocketTimeout);
 }
 
 class FaultyHandler : public RequestHandler
@@ -199,13 +190,13 @@ class FaultyHandler : public RequestHandler
 };
 
 // The other end of a connection that a group serves.
-Descriptor connectionOf(ConnectionGroup& group)
+base::Descriptor connectionOf(ConnectionGroup& group)
 {
     int ends[2];
     EXPECT_EQ(::socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, ends), 0);
-    Descriptor served(ends[0]);
+    base::Descriptor served(ends[0]);
     EXPECT_TRUE(group.serve(served, 10));
-    return Descriptor(ends[1]);
+    return base::Descriptor(ends[1]);
 }
 
 // What a connection's thread throws must end that connection, and nothing but it.
@@ -227,11 +218,11 @@ TEST(ConnectionGroupTest, anExceptionEndsOnlyItsConnection)
     for (const auto& [name, settings] : rows) {
         SCOPED_TRACE(name);
         ConnectionGroup group(handler, settings);
-        const Descriptor client = connectionOf(group);
+        const base::Descriptor client = connectionOf(group);
         ::send(client.get(), request.data(), request.size(), MSG_NOSIGNAL); // fails when it is closed already
         char byte;
         EXPECT_LE(::recv(client.get(), &byte, 1, 0), 0);
-        EXPECT_TRUE(group.waitForEnd(deadlineAfter(std::chrono::seconds(10))));
+        EXPECT_TRUE(group.waitForEnd(base::Deadline::afterOrNever(std::chrono::seconds(10))));
     }
 }
 
@@ -240,13 +231,13 @@ TEST(AcceptorTest, outlivesAConnectionThatCannotBeServed)
 {
     FaultyHandler handler;
     ConnectionGroup group(handler, [] { return ConnectionSettings(); });
-    Descriptor listener = listenOnLoopback(0);
+    base::Descriptor listener = listenOnLoopback(0);
     sockaddr_in address = {};
     socklen_t size = sizeof address;
     ASSERT_EQ(::getsockname(listener.get(), reinterpret_cast<sockaddr*>(&address), &size), 0);
     std::vector<Acceptor::Source> sources;
     sources.push_back({std::move(listener), [](int) { return ::geteuid(); }, &group});
-    const Descriptor stop(::eventfd(0, EFD_CLOEXEC));
+    const base::Descriptor stop(::eventfd(0, EFD_CLOEXEC));
     bool first = true;
     Acceptor acceptor(std::move(sources), stop.get(), [&]() -> std::size_t {
         if (std::exchange(first, false)) {
@@ -256,7 +247,7 @@ TEST(AcceptorTest, outlivesAConnectionThatCannotBeServed)
     });
     std::thread thread([&] { acceptor.run(); });
     for (const char* expected : {"", "HTTP/1.1 404 Not Found"}) {
-        const Descriptor client(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0));
+        const base::Descriptor client(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0));
         EXPECT_EQ(::connect(client.get(), reinterpret_cast<const sockaddr*>(&address), size), 0);
         ::send(client.get(), "GET / HTTP/1.0\r\n\r\n", 18, MSG_NOSIGNAL);
         char answer[22];
@@ -266,7 +257,7 @@ TEST(AcceptorTest, outlivesAConnectionThatCannotBeServed)
     ::eventfd_write(stop.get(), 1);
     thread.join();
     group.breakAll();
-    EXPECT_TRUE(group.waitForEnd(deadlineAfter(std::chrono::seconds(10))));
+    EXPECT_TRUE(group.waitForEnd(base::Deadline::afterOrNever(std::chrono::seconds(10))));
 }
 
 // An agent runs a vendor's code: its answers are bounded as a client's requests are.
@@ -278,7 +269,7 @@ TEST(AgentChannelTest, unparsedBytesAreBounded)
         int ends[2];
         ASSERT_EQ(::socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, ends), 0);
         std::size_t sent = 0;
-        std::thread agent([&, fd = Descriptor(ends[0])] {
+        std::thread agent([&, fd = base::Descriptor(ends[0])] {
             std::string bytes = start;
             for (bytes.resize(64u << 10, 'x'); sent < (16u << 20); bytes.assign(64u << 10, 'x')) {
                 const ssize_t n = ::send(fd.get(), bytes.data(), bytes.size(), MSG_NOSIGNAL);
@@ -293,46 +284,17 @@ TEST(AgentChannelTest, unparsedBytesAreBounded)
             void write(std::string_view) override {}
         } nothing;
         {
-            AgentChannel channel((Descriptor(ends[1])));
+            AgentChannel channel((base::Descriptor(ends[1])));
             try {
                 channel.request(AgentRequest(), nothing, std::chrono::seconds(10));
                 ADD_FAILURE() << "accepted";
             } catch (const AgentLost& error) {
-                EXPECT_STREQ(error.what(), "a head, chunk extension or trailer of more than 1048576 bytes");
+                EXPECT_NE(std::string(error.what()).find(" of more than 1048576 bytes"), std::string::npos)
+                    << error.what();
             }
         }
         agent.join();
         EXPECT_LT(sent, 4u << 20);
-    }
-}
-
-struct Utf8Row
-{
-    const char* name;
-    std::string bytes;
-    bool valid;
-};
-
-TEST(Utf8CheckTest, acceptsUtf8Only)
-{
-    const Utf8Row rows[] = {{"empty", "", true},
-                            {"ASCII", "0123456789abcdef", true},
-                            {"two", "caf\xc3\xa9", true},
-                            {"three", "\xe5\x90\x8d", true},
-                            {"four", "12345678\xf0\x9f\x98\x80", true},
-                            {"last", "\xf4\x8f\xbf\xbf", true},
-                            {"beyond", "\xf4\x90\x80\x80", false},
-                            {"overlong", "\xc0\xaf", false},
-                            {"overlong three", "\xe0\x80\xaf", false},
-                            {"surrogate", "\xed\xa0\x80", false},
-                            {"lone follower", "ab\x80", false},
-                            {"cut", "\xe5\x90", false},
-                            {"latin 1", "caf\xe9 x", false}};
-    for (const Utf8Row& row : rows) {
-        for (std::size_t shift = 0; shift < 9; ++shift) // at every offset in a word
-        {
-            EXPECT_EQ(isUtf8(std::string(shift, 'x') + row.bytes), row.valid) << row.name << " at " << shift;
-        }
     }
 }
 

@@ -42,7 +42,7 @@ sockaddr_in loopback(std::uint16_t port)
     return address;
 }
 
-std::uint16_t portOf(const Descriptor& socket)
+std::uint16_t portOf(const base::Descriptor& socket)
 {
     sockaddr_in address = {};
     socklen_t size = sizeof address;
@@ -51,9 +51,9 @@ std::uint16_t portOf(const Descriptor& socket)
 }
 
 // A connected client socket, from a given port if it is not 0.
-Descriptor connectTo(std::uint16_t port, std::uint16_t from = 0)
+base::Descriptor connectTo(std::uint16_t port, std::uint16_t from = 0)
 {
-    Descriptor socket(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0));
+    base::Descriptor socket(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0));
     const int yes = 1;
     ::setsockopt(socket.get(), SOL_SOCKET, SO_REUSEADDR, &yes, sizeof yes);
     sockaddr_in address = loopback(from);
@@ -64,9 +64,9 @@ Descriptor connectTo(std::uint16_t port, std::uint16_t from = 0)
 }
 
 // A connection from an IPv6 socket to the mapped IPv4 address.
-Descriptor connectMapped(std::uint16_t port)
+base::Descriptor connectMapped(std::uint16_t port)
 {
-    Descriptor socket(::socket(AF_INET6, SOCK_STREAM | SOCK_CLOEXEC, 0));
+    base::Descriptor socket(::socket(AF_INET6, SOCK_STREAM | SOCK_CLOEXEC, 0));
     sockaddr_in6 address = {};
     address.sin6_family = AF_INET6;
     address.sin6_port = htons(port);
@@ -77,7 +77,7 @@ Descriptor connectMapped(std::uint16_t port)
     return socket;
 }
 
-void resetConnection(Descriptor& socket)
+void resetConnection(base::Descriptor& socket)
 {
     const linger now = {1, 0};
     ::setsockopt(socket.get(), SOL_SOCKET, SO_LINGER, &now, sizeof now);
@@ -90,21 +90,21 @@ class PeerTest : public testing::Test
     PeerTest() : fListener(listenOnLoopback(0)), fPort(portOf(fListener)) {}
     ~PeerTest() override { fgAfterGetpeername = nullptr; }
 
-    Descriptor accept() const
+    base::Descriptor accept() const
     {
         bool exhausted = false;
         return acceptConnection(fListener, exhausted);
     }
 
-    Descriptor fListener;
+    base::Descriptor fListener;
     std::uint16_t fPort;
     TcpPeerLookup fLookup;
 };
 
 TEST_F(PeerTest, theKernelSaysWhoThePeerIs)
 {
-    Descriptor client = connectTo(fPort);
-    const Descriptor server = accept();
+    base::Descriptor client = connectTo(fPort);
+    const base::Descriptor server = accept();
     for (int i = 0; i < 3; ++i) { // on one netlink socket
         EXPECT_EQ(fLookup.userFromNetlink(server.get()), ::geteuid());
     }
@@ -118,7 +118,7 @@ TEST_F(PeerTest, theKernelSaysWhoThePeerIs)
 
 TEST_F(PeerTest, aMappedAddressIsTheSamePeer)
 {
-    const Descriptor client = connectMapped(fPort);
+    const base::Descriptor client = connectMapped(fPort);
     if (!client) {
         GTEST_SKIP() << "this machine has no IPv6";
     }
@@ -136,11 +136,11 @@ TEST_F(PeerTest, aPortThatChangesHandsDuringTheLookUpIsNobodys)
         {"either", [](TcpPeerLookup& lookup, int fd) { return lookup.userOf(fd); }}};
     for (const auto& [name, look] : rows) {
         SCOPED_TRACE(name);
-        Descriptor attacker = connectTo(fPort);
+        base::Descriptor attacker = connectTo(fPort);
         const std::uint16_t port = portOf(attacker);
-        const Descriptor server = accept();
+        const base::Descriptor server = accept();
         ASSERT_EQ(::send(attacker.get(), "POST", 4, MSG_NOSIGNAL), 4);
-        Descriptor successor;
+        base::Descriptor successor;
         fgAfterGetpeername = [&] {
             resetConnection(attacker);
             successor = connectTo(fPort, port);
@@ -162,8 +162,8 @@ struct TableRow
 
 TEST_F(PeerTest, theTableIsReadUnderTheSameRule)
 {
-    const Descriptor client = connectTo(fPort);
-    const Descriptor server = accept();
+    const base::Descriptor client = connectTo(fPort);
+    const base::Descriptor server = accept();
     const std::string table = std::filesystem::temp_directory_path() / ("peer-table-" + std::to_string(::getpid()));
     const TcpPeerLookup lookup(table);
     const auto write = [&](std::uint16_t from, const TableRow& row) {

@@ -1,6 +1,6 @@
 // Recorded requests that a provider answered, against our server and a CMPI provider that has the recorded provider's
 // data: it reads the files that this test writes from the recordings.
-#include "pegasus/server/net/HttpRequest.h"
+#include "pegasus/base/PercentCoding.h"
 #include "tests/pegasus/server/ReplayFixture.h"
 
 #include <filesystem>
@@ -129,7 +129,7 @@ class ProviderReplayTest : public ReplayFixture
         if (code == answer.trailers.end()) {
             return "";
         }
-        const std::string text = Pegasus::server::percentDecode(answer.trailers.at("cimstatuscodedescription"));
+        const std::string text = Pegasus::base::percentDecoded(answer.trailers.at("cimstatuscodedescription"));
         return code->second + " " + std::regex_replace(text, std::regex("^(CIM_ERR_\\w+|Unrecognized.*\"): "), "");
     }
 
@@ -222,7 +222,7 @@ TEST_F(ProviderReplayTest, otherVendors)
     {
         const RecordedExchange recorded(name);
         const std::string nameSpace =
-            Pegasus::server::percentDecode(firstMatch(recorded.request, "CIMObject: ([\\w%]+?)(%3A|\r)"));
+            Pegasus::base::percentDecoded(firstMatch(recorded.request, "CIMObject: ([\\w%]+?)(%3A|\r)"));
         if (namespaces.insert(nameSpace).second) {
             createNamespace(nameSpace);
             declareQualifiers(nameSpace);

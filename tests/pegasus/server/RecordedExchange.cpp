@@ -1,6 +1,6 @@
 #include "tests/pegasus/server/RecordedExchange.h"
 
-#include "pegasus/server/net/HttpRequest.h"
+#include "pegasus/base/PercentCoding.h"
 #include "pegasus/wire/XmlReader.h"
 
 #include <algorithm>
@@ -163,7 +163,7 @@ std::string canonical(const HttpAnswer& answer, Order order)
         }
     }
     for (const auto& [name, value] : answer.trailers) {
-        text += name + ": " + Pegasus::server::percentDecode(value) + "\n";
+        text += name + ": " + Pegasus::base::percentDecoded(value) + "\n";
     }
     return text + canonicalBody(answer.body, order);
 }

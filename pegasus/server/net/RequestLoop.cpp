@@ -1,5 +1,6 @@
-#include "pegasus/server/net/Connection.h"
+#include "pegasus/server/net/RequestLoop.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/server/admin/Log.h"
 
 #include <system_error>
@@ -29,7 +30,7 @@ AnswerStream::Options answerOptions(const HttpRequest& http, const ConnectionSet
     options.framing =
         takesTrailers ? AnswerStream::Framing::kChunkedWithTrailer : AnswerStream::Framing::kContentLength;
     options.maxBufferedBytes = settings.maxBufferedAnswerBytes;
-    options.writePatience = settings.writePatience;
+    options.writeTimeout = settings.writeTimeout;
     options.closes = wantsClose(http);
     options.extensionPrefix = http.extensionPrefix;
     return options;
@@ -52,15 +53,15 @@ try {
     try {
         throw;
     } catch (const std::system_error& error) { // the peer has gone: nobody is left to answer
-        Log::write(Severity::kDebug, std::string("connection ended: ") + error.what());
+        Log::write(LogLevel::kDebug, std::string("connection ended: ") + error.what());
     } catch (const SocketTimeout& error) {
-        Log::write(Severity::kWarning, std::string("connection closed: ") + error.what());
+        Log::write(LogLevel::kWarning, std::string("connection closed: ") + error.what());
     } catch (const std::exception& error) {
-        Log::write(Severity::kError, std::string("connection closed: ") + error.what());
+        Log::write(LogLevel::kError, std::string("connection closed: ") + error.what());
     } catch (const Exception& error) {
-        Log::write(Severity::kError, "connection closed: " + std::string(error.getMessage().getCString()));
+        Log::write(LogLevel::kError, "connection closed: " + base::utf8(error.getMessage()));
     } catch (...) {
-        Log::write(Severity::kError, "connection closed: an unknown exception");
+        Log::write(LogLevel::kError, "connection closed: an unknown exception");
     }
 } catch (...) { // no memory left for the line
 }
@@ -103,8 +104,8 @@ try {
     answer(http);
     return !closes;
 } catch (const HttpError& error) {
-    Log::write(Severity::kInformation, std::string("request refused: ") + error.what());
-    sendHttpError(fStream, error, fSettings.writePatience);
+    Log::write(LogLevel::kInformation, std::string("request refused: ") + error.what());
+    sendHttpError(fStream, error, fSettings.writeTimeout);
     if (error.closes()) {
         fStream.lingeringClose(kLinger);
     }
@@ -144,7 +145,7 @@ try {
 } catch (const AnswerTooLarge& error) {
     answer.fail(makeStatus(CIM_ERR_SERVER_LIMITS_EXCEEDED, error.what()));
 } catch (const Exception& error) {
-    answer.fail(makeStatus(CIM_ERR_FAILED, std::string(error.getMessage().getCString())));
+    answer.fail(makeStatus(CIM_ERR_FAILED, base::utf8(error.getMessage())));
 } catch (const std::bad_alloc&) {
     answer.fail(makeStatus(CIM_ERR_SERVER_LIMITS_EXCEEDED, "The server is out of memory"));
 }

@@ -8,26 +8,29 @@
 
 namespace Pegasus::server {
 
-// What bounds a connection; asked for anew before each request, so that changes take effect at once.
+// What bounds a connection. The settings are asked for before each request, so that a change takes effect at once.
 struct ConnectionSettings
 {
     HttpLimits http;
     ReadTimes times;
-    std::chrono::milliseconds writePatience = std::chrono::seconds(20);
+    std::chrono::milliseconds writeTimeout = std::chrono::seconds(20);
     std::size_t maxXmlDepth = 64;
     std::size_t maxBufferedAnswerBytes = 256u << 20;
 };
 
-// Carries out one operation.
+// Carries out operations.
+// Thread: any; connections call it at the same time.
 class RequestHandler
 {
   public:
     virtual ~RequestHandler() = default;
 
-    // Writes the answer's elements. Throws: CIMException or OperationFailed for an error of the operation;
-    // wire::XmlError when a parameter does not have the form that the operation needs.
+    // Writes the answer's elements.
+    // Throws: CIMException or OperationFailed for an error of the operation; wire::XmlError when a parameter does not
+    // have the form that the operation needs, and nothing has been written.
     virtual void handle(const HttpRequest& http, const CimRequest& request, CimAnswer& answer) = 0;
-    // Whether unknown intrinsic methods are answered inside the message, as OpenPegasus does, and not in the trailer.
+    // Returns: false for an unknown intrinsic method. It is answered with an ERROR element, as OpenPegasus does, also
+    // when the client reads trailers.
     virtual bool knowsMethod(const CimRequest& request) const = 0;
 };
 

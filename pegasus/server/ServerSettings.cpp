@@ -1,0 +1,41 @@
+#include "pegasus/server/ServerSettings.h"
+
+namespace Pegasus::server {
+
+LogLevel logLevel(const Config& config)
+{
+    const std::string level = config.text("logLevel");
+    return level == "ERROR"     ? LogLevel::kError
+           : level == "WARNING" ? LogLevel::kWarning
+           : level == "DEBUG"   ? LogLevel::kDebug
+                                : LogLevel::kInformation;
+}
+
+ConnectionSettings connectionSettings(const Config& config)
+{
+    ConnectionSettings settings;
+    settings.http = {config.number("maxHeaderBytes"), config.number("maxBodyBytes")};
+    settings.times = {config.seconds("idleConnectionTimeout"), config.seconds("requestReadTimeout")};
+    settings.writeTimeout = config.seconds("socketWriteTimeout");
+    settings.maxXmlDepth = config.number("maxXmlDepth");
+    settings.maxBufferedAnswerBytes = config.number("maxBufferedAnswerBytes");
+    return settings;
+}
+
+AgentSettings agentSettings(const Config& config)
+{
+    AgentSettings settings;
+    settings.providerDirectories = config.directories("providerDir");
+    settings.timeout = config.seconds("providerTimeout");
+    settings.idle = config.seconds("agentIdleTimeout");
+    settings.process = {config.number("agentMemoryMegabytes"), config.flag("strictOwners")};
+    return settings;
+}
+
+std::string repositoryPath(const Config& config)
+{
+    const std::string directory = config.text("repositoryDir");
+    return directory[0] == '/' ? directory : config.home() + "/" + directory;
+}
+
+} // namespace Pegasus::server
