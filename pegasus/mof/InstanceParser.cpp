@@ -1,6 +1,7 @@
 #include "pegasus/mof/InstanceParser.h"
 
 #include "pegasus/base/Text.h"
+#include "pegasus/common/EmbeddedKind.h"
 #include "pegasus/mof/ValueBuilder.h"
 
 #include <Pegasus/Common/CIMObject.h>
@@ -24,20 +25,6 @@ bool removeProperty(ParsedInstance& parsed, const CIMName& name)
     const bool wasOpen = removed != parsed.open.end();
     parsed.open.erase(removed, parsed.open.end());
     return wasOpen;
-}
-
-// A class from a server may have the embedded types; one from MOF has strings with a qualifier.
-bool isEmbeddedObject(const CIMConstProperty& declared)
-{
-    return declared.getType() == CIMTYPE_OBJECT ||
-           (declared.getType() == CIMTYPE_STRING && declared.findQualifier(CIMName("EmbeddedObject")) != PEG_NOT_FOUND);
-}
-
-bool isEmbeddedInstance(const CIMConstProperty& declared)
-{
-    return declared.getType() == CIMTYPE_INSTANCE ||
-           (declared.getType() == CIMTYPE_STRING &&
-            declared.findQualifier(CIMName("EmbeddedInstance")) != PEG_NOT_FOUND);
 }
 
 // The place of an embedded instance is that of the string; this leads from there to the place within.
@@ -109,7 +96,7 @@ void InstanceParser::setValue(ParsedInstance& parsed, const CIMConstProperty& de
         parsed.open.push_back({declared.getName(), alias.text, fCursor.place(alias.offset)});
         return;
     }
-    if (!initializer.isNull() && (isEmbeddedObject(declared) || isEmbeddedInstance(declared))) {
+    if (!initializer.isNull() && embeddedKind(declared) != EmbeddedKind::kNone) {
         parsed.instance.addProperty(CIMProperty(declared.getName(), embeddedValue(initializer, declared), 0, CIMName(),
                                                 declared.getClassOrigin()));
         return;
@@ -138,7 +125,7 @@ CIMValue InstanceParser::embeddedValue(const Initializer& initializer, const CIM
         instances.append(parseEmbedded(element));
         objects.append(CIMObject(instances[instances.size() - 1]));
     }
-    if (isEmbeddedObject(declared)) {
+    if (embeddedKind(declared) == EmbeddedKind::kObject) {
         return declared.isArray() ? CIMValue(objects) : CIMValue(objects[0]);
     }
     return declared.isArray() ? CIMValue(instances) : CIMValue(instances[0]);

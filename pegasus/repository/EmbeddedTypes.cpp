@@ -1,5 +1,8 @@
 #include "pegasus/repository/EmbeddedTypes.h"
 
+#include "pegasus/common/EmbeddedKind.h"
+#include "pegasus/common/ObjectReps.h"
+
 namespace Pegasus::repository {
 
 namespace {
@@ -7,11 +10,6 @@ namespace {
 bool isEmbedded(CIMType type)
 {
     return type == CIMTYPE_OBJECT || type == CIMTYPE_INSTANCE;
-}
-
-bool hasQualifier(const CIMConstProperty& property, const char* name)
-{
-    return property.findQualifier(CIMName(name)) != PEG_NOT_FOUND;
 }
 
 bool changesType(const CIMConstProperty& property)
@@ -37,10 +35,15 @@ CIMType embeddedType(const CIMConstProperty& property)
     if (type != CIMTYPE_STRING && !isEmbedded(type)) {
         return type;
     }
-    if (hasQualifier(property, "EmbeddedInstance")) {
+    // By the qualifiers alone: the decoder's type is what is to be replaced.
+    switch (embeddedKind(CIMTYPE_STRING, ObjectAccess::rep(property).fQualifiers)) {
+    case EmbeddedKind::kInstance:
         return property.isArray() ? CIMTYPE_STRING : CIMTYPE_INSTANCE;
+    case EmbeddedKind::kObject:
+        return CIMTYPE_STRING;
+    default:
+        return type;
     }
-    return hasQualifier(property, "EmbeddedObject") ? CIMTYPE_STRING : type;
 }
 
 CIMValue embeddedValue(const CIMConstProperty& property)
@@ -80,8 +83,7 @@ bool isStorableAs(const CIMConstProperty& given, const CIMConstProperty& declare
     if (given.getType() == declared.getType()) {
         return true;
     }
-    const bool holdsEmbedded = isEmbedded(declared.getType()) || hasQualifier(declared, "EmbeddedObject") ||
-                               hasQualifier(declared, "EmbeddedInstance");
+    const bool holdsEmbedded = embeddedKind(declared) != EmbeddedKind::kNone;
     return holdsEmbedded && (isEmbedded(given.getType()) || given.getValue().isNull());
 }
 

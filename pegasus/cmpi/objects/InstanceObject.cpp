@@ -32,14 +32,14 @@ bool accepts(const PropertySchema& property, const CIMValue& value)
         return false;
     }
     const CIMType type = value.getType();
-    return type == property.type ||
-           (property.isEmbedded && (type == CIMTYPE_INSTANCE || type == CIMTYPE_OBJECT || type == CIMTYPE_STRING));
+    return type == property.type || (property.embedded != EmbeddedKind::kNone &&
+                                     (type == CIMTYPE_INSTANCE || type == CIMTYPE_OBJECT || type == CIMTYPE_STRING));
 }
 
 // CMPI has one type for embedded objects of either kind; the class says which kind its property has.
 CIMValue asDeclared(const PropertySchema& property, const CIMValue& value)
 {
-    if (!property.isEmbeddedObject || value.getType() != CIMTYPE_INSTANCE || value.isNull()) {
+    if (property.embedded != EmbeddedKind::kObject || value.getType() != CIMTYPE_INSTANCE || value.isNull()) {
         return value;
     }
     if (!value.isArray()) {

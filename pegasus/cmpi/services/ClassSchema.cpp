@@ -23,20 +23,6 @@ bool isTrue(const CIMConstProperty& property, const char* qualifier)
     return result;
 }
 
-// On the wire an embedded type is an attribute of the property, or a qualifier alone.
-bool isEmbeddedObject(const CIMConstProperty& property)
-{
-    return property.getType() == CIMTYPE_OBJECT ||
-           (property.getType() == CIMTYPE_STRING && isTrue(property, "EmbeddedObject"));
-}
-
-bool isEmbeddedInstance(const CIMConstProperty& property)
-{
-    return property.getType() == CIMTYPE_INSTANCE ||
-           (property.getType() == CIMTYPE_STRING &&
-            property.findQualifier(CIMName("EmbeddedInstance")) != PEG_NOT_FOUND);
-}
-
 } // namespace
 
 std::size_t ClassSchema::NoCaseHash::operator()(std::string_view name) const noexcept
@@ -68,8 +54,7 @@ void ClassSchema::addProperty(const CIMConstProperty& property)
     added.type = property.getType();
     added.isArray = property.isArray();
     added.isKey = isTrue(property, "Key");
-    added.isEmbeddedObject = isEmbeddedObject(property);
-    added.isEmbedded = added.isEmbeddedObject || isEmbeddedInstance(property);
+    added.embedded = embeddedKind(property);
     added.referenceClass = property.getReferenceClassName();
     added.initial = property.getValue();
     if (added.isKey) {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "pegasus/base/AsciiCase.h"
+#include "pegasus/common/EmbeddedKind.h"
 
 #include <Pegasus/Common/CIMClass.h>
 #include <Pegasus/Common/CIMName.h>
@@ -22,8 +23,7 @@ struct PropertySchema
     CIMType type = CIMTYPE_STRING;
     bool isArray = false;
     bool isKey = false;
-    bool isEmbedded = false;       // an embedded object or instance, or a string that stands for one
-    bool isEmbeddedObject = false; // an embedded object
+    EmbeddedKind embedded = EmbeddedKind::kNone;
     CIMName referenceClass;
     CIMValue initial; // null of the declared type, or the class's default
 };
