@@ -51,6 +51,67 @@ template <typename Make> Evaluator sizeOf(Make make)
     return [make](const Vector&) { return make().size(); };
 }
 
+void addClientVectors(VectorTable& table)
+{
+    table["client.timeout.default"] = [](const Vector&) { return CIMClient().getTimeout(); };
+    const auto timeout = [](Uint32 milliseconds) {
+        return [=](const Vector&) {
+            CIMClient client;
+            client.setTimeout(milliseconds);
+            return client.getTimeout();
+        };
+    };
+    table["client.timeout.set"] = timeout(65535000);
+    table["client.timeout.zero"] = timeout(0);
+    table["client.nc.invoke"] = [](const Vector&) {
+        Array<CIMParamValue> outputs;
+        return test::describe(
+            CIMClient().invokeMethod("root", CIMObjectPath("A"), "M", Array<CIMParamValue>(), outputs));
+    };
+    table["client.nc.getQualifier"] = [](const Vector&) {
+        return utf8(CIMClient().getQualifier("root", "Key").getName().getString());
+    };
+    table["client.nc.disconnect"] = [](const Vector&) {
+        CIMClient().disconnect();
+        return "no exception";
+    };
+    const auto connect = [](const char* host, Uint32 port) {
+        return [=](const Vector&) {
+            CIMClient().connect(host, port, "", "");
+            return "connected";
+        };
+    };
+    table["client.refused"] = connect("127.0.0.1", 1);
+    table["client.badhost"] = connect("no.such.host.invalid", 5988);
+}
+
+void addArrayVectors(VectorTable& table)
+{
+    const auto one = [] { return Array<Uint32>(1, 1); };
+    table["array.oob.nc"] = [=](const Vector&) { return one()[1]; };
+    table["array.cow"] = [=](const Vector&) {
+        const Array<Uint32> a = one();
+        Array<Uint32> b = a;
+        b.append(2);
+        return json{a.size(), b.size()};
+    };
+    table["array.remove.oob"] = sizeOf([=] {
+        Array<Uint32> array = one();
+        array.remove(5);
+        return array;
+    });
+    table["array.insert.oob"] = sizeOf([=] {
+        Array<Uint32> array = one();
+        array.insert(5, 1);
+        return array;
+    });
+    table["array.size.ctor"] = [](const Vector&) {
+        const Array<String> array(3);
+        return json{array.size(), utf8(array[0])};
+    };
+    table["array.fill"] = [](const Vector&) { return Array<Uint32>(3, 7)[2]; };
+}
+
 } // namespace
 
 void addExceptionVectors(VectorTable& table)
@@ -94,36 +155,7 @@ void addExceptionVectors(VectorTable& table)
     table["exc.to"] = message([] { return ConnectionTimeoutException(); });
     table["exc.ssl"] = message([] { return SSLException("x"); });
     table["exc.enumctx"] = message([] { return InvalidEnumerationContextException(); });
-
-    table["client.timeout.default"] = [](const Vector&) { return CIMClient().getTimeout(); };
-    const auto timeout = [](Uint32 milliseconds) {
-        return [=](const Vector&) {
-            CIMClient client;
-            client.setTimeout(milliseconds);
-            return client.getTimeout();
-        };
-    };
-    table["client.timeout.set"] = timeout(65535000);
-    table["client.timeout.zero"] = timeout(0);
-    table["client.nc.invoke"] = [](const Vector&) {
-        Array<CIMParamValue> outputs;
-        return describe(CIMClient().invokeMethod("root", CIMObjectPath("A"), "M", Array<CIMParamValue>(), outputs));
-    };
-    table["client.nc.getQualifier"] = [](const Vector&) {
-        return utf8(CIMClient().getQualifier("root", "Key").getName().getString());
-    };
-    table["client.nc.disconnect"] = [](const Vector&) {
-        CIMClient().disconnect();
-        return "no exception";
-    };
-    const auto connect = [](const char* host, Uint32 port) {
-        return [=](const Vector&) {
-            CIMClient().connect(host, port, "", "");
-            return "connected";
-        };
-    };
-    table["client.refused"] = connect("127.0.0.1", 1);
-    table["client.badhost"] = connect("no.such.host.invalid", 5988);
+    addClientVectors(table);
 }
 
 void addStringVectors(VectorTable& table)
@@ -186,30 +218,7 @@ void addStringVectors(VectorTable& table)
     table["c16.eq"] = [](const Vector&) { return Char16('A') == 'A'; };
     table["c16.stream"] = [](const Vector&) { return streamed(Char16('A')); };
     table["c16.stream2"] = [](const Vector&) { return streamed(Char16('A')); };
-
-    const auto one = [] { return Array<Uint32>(1, 1); };
-    table["array.oob.nc"] = [=](const Vector&) { return one()[1]; };
-    table["array.cow"] = [=](const Vector&) {
-        const Array<Uint32> a = one();
-        Array<Uint32> b = a;
-        b.append(2);
-        return json{a.size(), b.size()};
-    };
-    table["array.remove.oob"] = sizeOf([=] {
-        Array<Uint32> array = one();
-        array.remove(5);
-        return array;
-    });
-    table["array.insert.oob"] = sizeOf([=] {
-        Array<Uint32> array = one();
-        array.insert(5, 1);
-        return array;
-    });
-    table["array.size.ctor"] = [](const Vector&) {
-        const Array<String> array(3);
-        return json{array.size(), utf8(array[0])};
-    };
-    table["array.fill"] = [](const Vector&) { return Array<Uint32>(3, 7)[2]; };
+    addArrayVectors(table);
 }
 
 namespace {

@@ -56,6 +56,42 @@ std::vector<std::string> readBackDifferences(const std::string& file, mof::Memor
     return all;
 }
 
+struct SchemaRow
+{
+    const char* nameSpace;
+    const char* className;
+    const char* keys;
+    std::string properties;
+    const char* methods;
+};
+
+void expectMembers(const CIMConstClass& found, const SchemaRow& row)
+{
+    std::set<std::string> properties;
+    for (Uint32 i = 0; i < found.getPropertyCount(); ++i) {
+        const CIMConstProperty property = found.getProperty(i);
+        properties.insert(std::string(cimTypeToString(property.getType())) + (property.isArray() ? "[] " : " ") +
+                          utf8(property.getName().getString()));
+    }
+    std::istringstream wanted(row.properties);
+    for (std::string property; std::getline(wanted, property, ',');) {
+        EXPECT_EQ(properties.count(property), 1u) << row.className << ": " << property;
+    }
+    Array<CIMName> keys;
+    found.getKeyNames(keys);
+    std::multiset<std::string> keyNames;
+    for (Uint32 i = 0; i < keys.size(); ++i) {
+        keyNames.insert(utf8(keys[i].getString()));
+    }
+    std::istringstream keyWords(row.keys);
+    EXPECT_EQ(keyNames, std::multiset<std::string>(std::istream_iterator<std::string>(keyWords), {})) << row.className;
+    std::istringstream methodWords(row.methods);
+    for (std::string method; methodWords >> method;) {
+        EXPECT_NE(found.findMethod(CIMName(method.c_str())), PEG_NOT_FOUND) << row.className << "." << method;
+    }
+    EXPECT_FALSE(found.isAbstract()) << row.className;
+}
+
 } // namespace
 
 // What servers, programs and vendors' registrations rely on.
@@ -74,15 +110,7 @@ TEST(BaseSchemas, HoldWhatAServerNeeds)
         "string[] StatusDescriptions,string Status,uint16 HealthState";
     const std::string capabilities = std::string(kElement) + "string ProviderModuleName,string ProviderName,"
                                                              "string CapabilityID,uint16[] ProviderType,";
-    struct Row
-    {
-        const char* nameSpace;
-        const char* className;
-        const char* keys;
-        std::string properties;
-        const char* methods;
-    };
-    const Row rows[] = {
+    const SchemaRow rows[] = {
         {"root/PG_Internal", "PG_ConfigSetting", "PropertyName",
          "string PropertyName,string DefaultValue,string CurrentValue,string PlannedValue,string Description,"
          "boolean DynamicProperty",
@@ -99,33 +127,10 @@ TEST(BaseSchemas, HoldWhatAServerNeeds)
         {"root/PG_InterOp", "PG_ConsumerCapabilities", "ProviderModuleName ProviderName CapabilityID",
          capabilities + "string[] Destinations", ""},
     };
-    for (const Row& row : rows) {
+    for (const SchemaRow& row : rows) {
         const CIMConstClass found =
             repository.getClass(CIMNamespaceName(row.nameSpace), CIMName(row.className), {false, true, false, {}});
-        std::set<std::string> properties;
-        for (Uint32 i = 0; i < found.getPropertyCount(); ++i) {
-            const CIMConstProperty property = found.getProperty(i);
-            properties.insert(std::string(cimTypeToString(property.getType())) + (property.isArray() ? "[] " : " ") +
-                              utf8(property.getName().getString()));
-        }
-        std::istringstream wanted(row.properties);
-        for (std::string property; std::getline(wanted, property, ',');) {
-            EXPECT_EQ(properties.count(property), 1u) << row.className << ": " << property;
-        }
-        Array<CIMName> keys;
-        found.getKeyNames(keys);
-        std::multiset<std::string> keyNames;
-        for (Uint32 i = 0; i < keys.size(); ++i) {
-            keyNames.insert(utf8(keys[i].getString()));
-        }
-        std::istringstream keyWords(row.keys);
-        EXPECT_EQ(keyNames, std::multiset<std::string>(std::istream_iterator<std::string>(keyWords), {}))
-            << row.className;
-        std::istringstream methodWords(row.methods);
-        for (std::string method; methodWords >> method;) {
-            EXPECT_NE(found.findMethod(CIMName(method.c_str())), PEG_NOT_FOUND) << row.className << "." << method;
-        }
-        EXPECT_FALSE(found.isAbstract()) << row.className;
+        expectMembers(found, row);
     }
 }
 

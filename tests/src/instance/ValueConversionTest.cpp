@@ -57,72 +57,87 @@ struct TRow
     Pegasus::CIMValue fBack; // what the host's value becomes again
 };
 
-std::vector<TRow> Rows()
+// A row whose value comes back as it went.
+TRow Same(const char* name, const Pegasus::CIMValue& peg, const TCIMValue& host)
+{
+    return {name, peg, host, peg};
+}
+
+std::vector<TRow> ScalarRows()
 {
     using namespace Pegasus;
-    std::vector<TRow> rows;
-    const auto add = [&rows](const char* name, const Pegasus::CIMValue& peg, const TCIMValue& host,
-                             const Pegasus::CIMValue& back) {
-        rows.push_back({name, peg, host, back});
+    return {
+        Same("boolean true", CIMValue(true), TCIMValue(true)),
+        Same("boolean false", CIMValue(false), TCIMValue(false)),
+        Same("uint8 max", CIMValue(Max<Uint8>()), TCIMValue(Max<unsigned char>())),
+        Same("sint8 min", CIMValue(Min<Sint8>()), TCIMValue(Min<signed char>())),
+        Same("uint16 max", CIMValue(Max<Uint16>()), TCIMValue(Max<unsigned short>())),
+        Same("sint16 min", CIMValue(Min<Sint16>()), TCIMValue(Min<short>())),
+        Same("uint32 max", CIMValue(Max<Uint32>()), TCIMValue(Max<unsigned int>())),
+        Same("sint32 min", CIMValue(Min<Sint32>()), TCIMValue(Min<int>())),
+        Same("uint64 max", CIMValue(Max<Uint64>()), TCIMValue(Max<unsigned long>())),
+        Same("sint64 min", CIMValue(Min<Sint64>()), TCIMValue(Min<long>())),
+        Same("sint64 -1", CIMValue(Sint64(-1)), TCIMValue(-1L)),
+        Same("real32 max", CIMValue(Max<Real32>()), TCIMValue(Max<float>())),
+        Same("real64 lowest", CIMValue(Min<Real64>()), TCIMValue(Min<double>())),
+        Same("char16 A", CIMValue(Char16(65)), HostChar(65)),
+        Same("char16 max", CIMValue(Char16(65535)), HostChar(65535)),
+        Same("string", CIMValue(String("caf\xC3\xA9 \xE5\x90\x8D")),
+             TCIMValue(std::string("caf\xC3\xA9 \xE5\x90\x8D"))),
+        Same("string empty", CIMValue(String()), TCIMValue(std::string())),
+        Same("datetime", CIMValue(CIMDateTime(kTime)), TCIMValue(TCIMDateTime(kTime))),
+        Same("interval", CIMValue(CIMDateTime(kInterval)), TCIMValue(TCIMDateTime(kInterval))),
     };
-    const auto same = [&add](const char* name, const Pegasus::CIMValue& peg, const TCIMValue& host) {
-        add(name, peg, host, peg);
-    };
-    same("boolean true", CIMValue(true), TCIMValue(true));
-    same("boolean false", CIMValue(false), TCIMValue(false));
-    same("uint8 max", CIMValue(Max<Uint8>()), TCIMValue(Max<unsigned char>()));
-    same("sint8 min", CIMValue(Min<Sint8>()), TCIMValue(Min<signed char>()));
-    same("uint16 max", CIMValue(Max<Uint16>()), TCIMValue(Max<unsigned short>()));
-    same("sint16 min", CIMValue(Min<Sint16>()), TCIMValue(Min<short>()));
-    same("uint32 max", CIMValue(Max<Uint32>()), TCIMValue(Max<unsigned int>()));
-    same("sint32 min", CIMValue(Min<Sint32>()), TCIMValue(Min<int>()));
-    same("uint64 max", CIMValue(Max<Uint64>()), TCIMValue(Max<unsigned long>()));
-    same("sint64 min", CIMValue(Min<Sint64>()), TCIMValue(Min<long>()));
-    same("sint64 -1", CIMValue(Sint64(-1)), TCIMValue(-1L));
-    same("real32 max", CIMValue(Max<Real32>()), TCIMValue(Max<float>()));
-    same("real64 lowest", CIMValue(Min<Real64>()), TCIMValue(Min<double>()));
-    same("char16 A", CIMValue(Char16(65)), HostChar(65));
-    same("char16 max", CIMValue(Char16(65535)), HostChar(65535));
-    same("string", CIMValue(String("caf\xC3\xA9 \xE5\x90\x8D")), TCIMValue(std::string("caf\xC3\xA9 \xE5\x90\x8D")));
-    same("string empty", CIMValue(String()), TCIMValue(std::string()));
-    same("datetime", CIMValue(CIMDateTime(kTime)), TCIMValue(TCIMDateTime(kTime)));
-    same("interval", CIMValue(CIMDateTime(kInterval)), TCIMValue(TCIMDateTime(kInterval)));
+}
 
-    same("boolean[]", PegArray<Boolean>({true, false}), HostArray(TType::kBoolean, {true, false}));
-    same("uint8[]", PegArray<Uint8>({0, 255}),
-         HostArray(TType::kUint8, {static_cast<unsigned char>(0), static_cast<unsigned char>(255)}));
-    same("sint8[]", PegArray<Sint8>({-128, 127}),
-         HostArray(TType::kSint8, {static_cast<signed char>(-128), static_cast<signed char>(127)}));
-    add("uint16[] to low bytes", PegArray<Uint16>({258, 3}),
-        HostArray(TType::kUint16, {static_cast<unsigned short>(258), static_cast<unsigned short>(3)}),
-        PegArray<Uint8>({2, 3}));
-    add("sint16[] to low bytes", PegArray<Sint16>({-1, 256}),
-        HostArray(TType::kSint16, {static_cast<short>(-1), static_cast<short>(256)}), PegArray<Sint8>({-1, 0}));
-    same("uint32[]", PegArray<Uint32>({0, Max<Uint32>()}), HostArray(TType::kUint32, {0U, Max<unsigned int>()}));
-    same("sint32[]", PegArray<Sint32>({Min<Sint32>()}), HostArray(TType::kSint32, {Min<int>()}));
-    same("uint64[]", PegArray<Uint64>({Max<Uint64>()}), HostArray(TType::kUint64, {Max<unsigned long>()}));
-    same("sint64[]", PegArray<Sint64>({Min<Sint64>()}), HostArray(TType::kSint64, {Min<long>()}));
-    same("real32[]", PegArray<Real32>({1.5F}), HostArray(TType::kReal32, {1.5F}));
-    same("real64[]", PegArray<Real64>({-2.25}), HostArray(TType::kReal64, {-2.25}));
-    same("char16[]", PegArray<Char16>({Char16(65), Char16(65535)}),
-         HostArray(TType::kChar16, {HostChar(65), HostChar(65535)}));
-    same("string[]", PegArray<String>({String("a"), String()}),
-         HostArray(TType::kString, {std::string("a"), std::string()}));
-    same("datetime[]", PegArray<CIMDateTime>({CIMDateTime(kTime)}), HostArray(TType::kDatetime, {TCIMDateTime(kTime)}));
-    same("boolean[] empty", PegArray<Boolean>({}), HostArray(TType::kBoolean, {}));
-    same("uint8[] empty", PegArray<Uint8>({}), HostArray(TType::kUint8, {}));
-    same("sint8[] empty", PegArray<Sint8>({}), HostArray(TType::kSint8, {}));
-    add("uint16[] empty", PegArray<Uint16>({}), HostArray(TType::kUint16, {}), PegArray<Uint8>({}));
-    add("sint16[] empty", PegArray<Sint16>({}), HostArray(TType::kSint16, {}), PegArray<Sint8>({}));
-    same("uint32[] empty", PegArray<Uint32>({}), HostArray(TType::kUint32, {}));
-    same("sint32[] empty", PegArray<Sint32>({}), HostArray(TType::kSint32, {}));
-    same("uint64[] empty", PegArray<Uint64>({}), HostArray(TType::kUint64, {}));
-    same("sint64[] empty", PegArray<Sint64>({}), HostArray(TType::kSint64, {}));
-    same("real32[] empty", PegArray<Real32>({}), HostArray(TType::kReal32, {}));
-    same("real64[] empty", PegArray<Real64>({}), HostArray(TType::kReal64, {}));
-    same("char16[] empty", PegArray<Char16>({}), HostArray(TType::kChar16, {}));
-    same("string[] empty", PegArray<String>({}), HostArray(TType::kString, {}));
-    same("datetime[] empty", PegArray<CIMDateTime>({}), HostArray(TType::kDatetime, {}));
+std::vector<TRow> ArrayRows()
+{
+    using namespace Pegasus;
+    return {
+        Same("boolean[]", PegArray<Boolean>({true, false}), HostArray(TType::kBoolean, {true, false})),
+        Same("uint8[]", PegArray<Uint8>({0, 255}),
+             HostArray(TType::kUint8, {static_cast<unsigned char>(0), static_cast<unsigned char>(255)})),
+        Same("sint8[]", PegArray<Sint8>({-128, 127}),
+             HostArray(TType::kSint8, {static_cast<signed char>(-128), static_cast<signed char>(127)})),
+        TRow{"uint16[] to low bytes", PegArray<Uint16>({258, 3}),
+             HostArray(TType::kUint16, {static_cast<unsigned short>(258), static_cast<unsigned short>(3)}),
+             PegArray<Uint8>({2, 3})},
+        TRow{"sint16[] to low bytes", PegArray<Sint16>({-1, 256}),
+             HostArray(TType::kSint16, {static_cast<short>(-1), static_cast<short>(256)}), PegArray<Sint8>({-1, 0})},
+        Same("uint32[]", PegArray<Uint32>({0, Max<Uint32>()}), HostArray(TType::kUint32, {0U, Max<unsigned int>()})),
+        Same("sint32[]", PegArray<Sint32>({Min<Sint32>()}), HostArray(TType::kSint32, {Min<int>()})),
+        Same("uint64[]", PegArray<Uint64>({Max<Uint64>()}), HostArray(TType::kUint64, {Max<unsigned long>()})),
+        Same("sint64[]", PegArray<Sint64>({Min<Sint64>()}), HostArray(TType::kSint64, {Min<long>()})),
+        Same("real32[]", PegArray<Real32>({1.5F}), HostArray(TType::kReal32, {1.5F})),
+        Same("real64[]", PegArray<Real64>({-2.25}), HostArray(TType::kReal64, {-2.25})),
+        Same("char16[]", PegArray<Char16>({Char16(65), Char16(65535)}),
+             HostArray(TType::kChar16, {HostChar(65), HostChar(65535)})),
+        Same("string[]", PegArray<String>({String("a"), String()}),
+             HostArray(TType::kString, {std::string("a"), std::string()})),
+        Same("datetime[]", PegArray<CIMDateTime>({CIMDateTime(kTime)}),
+             HostArray(TType::kDatetime, {TCIMDateTime(kTime)})),
+        Same("boolean[] empty", PegArray<Boolean>({}), HostArray(TType::kBoolean, {})),
+        Same("uint8[] empty", PegArray<Uint8>({}), HostArray(TType::kUint8, {})),
+        Same("sint8[] empty", PegArray<Sint8>({}), HostArray(TType::kSint8, {})),
+        TRow{"uint16[] empty", PegArray<Uint16>({}), HostArray(TType::kUint16, {}), PegArray<Uint8>({})},
+        TRow{"sint16[] empty", PegArray<Sint16>({}), HostArray(TType::kSint16, {}), PegArray<Sint8>({})},
+        Same("uint32[] empty", PegArray<Uint32>({}), HostArray(TType::kUint32, {})),
+        Same("sint32[] empty", PegArray<Sint32>({}), HostArray(TType::kSint32, {})),
+        Same("uint64[] empty", PegArray<Uint64>({}), HostArray(TType::kUint64, {})),
+        Same("sint64[] empty", PegArray<Sint64>({}), HostArray(TType::kSint64, {})),
+        Same("real32[] empty", PegArray<Real32>({}), HostArray(TType::kReal32, {})),
+        Same("real64[] empty", PegArray<Real64>({}), HostArray(TType::kReal64, {})),
+        Same("char16[] empty", PegArray<Char16>({}), HostArray(TType::kChar16, {})),
+        Same("string[] empty", PegArray<String>({}), HostArray(TType::kString, {})),
+        Same("datetime[] empty", PegArray<CIMDateTime>({}), HostArray(TType::kDatetime, {})),
+    };
+}
+
+std::vector<TRow> Rows()
+{
+    std::vector<TRow> rows = ScalarRows();
+    const std::vector<TRow> arrays = ArrayRows();
+    rows.insert(rows.end(), arrays.begin(), arrays.end());
     return rows;
 }
 
