@@ -7,10 +7,12 @@
 
 namespace Pegasus::mof {
 
-// The parts of a declaration that say a type. All functions but the first throw MofError.
+// The parts of a declaration that say a type.
 
 // Returns: true for the word of a DSP0004 data type, and sets `type`.
 bool isDataType(const Token& word, CIMType& type);
+
+// The next three parse at the cursor and throw MofError.
 
 // Parses "[]", "[n]" or nothing, and completes `type`.
 void parseArraySuffix(TokenCursor& cursor, ValueType& type);

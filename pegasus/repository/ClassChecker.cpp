@@ -1,8 +1,6 @@
-#include "pegasus/repository/ClassChecker.h"
-
 #include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
-#include "pegasus/repository/EmbeddedTypes.h"
+#include "pegasus/repository/ClassRules.h"
 
 namespace Pegasus::repository {
 

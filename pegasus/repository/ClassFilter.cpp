@@ -1,4 +1,4 @@
-#include "pegasus/repository/ClassFilter.h"
+#include "pegasus/repository/ClassRules.h"
 
 namespace Pegasus::repository {
 

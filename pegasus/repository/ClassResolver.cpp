@@ -1,4 +1,4 @@
-#include "pegasus/repository/ClassResolver.h"
+#include "pegasus/repository/ClassRules.h"
 
 namespace Pegasus::repository {
 

@@ -2,11 +2,8 @@
 
 #include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
-#include "pegasus/repository/ClassChecker.h"
-#include "pegasus/repository/ClassFilter.h"
-#include "pegasus/repository/ClassResolver.h"
-#include "pegasus/repository/EmbeddedTypes.h"
-#include "pegasus/repository/NameKey.h"
+#include "pegasus/repository/ClassRules.h"
+#include "pegasus/repository/LookupKey.h"
 #include "pegasus/wire/ElementEncoder.h"
 
 namespace Pegasus::repository {

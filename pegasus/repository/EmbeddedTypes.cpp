@@ -1,15 +1,26 @@
-#include "pegasus/repository/EmbeddedTypes.h"
-
 #include "pegasus/common/EmbeddedKind.h"
 #include "pegasus/common/ObjectReps.h"
+#include "pegasus/repository/ClassRules.h"
 
 namespace Pegasus::repository {
 
 namespace {
 
-bool isEmbedded(CIMType type)
+CIMType embeddedType(const CIMConstProperty& property)
 {
-    return type == CIMTYPE_OBJECT || type == CIMTYPE_INSTANCE;
+    const CIMType type = property.getType();
+    if (type != CIMTYPE_STRING && type != CIMTYPE_OBJECT && type != CIMTYPE_INSTANCE) {
+        return type;
+    }
+    // By the qualifiers alone: the decoder's type is what is to be replaced.
+    switch (embeddedKind(CIMTYPE_STRING, ObjectAccess::rep(property).fQualifiers)) {
+    case EmbeddedKind::kInstance:
+        return property.isArray() ? CIMTYPE_STRING : CIMTYPE_INSTANCE;
+    case EmbeddedKind::kObject:
+        return CIMTYPE_STRING;
+    default:
+        return type;
+    }
 }
 
 bool changesType(const CIMConstProperty& property)
@@ -28,23 +39,6 @@ CIMProperty retyped(CIMProperty property)
 }
 
 } // namespace
-
-CIMType embeddedType(const CIMConstProperty& property)
-{
-    const CIMType type = property.getType();
-    if (type != CIMTYPE_STRING && !isEmbedded(type)) {
-        return type;
-    }
-    // By the qualifiers alone: the decoder's type is what is to be replaced.
-    switch (embeddedKind(CIMTYPE_STRING, ObjectAccess::rep(property).fQualifiers)) {
-    case EmbeddedKind::kInstance:
-        return property.isArray() ? CIMTYPE_STRING : CIMTYPE_INSTANCE;
-    case EmbeddedKind::kObject:
-        return CIMTYPE_STRING;
-    default:
-        return type;
-    }
-}
 
 CIMValue embeddedValue(const CIMConstProperty& property)
 {
@@ -73,18 +67,6 @@ CIMClass withEmbeddedTypes(CIMClass decoded)
         result.addMethod(decoded.getMethod(i));
     }
     return result;
-}
-
-bool isStorableAs(const CIMConstProperty& given, const CIMConstProperty& declared)
-{
-    if (given.isArray() != declared.isArray()) {
-        return false;
-    }
-    if (given.getType() == declared.getType()) {
-        return true;
-    }
-    const bool holdsEmbedded = embeddedKind(declared) != EmbeddedKind::kNone;
-    return holdsEmbedded && (isEmbedded(given.getType()) || given.getValue().isNull());
 }
 
 } // namespace Pegasus::repository

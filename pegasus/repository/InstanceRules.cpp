@@ -1,9 +1,9 @@
 #include "pegasus/repository/InstanceRules.h"
 
 #include "pegasus/base/Text.h"
+#include "pegasus/common/EmbeddedKind.h"
 #include "pegasus/repository/CimError.h"
-#include "pegasus/repository/ClassFilter.h"
-#include "pegasus/repository/EmbeddedTypes.h"
+#include "pegasus/repository/ClassRules.h"
 
 namespace Pegasus::repository {
 
@@ -22,6 +22,24 @@ CIMProperty propertyOf(const CIMConstProperty& declared, const CIMValue& value, 
 {
     return CIMProperty(declared.getName(), value, declared.getArraySize(), declared.getReferenceClassName(),
                        declared.getClassOrigin(), isPropagated);
+}
+
+bool isEmbedded(CIMType type)
+{
+    return type == CIMTYPE_OBJECT || type == CIMTYPE_INSTANCE;
+}
+
+// An embedded object may come from the decoder, or as the null of a client that has no type for it.
+bool isStorableAs(const CIMConstProperty& given, const CIMConstProperty& declared)
+{
+    if (given.isArray() != declared.isArray()) {
+        return false;
+    }
+    if (given.getType() == declared.getType()) {
+        return true;
+    }
+    const bool holdsEmbedded = embeddedKind(declared) != EmbeddedKind::kNone;
+    return holdsEmbedded && (isEmbedded(given.getType()) || given.getValue().isNull());
 }
 
 CIMProperty givenProperty(const CIMConstProperty& given, const CIMConstClass& itsClass)

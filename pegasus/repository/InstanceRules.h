@@ -15,6 +15,7 @@ CIMInstance completeInstance(const CIMConstInstance& given, const CIMConstClass&
 CIMObjectPath instancePath(const CIMConstInstance& completed, const CIMConstClass& itsClass);
 
 // Puts the values of `modified` (all, or those listed) into a stored instance.
+// Requires: `stored` is complete. The caller checks that its path stays the same.
 // Throws: CIM_ERR_FAILED ("no such property: X", "type mismatch").
 void mergeValues(CIMInstance& stored, const CIMConstInstance& modified, const CIMPropertyList& list);
 

@@ -3,7 +3,7 @@
 #include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
 #include "pegasus/repository/InstanceRules.h"
-#include "pegasus/repository/PathKey.h"
+#include "pegasus/repository/LookupKey.h"
 
 namespace Pegasus::repository {
 

@@ -2,7 +2,7 @@
 
 #include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
-#include "pegasus/repository/NameKey.h"
+#include "pegasus/repository/LookupKey.h"
 
 namespace Pegasus::repository {
 

@@ -1,6 +1,6 @@
 #include "pegasus/repository/ResolvedClassCache.h"
 
-#include "pegasus/repository/ClassFilter.h"
+#include "pegasus/repository/ClassRules.h"
 #include "pegasus/wire/ElementEncoder.h"
 
 namespace Pegasus::repository {

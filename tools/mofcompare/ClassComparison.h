@@ -18,6 +18,8 @@ using Declarations = std::function<bool(const Pegasus::CIMName& name, Pegasus::C
 std::vector<std::string> differences(const Pegasus::CIMConstClass& source, const Pegasus::CIMConstClass& readBack,
                                      const Declarations& declarations);
 
+// The same for a qualifier declaration: one line with both, or none.
+// Returns: an empty vector when they are equal.
 std::vector<std::string> differences(const Pegasus::CIMConstQualifierDecl& source,
                                      const Pegasus::CIMConstQualifierDecl& readBack);
 

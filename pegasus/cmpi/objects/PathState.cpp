@@ -126,7 +126,7 @@ void PathState::addKey(const char* name, const CMPIValue* value, CMPIType type)
     if (schema != nullptr) {
         const std::size_t at = schema->find(requireText(name));
         if (at == ClassSchema::kNotFound || !schema->properties()[at].isKey) {
-            throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, std::string(name) + " is no key of " + schema->text()};
+            throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, std::string(name) + " is not a key of " + schema->text()};
         }
         keyName = schema->properties()[at].name;
     } else {

@@ -1,7 +1,6 @@
 #include "pegasus/cmpi/objects/ValueCodec.h"
 
 #include "pegasus/base/Text.h"
-#include "pegasus/cmpi/objects/ArrayElements.h"
 #include "pegasus/cmpi/objects/ArrayObject.h"
 #include "pegasus/cmpi/objects/Broker.h"
 #include "pegasus/cmpi/objects/DateTimeObject.h"

@@ -1,7 +1,7 @@
-#include "pegasus/repository/PathKey.h"
+#include "pegasus/repository/LookupKey.h"
 
 #include "pegasus/base/Text.h"
-#include "pegasus/repository/NameKey.h"
+#include "pegasus/repository/LookupKey.h"
 
 #include <charconv>
 #include <cstdint>
