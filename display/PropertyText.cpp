@@ -1,187 +1,15 @@
 #include "display/PropertyText.h"
 
-#include "display/TValueMap.h"
+#include "display/PlainText.h"
+#include "display/TTextRules.h"
 
 #include <host/ICIMPropertyDecl.h>
-#include <host/ICIMQualifier.h>
 
-#include <algorithm>
-#include <charconv>
 #include <optional>
 
 namespace NKOLVRX20 {
-namespace {
 
-using TType = TCIMValue::TCIMType;
-using TTexts = std::vector<std::string>;
-
-constexpr unsigned char kDecimal = 10;
-constexpr unsigned int kBitCount = 64; // of the widest integer
-
-bool IsInteger(const TCIMValue& value)
-{
-    return value.GetType() >= TType::kUint8 && value.GetType() <= TType::kSint64;
-}
-
-bool IsNumber(const TCIMValue& value)
-{
-    return value.GetType() >= TType::kUint8 && value.GetType() <= TType::kReal64;
-}
-
-bool IsText(const TCIMValue& value)
-{
-    return value.GetType() == TType::kString || value.GetType() == TType::kChar16;
-}
-
-TWideInteger WideValue(const TCIMValue& integer)
-{
-    if (integer.GetType() == TType::kUint64) {
-        return static_cast<unsigned long>(integer);
-    }
-    return static_cast<long>(integer);
-}
-
-// Returns: the bits in the integer's own width: a sint8 of -1 has eight, where sign extension would make 64.
-unsigned long BitsOf(const TCIMValue& integer)
-{
-    switch (integer.GetType()) {
-    case TType::kSint8:
-        return static_cast<unsigned char>(integer);
-    case TType::kSint16:
-        return static_cast<unsigned short>(integer);
-    case TType::kSint32:
-        return static_cast<unsigned int>(integer);
-    default:
-        return static_cast<unsigned long>(integer);
-    }
-}
-
-std::string HexText(unsigned long number)
-{
-    char digits[2 * sizeof number];
-    const auto end = std::to_chars(std::begin(digits), std::end(digits), number, 16);
-    return "0x" + std::string(digits, end.ptr);
-}
-
-std::string PlainText(const TCIMValue& value)
-{
-    if (value.IsNull()) {
-        return "";
-    }
-    switch (value.GetType()) {
-    case TType::kDatetime:
-        return static_cast<TCIMDateTime>(value).ToUIString();
-    case TType::kChar16:
-        return CharacterText(static_cast<TCIMChar16>(value));
-    default:
-        return value.ToString(kDecimal);
-    }
-}
-
-std::string Joined(const TTexts& texts, const char* separator)
-{
-    std::string joined;
-    for (std::size_t i = 0; i < texts.size(); ++i) {
-        joined += (i == 0 ? "" : separator) + texts[i];
-    }
-    return joined;
-}
-
-TCIMValue QualifierValue(const ICIMPropertyDecl& declaration, const char* name)
-{
-    const auto qualifier = declaration.GetQualifier(name, {});
-    return qualifier ? qualifier->GetValue({}) : TCIMValue();
-}
-
-TTexts QualifierTexts(const ICIMPropertyDecl& declaration, const char* name)
-{
-    TTexts texts;
-    const TCIMValue value = QualifierValue(declaration, name);
-    if (value.IsArray()) {
-        for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(value)) {
-            texts.push_back(element.ToString(kDecimal));
-        }
-    }
-    return texts;
-}
-
-// Units is deprecated in favour of PUnit (DSP0004, 5.6.3), but reads better.
-std::string UnitText(const ICIMPropertyDecl& declaration)
-{
-    const std::string units = QualifierValue(declaration, "Units").ToString(kDecimal);
-    return units.empty() ? QualifierValue(declaration, "PUnit").ToString(kDecimal) : units;
-}
-
-// What a declaration says about texts, read once for all elements of a value.
-class TTextRules
-{
-  public:
-    explicit TTextRules(const ICIMPropertyDecl& declaration)
-        : fValueMap(QualifierTexts(declaration, "ValueMap")), fValues(QualifierTexts(declaration, "Values")),
-          fBitMap(QualifierTexts(declaration, "BitMap")), fBitValues(QualifierTexts(declaration, "BitValues")),
-          fUnit(UnitText(declaration))
-    {
-    }
-
-    std::string Text(const TCIMValue& value) const
-    {
-        // ValueMap may have more entries than Values has texts; such a value has no text of its own.
-        const auto index = ValueIndex(value);
-        if (index && *index < fValues.size()) {
-            return fValues[*index];
-        }
-        const std::string bits = IsInteger(value) ? BitText(BitsOf(value)) : "";
-        if (!bits.empty()) {
-            return bits;
-        }
-        return fUnit.empty() || !IsNumber(value) ? PlainText(value) : PlainText(value) + " " + fUnit;
-    }
-
-  private:
-    std::optional<std::size_t> ValueIndex(const TCIMValue& value) const
-    {
-        if (IsInteger(value)) {
-            return fValueMap.Find(WideValue(value));
-        }
-        return IsText(value) ? fValueMap.Find(PlainText(value)) : std::nullopt;
-    }
-
-    std::string BitText(unsigned long bits) const
-    {
-        TTexts texts;
-        unsigned long rest = bits;
-        for (unsigned int bit = 0; bit < kBitCount; ++bit) {
-            const unsigned long mask = 1UL << bit;
-            const auto index = (bits & mask) != 0 ? fBitMap.Find(TWideInteger(bit)) : std::nullopt;
-            if (index && *index < fBitValues.size()) {
-                AddOnce(texts, fBitValues[*index]);
-                rest &= ~mask;
-            }
-        }
-        if (!texts.empty() && rest != 0) {
-            texts.push_back(HexText(rest));
-        }
-        return Joined(texts, " | ");
-    }
-
-    // An entry that is a range may cover several of the bits.
-    static void AddOnce(TTexts& texts, const std::string& text)
-    {
-        if (std::find(texts.begin(), texts.end(), text) == texts.end()) {
-            texts.push_back(text);
-        }
-    }
-
-    const TValueMap fValueMap;
-    const TTexts fValues;
-    const TValueMap fBitMap;
-    const TTexts fBitValues;
-    const std::string fUnit;
-};
-
-} // namespace
-
-TTexts PropertyTexts(const TCIMValue& value, const boost::shared_ptr<ICIMPropertyDecl>& declaration)
+std::vector<std::string> PropertyTexts(const TCIMValue& value, const boost::shared_ptr<ICIMPropertyDecl>& declaration)
 {
     if (value.IsNull()) {
         return {};
@@ -192,7 +20,7 @@ TTexts PropertyTexts(const TCIMValue& value, const boost::shared_ptr<ICIMPropert
     if (declaration) {
         rules.emplace(*declaration);
     }
-    TTexts texts;
+    std::vector<std::string> texts;
     texts.reserve(elements.size());
     for (const TCIMValue& element : elements) {
         texts.push_back(rules && !element.IsNull() ? rules->Text(element) : PlainText(element));
@@ -202,23 +30,7 @@ TTexts PropertyTexts(const TCIMValue& value, const boost::shared_ptr<ICIMPropert
 
 std::string PropertyText(const TCIMValue& value, const boost::shared_ptr<ICIMPropertyDecl>& declaration)
 {
-    return Joined(PropertyTexts(value, declaration), ", ");
-}
-
-std::string CharacterText(TCIMChar16 character)
-{
-    const auto byte = [](unsigned int value) { return static_cast<char>(value); };
-    unsigned int code = character.GetCode();
-    if (code >= 0xd800 && code < 0xe000) {
-        code = 0xfffd;
-    }
-    if (code < 0x80) {
-        return {byte(code)};
-    }
-    if (code < 0x800) {
-        return {byte(0xc0u | code >> 6), byte(0x80u | (code & 0x3fu))};
-    }
-    return {byte(0xe0u | code >> 12), byte(0x80u | (code >> 6 & 0x3fu)), byte(0x80u | (code & 0x3fu))};
+    return JoinTexts(PropertyTexts(value, declaration), ", ");
 }
 
 } // namespace NKOLVRX20

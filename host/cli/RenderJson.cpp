@@ -1,4 +1,4 @@
-#include "display/PropertyText.h"
+#include "display/PlainText.h"
 #include "host/cli/Document.h"
 
 #include <nlohmann/json.hpp>

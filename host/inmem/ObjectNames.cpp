@@ -1,6 +1,6 @@
 #include "host/inmem/ObjectNames.h"
 
-#include "display/PropertyText.h"
+#include "display/PlainText.h"
 
 #include <charconv>
 
