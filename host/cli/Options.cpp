@@ -1,5 +1,7 @@
 #include "host/cli/Options.h"
 
+#include "host/cli/UsageError.h"
+
 #include <CLI/CLI.hpp>
 
 #include <filesystem>
@@ -30,6 +32,9 @@ void MakeAbsolute(std::string& path)
     }
 }
 
+// The one setting of this project's plug-in.
+constexpr char kThreadsKey[] = "pegasus_multi_thread";
+
 bool SplitSetting(const std::string& text, TOptions& options)
 {
     const std::size_t equals = text.find('=');
@@ -58,7 +63,7 @@ void AddOptions(CLI::App& app, TOptions& options, std::vector<std::string>& sett
             TOptions ignored;
             return SplitSetting(text, ignored) ? std::string() : "key=value is expected, not \"" + text + "\"";
         });
-    app.add_option("--log", options.fLogFile, "The host's log, begun anew (default ROOT/vrxhost.log)");
+    app.add_option("--log", options.fLogFile, "The host's log, truncated by each run (default ROOT/vrxhost.log)");
     app.add_option("--plugin", options.fPlugin, "The plug-in (default ROOT/libpegasus.nsp.so)");
     app.add_option("--root", options.fRoot, "The root directory")->check(CLI::ExistingDirectory);
     app.add_option(
@@ -71,9 +76,9 @@ void AddOptions(CLI::App& app, TOptions& options, std::vector<std::string>& sett
 void AddCommands(CLI::App& app, TOptions& options)
 {
     const auto add = [&](const char* name, const char* text, ECommand command) {
-        return app.add_subcommand(name, text)->fallthrough()->callback([&options, command] {
-            options.fCommand = command;
-        });
+        CLI::App* const added = app.add_subcommand(name, text)->fallthrough();
+        added->set_help_flag(); // --help is the program's, with all options
+        return added->callback([&options, command] { options.fCommand = command; });
     };
     add("inventory", "Show every provider's classes and their instances", ECommand::kInventory);
     add("providers", "List the providers and their classes", ECommand::kProviders);
@@ -81,7 +86,79 @@ void AddCommands(CLI::App& app, TOptions& options)
     add("instances", "Show one class's instances", ECommand::kInstances)
         ->add_option("CLASS", options.fClassName, "The class's name")
         ->required();
-    app.require_subcommand(1);
+}
+
+std::vector<std::string> CommandNames(CLI::App& app)
+{
+    std::vector<std::string> names;
+    for (const CLI::App* command : app.get_subcommands([](const CLI::App*) { return true; })) {
+        names.push_back(command->get_name());
+    }
+    return names;
+}
+
+std::vector<std::string> OptionNames(const CLI::App& app)
+{
+    std::vector<std::string> names;
+    for (const CLI::Option* option : app.get_options()) {
+        for (const std::string& name : option->get_lnames()) {
+            names.push_back("--" + name);
+        }
+    }
+    return names;
+}
+
+// What nothing on the command line took, the first of it.
+// Throws: TUsageError.
+void RefuseUnknown(CLI::App& app)
+{
+    const std::vector<std::string> unknown = app.remaining(true);
+    for (const std::string& word : unknown) {
+        if (word.front() == '-') {
+            const std::string name = word.substr(0, word.find('='));
+            throw TUsageError("there is no option " + name + Suggestion(name, OptionNames(app)));
+        }
+    }
+    const bool hasCommand = !app.get_subcommands().empty();
+    if (!hasCommand && unknown.empty()) {
+        throw TUsageError("a command is missing: inventory, providers, classes or instances; --help describes them");
+    }
+    if (!hasCommand) {
+        throw TUsageError("there is no command " + unknown.front() + Suggestion(unknown.front(), CommandNames(app)));
+    }
+    if (!unknown.empty()) {
+        throw TUsageError("the argument " + unknown.front() + " is one too many");
+    }
+}
+
+// Other keys may be another plug-in's.
+// Throws: TUsageError.
+void RefuseMistyped(const TOptions& options)
+{
+    for (const auto& [key, value] : options.fSettings) {
+        const std::string suggestion = Suggestion(key, {kThreadsKey});
+        if (key != kThreadsKey && !suggestion.empty()) {
+            throw TUsageError("there is no setting " + key + suggestion);
+        }
+        if (key == kThreadsKey && value != "on" && value != "off") {
+            throw TUsageError(key + " is on or off, not \"" + value + "\"");
+        }
+    }
+}
+
+// The format is asked for before the command line is read, because an error in it is reported in that format too.
+EFormat WantedFormat(int argc, const char* const* argv)
+{
+    const std::vector<std::string> words(argv + 1, argv + argc);
+    const auto isJson = [](const std::string& word, const std::string& next) {
+        return word == "--format=json" || (word == "--format" && next == "json");
+    };
+    for (std::size_t i = 0; i < words.size(); ++i) {
+        if (isJson(words[i], i + 1 < words.size() ? words[i + 1] : "")) {
+            return EFormat::kJson;
+        }
+    }
+    return EFormat::kTable;
 }
 
 void FillDefaults(TOptions& options, const std::vector<std::string>& settings)
@@ -118,23 +195,28 @@ void SetRoot(const TDeployedTree& tree, TOptions& options)
     }
 }
 
-int ParseOptions(int argc, const char* const* argv, TOptions& options)
+bool ParseOptions(int argc, const char* const* argv, TOptions& options)
 {
     CLI::App app("Shows the inventory that a namespace-provider plug-in serves.", "vrxhost");
     std::vector<std::string> settings;
+    options.fFormat = WantedFormat(argc, argv);
     app.footer(kFooter);
+    app.allow_extras();
     AddOptions(app, options, settings);
     AddCommands(app, options);
     try {
         app.parse(argc, argv);
-        FillDefaults(options, settings);
+    } catch (const CLI::CallForHelp&) {
+        app.clear(); // with a command it would be the command's help alone, without the options
+        std::cout << app.help();
+        return false;
     } catch (const CLI::ParseError& e) {
-        return app.exit(e, std::cout, std::cerr) == 0 ? kComplete : kUsage;
-    } catch (const fs::filesystem_error& e) {
-        std::cerr << "vrxhost: " << e.what() << "\n";
-        return kFailed;
+        throw TUsageError(e.what());
     }
-    return -1;
+    RefuseUnknown(app);
+    FillDefaults(options, settings);
+    RefuseMistyped(options);
+    return true;
 }
 
 } // namespace vrxhost

@@ -52,9 +52,10 @@ constexpr char kPluginFile[] = "libpegasus.nsp.so";
 constexpr char kConfigFile[] = "vrx.conf";
 constexpr char kLogFile[] = "vrxhost.log";
 
-// Reads the command line; paths come out absolute. Help goes to standard output, errors to standard error.
-// Returns: -1 to go on with the options, else the exit status.
-int ParseOptions(int argc, const char* const* argv, TOptions& options);
+// Reads the command line; paths come out absolute. Help goes to standard output. The format is filled in first, also
+// when the rest cannot be read. Returns: false when help was all that was wanted. Throws: TUsageError,
+// std::filesystem::filesystem_error.
+bool ParseOptions(int argc, const char* const* argv, TOptions& options);
 
 // Makes a tree the root: the default place of the plug-in, the settings file and the log, and what the default consumer
 // is made of.

@@ -9,8 +9,8 @@ namespace vrxhost {
 namespace {
 
 using NKOLVRX20::TCIMValue;
-typedef nlohmann::ordered_json TJson;
-typedef TCIMValue::TCIMType TType;
+using TJson = nlohmann::ordered_json;
+using TType = TCIMValue::TCIMType;
 
 // Through the shortest text, so that a real32 of 0.1 is shown as 0.1 and not as the double beside it.
 TJson RealValue(const TCIMValue& value)

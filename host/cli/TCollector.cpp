@@ -158,7 +158,8 @@ TCollector::TClassPtr TCollector::FindClass(const std::string& name)
 {
     for (const TProviderPtr& provider : ListProviders()) {
         for (const TClassPtr& each : ListClasses(*provider, provider->GetName(kNoContext))) {
-            if (strcasecmp(each->GetName(kNoContext).c_str(), name.c_str()) == 0) {
+            fClassNames.push_back(each->GetName(kNoContext));
+            if (strcasecmp(fClassNames.back().c_str(), name.c_str()) == 0) {
                 return each;
             }
         }

@@ -20,9 +20,12 @@ class TCollector
     // Returns: the providers, filled to the depth of the command; of kInstances one without a name, with the one class.
     std::vector<TProviderRecord> Collect(ECommand command, const std::string& className);
 
+    // Returns: the names of the classes that were looked through for the one of kInstances.
+    const std::vector<std::string>& GetClassNames() const { return fClassNames; }
+
   private:
-    typedef boost::shared_ptr<NKOLVRX20::ICIMClass> TClassPtr;
-    typedef boost::shared_ptr<NKOLVRX20::IProvider> TProviderPtr;
+    using TClassPtr = boost::shared_ptr<NKOLVRX20::ICIMClass>;
+    using TProviderPtr = boost::shared_ptr<NKOLVRX20::IProvider>;
 
     std::vector<TProviderPtr> ListProviders();
     std::vector<TClassPtr> ListClasses(NKOLVRX20::IProvider& provider, const std::string& name);
@@ -39,6 +42,7 @@ class TCollector
     NKOLVRX20::ICIMNamespace& fNamespace;
     TLossLog& fLosses;
     std::function<bool()> fIsStopped;
+    std::vector<std::string> fClassNames;
 };
 
 } // namespace vrxhost

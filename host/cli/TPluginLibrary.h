@@ -45,7 +45,7 @@ class TPluginLibrary
     static bool HasLeftThreads();
 
   private:
-    typedef void (*TEntryPoint)();
+    using TEntryPoint = void (*)();
 
     TEntryPoint Symbol(const char* name) const;
     void Register();

@@ -2,12 +2,14 @@
 
 #include "host/cli/ErrorReport.h"
 #include "host/cli/TCollector.h"
+#include "host/cli/UsageError.h"
 #include "host/core/TProcessControl.h"
 
 #include <host/TConfig.h>
 #include <host/TRootObject.h>
 
 #include <chrono>
+#include <fstream>
 #include <random>
 
 namespace vrxhost {
@@ -18,6 +20,20 @@ constexpr int kAttempts = 3;
 constexpr int kLongestPauseMs = 500;
 
 constexpr std::chrono::seconds kGraceOfAttempt{4}; // longer than the pauses of one attempt that is left in order
+
+// Returns: the first line that is not "key = value", a comment or empty; without one, what the reader said.
+std::string SettingsError(const std::string& file, const std::string& error)
+{
+    std::ifstream lines(file);
+    std::string line;
+    for (int number = 1; std::getline(lines, line); ++number) {
+        const std::size_t begin = line.find_first_not_of(" \t\r");
+        if (begin != std::string::npos && line[begin] != '#' && line.find('=') == std::string::npos) {
+            return "line " + std::to_string(number) + " is not \"key = value\"";
+        }
+    }
+    return error;
+}
 
 } // namespace
 
@@ -80,7 +96,8 @@ void TRun::LoadSettings() const
     if (!fOptions.fConfigFile.empty()) {
         const std::string error = ErrorOf([&] { TConfig::GetInstance()->Load(fOptions.fConfigFile); });
         if (!error.empty()) {
-            throw TPluginError("the settings file " + fOptions.fConfigFile + " could not be read: " + error);
+            throw TPluginError("the settings file " + fOptions.fConfigFile +
+                               " could not be read: " + SettingsError(fOptions.fConfigFile, error));
         }
     }
     for (const auto& setting : fOptions.fSettings) {
@@ -146,15 +163,20 @@ void TRun::UsePlugin()
 void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
 {
     std::vector<TProviderRecord> providers;
+    std::string noClass;
     const std::string error = ErrorOf([&] {
         TCollector collector(ns, fLosses, [this] { return fStop.IsStopped(); });
         providers = collector.Collect(fOptions.fCommand, fOptions.fClassName);
+        if (fOptions.fCommand == ECommand::kInstances && providers.empty()) {
+            noClass =
+                "there is no class " + fOptions.fClassName + Suggestion(fOptions.fClassName, collector.GetClassNames());
+        }
     });
     if (!error.empty()) {
         fLosses.Add("the inventory is incomplete: " + error);
     }
-    if (fOptions.fCommand == ECommand::kInstances && providers.empty()) {
-        fReport.Fail("there is no class " + fOptions.fClassName);
+    if (!noClass.empty()) {
+        fReport.Fail(noClass);
     } else {
         fReport.Show(std::move(providers));
     }

@@ -7,6 +7,7 @@
 #include "host/cli/TPluginLibrary.h"
 #include "host/cli/TPrivateRoot.h"
 #include "host/cli/TRun.h"
+#include "host/cli/UsageError.h"
 #include "host/core/TCoreLogger.h"
 #include "host/core/TUniqueFd.h"
 
@@ -113,12 +114,10 @@ EExitStatus Run(TOptions& options)
 int Main(int argc, const char* const* argv)
 {
     TOptions options;
-    const int status = ParseOptions(argc, argv, options);
-    if (status >= 0) {
-        return status;
-    }
     try {
-        return Run(options);
+        return ParseOptions(argc, argv, options) ? Run(options) : kComplete;
+    } catch (const TUsageError& e) {
+        return Refuse(options, e.what(), kUsage);
     } catch (const TTreeError& e) {
         return Refuse(options, e.what(), kUsage);
     } catch (const std::runtime_error& e) {

@@ -13,6 +13,7 @@ namespace {
 
 using testing::HasSubstr;
 using testing::Not;
+using testing::StartsWith;
 
 TEST_F(VrxhostProgram, InventoryAsTable)
 {
@@ -194,26 +195,42 @@ struct TUsageRow
 };
 
 const TUsageRow kUsages[] = {
-    {{}, 2, "subcommand"},
-    {{"frobnicate"}, 2, "subcommand"},
+    {{}, 2, "a command is missing: inventory, providers, classes or instances"},
+    {{"frobnicate"}, 2, "there is no command frobnicate"},
+    {{"inventry"}, 2, "there is no command inventry; did you mean inventory?"},
+    {{"inventory", "--formt", "json"}, 2, "there is no option --formt; did you mean --format?"},
+    {{"classes", "Fake_Many"}, 2, "the argument Fake_Many is one too many"},
     {{"instances"}, 2, "CLASS is required"},
     {{"inventory", "--format", "xml"}, 2, "--format"},
     {{"inventory", "--set", "novalue"}, 2, "key=value is expected, not \"novalue\""},
+    {{"inventory", "--set", "Pegasus_multithread=on"}, 2, "did you mean pegasus_multi_thread?"},
+    {{"inventory", "--set", "pegasus_multi_thread=yes"}, 2, "pegasus_multi_thread is on or off, not \"yes\""},
     {{"inventory", "--config", "/nonexistent"}, 2, "/nonexistent"},
     {{"instances", "Fake_None"}, 1, "there is no class Fake_None"},
+    {{"instances", "fake_evrytype"}, 1, "there is no class fake_evrytype; did you mean Fake_EveryType?"},
 };
 
-TEST_F(VrxhostProgram, UsageErrorsHaveTheirOwnStatus)
+TEST_F(VrxhostProgram, UsageErrorIsOneSentenceAndADocument)
 {
     for (const TUsageRow& row : kUsages) {
+        SCOPED_TRACE(row.fError);
         const auto outcome = Run(row.fArguments);
-        EXPECT_TRUE(HasStatus(outcome, row.fStatus)) << row.fError;
+        EXPECT_TRUE(HasStatus(outcome, row.fStatus));
         EXPECT_EQ(outcome.fOutput, "");
+        EXPECT_THAT(outcome.fErrorOutput, StartsWith("vrxhost: "));
         EXPECT_THAT(outcome.fErrorOutput, HasSubstr(row.fError));
+        auto arguments = row.fArguments;
+        arguments.insert(arguments.begin(), {"--format", "json"});
+        const auto json = nlohmann::json::parse(Run(arguments).fOutput, nullptr, false);
+        ASSERT_TRUE(json.is_object());
+        EXPECT_EQ(json["losses"].size(), 1u);
     }
-    const auto help = Run({"--help"});
-    EXPECT_TRUE(HasStatus(help, 0));
-    EXPECT_THAT(help.fOutput, HasSubstr("Exit status: 0 complete"));
+    for (const auto& arguments : std::vector<std::vector<std::string>>{{"--help"}, {"inventory", "--help"}}) {
+        const auto help = Run(arguments);
+        EXPECT_TRUE(HasStatus(help, 0));
+        EXPECT_THAT(help.fOutput, HasSubstr("Exit status: 0 complete"));
+        EXPECT_THAT(help.fOutput, HasSubstr("--consumer"));
+    }
 }
 
 TEST_F(VrxhostProgram, SettingsFileAndLogFile)
@@ -226,10 +243,10 @@ TEST_F(VrxhostProgram, SettingsFileAndLogFile)
     EXPECT_THAT(outcome.fErrorOutput, HasSubstr("consumer vrxhost-")) << "-v shows the log";
     EXPECT_THAT(ReadFile(fRoot / "other.log"), HasSubstr("consumer vrxhost-"));
     EXPECT_FALSE(fs::exists(fRoot / "vrxhost.log"));
-    std::ofstream(fRoot / "vrx.conf") << "no equals sign";
+    std::ofstream(fRoot / "vrx.conf") << "# comment\nno equals sign";
     const auto bad = Run({"providers"});
     EXPECT_TRUE(HasStatus(bad, 1));
-    EXPECT_THAT(bad.fErrorOutput, HasSubstr("vrx.conf could not be read"));
+    EXPECT_THAT(bad.fErrorOutput, HasSubstr("vrx.conf could not be read: line 2 is not \"key = value\""));
     const auto noLog = Run({"--config", "/dev/null", "--log", "/dev/null/x", "providers"});
     EXPECT_TRUE(HasStatus(noLog, 0));
     EXPECT_THAT(noLog.fErrorOutput, HasSubstr("the log file /dev/null/x could not be opened"));
