@@ -31,7 +31,7 @@ bool AsksForProviders(const TCIMContext& context)
         LogFailure(kWrongContextTypeText);
         throw TVRXException(TVRXStatusCode::kTypeMismatch);
     }
-    return static_cast<signed char>(entry->second) == kPluginTypeOfProviders;
+    return !entry->second.IsNull() && static_cast<signed char>(entry->second) == kPluginTypeOfProviders;
 }
 
 void VisitInOrder(const std::vector<boost::shared_ptr<TPEGASUSProvider>>& providers, const TProviderVisitor& visitor)

@@ -392,3 +392,4 @@ TEST_F(ThreadedRegistrationTest, ListsProvidersForTheirOwnPluginTypeOnly)
 
 } // namespace
 } // namespace NKOLVRX20
+    EXPECT_EQ(0, visits({{"pluginType", TCIMValue(TCIMValue::TCIMType::kSint8, 0)}})); // a null is another type
