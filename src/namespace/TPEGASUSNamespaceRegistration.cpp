@@ -11,6 +11,8 @@
 #include <host/ICIMClass.h>
 #include <host/TVRXException.h>
 
+#include <algorithm>
+
 namespace NKOLVRX20 {
 
 namespace {
@@ -92,8 +94,11 @@ void TPEGASUSNamespace::RegisterProviders()
 void TPEGASUSNamespace::regProvider(std::string path, boost::shared_ptr<TPEGASUSProvider> provider)
 {
     LogProgress("Entering TPEGASUSNamespace::regProvider: ", path);
-    const std::vector<std::string> specifications = BuildMofPath(path, kSpecificationExtension);
-    const std::vector<std::string> registrations = BuildMofPath(path, kRegistrationExtension);
+    std::vector<std::string> specifications = BuildMofPath(path, kSpecificationExtension);
+    std::vector<std::string> registrations = BuildMofPath(path, kRegistrationExtension);
+    // A directory has no order of its own, and one file may need what another defines: the vendor decides by the names.
+    std::sort(specifications.begin(), specifications.end());
+    std::sort(registrations.begin(), registrations.end());
     for (const std::string& file : specifications) {
         callCimmof(provider->GetNameSpaceName({}), file);
     }

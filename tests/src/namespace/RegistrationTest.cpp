@@ -128,6 +128,25 @@ TEST_F(RegistrationTest, CompilesDefinitionsBeforeRegistrationsThenCollectsAndCo
     EXPECT_EQ(&provider, bound->GetProvider().get());
 }
 
+TEST_F(RegistrationTest, AVendorsFilesOfOneKindAreCompiledByTheirNames)
+{
+    AddProvider("acme", {});
+    std::vector<std::string> trace;
+    for (const char* kind : {".properties.mof", ".registration.mof"}) {
+        for (const char* name : {"c", "a", "d", "B", "10", "9"}) { // no directory has them in the order of their names
+            fRig.WriteProvider("acme", std::string(name) + kind, "");
+        }
+        for (const char* name : {"10", "9", "B", "a", "c", "d"}) {
+            trace.push_back(std::string("run cimmof -n ") + (*(kind + 1) == 'p' ? "root/acme" : "root/PG_InterOp") +
+                            " -aE M/pegasus/provider/acme/" + name + kind);
+        }
+    }
+    fRig.MakeConnectedNamespace(fServer)->FindProviders();
+    auto traced = fRig.Abbreviate(fRig.fWorld.Trace());
+    traced.resize(trace.size()); // without the end of the namespace
+    EXPECT_EQ(trace, traced);
+}
+
 TEST_F(RegistrationTest, UnknownClassesAreLeftOutAndTheNextFollow)
 {
     AddProvider("acme", {"ACME_One", "ACME_None", "ACME_Two"});
