@@ -100,7 +100,7 @@ void TPEGASUSNamespace::regProvider(std::string path, boost::shared_ptr<TPEGASUS
     std::sort(specifications.begin(), specifications.end());
     std::sort(registrations.begin(), registrations.end());
     for (const std::string& file : specifications) {
-        callCimmof(provider->GetNameSpaceName({}), file);
+        callCimmof(provider->GetServerNamespace(), file);
     }
     for (const std::string& file : registrations) {
         callCimmof(kInterOpNamespace, file);
@@ -127,7 +127,10 @@ boost::shared_ptr<ICIMClass> TPEGASUSNamespace::CollectClass(const std::string& 
 {
     std::map<std::string, std::string> tags = {{kTimeOutTag, provider->GetDefaultTimeoutVal()}};
     const std::string name = filterTag4classes(entry, tags);
-    const TCIMContext context = {{kNspKey, provider->GetNameSpaceName({})}, {kTimeoutKey, tags[kTimeOutTag]}};
+    const std::string& timeout = tags[kTimeOutTag];
+    // Neither the file nor the entry need give a timeout, and 0 seconds would make every call fail.
+    const TCIMContext context = {{kNspKey, provider->GetServerNamespace()},
+                                 {kTimeoutKey, timeout.empty() ? strTimeout : timeout}};
     const auto requestedClass = boost::dynamic_pointer_cast<TPEGASUSClass>(GetClass(name, context));
     if (requestedClass) {
         if (tags[kTag] == kCdmTag) {

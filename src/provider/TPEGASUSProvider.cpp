@@ -116,9 +116,14 @@ void TPEGASUSProvider::connectPegasusClient(const std::string& host, unsigned sh
     fConnection.Connect(host, port, user, password);
 }
 
+const std::string& TPEGASUSProvider::GetServerNamespace() const
+{
+    return fNameSpaceName.empty() ? kDefaultCimNamespace : fNameSpaceName;
+}
+
 Pegasus::CIMNamespaceName TPEGASUSProvider::GetPegNamespace() const
 {
-    return Pegasus::CIMNamespaceName(fNameSpaceName.c_str());
+    return Pegasus::CIMNamespaceName(GetServerNamespace().c_str());
 }
 
 bool TPEGASUSProvider::IsClassesProvided(const std::string& className) const

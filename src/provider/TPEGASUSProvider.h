@@ -43,8 +43,11 @@ class TPEGASUSProvider : public IProvider, public TClientOwner
     void initPegasusClient();
     void connectPegasusClient(const std::string& host, unsigned short port, const std::string& user,
                               const std::string& password);
-    // Returns: the namespace name as the client library wants it.
-    // Throws: Pegasus::InvalidNamespaceNameException when the requested-class file gave none or a bad one.
+    // Returns: the server namespace in which the provider's classes are compiled and asked for: the one that the
+    // requested-class file gives, else "root/cimv2".
+    const std::string& GetServerNamespace() const;
+    // Returns: the same as the client library wants it.
+    // Throws: Pegasus::InvalidNamespaceNameException when the requested-class file gave a bad one.
     Pegasus::CIMNamespaceName GetPegNamespace() const;
 
     // Returns: whether a class of exactly this name, case included, was collected.
@@ -68,7 +71,7 @@ class TPEGASUSProvider : public IProvider, public TClientOwner
     const std::string& GetType() const { return fType; }
     // Returns: the full path of the requested-class file; the provider's identity.
     const std::string& GetPath() const { return fPath; }
-    // Returns: the server namespace of the provider's classes, for instance "root/cimv2"; possibly empty.
+    // Returns: the namespace as the requested-class file gives it, for instance "root/cimv2"; possibly empty.
     const std::string& GetNameSpaceName(const TCIMContext& context) const;
     const std::string& GetDefaultTimeoutVal() const { return fDefaultTimeout; }
     // Returns: the requested entries as the file has them, time-outs and tags included.

@@ -169,7 +169,7 @@ boost::shared_ptr<TPEGASUSInstance> TInstanceRetrieval::Find(const TAnswer& answ
 std::string TInstanceRetrieval::ProviderNamespaceName() const
 {
     const auto provider = fClass.GetProvider();
-    return provider ? provider->GetNameSpaceName({}) : fClass.GetPegasusNSPStr();
+    return provider ? provider->GetServerNamespace() : fClass.GetPegasusNSPStr();
 }
 
 void TInstanceRetrieval::LogCallingNamespace() const

@@ -128,7 +128,7 @@ TEST_F(DiscoveryTest, AFileThatCannotBeReadGivesAnEmptyProvider)
         EXPECT_EQ("", provider.GetDefaultTimeoutVal());
         EXPECT_THAT(provider.GetClassVector(), IsEmpty());
         EXPECT_FALSE(provider.GetDiagnosticOnly());
-        EXPECT_THROW(provider.GetPegNamespace(), Pegasus::InvalidNamespaceNameException);
+        EXPECT_EQ("", provider.GetNameSpaceName({}));
         EXPECT_THAT(fRig.fLog.Lines(),
                     ElementsAre("3|Loading... " + path, "3|TPEGASUSNamespace created Provider " + path + "\n"));
     }

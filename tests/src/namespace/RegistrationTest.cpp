@@ -147,6 +147,42 @@ TEST_F(RegistrationTest, AVendorsFilesOfOneKindAreCompiledByTheirNames)
     EXPECT_EQ(trace, traced);
 }
 
+TEST_F(RegistrationTest, AFileWithoutTimeoutOrNamespaceGetsTheDefaults)
+{
+    struct
+    {
+        const char* fName;
+        const char* fElements;
+        const char* fEntry;
+        unsigned int fTimeoutMs;
+        std::string fNamespace;
+    } const rows[] = {
+        {"both given", "<nsp name='root/acme'/><timeout value='30'/>", "ACME_One", 30000, "root/acme"},
+        {"neither", "", "ACME_One", 60000, "root/cimv2"},
+        {"both empty", "<nsp name=''/><timeout value=''/>", "ACME_One", 60000, "root/cimv2"},
+        {"an empty bracket", "<timeout value='30'/>", "ACME_One[]", 60000, "root/cimv2"},
+        {"an explicit 0", "<timeout value='0'/>", "ACME_One", 0, "root/cimv2"},
+        {"a bracket with 0", "<timeout value='30'/>", "ACME_One[0]", 0, "root/cimv2"},
+    };
+    fServer.AnswerClass("ACME_One", "");
+    fServer.Answer("EnumerateInstances ACME_One", "");
+    fRig.WriteProvider("acme", "a.properties.mof", "");
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.fName);
+        fRig.WriteProvider("acme", "a.classes.xml",
+                           std::string("<vrx>") + row.fElements + "<class name='" + row.fEntry + "'/></vrx>");
+        const auto ns = fRig.MakeConnectedNamespace(fServer);
+        ns->FindProviders();
+        EXPECT_EQ("run cimmof -n " + row.fNamespace + " -aE M/pegasus/provider/acme/a.properties.mof",
+                  fRig.Abbreviate(fRig.fWorld.Take().front()));
+        const auto collected = boost::dynamic_pointer_cast<TPEGASUSClass>(ns->GetClass("ACME_One", {}));
+        ASSERT_NE(nullptr, collected);
+        EXPECT_EQ(row.fTimeoutMs, collected->GetDefaultTimeoutMs());
+        EXPECT_EQ(row.fNamespace, collected->GetPegasusNSPStr());
+        EXPECT_EQ(row.fNamespace, std::string(collected->GetProvider()->GetPegNamespace().getString().getCString()));
+    }
+}
+
 TEST_F(RegistrationTest, UnknownClassesAreLeftOutAndTheNextFollow)
 {
     AddProvider("acme", {"ACME_One", "ACME_None", "ACME_Two"});
@@ -397,6 +433,7 @@ TEST_F(ThreadedRegistrationTest, ListsProvidersForTheirOwnPluginTypeOnly)
     EXPECT_EQ(3, visits({{"pluginType", static_cast<signed char>(7)}}));
     fRig.fLog.Take();
     EXPECT_EQ(0, visits({{"pluginType", static_cast<signed char>(3)}}));
+    EXPECT_EQ(0, visits({{"pluginType", TCIMValue(TCIMValue::TCIMType::kSint8, 0)}})); // a null is another type
     EXPECT_THAT(fRig.fLog.Lines(), IsEmpty());
     const TCIMValue wrong[] = {"7", 7, static_cast<unsigned char>(7), TCIMValue(),
                                TCIMValue(TCIMValue::TCIMType::kSint8, 0, {static_cast<signed char>(7)})};
@@ -411,4 +448,3 @@ TEST_F(ThreadedRegistrationTest, ListsProvidersForTheirOwnPluginTypeOnly)
 
 } // namespace
 } // namespace NKOLVRX20
-    EXPECT_EQ(0, visits({{"pluginType", TCIMValue(TCIMValue::TCIMType::kSint8, 0)}})); // a null is another type
