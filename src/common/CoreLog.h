@@ -2,6 +2,7 @@
 #pragma once
 
 #include <host/ILogger.h>
+#include <host/TVRXException.h>
 
 #include <locale>
 #include <sstream>
@@ -41,6 +42,14 @@ template <typename... TParts> void LogProgress(const TParts&... parts)
 }
 
 // Requires: a catch block around the call.
+// Logs the parts as a failure, "Class::Operation failed: " and what and which, and throws TVRXException with the
+// status.
+template <typename... TParts> [[noreturn]] void LogAndThrow(unsigned int status, const TParts&... parts)
+{
+    LogFailure(parts...);
+    throw TVRXException(status);
+}
+
 // Returns: what the exception in flight says, whichever family it is of.
 std::string DescribeCurrentException();
 

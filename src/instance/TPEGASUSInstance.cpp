@@ -2,7 +2,7 @@
 
 #include "src/common/ClientConnection.h"
 #include "src/common/CoreLog.h"
-#include "src/instance/MethodResult.h"
+#include "src/instance/MethodValues.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMMethodDecl.h>
@@ -24,7 +24,8 @@ boost::shared_ptr<ICIMParameterDecl> ParameterDeclOf(const ICIMClass& instanceCl
     const auto methodDecl = instanceClass.GetMethodDecl(method, {});
     auto parameterDecl = methodDecl ? methodDecl->GetParameterDecl(parameter, {}) : nullptr;
     if (!parameterDecl) {
-        throw TVRXException(TVRXStatusCode::kNotFound);
+        LogAndThrow(TVRXStatusCode::kNotFound, "TPEGASUSInstance::InvokeMethod failed: ", instanceClass.GetName({}),
+                    ".", method, methodDecl ? " declares no parameter " + parameter : " is not declared");
     }
     return parameterDecl;
 }

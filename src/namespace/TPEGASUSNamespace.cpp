@@ -11,7 +11,6 @@
 
 #include <host/ICIMIndicationFilter.h>
 #include <host/ICIMInstance.h>
-#include <host/TVRXException.h>
 
 namespace NKOLVRX20 {
 
@@ -105,12 +104,14 @@ boost::shared_ptr<ICIMNamespace> TPEGASUSNamespace::GetUpcallNamespace() const
 
 void TPEGASUSNamespace::AddUnderlyingNamespace(boost::shared_ptr<ICIMNamespace>, TCIMContext)
 {
-    throw TVRXException(TVRXStatusCode::kNotSupported);
+    LogAndThrow(TVRXStatusCode::kNotSupported, "TPEGASUSNamespace::AddUnderlyingNamespace failed: ", fName,
+                ": not supported");
 }
 
 void TPEGASUSNamespace::Subscribe(boost::shared_ptr<ICIMIndicationFilter>, TInstanceVisitor, TCIMContext)
 {
-    throw TVRXException(TVRXStatusCode::kOperationNotSupported);
+    LogAndThrow(TVRXStatusCode::kOperationNotSupported, "TPEGASUSNamespace::Subscribe failed: ", fName,
+                ": indications are not supported");
 }
 
 boost::shared_ptr<ICIMInstance> TPEGASUSNamespace::GetInstance(const TCIMReference& reference, TCIMContext context)
@@ -119,28 +120,29 @@ boost::shared_ptr<ICIMInstance> TPEGASUSNamespace::GetInstance(const TCIMReferen
     return instanceClass ? instanceClass->GetInstance(reference, context) : nullptr;
 }
 
-ICIMNamespace& TPEGASUSNamespace::RepositoryNamespace() const
+ICIMNamespace& TPEGASUSNamespace::RepositoryNamespace(const char* operation, const std::string& object) const
 {
     if (!fRepositoryNamespace) {
-        throw TVRXException(TVRXStatusCode::kNotSupported);
+        LogAndThrow(TVRXStatusCode::kNotSupported, "TPEGASUSNamespace::", operation, " failed: ", object,
+                    ": the host gave no repository namespace");
     }
     return *fRepositoryNamespace;
 }
 
 void TPEGASUSNamespace::DeleteInstance(const TCIMReference& reference, TCIMContext context)
 {
-    RepositoryNamespace().DeleteInstance(reference, context);
+    RepositoryNamespace("DeleteInstance", reference.GetPath()).DeleteInstance(reference, context);
 }
 
 void TPEGASUSNamespace::ModifyInstance(const TCIMReference& reference, TCIMContext values, TCIMContext context)
 {
-    RepositoryNamespace().ModifyInstance(reference, values, context);
+    RepositoryNamespace("ModifyInstance", reference.GetPath()).ModifyInstance(reference, values, context);
 }
 
 void TPEGASUSNamespace::ExecuteQuery(TInstanceVisitor visitor, std::string& language, std::string& query,
                                      TCIMContext context)
 {
-    RepositoryNamespace().ExecuteQuery(visitor, language, query, context);
+    RepositoryNamespace("ExecuteQuery", query).ExecuteQuery(visitor, language, query, context);
 }
 
 void TPEGASUSNamespace::ClearInstances() {}

@@ -203,7 +203,8 @@ class TPEGASUSNamespace : public ICIMNamespace,
     boost::shared_ptr<ICIMClass> CollectClass(const std::string& entry,
                                               const boost::shared_ptr<TPEGASUSProvider>& provider);
 
-    ICIMNamespace& RepositoryNamespace() const;
+    // The operation and its object are for the log. Throws: TVRXException 31 when there is none.
+    ICIMNamespace& RepositoryNamespace(const char* operation, const std::string& object) const;
 
     bool AskServerForClass(const std::string& cimNamespace, const std::string& name, Pegasus::CIMClass& answer);
     boost::shared_ptr<ICIMClass> FetchClass(const std::string& name, const TCIMContext& context);

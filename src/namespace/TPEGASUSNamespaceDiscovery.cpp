@@ -13,6 +13,8 @@
 #include <boost/make_shared.hpp>
 
 #include <algorithm>
+#include <cerrno>
+#include <cstring>
 
 namespace NKOLVRX20 {
 
@@ -25,7 +27,9 @@ std::vector<std::string> ReadDirectoryOrThrow(const std::string& path)
 {
     std::vector<std::string> names;
     if (!ReadDirectory(path, names)) {
-        throw TVRXException(TVRXStatusCode::kDirectoryNotOpened);
+        const int error = errno;
+        LogAndThrow(TVRXStatusCode::kDirectoryNotOpened, "TPEGASUSNamespace::FindXmlFiles failed: ", path, ": ",
+                    std::strerror(error));
     }
     return names;
 }
@@ -43,14 +47,16 @@ std::vector<std::string> SubDirectoriesAmong(const std::vector<std::string>& nam
 }
 
 // Throws: TVRXException 4 when there is no memory for it, or it is larger than any requested-class file may be.
-std::unique_ptr<char[]> AllocateFileBuffer(std::size_t bytes)
+std::unique_ptr<char[]> AllocateFileBuffer(const std::string& path, std::size_t bytes)
 {
     std::unique_ptr<char[]> buffer;
     if (bytes <= kMaxRequestedClassFileBytes) {
         buffer.reset(new (std::nothrow) char[bytes]);
     }
     if (!buffer) {
-        throw TVRXException(TVRXStatusCode::kAllocationFailed);
+        LogAndThrow(TVRXStatusCode::kAllocationFailed, "TPEGASUSNamespace::parseProvider failed: ", path, ": ", bytes,
+                    " bytes are more than ",
+                    bytes > kMaxRequestedClassFileBytes ? "any such file may have" : "there is memory for");
     }
     return buffer;
 }
@@ -102,7 +108,7 @@ void TPEGASUSNamespace::parseProvider(const std::string& path, std::vector<std::
                                       std::map<std::string, std::string>& information)
 {
     const std::size_t bytes = TOSSpecific::GetFileSize(path);
-    const std::unique_ptr<char[]> buffer = AllocateFileBuffer(bytes);
+    const std::unique_ptr<char[]> buffer = AllocateFileBuffer(path, bytes);
     TFile file = OpenRegularFile(path);
     if (!file) {
         return;

@@ -69,7 +69,7 @@ std::vector<std::string> TPEGASUSNamespace::BuildMofPath(const std::string& path
 {
     const std::string::size_type slash = path.rfind('/');
     if (slash == std::string::npos) {
-        throw TVRXException(TVRXStatusCode::kBadPath);
+        LogAndThrow(TVRXStatusCode::kBadPath, "TPEGASUSNamespace::BuildMofPath failed: no directory in \"", path, "\"");
     }
     return FindMofFiles(path.substr(0, slash), pattern);
 }

@@ -68,7 +68,7 @@ std::string TPEGASUSProvider::GetDescription(TCIMContext) const
 
 boost::shared_ptr<ICIMNamespace> TPEGASUSProvider::GetNamespace(TCIMContext) const
 {
-    throw TVRXException(TVRXStatusCode::kNotSupported);
+    LogAndThrow(TVRXStatusCode::kNotSupported, "TPEGASUSProvider::GetNamespace failed: ", fName, ": not supported");
 }
 
 // A walk on copies: the visitor may drop the namespace, and this provider with it.

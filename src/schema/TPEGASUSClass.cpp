@@ -1,6 +1,6 @@
 #include "src/schema/TPEGASUSClass.h"
 
-#include <host/TVRXException.h>
+#include "src/common/CoreLog.h"
 
 #include <utility>
 
@@ -23,12 +23,12 @@ void TPEGASUSClass::AddToNamespace(TCIMContext)
 
 void TPEGASUSClass::RemoveFromNamespace(TCIMContext)
 {
-    throw TVRXException(TVRXStatusCode::kNotSupported);
+    LogAndThrow(TVRXStatusCode::kNotSupported, "TPEGASUSClass::RemoveFromNamespace failed: ", fName, ": not supported");
 }
 
 void TPEGASUSClass::ModifyClass(boost::shared_ptr<ICIMClass>, TCIMContext)
 {
-    throw TVRXException(TVRXStatusCode::kNotSupported);
+    LogAndThrow(TVRXStatusCode::kNotSupported, "TPEGASUSClass::ModifyClass failed: ", fName, ": not supported");
 }
 
 std::string TPEGASUSClass::GetName(TCIMContext) const
@@ -41,9 +41,10 @@ boost::shared_ptr<ICIMNamespace> TPEGASUSClass::GetNamespace(TCIMContext) const
     return fNamespace.Get();
 }
 
-void TPEGASUSClass::SetPropertyValue(const std::string&, TCIMValue, TCIMContext)
+void TPEGASUSClass::SetPropertyValue(const std::string& name, TCIMValue, TCIMContext)
 {
-    throw TVRXException(TVRXStatusCode::kNotSupported);
+    LogAndThrow(TVRXStatusCode::kNotSupported, "TPEGASUSClass::SetPropertyValue failed: ", fName, ".", name,
+                ": not supported");
 }
 
 bool TPEGASUSClass::operator==(const ICIMClass& other) const
@@ -76,9 +77,10 @@ void TPEGASUSClass::ReleaseLinks()
     fChildClasses.clear();
 }
 
-boost::shared_ptr<ICIMQualifier> TPEGASUSClass::GetQualifier(const std::string&, bool&, TCIMContext) const
+boost::shared_ptr<ICIMQualifier> TPEGASUSClass::GetQualifier(const std::string& name, bool&, TCIMContext) const
 {
-    throw TVRXException(TVRXStatusCode::kOperationNotSupported);
+    LogAndThrow(TVRXStatusCode::kOperationNotSupported, "TPEGASUSClass::GetQualifier failed: ", name, " of ", fName,
+                ": not supported with a found flag");
 }
 
 } // namespace NKOLVRX20

@@ -82,7 +82,8 @@ void TPEGASUSClass::AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declarat
 {
     const auto own = boost::dynamic_pointer_cast<TPEGASUSPropertyDecl>(declaration);
     if (!own) {
-        throw TVRXException(TVRXStatusCode::kTypeMismatch);
+        LogAndThrow(TVRXStatusCode::kTypeMismatch, "TPEGASUSClass::AddPropertyDecl failed: ", fName,
+                    ": null, or not a declaration of this plug-in");
     }
     const std::string name = own->GetName({});
     if (own->GetType({}) == TCIMValue::TCIMType::kReference && !IsAssociation({})) {

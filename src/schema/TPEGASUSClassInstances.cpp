@@ -1,7 +1,7 @@
 // What a class does with instances: fetched live from the server, never kept by the plug-in; and methods called on one.
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
-#include "src/instance/MethodResult.h"
+#include "src/instance/MethodValues.h"
 #include "src/instance/TPEGASUSInstance.h"
 #include "src/instance/ValueConversion.h"
 #include "src/schema/InstanceRetrieval.h"

@@ -1,5 +1,6 @@
 #include "src/schema/TPEGASUSPropertyDecl.h"
 
+#include "src/common/CoreLog.h"
 #include "src/schema/DeclaredType.h"
 #include "src/schema/TPEGASUSClass.h"
 
@@ -22,7 +23,8 @@ void TPEGASUSPropertyDecl::AddToClass(TCIMContext)
 
 void TPEGASUSPropertyDecl::RemoveFromClass(TCIMContext)
 {
-    throw TVRXException(TVRXStatusCode::kNotSupported);
+    LogAndThrow(TVRXStatusCode::kNotSupported, "TPEGASUSPropertyDecl::RemoveFromClass failed: ", fName,
+                ": not supported");
 }
 
 std::string TPEGASUSPropertyDecl::GetName(TCIMContext) const

@@ -1,9 +1,9 @@
 #include "src/schema/TPEGASUSQualifier.h"
 
+#include "src/common/CoreLog.h"
 #include "src/schema/QualifierBits.h"
 
 #include <host/ICIMNamedElement.h>
-#include <host/TVRXException.h>
 
 #include <utility>
 
@@ -23,9 +23,10 @@ void TPEGASUSQualifier::AddToClassOrProperty(TCIMContext context)
     boost::shared_ptr<ICIMNamedElement>(fElement)->AddQualifier(shared_from_this(), context);
 }
 
-void TPEGASUSQualifier::RemoveFromClassOrProperty(TCIMContext)
+void TPEGASUSQualifier::RemoveFromClassOrProperty(TCIMContext context)
 {
-    throw TVRXException(TVRXStatusCode::kNotSupported);
+    LogAndThrow(TVRXStatusCode::kNotSupported,
+                "TPEGASUSQualifier::RemoveFromClassOrProperty failed: ", GetName(context), ": not supported");
 }
 
 std::string TPEGASUSQualifier::GetName(TCIMContext context) const

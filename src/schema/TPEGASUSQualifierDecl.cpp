@@ -1,9 +1,8 @@
 #include "src/schema/TPEGASUSQualifierDecl.h"
 
+#include "src/common/CoreLog.h"
 #include "src/schema/DeclaredType.h"
 #include "src/schema/QualifierBits.h"
-
-#include <host/TVRXException.h>
 
 #include <utility>
 
@@ -25,7 +24,8 @@ void TPEGASUSQualifierDecl::AddToNamespace(TCIMContext)
 
 void TPEGASUSQualifierDecl::RemoveQualifierDecl(TCIMContext)
 {
-    throw TVRXException(TVRXStatusCode::kNotSupported);
+    LogAndThrow(TVRXStatusCode::kNotSupported, "TPEGASUSQualifierDecl::RemoveQualifierDecl failed: ", fName,
+                ": not supported");
 }
 
 std::string TPEGASUSQualifierDecl::GetName(TCIMContext) const

@@ -1,10 +1,10 @@
 #pragma once
 
+#include "src/common/CoreLog.h"
 #include "src/schema/NamedMap.h"
 #include "src/schema/TPEGASUSQualifier.h"
 
 #include <host/ICIMNamedElement.h>
-#include <host/TVRXException.h>
 
 #include <boost/enable_shared_from_this.hpp>
 #include <boost/make_shared.hpp>
@@ -27,7 +27,8 @@ class TQualifiedElement : public TInterface, public boost::enable_shared_from_th
     {
         const auto own = boost::dynamic_pointer_cast<TPEGASUSQualifier>(qualifier);
         if (!own) {
-            throw TVRXException(TVRXStatusCode::kTypeMismatch);
+            LogAndThrow(TVRXStatusCode::kTypeMismatch, "TQualifiedElement::AddQualifier failed: ", this->GetName({}),
+                        ": null, or not a qualifier of this plug-in");
         }
         fQualifiers.Put(own->GetName({}), own);
     }
@@ -38,7 +39,8 @@ class TQualifiedElement : public TInterface, public boost::enable_shared_from_th
                                                        TCIMContext) override
     {
         if (!declaration) {
-            throw TVRXException(TVRXStatusCode::kTypeMismatch);
+            LogAndThrow(TVRXStatusCode::kTypeMismatch,
+                        "TQualifiedElement::AllocateQualifier failed: ", this->GetName({}), ": no declaration");
         }
         return boost::make_shared<TPEGASUSQualifier>(this->shared_from_this(), declaration, value, flavor);
     }

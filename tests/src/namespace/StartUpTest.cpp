@@ -152,12 +152,19 @@ TEST_F(StartUpTest, AnUnconnectedNamespaceAnswersEveryQuestion)
     reference.SetPath("CIM_Any.Key=1");
     EXPECT_EQ(nullptr, ns->GetInstance(reference, {}));
     ns->ClearInstances();
-    std::string language, query;
+    std::string language, query = "select";
+    fRig.fLog.Take();
     EXPECT_EQ(31U, StatusOf([&] { ns->DeleteInstance(reference, {}); }));
     EXPECT_EQ(31U, StatusOf([&] { ns->ModifyInstance(reference, {}, {}); }));
     EXPECT_EQ(31U, StatusOf([&] { ns->ExecuteQuery(visit, language, query, {}); }));
     EXPECT_EQ(31U, StatusOf([&] { ns->AddUnderlyingNamespace(nullptr, {}); }));
     EXPECT_EQ(1U, StatusOf([&] { ns->Subscribe(nullptr, visit, {}); }));
+    const std::string failed = "0|TPEGASUSNamespace::", noRepository = ": the host gave no repository namespace";
+    EXPECT_THAT(fRig.fLog.Take(), ElementsAre(failed + "DeleteInstance failed: CIM_Any.Key=1" + noRepository,
+                                              failed + "ModifyInstance failed: CIM_Any.Key=1" + noRepository,
+                                              failed + "ExecuteQuery failed: select" + noRepository,
+                                              failed + "AddUnderlyingNamespace failed: root/cimv2: not supported",
+                                              failed + "Subscribe failed: root/cimv2: indications are not supported"));
     EXPECT_EQ(nullptr, ns->AllocateClass("CIM_Any", boost::shared_ptr<ICIMClass>(), {}));
     EXPECT_THROW(ns->GetQualifierDecl("Key", {}), boost::bad_weak_ptr);
     EXPECT_EQ(TPEGASUSNamespaceProvider::GetInstance(), ns->GetNamespaceProvider({}));

@@ -1,4 +1,4 @@
-#include "src/instance/MethodResult.h"
+#include "src/instance/MethodValues.h"
 
 #include "src/common/CoreLog.h"
 #include "src/instance/ValueConversion.h"
