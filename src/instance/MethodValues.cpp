@@ -5,6 +5,19 @@
 
 namespace NKOLVRX20 {
 
+// The client library has several families of exceptions, and one of them is no std::exception: a host that passed a
+// text that is not a path must not be ended by it.
+Pegasus::CIMParamValue MethodInput(const char* operation, const std::string& method, const std::string& name,
+                                   const boost::function<Pegasus::CIMValue()>& convert)
+{
+    try {
+        return Pegasus::CIMParamValue(name.c_str(), convert(), true);
+    } catch (...) {
+        LogAndThrow(TVRXStatusCode::kTypeMismatch, operation, " failed: ", method, ": parameter ", name,
+                    " does not convert: ", DescribeCurrentException());
+    }
+}
+
 TCIMValue MethodValueToHost(const std::string& name, const Pegasus::CIMValue& value,
                             const boost::shared_ptr<ICIMClass>& forClass)
 {

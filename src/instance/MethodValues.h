@@ -6,7 +6,15 @@
 #include <boost/function.hpp>
 #include <boost/shared_ptr.hpp>
 
+#include <string>
+
 namespace NKOLVRX20 {
+
+// Returns: an input parameter with the value that the conversion makes.
+// Throws: TVRXException 14, after a log line with the operation, the method and the parameter, when it does not
+// convert.
+Pegasus::CIMParamValue MethodInput(const char* operation, const std::string& method, const std::string& name,
+                                   const boost::function<Pegasus::CIMValue()>& convert);
 
 // Returns: the value that came back from a method, by its own type; null for null and for what the host has no type
 // for. Throws: as pegValToVRX.

@@ -41,10 +41,11 @@ boost::shared_ptr<ICIMNamespace> NamespaceOf(const ICIMClass& instanceClass)
     return ns;
 }
 
-Pegasus::CIMParamValue ReferenceParameter(const std::string& name, const TCIMValue& value)
+Pegasus::CIMParamValue ReferenceParameter(const std::string& method, const std::string& name, const TCIMValue& value)
 {
-    const Pegasus::CIMObjectPath path(Pegasus::String(value.ToString(kDecimal).c_str()));
-    return Pegasus::CIMParamValue(name.c_str(), Pegasus::CIMValue(path), true);
+    return MethodInput("TPEGASUSInstance::InvokeMethod", method, name, [&value] {
+        return Pegasus::CIMValue(Pegasus::CIMObjectPath(Pegasus::String(value.ToString(kDecimal).c_str())));
+    });
 }
 
 } // namespace
@@ -75,10 +76,10 @@ Pegasus::Array<Pegasus::CIMParamValue> TPEGASUSInstance::InputsFor(const std::st
     for (const auto& [name, value] : parameters) {
         const auto declaration = ParameterDeclOf(*GetClass({}), method, name);
         if (declaration->GetQualifier("OUT", {})) {
-            inputs.append(ReferenceParameter(name, value));
+            inputs.append(ReferenceParameter(method, name, value));
         }
         if (declaration->GetQualifier("IN", {})) {
-            inputs.append(ReferenceParameter(name, value));
+            inputs.append(ReferenceParameter(method, name, value));
         }
     }
     return inputs;

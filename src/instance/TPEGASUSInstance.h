@@ -26,8 +26,9 @@ class TPEGASUSInstance : public TInmemInstance
     // Calls the method on the server. Every parameter whose declaration has the qualifier "OUT" travels as a reference
     // made of its text, and once more when it has "IN". Outputs replace entries of the same name.
     // Returns: null also when the server refuses the call, which the log says.
-    // Throws: TVRXException 6 when the class declares no such method or the method no such parameter;
-    // Pegasus::Exception when a name or a text is no CIM name or object path, or an output does not convert;
+    // Throws, after a log line: TVRXException 6 when the class declares no such method or the method no such parameter,
+    // 14 when a parameter's text is not an object path; nothing is sent then.
+    // Throws: Pegasus::Exception when the method's name is not a CIM name, or an output does not convert;
     // boost::bad_weak_ptr when the namespace is gone.
     // Blocks: up to 300 seconds.
     TCIMValue InvokeMethod(const std::string& name, TCIMContext& parameters, TCIMContext context) override;

@@ -137,7 +137,8 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
                                                   TCIMContext context) const override;
 
     // Parameters travel by their own types, whatever their declarations say; outputs replace entries of their names.
-    // Throws: what the client throws, Pegasus::Exception; TVRXException 14 for a value that does not convert.
+    // Throws: what the client throws, Pegasus::Exception; TVRXException 14, after a log line, for an input that does
+    // not convert, and nothing is sent then.
     // Blocks: up to the time-out that the namespace's client was given last.
     TCIMValue InvokeMethod(const TCIMReference& target, const std::string& name, const TCIMContext& inputs,
                            TCIMContext& outputs, TCIMContext context) override;

@@ -140,9 +140,12 @@ TCIMValue TPEGASUSClass::InvokeMethod(const TCIMReference& target, const std::st
     const Pegasus::CIMName method(name.c_str());
     Pegasus::Array<Pegasus::CIMParamValue> pegInputs;
     for (const auto& [inputName, input] : inputs) {
-        Pegasus::CIMValue value;
-        vrxValToPeg(input, value);
-        pegInputs.append(Pegasus::CIMParamValue(inputName.c_str(), value, true));
+        const TCIMValue& hostValue = input;
+        pegInputs.append(MethodInput("TPEGASUSClass::InvokeMethod", name, inputName, [&hostValue] {
+            Pegasus::CIMValue value;
+            vrxValToPeg(hostValue, value);
+            return value;
+        }));
     }
     Pegasus::Array<Pegasus::CIMParamValue> pegOutputs;
     const Pegasus::CIMValue returned =

@@ -34,6 +34,13 @@ Pegasus::CIMParameter Parameter(const char* name, const std::vector<const char*>
     return parameter;
 }
 
+TCIMReference ReferenceTo(const std::string& path)
+{
+    TCIMReference reference;
+    reference.SetPath(path);
+    return reference;
+}
+
 class MethodTest : public ::testing::Test
 {
   protected:
@@ -99,8 +106,7 @@ TEST_F(MethodTest, OutputsReplaceWhatIsThereInBothRoutes)
     EXPECT_EQ(expected, parameters);
     EXPECT_THAT(fServed.Log(), ElementsAre("3|adding output param : Both", "3|adding output param : New"));
 
-    TCIMReference target;
-    target.SetPath("CIM_A.K=\"1\"");
+    TCIMReference target = ReferenceTo("CIM_A.K=\"1\"");
     TCIMContext outputs = {{"Both", TCIMValue(1)}};
     EXPECT_EQ(TCIMValue(7U), fClass->InvokeMethod(target, "Go", {}, outputs, {}));
     EXPECT_EQ(expected, outputs);
@@ -110,8 +116,7 @@ TEST_F(MethodTest, OutputsReplaceWhatIsThereInBothRoutes)
 TEST_F(MethodTest, AClassSendsEveryParameterByItsOwnTypeAndLeavesTheTimeout)
 {
     fServed.fNamespace->getPegClient()->setTimeout(4321);
-    TCIMReference target;
-    target.SetPath("CIM_A.K=\"1\"");
+    TCIMReference target = ReferenceTo("CIM_A.K=\"1\"");
     TCIMContext outputs;
     const TCIMContext inputs = {
         {"none", TCIMValue(5U)},
@@ -135,8 +140,7 @@ TEST_F(MethodTest, AnInstanceSwallowsTheServersRefusalAndAClassPassesItOn)
     EXPECT_THAT(parameters, IsEmpty());
     EXPECT_THAT(fServed.Log(), ElementsAre("3|pegClient->invokeMethod returned exception: CIM_ERR_FAILED: no"));
     fServed.fModel.addFault("Go", refuse);
-    TCIMReference target;
-    target.SetPath("CIM_A.K=\"1\"");
+    TCIMReference target = ReferenceTo("CIM_A.K=\"1\"");
     EXPECT_THROW(fClass->InvokeMethod(target, "Go", {}, parameters, {}), Pegasus::CIMException);
     target.SetPath("not a path.");
     EXPECT_THROW(fClass->InvokeMethod(target, "Go", {}, parameters, {}), Pegasus::Exception);
@@ -149,10 +153,43 @@ TEST_F(MethodTest, WhatIsNotDeclaredIsRefusedBeforeAnythingIsSent)
     TCIMContext unknown = {{"Other", TCIMValue(1)}};
     EXPECT_EQ(6U, StatusOf([&] { fInstance->InvokeMethod("Go", unknown, {}); }));
     EXPECT_EQ(6U, StatusOf([&] { fInstance->InvokeMethod("Undeclared", unknown, {}); }));
-    TCIMContext notAPath = {{"OnlyIn", TCIMValue(5)}};
-    EXPECT_THROW(fInstance->InvokeMethod("Go", notAPath, {}), Pegasus::Exception);
+    EXPECT_THAT(fServed.Log(),
+                ElementsAre("0|TPEGASUSInstance::InvokeMethod failed: CIM_A.Go declares no parameter Other",
+                            "0|TPEGASUSInstance::InvokeMethod failed: CIM_A.Undeclared is not declared"));
     TCIMContext none;
     EXPECT_TRUE(fClass->InvokeMethod("Go", none, {}).IsNull()); // without a target nothing is called
+    EXPECT_THAT(fServed.TakeRequests(), IsEmpty());
+}
+
+TEST_F(MethodTest, AParameterThatDoesNotConvertIsRefusedBeforeAnythingIsSent)
+{
+    struct
+    {
+        const char* fName;
+        bool fThroughInstance;
+        TCIMValue fValue;
+    } const rows[] = {
+        {"instance: a number", true, TCIMValue(5)},
+        {"instance: an empty text", true, TCIMValue(std::string())},
+        {"instance: a null", true, TCIMValue()},
+        {"instance: no path", true, TCIMValue(std::string("not a path."))},
+        {"class: a typed null", false, TCIMValue(TCIMValue::TCIMType::kUint8, 0)},
+        {"class: a reference that is no path", false, TCIMValue(ReferenceTo("not a path."))},
+        {"class: an empty reference", false, TCIMValue(ReferenceTo(""))},
+    };
+    fServed.TakeRequests();
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.fName);
+        TCIMContext parameters = {{"OnlyIn", row.fValue}}, outputs;
+        EXPECT_EQ(14U, StatusOf([&] {
+                      row.fThroughInstance
+                          ? fInstance->InvokeMethod("Go", parameters, {})
+                          : fClass->InvokeMethod(ReferenceTo("CIM_A.K=\"1\""), "Go", parameters, outputs, {});
+                  }));
+        EXPECT_THAT(fServed.Log(), ElementsAre(::testing::StartsWith(
+                                       std::string(row.fThroughInstance ? "0|TPEGASUSInstance" : "0|TPEGASUSClass") +
+                                       "::InvokeMethod failed: Go: parameter OnlyIn does not convert: ")));
+    }
     EXPECT_THAT(fServed.TakeRequests(), IsEmpty());
 }
 
@@ -166,8 +203,7 @@ TEST_F(MethodTest, ANullResultIsNullAndAnUnconnectedNamespaceAFailedCall)
     const auto unconnected = boost::make_shared<TPEGASUSClass>(ns, "CIM_A", nullptr);
     EXPECT_TRUE(unconnected->AllocateInstance({})->InvokeMethod("Go", none, {}).IsNull());
     EXPECT_EQ("3|pegClient->invokeMethod returned exception: not connected", fServed.Log().back());
-    TCIMReference target;
-    target.SetPath("CIM_A.K=\"1\"");
+    TCIMReference target = ReferenceTo("CIM_A.K=\"1\"");
     EXPECT_THROW(unconnected->InvokeMethod(target, "Go", none, none, {}), Pegasus::NotConnectedException);
     EXPECT_THROW(orphan->InvokeMethod(target, "Go", none, none, {}), boost::bad_weak_ptr);
 }
