@@ -1,5 +1,5 @@
-// The MOF compiler: any text ends in definitions or in an error that lies within the text; read again, it does the
-// same.
+// The MOF compiler: any text yields definitions, or an error whose place is within the text. A second run must yield
+// the same.
 #include "pegasus/mof/Compiler.h"
 #include "pegasus/mof/MemoryHandler.h"
 
@@ -20,7 +20,7 @@ struct Outcome
     std::size_t instanceCount = 0;
 };
 
-// Without includes, so that no file of the machine is read, and with limits that an input can reach.
+// Includes are off, so that no file of the machine is read. The limits are small enough for an input to reach them.
 CompileOptions options()
 {
     CompileOptions result;

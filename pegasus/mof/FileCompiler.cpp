@@ -68,7 +68,7 @@ void FileCompiler::run()
     }
 }
 
-// The handler knows no places: its errors are about the subject of the definition.
+// An exception of the handler carries no place; it becomes an error at the definition's subject.
 void FileCompiler::compileDefinition()
 {
     try {
@@ -162,6 +162,8 @@ void FileCompiler::obeyPragma()
     }
 }
 
+// A file that does not exist is a warning, as with OpenPegasus's compiler. One that exists and cannot be read is an
+// error: its definitions are meant to be there.
 void FileCompiler::include(const std::string& name)
 {
     const CompileLimits& limits = fCompilation.options.limits;
@@ -175,7 +177,7 @@ void FileCompiler::include(const std::string& name)
     }
     const std::string path = findInclude(name, fSource.directory(), fCompilation.options.includeDirectories);
     if (path.empty()) {
-        warn("Could not open include file " + name); // and goes on, as OpenPegasus's compiler does
+        warn("Could not open include file " + name);
         return;
     }
     try {

@@ -27,7 +27,7 @@ bool removeProperty(ParsedInstance& parsed, const CIMName& name)
     return wasOpen;
 }
 
-// The place of an embedded instance is that of the string; this leads from there to the place within.
+// Diagnostics of an embedded instance have the place of its string; this text leads to the place within.
 std::string inEmbedded(const SourcePlace& place)
 {
     return "in the embedded instance, line " + std::to_string(place.line) + ", column " + std::to_string(place.column) +

@@ -223,7 +223,8 @@ void Lexer::stringLiteral(std::string& value)
     ++fAt;
 }
 
-// Returns: false when the backslash begins no escape; nothing is taken then.
+// Takes an escape and appends its meaning.
+// Returns: false for an unknown escape, which is left in the text.
 bool Lexer::escape(std::string& value)
 {
     const char letter = peek(1);

@@ -7,7 +7,7 @@ namespace Pegasus::mof {
 
 namespace {
 
-// The tokens of a faulty text: what cannot be cut is left out.
+// Cuts a faulty text into tokens and leaves out the bytes that belong to none.
 class TolerantLexer
 {
   public:

@@ -14,7 +14,7 @@ namespace Pegasus::mof {
 
 namespace {
 
-// A diagnostic leaves out longer lines: the place and the cause would be lost in them.
+// A diagnostic shows lines up to this length; in a longer one nobody finds the caret.
 constexpr std::size_t kShownLineBytes = 240;
 
 ssize_t readSome(int descriptor, char* buffer, std::size_t size)

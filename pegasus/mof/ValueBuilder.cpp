@@ -92,6 +92,7 @@ template <typename T> T Converter::integer(const Literal& literal) const
     return static_cast<T>(isNegative ? Uint64(0) - magnitude : magnitude);
 }
 
+// from_chars and not strtod: MOF has a decimal point in every locale. "1." is not a number in MOF.
 template <typename T> T Converter::real(const Literal& literal) const
 {
     if (literal.kind == Literal::Kind::kInteger) {

@@ -24,6 +24,7 @@ template <typename Owner> bool isTrue(const Owner& owner, const CIMName& qualifi
     return isSet;
 }
 
+// A class is an association or an indication when it, or any class above it, says so.
 bool isKind(const CIMConstClass& newClass, const CIMConstClass& superClass, const CIMName& qualifier)
 {
     return isTrue(newClass, qualifier) || (!superClass.isUninitialized() && isTrue(superClass, qualifier));

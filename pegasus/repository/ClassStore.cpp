@@ -13,7 +13,8 @@ ClassStore::ClassStore(Storage& storage, ObjectCodec& codec, QualifierStore& qua
 {
 }
 
-// Recursion ends at a root class; the depth is bounded when classes are created.
+// Resolves from the root class down, and keeps every class on the way. The recursion is bounded: create() limits the
+// depth.
 CIMClass ClassStore::resolved(NamespaceId nameSpace, const CIMName& name)
 {
     const std::string key = nameKey(name);

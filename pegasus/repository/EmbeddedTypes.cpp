@@ -12,7 +12,7 @@ CIMType embeddedType(const CIMConstProperty& property)
     if (type != CIMTYPE_STRING && type != CIMTYPE_OBJECT && type != CIMTYPE_INSTANCE) {
         return type;
     }
-    // By the qualifiers alone: the decoder's type is what is to be replaced.
+    // By the qualifiers alone, as if the type were string: it replaces the type that the decoder chose.
     switch (embeddedKind(CIMTYPE_STRING, ObjectAccess::rep(property).fQualifiers)) {
     case EmbeddedKind::kInstance:
         return property.isArray() ? CIMTYPE_STRING : CIMTYPE_INSTANCE;

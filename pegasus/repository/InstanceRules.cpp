@@ -29,7 +29,8 @@ bool isEmbedded(CIMType type)
     return type == CIMTYPE_OBJECT || type == CIMTYPE_INSTANCE;
 }
 
-// An embedded object may come from the decoder, or as the null of a client that has no type for it.
+// A property with embedded objects also accepts what the decoder makes of them, and the null of a client that sent it
+// with another type.
 bool isStorableAs(const CIMConstProperty& given, const CIMConstProperty& declared)
 {
     if (given.isArray() != declared.isArray()) {
@@ -51,6 +52,7 @@ CIMProperty givenProperty(const CIMConstProperty& given, const CIMConstClass& it
     return propertyOf(declared, given.getValue(), false);
 }
 
+// Datetimes and char16 are strings in a path, so a null of them is an empty key like a null string.
 CIMKeyBinding keyBinding(const CIMConstProperty& property)
 {
     const CIMValue& value = property.getValue();

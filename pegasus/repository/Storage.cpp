@@ -4,6 +4,8 @@ namespace Pegasus::repository {
 
 namespace {
 
+// Sequence numbers keep the order of creation. NOCASE folds ASCII letters only, as CIM names do. A path is stored as
+// its key (pathKey), in which names are folded already.
 constexpr const char* kSchema =
     "BEGIN;"
     "CREATE TABLE IF NOT EXISTS namespaces(id INTEGER PRIMARY KEY, name TEXT NOT NULL COLLATE NOCASE UNIQUE);"
@@ -23,6 +25,8 @@ constexpr const char* kListDeepSubclasses =
     "  WHERE c.namespace = ?1)"
     " SELECT name FROM classes WHERE namespace = ?1 AND super IN (SELECT name FROM below) ORDER BY sequence";
 
+// Recursive like the one above: an enumeration includes instances of all subclasses. Starting after a sequence number
+// makes batches independent of each other.
 constexpr const char* kListInstances =
     "WITH RECURSIVE below(name) AS (SELECT ?2 UNION SELECT c.name FROM classes c JOIN below b ON c.super = b.name"
     "  WHERE c.namespace = ?1)"

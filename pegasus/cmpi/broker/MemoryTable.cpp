@@ -10,11 +10,12 @@
 #include <cstring>
 #include <new>
 
-// Memory that ends with the provider's function, and frames that the provider opens itself.
+// Memory that ends with the frame in which it was made, and frames that the provider opens itself.
 namespace Pegasus::cmpi {
 namespace {
 
-// A block of plain memory that a frame owns; the provider holds the bytes behind the header.
+// A block of plain memory that a frame owns. The provider holds the address of the bytes after this header, which is
+// how free and realloc find it again.
 class alignas(std::max_align_t) MemoryBlock final : public Owned
 {
   public:
@@ -43,7 +44,7 @@ class alignas(std::max_align_t) MemoryBlock final : public Owned
     std::size_t fSize;
 };
 
-// A frame that a provider opened; the frame around it frees it when the provider forgets.
+// A frame that a provider opened. The frame around it owns it, so that one that the provider never ends is freed too.
 class MarkedFrame final : public Owned, public Frame
 {
 };
@@ -117,7 +118,7 @@ template <typename Object, typename Face> void freeObject(const CMPIBroker*, Fac
     releaseObject<Object, Face>(face);
 }
 
-// No broker of ours makes a select expression.
+// Empty: this broker makes no select expressions.
 void freeSelectExp(const CMPIBroker*, CMPISelectExp*) {}
 
 void freeChars(const CMPIBroker* broker, char* chars)

@@ -7,7 +7,7 @@
 namespace Pegasus::cmpi {
 namespace {
 
-constexpr CMPICount kMaxArguments = 10; // one digit names each
+constexpr CMPICount kMaxArguments = 10; // $0 to $9
 
 std::string textOf(const char* text)
 {

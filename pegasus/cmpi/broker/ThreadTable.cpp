@@ -9,7 +9,8 @@
 #include <pthread.h>
 #include <time.h>
 
-// The platform's threads under CMPI's names. Integer results are 0 or an errno.
+// The platform's threads under CMPI's names. CMPI gives providers these so that they run on any platform; here each is
+// one pthread call. Integer results are 0 or an errno.
 namespace Pegasus::cmpi {
 namespace {
 
@@ -19,6 +20,7 @@ pthread_t native(CMPIThread thread)
     return reinterpret_cast<pthread_t>(thread);
 }
 
+// Ownership: the provider's; it calls free().
 char* resolveFileName(const char* name)
 {
     const std::string file = std::string("lib") + (name == nullptr ? "" : name) + ".so";
@@ -54,6 +56,7 @@ int cancelThread(CMPIThread thread)
     return ::pthread_cancel(native(thread));
 }
 
+// Sleeps the whole time: a signal to the process does not shorten it.
 int threadSleep(CMPIUint32 milliseconds)
 {
     timespec left{static_cast<time_t>(milliseconds / 1000), static_cast<long>(milliseconds % 1000) * 1000000L};
@@ -97,7 +100,7 @@ pthread_mutex_t* mutexOf(CMPIMutex mutex)
     return static_cast<pthread_mutex_t*>(mutex);
 }
 
-// Recursive, as providers of every broker are used to.
+// Recursive: providers lock again in functions that they call under the lock, and other brokers allow it.
 CMPIMutex newMutex(int)
 {
     auto* mutex = new (std::nothrow) pthread_mutex_t;

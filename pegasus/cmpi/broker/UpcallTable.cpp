@@ -13,7 +13,8 @@
 namespace Pegasus::cmpi {
 namespace {
 
-// What an upcall is about: the path without its name space, and the name space, by default the calling request's.
+// The object of an upcall: its path without the namespace, and the namespace. A path without one is in the namespace of
+// the request that the provider serves, which the context carries.
 struct Target
 {
     Target(const CMPIContext* context, const CMPIObjectPath* target)
@@ -50,11 +51,13 @@ CIMPropertyList listOf(const char** properties)
     return {names};
 }
 
+// The provider makes the copy on the serving thread and passes it to its own thread, which outlives the call's context.
 CMPIContext* prepareAttachThread(const CMPIBroker*, const CMPIContext* context)
 {
     return cloneObject<ContextObject, CMPIContext>(context, nullptr);
 }
 
+// From here to detachThread() the calling thread's objects belong to a frame that the context owns.
 CMPIStatus attachThread(const CMPIBroker*, const CMPIContext* context)
 {
     return perform([&] {
@@ -77,7 +80,7 @@ CMPIStatus detachThread(const CMPIBroker*, const CMPIContext* context)
     });
 }
 
-// No provider of ours is ever asked to enable indications, and only those may deliver.
+// Refused: only a provider that was asked to enable indications may deliver one, and this server asks none.
 CMPIStatus deliverIndication(const CMPIBroker*, const CMPIContext*, const char*, const CMPIInstance*)
 {
     return makeStatus(CMPI_RC_ERR_FAILED, "indications are not enabled");

@@ -63,6 +63,7 @@ template <typename Interface> Interface* ProviderInterfaces::make(const char* ki
     return fLibrary.create<Interface>(kind, provider, fBroker, context);
 }
 
+// Looks twice: while this thread waited for the factory's turn, another one may have made the interface.
 // Returns: null when the library has no factory of that kind.
 template <typename Interface>
 Interface* ProviderInterfaces::obtain(Interface* Provider::*kept, const char* kind, const std::string& provider)
@@ -112,6 +113,8 @@ CMPIrc ProviderInterfaces::cleanup(Provider& provider, bool terminating)
     return std::max(instance, method);
 }
 
+// Three steps, so that no lock of requests is held while providers clean up: close the door to new requests, clean up,
+// open it again. A provider that wants to stay for ever is not asked a second time.
 ProviderModule::Cleanup ProviderInterfaces::cleanupWhenIdle()
 {
     {

@@ -65,7 +65,8 @@ class ProviderModule::Impl
 
 namespace {
 
-// One call into a provider: its frame, its arguments and its result.
+// One call into a provider: its frame, its arguments and its result. The order of the members matters: the frame ends
+// after the arguments, and the interface may end only after both.
 class Call
 {
   public:

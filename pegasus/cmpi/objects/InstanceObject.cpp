@@ -87,6 +87,7 @@ InstanceObject::InstanceObject(const InstanceObject& other)
     hdl = this;
 }
 
+// A path's keys may be wider than the class declares; a key that the class lacks stays in the path alone.
 void InstanceObject::takeKeys()
 {
     for (const NamedValue& key : fPath.keys) {
@@ -204,6 +205,7 @@ void InstanceObject::setProperty(const char* name, const CMPIValue* value, CMPIT
     store(at, std::move(decoded));
 }
 
+// Most providers set keys as properties only; the path that goes to the client needs them all.
 PathState InstanceObject::completePath() const
 {
     PathState path = fPath;

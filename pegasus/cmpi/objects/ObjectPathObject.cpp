@@ -122,6 +122,7 @@ CMPIStatus setHostAndNameSpaceFromObjectPath(const CMPIObjectPath* self, const C
     });
 }
 
+// Not supported: the broker's schema keeps no qualifiers.
 CMPIData noQualifier(CMPIStatus* rc)
 {
     return answer(rc, kNothing, []() -> CMPIData { throw CmpiError{CMPI_RC_ERR_NOT_SUPPORTED, {}}; });

@@ -39,7 +39,7 @@ template <typename Number> bool parse(const std::string& text, std::size_t start
     return error == std::errc() && stop == end;
 }
 
-// The wire does not check the text of a numeric key, so that it may be anything: then the key stays text.
+// The wire passes any text as a numeric key. One that is not a number stays text.
 CIMValue numberOf(const String& text)
 {
     const std::string digits = base::utf8(text);

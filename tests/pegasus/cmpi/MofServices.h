@@ -11,8 +11,9 @@
 
 namespace Pegasus::cmpi {
 
-// The server's side for broker tests: classes from MOF, one name space (root/cimv2), upcalls answered by the module
-// that the test routes them to. Counts what it was asked. Thread: all members but the set-up.
+// The server's side for broker tests: classes from MOF in one namespace (root/cimv2). Upcalls go to the module that the
+// test names. Counts the classes that it was asked for.
+// Thread: all members except compile and route may be called on any thread.
 class MofServices : public BrokerServices
 {
   public:
@@ -21,7 +22,7 @@ class MofServices : public BrokerServices
     void compileFile(const std::string& path);
     void compileText(const std::string& text);
 
-    // Upcalls go to this provider, as a server would pass them on.
+    // Sets the provider to which upcalls go.
     void route(ProviderModule& module, const std::string& provider);
     static ProviderRequest request(const std::string& provider);
 
@@ -49,7 +50,7 @@ class MofServices : public BrokerServices
     unsigned fClassCount = 0;
 };
 
-// Helpers for looking at what was delivered.
+// Texts of delivered values.
 std::string text(const String& string);
 // Returns: the property's value as text ("<null>", "<none>" when the instance lacks it).
 std::string propertyText(const CIMInstance& instance, const char* name);

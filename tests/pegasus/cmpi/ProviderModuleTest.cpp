@@ -23,7 +23,7 @@ using testing::HasSubstr;
 
 constexpr const char* kProvider = "Conformance";
 
-// "code: text" of what the call threw, "" when it did not.
+// Returns: "code: text" of the call's exception, "" without one.
 template <typename Call> std::string errorOf(Call&& call)
 {
     try {
@@ -93,7 +93,7 @@ std::vector<std::string> checkNames()
     return result;
 }
 
-// The checks that the provider makes from its side; each runs in a module of its own.
+// Runs the checks that the provider makes on its side, each in a module of its own.
 TEST_F(Module, PassesTheProvidersChecks)
 {
     const std::vector<std::string> names = checkNames();

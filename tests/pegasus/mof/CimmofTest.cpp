@@ -42,7 +42,7 @@ class Cimmof : public testing::Test
     static std::unique_ptr<PrivateServer> server;
 };
 
-// Counts writes into the files of a directory. A burst that nobody has read yet may count as one.
+// Counts writes into the files of a directory. Writes that follow each other fast may count as one.
 class WriteCounter
 {
   public:
@@ -54,7 +54,7 @@ class WriteCounter
     WriteCounter(const WriteCounter&) = delete;
     WriteCounter& operator=(const WriteCounter&) = delete;
 
-    // Returns: false if so many do not come.
+    // Returns: false when fewer writes come before the timeout.
     bool waitFor(unsigned count)
     {
         pollfd wait = {fWatch, POLLIN, 0};
@@ -84,7 +84,7 @@ TEST_F(Cimmof, AnswersTheCommandLineAsOpenPegasusDoes)
         const char* name;
         std::vector<std::string> arguments;
         int exitStatus;
-        std::string out; // a part of it; "" nothing at all
+        std::string out; // a part of it; "": no output
         std::string err;
     };
     const Row rows[] = {
@@ -125,7 +125,7 @@ TEST_F(Cimmof, SaysWhatTheServerRefused)
     {
         const char* name;
         const char* text;
-        const char* error; // behind the file name
+        const char* error; // after the file name
     };
     const Row rows[] = {
         {"superclass", "class S1 : NoSuper {};",
@@ -205,8 +205,8 @@ TEST(CimmofAlone, SaysThatThereIsNoServer)
     EXPECT_EQ(result.err, "Cannot connect to CIM Server. The CIM Server may not be running.\n");
 }
 
-// The server dies in the middle of a compilation: the compiler says so and ends, and what the server had stored is
-// whole and can be compiled over.
+// The server is killed in the middle of a compilation. The compiler must end with an error, and the repository must
+// hold whole definitions only, over which the file can be compiled again.
 TEST(CimmofAlone, LeavesAWholeRepositoryWhenTheServerIsKilled)
 {
     constexpr int kRounds = 4;

@@ -37,7 +37,7 @@ MemoryHandler compile(const std::string& text, const CompileOptions& with = opti
     return handler;
 }
 
-// What went wrong, as "line:column: cause"; empty if nothing did.
+// Returns: the error as "line:column: cause"; empty without one.
 std::string failureOf(const std::string& text, const CompileOptions& with = options())
 {
     try {
@@ -186,7 +186,7 @@ TEST(Compiler, GivesInstancesTheTypesOfTheirClass)
     EXPECT_EQ(describe(handler.instances().at(0)), "instance B { uint8[] n=<1 2 >; string id=<one>; real32 r=null; }");
 }
 
-// Constructs that DSP0004 does not have but vendors' files do, because OpenPegasus's compiler takes them.
+// Constructs beyond DSP0004 that vendors' files have, because OpenPegasus's compiler accepts them.
 TEST(Compiler, AcceptsWhatOpenPegasusAccepts)
 {
     struct Row
@@ -295,7 +295,7 @@ TEST(Compiler, DeliversEverythingInFrontOfTheFirstError)
     }
 }
 
-// Cut anywhere, a text must end in an error inside of it or in the definitions that are whole.
+// A text that is cut anywhere must deliver its whole definitions and end in an error within the text, if in any.
 TEST(Compiler, SurvivesATextCutAtEveryLength)
 {
     const std::string text =

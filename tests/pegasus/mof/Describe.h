@@ -10,8 +10,8 @@ namespace mof_test {
 
 std::string utf8(const Pegasus::String& text);
 
-// One line each, close to MOF, with everything that a definition says and nothing else. What is marked propagated has
-// a tilde in front, a class origin stands behind an at sign.
+// Return: one line, close to MOF, with everything that the definition has. A tilde precedes propagated elements; an at
+// sign precedes a class origin.
 std::string describe(const Pegasus::CIMConstQualifierDecl& declaration);
 std::string describe(const Pegasus::CIMConstClass& cimClass);
 std::string describe(const Pegasus::CIMConstInstance& instance);

@@ -9,9 +9,9 @@
 #include <sstream>
 #include <vector>
 
-// Each cases/NAME.mof is compiled from within its folder; cases/NAME.expected holds what a user reads: the warnings,
-// the error with its line and caret, and how much was delivered.
-// With VRX_UPDATE_GOLDEN set in the environment the files are written instead of compared.
+// Compiles each cases/NAME.mof. cases/NAME.expected has what a user reads (the warnings, the error with its line and
+// caret, the number of skipped definitions) and how much was delivered.
+// With VRX_UPDATE_GOLDEN set in the environment, the expected files are written and not compared.
 
 using namespace Pegasus::mof;
 

@@ -11,7 +11,7 @@ using mof_test::TemporaryDirectory;
 
 namespace {
 
-// Goes back to the working directory that the test had.
+// Changes the working directory for its lifetime.
 class WorkingDirectory
 {
   public:

@@ -8,7 +8,7 @@
 
 namespace mof_test {
 
-// A directory of its own for one test, removed with all it holds.
+// A directory for one test, removed with its content.
 class TemporaryDirectory
 {
   public:
@@ -29,7 +29,8 @@ class TemporaryDirectory
     TemporaryDirectory& operator=(const TemporaryDirectory&) = delete;
 
     const std::string& path() const { return fPath; }
-    // Writes a file, with the folders above it, and returns its path.
+    // Writes a file and creates the folders above it.
+    // Returns: its path.
     std::string write(const std::string& name, const std::string& text) const
     {
         const std::filesystem::path file = std::filesystem::path(fPath) / name;

@@ -98,7 +98,7 @@ TEST_F(ClassTest, GivesBackWhatTheOptionsAskFor)
     for (const Row& row : rows) {
         EXPECT_EQ(read(row.className, row.options), row.expected) << row.name;
     }
-    // Asked for again, the answer comes from the cache.
+    // The second answer comes from the cache.
     EXPECT_EQ(read("MIDDLE", {false, true, false, {}}), kMiddleWhole);
 }
 

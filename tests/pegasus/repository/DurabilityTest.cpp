@@ -62,7 +62,8 @@ unsigned countBytes(int descriptor)
     return count;
 }
 
-// Kills the writer when it has acknowledged so many pairs and works on the next. Returns: how many it had in the end.
+// Kills the writer when it has acknowledged so many pairs and works on the next one.
+// Returns: how many pairs it has acknowledged in the end.
 unsigned writeAndKill(const std::string& directory, unsigned pairs)
 {
     int ends[2];
@@ -107,7 +108,7 @@ TEST(Durability, KeepsEveryAcknowledgedWriteAndNothingHalfWhenKilled)
         EXPECT_GE(instanceCount, acknowledged) << "round " << round;
         EXPECT_LE(classes.size(), acknowledged + 1) << "round " << round;
         EXPECT_THAT(instanceCount, testing::AnyOf(classes.size(), classes.size() - 1)) << "round " << round;
-        // Everything that is listed can be read whole, and one can go on writing.
+        // Everything that is listed can be read whole, and writing goes on.
         for (const CIMName& name : classes) {
             EXPECT_NO_THROW(repository.getClass(kNamespace, name, {false, true, true, {}})) << round;
         }

@@ -94,7 +94,7 @@ TEST_F(InstanceTest, RefusesWhatDoesNotFitTheClass)
     EXPECT_EQ(list("Base", {}), "");
 }
 
-// A null text key counts as empty, as OpenPegasus has it.
+// A null text key counts as empty, as in OpenPegasus.
 TEST_F(InstanceTest, KnowsAPathInWhateverSpelling)
 {
     create("instance of Keys { u = 16; b = true; r = \"Keys.u=1,b=FALSE\"; }; instance of Sub {};");
@@ -168,7 +168,7 @@ TEST_F(InstanceTest, EnumeratesMoreThanOneBatchInOrderAndStopsWhenTold)
         EXPECT_EQ(utf8(paths[i].toString()), "Sub.Id=\"" + std::to_string(i) + "\"");
     }
     Uint32 seen = 0;
-    // The sink may use the repository: it runs outside of its lock.
+    // The visitor may use the repository: no lock is held.
     repository.enumerateInstances(kNamespace, CIMName("Base"), {}, [&](const CIMInstance& found) {
         repository.deleteInstance(kNamespace, found.getPath());
         return ++seen < 100;

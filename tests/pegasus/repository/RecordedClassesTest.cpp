@@ -8,8 +8,8 @@
 #include <fstream>
 #include <sstream>
 
-// Classes as a real server once gave them out: their local forms are created here, and what comes back in every form
-// must be what the real server answered, byte by byte.
+// Classes that a real OpenPegasus server returned. Their local forms are created here; the answers in every form must
+// be equal to the real server's, byte by byte.
 
 using namespace Pegasus;
 using namespace Pegasus::repository;
@@ -27,7 +27,7 @@ std::string answerOf(const std::string& exchange)
     return text.str();
 }
 
-// The CLASS elements of an answer, each with the line feed behind it.
+// Returns: the CLASS elements of an answer, each with the line feed after it.
 std::vector<std::string> classesIn(const std::string& answer)
 {
     static const std::string kEnd = "</CLASS>\n";
@@ -52,7 +52,7 @@ std::string encode(const CIMConstClass& cimClass)
     return text;
 }
 
-// The recorded classes carry the effective flavors, so a use tells its declaration.
+// The recorded classes have effective flavors, so a use shows the flavors of its declaration.
 template <typename Owner> void declareQualifiers(Repository& repository, const Owner& owner)
 {
     for (Uint32 i = 0; i < owner.getQualifierCount(); ++i) {

@@ -19,7 +19,7 @@ mof::CompileOptions optionsFor(const char* nameSpace)
     return options;
 }
 
-// Takes any class, whatever it derives from.
+// Keeps the last class; its superclass need not exist.
 class Collector : public mof::MemoryHandler
 {
   public:

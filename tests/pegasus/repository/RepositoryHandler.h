@@ -27,14 +27,15 @@ class RepositoryHandler : public Pegasus::mof::DefinitionHandler
     Pegasus::CIMNamespaceName fNamespace;
 };
 
-// Both throw mof::MofError or Pegasus::Exception; creates the namespace if it is missing.
+// Create the namespace if it is missing.
+// Throw: mof::MofError, Pegasus::Exception.
 void compileText(Pegasus::repository::Repository& repository, const char* nameSpace, const std::string& text);
 void compileFile(Pegasus::repository::Repository& repository, const char* nameSpace, const std::string& path);
 
-// The one class that the definition declares, as a client would send it; nothing is checked but its syntax.
+// Returns: the one class that the definition declares, as a client would send it, after a check of its syntax only.
 Pegasus::CIMClass parseClass(const std::string& declarations, const std::string& definition);
 
-// "code message" of the CIMException that the operation throws, or "no failure".
+// Returns: "code message" of the operation's CIMException, or "no failure".
 std::string failureOf(const std::function<void()>& operation);
 
 } // namespace repository_test

@@ -1,4 +1,4 @@
-/* Checks of a broker from where its providers stand. Every check is a row: a name and a function. */
+/* Checks of a broker on its providers' side. Every check is a row: a name and a function. */
 #pragma once
 
 #include <cmpi/cmpi.h>
@@ -13,7 +13,7 @@ typedef struct Env
     CMPIArgs* out;
 } Env;
 
-/* Returns: what did not hold, or NULL. */
+/* Returns: the condition that failed, or NULL. */
 typedef const char* (*Check)(const Env* env);
 
 typedef struct CheckRow

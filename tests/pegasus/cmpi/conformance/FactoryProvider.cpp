@@ -1,5 +1,5 @@
-// Providers in C++ whose work is done in their factory: "Exact" makes a hundred rounds of broker calls there and throws
-// at the first answer that it does not expect; "Throwing" throws whatever happens, and "Late" at its first request.
+// Providers in C++ that work in their factory. "Exact" makes a hundred rounds of broker calls and throws at the first
+// unexpected answer; "Throwing" always throws; "Late" throws at its first request.
 #include <cmpi/cmpi.h>
 
 #include <stdexcept>

@@ -24,7 +24,7 @@ static CMPIStatus enumerateInstances(CMPIInstanceMI* mi, const CMPIContext* ctx,
     return result->ft->returnInstance(result, gBroker->eft->newInstance(gBroker, path, NULL));
 }
 
-/* Only what an interface of version 1.0 has, and nothing is mapped behind it. */
+/* The members of an interface of version 1.0; the memory after it is not mapped. */
 static const CMPIInstanceMIFT* oldTable(void)
 {
     const size_t page = (size_t)sysconf(_SC_PAGESIZE);
@@ -70,7 +70,7 @@ CMPIInstanceMI* Faulty_Create_InstanceMI(const CMPIBroker* broker, const CMPICon
     }
     rc->rc = CMPI_RC_ERR_FAILED;
     rc->msg = broker->eft->newString(broker, "no device yet", NULL);
-    return make(broker, NULL); /* an interface beside an error is an error */
+    return make(broker, NULL); /* an interface together with an error status is an error */
 }
 #elif defined(FAULT_GENERIC)
 CMPIInstanceMI* _Generic_Create_InstanceMI(const CMPIBroker* broker, const CMPIContext* ctx, const char* name,

@@ -82,7 +82,7 @@ static CMPIStatus returnChanged(const CMPIResult* result)
     return result->ft->returnInstance(result, instance);
 }
 
-/* Says by its message what a broker answered to a wrong kind of result. */
+/* Returns the broker's answers to wrong kinds of results as its message. */
 static CMPIStatus returnWrongKinds(const CMPIResult* result)
 {
     char text[64];
@@ -267,7 +267,7 @@ static CMPIStatus descend(const Env* env)
     return env->result->ft->returnData(env->result, &depth, CMPI_uint32);
 }
 
-/* Hands every input parameter back, and the first one as the return value. */
+/* Returns every input parameter as output, and the first one as the return value. */
 static CMPIStatus echo(const Env* env)
 {
     const CMPICount count = env->in->ft->getArgCount(env->in, NULL);
@@ -296,7 +296,7 @@ static CMPIStatus setMode(const Env* env)
     return env->result->ft->returnData(env->result, &zero, CMPI_uint32);
 }
 
-/* How often it was called since the library was loaded, and how many clean-ups overlapped calls. */
+/* Returns the number of calls since the library was loaded, and of clean-ups that overlapped calls. */
 static CMPIStatus tell(const Env* env)
 {
     static CMPIUint32 calls;
@@ -351,7 +351,7 @@ static const CMPIMethodMIFT kMethodMIFT = {.ftVersion = CMPIVersion200,
                                            .cleanup = tstMethodCleanup,
                                            .invokeMethod = tstInvokeMethod};
 
-/* The broker that the first factory got is the one that all others get. */
+/* All factories get the same broker. */
 static int isRightCall(const CMPIBroker* broker, const CMPIContext* ctx, const CMPIStatus* rc)
 {
     const int isRight = broker != NULL && ctx != NULL && rc != NULL && rc->rc == CMPI_RC_OK && rc->msg == NULL &&

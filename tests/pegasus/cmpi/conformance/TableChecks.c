@@ -1,4 +1,4 @@
-/* The tables themselves: versions, and that no slot is empty. */
+/* The tables themselves: versions; every slot has a function. */
 #include "tests/pegasus/cmpi/conformance/Conformance.h"
 
 #include <string.h>
@@ -82,7 +82,7 @@ static const char* kindsAreNamed(const Env* env)
     return NULL;
 }
 
-/* What is not meant to work says so, with a null result. */
+/* Unsupported functions return an error status and a null result. */
 static const char* unsupportedSlotsAnswer(const Env* env)
 {
     const CMPIBroker* mb = env->mb;

@@ -88,7 +88,7 @@ static const char* failuresComeAsCodes(const Env* env)
     return NULL;
 }
 
-/* An upcall into the same provider has a frame of its own: what was made before it stays, what it returned does too. */
+/* An upcall into the same provider has a frame of its own: objects made before it and its results stay. */
 static const char* upcallsNest(const Env* env)
 {
     const CMPIString* before = env->mb->eft->newString(env->mb, "before", NULL);

@@ -1,4 +1,4 @@
-/* Every type of value, and that no byte beyond it is read. */
+/* Every type of value; the broker reads exactly its bytes. */
 #include "tests/pegasus/cmpi/conformance/Conformance.h"
 
 #include <float.h>
@@ -29,7 +29,7 @@ enum
     kScalarCount = sizeof kScalars / sizeof *kScalars
 };
 
-/* A page that ends the mapping: writing `size` bytes of `source` at its very end. */
+/* Copies `size` bytes of `source` to the end of a page after which nothing is mapped. */
 static void* atPageEnd(void** page, const void* source, size_t size)
 {
     const size_t bytes = (size_t)sysconf(_SC_PAGESIZE);
@@ -88,7 +88,7 @@ static const char* otherFormsOfText(const Env* env)
     REQUIRE(instance->ft->setProperty(instance, "S", &value, CMPI_string).rc == CMPI_RC_OK);
     value.string->ft->release(value.string);
     REQUIRE(strcmp(textOf(instance->ft->getProperty(instance, "S", NULL).value.string), "object") == 0);
-    /* bytes that are no UTF-8 do not lose the rest */
+    /* invalid UTF-8 bytes are replaced; the rest of the text stays */
     REQUIRE(instance->ft->setProperty(instance, "S", (const CMPIValue*)"a\xFFz", CMPI_chars).rc == CMPI_RC_OK);
     REQUIRE(strcmp(textOf(instance->ft->getProperty(instance, "S", NULL).value.string), "a\xEF\xBF\xBDz") == 0);
     return NULL;
