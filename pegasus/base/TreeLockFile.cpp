@@ -128,7 +128,7 @@ bool takeTreeLock(const Descriptor& file)
     return ::fcntl(file.get(), F_OFD_SETLK, &lock) == 0;
 }
 
-// A reader sees the old content, nothing, or the beginning of the new one: lines that are not complete do not count.
+// A reader sees the old content, an empty file, or the beginning of the new content; parse() takes whole lines only.
 void writeTreeLock(const Descriptor& file, const TreeLockRecord& record)
 {
     const std::string text = format(record);

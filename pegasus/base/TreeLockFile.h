@@ -11,11 +11,11 @@
 // until its process ends, however that ends, and writes into it what others need to know about it. It lies beside the
 // repository, which may be deleted at any time.
 //
-// The lock is one of the open file description (F_OFD_SETLK), so that others can ask for it without taking it.
+// The lock belongs to the open file description (F_OFD_SETLK), so that others can ask for it and leave it alone.
 // Thread: any.
 namespace Pegasus::base {
 
-// What the lock file holds: "name=value" lines. A value that is not known yet is 0 or empty.
+// What the lock file holds: "name=value" lines. While the server starts, values may still be 0 or empty.
 struct TreeLockRecord
 {
     pid_t pid = 0;
@@ -28,8 +28,8 @@ struct TreeLockRecord
 
 enum class TreeLockState
 {
-    kAbsent, // no lock file: no server has ever run here, or the last one ended in order
-    kFree,   // the file is there, its server is not
+    kAbsent, // there is no lock file: no server has run here yet, or the last one removed it
+    kFree,   // the server that made the file has ended
     kHeld
 };
 
@@ -41,7 +41,7 @@ struct TreeLockStatus
 
 std::string treeLockPath(const std::string& home);
 
-// Looks without taking the lock. A file that is not a regular one of root's or the user's own counts as absent.
+// Returns: the state at this moment. Only a regular file of root's or the user's own counts as a lock file.
 // Throws: std::system_error when the file is there and cannot be read.
 TreeLockStatus readTreeLock(const std::string& home);
 

@@ -25,8 +25,8 @@ class OptionError : public std::runtime_error
     using std::runtime_error::runtime_error;
 };
 
-// Options and files may be mixed; a value stands right behind its letter or in the next argument.
-// Throws OptionError.
+// Options and files may be mixed; a value follows its letter directly or is the next argument.
+// Throws: OptionError.
 Options parseOptions(const std::vector<std::string>& arguments);
 
 extern const char* const kHelp;

@@ -1,6 +1,5 @@
-#include "pegasus/programs/ConfigActions.h"
-
 #include "pegasus/base/Text.h"
+#include "pegasus/programs/ConfigCommand.h"
 #include "pegasus/server/admin/Config.h"
 
 #include <Pegasus/Client/CIMClient.h>
@@ -129,7 +128,7 @@ try {
     return 1;
 }
 
-// The running server's values; none if no server runs.
+// Returns: the running server's values; empty if no server runs.
 std::optional<Array<CIMInstance>> serverSettings()
 {
     CIMClient client;

@@ -7,7 +7,7 @@
 
 namespace Pegasus::programs {
 
-// What the words behind "cimserver" ask for.
+// What the arguments of cimserver ask for.
 struct ServerCommand
 {
     enum class Action
@@ -25,9 +25,15 @@ struct ServerCommand
     std::vector<std::pair<std::string, std::string>> properties;
 };
 
-// Throws: std::runtime_error, whose what() follows "cimserver not started: ".
+// Throws: std::runtime_error whose what() follows "cimserver not started: ".
 ServerCommand parseServerCommand(const std::vector<std::string>& words);
 
 extern const char* const kServerUsage;
+
+// "cimserver -s": asks the server that holds the tree at `home` to end and waits until its process has ended; ends it
+// by force when it does not answer. Prints what the caller should know. Returns: the exit status. Throws:
+// std::system_error when the tree's lock file cannot be read. Blocks: for the server's shutdown time, and as long
+// again.
+int stopServer(const std::string& home);
 
 } // namespace Pegasus::programs

@@ -1,7 +1,6 @@
-#include "pegasus/programs/StopCommand.h"
-
 #include "pegasus/base/Text.h"
 #include "pegasus/base/TreeLockFile.h"
+#include "pegasus/programs/ServerCommand.h"
 #include "pegasus/server/admin/ProcessHandle.h"
 #include "pegasus/server/admin/StartFile.h"
 

@@ -1,6 +1,6 @@
 // Shows and changes the private server's configuration.
 #include "pegasus/base/Text.h"
-#include "pegasus/programs/ConfigActions.h"
+#include "pegasus/programs/ConfigCommand.h"
 #include "pegasus/server/admin/ConfigFile.h"
 
 #include <Pegasus/Common/Exception.h>

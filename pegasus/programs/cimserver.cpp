@@ -1,10 +1,8 @@
 // The private CIM server: starts, stops and asks after it. As "cimprovagt --agent" it is a provider agent.
 #include "pegasus/base/Text.h"
 #include "pegasus/programs/ServerCommand.h"
-#include "pegasus/programs/StopCommand.h"
 #include "pegasus/server/Server.h"
 #include "pegasus/server/admin/TreeClaim.h"
-#include "pegasus/server/admin/TreeOwners.h"
 #include "pegasus/server/agent/Agent.h"
 
 #include <Pegasus/Common/Exception.h>
@@ -92,6 +90,7 @@ int run(const ServerCommand& command)
 
 int main(int argc, char** argv)
 {
+    server::openStandardDescriptors();
     if (server::isAgentCommand(argc, argv)) {
         return server::runAgent(argc, argv);
     }

@@ -74,7 +74,7 @@ class LocalSocketFile
 // The sockets that connections come in by.
 struct Listeners
 {
-    base::Descriptor remote; // none when the configuration switches TCP off
+    base::Descriptor remote; // empty when the configuration switches TCP off
     base::Descriptor local;
 
     explicit Listeners(const Config& config)

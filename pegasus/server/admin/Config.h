@@ -12,7 +12,7 @@
 
 namespace Pegasus::server {
 
-// A command line or a request names a property or a value that does not exist. what() is the whole sentence.
+// A command line or a request names an unknown property or an invalid value. what() is the whole sentence.
 class ConfigError : public std::runtime_error
 {
   public:
@@ -32,15 +32,14 @@ class ConfigError : public std::runtime_error
 // Throws: ConfigError when there is no such property.
 const ConfigProperty& requireConfigProperty(const std::string& name);
 
-// The configuration of a running server: the table's defaults, over them the planned file's values, over them the
-// command line's, over them what cimconfig sets while it runs.
+// The configuration of a running server. The table's defaults are overridden by the planned file's values, these by the
+// command line's, these by what cimconfig sets while the server runs.
 //
 // Thread: any.
 class Config
 {
   public:
-    // Reads the planned values. A planned value that is no longer valid (a directory that has gone) gives way to the
-    // default.
+    // Reads the planned values. A planned value that has become invalid (a folder that was removed) is ignored.
     explicit Config(const std::string& home);
 
     const std::string& home() const { return fHome; }
@@ -62,9 +61,10 @@ class Config
     bool flag(const std::string& name) const { return text(name) == "true"; }
     std::size_t number(const std::string& name) const;
     std::chrono::seconds seconds(const std::string& name) const;
+    // Returns: the full paths of a directory list.
     std::vector<std::string> directories(const std::string& name) const;
 
-    // Changes with every change of a current value: what was made from the values stays good as long as it is the same.
+    // Returns: a number that changes with every change of a current value.
     unsigned generation() const { return fGeneration; }
 
     // The planned value, or the default if none is planned. Reads the file: cimconfig may have changed it.

@@ -8,7 +8,8 @@ namespace Pegasus::server {
 using ConfigValues = std::map<std::string, std::string>;
 
 // The two files that keep the configuration under the home directory: "name=value" lines, `#` begins a comment line.
-// The planned file holds what the next server takes over; the current one what the running server has.
+// The planned file holds what the next server will use, the current one what the running server uses.
+// Thread: any.
 inline std::string plannedConfigPath(const std::string& home)
 {
     return home + "/cimserver_planned.conf";
@@ -18,13 +19,14 @@ inline std::string currentConfigPath(const std::string& home)
     return home + "/cimserver_current.conf";
 }
 
-// Lines that are no "name=value", and everything beyond 64 KB, are left out; a missing file is empty.
+// Returns: the values. Only "name=value" lines within the first 64 KB count. Empty when the file is missing, or when
+// readOwnFile() refuses it.
 ConfigValues readConfigFile(const std::string& path);
 
-// Throws: std::system_error.
+// Replaces the file. Throws: std::system_error.
 void writeConfigFile(const std::string& path, const ConfigValues& values);
 
-// PEGASUS_HOME, else the folder above that of the running program.
+// Returns: PEGASUS_HOME, else the folder above that of the running program.
 std::string defaultHome();
 
 } // namespace Pegasus::server

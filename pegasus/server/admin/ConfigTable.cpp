@@ -86,7 +86,7 @@ bool areReadableDirectories(const std::vector<std::string>& directories)
     return !directories.empty() && std::all_of(directories.begin(), directories.end(), isReadableDirectory);
 }
 
-// One path component without anything that a shell or a terminal would take for more than a letter.
+// One path component. Characters that mean something to a shell or a terminal are refused.
 bool isConsumerName(const std::string& name)
 {
     static const char kRefused[] = "/\"'\\`$&|;<>()*?[]{}!#~ ";

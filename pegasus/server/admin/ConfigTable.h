@@ -5,13 +5,13 @@
 
 namespace Pegasus::server {
 
-// One property of the server's configuration. Names are compared as written.
+// One property of the server's configuration. Names are compared with regard to case.
 struct ConfigProperty
 {
     enum class Kind
     {
         kBoolean,
-        kFalse,       // a facility that this server does not have: only "false" is accepted
+        kFalse,       // a facility that this server lacks: only "false" is accepted
         kPort,        // 1 to 65535
         kCount,       // 1 to 2^31-1
         kCountOrZero, // 0 to 2^31-1, 0 switches the facility off
@@ -34,10 +34,10 @@ const std::vector<ConfigProperty>& configTable();
 // Returns: null if there is no such property.
 const ConfigProperty* findConfigProperty(const std::string& name);
 
-// Whether a property may take a value; `home` is where relative directories start.
+// Returns: whether a property may take a value; `home` is where relative directories start.
 bool isValidConfigValue(const ConfigProperty& property, const std::string& value, const std::string& home);
 
-// Splits a directory list and puts relative entries below `home`; empty entries are left out.
+// Returns: the entries of a directory list, relative ones below `home`; empty ones are left out.
 std::vector<std::string> splitDirectoryList(const std::string& list, const std::string& home);
 
 } // namespace Pegasus::server

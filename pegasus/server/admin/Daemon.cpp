@@ -71,6 +71,15 @@ void detach()
 
 } // namespace
 
+void openStandardDescriptors()
+{
+    int fd = -1;
+    do {
+        fd = ::open("/dev/null", O_RDWR);
+    } while (fd >= 0 && fd <= STDERR_FILENO);
+    ::close(fd);
+}
+
 void closeInheritedDescriptors(int keep)
 {
     const auto first = static_cast<unsigned>(STDERR_FILENO + 1);

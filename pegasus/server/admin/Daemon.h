@@ -7,15 +7,16 @@
 
 namespace Pegasus::server {
 
-// What the launching process tells its caller.
+// What the launching process reports to its caller.
 struct LaunchResult
 {
     int exitStatus = 0;
-    std::string error; // for standard error, without the line's end
+    std::string error; // one line for standard error
 };
 
-// Tells the launcher, once, that the server is ready or why there is none. Afterwards, and in the foreground, it does
-// nothing.
+// Reports to the launcher, once, that the server is ready or why it cannot start. Later calls have no effect, and
+// neither has any in the foreground.
+// Thread: one at a time.
 class LaunchSignal
 {
   public:
@@ -31,12 +32,18 @@ class LaunchSignal
     base::Descriptor fPipe;
 };
 
-// Runs `server` in a process of its own session with standard input, output and error on /dev/null, umask 077 and no
-// other descriptor of the caller's; the working directory stays. Returns: in the launching process, when the signal has
-// come or the child has died. Requires: no other thread runs.
+// Runs `server` in a process with a session of its own, standard input, output and error on /dev/null, umask 077 and
+// the caller's working directory. The caller's other descriptors are closed there.
+// Returns: in the launching process, what the signal reported, or that the child ended before.
+// Throws: std::system_error. Requires: the caller has one thread.
+// Blocks: until then.
 LaunchResult launchDaemon(const std::function<void(LaunchSignal&)>& server);
 
-// Closes what the caller left open above standard error, but for `keep` (-1: nothing).
+// Opens /dev/null as standard input, output and error where the caller has closed them, so that a file that is opened
+// later never takes their place.
+void openStandardDescriptors();
+
+// Closes all descriptors above standard error except `keep`; -1 keeps none.
 void closeInheritedDescriptors(int keep);
 
 } // namespace Pegasus::server

@@ -66,6 +66,10 @@ std::string formatLine(LogLevel severity, const std::string& text)
     for (const char c : text) {
         if (c == '\n') {
             line += "\\n";
+        } else if (static_cast<unsigned char>(c) < 0x20 || c == 0x7f) { // a terminal must not obey a vendor's text
+            char escape[8];
+            std::snprintf(escape, sizeof escape, "\\x%02x", static_cast<unsigned>(static_cast<unsigned char>(c)));
+            line += escape;
         } else {
             line += c;
         }
@@ -76,7 +80,7 @@ std::string formatLine(LogLevel severity, const std::string& text)
 void put(int fd, const std::string& line)
 {
     if (fd >= 0 && ::write(fd, line.data(), line.size()) < 0) {
-        return; // nowhere to say so
+        return; // the line is lost
     }
 }
 

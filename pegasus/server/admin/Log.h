@@ -4,6 +4,7 @@
 
 namespace Pegasus::server {
 
+// In order of weight: a level includes those before it.
 enum class LogLevel
 {
     kError,
@@ -12,16 +13,17 @@ enum class LogLevel
     kDebug
 };
 
-// The server's log: one line an event, appended to <home>/cimserver.log (mode 0600). Past kMaxLogBytes the file is set
-// aside as cimserver.log.1 and begun anew. Line ends within a text are written as "\n".
+// The server's log: one line an event, appended to <home>/cimserver.log (mode 0600). Past kMaxLogBytes the file is
+// renamed to cimserver.log.1, and a new one begins. Control bytes are written as "\n", "\x1b".
 //
-// Thread: any. Nothing throws: a log that cannot be written is no reason to fail a request.
+// Throws: nothing. A line that cannot be written is lost.
+// Thread: any.
 class Log
 {
   public:
     static constexpr std::size_t kMaxLogBytes = 8u << 20;
 
-    // Until opened, lines are dropped. `alsoToStandardError` serves a server in the foreground.
+    // Lines written before are lost. `alsoToStandardError` serves a server in the foreground.
     static void open(const std::string& home, bool alsoToStandardError) noexcept;
     static void setLevel(LogLevel least) noexcept;
     static void write(LogLevel severity, const std::string& text) noexcept;

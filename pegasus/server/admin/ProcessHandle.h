@@ -8,14 +8,16 @@
 
 namespace Pegasus::server {
 
-// A process by a handle of its own: a later process of the same number is never waited for or ended.
+// A process, by a handle that stays its own when the number is given to a later process.
+//
+// Thread: any.
 class ProcessHandle
 {
   public:
-    // A process that has ended already, or never was, gives a handle of a process that has ended.
+    // The number of a process that does not exist gives a handle of one that has ended.
     explicit ProcessHandle(pid_t pid);
 
-    // Whether the process runs this program.
+    // Returns: whether the process runs this program's file.
     bool runsThisProgram() const;
     // Returns: false if it still runs at the time-out.
     bool waitForEnd(std::chrono::milliseconds timeout) const;

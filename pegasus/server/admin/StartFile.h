@@ -6,11 +6,11 @@
 
 namespace Pegasus::server {
 
-// The file under /var/tmp that tells other programs which process serves one consumer: the process id in decimal, one
-// newline. Its path is fixed by the programs that look for it.
+// The file under /var/tmp by which other programs find the process that serves one consumer: the process id in decimal,
+// one newline. Its path is fixed by the programs that look for it.
 //
-// It lies in a folder that everybody may write to, so this server only writes it: whether a server runs is a matter of
-// the tree's lock.
+// Everybody may write to its folder, so this server only writes it; the tree's lock decides whether a server runs.
+// Thread: any.
 class StartFile
 {
   public:

@@ -6,8 +6,9 @@
 
 namespace Pegasus::server {
 
-// Becomes readable when the server is to end: by SIGTERM, SIGINT or SIGHUP, or by raise().
-// While it exists, these signals are blocked in this thread and in those started from it.
+// A descriptor that becomes readable when the server is to end: by SIGTERM, SIGINT or SIGHUP, or by raise().
+// From the constructor on, these signals are blocked in this thread and in those started from it, and SIGPIPE is
+// ignored by the process.
 class StopSignal
 {
   public:

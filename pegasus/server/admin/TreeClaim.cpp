@@ -1,9 +1,11 @@
 #include "pegasus/server/admin/TreeClaim.h"
 
+#include "pegasus/base/OwnedPath.h"
 #include "pegasus/server/admin/Log.h"
 #include "pegasus/server/admin/ProcessHandle.h"
 #include "pegasus/server/admin/StartFile.h"
 
+#include <filesystem>
 #include <system_error>
 
 #include <fcntl.h>
@@ -12,6 +14,8 @@
 namespace Pegasus::server {
 
 namespace {
+
+namespace fs = std::filesystem;
 
 constexpr int kMaxReplacements = 3; // others may be starting at the same time
 constexpr std::chrono::seconds kOrderlyEndTimeout{1};
@@ -38,7 +42,44 @@ pid_t endLeftOverServer(const std::string& home)
     return pid;
 }
 
+void require(const std::string& path)
+{
+    const std::string fault = base::ownershipFault(path);
+    if (!fault.empty()) {
+        throw StartError("cimserver not started: " + fault +
+                         "; cimconfig -s strictOwners=false -p switches this check off.");
+    }
+}
+
+// A folder and what lies in it: programs and libraries.
+void requireWithContent(const std::string& folder)
+{
+    require(folder);
+    std::error_code ignored; // of a missing folder, which is empty here
+    for (const fs::directory_entry& entry : fs::directory_iterator(folder, ignored)) {
+        require(entry.path().string());
+    }
+}
+
 } // namespace
+
+void requireOwnTree(const Config& config)
+{
+    if (!config.flag("strictOwners")) {
+        return;
+    }
+    const fs::path program = fs::read_symlink("/proc/self/exe");
+    require(program.string());
+    require(program.parent_path().string());
+    requireWithContent((program.parent_path().parent_path() / "lib").string());
+    require(config.home());
+    requireWithContent(config.home() + "/bin");
+    requireWithContent(config.home() + "/lib");
+    require(config.home() + "/provider");
+    for (const std::string& folder : config.directories("providerDir")) {
+        require(folder);
+    }
+}
 
 TreeClaim::~TreeClaim()
 {

@@ -15,10 +15,17 @@ class StartError : public std::runtime_error
     using std::runtime_error::runtime_error;
 };
 
-// This server's hold on its tree, and the files that tell others about it; removed in the end.
+// Requires that only root and the server's own user can change what a server of this configuration is going to run:
+// this program and its libraries, and in the tree the home folder, bin, lib, provider and the folders of providerDir.
+// An agent checks a vendor's library when it loads it. strictOwners=false switches both checks off.
+// Throws: StartError with path, owner and mode.
+// Thread: any.
+void requireOwnTree(const Config& config);
+
+// This server's hold on its tree, and the files by which others find it. The destructor removes them.
 //
-// A server that finds the tree held by one whose repository has been deleted under it takes its place: that one is left
-// over from a host that has gone, and can serve nobody.
+// A server that finds the tree held by another one whose repository has been deleted takes its place: the other one is
+// left over from a host that has ended.
 //
 // Thread: one at a time.
 class TreeClaim
@@ -34,7 +41,7 @@ class TreeClaim
     // Blocks: when it ends a server that is left over, 1 s and until that process has ended.
     void take(const Config& config);
 
-    // Tells others which process serves, from which repository: completes the lock file and writes the start file. A
+    // Publishes which process serves, from which repository: completes the lock file and writes the start file. A
     // start file that cannot be written is a line in the log.
     // Throws: std::system_error. Requires: taken; the repository's folder exists.
     void announce(const std::string& repository);

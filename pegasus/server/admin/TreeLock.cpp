@@ -10,7 +10,8 @@ namespace Pegasus::server {
 
 namespace {
 
-// Whether the path still names the locked file: a predecessor may have removed it between our open and our lock.
+// Returns: whether the path still names the locked file. Its last holder may have removed it between our open and our
+// lock.
 bool isSameFile(int fd, const std::string& path)
 {
     struct stat ours = {};

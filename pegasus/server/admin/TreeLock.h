@@ -8,6 +8,7 @@ namespace Pegasus::server {
 
 // Holds "one server a tree": the lock on <home>/cimserver.lock. The kernel releases it when the process ends, however
 // it ends.
+// Thread: one at a time.
 class TreeLock
 {
   public:
@@ -16,7 +17,7 @@ class TreeLock
     bool acquire(const std::string& home);
     // Requires: acquired. Throws: std::system_error.
     void write(const base::TreeLockRecord& record) const { base::writeTreeLock(fFile, record); }
-    // Removes the file, then releases the lock. Without a lock it does nothing.
+    // Removes the file, then releases the lock, if this object holds it.
     void release() noexcept;
 
   private:

@@ -73,7 +73,7 @@ class ChannelThreads
     unsigned fCount = 0;
 };
 
-// Returns: the next channel; none when the server has gone.
+// Returns: the next channel; an empty descriptor when the server has gone.
 base::Descriptor receiveChannel()
 {
     char byte = 0;
@@ -128,7 +128,7 @@ int runAgent(int, char** argv)
     while (base::Descriptor channel = receiveChannel()) {
         threads.serve(std::move(channel), *handler);
     }
-    // A provider that still works, or never returns, is left behind with its process; else it is asked to clean up.
+    // When every request has ended in time, providers are asked to clean up. A provider that still works is cut off.
     if (threads.waitForEnd(base::Deadline::after(kGraceForProviders))) {
         handler.reset();
     }

@@ -32,7 +32,7 @@ class AgentSilent : public std::runtime_error
 struct AgentRequest
 {
     std::string method;
-    std::string object; // the CIMObject header, not encoded
+    std::string object; // the CIMObject header, before encoding
     std::string body;   // the CIM message
     std::string provider;
     std::string library; // path of the module's library

@@ -39,7 +39,7 @@ cmpi::ProviderModule& AgentHandler::module(const HttpRequest& http)
     return *fModule;
 }
 
-// Whoever can change the library, or put another one into its folder, would run as this user.
+// A user who can change the library, or put another one into its folder, would run code as this user.
 void AgentHandler::requireOwned(const std::string& library) const
 {
     std::string fault = base::ownershipFault(library.substr(0, library.rfind('/') + 1));

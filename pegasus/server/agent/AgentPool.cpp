@@ -64,7 +64,7 @@ CimStatus AgentPool::request(const ProviderReference& provider, AgentRequest req
     try {
         return requestOnce(provider.module, request, sink, settings.timeout);
     } catch (const AgentGone&) {
-        // It died while idle and nobody had noticed yet; the request never reached it.
+        // It died while idle, before the request could reach it.
     }
     try {
         return requestOnce(provider.module, request, sink, settings.timeout);

@@ -31,7 +31,7 @@ class AgentPool
     static constexpr std::chrono::seconds kLastBackOff{60};
 
     explicit AgentPool(std::function<AgentSettings()> settings);
-    // Ends all agents. Requires: no request is running.
+    // Ends all agents. Requires: all requests have ended.
     ~AgentPool();
     AgentPool(const AgentPool&) = delete;
     AgentPool& operator=(const AgentPool&) = delete;

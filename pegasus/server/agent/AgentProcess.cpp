@@ -46,7 +46,7 @@ struct SpawnPlan
     {
         ::posix_spawn_file_actions_init(&actions);
         ::posix_spawnattr_init(&attributes);
-        // dup2 onto itself would keep close-on-exec, so the end is never 3 already: see spawnAgent().
+        // spawnAgent() sees to it that `control` differs from 3: dup2 onto itself would keep close-on-exec.
         ::posix_spawn_file_actions_adddup2(&actions, control, kAgentControlFd);
         sigset_t none;
         sigset_t all;
@@ -76,7 +76,8 @@ pid_t spawnAgent(const std::string& module, const AgentProcess::Options& options
                            options.strictOwners ? "strict" : "any"};
     char* argv[] = {words[0].data(), words[1].data(), words[2].data(), words[3].data(), words[4].data(), nullptr};
     pid_t pid = -1;
-    // Run through this link the process is never called cimserver, not even before it names itself.
+    // A process that runs through this link is called "exe" until it names itself; programs that look for cimserver
+    // pass it over.
     const int error = ::posix_spawn(&pid, "/proc/self/exe", &plan.actions, &plan.attributes, argv, environ);
     if (error != 0) {
         throw std::system_error(error, std::generic_category(), "cannot start the agent of module \"" + module + "\"");
@@ -134,7 +135,7 @@ AgentProcess::~AgentProcess()
 
 void AgentProcess::watch()
 {
-    // The pid stays ours until fEnded is set under the lock: kill() never hits a stranger.
+    // The process id stays ours until fEnded is set under the lock, so that kill() hits this process only.
     siginfo_t info = {};
     while (::waitid(P_PID, static_cast<id_t>(fPid), &info, WEXITED | WNOWAIT) != 0 && errno == EINTR) {
     }

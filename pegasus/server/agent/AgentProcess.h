@@ -23,7 +23,7 @@ class AgentProcess
   public:
     struct Options
     {
-        std::size_t memoryMegabytes = 0; // bounds its address space; 0 does not
+        std::size_t memoryMegabytes = 0; // bound of its address space; 0: any
         bool strictOwners = true;        // whether a library that other users can change is refused
     };
 

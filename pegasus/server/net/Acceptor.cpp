@@ -27,7 +27,7 @@ void RefusedConnections::refuse(base::Descriptor connection)
         return;
     }
     ::shutdown(connection.get(), SHUT_WR);
-    if (fWaiting.size() == kMaxCount) {
+    if (fWaiting.size() == kMaxWaiting) {
         fWaiting.pop_front();
     }
     fWaiting.push_back({std::move(connection), base::Deadline::after(kMoment)});
@@ -96,7 +96,7 @@ bool Acceptor::accept(Source& source)
     return true;
 }
 
-// Returns: whether it is time to stop, after at most kRetryMs. Needs no memory.
+// Returns: whether it is time to stop, after at most kRetryMs. It allocates nothing.
 bool Acceptor::waitForStop() const
 {
     pollfd wait = {fStop, POLLIN, 0};

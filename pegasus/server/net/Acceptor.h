@@ -17,7 +17,7 @@ namespace Pegasus::server {
 class RefusedConnections
 {
   public:
-    static constexpr std::size_t kMaxCount = 64; // the oldest is closed before its moment is over
+    static constexpr std::size_t kMaxWaiting = 64; // the oldest is closed before its moment is over
     static constexpr std::chrono::seconds kMoment{1};
 
     void refuse(base::Descriptor connection);
@@ -34,8 +34,8 @@ class RefusedConnections
     std::deque<Waiting> fWaiting;
 };
 
-// Log lines about connections of other users: one at once, then at most one a second, with a count of the others. A
-// user who floods the server must not push everything else out of the log.
+// Log lines about connections of other users: the first at once, then at most one a second with a count of the others,
+// so that a flood leaves the rest of the log in place.
 class RefusalLog
 {
   public:

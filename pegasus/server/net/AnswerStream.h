@@ -60,7 +60,7 @@ class AnswerStream
     bool isChunked() const { return fOptions.framing == Framing::kChunkedWithTrailer; }
     // Whether bytes have been sent already.
     bool hasStarted() const { return fStarted; }
-    // Takes back what has been written and not been sent.
+    // Takes back what has been written since the last bytes were sent.
     void discard() { fPending.clear(); }
 
   private:

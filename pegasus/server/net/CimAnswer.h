@@ -48,8 +48,8 @@ class CimAnswer : public ElementSink
         kAfterElements, // in the trailer; what was written stays
         kBody           // an ERROR element in the message, also when the client reads trailers
     };
-    // Ends the answer with an error. For a client that does not read trailers it is an ERROR element, in place of what
-    // was written.
+    // Ends the answer with an error. For a client that lacks trailers it is an ERROR element, in place of what was
+    // written.
     void fail(const CimStatus& status, ErrorPlace place = ErrorPlace::kTrailer);
 
   private:

@@ -34,7 +34,7 @@ class IntrinsicParameters
     CIMQualifierDecl qualifierDeclaration(std::string_view parameter) const;
 
   private:
-    // An absent parameter and one without content are the same.
+    // Returns: the parameter's value; null for an absent parameter as for an empty one.
     wire::XmlElement find(std::string_view parameter) const;
     wire::XmlElement require(std::string_view parameter, const char* element) const;
 

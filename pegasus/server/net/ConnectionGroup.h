@@ -29,7 +29,7 @@ class ConnectionGroup
     // Ownership: `socket` passes to the group only when the connection is served.
     bool serve(base::Descriptor& socket, std::size_t most);
 
-    // Ends reading on every connection: running requests are answered, no further ones are read.
+    // Ends reading on every connection. Running requests are still answered.
     void endReading();
     // Breaks every connection.
     void breakAll();

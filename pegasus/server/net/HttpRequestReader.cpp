@@ -95,8 +95,8 @@ std::size_t HttpRequestParser::putHead(std::string_view bytes)
     return taken;
 }
 
-// The parser takes a chunk's size line, and the last one with the trailer, only as a whole. It is offered no more than
-// the limit at once: what does not fit in is refused, however the bytes arrive, and is never kept.
+// The parser takes a chunk's size line, and the last one with the trailer, only as a whole. It is offered at most as
+// many bytes as the limit at once; a line that does not fit in is refused, the same however its bytes arrive.
 std::size_t HttpRequestParser::putBody(std::string_view bytes)
 {
     std::size_t taken = 0;

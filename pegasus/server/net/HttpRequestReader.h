@@ -9,7 +9,7 @@
 
 namespace Pegasus::server {
 
-// How long a client may take; 0 is no bound.
+// How long a client may take; 0 means any time.
 struct ReadTimes
 {
     std::chrono::milliseconds idle = std::chrono::milliseconds::zero(); // before the first byte
@@ -65,7 +65,7 @@ class HttpRequestReader
 
     SocketStream& fStream;
     std::vector<char> fBuffer;
-    std::size_t fBegin = 0; // what lies between the two has been read and not been parsed
+    std::size_t fBegin = 0; // between the two: read, and still to be parsed
     std::size_t fEnd = 0;
 };
 

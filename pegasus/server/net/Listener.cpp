@@ -60,7 +60,7 @@ base::Descriptor acceptConnection(const base::Descriptor& listener, bool& exhaus
     exhausted = !connection && (errno == EMFILE || errno == ENFILE || errno == ENOBUFS || errno == ENOMEM);
     if (connection) {
         const int yes = 1;
-        ::setsockopt(connection.get(), IPPROTO_TCP, TCP_NODELAY, &yes, sizeof yes); // fails on a local one: no matter
+        ::setsockopt(connection.get(), IPPROTO_TCP, TCP_NODELAY, &yes, sizeof yes);
     }
     return connection;
 }

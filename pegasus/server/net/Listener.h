@@ -7,7 +7,7 @@
 
 namespace Pegasus::server {
 
-// Returns: a non-blocking socket that listens on 127.0.0.1 and nowhere else.
+// Returns: a non-blocking socket that listens on 127.0.0.1 only.
 // Throws: std::runtime_error "Bind failed: Failed to bind socket on port N: <reason> (error code E)."
 base::Descriptor listenOnLoopback(std::uint16_t port);
 
@@ -15,7 +15,8 @@ base::Descriptor listenOnLoopback(std::uint16_t port);
 base::Descriptor listenLocally(const std::string& home);
 
 // Returns: the next connection; an empty descriptor when none waits, or it broke already. Sets `exhausted` when the
-// process has no descriptors left for it.
+// process or the system is out of descriptors or memory for it.
+// Thread: one at a time a listener.
 base::Descriptor acceptConnection(const base::Descriptor& listener, bool& exhausted);
 
 } // namespace Pegasus::server

@@ -43,7 +43,7 @@ bool isLive(unsigned state, unsigned long inode)
     return inode != 0 && (state == TCP_ESTABLISHED || state == TCP_CLOSE_WAIT);
 }
 
-// Whether the accepted connection still is what its address pair was taken from.
+// Returns: whether the accepted connection still is the one that its address pair was taken from.
 bool isStillOpen(int fd)
 {
     tcp_info info = {};
@@ -139,7 +139,7 @@ std::size_t receiveAnswer(const base::Descriptor& netlink, std::uint32_t sequenc
     }
 }
 
-// Whether the kernel has no such facility. ENOENT says that it has, and that there is no such socket.
+// Returns: whether the kernel lacks the facility. ENOENT comes from the facility itself: the socket does not exist.
 bool isUnsupported(const char* answer, std::size_t size)
 {
     nlmsghdr header = {};

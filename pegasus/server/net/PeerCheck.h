@@ -48,7 +48,7 @@ class TcpPeerLookup
 // Returns: the user at the other end of a Unix socket, as of its connect().
 std::optional<uid_t> localPeerUser(int fd);
 
-// The server's own user and root are served, nobody else.
+// Returns: whether a peer is served: only the server's own user and root are.
 bool mayConnect(std::optional<uid_t> peer);
 
 } // namespace Pegasus::server

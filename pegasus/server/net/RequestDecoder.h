@@ -5,8 +5,8 @@
 
 namespace Pegasus::server {
 
-// HTTP requests to CIM operations: the CIM headers (DSP0200, 6), the message around the call (DSP0201), and that both
-// say the same. One decoder serves a connection.
+// Decodes HTTP requests to CIM operations: checks the CIM headers (DSP0200, 6) and the message around the call
+// (DSP0201), and that both name the same method and object. One decoder serves a connection.
 //
 // Thread: one at a time.
 class RequestDecoder

@@ -52,7 +52,7 @@ void logEnd() noexcept
 try {
     try {
         throw;
-    } catch (const std::system_error& error) { // the peer has gone: nobody is left to answer
+    } catch (const std::system_error& error) { // the peer has gone
         Log::write(LogLevel::kDebug, std::string("connection ended: ") + error.what());
     } catch (const SocketTimeout& error) {
         Log::write(LogLevel::kWarning, std::string("connection closed: ") + error.what());
@@ -63,7 +63,7 @@ try {
     } catch (...) {
         Log::write(LogLevel::kError, "connection closed: an unknown exception");
     }
-} catch (...) { // no memory left for the line
+} catch (...) { // out of memory: the line is lost
 }
 
 class RequestLoop

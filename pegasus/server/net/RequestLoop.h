@@ -35,7 +35,7 @@ class RequestHandler
 };
 
 // Serves the requests of one connection, one after the other, until the peer closes or breaks the protocol. This is the
-// boundary of a connection's thread: whatever is thrown below it is logged and ends the connection, never the process.
+// boundary of a connection's thread: whatever is thrown below it is logged and ends this connection alone.
 // Requires: stream and handler outlive the call.
 // Blocks: until the connection ends.
 void serveConnection(SocketStream& stream, RequestHandler& handler, const std::function<ConnectionSettings()>& settings,

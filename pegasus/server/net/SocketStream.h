@@ -11,7 +11,7 @@
 
 namespace Pegasus::server {
 
-// The peer did not send, or did not take, anything in time.
+// The peer stayed silent, or left our bytes unread, for too long.
 class SocketTimeout : public std::runtime_error
 {
   public:
@@ -32,7 +32,7 @@ class SocketStream
     std::size_t readSome(char* data, std::size_t size, const base::Deadline& deadline);
 
     // Sends everything. The vectors are changed.
-    // Blocks: for as long as the peer takes something at least every `timeout`; 0 waits without a bound.
+    // Blocks: for as long as the peer takes something at least every `timeout`; 0 allows any time.
     void writeAll(iovec* parts, std::size_t count, std::chrono::milliseconds timeout);
 
     // Ends both directions, so that a thread that waits on the socket returns.

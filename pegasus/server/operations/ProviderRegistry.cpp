@@ -23,7 +23,7 @@ CIMNamespaceName interop()
     return CIMNamespaceName(kInteropNamespace);
 }
 
-// Stored instances of a class; none while the class does not exist yet.
+// Returns: the stored instances of a class; empty while the class does not exist.
 std::vector<CIMInstance> storedInstances(const repository::Repository& repository, const char* className)
 {
     std::vector<CIMInstance> instances;
@@ -64,7 +64,7 @@ bool isStored(const repository::Repository& repository, const CIMObjectPath& pat
     throw CIMException(CIM_ERR_FAILED, String(text));
 }
 
-// A module counts as running: the server adds what no registration file gives.
+// A module counts as running: the server adds the status, which registration files leave out.
 void addOperationalStatus(CIMInstance& module)
 {
     if (module.findProperty(CIMName("OperationalStatus")) != PEG_NOT_FOUND) {

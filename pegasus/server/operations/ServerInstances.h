@@ -21,7 +21,7 @@ class ServerInstances
     static std::unique_ptr<ServerInstances> find(ServerCore& core, const CIMNamespaceName& nameSpace,
                                                  const CIMName& className);
 
-    // Returns: the instances, with their paths without host and namespace.
+    // Returns: the instances. Their paths have keys only.
     std::vector<CIMInstance> all(const CIMPropertyList& properties) const;
     // Throws: CIM_ERR_NOT_FOUND.
     CIMInstance get(const CIMObjectPath& path, const CIMPropertyList& properties) const;

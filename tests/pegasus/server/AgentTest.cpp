@@ -1,4 +1,4 @@
-// Vendor code behind the server: what it delivers, and what becomes of everybody else when it fails.
+// Vendor code under the server: what it delivers, and what becomes of everything else when it fails.
 #include "tests/pegasus/server/HttpExchange.h"
 #include "tests/pegasus/server/ServerTree.h"
 

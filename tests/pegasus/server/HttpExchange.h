@@ -33,7 +33,7 @@ class RawConnection
     // Returns: false when the server does not take any more.
     bool send(const std::string& bytes);
     void endSending();
-    // Reads one answer; bytes behind it are kept for the next. Ends at the time limit with what there is.
+    // Reads one answer; bytes after it are kept for the next. Ends at the time limit with what there is.
     HttpAnswer receive(std::chrono::milliseconds limit = std::chrono::seconds(10));
     // Whether the server has closed, seen within the limit.
     bool isClosed(std::chrono::milliseconds limit = std::chrono::seconds(5));

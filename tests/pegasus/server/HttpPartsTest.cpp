@@ -62,7 +62,7 @@ TEST(HttpRequestParserTest, aCutRequestIsNeverDone)
     }
 }
 
-// What a peer sends behind the head, however slowly, is bounded while it is kept.
+// What a peer sends after the head, however slowly, is bounded while it is kept.
 TEST(HttpRequestParserTest, unparsedBytesAreBounded)
 {
     const HttpLimits limits = {200, 10'000};

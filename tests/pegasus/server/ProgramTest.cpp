@@ -16,6 +16,7 @@
 #include <signal.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
 namespace servertest {
@@ -224,7 +225,7 @@ TEST(ProgramTest, startsWhateverLiesAtTheStartFilesPath)
     }
 }
 
-// A host that was killed leaves its server behind; the next host deletes the repository and starts a server.
+// A host that was killed leaves its server running; the next host deletes the repository and starts a server.
 TEST(ProgramTest, takesThePlaceOfAServerWhoseRepositoryIsGone)
 {
     for (const bool stopped : {false, true}) {
@@ -378,6 +379,31 @@ TEST(ProgramTest, theServerKeepsNoneOfItsCallersDescriptors)
     for (const char* fd : {"0", "1", "2"}) {
         EXPECT_EQ(fs::read_symlink(fds + fd), "/dev/null");
     }
+}
+
+// The pipe to the launcher must not be taken for standard output.
+TEST(ProgramTest, startsForACallerWithoutStandardDescriptors)
+{
+    ServerTree tree;
+    const pid_t pid = ::fork();
+    if (pid == 0) {
+        for (const int fd : {0, 1, 2}) {
+            ::close(fd);
+        }
+        ::setenv("PEGASUS_HOME", tree.home().c_str(), 1);
+        const std::string port = "httpPort=" + std::to_string(tree.port());
+        ::execl(programPath("cimserver").c_str(), "cimserver", port.c_str(), nullptr);
+        ::_exit(127);
+    }
+    int status = -1;
+    EXPECT_TRUE(eventually([&] { return ::waitpid(pid, &status, WNOHANG) == pid; }));
+    EXPECT_EQ(status, 0);
+    if (status == -1) {
+        ::kill(pid, SIGKILL);
+        ::waitpid(pid, nullptr, 0);
+        return;
+    }
+    EXPECT_EQ(exchange(tree.port(), intrinsicRequest("EnumerateClassNames", "root", "")).status, 200);
 }
 
 TEST(ProgramTest, listensOnLoopbackOnly)

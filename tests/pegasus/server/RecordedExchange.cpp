@@ -142,8 +142,8 @@ std::vector<std::string> elementsOf(const std::string& body, const std::string& 
     std::vector<std::string> found;
     const std::string close = "</" + element + ">\n";
     for (std::size_t at = 0; (at = body.find("<" + element, at)) != std::string::npos;) {
-        const char behind = body[at + element.size() + 1];
-        if (behind != ' ' && behind != '>') {
+        const char next = body[at + element.size() + 1];
+        if (next != ' ' && next != '>') {
             ++at;
             continue;
         }

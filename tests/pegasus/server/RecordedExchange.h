@@ -17,10 +17,10 @@ struct RecordedExchange
     HttpAnswer answer;
 };
 
-// The recordings' folder, with a slash behind it; empty when the build knows of none.
+// The recordings' folder, with a slash at the end; empty when the build knows of none.
 std::string recordingsFolder();
 
-// The elements of one name in a body, each as text with the line feed behind it. They do not nest.
+// The elements of one name in a body, each as text with the line feed after it. They do not nest.
 std::vector<std::string> elementsOf(const std::string& body, const std::string& element);
 
 enum class Order

@@ -39,7 +39,7 @@ const BetterRow kBetter[] = {
     {"enuminst-shallow-base", "cimstatuscodedescription: CIM_ERR_FAILED: File \"libNoSuchLibrary.so\"", Body::kSame,
      "likewise"},
     {"enuminst-fail99", "cimstatuscode: 1\n", Body::kSame,
-     "a number that is no CIM status arrives as one that clients know"},
+     "a number outside the CIM status codes arrives as one that clients know"},
     {"invoke-fail30", "cimstatuscode: 1\n", Body::kSame, "likewise"},
     {"invoke-twice", "VALUE: again", Body::kOther, "CMPI keeps one argument of a name, the last"},
     {"invoke-embedded", "EmbeddedObject=instance EMBEDDEDOBJECT=instance NAME=oobj", Body::kOther,

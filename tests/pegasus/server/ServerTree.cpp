@@ -47,11 +47,6 @@ std::uint16_t freePort()
     return ntohs(address.sin_port);
 }
 
-std::string programPath(const std::string& name)
-{
-    return std::string(PROGRAM_DIRECTORY) + "/" + name;
-}
-
 std::string readFile(const std::string& path)
 {
     std::ifstream file(path);
@@ -74,6 +69,11 @@ int waitFor(pid_t pid)
 }
 
 } // namespace
+
+std::string programPath(const std::string& name)
+{
+    return std::string(PROGRAM_DIRECTORY) + "/" + name;
+}
 
 bool waitUntil(bool (*condition)(const void*), const void* argument)
 {

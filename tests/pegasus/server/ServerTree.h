@@ -52,6 +52,9 @@ class ServerTree
     std::uint16_t fPort;
 };
 
+// Returns: the path of one of the build's programs.
+std::string programPath(const std::string& name);
+
 // Waits until `condition` holds. Returns: false after 10 s.
 template <typename Condition> bool eventually(const Condition& condition);
 

@@ -1,8 +1,10 @@
 // What the server keeps and checks: configuration, files, registrations.
 #include "pegasus/server/admin/Config.h"
+#include "pegasus/server/admin/Log.h"
 #include "pegasus/server/admin/PrivateFile.h"
 #include "pegasus/server/admin/StartFile.h"
 #include "pegasus/server/admin/TreeClaim.h"
+#include "pegasus/server/net/Acceptor.h"
 #include "pegasus/server/operations/ProviderRegistry.h"
 #include "pegasus/server/operations/RegistrationChecks.h"
 
@@ -10,6 +12,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <filesystem>
 #include <fstream>
 
@@ -152,6 +155,29 @@ TEST_F(StateTest, aStartFileIsRemovedOnlyByTheServerThatItNames)
     }
     StartFile::remove(path, 1234);
     EXPECT_FALSE(fs::exists(path));
+}
+
+TEST_F(StateTest, aFloodOfRefusalsIsOneLineWithACount)
+{
+    Log::open(fHome, false);
+    RefusalLog refusals;
+    const auto begin = std::chrono::steady_clock::now();
+    for (int i = 0; i < 1000; ++i) {
+        refusals.note(4711);
+    }
+    const auto seconds = std::chrono::steady_clock::now() - begin;
+    const std::string log = readOwnFile(fHome + "/cimserver.log", 1u << 20);
+    EXPECT_NE(log.find("Refused a connection of user 4711.\n"), std::string::npos);
+    EXPECT_LE(std::count(log.begin(), log.end(), '\n'), 1 + std::chrono::ceil<std::chrono::seconds>(seconds).count());
+}
+
+// What a vendor writes must neither forge a line nor reach a terminal.
+TEST_F(StateTest, controlBytesAreEscapedInTheLog)
+{
+    Log::open(fHome, false);
+    Log::write(LogLevel::kError, "a\nb\x1b[2J\x7f \xc3\xa9");
+    const std::string log = readOwnFile(fHome + "/cimserver.log", 1000);
+    EXPECT_NE(log.find("error: a\\nb\\x1b[2J\\x7f \xc3\xa9\n"), std::string::npos) << log;
 }
 
 TEST_F(StateTest, oneLockATree)
