@@ -13,7 +13,7 @@ std::string read(std::string_view bytes, std::size_t cut)
 {
     wire::HttpAnswerLimits limits;
     limits.maxHeaderBytes = 4096;
-    limits.maxFramingBytes = 4096;
+    limits.maxFramingBytes = 200;
     limits.maxBodyBytes = 64UL * 1024;
     std::string body;
     wire::HttpAnswerReader response(

@@ -85,7 +85,7 @@ class HttpAnswerReader::Parser : public http::basic_parser<false>
 {
   public:
     Parser(const HttpAnswerLimits& limits, HeaderHandler onHeader, BodyHandler onBody)
-        : fMaxFramingBytes(limits.maxFramingBytes), fOnHeader(std::move(onHeader)), fOnBody(std::move(onBody))
+        : fOnHeader(std::move(onHeader)), fOnBody(std::move(onBody))
     {
         eager(true);
         header_limit(limits.maxHeaderBytes);
@@ -105,7 +105,6 @@ class HttpAnswerReader::Parser : public http::basic_parser<false>
 
     void on_field_impl(http::field, BeastView name, BeastView value, error_code&) override
     {
-        countTrailer(name.size() + value.size());
         if (isNamed(name, "CIMOperation")) {
             fFields.cimOperation = toStd(value);
         } else if (isNamed(name, "Content-Type")) {
@@ -121,12 +120,7 @@ class HttpAnswerReader::Parser : public http::basic_parser<false>
         }
     }
 
-    void on_header_impl(error_code&) override
-    {
-        fHasHeader = true;
-        fOnHeader(fFields);
-    }
-
+    void on_header_impl(error_code&) override { fOnHeader(fFields); }
     void on_body_init_impl(const boost::optional<std::uint64_t>&, error_code&) override {}
 
     std::size_t on_body_impl(BeastView body, error_code&) override
@@ -135,12 +129,7 @@ class HttpAnswerReader::Parser : public http::basic_parser<false>
         return body.size();
     }
 
-    void on_chunk_header_impl(std::uint64_t, BeastView extensions, error_code&) override
-    {
-        if (extensions.size() > fMaxFramingBytes) {
-            throwTooLarge("chunk framing", fMaxFramingBytes);
-        }
-    }
+    void on_chunk_header_impl(std::uint64_t, BeastView, error_code&) override {}
 
     std::size_t on_chunk_body_impl(std::uint64_t, BeastView body, error_code&) override
     {
@@ -150,21 +139,9 @@ class HttpAnswerReader::Parser : public http::basic_parser<false>
 
     void on_finish_impl(error_code&) override {}
 
-    // How the bytes were split decides what the parser sees at once; the count does not depend on it.
-    void countTrailer(std::size_t fieldBytes)
-    {
-        fTrailerBytes += fHasHeader ? fieldBytes : 0;
-        if (fTrailerBytes > fMaxFramingBytes) {
-            throwTooLarge("a trailer", fMaxFramingBytes);
-        }
-    }
-
-    std::size_t fMaxFramingBytes;
     HeaderHandler fOnHeader;
     BodyHandler fOnBody;
     HttpAnswerFields fFields;
-    std::size_t fTrailerBytes = 0;
-    bool fHasHeader = false;
 };
 
 HttpAnswerReader::HttpAnswerReader(const HttpAnswerLimits& limits, HeaderHandler onHeader, BodyHandler onBody)
@@ -193,10 +170,6 @@ void HttpAnswerReader::feed(std::string_view bytes)
         fHasSurplus = fHasSurplus || !fPending.empty();
         fPending.clear();
     }
-    // Only the framing between pieces of a body waits for more.
-    if (fPending.size() > fLimits.maxFramingBytes) {
-        throwTooLarge("chunk framing", fLimits.maxFramingBytes);
-    }
 }
 
 // Takes bytes up to the end of the header.
@@ -216,18 +189,23 @@ void HttpAnswerReader::feedHeader(std::string_view& bytes)
     }
     const std::string header = withCrLf(std::string_view(fPending).substr(0, end));
     fPending.clear();
-    put(header);
-    if (!hasHeader()) {
+    if (putSome(header) != header.size() || !hasHeader()) {
         throwMalformed();
     }
 }
 
-// Returns: how many bytes were used; the rest must come again, with more after it.
+// Returns: how many bytes were used; the rest must come again, with more after it. Only framing waits for more: the
+// head of a chunk, or a trailer. The parser takes it as a whole, so what does not fit into the window is too large,
+// however the bytes were split.
 std::size_t HttpAnswerReader::put(std::string_view bytes)
 {
     std::size_t done = 0;
     while (done < bytes.size() && !isComplete()) {
-        const std::size_t used = putSome(bytes.substr(done));
+        const std::string_view window = bytes.substr(done, fLimits.maxFramingBytes);
+        const std::size_t used = putSome(window);
+        if (used == 0 && window.size() == fLimits.maxFramingBytes) {
+            throwTooLarge("chunk framing", fLimits.maxFramingBytes);
+        }
         if (used == 0) {
             break;
         }

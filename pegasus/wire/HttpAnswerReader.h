@@ -16,7 +16,7 @@ struct HttpAnswerLimits
 {
     // Bytes of the status line and the header fields.
     std::uint32_t maxHeaderBytes = 64 * 1024;
-    // Bytes of the extensions of one chunk; of the trailer fields; and of what cannot be parsed before more has come.
+    // Bytes of the head of one chunk with its extensions; and of the last chunk's head with the trailer fields.
     std::uint32_t maxFramingBytes = 64 * 1024;
     // Bytes of the body, without the framing of chunks.
     std::uint64_t maxBodyBytes = std::uint64_t(4) * 1024 * 1024 * 1024;
