@@ -6,9 +6,9 @@
 // both also as a ratio to a bare expat pass with empty handlers over the same bytes in the same run, and the growth of
 // the process's memory. Then what decoding during arrival saves, and GetClass calls on one connection. --quick leaves
 // out the biggest answer, --calls all but the calls.
-#include "pegasus/client/Connection.h"
 #include "pegasus/client/Request.h"
 #include "pegasus/client/ResponseReader.h"
+#include "pegasus/client/ServerConnection.h"
 #include "pegasus/wire/ElementEncoder.h"
 #include "pegasus/wire/HttpAnswerReader.h"
 #include "tests/support/PeerAnswers.h"
@@ -246,7 +246,7 @@ void benchInstances(unsigned count, const char* how, const TSending& sending = T
 }
 
 // What a client does that reads the whole answer before it decodes it.
-Array<CIMInstance> readThenDecode(client::Connection& connection, const std::string& request)
+Array<CIMInstance> readThenDecode(client::ServerConnection& connection, const std::string& request)
 {
     const auto deadline = base::Deadline::after(std::chrono::minutes(10));
     connection.send(request, deadline);
@@ -282,7 +282,7 @@ void benchOverlap()
     client::ServerAddress address;
     address.host = "127.0.0.1";
     address.port = peer.port();
-    client::Connection connection;
+    client::ServerConnection connection;
     connection.setAddress(address);
     connection.open(base::Deadline::after(std::chrono::seconds(10)));
     wire::IntrinsicCall call("EnumerateInstances", kNameSpace);

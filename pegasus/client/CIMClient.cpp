@@ -13,7 +13,7 @@ using wire::XmlElement;
 
 void failUnexpected(const XmlElement& element)
 {
-    element.fail(wire::XmlError::Kind::Invalid,
+    element.fail(wire::XmlError::Kind::kInvalid,
                  "Expected close of IRETURNVALUE element, got " + std::string(element.name()) + " instead");
 }
 

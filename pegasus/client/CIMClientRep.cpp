@@ -19,7 +19,7 @@ using base::Deadline;
 using client::ResponseReader;
 using wire::HttpAnswerFields;
 using wire::HttpAnswerReader;
-using Result = client::Connection::Result;
+using Result = client::ServerConnection::Result;
 
 constexpr std::size_t kReceiveBytes = 64UL * 1024;
 constexpr const char* kClosed = "Connection closed by CIM Server.";
@@ -164,7 +164,7 @@ void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHan
     for (;;) {
         ResponseReader reader(expected, fDecoder, onContent);
         HttpAnswerReader response(fLimits.http, checkHeader, [&](std::string_view body) { reader.feed(body); });
-        if (sendAndReceive(message, response, deadline) == Outcome::NothingReceived) {
+        if (sendAndReceive(message, response, deadline) == Outcome::kNothingReceived) {
             if (!mayRepeat) {
                 throw CIMClientMalformedHTTPException(kClosed);
             }
@@ -172,7 +172,7 @@ void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHan
             continue;
         }
         if (!response.isComplete()) {
-            throw wire::XmlError(wire::XmlError::Kind::Invalid, reader.place(),
+            throw wire::XmlError(wire::XmlError::Kind::kInvalid, reader.place(),
                                  "the connection was closed inside the answer");
         }
         if (!response.keepsAlive()) {
@@ -194,7 +194,7 @@ CIMClientRep::Outcome CIMClientRep::sendAndReceive(const std::string& message, H
         fConnection.open(deadline);
     }
     // A server that closes while it is sent to may have answered all the same.
-    if (fConnection.send(message, deadline) == Result::TimedOut) {
+    if (fConnection.send(message, deadline) == Result::kTimedOut) {
         throw ConnectionTimeoutException();
     }
     return receive(response, deadline);
@@ -207,13 +207,13 @@ CIMClientRep::Outcome CIMClientRep::receive(HttpAnswerReader& response, const De
     while (!response.isComplete()) {
         std::size_t received = 0;
         const Result result = fConnection.receive(fReceiveBuffer.data(), fReceiveBuffer.size(), deadline, received);
-        if (result == Result::TimedOut) {
+        if (result == Result::kTimedOut) {
             throw ConnectionTimeoutException();
         }
-        if (result == Result::Closed) {
+        if (result == Result::kClosed) {
             fConnection.close();
             if (isFirst) {
-                return Outcome::NothingReceived;
+                return Outcome::kNothingReceived;
             }
             if (!response.hasHeader()) {
                 throw CIMClientMalformedHTTPException("Missing CIMOperation HTTP header");
@@ -224,7 +224,7 @@ CIMClientRep::Outcome CIMClientRep::receive(HttpAnswerReader& response, const De
         isFirst = false;
         response.feed(std::string_view(fReceiveBuffer.data(), received));
     }
-    return Outcome::Answered;
+    return Outcome::kAnswered;
 }
 
 } // namespace Pegasus

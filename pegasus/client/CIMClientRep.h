@@ -1,8 +1,8 @@
 #pragma once
 
-#include "pegasus/client/Connection.h"
 #include "pegasus/client/Request.h"
 #include "pegasus/client/ResponseReader.h"
+#include "pegasus/client/ServerConnection.h"
 #include "pegasus/wire/HttpAnswerReader.h"
 #include "pegasus/wire/XmlLimits.h"
 
@@ -52,8 +52,8 @@ class CIMClientRep
   private:
     enum class Outcome
     {
-        Answered,
-        NothingReceived // the server closed the connection before it answered
+        kAnswered,
+        kNothingReceived // the server closed the connection before it answered
     };
 
     void exchangeOnce(const client::Request& request, const ContentHandler& onContent);
@@ -64,7 +64,7 @@ class CIMClientRep
     client::ClientLimits fLimits;
     wire::ElementDecoder fDecoder{fLimits.xml}; // kept, so that the names of all answers share their texts
     std::optional<client::ServerAddress> fAddress;
-    client::Connection fConnection;
+    client::ServerConnection fConnection;
     std::vector<char> fReceiveBuffer;
     Uint32 fTimeoutMs = 20000;
 };

@@ -11,6 +11,7 @@
 namespace Pegasus::client {
 namespace {
 
+using wire::XmlAttribute;
 using wire::XmlElement;
 using Kind = wire::XmlError::Kind;
 
@@ -40,13 +41,13 @@ constexpr std::string_view kIntrinsicMethods[] = {
     throw CIMClientResponseException(base::fromUtf8(text));
 }
 
-void expectVersion(const XmlElement& tag, std::string_view attribute, std::string_view value)
+void expectVersion(const XmlElement& tag, std::string_view attribute, const XmlAttribute& value)
 {
-    if (value.data() == nullptr) {
-        tag.fail(Kind::Invalid, "missing CIM." + std::string(attribute) + " attribute");
+    if (!value) {
+        tag.fail(Kind::kInvalid, "missing CIM." + std::string(attribute) + " attribute");
     }
-    if (value.substr(0, 2) != "2.") {
-        tag.fail(Kind::Invalid, "CIM." + std::string(attribute) + " is not 2.x");
+    if (value->substr(0, 2) != "2.") {
+        tag.fail(Kind::kInvalid, "CIM." + std::string(attribute) + " is not 2.x");
     }
 }
 
@@ -56,12 +57,12 @@ bool isProtocolOne(std::string_view version)
            version.find_first_not_of("0123456789", 2) == std::string_view::npos;
 }
 
-std::string_view required(const XmlElement& tag, std::string_view attribute, std::string_view value)
+std::string_view required(const XmlElement& tag, std::string_view attribute, const XmlAttribute& value)
 {
-    if (value.data() == nullptr) {
-        tag.fail(Kind::Invalid, "missing " + std::string(tag.name()) + "." + std::string(attribute) + " attribute");
+    if (!value) {
+        tag.fail(Kind::kInvalid, "missing " + std::string(tag.name()) + "." + std::string(attribute) + " attribute");
     }
-    return value;
+    return *value;
 }
 
 } // namespace
@@ -79,12 +80,12 @@ void ResponseReader::openEnvelope(const XmlElement& tag)
     const bool isAtLevel = fDepth < std::size(kLevels) &&
                            (tag.is(kLevels[fDepth]) || (fDepth == kResponseLevel && tag.is(kExtrinsicResponse)));
     if (!isAtLevel) {
-        tag.fail(Kind::Invalid, "Expected open of " +
-                                    std::string(fDepth < std::size(kLevels) ? kLevels[fDepth] : "content") +
-                                    " element, got " + std::string(tag.name()));
+        tag.fail(Kind::kInvalid, "Expected open of " +
+                                     std::string(fDepth < std::size(kLevels) ? kLevels[fDepth] : "content") +
+                                     " element, got " + std::string(tag.name()));
     }
     if (tag.is("CIM")) {
-        std::string_view values[2];
+        XmlAttribute values[2];
         tag.attributes({"CIMVERSION", "DTDVERSION"}, values);
         expectVersion(tag, "CIMVERSION", values[0]);
         expectVersion(tag, "DTDVERSION", values[1]);
@@ -96,7 +97,7 @@ void ResponseReader::openEnvelope(const XmlElement& tag)
         tag.expectNoAttributes();
         if (tag.is("IRETURNVALUE")) {
             if (!fExpected.isIntrinsic || fHasReturnValue || fError) {
-                tag.fail(Kind::Invalid, "unexpected IRETURNVALUE element");
+                tag.fail(Kind::kInvalid, "unexpected IRETURNVALUE element");
             }
             fHasReturnValue = true;
         }
@@ -106,7 +107,7 @@ void ResponseReader::openEnvelope(const XmlElement& tag)
 
 void ResponseReader::openMessage(const XmlElement& tag)
 {
-    std::string_view values[2];
+    XmlAttribute values[2];
     tag.attributes({"ID", "PROTOCOLVERSION"}, values);
     const std::string id(required(tag, "ID", values[0]));
     const std::string version(required(tag, "PROTOCOLVERSION", values[1]));
@@ -121,17 +122,17 @@ void ResponseReader::openMessage(const XmlElement& tag)
 void ResponseReader::openMethodResponse(const XmlElement& tag)
 {
     if (fHasResponse) {
-        tag.fail(Kind::Invalid, "a second response in the message");
+        tag.fail(Kind::kInvalid, "a second response in the message");
     }
     fHasResponse = true;
-    std::string_view values[1];
+    XmlAttribute values[1];
     tag.attributes({"NAME"}, values);
     const std::string name(required(tag, "NAME", values[0]));
     const bool isIntrinsic = !tag.is(kExtrinsicResponse);
     const bool isKnown =
         std::find(std::begin(kIntrinsicMethods), std::end(kIntrinsicMethods), name) != std::end(kIntrinsicMethods);
     if (isIntrinsic && !isKnown) {
-        tag.fail(Kind::Invalid, "Unrecognized IMethodResponse name \"" + name + "\"");
+        tag.fail(Kind::kInvalid, "Unrecognized IMethodResponse name \"" + name + "\"");
     }
     if (isIntrinsic != fExpected.isIntrinsic || !base::equalNoCase(name, fExpected.method)) {
         throwResponse("Mismatched response:  Got an answer to \"" + name + "\", expected one to \"" + fExpected.method +
@@ -152,9 +153,9 @@ void ResponseReader::slice(const XmlElement& element)
     }
     if (!isContent || fError) {
         if (fDepth < std::size(kLevels) && fDepth != kResponseLevel + 1) {
-            element.fail(Kind::Invalid, "Expected open of " + std::string(kLevels[fDepth]) + " element");
+            element.fail(Kind::kInvalid, "Expected open of " + std::string(kLevels[fDepth]) + " element");
         }
-        element.fail(Kind::Invalid, "unexpected " + std::string(element.name()) + " element");
+        element.fail(Kind::kInvalid, "unexpected " + std::string(element.name()) + " element");
     }
     fHasContent = true;
     fOnContent(element, fDecoder);
@@ -162,15 +163,14 @@ void ResponseReader::slice(const XmlElement& element)
 
 void ResponseReader::readError(const XmlElement& element)
 {
-    std::string_view values[2];
+    XmlAttribute values[2];
     element.attributes({"CODE", "DESCRIPTION"}, values);
     const auto code = base::parseUnsigned(required(element, "CODE", values[0]));
     if (!code || *code > 0xFFFF) {
-        element.fail(Kind::Invalid, "missing ERROR.CODE attribute");
+        element.fail(Kind::kInvalid, "missing ERROR.CODE attribute");
     }
     std::string scratch;
-    const String description =
-        values[1].data() == nullptr ? String() : fDecoder.toString(element, element.resolved(values[1], scratch));
+    const String description = values[1] ? fDecoder.toString(element, element.resolved(*values[1], scratch)) : String();
     Array<CIMInstance> instances;
     for (XmlElement child = element.firstChild(); child; child = child.nextSibling()) {
         instances.append(fDecoder.decodeInstance(child));
@@ -182,10 +182,10 @@ void ResponseReader::finish()
 {
     fSlicer.finish();
     if (!fHasResponse) {
-        throw wire::XmlError(Kind::Invalid, fSlicer.place(), "expected IMETHODRESPONSE or METHODRESPONSE element");
+        throw wire::XmlError(Kind::kInvalid, fSlicer.place(), "expected IMETHODRESPONSE or METHODRESPONSE element");
     }
     if (!fExpected.result.empty() && !fHasContent && !fError) {
-        throw wire::XmlError(Kind::Invalid, fSlicer.place(),
+        throw wire::XmlError(Kind::kInvalid, fSlicer.place(),
                              "expected ERROR or IRETURNVALUE element with " + std::string(fExpected.result));
     }
 }

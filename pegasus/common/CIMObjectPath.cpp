@@ -65,11 +65,11 @@ Array<CIMKeyBinding> sorted(const Array<CIMKeyBinding>& keys)
 CIMKeyBinding::Type typeOf(path::KeyKind kind)
 {
     switch (kind) {
-    case path::KeyKind::Boolean:
+    case path::KeyKind::kBoolean:
         return CIMKeyBinding::BOOLEAN;
-    case path::KeyKind::Numeric:
+    case path::KeyKind::kNumeric:
         return CIMKeyBinding::NUMERIC;
-    case path::KeyKind::Reference:
+    case path::KeyKind::kReference:
         return CIMKeyBinding::REFERENCE;
     default:
         return CIMKeyBinding::STRING;

@@ -174,7 +174,7 @@ Reason PathParser::readKey()
     Reason reason;
     if (!fText.empty() && fText.front() == '"') {
         reason = readQuoted(key.value);
-        key.kind = reason.empty() && isPathWithKeys(key.value) ? KeyKind::Reference : KeyKind::String;
+        key.kind = reason.empty() && isPathWithKeys(key.value) ? KeyKind::kReference : KeyKind::kString;
     } else {
         reason = readPlain(key);
     }
@@ -209,11 +209,11 @@ Reason PathParser::readPlain(Key& key)
     for (const char* word : {"TRUE", "FALSE"}) {
         if (String::equalNoCase(value, word)) {
             key.value = word;
-            key.kind = KeyKind::Boolean;
+            key.kind = KeyKind::kBoolean;
             return Reason();
         }
     }
-    key.kind = KeyKind::Numeric;
+    key.kind = KeyKind::kNumeric;
     if (!key.value.empty() && key.value.front() == '-') {
         return base::parseSigned(key.value) ? Reason() : "invalid negative number value " + key.value;
     }

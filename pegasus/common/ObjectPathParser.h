@@ -8,17 +8,17 @@ namespace Pegasus::path {
 
 enum class KeyKind
 {
-    Boolean,
-    String,
-    Numeric,
-    Reference
+    kBoolean,
+    kString,
+    kNumeric,
+    kReference
 };
 
 struct Key
 {
     std::string name;
     std::string value;
-    KeyKind kind = KeyKind::String;
+    KeyKind kind = KeyKind::kString;
 };
 
 // The parts of an object path's text, in UTF-8.

@@ -39,8 +39,8 @@ bool isOneOf(const XmlElement& element, std::initializer_list<std::string_view> 
 
 [[noreturn]] void failUnexpected(const XmlElement& parent, const XmlElement& child)
 {
-    child.fail(Kind::Invalid, "Expected close of " + std::string(parent.name()) + " element, got " +
-                                  std::string(child.name()) + " instead");
+    child.fail(Kind::kInvalid, "Expected close of " + std::string(parent.name()) + " element, got " +
+                                   std::string(child.name()) + " instead");
 }
 
 void expectEnd(const XmlElement& parent, const XmlElement& child)
@@ -52,21 +52,22 @@ void expectEnd(const XmlElement& parent, const XmlElement& child)
 
 [[noreturn]] void failIllegal(const XmlElement& element, std::string_view attribute)
 {
-    element.fail(Kind::Semantic,
+    element.fail(Kind::kSemantic,
                  "Illegal value for " + std::string(element.name()) + "." + std::string(attribute) + " attribute");
 }
 
 [[noreturn]] void failMissing(const XmlElement& element, std::string_view attribute)
 {
-    element.fail(Kind::Invalid, "missing " + std::string(element.name()) + "." + std::string(attribute) + " attribute");
+    element.fail(Kind::kInvalid,
+                 "missing " + std::string(element.name()) + "." + std::string(attribute) + " attribute");
 }
 
 // Adds an element's object, whose name must be new.
 template <class Item> void addNew(const XmlElement& element, Array<Item>& items, const Item& item)
 {
     if (ObjectAccess::find(items, item.getName()) != PEG_NOT_FOUND) {
-        element.fail(Kind::Semantic, "a second " + std::string(element.name()) + " named \"" +
-                                         base::utf8(item.getName().getString()) + "\"");
+        element.fail(Kind::kSemantic, "a second " + std::string(element.name()) + " named \"" +
+                                          base::utf8(item.getName().getString()) + "\"");
     }
     items.append(item);
 }
@@ -98,13 +99,13 @@ Uint32 countFrom(XmlElement child)
 // ---- attributes
 
 const CIMName& ElementDecoder::nameAttribute(const XmlElement& element, std::string_view attribute,
-                                             std::string_view value)
+                                             const XmlAttribute& value)
 {
-    if (value.data() == nullptr) {
+    if (!value) {
         failMissing(element, attribute);
     }
     try {
-        return fNames.name(element.resolved(value, fScratch));
+        return fNames.name(element.resolved(*value, fScratch));
     } catch (const XmlError&) {
         throw;
     } catch (const Exception&) {
@@ -112,48 +113,48 @@ const CIMName& ElementDecoder::nameAttribute(const XmlElement& element, std::str
     }
 }
 
-CIMName ElementDecoder::optionalName(const XmlElement& element, std::string_view attribute, std::string_view value)
+CIMName ElementDecoder::optionalName(const XmlElement& element, std::string_view attribute, const XmlAttribute& value)
 {
-    return value.data() == nullptr ? CIMName() : nameAttribute(element, attribute, value);
+    return !value ? CIMName() : nameAttribute(element, attribute, value);
 }
 
-bool ElementDecoder::boolAttribute(const XmlElement& element, std::string_view attribute, std::string_view value,
+bool ElementDecoder::boolAttribute(const XmlElement& element, std::string_view attribute, const XmlAttribute& value,
                                    bool ifMissing)
 {
-    if (value.data() == nullptr) {
+    if (!value) {
         return ifMissing;
     }
-    if (base::equalNoCase(value, "true")) {
+    if (base::equalNoCase(*value, "true")) {
         return true;
     }
-    if (base::equalNoCase(value, "false")) {
+    if (base::equalNoCase(*value, "false")) {
         return false;
     }
     failIllegal(element, attribute);
 }
 
-CIMType ElementDecoder::typeAttribute(const XmlElement& element, std::string_view attribute, std::string_view value)
+CIMType ElementDecoder::typeAttribute(const XmlElement& element, std::string_view attribute, const XmlAttribute& value)
 {
-    if (value.data() == nullptr) {
+    if (!value) {
         failMissing(element, attribute);
     }
-    if (value == "string") {
+    if (*value == "string") {
         return CIMTYPE_STRING;
     }
     for (int type = CIMTYPE_BOOLEAN; type <= CIMTYPE_REFERENCE; ++type) {
-        if (value == cimTypeToString(CIMType(type))) {
+        if (*value == cimTypeToString(CIMType(type))) {
             return CIMType(type);
         }
     }
     failIllegal(element, attribute);
 }
 
-Uint32 ElementDecoder::sizeAttribute(const XmlElement& element, std::string_view value)
+Uint32 ElementDecoder::sizeAttribute(const XmlElement& element, const XmlAttribute& value)
 {
-    if (value.data() == nullptr) {
+    if (!value) {
         return 0;
     }
-    const auto size = base::parseUnsigned(value);
+    const auto size = base::parseUnsigned(*value);
     if (!size || *size > fLimits.maxArrayElements) {
         failIllegal(element, "ARRAYSIZE");
     }
@@ -161,7 +162,7 @@ Uint32 ElementDecoder::sizeAttribute(const XmlElement& element, std::string_view
 }
 
 // `values` begin with OVERRIDABLE, TOSUBCLASS, TOINSTANCE, TRANSLATABLE.
-CIMFlavor ElementDecoder::flavor(const XmlElement& element, const std::string_view* values)
+CIMFlavor ElementDecoder::flavor(const XmlElement& element, const XmlAttribute* values)
 {
     CIMFlavor flavor;
     flavor.addFlavor(boolAttribute(element, "OVERRIDABLE", values[0], true) ? CIMFlavor::OVERRIDABLE
@@ -182,7 +183,7 @@ String ElementDecoder::toString(const XmlElement& element, std::string_view utf8
     try {
         return base::fromUtf8(utf8);
     } catch (const Exception&) {
-        element.fail(Kind::NotWellFormed, "text that is not UTF-8 in " + std::string(element.name()) + " element");
+        element.fail(Kind::kNotWellFormed, "text that is not UTF-8 in " + std::string(element.name()) + " element");
     }
 }
 
@@ -190,7 +191,7 @@ String ElementDecoder::toString(const XmlElement& element, std::string_view utf8
 
 CIMQualifier ElementDecoder::decodeQualifier(const XmlElement& element)
 {
-    std::string_view values[std::size(kQualifierAttributes)];
+    XmlAttribute values[std::size(kQualifierAttributes)];
     element.attributes(kQualifierAttributes, values);
     const CIMName name = nameAttribute(element, "NAME", values[0]);
     const CIMType type = typeAttribute(element, "TYPE", values[1]);
@@ -219,7 +220,7 @@ CIMScope ElementDecoder::decodeScope(const XmlElement& element)
 {
     const CIMScope kinds[] = {CIMScope::CLASS,  CIMScope::ASSOCIATION, CIMScope::REFERENCE, CIMScope::PROPERTY,
                               CIMScope::METHOD, CIMScope::PARAMETER,   CIMScope::INDICATION};
-    std::string_view values[std::size(kScopeAttributes)];
+    XmlAttribute values[std::size(kScopeAttributes)];
     element.attributes(kScopeAttributes, values);
     element.expectNoChildren();
     CIMScope scope;
@@ -234,7 +235,7 @@ CIMScope ElementDecoder::decodeScope(const XmlElement& element)
 CIMQualifierDecl ElementDecoder::decodeQualifierDeclaration(const XmlElement& element)
 {
     element.expectName("QUALIFIER.DECLARATION");
-    std::string_view values[std::size(kDeclarationAttributes)];
+    XmlAttribute values[std::size(kDeclarationAttributes)];
     element.attributes(kDeclarationAttributes, values);
     const CIMName name = nameAttribute(element, "NAME", values[0]);
     const CIMType type = typeAttribute(element, "TYPE", values[1]);
@@ -270,7 +271,7 @@ CIMProperty ElementDecoder::decodeProperty(const XmlElement& element)
 }
 
 // `values` begin with NAME, CLASSORIGIN, PROPAGATED. Returns: the first child that is no qualifier.
-XmlElement ElementDecoder::beginProperty(const XmlElement& element, const std::string_view* values, CIMPropertyRep& rep)
+XmlElement ElementDecoder::beginProperty(const XmlElement& element, const XmlAttribute* values, CIMPropertyRep& rep)
 {
     rep.fName = nameAttribute(element, "NAME", values[0]);
     rep.fClassOrigin = optionalName(element, "CLASSORIGIN", values[1]);
@@ -280,7 +281,7 @@ XmlElement ElementDecoder::beginProperty(const XmlElement& element, const std::s
 
 void ElementDecoder::readTypedProperty(const XmlElement& element, bool isArray, CIMPropertyRep& rep)
 {
-    std::string_view values[std::size(kPropertyAttributes)];
+    XmlAttribute values[std::size(kPropertyAttributes)];
     element.attributes(kPropertyAttributes, values);
     const XmlElement child = beginProperty(element, values, rep);
     const CIMType declared = embeddedType(element, typeAttribute(element, "TYPE", values[3]), values[4], values[5]);
@@ -295,7 +296,7 @@ void ElementDecoder::readTypedProperty(const XmlElement& element, bool isArray, 
 
 void ElementDecoder::readReferenceProperty(const XmlElement& element, CIMPropertyRep& rep)
 {
-    std::string_view values[std::size(kReferenceAttributes)];
+    XmlAttribute values[std::size(kReferenceAttributes)];
     element.attributes(kReferenceAttributes, values);
     const XmlElement child = beginProperty(element, values, rep);
     rep.fReferenceClassName = optionalName(element, "REFERENCECLASS", values[3]);
@@ -318,7 +319,7 @@ XmlElement ElementDecoder::decodeProperties(XmlElement child, Array<CIMProperty>
 
 CIMParameter ElementDecoder::decodeParameter(const XmlElement& element)
 {
-    std::string_view values[std::size(kParameterAttributes)];
+    XmlAttribute values[std::size(kParameterAttributes)];
     element.attributes(kParameterAttributes, values);
     const bool isReference = isOneOf(element, {"PARAMETER.REFERENCE", "PARAMETER.REFARRAY"});
     CIMParameter parameter = ObjectAccess::wrap<CIMParameter>(new CIMParameterRep());
@@ -335,7 +336,7 @@ CIMParameter ElementDecoder::decodeParameter(const XmlElement& element)
 
 CIMMethod ElementDecoder::decodeMethod(const XmlElement& element)
 {
-    std::string_view values[std::size(kMethodAttributes)];
+    XmlAttribute values[std::size(kMethodAttributes)];
     element.attributes(kMethodAttributes, values);
     CIMMethod method = ObjectAccess::wrap<CIMMethod>(new CIMMethodRep());
     CIMMethodRep& rep = ObjectAccess::rep(method);
@@ -356,7 +357,7 @@ CIMMethod ElementDecoder::decodeMethod(const XmlElement& element)
 CIMClass ElementDecoder::decodeClass(const XmlElement& element)
 {
     element.expectName("CLASS");
-    std::string_view values[2];
+    XmlAttribute values[2];
     element.attributes({"NAME", "SUPERCLASS"}, values);
     const CIMName name = nameAttribute(element, "NAME", values[0]);
     CIMClass cimClass(name, optionalName(element, "SUPERCLASS", values[1]));
@@ -375,7 +376,7 @@ CIMClass ElementDecoder::decodeClass(const XmlElement& element)
 CIMInstance ElementDecoder::decodeInstance(const XmlElement& element)
 {
     element.expectName("INSTANCE");
-    std::string_view values[2];
+    XmlAttribute values[2];
     element.attributes({"CLASSNAME", "xml:lang"}, values);
     CIMInstance instance(nameAttribute(element, "CLASSNAME", values[0]));
     CIMInstanceRep& rep = ObjectAccess::rep(instance);
@@ -391,12 +392,12 @@ CIMInstance ElementDecoder::decodeNamedInstance(const XmlElement& element)
     element.expectNoAttributes();
     const XmlElement name = element.firstChild();
     if (!name) {
-        element.fail(Kind::Invalid, "expected INSTANCENAME element");
+        element.fail(Kind::kInvalid, "expected INSTANCENAME element");
     }
     const CIMObjectPath path = decodeInstanceName(name);
     const XmlElement child = name.nextSibling();
     if (!child) {
-        element.fail(Kind::Invalid, "expected INSTANCE element");
+        element.fail(Kind::kInvalid, "expected INSTANCE element");
     }
     CIMInstance instance = decodeInstance(child);
     expectEnd(element, child.nextSibling());

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "pegasus/wire/NameCache.h"
-#include "pegasus/wire/XmlReader.h"
+#include "pegasus/wire/XmlDocument.h"
 
 #include <Pegasus/Common/CIMClass.h>
 #include <Pegasus/Common/CIMObject.h>
@@ -52,7 +52,7 @@ class ElementDecoder
     CIMValue decodeValue(const XmlElement& element, CIMType type);
 
     // An attribute that holds a name. Throws: XmlError "Illegal value for PROPERTY.NAME attribute", or "missing ...".
-    const CIMName& nameAttribute(const XmlElement& element, std::string_view attribute, std::string_view value);
+    const CIMName& nameAttribute(const XmlElement& element, std::string_view attribute, const XmlAttribute& value);
     // UTF-8 to text, with its fault at the element.
     String toString(const XmlElement& element, std::string_view utf8);
 
@@ -61,7 +61,7 @@ class ElementDecoder
   private:
     // ElementDecoder.cpp
     CIMProperty decodeProperty(const XmlElement& element);
-    XmlElement beginProperty(const XmlElement& element, const std::string_view* values, CIMPropertyRep& rep);
+    XmlElement beginProperty(const XmlElement& element, const XmlAttribute* values, CIMPropertyRep& rep);
     void readTypedProperty(const XmlElement& element, bool isArray, CIMPropertyRep& rep);
     void readReferenceProperty(const XmlElement& element, CIMPropertyRep& rep);
     CIMQualifier decodeQualifier(const XmlElement& element);
@@ -70,18 +70,19 @@ class ElementDecoder
     CIMScope decodeScope(const XmlElement& element);
     XmlElement decodeQualifiers(XmlElement child, Array<CIMQualifier>& qualifiers);
     XmlElement decodeProperties(XmlElement child, Array<CIMProperty>& properties);
-    CIMName optionalName(const XmlElement& element, std::string_view attribute, std::string_view value);
-    bool boolAttribute(const XmlElement& element, std::string_view attribute, std::string_view value, bool ifMissing);
-    CIMType typeAttribute(const XmlElement& element, std::string_view attribute, std::string_view value);
-    Uint32 sizeAttribute(const XmlElement& element, std::string_view value);
-    CIMFlavor flavor(const XmlElement& element, const std::string_view* values);
+    CIMName optionalName(const XmlElement& element, std::string_view attribute, const XmlAttribute& value);
+    bool boolAttribute(const XmlElement& element, std::string_view attribute, const XmlAttribute& value,
+                       bool ifMissing);
+    CIMType typeAttribute(const XmlElement& element, std::string_view attribute, const XmlAttribute& value);
+    Uint32 sizeAttribute(const XmlElement& element, const XmlAttribute& value);
+    CIMFlavor flavor(const XmlElement& element, const XmlAttribute* values);
 
-    // PathElementDecoder.cpp
+    // ElementDecoderPaths.cpp
     CIMKeyBinding decodeKeyBinding(const XmlElement& element);
     CIMKeyBinding decodeKeyValue(const XmlElement& element, const CIMName& name);
     CIMObjectPath decodeNameIn(const XmlElement& element, const String& host, const CIMNamespaceName& nameSpace);
 
-    // ValueElementDecoder.cpp
+    // ElementDecoderValues.cpp
     template <class T> T parseText(const XmlElement& element, std::string_view text);
     template <class T> CIMValue decodeScalar(const XmlElement& element);
     template <class T> CIMValue decodeArray(const XmlElement& element);
@@ -89,7 +90,8 @@ class ElementDecoder
     template <class T> T parseSigned(const XmlElement& element, std::string_view text);
     CIMValue decodeParameterContent(const XmlElement& element, CIMType type);
     CIMObject decodeEmbedded(const XmlElement& element, std::string_view text);
-    CIMType embeddedType(const XmlElement& element, CIMType type, std::string_view value1, std::string_view value2);
+    CIMType embeddedType(const XmlElement& element, CIMType type, const XmlAttribute& value1,
+                         const XmlAttribute& value2);
 
     XmlLimits fLimits;
     NameCache fNames;

@@ -3,6 +3,7 @@
 #include "pegasus/base/NumberText.h"
 #include "pegasus/base/Text.h"
 #include "pegasus/common/CIMValueRep.h"
+#include "pegasus/wire/XmlEscape.h"
 
 #include <cmath>
 
@@ -507,3 +508,23 @@ void appendReturnValue(std::string& out, const CIMValue& value)
 }
 
 } // namespace Pegasus::wire
+
+// ---- the one member of the CIM objects that writes XML: it stands above them, with the encoder
+
+namespace Pegasus {
+
+String CIMConstObject::toString() const
+{
+    if (isUninitialized()) {
+        throw UninitializedObjectException();
+    }
+    std::string text;
+    if (isClass()) {
+        wire::appendClass(text, fClass);
+    } else {
+        wire::appendInstance(text, fInstance);
+    }
+    return base::fromUtf8(text);
+}
+
+} // namespace Pegasus

@@ -13,11 +13,6 @@ namespace Pegasus::wire {
 // Objects to CIM-XML elements (DSP0201): each function appends to `out` the element that its comment names,
 // UTF-8, a line feed after every tag that ends a line. Throws: UninitializedObjectException.
 
-// `text` with & < > " ' as entities, and as character references what a parser would otherwise change: control
-// characters, and a blank at the beginning, at the end or beside another blank.
-void appendEscaped(std::string& out, std::string_view text);
-void appendEscaped(std::string& out, const String& text);
-
 // CLASS
 void appendClass(std::string& out, const CIMConstClass& cimClass);
 // INSTANCE

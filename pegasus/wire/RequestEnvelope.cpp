@@ -1,6 +1,7 @@
 #include "pegasus/wire/RequestEnvelope.h"
 
 #include "pegasus/wire/ElementEncoder.h"
+#include "pegasus/wire/XmlEscape.h"
 
 #include <Pegasus/Common/Exception.h>
 

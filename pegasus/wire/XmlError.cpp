@@ -8,11 +8,11 @@ namespace {
 const char* wordFor(XmlError::Kind kind)
 {
     switch (kind) {
-    case XmlError::Kind::NotWellFormed:
+    case XmlError::Kind::kNotWellFormed:
         return "Not well-formed";
-    case XmlError::Kind::Semantic:
+    case XmlError::Kind::kSemantic:
         return "Semantic error";
-    case XmlError::Kind::TooLarge:
+    case XmlError::Kind::kTooLarge:
         return "Limit exceeded";
     default:
         return "Validation error";

@@ -20,10 +20,10 @@ class XmlError : public Exception
   public:
     enum class Kind
     {
-        NotWellFormed, // no XML: "Not well-formed"
-        Invalid,       // XML, but not CIM-XML: "Validation error"
-        Semantic,      // CIM-XML whose values do not fit: "Semantic error"
-        TooLarge       // over one of the limits: "Limit exceeded"
+        kNotWellFormed, // no XML: "Not well-formed"
+        kInvalid,       // XML, but not CIM-XML: "Validation error"
+        kSemantic,      // CIM-XML whose values do not fit: "Semantic error"
+        kTooLarge       // over one of the limits: "Limit exceeded"
     };
 
     XmlError(Kind kind, XmlPlace place, const std::string& cause);

@@ -1,5 +1,6 @@
+#include "pegasus/wire/XmlEscape.h"
+
 #include "pegasus/base/Text.h"
-#include "pegasus/wire/ElementEncoder.h"
 
 namespace Pegasus::wire {
 namespace {

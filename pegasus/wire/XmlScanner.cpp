@@ -65,10 +65,10 @@ XmlToken XmlScanner::next(std::string_view bytes, XmlPlace place) const
     }
     const std::size_t size = std::min(bytes.find('<'), bytes.size());
     if (size > fLimits.maxTextBytes) {
-        throw XmlError(XmlError::Kind::TooLarge, place,
+        throw XmlError(XmlError::Kind::kTooLarge, place,
                        "text of more than " + std::to_string(fLimits.maxTextBytes) + " bytes");
     }
-    return {XmlToken::Type::Text, size};
+    return {XmlToken::Type::kText, size};
 }
 
 XmlToken XmlScanner::markup(std::string_view bytes, XmlPlace place) const
@@ -82,21 +82,22 @@ XmlToken XmlScanner::markup(std::string_view bytes, XmlPlace place) const
             return {};
         }
         const bool isDeclaration = startsWith(bytes, kDeclaration) && isBlank(bytes[kDeclaration.size()]);
-        return upTo(isDeclaration ? Type::Declaration : Type::Instruction, bytes, 2, "?>", fLimits.maxTagBytes, place);
+        return upTo(isDeclaration ? Type::kDeclaration : Type::kInstruction, bytes, 2, "?>", fLimits.maxTagBytes,
+                    place);
     }
     if (bytes[1] != '!') {
         return tag(bytes, place);
     }
     if (startsWith(bytes, kComment)) {
-        return upTo(Type::Comment, bytes, kComment.size(), "-->", fLimits.maxTagBytes, place);
+        return upTo(Type::kComment, bytes, kComment.size(), "-->", fLimits.maxTagBytes, place);
     }
     if (startsWith(bytes, kCData)) {
-        return upTo(Type::CData, bytes, kCData.size(), "]]>", fLimits.maxTextBytes, place);
+        return upTo(Type::kCData, bytes, kCData.size(), "]]>", fLimits.maxTextBytes, place);
     }
     if (mayBecome(bytes, kComment) || mayBecome(bytes, kCData)) {
         return {};
     }
-    throw XmlError(XmlError::Kind::Invalid, place, "a document type or other declaration is not accepted");
+    throw XmlError(XmlError::Kind::kInvalid, place, "a document type or other declaration is not accepted");
 }
 
 XmlToken XmlScanner::tag(std::string_view bytes, XmlPlace place) const
@@ -106,16 +107,16 @@ XmlToken XmlScanner::tag(std::string_view bytes, XmlPlace place) const
         at = findTagMark(bytes, std::min(findQuote(bytes, at + 1, bytes[at]) + 1, bytes.size()));
     }
     if (at > fLimits.maxTagBytes) {
-        throw XmlError(XmlError::Kind::TooLarge, place,
+        throw XmlError(XmlError::Kind::kTooLarge, place,
                        "a tag of more than " + std::to_string(fLimits.maxTagBytes) + " bytes");
     }
     if (at >= bytes.size()) {
         return {};
     }
     if (bytes[1] == '/') {
-        return {XmlToken::Type::EndTag, at + 1};
+        return {XmlToken::Type::kEndTag, at + 1};
     }
-    return {bytes[at - 1] == '/' ? XmlToken::Type::EmptyTag : XmlToken::Type::StartTag, at + 1};
+    return {bytes[at - 1] == '/' ? XmlToken::Type::kEmptyTag : XmlToken::Type::kStartTag, at + 1};
 }
 
 XmlToken XmlScanner::upTo(XmlToken::Type type, std::string_view bytes, std::size_t from, std::string_view end,
@@ -124,7 +125,7 @@ XmlToken XmlScanner::upTo(XmlToken::Type type, std::string_view bytes, std::size
     const std::size_t found = bytes.find(end, from);
     const std::size_t size = found == std::string_view::npos ? bytes.size() : found + end.size();
     if (size > limit) {
-        throw XmlError(XmlError::Kind::TooLarge, place, "a section of more than " + std::to_string(limit) + " bytes");
+        throw XmlError(XmlError::Kind::kTooLarge, place, "a section of more than " + std::to_string(limit) + " bytes");
     }
     return found == std::string_view::npos ? XmlToken{} : XmlToken{type, size};
 }

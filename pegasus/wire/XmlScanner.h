@@ -13,18 +13,18 @@ struct XmlToken
 {
     enum class Type
     {
-        Incomplete, // more bytes are needed
-        Text,       // everything up to the next '<'
-        StartTag,
-        EmptyTag, // <a/>
-        EndTag,
-        CData,
-        Comment,
-        Declaration, // <?xml ...?>
-        Instruction  // any other <? ?>
+        kIncomplete, // more bytes are needed
+        kText,       // everything up to the next '<'
+        kStartTag,
+        kEmptyTag, // <a/>
+        kEndTag,
+        kCData,
+        kComment,
+        kDeclaration, // <?xml ...?>
+        kInstruction  // any other <? ?>
     };
 
-    Type type = Type::Incomplete;
+    Type type = Type::kIncomplete;
     std::size_t size = 0;
 };
 

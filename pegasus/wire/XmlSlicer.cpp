@@ -43,7 +43,7 @@ void XmlSlicer::run()
 void XmlSlicer::checkElementSize(std::size_t size) const
 {
     if (size > fLimits.maxElementBytes) {
-        throw XmlError(Kind::TooLarge, here(),
+        throw XmlError(Kind::kTooLarge, here(),
                        "an element of more than " + std::to_string(fLimits.maxElementBytes) + " bytes");
     }
 }
@@ -73,8 +73,8 @@ bool XmlSlicer::step()
 {
     const XmlToken token = nextToken();
     // Text may go on with the next bytes; in a slice that does not matter.
-    const bool isCut = token.type == Type::Text && token.size == rest().size() && fSliceDepth == 0;
-    if (token.type == Type::Incomplete || isCut) {
+    const bool isCut = token.type == Type::kText && token.size == rest().size() && fSliceDepth == 0;
+    if (token.type == Type::kIncomplete || isCut) {
         return false;
     }
     take(token);
@@ -84,8 +84,8 @@ bool XmlSlicer::step()
 void XmlSlicer::take(const XmlToken& token)
 {
     if (!fHasDeclaration) {
-        if (token.type != Type::Declaration) {
-            throw XmlError(Kind::Invalid, fPlace, "Expected <?xml ... ?> style declaration");
+        if (token.type != Type::kDeclaration) {
+            throw XmlError(Kind::kInvalid, fPlace, "Expected <?xml ... ?> style declaration");
         }
         checkXmlDeclaration(rest().substr(0, token.size), fPlace);
         fHasDeclaration = true;
@@ -101,14 +101,14 @@ void XmlSlicer::take(const XmlToken& token)
 void XmlSlicer::takeInSlice(const XmlToken& token)
 {
     fScanned += token.size;
-    if (token.type == Type::StartTag) {
+    if (token.type == Type::kStartTag) {
         ++fSliceDepth;
     }
     if (fOpen.size() + fSliceDepth > fLimits.maxDepth) {
-        throw XmlError(Kind::TooLarge, here(),
+        throw XmlError(Kind::kTooLarge, here(),
                        "elements nested more than " + std::to_string(fLimits.maxDepth) + " deep");
     }
-    if (token.type == Type::EndTag && --fSliceDepth == 0) {
+    if (token.type == Type::kEndTag && --fSliceDepth == 0) {
         endSlice();
     }
 }
@@ -117,22 +117,22 @@ void XmlSlicer::takeInEnvelope(const XmlToken& token)
 {
     const std::string_view text = rest().substr(0, token.size);
     switch (token.type) {
-    case Type::StartTag:
-    case Type::EmptyTag:
+    case Type::kStartTag:
+    case Type::kEmptyTag:
         return isEnvelope(XmlScanner::tagName(text)) ? open(token) : beginSlice(token);
-    case Type::EndTag:
+    case Type::kEndTag:
         flush();
         consume(0);
         close(XmlScanner::tagName(text));
         break;
-    case Type::Text:
-    case Type::CData:
+    case Type::kText:
+    case Type::kCData:
         if (text.find_first_not_of(" \t\r\n") != std::string_view::npos) {
-            throw XmlError(Kind::Invalid, here(), "unexpected text between elements");
+            throw XmlError(Kind::kInvalid, here(), "unexpected text between elements");
         }
         break;
-    case Type::Declaration:
-        throw XmlError(Kind::NotWellFormed, fPlace, "a second XML declaration");
+    case Type::kDeclaration:
+        throw XmlError(Kind::kNotWellFormed, fPlace, "a second XML declaration");
     default:
         break;
     }
@@ -146,11 +146,11 @@ void XmlSlicer::takeInEnvelope(const XmlToken& token)
 void XmlSlicer::beginSlice(const XmlToken& token)
 {
     if (fOpen.empty() && fHasRoot) {
-        throw XmlError(Kind::NotWellFormed, here(), "a second root element");
+        throw XmlError(Kind::kNotWellFormed, here(), "a second root element");
     }
     fSliceStart = fScanned;
     fScanned += token.size;
-    if (token.type == Type::EmptyTag) {
+    if (token.type == Type::kEmptyTag) {
         endSlice();
     } else {
         fSliceDepth = 1;
@@ -190,18 +190,18 @@ void XmlSlicer::open(const XmlToken& token)
     flush();
     consume(0);
     if (fOpen.empty() && fHasRoot) {
-        throw XmlError(Kind::NotWellFormed, here(), "a second root element");
+        throw XmlError(Kind::kNotWellFormed, here(), "a second root element");
     }
     const std::string name(XmlScanner::tagName(rest().substr(0, token.size)));
     // The tag by itself is made an element that the parser can read.
     std::string tag(rest().substr(0, token.size));
-    if (token.type == Type::StartTag) {
+    if (token.type == Type::kStartTag) {
         tag.insert(tag.size() - 1, 1, '/');
     }
     fHasRoot = true;
     fOpen.push_back(name);
     fHandler.openEnvelope(fDocument.parseElement(tag.data(), tag.size(), fPlace));
-    if (token.type == Type::EmptyTag) {
+    if (token.type == Type::kEmptyTag) {
         close(name);
     }
     consume(token.size);
@@ -210,7 +210,7 @@ void XmlSlicer::open(const XmlToken& token)
 void XmlSlicer::close(std::string_view name)
 {
     if (fOpen.empty() || fOpen.back() != name) {
-        throw XmlError(Kind::NotWellFormed, fPlace,
+        throw XmlError(Kind::kNotWellFormed, fPlace,
                        "Closing element does not match opening element: " + std::string(name));
     }
     fOpen.pop_back();
@@ -234,11 +234,11 @@ bool XmlSlicer::isEnvelope(std::string_view name) const
 void XmlSlicer::finish()
 {
     if (!fHasDeclaration) {
-        throw XmlError(Kind::Invalid, fPlace, "Expected <?xml ... ?> style declaration");
+        throw XmlError(Kind::kInvalid, fPlace, "Expected <?xml ... ?> style declaration");
     }
     const bool onlyBlanks = rest().find_first_not_of(" \t\r\n") == std::string_view::npos;
     if (!fHasRoot || !fOpen.empty() || fSliceDepth > 0 || !onlyBlanks) {
-        throw XmlError(Kind::NotWellFormed, fPlace, "the answer ends before its XML does");
+        throw XmlError(Kind::kNotWellFormed, fPlace, "the answer ends before its XML does");
     }
 }
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "pegasus/wire/XmlReader.h"
+#include "pegasus/wire/XmlDocument.h"
 #include "pegasus/wire/XmlScanner.h"
 
 #include <string>

@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <cstdint>
+#include <optional>
 
 namespace Pegasus::wire {
 namespace {
@@ -68,19 +69,22 @@ bool appendReference(std::string_view reference, std::string& out)
     return true;
 }
 
-// The value of `name` in a declaration; empty when it is not there.
-std::string_view pseudoAttribute(std::string_view declaration, std::string_view name)
+// Returns: the value of `name` in a declaration; nothing when it is not there.
+std::optional<std::string_view> pseudoAttribute(std::string_view declaration, std::string_view name)
 {
     std::size_t at = declaration.find(name);
     if (at == std::string_view::npos) {
-        return std::string_view();
+        return std::nullopt;
     }
     at = declaration.find_first_of("\"'", at + name.size());
     if (at == std::string_view::npos) {
-        return std::string_view();
+        return std::nullopt;
     }
     const std::size_t end = declaration.find(declaration[at], at + 1);
-    return end == std::string_view::npos ? std::string_view() : declaration.substr(at + 1, end - at - 1);
+    if (end == std::string_view::npos) {
+        return std::nullopt;
+    }
+    return declaration.substr(at + 1, end - at - 1);
 }
 
 } // namespace
@@ -138,13 +142,13 @@ void appendNormalized(std::string& out, std::string_view text)
 
 void checkXmlDeclaration(std::string_view declaration, XmlPlace place)
 {
-    const std::string_view version = pseudoAttribute(declaration, "version");
+    const std::string_view version = pseudoAttribute(declaration, "version").value_or("");
     if (version.substr(0, 2) != "1." || version.size() < 3) {
-        throw XmlError(XmlError::Kind::Invalid, place, "Expected <?xml ... ?> style declaration with version 1.x");
+        throw XmlError(XmlError::Kind::kInvalid, place, "Expected <?xml ... ?> style declaration with version 1.x");
     }
-    const std::string_view encoding = pseudoAttribute(declaration, "encoding");
-    if (encoding.data() != nullptr && !base::equalNoCase(encoding, "utf-8")) {
-        throw XmlError(XmlError::Kind::Invalid, place, "unsupported encoding \"" + std::string(encoding) + "\"");
+    const auto encoding = pseudoAttribute(declaration, "encoding");
+    if (encoding && !base::equalNoCase(*encoding, "utf-8")) {
+        throw XmlError(XmlError::Kind::kInvalid, place, "unsupported encoding \"" + std::string(*encoding) + "\"");
     }
 }
 

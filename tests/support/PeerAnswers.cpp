@@ -1,6 +1,7 @@
 #include "tests/support/PeerAnswers.h"
 
 #include "pegasus/wire/ElementEncoder.h"
+#include "pegasus/wire/XmlEscape.h"
 
 #include <algorithm>
 #include <cctype>

@@ -97,7 +97,7 @@ ScriptedPeer::ScriptedPeer(PeerHandler handler, Start start) : fHandler(std::mov
         fail("eventfd");
     }
     bindPort();
-    if (start == Start::Listening) {
+    if (start == Start::kListening) {
         listen();
     }
 }

@@ -49,11 +49,11 @@ class ScriptedPeer
   public:
     enum class Start
     {
-        Listening,
-        Refusing // the port is taken, but connections are refused until listen() is called
+        kListening,
+        kRefusing // the port is taken, but connections are refused until listen() is called
     };
 
-    explicit ScriptedPeer(PeerHandler handler, Start start = Start::Listening);
+    explicit ScriptedPeer(PeerHandler handler, Start start = Start::kListening);
     // Closes everything and waits for the threads.
     ~ScriptedPeer();
     ScriptedPeer(const ScriptedPeer&) = delete;

@@ -2,6 +2,7 @@
 
 #include "pegasus/base/Text.h"
 #include "pegasus/wire/ElementEncoder.h"
+#include "pegasus/wire/XmlEscape.h"
 
 namespace Pegasus::server {
 

@@ -26,7 +26,7 @@ XmlElement IntrinsicParameters::require(std::string_view parameter, const char* 
 {
     const XmlElement value = find(parameter);
     if (!value) {
-        fCall.fail(XmlError::Kind::Invalid, std::string("expected ") + element + " element");
+        fCall.fail(XmlError::Kind::kInvalid, std::string("expected ") + element + " element");
     }
     value.expectName(element);
     return value;
@@ -49,7 +49,7 @@ CIMName IntrinsicParameters::name(std::string_view parameter) const
     String text;
     fDecoder->decodeValue(value, CIMTYPE_STRING).get(text);
     if (!CIMName::legal(text)) {
-        value.fail(XmlError::Kind::Semantic, "Illegal value for " + std::string(parameter));
+        value.fail(XmlError::Kind::kSemantic, "Illegal value for " + std::string(parameter));
     }
     return CIMName(text);
 }
@@ -77,7 +77,7 @@ CIMPropertyList IntrinsicParameters::propertyList() const
     Array<CIMName> names;
     for (Uint32 i = 0; i < texts.size(); ++i) {
         if (!CIMName::legal(texts[i])) {
-            value.fail(XmlError::Kind::Semantic, "Illegal value for PropertyList");
+            value.fail(XmlError::Kind::kSemantic, "Illegal value for PropertyList");
         }
         names.append(CIMName(texts[i]));
     }

@@ -7,6 +7,7 @@
 
 namespace Pegasus::server {
 
+using wire::XmlAttribute;
 using wire::XmlElement;
 using wire::XmlError;
 
@@ -131,12 +132,12 @@ void checkMatch(const HttpRequest& http, const CimRequest& request)
     }
 }
 
-std::string requiredAttribute(XmlElement element, std::string_view value, const char* name)
+std::string requiredAttribute(XmlElement element, const XmlAttribute& value, const char* name)
 {
-    if (value.data() == nullptr) {
-        element.fail(XmlError::Kind::Invalid, std::string("missing ") + name + " attribute");
+    if (!value) {
+        element.fail(XmlError::Kind::kInvalid, std::string("missing ") + name + " attribute");
     }
-    return std::string(value);
+    return std::string(*value);
 }
 
 } // namespace
@@ -145,9 +146,9 @@ void failFor(const XmlError& error)
 {
     const std::string detail = base::utf8(error.getMessage());
     switch (error.kind()) {
-    case XmlError::Kind::NotWellFormed:
+    case XmlError::Kind::kNotWellFormed:
         refuse("request-not-well-formed", detail);
-    case XmlError::Kind::TooLarge:
+    case XmlError::Kind::kTooLarge:
         refuse("request-not-valid", detail, 413);
     default:
         refuse("request-not-valid", detail);
@@ -168,9 +169,9 @@ CimRequest RequestDecoder::decode(const HttpRequest& http)
         const XmlElement cim = fDocument.parseMessage(fText.data(), fText.size());
         static constexpr std::string_view kMessageNames[] = {"ID", "PROTOCOLVERSION"};
         CimRequest request = decodeMessage(cim);
-        std::string_view message[2];
+        XmlAttribute message[2];
         cim.onlyChild().attributes(kMessageNames, message);
-        checkProtocolVersion(http, std::string(message[1]));
+        checkProtocolVersion(http, std::string(*message[1]));
         checkMatch(http, request);
         return request;
     } catch (const XmlError& error) {
@@ -189,8 +190,8 @@ CimRequest RequestDecoder::decodeMessage(XmlElement cim)
 {
     static constexpr std::string_view kCimNames[] = {"CIMVERSION", "DTDVERSION"};
     static constexpr std::string_view kMessageNames[] = {"ID", "PROTOCOLVERSION"};
-    std::string_view cimValues[2];
-    std::string_view messageValues[2];
+    XmlAttribute cimValues[2];
+    XmlAttribute messageValues[2];
     cim.expectName("CIM");
     cim.attributes(kCimNames, cimValues);
     checkCimVersions(requiredAttribute(cim, cimValues[0], "CIM.CIMVERSION"),
@@ -216,12 +217,12 @@ CimRequest RequestDecoder::decodeMessage(XmlElement cim)
 void RequestDecoder::decodeIntrinsic(XmlElement call, CimRequest& request)
 {
     static constexpr std::string_view kNames[] = {"NAME"};
-    std::string_view values[1];
+    XmlAttribute values[1];
     call.attributes(kNames, values);
     request.method = resolvedAttribute(call, requiredAttribute(call, values[0], "IMETHODCALL.NAME"));
     XmlElement child = call.firstChild();
     if (!child) {
-        call.fail(XmlError::Kind::Invalid, "expected LOCALNAMESPACEPATH element");
+        call.fail(XmlError::Kind::kInvalid, "expected LOCALNAMESPACEPATH element");
     }
     request.nameSpace = fElements.decodeLocalNamespacePath(child);
     request.parameters = IntrinsicParameters(call, fElements);
@@ -231,7 +232,7 @@ void RequestDecoder::decodeIntrinsic(XmlElement call, CimRequest& request)
         requiredAttribute(child, values[0], "IPARAMVALUE.NAME");
         const XmlElement value = child.firstChild();
         if (value) {
-            request.parameters.add(values[0], child.onlyChild());
+            request.parameters.add(*values[0], child.onlyChild());
         }
     }
 }
@@ -239,13 +240,13 @@ void RequestDecoder::decodeIntrinsic(XmlElement call, CimRequest& request)
 void RequestDecoder::decodeExtrinsic(XmlElement call, CimRequest& request)
 {
     static constexpr std::string_view kNames[] = {"NAME"};
-    std::string_view values[1];
+    XmlAttribute values[1];
     call.expectName("METHODCALL");
     call.attributes(kNames, values);
     request.method = resolvedAttribute(call, requiredAttribute(call, values[0], "METHODCALL.NAME"));
     XmlElement child = call.firstChild();
     if (!child.is("LOCALCLASSPATH") && !child.is("LOCALINSTANCEPATH")) {
-        call.fail(XmlError::Kind::Invalid, "expected LOCALCLASSPATH or LOCALINSTANCEPATH element");
+        call.fail(XmlError::Kind::kInvalid, "expected LOCALCLASSPATH or LOCALINSTANCEPATH element");
     }
     request.object = fElements.decodeObjectPath(child);
     request.nameSpace = request.object.getNameSpace();

@@ -325,7 +325,7 @@ TEST(ClientDeadline, OfZeroEndsAtOnce)
 
 TEST(ClientConnection, LifeCycle)
 {
-    test::ScriptedPeer peer(good, test::ScriptedPeer::Start::Refusing);
+    test::ScriptedPeer peer(good, test::ScriptedPeer::Start::kRefusing);
     CIMClient client;
     EXPECT_EQ(getClassOutcome(client), "Pegasus::NotConnectedException: not connected");
     const std::string refused =

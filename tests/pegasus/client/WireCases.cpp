@@ -68,7 +68,7 @@ class RecordedCall
 wire::XmlElement RecordedCall::parameter(const std::string& name)
 {
     for (wire::XmlElement child = fCall.firstChild(); child; child = child.nextSibling()) {
-        std::string_view values[2];
+        wire::XmlAttribute values[2];
         if (!child.is("IPARAMVALUE")) {
             continue;
         }

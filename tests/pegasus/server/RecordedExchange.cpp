@@ -1,7 +1,7 @@
 #include "tests/pegasus/server/RecordedExchange.h"
 
 #include "pegasus/base/PercentCoding.h"
-#include "pegasus/wire/XmlReader.h"
+#include "pegasus/wire/XmlDocument.h"
 
 #include <algorithm>
 #include <cstdlib>
@@ -85,13 +85,13 @@ void appendCanonical(std::string& out, const XmlElement& element, int depth, Ord
                                                   "PROPERTY",    "PROTOCOLVERSION", "REFERENCE",      "REFERENCECLASS",
                                                   "SUPERCLASS",  "TOINSTANCE",      "TOSUBCLASS",     "TRANSLATABLE",
                                                   "TYPE",        "VALUETYPE",       "VERSION"};
-    std::string_view values[std::size(kNames)];
+    Pegasus::wire::XmlAttribute values[std::size(kNames)];
     std::string scratch;
     element.attributes(kNames, values);
     out += std::string(static_cast<std::size_t>(depth), ' ') + std::string(element.name());
     for (std::size_t i = 0; i < std::size(kNames); ++i) {
-        if (values[i].data() != nullptr) {
-            out += " " + std::string(kNames[i]) + "=" + std::string(element.resolved(values[i], scratch));
+        if (values[i]) {
+            out += " " + std::string(kNames[i]) + "=" + std::string(element.resolved(*values[i], scratch));
         }
     }
     if (element.is("VALUE") || element.is("KEYVALUE") || element.is("HOST")) {

@@ -24,7 +24,7 @@ std::string NameOf(const test::PeerRequest& request)
 } // namespace
 
 TFakeCimServer::TFakeCimServer()
-    : fPeer([this](const test::PeerRequest& request) { return Respond(request); }, test::ScriptedPeer::Start::Refusing)
+    : fPeer([this](const test::PeerRequest& request) { return Respond(request); }, test::ScriptedPeer::Start::kRefusing)
 {
 }
 

@@ -25,20 +25,20 @@ struct ServerAddress
 };
 
 // One socket, close-on-exec and without SIGPIPE. No call lasts beyond the deadline that it is given.
-class Connection
+class ServerConnection
 {
   public:
     enum class Result
     {
-        Done,
-        Closed, // by the server, orderly or not
-        TimedOut
+        kDone,
+        kClosed, // by the server, orderly or not
+        kTimedOut
     };
 
-    Connection() = default;
-    ~Connection() { close(); }
-    Connection(const Connection&) = delete;
-    Connection& operator=(const Connection&) = delete;
+    ServerConnection() = default;
+    ~ServerConnection() { close(); }
+    ServerConnection(const ServerConnection&) = delete;
+    ServerConnection& operator=(const ServerConnection&) = delete;
 
     // Where open() goes from now on. A host name is looked up here and not again, because nothing but the resolver's
     // own settings bounds that. Throws: InvalidLocatorException.

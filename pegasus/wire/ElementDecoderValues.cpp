@@ -38,10 +38,10 @@ template <class T> T ElementDecoder::parseUnsigned(const XmlElement& element, st
 {
     const auto parsed = base::parseUnsigned(text);
     if (!parsed) {
-        element.fail(Kind::Semantic, "Invalid unsigned integer value");
+        element.fail(Kind::kSemantic, "Invalid unsigned integer value");
     }
     if (*parsed > std::numeric_limits<T>::max()) {
-        element.fail(Kind::Semantic, typeWord<T>() + " value out of range");
+        element.fail(Kind::kSemantic, typeWord<T>() + " value out of range");
     }
     return static_cast<T>(*parsed);
 }
@@ -50,10 +50,10 @@ template <class T> T ElementDecoder::parseSigned(const XmlElement& element, std:
 {
     const auto parsed = base::parseSigned(text);
     if (!parsed) {
-        element.fail(Kind::Semantic, "Invalid signed integer value");
+        element.fail(Kind::kSemantic, "Invalid signed integer value");
     }
     if (*parsed > std::numeric_limits<T>::max() || *parsed < std::numeric_limits<T>::min()) {
-        element.fail(Kind::Semantic, typeWord<T>() + " value out of range");
+        element.fail(Kind::kSemantic, typeWord<T>() + " value out of range");
     }
     return static_cast<T>(*parsed);
 }
@@ -71,14 +71,14 @@ template <> Boolean ElementDecoder::parseText<Boolean>(const XmlElement& element
     if (base::equalNoCase(text, "false")) {
         return false;
     }
-    element.fail(Kind::Semantic, "Invalid boolean value");
+    element.fail(Kind::kSemantic, "Invalid boolean value");
 }
 
 template <> Real32 ElementDecoder::parseText<Real32>(const XmlElement& element, std::string_view text)
 {
     const auto parsed = base::parseReal32(text);
     if (!parsed) {
-        element.fail(Kind::Semantic, "Invalid real number value");
+        element.fail(Kind::kSemantic, "Invalid real number value");
     }
     return *parsed;
 }
@@ -87,7 +87,7 @@ template <> Real64 ElementDecoder::parseText<Real64>(const XmlElement& element, 
 {
     const auto parsed = base::parseReal64(text);
     if (!parsed) {
-        element.fail(Kind::Semantic, "Invalid real number value");
+        element.fail(Kind::kSemantic, "Invalid real number value");
     }
     return *parsed;
 }
@@ -96,7 +96,7 @@ template <> Char16 ElementDecoder::parseText<Char16>(const XmlElement& element, 
 {
     const String unit = toString(element, text);
     if (unit.size() != 1) {
-        element.fail(Kind::Semantic, "Invalid char16 value");
+        element.fail(Kind::kSemantic, "Invalid char16 value");
     }
     return unit[0];
 }
@@ -111,7 +111,7 @@ template <> CIMDateTime ElementDecoder::parseText<CIMDateTime>(const XmlElement&
     } catch (const XmlError&) {
         throw;
     } catch (const Exception&) {
-        element.fail(Kind::Semantic, "Invalid datetime value");
+        element.fail(Kind::kSemantic, "Invalid datetime value");
     }
 }
 
@@ -124,7 +124,7 @@ template <> CIMInstance ElementDecoder::parseText<CIMInstance>(const XmlElement&
 {
     const CIMObject object = decodeEmbedded(element, text);
     if (!object.isInstance()) {
-        element.fail(Kind::Semantic, "an embedded class where an instance is expected");
+        element.fail(Kind::kSemantic, "an embedded class where an instance is expected");
     }
     return CIMInstance(object);
 }
@@ -142,7 +142,7 @@ CIMObject ElementDecoder::decodeEmbedded(const XmlElement& element, std::string_
 {
     const EmbeddingGuard guard(fEmbeddingDepth);
     if (fEmbeddingDepth > fLimits.maxEmbedding) {
-        element.fail(Kind::TooLarge, "objects embedded more than " + std::to_string(fLimits.maxEmbedding) + " deep");
+        element.fail(Kind::kTooLarge, "objects embedded more than " + std::to_string(fLimits.maxEmbedding) + " deep");
     }
     // A copy: decoding the object uses the scratch text that `text` may be in, and changes what it reads.
     std::string xml(text);
@@ -155,21 +155,21 @@ CIMObject ElementDecoder::decodeEmbedded(const XmlElement& element, std::string_
     }
 }
 
-CIMType ElementDecoder::embeddedType(const XmlElement& element, CIMType type, std::string_view value1,
-                                     std::string_view value2)
+CIMType ElementDecoder::embeddedType(const XmlElement& element, CIMType type, const XmlAttribute& value1,
+                                     const XmlAttribute& value2)
 {
-    const std::string_view kind = value1.data() != nullptr ? value1 : value2;
-    if (kind.data() == nullptr) {
+    const XmlAttribute& kind = value1 ? value1 : value2;
+    if (!kind) {
         return type;
     }
-    const bool agree = value1.data() == nullptr || value2.data() == nullptr || value1 == value2;
-    if (type == CIMTYPE_STRING && agree && kind == "instance") {
+    const bool agree = !value1 || !value2 || *value1 == *value2;
+    if (type == CIMTYPE_STRING && agree && *kind == "instance") {
         return CIMTYPE_INSTANCE;
     }
-    if (type == CIMTYPE_STRING && agree && kind == "object") {
+    if (type == CIMTYPE_STRING && agree && *kind == "object") {
         return CIMTYPE_OBJECT;
     }
-    element.fail(Kind::Semantic, "Illegal value for " + std::string(element.name()) + ".EmbeddedObject attribute");
+    element.fail(Kind::kSemantic, "Illegal value for " + std::string(element.name()) + ".EmbeddedObject attribute");
 }
 
 // ---- VALUE, VALUE.ARRAY
@@ -181,7 +181,7 @@ template <class T> CIMValue ElementDecoder::decodeScalar(const XmlElement& eleme
 
 template <> CIMValue ElementDecoder::decodeScalar<CIMObjectPath>(const XmlElement& element)
 {
-    element.fail(Kind::Invalid, "expected VALUE.REFERENCE element, got " + std::string(element.name()));
+    element.fail(Kind::kInvalid, "expected VALUE.REFERENCE element, got " + std::string(element.name()));
 }
 
 template <class T> CIMValue ElementDecoder::decodeArray(const XmlElement& element)
@@ -189,7 +189,7 @@ template <class T> CIMValue ElementDecoder::decodeArray(const XmlElement& elemen
     Array<T> array;
     for (XmlElement child = element.firstChild(); child; child = child.nextSibling()) {
         if (array.size() == fLimits.maxArrayElements) {
-            child.fail(Kind::TooLarge,
+            child.fail(Kind::kTooLarge,
                        "an array of more than " + std::to_string(fLimits.maxArrayElements) + " elements");
         }
         child.expectNoAttributes();
@@ -240,7 +240,7 @@ CIMValue ElementDecoder::decodeParameterContent(const XmlElement& element, CIMTy
     }
     const bool isReference = only.is("VALUE.REFERENCE") || only.is("VALUE.REFARRAY");
     if (isReference && type != CIMTYPE_REFERENCE && type != CIMTYPE_STRING) {
-        only.fail(Kind::Semantic, "a reference where " + std::string(cimTypeToString(type)) + " is expected");
+        only.fail(Kind::kSemantic, "a reference where " + std::string(cimTypeToString(type)) + " is expected");
     }
     return decodeValue(only, type);
 }
@@ -248,10 +248,10 @@ CIMValue ElementDecoder::decodeParameterContent(const XmlElement& element, CIMTy
 CIMParamValue ElementDecoder::decodeParamValue(const XmlElement& element)
 {
     element.expectName("PARAMVALUE");
-    std::string_view values[4];
+    XmlAttribute values[4];
     element.attributes({"NAME", "PARAMTYPE", "EmbeddedObject", "EMBEDDEDOBJECT"}, values);
     const CIMName name = nameAttribute(element, "NAME", values[0]);
-    const bool isTyped = values[1].data() != nullptr;
+    const bool isTyped = values[1].has_value();
     // A null without a type: the value is the untyped one that a default-constructed CIMValue is.
     if (!isTyped && !element.firstChild()) {
         return CIMParamValue(name.getString(), CIMValue(), false);
@@ -264,9 +264,9 @@ CIMParamValue ElementDecoder::decodeParamValue(const XmlElement& element)
 CIMValue ElementDecoder::decodeReturnValue(const XmlElement& element)
 {
     element.expectName("RETURNVALUE");
-    std::string_view values[3];
+    XmlAttribute values[3];
     element.attributes({"PARAMTYPE", "EmbeddedObject", "EMBEDDEDOBJECT"}, values);
-    const CIMType type = values[0].data() != nullptr ? typeAttribute(element, "PARAMTYPE", values[0]) : CIMTYPE_STRING;
+    const CIMType type = values[0] ? typeAttribute(element, "PARAMTYPE", values[0]) : CIMTYPE_STRING;
     return decodeParameterContent(element, embeddedType(element, type, values[1], values[2]));
 }
 

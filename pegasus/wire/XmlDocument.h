@@ -5,6 +5,7 @@
 
 #include <cstddef>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -15,6 +16,9 @@ struct xml_node_struct;
 namespace Pegasus::wire {
 
 class XmlDocument;
+
+// The raw text of an attribute, a view into the message; nothing when the element does not have it.
+using XmlAttribute = std::optional<std::string_view>;
 
 // One element of a parsed document: a cheap copyable view, valid as long as its document.
 // Names and values are views into the message; entity and character references are resolved on reading.
@@ -38,9 +42,9 @@ class XmlElement
     void expectNoChildren() const;
     void expectName(std::string_view expectedName) const;
 
-    // Reads attributes: values[i] gets the raw text of names[i], or stays with data() == nullptr when it is absent.
+    // Reads attributes: values[i] gets the value of names[i].
     // Throws: XmlError for an attribute that is not listed or appears twice.
-    template <std::size_t N> void attributes(const std::string_view (&names)[N], std::string_view (&values)[N]) const
+    template <std::size_t N> void attributes(const std::string_view (&names)[N], XmlAttribute (&values)[N]) const
     {
         readAttributes(names, values, N);
     }
@@ -59,7 +63,7 @@ class XmlElement
     friend class XmlDocument;
     XmlElement(pugi::xml_node_struct* node, const XmlDocument* document) : fNode(node), fDocument(document) {}
 
-    void readAttributes(const std::string_view* names, std::string_view* values, std::size_t count) const;
+    void readAttributes(const std::string_view* names, XmlAttribute* values, std::size_t count) const;
     std::string_view mixedText(std::string& scratch) const;
 
     pugi::xml_node_struct* fNode = nullptr;

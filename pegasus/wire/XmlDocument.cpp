@@ -1,4 +1,4 @@
-#include "pegasus/wire/XmlReader.h"
+#include "pegasus/wire/XmlDocument.h"
 
 #include "pegasus/wire/XmlScanner.h"
 #include "pegasus/wire/XmlText.h"
@@ -54,8 +54,8 @@ class MessageCheck
 XmlToken MessageCheck::take()
 {
     const XmlToken token = fScanner.next(fRest, fPlace);
-    if (token.type == XmlToken::Type::Incomplete) {
-        throw XmlError(Kind::NotWellFormed, fPlace, "the document ends inside a tag or section");
+    if (token.type == XmlToken::Type::kIncomplete) {
+        throw XmlError(Kind::kNotWellFormed, fPlace, "the document ends inside a tag or section");
     }
     return token;
 }
@@ -64,16 +64,16 @@ void MessageCheck::open(XmlToken token, const char* start, XmlPlace place)
 {
     if (fDepth == 0) {
         if (fRootStart) {
-            throw XmlError(Kind::NotWellFormed, place, "a second root element");
+            throw XmlError(Kind::kNotWellFormed, place, "a second root element");
         }
         fRootStart = start;
         fRootPlace = place;
     }
     if (++fDepth > fLimits.maxDepth) {
-        throw XmlError(Kind::TooLarge, place,
+        throw XmlError(Kind::kTooLarge, place,
                        "elements nested more than " + std::to_string(fLimits.maxDepth) + " deep");
     }
-    if (token.type == XmlToken::Type::EmptyTag) {
+    if (token.type == XmlToken::Type::kEmptyTag) {
         close(start + token.size);
     }
 }
@@ -81,7 +81,7 @@ void MessageCheck::open(XmlToken token, const char* start, XmlPlace place)
 void MessageCheck::close(const char* end)
 {
     if (fDepth == 0) {
-        throw XmlError(Kind::NotWellFormed, fPlace, "an end tag without a start tag");
+        throw XmlError(Kind::kNotWellFormed, fPlace, "an end tag without a start tag");
     }
     if (--fDepth == 0) {
         fRoot = std::string_view(fRootStart, static_cast<std::size_t>(end - fRootStart));
@@ -91,15 +91,15 @@ void MessageCheck::close(const char* end)
 void MessageCheck::expectOnlyBlanks(std::string_view text, XmlPlace place) const
 {
     if (fDepth == 0 && text.find_first_not_of(" \t\r\n") != std::string_view::npos) {
-        throw XmlError(Kind::NotWellFormed, place, "text outside the root element");
+        throw XmlError(Kind::kNotWellFormed, place, "text outside the root element");
     }
 }
 
 void MessageCheck::takeDeclaration()
 {
     const XmlToken token = fRest.empty() ? XmlToken() : fScanner.next(fRest, fPlace);
-    if (token.type != XmlToken::Type::Declaration) {
-        throw XmlError(Kind::Invalid, fPlace, "Expected <?xml ... ?> style declaration");
+    if (token.type != XmlToken::Type::kDeclaration) {
+        throw XmlError(Kind::kInvalid, fPlace, "Expected <?xml ... ?> style declaration");
     }
     checkXmlDeclaration(fRest.substr(0, token.size), fPlace);
 }
@@ -113,18 +113,18 @@ void MessageCheck::run(bool expectDeclaration)
     while (!fRest.empty()) {
         const XmlToken token = take();
         const std::string_view text = fRest.substr(0, token.size);
-        if (token.type == Type::StartTag || token.type == Type::EmptyTag) {
+        if (token.type == Type::kStartTag || token.type == Type::kEmptyTag) {
             open(token, text.data(), fPlace);
-        } else if (token.type == Type::EndTag) {
+        } else if (token.type == Type::kEndTag) {
             close(text.data() + text.size());
-        } else if (token.type == Type::Text || token.type == Type::CData) {
+        } else if (token.type == Type::kText || token.type == Type::kCData) {
             expectOnlyBlanks(text, fPlace);
         }
         fPlace = advance(fPlace, text);
         fRest.remove_prefix(token.size);
     }
-    if (fRoot.data() == nullptr) {
-        throw XmlError(Kind::NotWellFormed, fPlace, "the document ends before its root element does");
+    if (fRoot.empty()) {
+        throw XmlError(Kind::kNotWellFormed, fPlace, "the document ends before its root element does");
     }
 }
 
@@ -161,7 +161,7 @@ XmlElement XmlDocument::parseElement(char* text, std::size_t size, XmlPlace star
     fSize = size;
     fStart = start;
     if (const void* zero = std::memchr(text, 0, size)) {
-        throw XmlError(Kind::NotWellFormed, placeOf(static_cast<const char*>(zero)), "a zero byte");
+        throw XmlError(Kind::kNotWellFormed, placeOf(static_cast<const char*>(zero)), "a zero byte");
     }
     return parse(text, size);
 }
@@ -171,7 +171,7 @@ XmlElement XmlDocument::parse(char* text, std::size_t size)
     const pugi::xml_parse_result result =
         fTree->document.load_buffer_inplace(text, size, kParseOptions, pugi::encoding_utf8);
     if (!result) {
-        throw XmlError(Kind::NotWellFormed, placeAtOffset(static_cast<std::size_t>(result.offset)),
+        throw XmlError(Kind::kNotWellFormed, placeAtOffset(static_cast<std::size_t>(result.offset)),
                        result.description());
     }
     return XmlElement(fTree->document.first_child().internal_object(), this);
@@ -218,7 +218,7 @@ XmlElement XmlElement::firstChild() const
     const pugi::xml_node node = nodeOf(fNode);
     const pugi::xml_node child = node.first_child();
     if (node.value()[0] != '\0' || (child && child.type() != pugi::node_element)) {
-        fail(Kind::Invalid, "unexpected text in " + std::string(name()) + " element");
+        fail(Kind::kInvalid, "unexpected text in " + std::string(name()) + " element");
     }
     return XmlElement(child.internal_object(), fDocument);
 }
@@ -227,7 +227,7 @@ XmlElement XmlElement::nextSibling() const
 {
     const pugi::xml_node sibling = nodeOf(fNode).next_sibling();
     if (sibling && sibling.type() != pugi::node_element) {
-        fail(Kind::Invalid, "unexpected text behind " + std::string(name()) + " element");
+        fail(Kind::kInvalid, "unexpected text behind " + std::string(name()) + " element");
     }
     return XmlElement(sibling.internal_object(), fDocument);
 }
@@ -236,11 +236,11 @@ XmlElement XmlElement::onlyChild() const
 {
     const XmlElement child = firstChild();
     if (!child) {
-        fail(Kind::Invalid, "missing element in " + std::string(name()) + " element");
+        fail(Kind::kInvalid, "missing element in " + std::string(name()) + " element");
     }
     if (const XmlElement second = child.nextSibling()) {
-        second.fail(Kind::Invalid, "Expected close of " + std::string(name()) + " element, got " +
-                                       std::string(second.name()) + " instead");
+        second.fail(Kind::kInvalid, "Expected close of " + std::string(name()) + " element, got " +
+                                        std::string(second.name()) + " instead");
     }
     return child;
 }
@@ -248,22 +248,22 @@ XmlElement XmlElement::onlyChild() const
 void XmlElement::expectNoChildren() const
 {
     if (const XmlElement child = firstChild()) {
-        child.fail(Kind::Invalid, "Expected close of " + std::string(name()) + " element, got " +
-                                      std::string(child.name()) + " instead");
+        child.fail(Kind::kInvalid, "Expected close of " + std::string(name()) + " element, got " +
+                                       std::string(child.name()) + " instead");
     }
 }
 
 void XmlElement::expectName(std::string_view expectedName) const
 {
     if (!is(expectedName)) {
-        fail(Kind::Invalid, "expected " + std::string(expectedName) + " element, got " + std::string(name()));
+        fail(Kind::kInvalid, "expected " + std::string(expectedName) + " element, got " + std::string(name()));
     }
 }
 
-void XmlElement::readAttributes(const std::string_view* names, std::string_view* values, std::size_t count) const
+void XmlElement::readAttributes(const std::string_view* names, XmlAttribute* values, std::size_t count) const
 {
     for (std::size_t i = 0; i < count; ++i) {
-        values[i] = std::string_view();
+        values[i].reset();
     }
     std::size_t seen = 0;
     for (pugi::xml_attribute attribute = nodeOf(fNode).first_attribute(); attribute;
@@ -272,19 +272,20 @@ void XmlElement::readAttributes(const std::string_view* names, std::string_view*
         const std::string_view attributeName = attribute.name();
         const auto index = static_cast<std::size_t>(std::find(names, names + count, attributeName) - names);
         if (++seen > fDocument->limits().maxAttributes) {
-            fail(Kind::TooLarge, "more than " + std::to_string(fDocument->limits().maxAttributes) + " attributes in " +
-                                     std::string(name()) + " element");
+            fail(Kind::kTooLarge, "more than " + std::to_string(fDocument->limits().maxAttributes) + " attributes in " +
+                                      std::string(name()) + " element");
         }
         if (index == count) {
-            fail(Kind::Invalid,
+            fail(Kind::kInvalid,
                  "unexpected attribute " + quoted(attributeName) + " in " + std::string(name()) + " element");
         }
-        if (values[index].data() != nullptr) {
-            fail(Kind::NotWellFormed, "attribute " + quoted(attributeName) + " twice");
+        if (values[index]) {
+            fail(Kind::kNotWellFormed, "attribute " + quoted(attributeName) + " twice");
         }
-        values[index] = attribute.value();
-        if (values[index].find('<') != std::string_view::npos) {
-            fail(Kind::NotWellFormed, "'<' in attribute " + quoted(attributeName));
+        const std::string_view value = attribute.value();
+        values[index] = value;
+        if (value.find('<') != std::string_view::npos) {
+            fail(Kind::kNotWellFormed, "'<' in attribute " + quoted(attributeName));
         }
     }
 }
@@ -314,7 +315,7 @@ std::string_view XmlElement::mixedText(std::string& scratch) const
     for (const pugi::xml_node child : node.children()) {
         if (child.type() == pugi::node_element) {
             XmlElement(child.internal_object(), fDocument)
-                .fail(Kind::Invalid, "Expected close of " + std::string(name()) + " element, got " + child.name());
+                .fail(Kind::kInvalid, "Expected close of " + std::string(name()) + " element, got " + child.name());
         }
         endsInCData = child.type() == pugi::node_cdata;
         if (endsInCData) {
@@ -341,7 +342,7 @@ std::string_view XmlElement::resolved(std::string_view raw, std::string& scratch
     scratch.clear();
     const std::string problem = resolveReferences(raw, scratch);
     if (!problem.empty()) {
-        fail(Kind::NotWellFormed, problem + " in " + std::string(name()) + " element");
+        fail(Kind::kNotWellFormed, problem + " in " + std::string(name()) + " element");
     }
     return scratch;
 }

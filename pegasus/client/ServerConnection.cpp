@@ -1,4 +1,4 @@
-#include "pegasus/client/Connection.h"
+#include "pegasus/client/ServerConnection.h"
 
 #include "pegasus/base/LocalSocket.h"
 
@@ -59,13 +59,13 @@ std::string ServerAddress::text() const
     return isLocal ? std::string() : host + ":" + std::to_string(port);
 }
 
-void Connection::setAddress(const ServerAddress& address)
+void ServerConnection::setAddress(const ServerAddress& address)
 {
     fCandidates = address.isLocal ? nullptr : lookUp(address);
     fAddress = address;
 }
 
-void Connection::open(const Deadline& deadline)
+void ServerConnection::open(const Deadline& deadline)
 {
     close();
     fHasReceived = false;
@@ -76,7 +76,7 @@ void Connection::open(const Deadline& deadline)
     }
 }
 
-void Connection::openTcp(const Deadline& deadline)
+void ServerConnection::openTcp(const Deadline& deadline)
 {
     for (const addrinfo* candidate = fCandidates.get(); candidate; candidate = candidate->ai_next) {
         fFd = ::socket(candidate->ai_family, candidate->ai_socktype | SOCK_CLOEXEC | SOCK_NONBLOCK, 0);
@@ -85,7 +85,7 @@ void Connection::openTcp(const Deadline& deadline)
         }
         const int started = ::connect(fFd, candidate->ai_addr, candidate->ai_addrlen);
         const bool isPending = started < 0 && (errno == EINPROGRESS || errno == EINTR);
-        if (started == 0 || (isPending && waitFor(POLLOUT, deadline) == Result::Done && pendingError(fFd) == 0)) {
+        if (started == 0 || (isPending && waitFor(POLLOUT, deadline) == Result::kDone && pendingError(fFd) == 0)) {
             // A request is one message; waiting to fill a packet would only delay it.
             const int on = 1;
             ::setsockopt(fFd, IPPROTO_TCP, TCP_NODELAY, &on, sizeof(on));
@@ -96,7 +96,7 @@ void Connection::openTcp(const Deadline& deadline)
     throw CannotConnectException(toString("Cannot connect to " + fAddress.text() + ". Connection failed."));
 }
 
-void Connection::openLocal(const Deadline& deadline)
+void ServerConnection::openLocal(const Deadline& deadline)
 {
     try {
         fFd = base::connectLocalSocket(base::localSocketHome(), deadline).release();
@@ -107,7 +107,7 @@ void Connection::openLocal(const Deadline& deadline)
     ::fcntl(fFd, F_SETFL, flags | O_NONBLOCK);
 }
 
-void Connection::close()
+void ServerConnection::close()
 {
     if (fFd >= 0) {
         ::close(fFd);
@@ -115,31 +115,31 @@ void Connection::close()
     fFd = -1;
 }
 
-bool Connection::isStale() const
+bool ServerConnection::isStale() const
 {
     char byte = 0;
     const ssize_t count = ::recv(fFd, &byte, 1, MSG_PEEK | MSG_DONTWAIT);
     return count >= 0 || !isRetry(errno);
 }
 
-Connection::Result Connection::waitFor(short events, const Deadline& deadline) const
+ServerConnection::Result ServerConnection::waitFor(short events, const Deadline& deadline) const
 {
     for (;;) {
         pollfd entry{fFd, events, 0};
         const int ready = ::poll(&entry, 1, deadline.pollTimeoutMs());
         if (ready > 0) {
-            return Result::Done;
+            return Result::kDone;
         }
         if (ready == 0 && deadline.hasPassed()) {
-            return Result::TimedOut;
+            return Result::kTimedOut;
         }
         if (ready < 0 && errno != EINTR) {
-            return Result::Closed;
+            return Result::kClosed;
         }
     }
 }
 
-Connection::Result Connection::send(std::string_view bytes, const Deadline& deadline)
+ServerConnection::Result ServerConnection::send(std::string_view bytes, const Deadline& deadline)
 {
     while (!bytes.empty()) {
         const ssize_t count = ::send(fFd, bytes.data(), bytes.size(), MSG_NOSIGNAL);
@@ -148,35 +148,35 @@ Connection::Result Connection::send(std::string_view bytes, const Deadline& dead
             continue;
         }
         if (!isRetry(errno)) {
-            return Result::Closed;
+            return Result::kClosed;
         }
         const Result waited = waitFor(POLLOUT, deadline);
-        if (waited != Result::Done) {
+        if (waited != Result::kDone) {
             return waited;
         }
     }
-    return Result::Done;
+    return Result::kDone;
 }
 
-Connection::Result Connection::receive(char* buffer, std::size_t capacity, const Deadline& deadline,
-                                       std::size_t& received)
+ServerConnection::Result ServerConnection::receive(char* buffer, std::size_t capacity, const Deadline& deadline,
+                                                   std::size_t& received)
 {
     for (;;) {
         // Asked before each read: a server that never stops sending must not outlast the deadline.
         if (deadline.hasPassed()) {
-            return Result::TimedOut;
+            return Result::kTimedOut;
         }
         const ssize_t count = ::recv(fFd, buffer, capacity, 0);
         if (count >= 0) {
             received = static_cast<std::size_t>(count);
             fHasReceived = true;
-            return count == 0 ? Result::Closed : Result::Done;
+            return count == 0 ? Result::kClosed : Result::kDone;
         }
         if (!isRetry(errno)) {
-            return Result::Closed;
+            return Result::kClosed;
         }
         const Result waited = waitFor(POLLIN, deadline);
-        if (waited != Result::Done) {
+        if (waited != Result::kDone) {
             return waited;
         }
     }

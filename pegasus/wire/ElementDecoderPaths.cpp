@@ -10,7 +10,7 @@ XmlElement childOf(const XmlElement& element, std::string_view name)
 {
     const XmlElement child = element.firstChild();
     if (!child.is(name)) {
-        (child ? child : element).fail(Kind::Invalid, "expected " + std::string(name) + " element");
+        (child ? child : element).fail(Kind::kInvalid, "expected " + std::string(name) + " element");
     }
     return child;
 }
@@ -20,26 +20,26 @@ XmlElement lastAfter(const XmlElement& child)
 {
     const XmlElement last = child.nextSibling();
     if (!last) {
-        child.fail(Kind::Invalid, "missing element behind " + std::string(child.name()) + " element");
+        child.fail(Kind::kInvalid, "missing element behind " + std::string(child.name()) + " element");
     }
     if (const XmlElement more = last.nextSibling()) {
-        more.fail(Kind::Invalid, "unexpected " + std::string(more.name()) + " element");
+        more.fail(Kind::kInvalid, "unexpected " + std::string(more.name()) + " element");
     }
     return last;
 }
 
-CIMKeyBinding::Type keyType(const XmlElement& element, std::string_view valueType)
+CIMKeyBinding::Type keyType(const XmlElement& element, const XmlAttribute& valueType)
 {
-    if (valueType.data() == nullptr || valueType == "string") {
+    if (!valueType || *valueType == "string") {
         return CIMKeyBinding::STRING;
     }
-    if (valueType == "boolean") {
+    if (*valueType == "boolean") {
         return CIMKeyBinding::BOOLEAN;
     }
-    if (valueType == "numeric") {
+    if (*valueType == "numeric") {
         return CIMKeyBinding::NUMERIC;
     }
-    element.fail(Kind::Semantic, "Illegal value for KEYVALUE.VALUETYPE attribute");
+    element.fail(Kind::kSemantic, "Illegal value for KEYVALUE.VALUETYPE attribute");
 }
 
 } // namespace
@@ -47,7 +47,7 @@ CIMKeyBinding::Type keyType(const XmlElement& element, std::string_view valueTyp
 CIMName ElementDecoder::decodeClassName(const XmlElement& element)
 {
     element.expectName("CLASSNAME");
-    std::string_view values[1];
+    XmlAttribute values[1];
     element.attributes({"NAME"}, values);
     element.expectNoChildren();
     return nameAttribute(element, "NAME", values[0]);
@@ -55,7 +55,7 @@ CIMName ElementDecoder::decodeClassName(const XmlElement& element)
 
 CIMKeyBinding ElementDecoder::decodeKeyValue(const XmlElement& element, const CIMName& name)
 {
-    std::string_view values[2];
+    XmlAttribute values[2];
     element.attributes({"VALUETYPE", "TYPE"}, values);
     const CIMKeyBinding::Type type = keyType(element, values[0]);
     return CIMKeyBinding(name, toString(element, element.text(fScratch)), type);
@@ -63,7 +63,7 @@ CIMKeyBinding ElementDecoder::decodeKeyValue(const XmlElement& element, const CI
 
 CIMKeyBinding ElementDecoder::decodeKeyBinding(const XmlElement& element)
 {
-    std::string_view values[1];
+    XmlAttribute values[1];
     element.attributes({"NAME"}, values);
     const CIMName name = nameAttribute(element, "NAME", values[0]);
     const XmlElement child = element.onlyChild();
@@ -86,14 +86,14 @@ CIMObjectPath ElementDecoder::decodeNameIn(const XmlElement& element, const Stri
         return CIMObjectPath(host, nameSpace, decodeClassName(element));
     }
     element.expectName("INSTANCENAME");
-    std::string_view values[1];
+    XmlAttribute values[1];
     element.attributes({"CLASSNAME"}, values);
     const CIMName className = nameAttribute(element, "CLASSNAME", values[0]);
     Array<CIMKeyBinding> keys;
     XmlElement child = element.firstChild();
     for (; child.is("KEYBINDING"); child = child.nextSibling()) {
         if (keys.size() == fLimits.maxKeyBindings) {
-            child.fail(Kind::TooLarge, "more than " + std::to_string(fLimits.maxKeyBindings) + " key bindings");
+            child.fail(Kind::kTooLarge, "more than " + std::to_string(fLimits.maxKeyBindings) + " key bindings");
         }
         keys.append(decodeKeyBinding(child));
     }
@@ -105,7 +105,7 @@ CIMObjectPath ElementDecoder::decodeNameIn(const XmlElement& element, const Stri
         child = XmlElement();
     }
     if (child) {
-        child.fail(Kind::Invalid,
+        child.fail(Kind::kInvalid,
                    "Expected close of INSTANCENAME element, got " + std::string(child.name()) + " instead");
     }
     return CIMObjectPath(host, nameSpace, className, keys);
@@ -120,7 +120,7 @@ CIMNamespaceName ElementDecoder::decodeLocalNamespacePath(const XmlElement& elem
     for (; child; child = child.nextSibling()) {
         child.expectName("NAMESPACE");
         child.expectNoChildren();
-        std::string_view values[1];
+        XmlAttribute values[1];
         child.attributes({"NAME"}, values);
         text += (text.empty() ? "" : "/");
         base::appendUtf8(text, nameAttribute(child, "NAME", values[0]).getString());
@@ -139,7 +139,7 @@ CIMObjectPath ElementDecoder::decodeObjectPath(const XmlElement& element)
         return decodeNameIn(lastAfter(nameSpace), String(), decodeLocalNamespacePath(nameSpace));
     }
     if (!element.is("INSTANCEPATH") && !element.is("CLASSPATH")) {
-        element.fail(Kind::Invalid, "expected an object path, got " + std::string(element.name()) + " element");
+        element.fail(Kind::kInvalid, "expected an object path, got " + std::string(element.name()) + " element");
     }
     const XmlElement location = childOf(element, "NAMESPACEPATH");
     const XmlElement hostElement = childOf(location, "HOST");
@@ -148,7 +148,7 @@ CIMObjectPath ElementDecoder::decodeObjectPath(const XmlElement& element)
     try {
         return decodeNameIn(lastAfter(location), host, nameSpace);
     } catch (const MalformedObjectNameException&) {
-        hostElement.fail(Kind::Semantic, "Illegal value for HOST element");
+        hostElement.fail(Kind::kSemantic, "Illegal value for HOST element");
     }
 }
 
