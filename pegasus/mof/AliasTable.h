@@ -9,7 +9,7 @@
 
 namespace Pegasus::mof {
 
-// The instance (or class) paths for which the aliases of one compilation stand. Names match without regard to case.
+// The instance (or class) paths for which the aliases of one compilation stand. Names match in any case.
 class AliasTable
 {
   public:

@@ -37,7 +37,7 @@ class DefinitionHandler
     // Returns: false when the instance exists already; it stays as it is.
     virtual bool createInstance(const CIMInstance& newInstance) = 0;
 
-    // Reports what does not stop the compilation; `place` is "file:line:column".
+    // Reports a warning; `place` is "file:line:column".
     virtual void warn(const std::string& place, const std::string& text) = 0;
 };
 

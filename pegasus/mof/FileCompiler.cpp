@@ -68,7 +68,7 @@ void FileCompiler::run()
     }
 }
 
-// An exception of the handler carries no place; it becomes an error at the definition's subject.
+// An exception of the handler becomes an error at the definition's subject.
 void FileCompiler::compileDefinition()
 {
     try {

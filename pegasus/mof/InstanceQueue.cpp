@@ -15,7 +15,7 @@ void addReference(ParsedInstance& parsed, const CIMName& name, const CIMObjectPa
         CIMProperty(name, CIMValue(path), 0, declared.getReferenceClassName(), declared.getClassOrigin()));
 }
 
-// A path consists of keys only: references that are no keys may stay open while the alias gets its path.
+// A path consists of keys only: other references may stay open while the alias gets its path.
 bool hasOpenKey(const ParsedInstance& parsed)
 {
     Array<CIMName> keys;

@@ -9,7 +9,7 @@
 
 namespace Pegasus::mof {
 
-// Reports what does not stop the compilation.
+// Reports a warning: the compilation goes on.
 using WarningSink = std::function<void(const SourcePlace& place, const std::string& text)>;
 
 // Cuts a source text into tokens. Blanks and comments are dropped; adjacent string literals become one token.

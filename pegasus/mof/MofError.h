@@ -27,7 +27,7 @@ class MofError : public std::runtime_error
     const SourcePlace& place() const noexcept { return fPlace; }
     const std::string& cause() const noexcept { return fCause; }
 
-    // Adds definitions that follow the error in a file and were not compiled because of it.
+    // Adds definitions of a file that follow the error and were skipped because of it.
     void addSkipped(std::size_t definitionCount) noexcept { fSkippedCount += definitionCount; }
 
     // Returns: "file:line:column: error: cause", the line, a caret below the column, and how many definitions were
@@ -40,7 +40,7 @@ class MofError : public std::runtime_error
     std::size_t fSkippedCount = 0;
 };
 
-// A source file that could not be opened or, once open, not be read.
+// A source file failed to open or to be read.
 class FileError : public std::runtime_error
 {
   public:

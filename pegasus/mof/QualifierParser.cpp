@@ -99,7 +99,7 @@ CIMQualifierDecl QualifierParser::declarationOf(const Token& name)
     return declaration;
 }
 
-// Without a parameter a boolean qualifier is true, any other null (DSP0004, 7.6.3).
+// The parameter may be left out: a boolean qualifier is true then, any other null (DSP0004, 7.6.3).
 CIMValue QualifierParser::parseParameter(const CIMQualifierDecl& declaration)
 {
     const ValueType type{declaration.getType(), declaration.isArray(), declaration.getArraySize()};
@@ -166,7 +166,7 @@ CIMScope QualifierParser::parseScopes()
     return scopes;
 }
 
-// Parses the flavors after the colon of a use: words without commas.
+// Parses the flavors after the colon of a use: words side by side.
 CIMFlavor QualifierParser::parseUseFlavors(CIMFlavor flavor)
 {
     do {

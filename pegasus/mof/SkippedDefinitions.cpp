@@ -7,7 +7,7 @@ namespace Pegasus::mof {
 
 namespace {
 
-// Cuts a faulty text into tokens and leaves out the bytes that belong to none.
+// Cuts a faulty text into tokens and skips bytes that fit nowhere.
 class TolerantLexer
 {
   public:

@@ -92,7 +92,8 @@ template <typename T> T Converter::integer(const Literal& literal) const
     return static_cast<T>(isNegative ? Uint64(0) - magnitude : magnitude);
 }
 
-// from_chars and not strtod: MOF has a decimal point in every locale. "1." is not a number in MOF.
+// By from_chars: MOF has a decimal point in every locale, which strtod would read by the process's own. A digit must
+// follow the point.
 template <typename T> T Converter::real(const Literal& literal) const
 {
     if (literal.kind == Literal::Kind::kInteger) {

@@ -28,7 +28,7 @@ CIMValue embeddedValue(const CIMConstProperty& property);
 
 // Completes a stored class with what it inherits, as clients see it and in OpenPegasus's order:
 //
-// - Elements that the class does not override come first, in the superclass's order, marked propagated, with the
+// - Elements that the class leaves alone come first, in the superclass's order, marked propagated, with the
 //   superclass's qualifiers unchanged.
 // - Its own elements follow as declared. One that overrides an inherited element keeps that element's origin. Before
 // its

@@ -8,7 +8,7 @@ namespace Pegasus::repository {
 
 namespace {
 
-// EXCLUSIVE keeps the index of the write-ahead log in this process's memory: one file less, and no file lock per
+// EXCLUSIVE keeps the index of the write-ahead log in this process's memory: it saves a file, and a file lock per
 // statement. synchronous=OFF leaves writing to the disk to the kernel, which outlives the process.
 constexpr const char* kPragmas = "PRAGMA locking_mode=EXCLUSIVE;"
                                  "PRAGMA synchronous=OFF;"

@@ -44,7 +44,7 @@ std::string canonicalValue(const CIMKeyBinding& key)
 
 } // namespace
 
-// Each value follows its length, so that no value can look like a further key. CIMObjectPath keeps its keys sorted.
+// Each value follows its length, which keeps a value apart from a further key. CIMObjectPath keeps its keys sorted.
 std::string pathKey(const CIMObjectPath& path)
 {
     std::string text = nameKey(path.getClassName());

@@ -11,7 +11,7 @@
 // Maps, caches and tables look names and paths up by one text for all their spellings.
 namespace Pegasus::repository {
 
-// Returns: the key of a name, which has no case; empty for a null name.
+// Returns: the key of a name, in lower case; empty for a null name.
 inline std::string nameKey(const CIMName& name)
 {
     return base::foldCase(base::utf8(name));

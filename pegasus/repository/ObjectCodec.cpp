@@ -8,7 +8,7 @@ namespace Pegasus::repository {
 
 namespace {
 
-// An accepted object must stay readable, so the limits of the network do not apply here.
+// An accepted object must stay readable, whatever limits the network has.
 wire::XmlLimits storageLimits(std::size_t maxBytes)
 {
     wire::XmlLimits limits;

@@ -7,8 +7,8 @@ namespace Pegasus::repository {
 
 namespace {
 
-// A use may take away what its declaration allows (overriding, passing on), and never add it. Translatable is the
-// exception: it only describes the text.
+// A use may only take away what its declaration allows (overriding, passing on). Translatable is the exception, which
+// describes the text.
 CIMFlavor effectiveFlavor(const CIMFlavor& use, const CIMFlavor& declared)
 {
     const bool isOverridable = use.hasFlavor(CIMFlavor::OVERRIDABLE);

@@ -168,7 +168,7 @@ void Repository::deleteInstance(const CIMNamespaceName& nameSpace, const CIMObje
     fState->instances.remove(fState->namespaces.id(nameSpace), path);
 }
 
-// The lock is held for one batch at a time: a slow visitor must not stop the server.
+// The lock is held for one batch at a time: the server goes on during a slow visitor.
 void Repository::enumerateInstances(const CIMNamespaceName& nameSpace, const CIMName& className,
                                     const InstanceOptions& options, const InstanceVisitor& visit) const
 {

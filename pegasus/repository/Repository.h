@@ -23,7 +23,7 @@ struct ClassOptions
     CIMPropertyList propertyList = CIMPropertyList(); // null: all; names that the class lacks are ignored
 };
 
-// Which parts of a stored instance an answer has. Qualifiers of instances are not stored.
+// Which parts of a stored instance an answer has. Qualifiers of instances are dropped.
 struct InstanceOptions
 {
     bool deepInheritance = true; // false: subclass instances are cut down to the named class's properties
@@ -41,7 +41,7 @@ struct RepositoryLimits
     std::size_t cachedClassCount = 1024; // resolved classes held in memory; more are resolved again on demand
 };
 
-// Receives enumerated instances one by one. No lock of the repository is held, so the visitor may call it.
+// Receives enumerated instances one by one. The visitor may call the repository: its lock is free.
 // Returns: false to end the enumeration early.
 using InstanceVisitor = std::function<bool(const CIMInstance&)>;
 
@@ -54,7 +54,7 @@ using InstanceVisitor = std::function<bool(const CIMInstance&)>;
 // Classes are stored as they were created and resolved with what they inherit when they are read. A write that has
 // returned survives the death of the process; a power cut may lose it. A failed write changes nothing.
 //
-// Names compare without regard to case and are returned in the spelling of their creation. Enumerations are in order of
+// Names compare in any case and are returned in the spelling of their creation. Enumerations are in order of
 // creation.
 //
 // Throws: every operation throws CIMException. Its message is the cause alone (in the simple cases the name), without
@@ -83,8 +83,8 @@ class Repository
     // Throws: CIM_ERR_NOT_FOUND.
     CIMQualifierDecl getQualifier(const CIMNamespaceName& nameSpace, const CIMName& name) const;
     std::vector<CIMQualifierDecl> enumerateQualifiers(const CIMNamespaceName& nameSpace) const;
-    // Creates or replaces the declaration. An existing one of another type or array form stays as it is without an
-    // error, as in OpenPegasus.
+    // Creates or replaces the declaration. An existing one of another type or array form stays as it is, silently,
+    // as in OpenPegasus.
     void setQualifier(const CIMNamespaceName& nameSpace, const CIMConstQualifierDecl& declaration);
 
     // Throws: CIM_ERR_NOT_FOUND.

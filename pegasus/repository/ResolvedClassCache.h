@@ -12,7 +12,7 @@
 namespace Pegasus::repository {
 
 // Resolved classes, at most so many; the least recently used one is dropped first. Each keeps the encoded forms that
-// clients asked for. Nothing goes stale: a stored class never changes and is never removed.
+// clients asked for. Entries stay valid, since a stored class stays as it is.
 // Thread: one thread at a time.
 class ResolvedClassCache
 {
@@ -42,7 +42,7 @@ class ResolvedClassCache
     void forgetTexts();
 
     std::size_t fCapacity;
-    std::size_t fTextBytes = 0; // upper bound of what is kept: a dropped class's texts are not subtracted
+    std::size_t fTextBytes = 0; // upper bound of what is kept: texts of dropped classes are still in it
     std::list<Entry> fEntries;  // most recently used first
     std::unordered_map<std::string, std::list<Entry>::iterator> fByKey;
 };

@@ -21,7 +21,7 @@ struct InstanceRow
 };
 
 // The repository's tables: rows of names and encoded objects. Rules are one level up, in the stores. Names match
-// without regard to the case of ASCII letters; lists are in order of creation.
+// in any case of ASCII letters; lists are in order of creation.
 //
 // Throws: CIMException CIM_ERR_FAILED when the database fails.
 // Thread: one thread at a time.

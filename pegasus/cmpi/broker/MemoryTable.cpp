@@ -44,7 +44,7 @@ class alignas(std::max_align_t) MemoryBlock final : public Owned
     std::size_t fSize;
 };
 
-// A frame that a provider opened. The frame around it owns it, so that one that the provider never ends is freed too.
+// A frame that a provider opened. The frame around it owns it and frees it if the provider forgets.
 class MarkedFrame final : public Owned, public Frame
 {
 };
@@ -118,7 +118,7 @@ template <typename Object, typename Face> void freeObject(const CMPIBroker*, Fac
     releaseObject<Object, Face>(face);
 }
 
-// Empty: this broker makes no select expressions.
+// Empty: select expressions would have to come from this broker, which refuses them.
 void freeSelectExp(const CMPIBroker*, CMPISelectExp*) {}
 
 void freeChars(const CMPIBroker* broker, char* chars)

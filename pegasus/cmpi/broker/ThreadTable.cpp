@@ -56,7 +56,7 @@ int cancelThread(CMPIThread thread)
     return ::pthread_cancel(native(thread));
 }
 
-// Sleeps the whole time: a signal to the process does not shorten it.
+// Sleeps the whole time, across signals to the process.
 int threadSleep(CMPIUint32 milliseconds)
 {
     timespec left{static_cast<time_t>(milliseconds / 1000), static_cast<long>(milliseconds % 1000) * 1000000L};

@@ -13,8 +13,8 @@
 namespace Pegasus::cmpi {
 namespace {
 
-// The object of an upcall: its path without the namespace, and the namespace. A path without one is in the namespace of
-// the request that the provider serves, which the context carries.
+// The object of an upcall: namespace and local path. The namespace defaults to that of the request that the provider
+// serves, which the context carries.
 struct Target
 {
     Target(const CMPIContext* context, const CMPIObjectPath* target)
@@ -80,7 +80,7 @@ CMPIStatus detachThread(const CMPIBroker*, const CMPIContext* context)
     });
 }
 
-// Refused: only a provider that was asked to enable indications may deliver one, and this server asks none.
+// Refused: a provider may deliver indications once it was asked to enable them, and this server never asks.
 CMPIStatus deliverIndication(const CMPIBroker*, const CMPIContext*, const char*, const CMPIInstance*)
 {
     return makeStatus(CMPI_RC_ERR_FAILED, "indications are not enabled");

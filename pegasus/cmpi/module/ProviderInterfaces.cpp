@@ -113,8 +113,8 @@ CMPIrc ProviderInterfaces::cleanup(Provider& provider, bool terminating)
     return std::max(instance, method);
 }
 
-// Three steps, so that no lock of requests is held while providers clean up: close the door to new requests, clean up,
-// open it again. A provider that wants to stay for ever is not asked a second time.
+// Three steps: make new requests wait, clean up, let them go on. The requests' lock is held in the first and last only.
+// A provider that wants to stay for ever is asked once.
 ProviderModule::Cleanup ProviderInterfaces::cleanupWhenIdle()
 {
     {

@@ -19,7 +19,7 @@ class ProviderLibrary;
 class ProviderInterfaces
 {
   public:
-    // A request in progress: while one exists, no interface is ended.
+    // A request in progress: the interfaces stay as long as one exists.
     // Blocks: while the interfaces are being ended.
     class Use
     {
@@ -62,12 +62,12 @@ class ProviderInterfaces
 
     const ProviderLibrary& fLibrary;
     Broker& fBroker;
-    std::mutex fUseMutex; // guards the next three; never held while a provider runs
+    std::mutex fUseMutex; // guards the next three; released while a provider runs
     std::condition_variable fCleaned;
     unsigned fUses = 0;
     bool fIsCleaning = false;
     std::mutex fFactoryMutex; // one factory at a time: those of one provider may share what they make
-    std::mutex fMakeMutex; // guards the next two; not held while a factory runs, so that interfaces already made serve
+    std::mutex fMakeMutex; // guards the next two; released while a factory runs, so that interfaces already made serve
     std::map<std::string, Provider> fProviders;
     bool fNeverUnload = false;
 };

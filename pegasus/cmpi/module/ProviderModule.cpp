@@ -17,7 +17,7 @@
 namespace Pegasus::cmpi {
 namespace {
 
-// CMPI's own codes have no meaning for a client.
+// CMPI's own codes mean something to brokers and providers only.
 CIMStatusCode statusCodeOf(CMPIrc code)
 {
     const bool isCim =

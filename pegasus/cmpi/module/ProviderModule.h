@@ -11,7 +11,7 @@ namespace Pegasus::cmpi {
 // One vendor library and the providers in it, driven through CMPI.
 //
 // The constructor loads the library. A provider's instance or method interface is made at its first request and kept.
-// The paths of delivered instances, and delivered paths, carry class and keys, without host and namespace.
+// The paths of delivered instances, and delivered paths, consist of class and keys.
 //
 // Throws: CIMException with the provider's status code and text; CMPI's own codes become CIM_ERR_FAILED. Also
 //     CIM_ERR_FAILED: "ProviderLoadFailure: ..." when the library has no entry points for the provider, and

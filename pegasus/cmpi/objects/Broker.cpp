@@ -20,7 +20,7 @@ Broker& Broker::of(const CMPIBroker* broker)
     if (broker == nullptr || broker->hdl == nullptr) {
         throw CmpiError{CMPI_RC_ERR_INVALID_HANDLE, {}};
     }
-    // By the handle, not the address: some providers keep a copy of the structure.
+    // By the handle: some providers keep a copy of the structure.
     return *static_cast<Broker*>(const_cast<void*>(broker->hdl));
 }
 

@@ -35,7 +35,7 @@ class Broker final : public CMPIBroker
     SchemaCache& classes() { return fClasses; }
 
     // Logs a provider's mistake the first time only, since providers repeat theirs for every instance. The number of
-    // remembered warnings is bounded; beyond it, new mistakes are not logged.
+    // remembered warnings is bounded; beyond it, new mistakes stay unlogged.
     void warnOnce(const std::string& text);
 
     // Returns: the broker that a provider passed to one of the tables' functions.

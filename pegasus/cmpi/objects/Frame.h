@@ -9,7 +9,7 @@
 //   during the call (strings, paths, instances, memory blocks) enter the thread's current frame and are freed at its
 //   end, the newest first.
 // - The provider may release an object earlier; it leaves its frame then.
-// - A clone enters no frame: the provider frees it by release, at any time and on any thread.
+// - A clone stays outside of frames: the provider frees it by release, at any time and on any thread.
 // - The arguments of a call (context, path, result, args) live on the broker's stack. A provider's release of them does
 //   nothing.
 // - A provider that loops over many objects may open a frame of its own by mark() and end it by release().
@@ -34,19 +34,19 @@ class Owned
     Owned* fNext = nullptr;
 };
 
-// The objects that a thread made since the frame was opened; its end frees those that the provider has not released.
+// The objects that a thread made since the frame was opened; its end frees those that are left.
 //
 // Frames of one thread nest as the calls do: an upcall that reaches another provider on this thread opens its own.
-// A thread always has a frame: on a provider's own thread that did not attach, objects live until the thread ends.
+// A thread always has a frame: that of a provider's own, unattached thread lasts until the thread ends.
 //
-// Thread: a frame belongs to the thread that opened it. CMPI demands that providers do not share an object between
-//     threads except as a clone, so the ring needs no lock.
+// Thread: a frame belongs to the thread that opened it. CMPI demands that providers share objects between threads as
+//     clones only, which is why the ring needs no lock.
 class Frame
 {
   public:
     // Opens a frame, which becomes the current one.
     Frame();
-    // Frees the frame's objects, the newest first, and those of frames that were opened later and not closed.
+    // Frees the frame's objects, the newest first, and those of frames that were opened later and are still open.
     ~Frame();
     Frame(const Frame&) = delete;
     Frame& operator=(const Frame&) = delete;

@@ -38,7 +38,7 @@ class InstanceObject final : public Owned, public CMPIInstance
     // Throws: CMPI_RC_ERR_FAILED when the class differs.
     void setPath(const PathState& path);
 
-    // Returns: the instance for the wire: its path has no namespace, its properties are in the class's order.
+    // Returns: the instance for the wire: its path is local, its properties are in the class's order.
     CIMInstance filtered(const PropertyFilter& filter) const;
     // Returns: the same with all properties, for embedding.
     CIMInstance value() const;

@@ -108,7 +108,7 @@ CIMValue valueOfText(const String& text, CIMType type)
             return CIMValue(CIMObjectPath(text));
         }
     } catch (const Exception&) {
-        // the text does not fit the type: the null below
+        // the text is of another kind: the null below
     }
     return {type, false};
 }

@@ -8,7 +8,7 @@
 
 namespace Pegasus::cmpi {
 
-// An ordered list of named values, as contexts and arguments are. Names are found without regard to case.
+// An ordered list of named values, as contexts and arguments are. Names are found in any case.
 class NamedValues
 {
   public:

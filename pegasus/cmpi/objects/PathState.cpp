@@ -39,7 +39,7 @@ template <typename Number> bool parse(const std::string& text, std::size_t start
     return error == std::errc() && stop == end;
 }
 
-// The wire passes any text as a numeric key. One that is not a number stays text.
+// The wire passes any text as a numeric key; other texts than numbers stay text.
 CIMValue numberOf(const String& text)
 {
     const std::string digits = base::utf8(text);

@@ -17,7 +17,8 @@ struct PathState
     // A null or empty text leaves that part unset.
     // Throws: CMPI_RC_ERR_INVALID_PARAMETER for a text that is not a legal namespace or class name.
     PathState(Broker& broker, const char* nameSpace, const char* className);
-    // Keys take the types that the class declares; those that do not fit, or of an unknown class, keep their own.
+    // Keys take the types that the class declares; values that differ from it, and those of an unknown class, keep
+    // their own.
     PathState(Broker& broker, const CIMObjectPath& path);
 
     // Replaces the key of that name; a null value removes it.

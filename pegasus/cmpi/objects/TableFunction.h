@@ -16,7 +16,7 @@ namespace Pegasus::cmpi {
 struct CmpiError
 {
     CMPIrc code;
-    std::string text; // may be empty: the status then carries no message
+    std::string text; // may be empty: the status then consists of the code
 };
 
 // The version of CMPI that the tables follow.
@@ -97,7 +97,7 @@ template <typename Object, typename Face> CMPIStatus releaseObject(Face* face) n
     });
 }
 
-// The clone function of every kind of object: a copy that no frame holds.
+// The clone function of every kind of object: a copy outside of all frames.
 template <typename Object, typename Face> Face* cloneObject(const Face* face, CMPIStatus* rc) noexcept
 {
     return answer(rc, static_cast<Face*>(nullptr), [&]() -> Face* {

@@ -36,7 +36,7 @@ constexpr std::array kTypes{
     TypePair{CIMTYPE_STRING, CMPI_charsptr},
 };
 
-// The value's memory may end right after the type's own bytes, and need not be aligned for more.
+// The value's memory may end right after the type's own bytes, and may be aligned for that type only.
 template <typename T> T read(const CMPIValue* value)
 {
     T result;

@@ -21,7 +21,7 @@ namespace Pegasus::cmpi {
 // Thread: called on every thread that runs a provider, several at once, and again on another thread while an earlier
 //     call waits (a provider may enumerate its own class). An implementation therefore needs a pool of connections; one
 //     connection under a lock would deadlock.
-// Blocks: up to the implementation's own timeout. The broker holds no lock during the call.
+// Blocks: up to the implementation's own timeout. The broker's locks are free during the call.
 class BrokerServices
 {
   public:

@@ -12,8 +12,8 @@
 
 namespace Pegasus::cmpi {
 
-// The classes that providers have named so far. Each is asked for once, since the server never changes or removes a
-// class. An unknown class is remembered as such until the next request, because it may have been compiled meanwhile.
+// The classes that providers have named so far. Each is asked for once, since classes of the server stay as they
+// are. An unknown class is remembered as such until the next request, because it may have been compiled meanwhile.
 // Thread: all members may be called on any thread at any time.
 class SchemaCache
 {
@@ -40,8 +40,8 @@ class SchemaCache
     void logFailure(std::string_view nameSpace, std::string_view className, const Exception& error);
 
     BrokerServices& fServices;
-    std::shared_mutex fMutex;                        // guards the next two; never held during an upcall
-    std::unordered_map<std::string, Entry> fEntries; // by "namespace:class" in lower case; entries are never removed
+    std::shared_mutex fMutex;                        // guards the next two; released during an upcall
+    std::unordered_map<std::string, Entry> fEntries; // by "namespace:class" in lower case; entries stay
     std::uint64_t fRequest = 0;                      // number of the current request
 };
 
