@@ -101,6 +101,8 @@ CIMParameter ClassParser::parseParameter()
 }
 
 // Leaves out a second property of one name with a warning, as OpenPegasus's compiler does.
+// Members are looked up one by one, here and in CIMClass: a class of 300 takes milliseconds, one at the limit
+// memberCount about 5 s.
 void ClassParser::addProperty(CIMClass& owner, const CIMProperty& property, std::size_t offset)
 {
     if (owner.findProperty(property.getName()) == PEG_NOT_FOUND) {
