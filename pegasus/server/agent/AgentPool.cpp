@@ -79,7 +79,7 @@ CimStatus AgentPool::requestOnce(const std::string& module, const AgentRequest& 
     const std::shared_ptr<AgentProcess> process = acquire(module);
     const ScopeGuard releaser([&] { release(module); });
     try {
-        std::unique_ptr<AgentChannel> channel = process->takeChannel();
+        std::shared_ptr<AgentChannel> channel = process->takeChannel();
         CimStatus status = channel->request(request, sink, timeout);
         process->giveBack(std::move(channel));
         succeeded(module);
@@ -181,7 +181,7 @@ void AgentPool::shutDown() noexcept
 bool AgentPool::mayEnd(AgentProcess& process)
 {
     try {
-        std::unique_ptr<AgentChannel> channel = process.takeChannel();
+        std::shared_ptr<AgentChannel> channel = process.takeChannel();
         class : public ElementSink
         {
             void write(std::string_view) override {}

@@ -1,5 +1,6 @@
 #include "pegasus/server/agent/AgentProcess.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstring>
 #include <system_error>
@@ -139,20 +140,39 @@ void AgentProcess::watch()
     siginfo_t info = {};
     while (::waitid(P_PID, static_cast<id_t>(fPid), &info, WEXITED | WNOWAIT) != 0 && errno == EINTR) {
     }
+    ::kill(-fPid, SIGKILL); // what its provider started and left
     const std::lock_guard<std::mutex> lock(fMutex);
     while (::waitpid(fPid, &fStatus, 0) < 0 && errno == EINTR) {
     }
     fEnded = true;
     fIdle.clear();
+    for (const std::weak_ptr<AgentChannel>& entry : fInUse) {
+        if (const std::shared_ptr<AgentChannel> channel = entry.lock()) {
+            channel->shutDown(); // a child in a session of its own may hold the other end
+        }
+    }
     fChanged.notify_all();
 }
 
-std::unique_ptr<AgentChannel> AgentProcess::takeChannel()
+// Enters a channel among those in use.
+std::shared_ptr<AgentChannel> AgentProcess::inUse(std::shared_ptr<AgentChannel> channel)
+{
+    const std::lock_guard<std::mutex> lock(fMutex);
+    if (fEnded) {
+        throw AgentGone("the agent has ended");
+    }
+    const auto isGone = [](const std::weak_ptr<AgentChannel>& entry) { return entry.expired(); };
+    fInUse.erase(std::remove_if(fInUse.begin(), fInUse.end(), isGone), fInUse.end());
+    fInUse.push_back(channel);
+    return channel;
+}
+
+std::shared_ptr<AgentChannel> AgentProcess::takeChannel()
 {
     {
         const std::lock_guard<std::mutex> lock(fMutex);
-        if (!fIdle.empty()) {
-            std::unique_ptr<AgentChannel> channel = std::move(fIdle.back());
+        if (!fIdle.empty()) { // it is among those in use already
+            std::shared_ptr<AgentChannel> channel = std::move(fIdle.back());
             fIdle.pop_back();
             return channel;
         }
@@ -161,10 +181,10 @@ std::unique_ptr<AgentChannel> AgentProcess::takeChannel()
     if (!sendDescriptor(fControl.get(), pair.theirs.get())) {
         throw AgentGone("the agent takes no request");
     }
-    return std::make_unique<AgentChannel>(std::move(pair.ours));
+    return inUse(std::make_shared<AgentChannel>(std::move(pair.ours)));
 }
 
-void AgentProcess::giveBack(std::unique_ptr<AgentChannel> channel)
+void AgentProcess::giveBack(std::shared_ptr<AgentChannel> channel)
 {
     const std::lock_guard<std::mutex> lock(fMutex);
     if (!fEnded) {
@@ -185,7 +205,8 @@ void AgentProcess::kill() noexcept
 {
     const std::lock_guard<std::mutex> lock(fMutex);
     if (!fEnded) {
-        ::kill(fPid, SIGKILL);
+        ::kill(-fPid, SIGKILL);
+        ::kill(fPid, SIGKILL); // should it have left its group
     }
 }
 

@@ -35,11 +35,13 @@ class AgentProcess
     AgentProcess& operator=(const AgentProcess&) = delete;
 
     // Returns: an idle channel, or a new one. Throws: AgentGone; std::system_error without descriptors.
-    std::unique_ptr<AgentChannel> takeChannel();
-    void giveBack(std::unique_ptr<AgentChannel> channel);
+    // A request that waits on it fails when the process ends, also when children of the process keep its sockets open.
+    std::shared_ptr<AgentChannel> takeChannel();
+    void giveBack(std::shared_ptr<AgentChannel> channel);
 
     // Asks the agent to end: it sees the end of its control socket.
     void close() noexcept;
+    // Kills the process and its process group.
     void kill() noexcept;
     bool isRunning() const;
     // Returns: false if it still runs at the deadline.
@@ -52,6 +54,7 @@ class AgentProcess
 
   private:
     void watch();
+    std::shared_ptr<AgentChannel> inUse(std::shared_ptr<AgentChannel> channel);
 
     std::string fModule;
     base::Descriptor fControl;
@@ -60,7 +63,8 @@ class AgentProcess
     mutable std::condition_variable fChanged;
     bool fEnded = false;
     int fStatus = 0;
-    std::vector<std::unique_ptr<AgentChannel>> fIdle;
+    std::vector<std::shared_ptr<AgentChannel>> fIdle;
+    std::vector<std::weak_ptr<AgentChannel>> fInUse; // those that are gone are removed with the next one
     std::thread fWatcher;
 };
 

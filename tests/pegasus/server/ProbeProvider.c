@@ -243,6 +243,13 @@ static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, con
     if (strcasecmp(method, "Crash") == 0) {
         raise(SIGSEGV);
     }
+    if (strcasecmp(method, "ForkAndCrash") == 0) { /* the children keep the agent's descriptors */
+        if (fork() == 0 || (fork() == 0 && setsid() > 0)) {
+            sleep(20);
+            _exit(0);
+        }
+        raise(SIGSEGV);
+    }
     if (strcasecmp(method, "Exit") == 0) {
         _exit(3);
     }
