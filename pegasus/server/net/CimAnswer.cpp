@@ -22,6 +22,19 @@ std::string symbolicName(unsigned code)
                  : "Unrecognized CIM status code \"" + std::to_string(code) + "\"";
 }
 
+// A text that a vendor made too long would not fit into the trailer that its readers accept.
+void cutText(std::string& text)
+{
+    if (text.size() <= CimAnswer::kMaxStatusTextBytes) {
+        return;
+    }
+    std::size_t end = CimAnswer::kMaxStatusTextBytes;
+    while (end > 0 && (static_cast<unsigned char>(text[end]) & 0xC0) == 0x80) { // not within a character
+        --end;
+    }
+    text.resize(end);
+}
+
 } // namespace
 
 CimStatus makeStatus(CIMStatusCode code, const std::string& text)
@@ -98,8 +111,9 @@ void CimAnswer::finish()
     fStream.finish();
 }
 
-void CimAnswer::fail(const CimStatus& status, ErrorPlace place)
+void CimAnswer::fail(CimStatus status, ErrorPlace place)
 {
+    cutText(status.text);
     const bool inTrailer = fStream.isChunked() && place != ErrorPlace::kBody;
     const bool keeps = inTrailer && place == ErrorPlace::kAfterElements;
     if (!fStream.hasStarted() && !keeps) {

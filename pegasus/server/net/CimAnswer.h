@@ -29,6 +29,8 @@ class ElementSink
 class CimAnswer : public ElementSink
 {
   public:
+    static constexpr std::size_t kMaxStatusTextBytes = 4096;
+
     enum class Envelope
     {
         kMessage, // a whole CIM message
@@ -48,9 +50,9 @@ class CimAnswer : public ElementSink
         kAfterElements, // in the trailer; what was written stays
         kBody           // an ERROR element in the message, also when the client reads trailers
     };
-    // Ends the answer with an error. For a client that lacks trailers it is an ERROR element, in place of what was
-    // written.
-    void fail(const CimStatus& status, ErrorPlace place = ErrorPlace::kTrailer);
+    // Ends the answer with an error, whose text is cut at kMaxStatusTextBytes. For a client that lacks trailers it is
+    // an ERROR element, in place of what was written.
+    void fail(CimStatus status, ErrorPlace place = ErrorPlace::kTrailer);
 
   private:
     void open();

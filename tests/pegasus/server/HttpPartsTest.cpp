@@ -1,4 +1,5 @@
 // The HTTP layer without a server: bytes in, bytes out; what bounds them; what ends a connection.
+#include "pegasus/base/PercentCoding.h"
 #include "pegasus/server/agent/AgentChannel.h"
 #include "pegasus/server/net/Acceptor.h"
 #include "pegasus/server/net/AnswerStream.h"
@@ -166,6 +167,25 @@ TEST(AnswerStreamTest, keepsWhatNeedsALength)
                        answer.finish();
                    }),
               "1234567890");
+}
+
+// A vendor's error text of any length arrives, cut at a character: a longer trailer would lose the whole answer.
+TEST(CimAnswerTest, cutsALongErrorText)
+{
+    CimRequest request;
+    for (const std::size_t shift : {std::size_t(0), std::size_t(1)}) {
+        std::string text(shift, 'x');
+        for (int i = 0; i < 50'000; ++i) {
+            text += "\xc3\xa9";
+        }
+        const std::string bytes = sent({}, [&](AnswerStream& stream) {
+            CimAnswer(stream, request, CimAnswer::Envelope::kBare).fail({1, text});
+        });
+        const std::string field = "CIMStatusCodeDescription: ";
+        const std::size_t begin = bytes.find(field) + field.size();
+        const std::string arrived = base::percentDecoded(bytes.substr(begin, bytes.find("\r\n", begin) - begin));
+        EXPECT_EQ(arrived, text.substr(0, 4096 - shift));
+    }
 }
 
 // A peer that takes nothing must not hold the thread.
