@@ -73,7 +73,7 @@ std::string OneLine(const std::string& text)
     return joined;
 }
 
-std::optional<std::string> Apply(const TRule& rule, const std::string& line)
+std::optional<TLoss> Apply(const TRule& rule, const std::string& line)
 {
     if (!BeginsWith(line, rule.fBegin)) {
         return std::nullopt;
@@ -85,7 +85,7 @@ std::optional<std::string> Apply(const TRule& rule, const std::string& line)
         return std::nullopt;
     }
     const std::string cause = split < line.size() ? line.substr(split + middle.size()) : "";
-    return rule.fSubject + OneLine(line.substr(object, split - object)) + rule.fVerb + OneLine(cause);
+    return TLoss{rule.fSubject, OneLine(line.substr(object, split - object)), rule.fVerb + OneLine(cause)};
 }
 
 std::string Cause(const NKOLVRX20::TFailedProgram& program)
@@ -105,11 +105,11 @@ std::string LossOfCompilation(const NKOLVRX20::TFailedProgram& program)
 
 } // namespace
 
-std::optional<std::string> LossOfLine(const std::string& line)
+std::optional<TLoss> LossOfLine(const std::string& line)
 {
     for (const TRule& rule : kRules) {
-        if (auto sentence = Apply(rule, line)) {
-            return sentence;
+        if (auto loss = Apply(rule, line)) {
+            return loss;
         }
     }
     return std::nullopt;

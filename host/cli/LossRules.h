@@ -7,10 +7,19 @@
 
 namespace vrxhost {
 
-// Returns: the sentence for a log line by which the plug-in reports a loss, whatever its severity; nothing for others.
-std::optional<std::string> LossOfLine(const std::string& line);
+// What was lost, as a sentence in three pieces. Losses that differ in the object alone have one cause and share a
+// sentence.
+struct TLoss
+{
+    std::string fBegin;
+    std::string fObject; // empty when the loss stands alone
+    std::string fEnd;
+};
 
-// Returns: true for a line of severity 0 that is no loss of its own: a failed program's sentence tells it.
+// Returns: the loss that a log line of the plug-in reports, whatever its severity; nothing for other lines.
+std::optional<TLoss> LossOfLine(const std::string& line);
+
+// Returns: true for a line of severity 0 that only repeats what a failed program's sentence says.
 bool IsHarmless(const std::string& errorLine);
 
 // Returns: the sentence for a failed program; nothing when nothing was lost by it.

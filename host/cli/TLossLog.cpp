@@ -47,8 +47,8 @@ void TLossLog::Learn(EVRXLogSeverity severity, const std::string& text)
     }
     if (BeginsWith(text, kLoading)) {
         fLoadedFile = text.substr(sizeof kLoading - 1);
-    } else if (const auto sentence = LossOfLine(text)) {
-        Enter(*sentence);
+    } else if (const auto loss = LossOfLine(text)) {
+        Enter(*loss);
     } else if (severity != kError || IsHarmless(text)) {
         return;
     } else if (!BeginsWith(text, kDescription)) {
@@ -104,7 +104,7 @@ void TLossLog::StartOver()
     const std::lock_guard<std::mutex> lock(fMutex);
     fHeldBack.clear();
     fStartFailed = fNoServer = fForeignServer = false;
-    fSentences.clear();
+    fLosses.clear();
     fKnown.clear();
 }
 
@@ -143,14 +143,30 @@ bool TLossLog::HasForeignServer() const
 std::vector<std::string> TLossLog::GetSentences() const
 {
     const std::lock_guard<std::mutex> lock(fMutex);
-    return fSentences;
+    std::vector<std::string> sentences;
+    for (const TLoss& loss : fLosses) {
+        sentences.push_back(loss.fBegin + loss.fObject + loss.fEnd);
+    }
+    return sentences;
 }
 
 void TLossLog::Enter(const std::string& sentence)
 {
-    if (fKnown.insert(sentence).second) {
-        fSentences.push_back(sentence);
+    Enter(TLoss{sentence, "", ""});
+}
+
+void TLossLog::Enter(const TLoss& loss)
+{
+    if (!fKnown.insert(loss.fBegin + loss.fObject + loss.fEnd).second) {
+        return;
     }
+    for (TLoss& earlier : fLosses) {
+        if (!loss.fObject.empty() && earlier.fBegin == loss.fBegin && earlier.fEnd == loss.fEnd) {
+            earlier.fObject += ", " + loss.fObject;
+            return;
+        }
+    }
+    fLosses.push_back(loss);
 }
 
 } // namespace vrxhost

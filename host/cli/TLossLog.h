@@ -1,5 +1,7 @@
 #pragma once
 
+#include "host/cli/LossRules.h"
+
 #include <host/ILogger.h>
 
 #include <mutex>
@@ -10,7 +12,7 @@
 namespace vrxhost {
 
 // The host's core logger while vrxhost runs: passes every line on to the host's own logger, and learns from the
-// plug-in's lines what was lost. Each loss becomes one sentence, reported once. Thread: safe.
+// plug-in's lines what was lost. Each cause becomes one sentence, reported once. Thread: safe.
 class TLossLog : public NKOLVRX20::ILogger
 {
   public:
@@ -43,6 +45,7 @@ class TLossLog : public NKOLVRX20::ILogger
 
   private:
     void Enter(const std::string& sentence);
+    void Enter(const TLoss& loss);
     void Learn(EVRXLogSeverity severity, const std::string& text);
     void LearnFromPrograms();
     bool LearnFromAttempt(const std::string& text);
@@ -56,7 +59,7 @@ class TLossLog : public NKOLVRX20::ILogger
     bool fNoServer = false;
     bool fForeignServer = false;
     bool fFrozen = false;
-    std::vector<std::string> fSentences;
+    std::vector<TLoss> fLosses; // an object is a list of names
     std::set<std::string> fKnown;
 };
 

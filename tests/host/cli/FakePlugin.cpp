@@ -197,7 +197,10 @@ void LogLosses()
     Log(ILogger::kInfo, "Loading... /x/linux/a.classes.xml");
     Log(ILogger::kError, "Performance Data RDD Parser line 1:Unrecognized identifier:vrx");
     Log(ILogger::kError, "Performance Data RDD Parser line 3:syntax error");
-    Log(ILogger::kInfo, "TPEGASUSNamespace::GetClass from Pegasus for: CIM_Gone returned exception: CIM_ERR_NOT_FOUND");
+    for (const char* name : {"CIM_Gone", "CIM_Gone", "CIM_Lost"}) {
+        Log(ILogger::kInfo,
+            std::string("TPEGASUSNamespace::GetClass from Pegasus for: ") + name + " returned exception: not found");
+    }
     Log(ILogger::kInfo,
         "Catching exeption: AllocateClass  --- CIM_Odd  CIM_Base\twith reason: The value has the wrong type");
     std::string output;

@@ -162,7 +162,7 @@ TEST_F(VrxhostProgram, LossesAreLearntFromTheLogAndFromPrograms)
     EXPECT_TRUE(HasStatus(outcome, 3));
     const std::vector<std::string> expected = {
         "provider description /x/linux/a.classes.xml, line 3:syntax error",
-        "class CIM_Gone could not be fetched: CIM_ERR_NOT_FOUND",
+        "class CIM_Gone, CIM_Lost could not be fetched: not found",
         "class CIM_Odd  CIM_Base could not be built: The value has the wrong type",
         "MOF file /x/provider/linux/bad.mof of provider linux did not compile, cimmof: exit status 250: "
         "Parsing error: bad.mof:3"};
