@@ -16,12 +16,6 @@ bool IsNamePart(char character)
     return character == '_' || std::isalnum(static_cast<unsigned char>(character)) != 0;
 }
 
-bool IsLegalName(const std::string& name)
-{
-    const bool startsWithDigit = !name.empty() && std::isdigit(static_cast<unsigned char>(name.front())) != 0;
-    return !startsWithDigit && std::all_of(name.begin(), name.end(), IsNamePart);
-}
-
 } // namespace
 
 std::string LowerCase(std::string text)
@@ -32,10 +26,16 @@ std::string LowerCase(std::string text)
     return text;
 }
 
+bool IsCimName(const std::string& name)
+{
+    const bool startsWithDigit = !name.empty() && std::isdigit(static_cast<unsigned char>(name.front())) != 0;
+    return !startsWithDigit && std::all_of(name.begin(), name.end(), IsNamePart);
+}
+
 std::string NormalizedName(const std::string& name)
 {
     std::string normalized = LowerCase(name);
-    if (!IsLegalName(normalized)) {
+    if (!IsCimName(normalized)) {
         LogFailure("PEGASUS: CIM name '", name, "' is invalid");
         throw TVRXException(TVRXStatusCode::kInvalidName);
     }

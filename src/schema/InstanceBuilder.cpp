@@ -40,9 +40,14 @@ std::optional<std::string> ReferencedClassName(const std::string& path, const st
 }
 
 boost::shared_ptr<ICIMClass> ReferencedClass(const TPEGASUSClass& holder, const Pegasus::CIMInstance& source,
-                                             const std::string& property)
+                                             const std::string& property, const std::string& operation)
 {
     const auto name = ReferencedClassName(ToStdString(source.getPath().toString()), property);
+    if (name && !IsCimName(*name)) {
+        LogProgress("TPEGASUSClass::", operation, " keeps reference property ", property, " of ", holder.GetName({}),
+                    " without its class: \"", *name, "\" is not a class name");
+        return nullptr;
+    }
     return name ? holder.GetOwningNamespace().GetClass(*name, {{kNspKey, holder.GetPegasusNSPStr()}}) : nullptr;
 }
 
@@ -51,8 +56,8 @@ class TPropertyTransfer
 {
   public:
     TPropertyTransfer(TPEGASUSClass& instanceClass, const Pegasus::CIMInstance& source,
-                      const Pegasus::CIMConstProperty& property)
-        : fClass(instanceClass), fSource(source), fProperty(property),
+                      const Pegasus::CIMConstProperty& property, const std::string& operation)
+        : fClass(instanceClass), fSource(source), fProperty(property), fOperation(operation),
           fServerName(ToStdString(property.getName().getString()))
     {
     }
@@ -74,7 +79,7 @@ class TPropertyTransfer
     {
         TCIMValue value;
         const bool isReference = fProperty.getType() == Pegasus::CIMTYPE_REFERENCE;
-        const auto referenced = isReference ? ReferencedClass(fClass, fSource, fServerName) : nullptr;
+        const auto referenced = isReference ? ReferencedClass(fClass, fSource, fServerName, fOperation) : nullptr;
         if (!fProperty.getValue().isNull()) {
             pegValToVRX(fName, fProperty.getValue(), fProperty.getType(), fProperty.isArray(), value,
                         fClass.shared_from_this());
@@ -98,6 +103,7 @@ class TPropertyTransfer
     TPEGASUSClass& fClass;
     const Pegasus::CIMInstance& fSource;
     const Pegasus::CIMConstProperty& fProperty;
+    const std::string& fOperation; // the function's name, as the log has it
     const std::string fServerName;
     std::string fName;
 };
@@ -110,7 +116,7 @@ boost::shared_ptr<TPEGASUSInstance> BuildInstance(TPEGASUSClass& instanceClass, 
     auto target = boost::dynamic_pointer_cast<TPEGASUSInstance>(instanceClass.AllocateInstance({}));
     for (Pegasus::Uint32 i = 0; i < source.getPropertyCount(); ++i) {
         const Pegasus::CIMConstProperty property = source.getProperty(i);
-        TPropertyTransfer transfer(instanceClass, source, property);
+        TPropertyTransfer transfer(instanceClass, source, property, operation);
         try {
             transfer.To(*target);
         } catch (...) { // one property must not cost the others

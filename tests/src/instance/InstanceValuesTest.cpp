@@ -92,7 +92,7 @@ TEST_F(InstanceValuesTest, AReferenceKnowsItsClassWhenThePathSpellsItOut)
     }
 }
 
-TEST_F(InstanceValuesTest, AReferenceToAClassWithABadNameCostsOnlyItself)
+TEST_F(InstanceValuesTest, AReferenceToAClassWithABadNameKeepsItsValue)
 {
     const auto target = Serve("CIM_L", {});
     fServed.fModel.addFault("EnumerateInstances", [&](const test::PeerRequest& request) {
@@ -103,10 +103,15 @@ TEST_F(InstanceValuesTest, AReferenceToAClassWithABadNameCostsOnlyItself)
     });
     const auto instances = Enumerate(*target);
     ASSERT_EQ(1U, instances.size());
-    EXPECT_EQ(15U, StatusOf([&] { ValueOf(*instances[0], "Antecedent"); }));
+    const TCIMValue kept = ValueOf(*instances[0], "Antecedent");
+    EXPECT_EQ("CIM_Y.Key=\"1\"", static_cast<TCIMReference>(kept).GetPath());
+    EXPECT_FALSE(kept.GetReferencedClass());
     EXPECT_EQ(TCIMValue(true), ValueOf(*instances[0], "Other"));
     const std::string line = "3|4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: ";
-    EXPECT_THAT(fServed.fRig.fLog.LinesWith("3|4"), ElementsAre(line + "antecedent", line + "Gr\xC3\xB6n"));
+    EXPECT_THAT(fServed.fRig.fLog.LinesWith("3|4"), ElementsAre(line + "Gr\xC3\xB6n"));
+    EXPECT_THAT(fServed.fRig.fLog.LinesWith("3|TPEGASUSClass::EnumerateInstances keeps"),
+                ElementsAre("3|TPEGASUSClass::EnumerateInstances keeps reference property Antecedent of CIM_L without "
+                            "its class: \"1b\" is not a class name"));
 }
 
 } // namespace
