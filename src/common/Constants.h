@@ -8,6 +8,9 @@ namespace NKOLVRX20 {
 // The default time-out, in seconds.
 inline const std::string strTimeout = "60";
 
+// Milliseconds that a question for a class or a qualifier declaration may take, whatever timeout the client had before.
+inline constexpr unsigned int kGetClassTimeoutMs = 5000;
+
 // The one CIM namespace that the plug-in offers; also the server namespace of a class that names none.
 inline const std::string kDefaultCimNamespace = "root/cimv2";
 

@@ -178,7 +178,7 @@ class TPEGASUSNamespace : public ICIMNamespace,
     // Returns: the lower-cased name, the key of every map of named elements; an empty name stays empty.
     // Throws: TVRXException 25, after a log line, when it is no CIM name.
     static std::string NormalizeName(const std::string& name);
-    // Throws: TVRXException 16, after a log line, when a class of that name is there and redefinition is off.
+    // Throws, after a log line: TVRXException 16 when one of that name is there and redefinition is off, 14 for null.
     void AddClass(boost::shared_ptr<TPEGASUSClass> newClass);
     void AddQualifierDecl(boost::shared_ptr<TPEGASUSQualifierDecl> declaration);
     // Returns: this namespace's own declaration; null when it has none. Throws: TVRXException 25.

@@ -14,7 +14,6 @@ namespace NKOLVRX20 {
 
 namespace {
 
-constexpr Pegasus::Uint32 kGetClassTimeoutMs = 5000;
 // No real schema comes near; a server that names classes as each other's superclass would never end.
 constexpr unsigned int kMaxSuperClassDepth = 128;
 constexpr unsigned char kDecimal = 10;

@@ -13,18 +13,11 @@ namespace NKOLVRX20 {
 
 namespace {
 
-// Returns: the definition of that name that a new one takes the place of; null when the name is new.
-// Throws: TVRXException 25 for a bad name; 16, after a log line, when the name is taken and may not be replaced.
-template <typename TDefinition>
-boost::shared_ptr<TDefinition> FindReplaced(const TNamedMap<TDefinition>& definitions, const std::string& name,
-                                            bool mayReplace, const char* kind)
+// The line has severity 3; log readers rely on it.
+[[noreturn]] void RefuseSecondDefinition(const char* kind, const std::string& name)
 {
-    auto present = definitions.Find(name);
-    if (present && !mayReplace) {
-        LogProgress("TPEGASUSNamespace: ", kind, name, " already defined");
-        throw TVRXException(TVRXStatusCode::kAlreadyExists);
-    }
-    return present;
+    LogProgress("TPEGASUSNamespace: ", kind, " ", name, " already defined");
+    throw TVRXException(TVRXStatusCode::kAlreadyExists);
 }
 
 } // namespace
@@ -52,9 +45,24 @@ boost::shared_ptr<ICIMClass> TPEGASUSNamespace::AllocateClass(const std::string&
 
 void TPEGASUSNamespace::AddClass(boost::shared_ptr<TPEGASUSClass> newClass)
 {
+    if (!newClass) {
+        LogAndThrow(TVRXStatusCode::kTypeMismatch, "TPEGASUSNamespace::AddClass failed: null");
+    }
     const std::string name = newClass->GetName({});
-    if (const auto replaced = FindReplaced(fClasses, name, fAllowRedefinition, "class ")) {
-        newClass->SetChildClasses(replaced->GetChildClasses());
+    boost::shared_ptr<TPEGASUSClass> present;
+    try {
+        present = fClasses.Find(name);
+        if (present && !fAllowRedefinition) {
+            RefuseSecondDefinition("class", name);
+        }
+    } catch (const TVRXException&) {
+        if (present != newClass) {
+            newClass->LeaveSuperClass(); // or the tree would show a class that the cache does not have
+        }
+        throw;
+    }
+    if (present && present != newClass) {
+        newClass->TakePlaceOf(*present);
     }
     fClasses.Put(name, newClass);
 }
@@ -77,8 +85,13 @@ boost::shared_ptr<ICIMQualifierDecl> TPEGASUSNamespace::AllocateQualifierDecl(co
 
 void TPEGASUSNamespace::AddQualifierDecl(boost::shared_ptr<TPEGASUSQualifierDecl> declaration)
 {
+    if (!declaration) {
+        LogAndThrow(TVRXStatusCode::kTypeMismatch, "TPEGASUSNamespace::AddQualifierDecl failed: null");
+    }
     const std::string name = declaration->GetName({});
-    FindReplaced(fQualifierDecls, name, fAllowRedefinition, "qualifier ");
+    if (fQualifierDecls.Find(name) && !fAllowRedefinition) {
+        RefuseSecondDefinition("qualifier", name);
+    }
     fQualifierDecls.Put(name, declaration);
 }
 

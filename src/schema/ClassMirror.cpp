@@ -106,6 +106,9 @@ boost::shared_ptr<ICIMQualifierDecl> TClassMirror::FetchDeclaration(const Pegasu
         auto declaration = fNamespace.AllocateQualifierDecl(NameOf(source), defaultValue,
                                                             ScopeFromText(ToStdString(source.getScope().toString())),
                                                             FlavorFromText(ToStdString(source.getFlavor().toString())));
+        if (source.isArray() && source.getValue().isNull()) {
+            declaration->SetDefaultValue(TCIMValue(), {}); // the empty array has given the type; it is not the default
+        }
         fNamespace.AddQualifierDecl(boost::dynamic_pointer_cast<TPEGASUSQualifierDecl>(declaration));
         return declaration;
     } catch (...) {
@@ -130,16 +133,20 @@ TType TClassMirror::PropertyType(const Pegasus::CIMConstProperty& source, const 
 
 void TClassMirror::MirrorProperty(const Pegasus::CIMConstProperty& source, const std::string& name)
 {
-    const auto declaration = fTarget.AllocatePropertyDecl(name, TCIMValue(PropertyType(source, name), 0), {});
+    const TType type = PropertyType(source, name);
+    const auto declaration = fTarget.AllocatePropertyDecl(name, TCIMValue(type, 0), {});
     const TCIMValue defaultValue = ValueOf(source, name);
-    declaration->SetDefaultValue(defaultValue, {});
+    // Without a default the typed null stays. The host has none for arrays, and an empty array would be a value.
+    if (type.IsArray() || !defaultValue.IsNull()) {
+        declaration->SetDefaultValue(defaultValue, {});
+    }
     MirrorQualifiers(source, {*declaration, kPropertyFailure, name});
     if (declaration->GetQualifier(kOverrideQualifier, {})) {
         fTarget.AdoptPropertyDecl(name);
     }
     fTarget.AddPropertyDecl(declaration);
     if (!defaultValue.IsNull()) {
-        fTarget.EnterProperty(declaration, defaultValue);
+        fTarget.EnterProperty(declaration, defaultValue, source.getPropagated() != 0);
     }
 }
 

@@ -44,8 +44,7 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     // only takes its settings. An element that cannot be mirrored is logged and left out.
     // Requires: a time-out in decimal seconds. The superclass may be null.
     // Throws: TVRXException 42, after a log line, when the server does not give the class.
-    // Blocks: as long as the client's time-out for the class, and again for each qualifier that is new to the
-    // namespace.
+    // Blocks: up to 5 seconds for the class, and again for each qualifier that is new to the namespace.
     void Initialize(const std::string& cimNamespace, const std::string& timeout,
                     const boost::shared_ptr<TPEGASUSClass>& superClass);
 
@@ -65,12 +64,13 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     bool IsAbstract(TCIMContext context) const override;
     // Returns: true for the connected namespace's root class alone.
     bool IsRootClass(TCIMContext context) const override;
-    // Asks the server anew. Returns: null also when the namespace is not connected.
-    // Throws: TVRXException 42, after a log line, when the server does not answer; what GetClass throws.
+    // Asks the server at every call, then the namespace's cache, for a class of this one's own server namespace unless
+    // the context's "nsp" names another. Returns: null also for the root class, and when the namespace is not
+    // connected. Throws: TVRXException 42, after a log line, when the server does not answer; what GetClass throws.
     boost::shared_ptr<ICIMClass> GetSuperClass(TCIMContext context) const override;
     // A visitor's std::exception is logged and costs only its own child. Returning false ends the whole walk.
     void EnumerateSubClasses(TClassVisitor visitor, bool deep, TCIMContext context) const override;
-    // Compares names, case included. The root class is nobody's superclass here but its own.
+    // Compares names, case included. The root class counts as a superclass of itself only.
     bool IsSubclassOf(boost::shared_ptr<const ICIMClass> other, TCIMContext context) const override;
     // Visit nothing.
     void EnumerateAssociatedClasses(TClassVisitor visitor, const std::string& associationClass,
@@ -114,10 +114,11 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     // Does nothing.
     void SetCollected() override;
 
-    // Does nothing when a child of that name is there.
+    // Does nothing when a child of that name is there. Throws: TVRXException 14, after a log line, for null.
     void AddChildClass(boost::shared_ptr<ICIMClass> child) override;
     void RemoveChildClass(boost::shared_ptr<ICIMClass> child) override; // does nothing
-    // An instance of another class also has that class's instances cleared with this one's.
+    // While an instance of another class is here, that class's instances are cleared with this one's.
+    // Throws: TVRXException 14, after a log line, for null.
     void AddInstance(boost::shared_ptr<ICIMInstance> instance) override;
     void RemoveInstance(boost::shared_ptr<ICIMInstance> instance) override;
     void AddAssociationClass(boost::shared_ptr<ICIMClass> association) override;    // does nothing
@@ -168,7 +169,10 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     unsigned int GetDefaultTimeoutMs() const { return fDefaultTimeoutMs; }
 
     const std::vector<boost::shared_ptr<ICIMClass>>& GetChildClasses() const { return fChildClasses; }
-    void SetChildClasses(const std::vector<boost::shared_ptr<ICIMClass>>& children) { fChildClasses = children; }
+    // Takes the class out of its superclass's children, where Initialize entered it.
+    void LeaveSuperClass();
+    // Takes over the children of the class that this one replaces in the namespace, and its place below the superclass.
+    void TakePlaceOf(TPEGASUSClass& replaced);
     // Lets go of provider, children and instances, so that nothing keeps itself alive in a circle.
     void ReleaseLinks();
 
@@ -177,8 +181,8 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     // Puts the superclass's declaration of that name in place, if it has one, to be overridden.
     void AdoptPropertyDecl(const std::string& name);
     void EnterMethodDecl(const boost::shared_ptr<TPEGASUSMethodDecl>& declaration);
-    // Gives the class a property of its own with the value.
-    void EnterProperty(const boost::shared_ptr<ICIMPropertyDecl>& declaration, const TCIMValue& value);
+    // Gives the class a property of its own with the value; propagated when a superclass has declared it.
+    void EnterProperty(const boost::shared_ptr<ICIMPropertyDecl>& declaration, const TCIMValue& value, bool propagated);
 
   private:
     // The existing declaration, of the same name, may be null.

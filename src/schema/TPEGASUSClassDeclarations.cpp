@@ -153,10 +153,12 @@ void TPEGASUSClass::AdoptPropertyDecl(const std::string& name)
     }
 }
 
-void TPEGASUSClass::EnterProperty(const boost::shared_ptr<ICIMPropertyDecl>& declaration, const TCIMValue& value)
+void TPEGASUSClass::EnterProperty(const boost::shared_ptr<ICIMPropertyDecl>& declaration, const TCIMValue& value,
+                                  bool propagated)
 {
-    fProperties.Put(declaration->GetName({}),
-                    boost::make_shared<TPEGASUSProperty>(value, declaration, shared_from_this()));
+    const auto property = boost::make_shared<TPEGASUSProperty>(value, declaration, shared_from_this());
+    property->SetPropagated(propagated);
+    fProperties.Put(declaration->GetName({}), property);
 }
 
 void TPEGASUSClass::EnterMethodDecl(const boost::shared_ptr<TPEGASUSMethodDecl>& declaration)

@@ -24,19 +24,23 @@ bool TPEGASUSClass::IsRootClass(TCIMContext) const
 
 boost::shared_ptr<ICIMClass> TPEGASUSClass::GetSuperClass(TCIMContext context) const
 {
-    if (!fNamespace.IsConnected()) {
+    if (!fNamespace.IsConnected() || fName == kRootClassName) {
         return nullptr;
     }
     std::string superName;
     try {
+        Pegasus::CIMClient& client = fNamespace.ConnectedClient();
+        client.setTimeout(kGetClassTimeoutMs);
         const Pegasus::CIMClass answer =
-            fNamespace.ConnectedClient().getClass(fPegasusNsp, Pegasus::CIMName(fName.c_str()), true, true, false);
+            client.getClass(fPegasusNsp, Pegasus::CIMName(fName.c_str()), true, true, false);
         superName = ToStdString(answer.getSuperClassName().getString());
     } catch (const Pegasus::Exception& exception) {
         LogFailure("TPEGASUSClass::GetSuperClass from Pegasus for: ", fName,
                    " returned exception: ", ToStdString(exception.getMessage()));
         throw TVRXException(TVRXStatusCode::kServerConnectionFailed);
     }
+    // A class of the same name in another server namespace would be a stranger.
+    context.emplace(kNspKey, fPegasusNspText);
     return fNamespace.GetClass(superName, context);
 }
 
@@ -90,9 +94,35 @@ void TPEGASUSClass::EnumerateAssociationClasses(TClassVisitor, const std::string
 
 void TPEGASUSClass::AddChildClass(boost::shared_ptr<ICIMClass> child)
 {
+    if (!child) {
+        LogAndThrow(TVRXStatusCode::kTypeMismatch, "TPEGASUSClass::AddChildClass failed: ", fName, ": null");
+    }
     const auto hasName = [name = child->GetName({})](const auto& other) { return other->GetName({}) == name; };
     if (std::none_of(fChildClasses.begin(), fChildClasses.end(), hasName)) {
         fChildClasses.push_back(child);
+    }
+}
+
+void TPEGASUSClass::LeaveSuperClass()
+{
+    if (const auto superClass = fSuperClass.lock()) {
+        auto& siblings = superClass->fChildClasses;
+        const auto isThis = [this](const auto& sibling) { return sibling.get() == this; };
+        siblings.erase(std::remove_if(siblings.begin(), siblings.end(), isThis), siblings.end());
+    }
+}
+
+void TPEGASUSClass::TakePlaceOf(TPEGASUSClass& replaced)
+{
+    fChildClasses = replaced.fChildClasses;
+    for (const auto& child : fChildClasses) {
+        if (const auto own = boost::dynamic_pointer_cast<TPEGASUSClass>(child)) {
+            own->fSuperClass = shared_from_this(); // a weak link, which the replaced class would leave dangling
+        }
+    }
+    replaced.LeaveSuperClass();
+    if (const auto superClass = fSuperClass.lock()) {
+        superClass->AddChildClass(shared_from_this());
     }
 }
 

@@ -34,8 +34,9 @@ void TPEGASUSClass::Initialize(const std::string& cimNamespace, const std::strin
         if (fName == kRootClassName) {
             return;
         }
-        TClassMirror(*this).Mirror(
-            fNamespace.ConnectedClient().getClass(fPegasusNsp, Pegasus::CIMName(fName.c_str()), false, true, false));
+        Pegasus::CIMClient& client = fNamespace.ConnectedClient();
+        client.setTimeout(kGetClassTimeoutMs);
+        TClassMirror(*this).Mirror(client.getClass(fPegasusNsp, Pegasus::CIMName(fName.c_str()), false, true, false));
     } catch (const Pegasus::Exception& exception) {
         LogFailure("TPEGASUSClass::Initialize - Unable to retrieve class: ", fName,
                    "\tdetail: ", ToStdString(exception.getMessage()));

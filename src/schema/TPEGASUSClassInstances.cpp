@@ -7,6 +7,7 @@
 #include "src/schema/InstanceRetrieval.h"
 #include "src/schema/TPEGASUSClass.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace NKOLVRX20 {
@@ -100,6 +101,9 @@ boost::shared_ptr<ICIMInstance> TPEGASUSClass::GetInstanceWithNsp(const TCIMRefe
 
 void TPEGASUSClass::AddInstance(boost::shared_ptr<ICIMInstance> instance)
 {
+    if (!instance) {
+        LogAndThrow(TVRXStatusCode::kTypeMismatch, "TPEGASUSClass::AddInstance failed: ", fName, ": null");
+    }
     const auto owner = instance->GetClass({});
     if (owner && owner.get() != this) {
         fInstanceOwners.insert(owner);
@@ -112,6 +116,11 @@ void TPEGASUSClass::RemoveInstance(boost::shared_ptr<ICIMInstance> instance)
 {
     for (auto entry = fInstances.begin(); entry != fInstances.end();) {
         entry = entry->second == instance ? fInstances.erase(entry) : std::next(entry);
+    }
+    const auto owner = instance ? instance->GetClass({}) : nullptr;
+    const auto isOfOwner = [&owner](const auto& entry) { return entry.second->GetClass({}) == owner; };
+    if (std::none_of(fInstances.begin(), fInstances.end(), isOfOwner)) {
+        fInstanceOwners.erase(owner);
     }
 }
 

@@ -45,7 +45,7 @@ void TPEGASUSProperty::SetValue(TCIMValue value, TCIMContext)
 bool TPEGASUSProperty::GetPropagated(TCIMContext context) const
 {
     const auto declaration = fDeclaration.lock();
-    return declaration && declaration->GetClass(context) != fOwner.lock();
+    return fPropagated || (declaration && declaration->GetClass(context) != fOwner.lock());
 }
 
 boost::shared_ptr<ICIMPropertyDecl> TPEGASUSProperty::GetDeclaration(TCIMContext) const

@@ -24,7 +24,7 @@ class TPEGASUSProperty : public ICIMProperty
     bool IsDefaultValue(TCIMContext context) const override;
     TCIMValue GetValue(TCIMContext context) const override;
     void SetValue(TCIMValue value, TCIMContext context) override;
-    // Returns: whether another class declares it.
+    // Returns: whether the server says so, or another class declares it.
     bool GetPropagated(TCIMContext context) const override;
     boost::shared_ptr<ICIMPropertyDecl> GetDeclaration(TCIMContext context) const override;
     // By value.
@@ -40,11 +40,14 @@ class TPEGASUSProperty : public ICIMProperty
     std::string PrevValueToString() const override;
     std::vector<std::string> ToStringVector() const override;
 
+    void SetPropagated(bool propagated) { fPropagated = propagated; }
+
   private:
     TCIMValue fValue;
     TCIMValue fPrevValue;
     boost::weak_ptr<ICIMPropertyDecl> fDeclaration;
     boost::weak_ptr<ICIMClass> fOwner;
+    bool fPropagated = false;
 };
 
 } // namespace NKOLVRX20

@@ -292,12 +292,16 @@ TEST_F(SchemaCacheTest, RedefinitionIsRefusedUnlessAllowedAndThenKeepsTheChildre
     fRig.fLog.Take();
     EXPECT_EQ(16U, StatusOf([&] { fNamespace->AddClass(second); }));
     EXPECT_THAT(fRig.fLog.Take(), ElementsAre("3|TPEGASUSNamespace: class a already defined"));
+    EXPECT_EQ(16U, StatusOf([&] { fNamespace->AddClass(first); })); // stays where it is
     EXPECT_EQ(first, fNamespace->GetClass("A", {}));
+    EXPECT_THAT(fNamespace->GetRootClass()->GetChildClasses(), ElementsAre(first));
 
     fNamespace->SetAllowRedefinition(true);
     fNamespace->AddClass(second);
     EXPECT_EQ(second, fNamespace->GetClass("A", {}));
     EXPECT_THAT(second->GetChildClasses(), ElementsAre(child));
+    EXPECT_THAT(fNamespace->GetRootClass()->GetChildClasses(), ElementsAre(second));
+    EXPECT_TRUE(child->IsSubclassOf(second, {}));
 }
 
 TEST_F(SchemaCacheTest, KeepsQualifierDeclarationsUnderTheirNormalisedNames)

@@ -41,6 +41,9 @@ TEST_F(ClassMirrorTest, TakesOverEveryDeclaration)
     source.addProperty(Property("Id", CIMValue(Pegasus::String("")), "Key"));
     source.addProperty(Property("Sizes", CIMValue(Pegasus::CIMTYPE_UINT64, true)));
     source.addProperty(Property("Count", CIMValue(Pegasus::Uint16(7))));
+    source.addProperty(Property("Unset", CIMValue(Pegasus::CIMTYPE_UINT16, false)));
+    source.addProperty(Pegasus::CIMProperty(CIMName("Inherited"), CIMValue(Pegasus::Uint16(1)), 0, CIMName(),
+                                            CIMName("CIM_Base"), true));
     Pegasus::CIMMethod method(CIMName("Format"), Pegasus::CIMTYPE_UINT32);
     Pegasus::CIMParameter parameter(CIMName("Label"), Pegasus::CIMTYPE_STRING, true);
     parameter.addQualifier(TrueQualifier("In"));
@@ -66,6 +69,10 @@ TEST_F(ClassMirrorTest, TakesOverEveryDeclaration)
     EXPECT_TRUE(sizes->GetDefaultValue({}).IsNull());
     EXPECT_EQ(mirrored, sizes->GetClass({}));
     EXPECT_EQ(TCIMValue(static_cast<unsigned short>(7)), mirrored->GetProperty("count", {})->GetValue({}));
+    EXPECT_EQ(TCIMValue(TType::kUint16, 0), mirrored->GetPropertyDecl("Unset", {})->GetDefaultValue({}));
+    EXPECT_EQ(TType::kUint16, mirrored->GetPropertyDecl("Unset", {})->GetDefaultValue({}).GetType());
+    EXPECT_FALSE(mirrored->GetProperty("count", {})->GetPropagated({}));
+    EXPECT_TRUE(mirrored->GetProperty("Inherited", {})->GetPropagated({}));
     EXPECT_EQ(15U, StatusOf([&] { mirrored->GetProperty("Sizes", {}); }));
     const auto format = mirrored->GetMethodDecl("FORMAT", {});
     ASSERT_TRUE(format);

@@ -106,7 +106,6 @@ TEST_F(ClassObjectTest, AddPropertyDeclTakesEveryBranch)
             EXPECT_EQ(second, target->GetPropertyDecl(row.fProperty, {}));
         }
     }
-    EXPECT_EQ(14U, StatusOf([&] { base->AddPropertyDecl(nullptr); }));
 }
 
 TEST_F(ClassObjectTest, OnlyTheCollectionTimeMayBeMissing)
@@ -228,6 +227,7 @@ TEST_F(ClassObjectTest, TheSuperclassIsAskedForAnewAndComesFromTheCache)
     fServed.TakeRequests();
     EXPECT_EQ(base, derived->GetSuperClass({}));
     EXPECT_FALSE(base->GetSuperClass({}));
+    EXPECT_FALSE(fServed.fNamespace->GetRootClass()->GetSuperClass({}));
     EXPECT_THAT(fServed.TakeRequests(), ElementsAre("GetClass A1", "GetClass A"));
     fServed.Log();
     fServed.fModel.addFault("GetClass", [](const test::PeerRequest& request) {
@@ -239,6 +239,26 @@ TEST_F(ClassObjectTest, TheSuperclassIsAskedForAnewAndComesFromTheCache)
     const auto unconnected = fServed.fRig.MakeNamespace();
     EXPECT_FALSE(boost::make_shared<TPEGASUSClass>(unconnected, "A1", nullptr)->GetSuperClass({}));
     EXPECT_FALSE(boost::make_shared<TPEGASUSClass>(unconnected, "<root>", nullptr)->IsRootClass({}));
+}
+
+TEST_F(ClassObjectTest, AClassAsksInItsOwnServerNamespaceAndWithItsOwnTimeout)
+{
+    for (const char* ns : {kNsp, "root/vendor"}) {
+        fServed.fModel.addClass(ns, Pegasus::CIMClass(CIMName("V")))
+            .addClass(ns, Pegasus::CIMClass(CIMName("V1"), CIMName("V")));
+    }
+    Pegasus::CIMClient& client = *fServed.fNamespace->getPegClient();
+    TCIMContext context;
+    client.setTimeout(301000); // what a slow class before has left
+    const auto derived = fServed.fNamespace->AllocateClass("V1", "root/vendor", "60", nullptr, context);
+    EXPECT_EQ(5000U, fServed.TimeoutMs());
+    client.setTimeout(301000);
+    const auto base = boost::dynamic_pointer_cast<TPEGASUSClass>(derived->GetSuperClass({}));
+    ASSERT_TRUE(base);
+    EXPECT_EQ("root/vendor", base->GetPegasusNSPStr());
+    client.setTimeout(301000);
+    EXPECT_EQ(base, derived->GetSuperClass({{"nsp", kNsp}})); // from the cache
+    EXPECT_EQ(5000U, fServed.TimeoutMs());
 }
 
 TEST_F(ClassObjectTest, ClearingReachesTheWholeSubtreeAndForeignOwners)
@@ -257,6 +277,13 @@ TEST_F(ClassObjectTest, ClearingReachesTheWholeSubtreeAndForeignOwners)
     removed->AddToNamespace({});
     other->RemoveInstance(removed);
     EXPECT_EQ(1, removed.use_count());
+    const auto lone = Add("C");
+    const auto ofOther = addTo(other, other);
+    const auto guest = other->AllocateInstance({});
+    lone->AddInstance(guest);
+    lone->RemoveInstance(guest);
+    lone->ClearInstances();
+    EXPECT_FALSE(ofOther.expired());
     for (const auto& instance : kept) {
         EXPECT_FALSE(instance.expired());
     }
@@ -307,10 +334,28 @@ TEST_F(ClassObjectTest, WhatIsNotServedDoesNothingOrSaysSo)
     EXPECT_EQ(&same, &(same = *child));
     EXPECT_EQ("A", target->GetName({}));
     bool found = false;
+    fServed.Log();
     EXPECT_EQ(1U, StatusOf([&] { target->GetQualifier("Key", found, {}); }));
     EXPECT_EQ(31U, StatusOf([&] { target->SetPropertyValue("P", 1, {}); }));
     EXPECT_EQ(31U, StatusOf([&] { target->ModifyClass(child, {}); }));
     EXPECT_EQ(31U, StatusOf([&] { target->RemoveFromNamespace({}); }));
+    EXPECT_EQ(14U, StatusOf([&] { target->AddPropertyDecl(nullptr); }));
+    EXPECT_EQ(14U, StatusOf([&] { target->AddChildClass(nullptr); }));
+    EXPECT_EQ(14U, StatusOf([&] { target->AddInstance(nullptr); }));
+    EXPECT_EQ(14U, StatusOf([&] { target->AddQualifier(nullptr, {}); }));
+    EXPECT_EQ(14U, StatusOf([&] { fServed.fNamespace->AddClass(nullptr); }));
+    EXPECT_EQ(14U, StatusOf([&] { fServed.fNamespace->AddQualifierDecl(nullptr); }));
+    EXPECT_THAT(fServed.Log(),
+                ElementsAre("0|TPEGASUSClass::GetQualifier failed: Key of A: not supported with a found flag",
+                            "0|TPEGASUSClass::SetPropertyValue failed: A.P: not supported",
+                            "0|TPEGASUSClass::ModifyClass failed: A: not supported",
+                            "0|TPEGASUSClass::RemoveFromNamespace failed: A: not supported",
+                            "0|TPEGASUSClass::AddPropertyDecl failed: A: null, or not a declaration of this plug-in",
+                            "0|TPEGASUSClass::AddChildClass failed: A: null",
+                            "0|TPEGASUSClass::AddInstance failed: A: null",
+                            "0|TQualifiedElement::AddQualifier failed: A: null, or not a qualifier of this plug-in",
+                            "0|TPEGASUSNamespace::AddClass failed: null",
+                            "0|TPEGASUSNamespace::AddQualifierDecl failed: null"));
 }
 
 } // namespace
