@@ -1,7 +1,8 @@
-// What went wrong, as text: what an exception says, and how the user hears of it.
+// What went wrong, as text: what an exception says, what an unknown name may have meant, and how the user hears of it.
 #pragma once
 
 #include <string>
+#include <vector>
 
 namespace vrxhost {
 
@@ -23,5 +24,9 @@ template <typename Call> std::string ErrorOf(const Call& call)
         return DescribeCurrentException();
     }
 }
+
+// For the end of a sentence about an unknown name.
+// Returns: "; did you mean NAME?" with the most similar of the names, case ignored; empty when none is similar.
+std::string Suggestion(const std::string& unknown, const std::vector<std::string>& names);
 
 } // namespace vrxhost

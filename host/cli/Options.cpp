@@ -1,6 +1,6 @@
 #include "host/cli/Options.h"
 
-#include "host/cli/UsageError.h"
+#include "host/cli/ErrorReport.h"
 
 #include <CLI/CLI.hpp>
 
@@ -14,7 +14,7 @@ namespace fs = std::filesystem;
 
 constexpr char kFooter[] =
     "Everything runs in the root directory, a deployed tree: the program's own folder unless --root names another.\n"
-    "Standard output carries the document alone; what was lost is said on standard error.\n"
+    "Standard output carries the document alone; standard error reports what was lost.\n"
     "Exit status: 0 complete, 1 failed, 2 wrong usage, 3 partial (something was lost), 130 interrupted.";
 
 // Never the working directory, which may be anybody's.

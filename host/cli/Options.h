@@ -2,6 +2,7 @@
 
 #include "host/cli/TDeployedTree.h"
 
+#include <stdexcept>
 #include <string>
 #include <utility>
 #include <vector>
@@ -20,6 +21,13 @@ enum class EFormat
 {
     kTable,
     kJson
+};
+
+// What is wrong with the command line, as a sentence.
+class TUsageError : public std::runtime_error
+{
+  public:
+    using std::runtime_error::runtime_error;
 };
 
 // What vrxhost ends with; docs and tests name these.

@@ -79,7 +79,7 @@ TPluginLibrary::TEntryPoint TPluginLibrary::Symbol(const char* name) const
 {
     void* const symbol = ::dlsym(fHandle, name);
     if (!symbol) {
-        throw TPluginError(fPath + " is no namespace-provider plug-in: it has no symbol " + name);
+        throw TPluginError(fPath + " is not a namespace-provider plug-in: it lacks the symbol " + name);
     }
     return reinterpret_cast<TEntryPoint>(symbol);
 }

@@ -19,7 +19,7 @@ class TPrivateRoot
     // Returns: the root to work in; the tree's own when no private one is needed.
     const std::string& GetPath() const { return fPath; }
 
-    // Lays the tree's links anew, so that they follow its updates; files that the user put beside them stay. Does
+    // Replaces the links, so that they follow the tree's updates; files that the user put beside them stay. Does
     // nothing for the tree's own root. Requires: nobody else works in the root. Throws: TTreeError when the directory
     // holds something that was not laid here.
     void Lay() const;

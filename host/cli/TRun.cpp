@@ -2,7 +2,6 @@
 
 #include "host/cli/ErrorReport.h"
 #include "host/cli/TCollector.h"
-#include "host/cli/UsageError.h"
 #include "host/core/TProcessControl.h"
 
 #include <host/TConfig.h>

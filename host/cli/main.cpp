@@ -7,7 +7,6 @@
 #include "host/cli/TPluginLibrary.h"
 #include "host/cli/TPrivateRoot.h"
 #include "host/cli/TRun.h"
-#include "host/cli/UsageError.h"
 #include "host/core/TCoreLogger.h"
 #include "host/core/TUniqueFd.h"
 

@@ -146,7 +146,7 @@ TEST_F(Root, LinkThroughAFolderOfOthersIsRefused)
     ExpectRefusal(Command({"inventory"}), open.string());
 }
 
-TEST_F(Root, LogIsTheUsersAloneAndNeverBehindALink)
+TEST_F(Root, LogIsTheUsersAloneAndFollowsNoLink)
 {
     const fs::path target = fFolder / "target";
     std::ofstream(target) << "precious";

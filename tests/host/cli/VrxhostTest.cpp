@@ -184,7 +184,7 @@ TEST_F(VrxhostProgram, MissingOrForeignPluginFails)
     command[4] = PLUGIN_WITHOUT_ENTRY_POINTS;
     outcome = Start(command);
     EXPECT_TRUE(HasStatus(outcome, 1));
-    EXPECT_THAT(outcome.fErrorOutput, HasSubstr("is no namespace-provider plug-in"));
+    EXPECT_THAT(outcome.fErrorOutput, HasSubstr("is not a namespace-provider plug-in"));
 }
 
 struct TUsageRow

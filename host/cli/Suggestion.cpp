@@ -1,9 +1,11 @@
-#include "host/cli/UsageError.h"
+// Which known name an unknown one may have meant.
+#include "host/cli/ErrorReport.h"
 
 #include <algorithm>
 #include <cctype>
 #include <numeric>
 #include <utility>
+#include <vector>
 
 namespace vrxhost {
 namespace {
