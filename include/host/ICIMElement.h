@@ -2,7 +2,8 @@
 
 namespace NKOLVRX20 {
 
-// The root of everything that a namespace holds.
+// The common base of classes and instances: everything that a namespace holds. Its only operation is the destructor; a
+// host uses it for lists of both, and dynamic_cast to find out which one it has.
 class ICIMElement
 {
   public:

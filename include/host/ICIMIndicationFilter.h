@@ -2,7 +2,8 @@
 
 namespace NKOLVRX20 {
 
-// A filter for indications. No namespace provider in this project serves indications.
+// A filter for indications, the argument of ICIMNamespace::Subscribe.
+// Here: indications are unsupported, so a filter needs only its destructor.
 class ICIMIndicationFilter
 {
   public:

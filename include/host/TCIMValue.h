@@ -14,12 +14,19 @@ namespace NKOLVRX20 {
 
 // The host's variant: one CIM value, scalar or array, possibly null.
 //
-// A default-constructed value is null and has no type. Copies are cheap and independent.
+// A default-constructed value is an untyped null. Copies are cheap and independent. The C++ type of a value decides its
+// CIM type, so that a context entry needs the exact one: TCIMValue(7) is a kSint32, and TCIMValue(static_cast<signed
+// char>(7)) the kSint8 that "pluginType" wants. An implementer of this class keeps the type codes, which a plug-in
+// computes with (Pegasus code plus 1, arrays plus 17), and the text form of references and datetimes: a plug-in hands
+// that text to the CIM client library.
+// Ownership: a value owns its text and elements; it refers to a namespace (in a reference) and to a referenced class
+// weakly.
 // Thread: distinct values may be used by distinct threads, also when one was copied from the other.
 class TCIMValue
 {
   public:
-    // A type code: DMTF's intrinsic types in order from 1, an array is the element's code plus 16.
+    // A type code: DMTF's intrinsic types in order from 1; the code of an array is the element's code plus 16.
+    // Declarations give array codes (ICIMPropertyDecl::GetType); a value gives its element's code and IsArray.
     class TCIMType
     {
       public:
@@ -41,7 +48,7 @@ class TCIMValue
             kString = 13,
             kDatetime = 14,
             kReference = 15,
-            kArrayOffset = 16, // also the array of no type
+            kArrayOffset = 16, // also the array of kNone
             kBooleanArray = 17,
             kUint8Array = 18,
             kSint8Array = 19,
@@ -63,15 +70,16 @@ class TCIMValue
         operator ECIMType() const noexcept { return fCode; }
 
         bool IsArray() const noexcept { return fCode >= kArrayOffset; }
-        // Returns: the scalar code; itself for a scalar.
+        // Returns: the element's code; the code itself for a scalar.
         TCIMType GetElementType() const noexcept { return IsArray() ? ECIMType(fCode - kArrayOffset) : fCode; }
-        // Returns: the DMTF name ("uint32"), without any array mark; "none" for no type. Static lifetime.
+        // Returns: the DMTF name of the element ("uint32"); "none" for kNone. Static lifetime.
         const char* GetName() const noexcept;
 
       private:
         ECIMType fCode;
     };
 
+    // One constructor a C++ type, implicit by design. unsigned long and long are the 64-bit types.
     TCIMValue();
     TCIMValue(bool value);
     TCIMValue(unsigned char value);
@@ -85,17 +93,18 @@ class TCIMValue
     TCIMValue(float value);
     TCIMValue(double value);
     TCIMValue(const std::string& value);
-    TCIMValue(const char* value); // a string; without it a literal would become a boolean
+    TCIMValue(const char* value); // a string; a literal would become a boolean otherwise
     TCIMValue(const TCIMChar16& value);
     TCIMValue(const TCIMDateTime& value);
     TCIMValue(const TCIMReference& value);
 
-    // A typed null (scalar code) or an empty array (code 17-31). The count is reserved; pass 0.
+    // A typed null (scalar code), or an empty array (code 17 to 31), whose IsNull is false. The count is reserved; pass
+    // 0.
     // Throws: TVRXException 14 for a code above 31.
     TCIMValue(TCIMType type, unsigned int count);
 
-    // An array. The type is the element's scalar code (1-15); the count is reserved; pass 0.
-    // Throws: TVRXException 14 when the code is no element code or an element is of another type.
+    // An array. The type is the element's scalar code (1 to 15); the count is reserved; pass 0.
+    // Throws: TVRXException 14 when the code is not an element code or an element is of another type.
     TCIMValue(TCIMType elementType, unsigned int count, const std::vector<TCIMValue>& elements);
 
     TCIMValue(const TCIMValue& other);
@@ -104,8 +113,8 @@ class TCIMValue
     TCIMValue& operator=(TCIMValue&& other) noexcept;
     ~TCIMValue();
 
-    // Numbers, booleans and char16 convert among each other as C++ does (integers wrap, reals truncate and
-    // saturate). Throws: TVRXException 14 for a null, an array, or a kind that does not convert.
+    // Numbers, booleans and char16 convert among each other as C++ does (integers wrap, reals truncate and saturate).
+    // Throws: TVRXException 14 for a null, an array, or a kind that does not convert.
     operator bool() const;
     operator unsigned char() const;
     operator signed char() const;
@@ -124,7 +133,9 @@ class TCIMValue
     operator TCIMDateTime() const;
     operator TCIMReference() const;
 
-    // The elements. Throws: TVRXException 14 unless the value is an array.
+    // The elements, by reference: valid until the value is changed or destroyed. A change through the second form
+    // leaves copies as they are.
+    // Throws: TVRXException 14 unless the value is an array.
     operator const std::vector<TCIMValue>&() const;
     operator std::vector<TCIMValue>&();
 
@@ -133,19 +144,21 @@ class TCIMValue
     bool IsArray() const;
     bool IsNull() const;
 
-    // Reads the text as the value's own type (a value without type becomes a string) and makes it not null. Integers
+    // Reads the text as the value's own type (an untyped null becomes a string); the value is then set. Integers
     // and char16 codes are decimal; an array takes the empty text alone and becomes empty.
-    // Throws: TVRXException 14 when the text is no such value; the value is then unchanged.
+    // Throws: TVRXException 14 when the text does not name such a value; the value is then unchanged.
     void Set(const std::string& text);
 
     // Returns: integers in the radix (2 to 36); reals in %g form with just the digits that tell them apart; booleans
     // "true"/"false"; char16 its code in the radix; datetime its 25 characters; reference its path text; arrays their
-    // elements joined by ", "; null the empty text. No locale has influence.
+    // elements joined by ", "; null the empty text. Every locale gives the same text.
     // Throws: TVRXException 14 for another radix.
     std::string ToString(unsigned char radix) const;
 
     // The class that a reference value refers to.
-    // Ownership: the value does not keep it alive; Get returns null when it is gone.
+    // Here: set on a key reference whose class could be fetched; null on other references, whose class name
+    // TCIMReference::GetClassName reads out of the path.
+    // Ownership: the value holds it weakly; Get returns null when it is gone.
     boost::shared_ptr<ICIMClass> GetReferencedClass() const;
     void SetReferencedClass(const boost::shared_ptr<ICIMClass>& referencedClass);
 

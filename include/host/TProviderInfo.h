@@ -5,6 +5,7 @@
 namespace NKOLVRX20 {
 
 // What the host keeps on a provider beside the provider itself.
+// Here: a provider holds an empty one, for the host to fill.
 struct TProviderInfo
 {
     std::string fVendor;
