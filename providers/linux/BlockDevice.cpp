@@ -78,7 +78,7 @@ std::vector<Record> blockDevices(const SystemTree& tree)
     std::vector<Record> result;
     for (const std::string& name : tree.entries("/sys/block")) {
         const auto sectors = tree.natural("/sys/block/" + name + "/size");
-        if (sectors && *sectors > 0) // an unused loop device has none
+        if (sectors && *sectors > 0) // an unused loop device has zero
         {
             result.push_back(blockDevice(tree, name, *sectors));
         }

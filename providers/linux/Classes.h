@@ -9,15 +9,31 @@
 
 namespace lnx {
 
-// The classes of the inventory, one collector each: what a class's instances are on the machine right now.
-// Thread: all functions.
-std::vector<Record> computerSystems(const SystemTree& tree);  // exactly one
-std::vector<Record> operatingSystems(const SystemTree& tree); // exactly one
-std::vector<Record> processors(const SystemTree& tree);       // one for each "processor" of /proc/cpuinfo
-std::vector<Record> memories(const SystemTree& tree);         // one, none without /proc/meminfo
-std::vector<Record> networkPorts(const SystemTree& tree);     // one for each interface, lo included
-std::vector<Record> blockDevices(const SystemTree& tree);     // one for each that has a size
-std::vector<Record> systemDevices(const SystemTree& tree);    // links the system with each of its devices
+// The classes of the inventory, one collector each: a class's instances as the machine is at the moment of the call. A
+// property whose source is missing or odd is left out (null); the keys are always there. The classes and their
+// properties are those of linux.properties.mof.
+// Throws: std::bad_alloc.
+// Blocks: as long as the kernel takes to answer the reads.
+// Thread: safe.
+
+// LNX_ComputerSystem: exactly one, named after the host. From /proc/sys/kernel/hostname and /sys/class/dmi/id, whose
+// serial number only root may read.
+std::vector<Record> computerSystems(const SystemTree& tree);
+// LNX_OperatingSystem: exactly one. From /etc/os-release and /proc; its processes are those that /proc shows the
+// caller. The clock and the time zone are this process's own, whatever the tree.
+std::vector<Record> operatingSystems(const SystemTree& tree);
+// LNX_Processor: one for each "processor" of /proc/cpuinfo, that is, for each that is online.
+std::vector<Record> processors(const SystemTree& tree);
+// LNX_Memory: one for all of it, from /proc/meminfo; the result is empty when that cannot be read.
+std::vector<Record> memories(const SystemTree& tree);
+// LNX_NetworkPort: one for each interface of /sys/class/net in the process's network namespace, lo included.
+// Speeds are null while the driver reports none (link down, virtual ports). PermanentAddress is the hardware's address
+// and null for loopback and virtual ports; MACAddress and NetworkAddresses are those in use.
+std::vector<Record> networkPorts(const SystemTree& tree);
+// LNX_BlockDevice: one for each device of /sys/block that has a size. Partitions are part of their device.
+std::vector<Record> blockDevices(const SystemTree& tree);
+// LNX_SystemDevice: one for each device of the four collectors above that are devices, linking it with the system.
+std::vector<Record> systemDevices(const SystemTree& tree);
 
 struct ClassEntry
 {
@@ -25,17 +41,18 @@ struct ClassEntry
     std::vector<Record> (*collect)(const SystemTree& tree);
 };
 
-// Returns: the class of that name (case-insensitive), or null.
+// Returns: the class of that name, case ignored; null for a class that is not of this provider.
 const ClassEntry* findClass(const std::string& name);
 
-// The system that every device and operating system belongs to.
+// The key values of the system that every device and operating system belongs to. The name is "localhost" on a machine
+// that gives none.
 std::string systemName(const SystemTree& tree);
 extern const char* const kSystemClass;
 
-// Starts a device of the system: its four keys, and the state "enabled".
+// Returns: a new device of the system with its four keys and the operational status OK.
 Record device(const SystemTree& tree, const char* className, const std::string& id);
 
-// Returns: the number of processes, or of those with that command name.
+// Returns: the number of processes, or of those whose command name (/proc/PID/comm, 15 bytes) is exactly that.
 std::uint32_t countProcesses(const SystemTree& tree, const std::optional<std::string>& name);
 
 } // namespace lnx

@@ -78,7 +78,7 @@ template <typename Object> void release(Object* object)
     }
 }
 
-// Calls `use(value, type)` with the value as the broker takes it; says the broker's status.
+// Calls `use(value, type)` with the value as the broker takes it; returns the broker's status.
 class ValuePasser
 {
   public:
@@ -97,19 +97,20 @@ class ValuePasser
         return usedOnce(made, status, CMPI_dateTime, use);
     }
 
+    // Text goes into an array of CMPI_chars, which copies it. An array of CMPI_string keeps the handles of its elements
+    // in some brokers: a string object must then outlive the array's last use.
     template <typename T, typename Use> CMPIStatus pass(const std::vector<T>& values, Use&& use) const
     {
-        constexpr CMPIType kElement = std::is_same_v<T, std::string> ? CMPIType{CMPI_string} : typeOf<T>();
+        constexpr CMPIType kElement = typeOf<T>();
         CMPIStatus status{CMPI_RC_OK, nullptr};
         CMPIArray* array = fBroker.eft->newArray(&fBroker, static_cast<CMPICount>(values.size()), kElement, &status);
         for (CMPICount i = 0; array != nullptr && status.rc == CMPI_RC_OK && i < values.size(); ++i) {
-            status = passElement(values[i], [&](const CMPIValue* value, CMPIType type) {
-                return array->ft->setElementAt(array, i, value, type);
-            });
+            status = array->ft->setElementAt(array, i, pointerTo(values[i]), kElement);
         }
         return usedOnce(array, status, static_cast<CMPIType>(CMPI_ARRAY | kElement), use);
     }
 
+    // Releases the object after its one use: the broker has copied it by then.
     template <typename Object, typename Use>
     static CMPIStatus usedOnce(Object* object, CMPIStatus status, CMPIType type, Use&& use)
     {
@@ -121,30 +122,13 @@ class ValuePasser
     }
 
   private:
-    // Text in an array is a string object: not every broker takes plain text there.
-    template <typename Use> CMPIStatus passElement(const std::string& value, Use&& use) const
-    {
-        CMPIStatus status{CMPI_RC_OK, nullptr};
-        CMPIString* made = fBroker.eft->newString(&fBroker, value.c_str(), &status);
-        return usedOnce(made, status, CMPI_string, use);
-    }
-    template <typename T, typename Use> CMPIStatus passElement(const T& value, Use&& use) const
-    {
-        return pass(value, use);
-    }
-
     const CMPIBroker& fBroker;
 };
-
-bool isText(const CMPIData& data)
-{
-    return (data.state & CMPI_nullValue) == 0 && data.type == CMPI_string && data.value.string != nullptr;
-}
 
 bool sameKey(const CMPIObjectPath& path, const std::string& name, const std::string& expected)
 {
     const CMPIData data = path.ft->getKey(&path, name.c_str(), nullptr);
-    return isText(data) && expected == static_cast<const char*>(data.value.string->hdl);
+    return (data.state & CMPI_nullValue) == 0 && data.type == CMPI_string && textOf(data.value.string) == expected;
 }
 
 bool sameKey(const CMPIObjectPath& path, const std::string& name, const Reference& expected)
@@ -153,9 +137,8 @@ bool sameKey(const CMPIObjectPath& path, const std::string& name, const Referenc
     if ((data.state & CMPI_nullValue) != 0 || data.type != CMPI_ref || data.value.ref == nullptr) {
         return false;
     }
-    const CMPIString* className = data.value.ref->ft->getClassName(data.value.ref, nullptr);
-    if (className == nullptr || ::strcasecmp(static_cast<const char*>(className->hdl), expected.className.c_str()) != 0)
-    {
+    const std::string className = textOf(data.value.ref->ft->getClassName(data.value.ref, nullptr));
+    if (::strcasecmp(className.c_str(), expected.className.c_str()) != 0) {
         return false;
     }
     for (const auto& [key, value] : expected.keys) {
@@ -167,6 +150,12 @@ bool sameKey(const CMPIObjectPath& path, const std::string& name, const Referenc
 }
 
 } // namespace
+
+std::string textOf(const CMPIString* string)
+{
+    const char* text = string != nullptr ? string->ft->getCharPtr(string, nullptr) : nullptr;
+    return text != nullptr ? text : std::string();
+}
 
 CMPIObjectPath* CmpiRecord::reference(const Reference& reference, CMPIStatus& status) const
 {

@@ -8,19 +8,27 @@
 
 namespace lnx {
 
-// Records in the broker's terms. Objects made here belong to the running call, and are released early where many are
-// made.
+// Returns: the string's text; the empty text for null.
+std::string textOf(const CMPIString* string);
+
+// Records in the broker's terms.
+// Ownership: objects that the broker makes belong to the running call, which may make thousands. Whatever is needed for
+// one property or key only is released after its use; the broker copies what setProperty and addKey are given. Paths
+// and instances that are returned are the caller's to release. Thread: distinct objects may be used by distinct
+// threads.
 class CmpiRecord
 {
   public:
-    // Requires: `nameSpace` outlives the object.
+    // Requires: broker and `nameSpace` outlive the object.
     CmpiRecord(const CMPIBroker& broker, const std::string& nameSpace) : fBroker(broker), fNameSpace(nameSpace) {}
 
-    // Returns: the path, or null with the broker's status in `status`.
+    // Return the path, or the instance with its path; null with the broker's status in `status` when the broker
+    // refuses.
     CMPIObjectPath* path(const Record& record, CMPIStatus& status) const;
     CMPIInstance* instance(const Record& record, CMPIStatus& status) const;
 
-    // True when the path's keys are those of the record; keys that the path lacks do not match.
+    // Returns: whether the path has every key of the record, with the same value. Key texts are compared byte for byte,
+    // classes of references ignoring case.
     static bool matches(const Record& record, const CMPIObjectPath& path);
 
   private:

@@ -1,8 +1,8 @@
 #include "providers/linux/Classes.h"
 #include "providers/linux/Parse.h"
 
+#include <algorithm>
 #include <array>
-#include <cctype>
 
 #include <net/if.h>
 #include <net/if_arp.h>
@@ -41,7 +41,7 @@ std::optional<std::uint16_t> linkState(const std::optional<std::string>& word)
     return std::nullopt;
 }
 
-// "02:fc:00:00:00:01" as its octets; none when it is anything else.
+// Returns: the octets of "02:fc:00:00:00:01"; an empty vector for any other text.
 std::vector<std::uint8_t> octets(const std::string& address)
 {
     std::vector<std::uint8_t> result;
@@ -58,28 +58,32 @@ std::vector<std::uint8_t> octets(const std::string& address)
     return result;
 }
 
-// CIM's form of an address: its digits in upper case, without separators.
-std::string compact(const std::string& address)
+// CIM's form of an address: the digits alone, in upper case.
+std::string compact(const std::vector<std::uint8_t>& octets)
 {
+    constexpr char kDigits[] = "0123456789ABCDEF";
     std::string result;
-    for (const char c : address) {
-        if (c != ':') {
-            result += static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
-        }
+    for (const std::uint8_t octet : octets) {
+        result += kDigits[octet >> 4];
+        result += kDigits[octet & 15];
     }
     return result;
 }
 
-void describeAddress(const std::optional<std::string>& address, Record& record)
+// The permanent address is the hardware's; the kernel's current one may be another, and a virtual port has only that.
+void describeAddress(const SystemTree& tree, const std::string& name, Record& record)
 {
-    if (!address) {
-        return;
+    if (const auto address = tree.word("/sys/class/net/" + name + "/address")) {
+        record.set("MACAddress", *address);
+        if (auto current = octets(*address); !current.empty()) {
+            if (std::any_of(current.begin(), current.end(), [](std::uint8_t octet) { return octet != 0; })) {
+                record.set("NetworkAddresses", std::vector<std::string>{compact(current)}); // loopback's is all zeros
+            }
+            record.set("MACOctets", std::move(current));
+        }
     }
-    record.set("MACAddress", *address);
-    if (auto bytes = octets(*address); !bytes.empty()) {
-        record.set("MACOctets", std::move(bytes));
-        record.set("PermanentAddress", compact(*address));
-        record.set("NetworkAddresses", std::vector<std::string>{compact(*address)});
+    if (const auto permanent = tree.permanentAddress(name); !permanent.empty()) {
+        record.set("PermanentAddress", compact(permanent));
     }
 }
 
@@ -95,9 +99,9 @@ void describeLink(const SystemTree& tree, const std::string& directory, Record& 
     record.set("LinkState", linkState(tree.word(directory + "operstate")));
     record.set("CarrierDetected", tree.flag(directory + "carrier"));
 
-    const auto speed = narrowed<std::int32_t>(tree.integer(directory + "speed")); // -1: not known
-    record.set("NegotiatedSpeed", speed);
+    const auto speed = narrowed<std::int32_t>(tree.integer(directory + "speed")); // -1 where the driver knows none
     if (speed && *speed > 0) {
+        record.set("NegotiatedSpeed", speed);
         record.set("Speed", static_cast<std::uint64_t>(*speed) * 1'000'000);
     }
     const auto duplex = tree.word(directory + "duplex");
@@ -119,7 +123,7 @@ Record networkPort(const SystemTree& tree, const std::string& name)
     }
     record.set("InterfaceIndex", narrowed<std::uint32_t>(tree.natural(directory + "ifindex")));
     record.set("ActiveMaximumTransmissionUnit", tree.natural(directory + "mtu"));
-    describeAddress(tree.word(directory + "address"), record);
+    describeAddress(tree, name, record);
     describeLink(tree, directory, record);
     for (const Counter& counter : kCounters) {
         record.set(counter.property, tree.natural(directory + "statistics/" + counter.file));

@@ -152,6 +152,7 @@ std::vector<Record> operatingSystems(const SystemTree& tree)
     record.set("Version", tree.word("/proc/sys/kernel/osrelease"));
     record.set("MaxNumberOfProcesses", narrowed<std::uint32_t>(tree.natural("/proc/sys/kernel/pid_max")));
     record.set("Distributed", false);
+    record.set("PanicRestartDelay", narrowed<std::int32_t>(tree.integer("/proc/sys/kernel/panic")));
     describeTimes(tree, record);
     describeProcesses(tree, record);
     describeLoad(tree, record);

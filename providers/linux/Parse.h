@@ -8,7 +8,7 @@
 #include <string_view>
 #include <vector>
 
-// The few text forms of /proc and /sys. What does not parse as a whole is absent, never half a value.
+// The few text forms of /proc and /sys. A text that fails to parse as a whole is absent.
 namespace lnx {
 
 std::string_view trimmed(std::string_view text);

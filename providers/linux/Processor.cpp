@@ -36,7 +36,7 @@ std::optional<std::uint64_t> number(const Fields& block, const char* name)
     return text ? toNatural(*text) : std::nullopt;
 }
 
-// The node whose directory entry lies beside the processor's; -1 where the machine has none.
+// The node of memory whose entry lies in the processor's directory; -1 on a machine that has one memory for all.
 std::int8_t nodeOf(const SystemTree& tree, const std::string& directory)
 {
     for (const std::string& entry : tree.entries(directory)) {

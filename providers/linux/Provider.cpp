@@ -9,13 +9,12 @@
 
 #include <strings.h>
 
-// The library's two interfaces, instances and methods, both under the name LinuxInventory. The machine is read anew for
-// every request; nothing is kept between them, so any number may run at once.
+// The library's two interfaces, instances and methods, both under the name LinuxInventory. Every request reads the
+// machine again and keeps its data to itself, so any number may run at once.
 namespace lnx {
 namespace {
 
-// The same for all of the library's interfaces. Each factory sets it, and one may run while the other's interface
-// works.
+// The same for all of the library's interfaces. Each factory sets it, possibly while the other's interface works.
 std::atomic<const CMPIBroker*> gBroker{nullptr};
 
 constexpr CMPIStatus kOk{CMPI_RC_OK, nullptr};
@@ -26,7 +25,7 @@ CMPIStatus failure(CMPIrc code, const std::string& text)
     return {code, broker->eft->newString(broker, text.c_str(), nullptr)};
 }
 
-// Nothing may be thrown into the broker.
+// The broker is C: an exception becomes a status here.
 CMPIStatus guarded(const std::function<CMPIStatus()>& body)
 {
     try {
@@ -34,11 +33,6 @@ CMPIStatus guarded(const std::function<CMPIStatus()>& body)
     } catch (const std::exception& error) {
         return failure(CMPI_RC_ERR_FAILED, error.what());
     }
-}
-
-std::string textOf(const CMPIString* string)
-{
-    return string == nullptr || string->hdl == nullptr ? std::string() : static_cast<const char*>(string->hdl);
 }
 
 std::string classOf(const CMPIObjectPath* path)
@@ -57,7 +51,7 @@ CMPIStatus forEach(const CMPIObjectPath* path, const std::function<CMPIStatus(co
     const std::string name = classOf(path);
     const ClassEntry* entry = findClass(name);
     if (entry == nullptr) {
-        return failure(CMPI_RC_ERR_INVALID_CLASS, name + " is not of this provider");
+        return failure(CMPI_RC_ERR_INVALID_CLASS, name + " is not a class of this provider");
     }
     for (const Record& record : entry->collect(SystemTree())) {
         const CMPIStatus status = deliver(record);
@@ -169,7 +163,7 @@ CMPIStatus cleanupInstances(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean)
     return kOk;
 }
 
-// CountProcesses(in string Name, out uint32 Count): Name null counts them all. Returns 0.
+// CountProcesses(in string Name, out uint32 Count): a null Name counts all processes. Returns 0.
 CMPIStatus countProcesses(const CMPIResult* result, const CMPIArgs* in, CMPIArgs* out)
 {
     const CMPIData name = in->ft->getArg(in, "Name", nullptr);

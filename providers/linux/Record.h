@@ -40,7 +40,7 @@ struct Property
     bool isKey;
 };
 
-// One instance, before it is told to a broker. What the machine does not say is left out, and so is null.
+// One instance, before it becomes a broker's. A property that the machine gives no value for is left out, and so null.
 class Record
 {
   public:
@@ -58,7 +58,7 @@ class Record
         }
     }
 
-    // Returns: the value of that property, or null.
+    // Returns: the value of that property; null when it was left out.
     const Value* find(const std::string& name) const;
 
     // Returns: a reference to this instance.

@@ -5,20 +5,27 @@
 #include <algorithm>
 #include <array>
 #include <cerrno>
+#include <cstring>
 #include <memory>
 
 #include <dirent.h>
 #include <fcntl.h>
+#include <linux/ethtool.h>
+#include <linux/sockios.h>
+#include <net/if.h>
 #include <string.h>
+#include <sys/ioctl.h>
+#include <sys/socket.h>
 #include <unistd.h>
 
 namespace lnx {
 namespace {
 
+// Owner of a descriptor; -1 when opening it failed.
 class Descriptor
 {
   public:
-    explicit Descriptor(const std::string& path) : fFd(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK)) {}
+    explicit Descriptor(int fd) : fFd(fd) {}
     ~Descriptor()
     {
         if (fFd >= 0) {
@@ -29,6 +36,7 @@ class Descriptor
     Descriptor& operator=(const Descriptor&) = delete;
 
     bool isOpen() const { return fFd >= 0; }
+    int get() const { return fFd; }
     // Returns: bytes read, 0 at the end, negative on an error.
     ssize_t read(char* buffer, std::size_t size) const
     {
@@ -48,11 +56,36 @@ struct DirectoryCloser
     void operator()(DIR* directory) const { ::closedir(directory); }
 };
 
+constexpr std::size_t kAddressBytes = 32; // MAX_ADDR_LEN: the kernel's longest, more than InfiniBand's 20
+
 } // namespace
+
+std::vector<std::uint8_t> permanentAddressOf(const std::string& interface)
+{
+    const Descriptor socket(::socket(AF_INET, SOCK_DGRAM | SOCK_CLOEXEC, 0));
+    ifreq request{};
+    if (!socket.isOpen() || interface.size() >= sizeof request.ifr_name) {
+        return {};
+    }
+    std::memcpy(request.ifr_name, interface.c_str(), interface.size() + 1);
+    // The address follows the fixed part.
+    ethtool_perm_addr fixedPart{ETHTOOL_GPERMADDR, kAddressBytes};
+    std::array<std::uint8_t, sizeof fixedPart + kAddressBytes> answer{};
+    std::memcpy(answer.data(), &fixedPart, sizeof fixedPart);
+    request.ifr_data = reinterpret_cast<char*>(answer.data());
+    if (::ioctl(socket.get(), SIOCETHTOOL, &request) != 0) {
+        return {};
+    }
+    std::memcpy(&fixedPart, answer.data(), sizeof fixedPart);
+    const auto* begin = answer.data() + sizeof fixedPart;
+    const auto* end = begin + std::min<std::size_t>(fixedPart.size, kAddressBytes);
+    const bool isSet = std::any_of(begin, end, [](std::uint8_t octet) { return octet != 0; });
+    return isSet ? std::vector<std::uint8_t>(begin, end) : std::vector<std::uint8_t>();
+}
 
 std::optional<std::string> SystemTree::text(const std::string& path) const
 {
-    const Descriptor file(fRoot + path);
+    const Descriptor file(::open((fRoot + path).c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
     if (!file.isOpen()) {
         return std::nullopt;
     }

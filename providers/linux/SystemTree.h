@@ -2,43 +2,62 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <functional>
 #include <optional>
 #include <string>
 #include <vector>
 
 namespace lnx {
 
-// The files of /proc, /sys and /etc below a root, "/" for the machine itself.
+// Asks the kernel for the address that an interface's hardware came with (ETHTOOL_GPERMADDR).
+// Returns: its octets; an empty vector for an interface that has none: loopback, bridges, most virtual ones.
+std::vector<std::uint8_t> permanentAddressOf(const std::string& interface);
+
+// What the collectors see of a machine: the files of /proc, /sys and /etc below a root ("/" for this machine), and the
+// one fact of it that the kernel keeps in no file.
 //
-// Nothing here throws but for lack of memory: a file that is missing, unreadable or odd is an absent value.
+// A file that is missing, unreadable or odd is an absent value.
+// Throws: std::bad_alloc.
 // Blocks: as long as the kernel takes to answer a read.
 // Thread: all members.
 class SystemTree
 {
   public:
     static constexpr std::size_t kMaxFileBytes = 4UL * 1024 * 1024; // /proc/cpuinfo of a machine with 1,000 processors
-    static constexpr std::size_t kMaxEntries = 100'000;             // of one directory; more are not looked at
+    static constexpr std::size_t kMaxEntries = 100'000;             // of one directory; the rest is left out
 
-    explicit SystemTree(std::string root = "/") : fRoot(std::move(root)) {}
+    using AddressLookup = std::function<std::vector<std::uint8_t>(const std::string& interface)>;
 
-    // Returns: the file's text without blanks at its ends, cut off at kMaxFileBytes; nothing when it cannot be read.
+    explicit SystemTree(std::string root = "/", AddressLookup permanentAddress = permanentAddressOf)
+        : fRoot(std::move(root)), fPermanentAddress(std::move(permanentAddress))
+    {
+    }
+
+    // Returns: the file's text, blanks at its ends cut off, at most kMaxFileBytes of it; absent for an unreadable file.
     std::optional<std::string> text(const std::string& path) const;
-    // The same, when there is anything but blanks in it.
+    // The same; absent also for a file of blanks.
     std::optional<std::string> word(const std::string& path) const;
     // Returns: the number that is the file's whole text, decimal or with 0x.
     std::optional<std::int64_t> integer(const std::string& path) const;
     std::optional<std::uint64_t> natural(const std::string& path) const;
-    // Returns: what a file of 0 or 1 says.
+    // Returns: the truth of a file that holds 0 or 1.
     std::optional<bool> flag(const std::string& path) const;
 
-    // Returns: the names in a directory but "." and "..", sorted; numbers in names by value, so that cpu2 precedes
-    // cpu10.
+    // Returns: the names in a directory except "." and "..", sorted; numbers in names by value, so that cpu2 precedes
+    // cpu10. An unreadable directory is empty.
     std::vector<std::string> entries(const std::string& path) const;
 
     bool exists(const std::string& path) const;
 
+    // Returns: as permanentAddressOf.
+    std::vector<std::uint8_t> permanentAddress(const std::string& interface) const
+    {
+        return fPermanentAddress(interface);
+    }
+
   private:
     std::string fRoot;
+    AddressLookup fPermanentAddress;
 };
 
 } // namespace lnx

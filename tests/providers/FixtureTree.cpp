@@ -36,4 +36,18 @@ FixtureTree& FixtureTree::directory(const std::string& path)
     return *this;
 }
 
+FixtureTree& FixtureTree::permanentAddress(const std::string& interface, const std::vector<std::uint8_t>& octets)
+{
+    fPermanentAddresses[interface] = octets;
+    return *this;
+}
+
+SystemTree FixtureTree::tree() const
+{
+    return SystemTree(fRoot.string(), [this](const std::string& interface) {
+        const auto found = fPermanentAddresses.find(interface);
+        return found == fPermanentAddresses.end() ? std::vector<std::uint8_t>() : found->second;
+    });
+}
+
 } // namespace lnx

@@ -3,11 +3,13 @@
 #include "providers/linux/SystemTree.h"
 
 #include <filesystem>
+#include <map>
 #include <string>
+#include <vector>
 
 namespace lnx {
 
-// A made-up machine: files below a temporary root, removed at the end.
+// An invented machine: files below a temporary root, removed at the end, and the permanent addresses of its ports.
 class FixtureTree
 {
   public:
@@ -19,12 +21,15 @@ class FixtureTree
     // `path` begins with a slash; its directories are made.
     FixtureTree& file(const std::string& path, const std::string& text);
     FixtureTree& directory(const std::string& path);
+    FixtureTree& permanentAddress(const std::string& interface, const std::vector<std::uint8_t>& octets);
 
-    SystemTree tree() const { return SystemTree(fRoot.string()); }
+    // The tree reads the fixture, which must outlive it.
+    SystemTree tree() const;
     const std::filesystem::path& root() const { return fRoot; }
 
   private:
     std::filesystem::path fRoot;
+    std::map<std::string, std::vector<std::uint8_t>> fPermanentAddresses;
 };
 
 } // namespace lnx

@@ -87,18 +87,19 @@ TEST(NetworkPorts, ReadWhatTheKernelShows)
              "ifindex=4|statistics/rx_bytes=18446744073709551615|statistics/tx_errors=7");
     addFiles(fixture, "/sys/class/net/lo",
              "address=00:00:00:00:00:00|mtu=65536|operstate=unknown|type=772|flags=0x8|speed=-1");
-    fixture.file("/sys/class/net/bonding_masters", "bond0\n");
+    fixture.file("/sys/class/net/bonding_masters", "bond0\n").permanentAddress("eth0", {2, 252, 0, 10, 11, 255});
 
     const std::vector<Record> ports = networkPorts(fixture.tree());
     ASSERT_EQ(ports.size(), 2U);
     expectProperties(
         ports[0],
-        "DeviceID=eth0|MACAddress=02:fc:00:aa:bb:01|MACOctets=2,252,0,170,187,1|PermanentAddress=02FC00AABB01|"
+        "DeviceID=eth0|MACAddress=02:fc:00:aa:bb:01|MACOctets=2,252,0,170,187,1|PermanentAddress=02FC000A0BFF|"
         "NetworkAddresses=02FC00AABB01|ActiveMaximumTransmissionUnit=1400|LinkState=6|LinkTechnology=2|CarrierDetected="
         "true|EnabledState=2|NegotiatedSpeed=10000|Speed=10000000000|FullDuplex=true|InterfaceFlags=4099|BytesReceived="
         "18446744073709551615|TransmitErrors=7|BytesTransmitted=<null>");
     expectProperties(ports[1], "DeviceID=lo|OtherLinkTechnology=loopback|LinkState=0|CarrierDetected=<null>|"
-                               "EnabledState=3|NegotiatedSpeed=-1|Speed=<null>");
+                               "EnabledState=3|NegotiatedSpeed=<null>|Speed=<null>|PermanentAddress=<null>|"
+                               "NetworkAddresses=<null>");
 }
 
 TEST(NetworkPorts, OddAddressesStayText)
@@ -107,7 +108,7 @@ TEST(NetworkPorts, OddAddressesStayText)
         FixtureTree fixture;
         addFiles(fixture, "/sys/class/net/x0", std::string("address=") + address);
         expectProperties(networkPorts(fixture.tree()).at(0),
-                         std::string("MACAddress=") + address + "|MACOctets=<null>|PermanentAddress=<null>");
+                         std::string("MACAddress=") + address + "|MACOctets=<null>|NetworkAddresses=<null>");
     }
 }
 
@@ -203,6 +204,7 @@ TEST(OperatingSystems, ReadReleaseTimesAndProcesses)
     fixture.file("/etc/os-release", "NAME=\"Some Linux\"\nID=some\nPRETTY_NAME='Some Linux 1'\n")
         .file("/proc/sys/kernel/hostname", "box\n")
         .file("/proc/sys/kernel/osrelease", "6.1.0\n")
+        .file("/proc/sys/kernel/panic", "-1\n")
         .file("/proc/stat", "cpu 1 2 3\nbtime 1700000000\n")
         .file("/proc/uptime", "123.50 99.00\n")
         .file("/proc/loadavg", "0.50 1.25 2.00 1/80 1000\n")
@@ -213,7 +215,7 @@ TEST(OperatingSystems, ReadReleaseTimesAndProcesses)
         system,
         "CSName=box|Name=some|Caption=Some Linux 1|Version=6.1.0|LastBootUpTime=1700000000000000|UpTime=123500000 "
         "long|UpTimeSeconds=123.5|LoadAverages=0.5,1.25,2|NumberOfProcesses=3|ProcessStates=R,S|ProcessStateCounts=1,2|"
-        "InitProcessState=S|TotalVirtualMemorySize=1500");
+        "InitProcessState=S|TotalVirtualMemorySize=1500|PanicRestartDelay=-1");
     EXPECT_EQ(countProcesses(fixture.tree(), std::nullopt), 3U);
     EXPECT_EQ(countProcesses(fixture.tree(), std::string("worker")), 1U);
     EXPECT_EQ(countProcesses(fixture.tree(), std::string("nobody")), 0U);
