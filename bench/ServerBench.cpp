@@ -1,5 +1,5 @@
-// The private server as its users meet it: whole programs, an agent, our client, on loopback. The yardstick is a bare
-// expat pass over the same bytes in the same run.
+// The private server as its users meet it: whole programs, an agent and the client library over the loopback interface.
+// bareExpat is the reference loop: a bare expat pass over the same bytes in the same run.
 #include "tests/pegasus/server/HttpExchange.h"
 #include "tests/pegasus/server/ServerTree.h"
 
@@ -19,7 +19,7 @@ namespace {
 
 const CIMNamespaceName kNamespace("root/probe");
 
-// One server with the probe provider for all benchmarks but the launch.
+// One server with the probe provider, shared by all benchmarks except launch.
 class TProbeServer
 {
   public:
@@ -133,7 +133,8 @@ void invokeMethod(benchmark::State& state)
     state.SetItemsProcessed(state.iterations());
 }
 
-// From the start of the process until its launcher has returned, on an empty repository; then a connection is accepted.
+// From the start of the process until its launcher has returned, on an empty repository. A connection, outside the
+// time, shows that it listens then.
 void launch(benchmark::State& state)
 {
     for (auto _ : state) {

@@ -1,7 +1,7 @@
-// How long it takes to compile a schema, and how fast its classes are read back.
+// The time to compile a schema, and the rate at which its classes are read back.
 //   schema_bench TOP.mof [ROUNDS]
-// prints one line a measure: the median of the rounds, and the least and the greatest. Servers run in trees of their
-// own; a round starts a fresh one and its start counts.
+// Prints one line a measure: the median of the rounds, the minimum and the maximum. Each round starts a server in a
+// tree of its own; its start is part of the compile time.
 #include "pegasus/mof/Compiler.h"
 #include "pegasus/mof/MemoryHandler.h"
 #include "tests/support/PrivateServer.h"

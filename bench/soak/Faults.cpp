@@ -9,7 +9,7 @@ namespace {
 
 using namespace std::chrono_literals;
 
-// The class's time-out is 5 s (tools/soak writes it into the vendor's class list).
+// The class's timeout is 5 s (tools/soak writes it into the vendor's class list).
 constexpr auto kSlow = 1500ms;
 constexpr auto kStall = 7s;
 constexpr int kLongestDelayMs = 60; // an enumeration of the probe takes about as long
@@ -44,8 +44,8 @@ const char* NameOf(EFault fault)
     static constexpr const char* kNames[] = {"none",
                                              "agent killed between calls",
                                              "agent killed during a call",
-                                             "agent slow, within the time-out",
-                                             "agent slow, beyond the time-out",
+                                             "agent slow, within the timeout",
+                                             "agent slow, beyond the timeout",
                                              "server killed between calls",
                                              "server killed during a call"};
     return kNames[static_cast<int>(fault)];

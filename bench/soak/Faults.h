@@ -13,7 +13,7 @@ enum class EFault
     kNone,
     kAgentKilled,     // between two calls
     kAgentKilledBusy, // during an enumeration
-    kAgentSlow,       // stands still for a while, within the class's time-out
+    kAgentSlow,       // stands still for a while, within the class's timeout
     kAgentStalled,    // stands still for longer than that
     kServerKilled,
     kServerKilledBusy
@@ -24,10 +24,10 @@ constexpr EFault kFaults[] = {
 
 const char* NameOf(EFault fault);
 bool IsServerFault(EFault fault);
-// Whether the call that it hits must give the whole answer all the same.
+// Returns: whether the call that the fault hits must still give the whole answer.
 bool IsHarmless(EFault fault);
 
-// Does it to the process (the agent, or the server for a server's fault) while the call runs or just before it.
+// Hits the process (the agent, or the server for a server's fault) while the call runs or just before it.
 // Blocks: until both have ended.
 void Inject(EFault fault, pid_t process, const std::function<void()>& call);
 

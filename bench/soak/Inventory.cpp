@@ -21,7 +21,7 @@ using vrxhost::ErrorOf;
 
 namespace {
 
-// What the probe delivers until it is told otherwise, and the rule of its numbers.
+// How many instances the probe delivers by default, and the rule of its numbers.
 constexpr std::size_t kProbeCount = 1000;
 constexpr unsigned long kProbeFactor = 1000003;
 constexpr std::size_t kIdPrefixBytes = 5; // "bulk-"

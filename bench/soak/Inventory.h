@@ -19,7 +19,7 @@ enum class EAnswer
 };
 
 // What a host asks of a namespace, and whether the answers are those that the vendors of the soak give.
-// Lets go of everything that came from the plug-in when it is destroyed.
+// Ownership: releases everything that came from the plug-in when it is destroyed.
 // Thread: one at a time.
 class TInventory
 {
@@ -33,7 +33,7 @@ class TInventory
     // This machine's processors.
     EAnswer EnumerateProcessors();
 
-    // Returns: the process that runs the probe's library; 0 when it does not answer.
+    // Returns: the process that runs the probe's library; 0 when the probe fails to answer.
     pid_t ProbeProcess();
 
   private:

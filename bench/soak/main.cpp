@@ -34,7 +34,7 @@ using NKOLVRX20::TRootObject;
 constexpr int kRounds = 10;                // of all operations, before and after the fault
 constexpr unsigned int kHungSeconds = 600; // a cycle takes a quarter of a minute
 constexpr auto kRecovery = 20s;
-constexpr int kWarmCycles = 2; // what is allocated once is allocated by then
+constexpr int kWarmCycles = 2; // after these, everything that is allocated once has been
 // The allocator's own caches come and go; a leak of one object a cycle shows against this after some hours.
 constexpr long kHeapNoiseBytes = 256 << 10;
 
@@ -113,7 +113,7 @@ void TSoak::Rounds(TInventory& inventory, bool healthy)
     }
 }
 
-// An agent's fault may cost calls for a moment; then everything must be as before.
+// After an agent's fault, calls may fail for a moment; then everything must be as before.
 void TSoak::Recover(TInventory& inventory)
 {
     const auto deadline = TClock::now() + kRecovery;
