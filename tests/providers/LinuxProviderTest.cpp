@@ -64,7 +64,7 @@ TEST_F(LinuxProvider, ShowsEveryAddressAsTheKernelDoes)
     for (const CIMInstance& port : all("LNX_NetworkPort")) {
         shown[propertyText(port, "DeviceID")] = propertyText(port, "MACAddress");
         if (propertyText(port, "DeviceID") == "lo") {
-            EXPECT_EQ(propertyText(port, "PermanentAddress"), "") << "loopback has no hardware";
+            EXPECT_EQ(propertyText(port, "PermanentAddress").front(), '<') << "loopback got an address";
         }
     }
     EXPECT_EQ(shown, expected);
