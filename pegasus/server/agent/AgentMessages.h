@@ -7,7 +7,8 @@
 
 namespace Pegasus::server {
 
-// Requests that the server makes for agents itself. A client's GetInstance and method calls are passed on as they came.
+// Requests that the server makes for agents itself. A client's GetInstance is passed on as it came, and its method
+// calls too, unless they leave types out.
 // Thread: any.
 
 // EnumerateInstances, with everything that the provider has, of one class alone.

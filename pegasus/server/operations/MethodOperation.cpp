@@ -2,6 +2,7 @@
 #include "pegasus/server/operations/ConfigService.h"
 #include "pegasus/server/operations/Operations.h"
 #include "pegasus/wire/ElementEncoder.h"
+#include "pegasus/wire/RequestEnvelope.h"
 
 namespace Pegasus::server::operations {
 
@@ -22,6 +23,41 @@ CIMValue invokeShutdown(ServerCore& core, const CimRequest& request)
     return CIMValue(Sint32(0));
 }
 
+bool areAllTyped(const Array<CIMParamValue>& parameters)
+{
+    for (Uint32 i = 0; i < parameters.size(); ++i) {
+        if (!parameters[i].isTyped()) {
+            return false;
+        }
+    }
+    return true;
+}
+
+MethodDeclaration declarationOf(ServerCore& core, const CimRequest& request)
+{
+    repository::ClassOptions methodsOnly;
+    methodsOnly.localOnly = false;
+    methodsOnly.propertyList = CIMPropertyList(Array<CIMName>());
+    return {core.repository.getClass(request.nameSpace, request.object.getClassName(), methodsOnly),
+            CIMName(String(request.method.c_str()))};
+}
+
+// Returns: the message for the provider: the client's own, unless it left types out.
+std::string providerMessage(ServerCore& core, const HttpRequest& http, const CimRequest& request)
+{
+    if (request.arguments.size() == 0) {
+        return http.body;
+    }
+    const MethodDeclaration declaration = declarationOf(core, request);
+    declaration.warnOfDifferences(request.arguments, core.parameterWarnings);
+    if (areAllTyped(request.arguments)) {
+        return http.body;
+    }
+    const Array<CIMParamValue> typed = declaration.withTypes(request.arguments);
+    return wire::encodeRequestMessage(
+        "1", wire::encodeMethodCall(request.nameSpace, request.object, CIMName(String(request.method.c_str())), typed));
+}
+
 void passToProvider(ServerCore& core, const HttpRequest& http, const CimRequest& request, ElementSink& answer)
 {
     const auto provider = core.registry.find(request.nameSpace, request.object.getClassName(), ProviderType::kMethod);
@@ -31,7 +67,7 @@ void passToProvider(ServerCore& core, const HttpRequest& http, const CimRequest&
     AgentRequest passed;
     passed.method = request.method;
     passed.object = base::percentDecoded(*http.header("CIMObject"));
-    passed.body = http.body;
+    passed.body = providerMessage(core, http, request);
     const CimStatus status = core.agents.request(*provider, passed, answer);
     if (status.code != 0) {
         throw OperationFailed(status);

@@ -24,8 +24,9 @@ void enumerateInstances(ServerCore& core, const CimRequest& request, ElementSink
 void enumerateInstanceNames(ServerCore& core, const CimRequest& request, ElementSink& answer);
 void createInstance(ServerCore& core, const CimRequest& request, ElementSink& answer);
 
-// A method of the server's own services, or of the class's method provider through its agent. Parameters reach the
-// provider as they were sent, and checking them is the provider's task.
+// A method of the server's own services, or of the class's method provider through its agent. Parameters that
+// came with a type reach the provider as they were sent, and checking them is the provider's task; the others get the
+// types that the class declares.
 void invokeMethod(ServerCore& core, const HttpRequest& http, const CimRequest& request, ElementSink& answer);
 
 } // namespace Pegasus::server::operations

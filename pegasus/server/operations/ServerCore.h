@@ -3,6 +3,7 @@
 #include "pegasus/repository/Repository.h"
 #include "pegasus/server/admin/Config.h"
 #include "pegasus/server/agent/AgentPool.h"
+#include "pegasus/server/operations/MethodParameters.h"
 #include "pegasus/server/operations/ProviderRegistry.h"
 
 #include <functional>
@@ -18,6 +19,7 @@ struct ServerCore
     ProviderRegistry& registry;
     AgentPool& agents;
     std::function<void()> requestShutdown; // returns at once; the server ends when its answers have gone out
+    ParameterWarnings parameterWarnings = {};
 };
 
 // Throws: CIM_ERR_INVALID_NAMESPACE.

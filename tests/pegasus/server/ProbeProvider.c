@@ -181,6 +181,51 @@ static CMPIStatus setCount(const CMPIResult* result, const CMPIArgs* in)
     return returnNumber(result, gCount);
 }
 
+/* Appends what the provider got: name, CMPI type and value. */
+static void describe(char* text, size_t size, const char* name, CMPIData data)
+{
+    char value[64] = "?";
+    if (data.state & CMPI_nullValue) {
+        snprintf(value, sizeof value, "null");
+    } else if (data.type & CMPI_ARRAY) {
+        snprintf(value, sizeof value, "%u elements", data.value.array->ft->getSize(data.value.array, NULL));
+    } else if (data.type == CMPI_boolean) {
+        snprintf(value, sizeof value, "%d", data.value.boolean);
+    } else if (data.type == CMPI_uint8) {
+        snprintf(value, sizeof value, "%u", data.value.uint8);
+    } else if (data.type == CMPI_sint64) {
+        snprintf(value, sizeof value, "%lld", (long long)data.value.sint64);
+    } else if (data.type == CMPI_real32) {
+        snprintf(value, sizeof value, "%g", (double)data.value.real32);
+    } else if (data.type == CMPI_char16) {
+        snprintf(value, sizeof value, "%c", data.value.char16);
+    } else if (data.type == CMPI_string) {
+        snprintf(value, sizeof value, "%s", textOf(data.value.string));
+    } else if (data.type == CMPI_dateTime) {
+        snprintf(value, sizeof value, "%s",
+                 textOf(data.value.dateTime->ft->getStringFormat(data.value.dateTime, NULL)));
+    } else if (data.type == CMPI_ref) {
+        snprintf(value, sizeof value, "to %s", textOf(data.value.ref->ft->getClassName(data.value.ref, NULL)));
+    } else if (data.type == CMPI_instance) {
+        const CMPIInstance* instance = data.value.inst;
+        snprintf(value, sizeof value, "of %s", textOf(instance->ft->getProperty(instance, "Id", NULL).value.string));
+    }
+    const size_t used = strlen(text);
+    snprintf(text + used, size - used, "%s:%04x=%s;", name, data.type, value);
+}
+
+static CMPIStatus describeArguments(const CMPIResult* result, const CMPIArgs* in)
+{
+    char text[1024] = "";
+    for (CMPICount i = 0; i < in->ft->getArgCount(in, NULL); ++i) {
+        CMPIString* name = NULL;
+        const CMPIData data = in->ft->getArgAt(in, i, &name, NULL);
+        describe(text, sizeof text, textOf(name), data);
+    }
+    result->ft->returnData(result, (const CMPIValue*)text, CMPI_chars);
+    return result->ft->returnDone(result);
+}
+
 /* Calls back into the server: how many instances of Probe_Bulk does it say there are? */
 static CMPIStatus countByUpcall(const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path)
 {
@@ -230,6 +275,9 @@ static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, con
     }
     if (strcasecmp(method, "SetCount") == 0) {
         return setCount(result, in);
+    }
+    if (strcasecmp(method, "Describe") == 0 || strcasecmp(method, "Undeclared") == 0) {
+        return describeArguments(result, in);
     }
     if (strcasecmp(method, "CountByUpcall") == 0) {
         return countByUpcall(context, result, path);

@@ -64,6 +64,10 @@ TEST(WbemcliTest, everyOperation)
         {"InvokeMethod, outputs shown",
          "cmx " + probe + ":Probe_Bulk' 'Echo.Text=\"hello\"'",
          {"<PARAMVALUE NAME=\"Back\"", "hello"}},
+        {"InvokeMethod, a number", "cm " + probe + ":Probe_Bulk' 'SetCount.Count=1200'", {"1200"}},
+        {"InvokeMethod, a text for a number",
+         "cm " + probe + ":Probe_Bulk' 'SetCount.Count=hello' 2>&1",
+         {"CIM_ERR_INVALID_PARAMETER", "does not convert to uint32"}},
         {"an error", "gc " + probe + ":Nope' 2>&1", {"CIM_ERR_NOT_FOUND"}},
     };
     const std::string stored = probe + ":Probe_Stored.Id=\"stored-1\"' ";
