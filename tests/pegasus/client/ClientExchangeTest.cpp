@@ -119,7 +119,7 @@ const Fault kFaults[] = {
     {"an element that nobody knows",
      [](const PeerRequest& r) { return test::withReplaced(good(r), "PROPERTY", "PROPPETY"); },
      "Pegasus::CIMClientXmlException: Validation error: on line "},
-    {"a type that is none", [](const PeerRequest& r) { return test::withReplaced(good(r), "uint64", "uint46"); },
+    {"an unknown type", [](const PeerRequest& r) { return test::withReplaced(good(r), "uint64", "uint46"); },
      "Pegasus::CIMClientXmlException: Semantic error: on line "},
     {"another message's id", [](const PeerRequest& r) { return test::withReplaced(good(r), "ID=\"1", "ID=\"9"); },
      "Pegasus::CIMClientResponseException: Mismatched response message ID:  Got \"9"},

@@ -210,7 +210,7 @@ TEST(ValueConversionTest, AWrongDeclaredTypeLeavesAsTheLibrarysExceptionAndTheOu
     Pegasus::CIMValue peg(Pegasus::String("sentinel"));
     EXPECT_EQ(14U, StatusOf([&] { vrxValToPeg(TCIMValue(TType::kUint32, 0), peg); })); // null
     EXPECT_TRUE(peg == Pegasus::CIMValue(Pegasus::String("sentinel")));
-    // A boolean is told by comparison, not by its type.
+    // Declared boolean: a value is true when it equals a boolean true, whatever its own type.
     pegValToVRX("P", text, Pegasus::CIMTYPE_BOOLEAN, false, out, nullptr);
     EXPECT_TRUE(out == TCIMValue(false));
 }

@@ -44,7 +44,7 @@ class TOutsideWorld
 
     // --- the script: set before the plug-in runs ---
 
-    // Told of every pause before it "ends".
+    // Called at every pause, before it "ends".
     std::function<void(unsigned int seconds)> fOnSleep;
     // Gives a program's output, and may throw as the process service would; without it the output is empty.
     std::function<void(const TSpawnCall&, std::string& output)> fRun;
