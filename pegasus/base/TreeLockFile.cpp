@@ -78,7 +78,7 @@ void setField(TreeLockRecord& record, std::string_view name, std::string_view va
 TreeLockRecord parse(std::string_view text)
 {
     TreeLockRecord record;
-    for (std::size_t end; (end = text.find('\n')) != std::string_view::npos; text.remove_prefix(end + 1)) {
+    for (std::size_t end = 0; (end = text.find('\n')) != std::string_view::npos; text.remove_prefix(end + 1)) {
         const std::string_view line = text.substr(0, end);
         const std::size_t equals = line.find('=');
         if (equals != std::string_view::npos) {

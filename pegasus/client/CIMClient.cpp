@@ -18,7 +18,7 @@ void failUnexpected(const XmlElement& element)
 }
 
 // An operation whose result is one object. An answer that says success without a result gives an uninitialised one.
-template <class T>
+template <typename T>
 T readOne(CIMClientRep& rep, client::Request request, const char* elementName,
           T (ElementDecoder::*decode)(const XmlElement&))
 {
@@ -36,7 +36,7 @@ T readOne(CIMClientRep& rep, client::Request request, const char* elementName,
 }
 
 // An operation whose result is a list.
-template <class T>
+template <typename T>
 Array<T> readAll(CIMClientRep& rep, const client::Request& request, T (ElementDecoder::*decode)(const XmlElement&))
 {
     Array<T> results;

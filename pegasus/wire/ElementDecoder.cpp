@@ -63,7 +63,7 @@ void expectEnd(const XmlElement& parent, const XmlElement& child)
 }
 
 // Adds an element's object, whose name must be new.
-template <class Item> void addNew(const XmlElement& element, Array<Item>& items, const Item& item)
+template <typename Item> void addNew(const XmlElement& element, Array<Item>& items, const Item& item)
 {
     if (ObjectAccess::find(items, item.getName()) != PEG_NOT_FOUND) {
         element.fail(Kind::kSemantic, "a second " + std::string(element.name()) + " named \"" +

@@ -12,7 +12,7 @@ namespace {
 using Kind = XmlError::Kind;
 
 // "Uint8", from "uint8".
-template <class T> std::string typeWord()
+template <typename T> std::string typeWord()
 {
     std::string word = cimTypeToString(CIMTypeOf<T>::kType);
     word.front() = static_cast<char>(word.front() - ('a' - 'A'));
@@ -34,7 +34,7 @@ class EmbeddingGuard
 
 } // namespace
 
-template <class T> T ElementDecoder::parseUnsigned(const XmlElement& element, std::string_view text)
+template <typename T> T ElementDecoder::parseUnsigned(const XmlElement& element, std::string_view text)
 {
     const auto parsed = base::parseUnsigned(text);
     if (!parsed) {
@@ -46,7 +46,7 @@ template <class T> T ElementDecoder::parseUnsigned(const XmlElement& element, st
     return static_cast<T>(*parsed);
 }
 
-template <class T> T ElementDecoder::parseSigned(const XmlElement& element, std::string_view text)
+template <typename T> T ElementDecoder::parseSigned(const XmlElement& element, std::string_view text)
 {
     const auto parsed = base::parseSigned(text);
     if (!parsed) {
@@ -129,7 +129,7 @@ template <> CIMInstance ElementDecoder::parseText<CIMInstance>(const XmlElement&
     return CIMInstance(object);
 }
 
-template <class T> T ElementDecoder::parseText(const XmlElement& element, std::string_view text)
+template <typename T> T ElementDecoder::parseText(const XmlElement& element, std::string_view text)
 {
     if constexpr (std::is_unsigned_v<T>) {
         return parseUnsigned<T>(element, text);
@@ -174,7 +174,7 @@ CIMType ElementDecoder::embeddedType(const XmlElement& element, CIMType type, co
 
 // ---- VALUE, VALUE.ARRAY
 
-template <class T> CIMValue ElementDecoder::decodeScalar(const XmlElement& element)
+template <typename T> CIMValue ElementDecoder::decodeScalar(const XmlElement& element)
 {
     return ValueAccess::make(parseText<T>(element, element.text(fScratch)));
 }
@@ -184,7 +184,7 @@ template <> CIMValue ElementDecoder::decodeScalar<CIMObjectPath>(const XmlElemen
     element.fail(Kind::kInvalid, "expected VALUE.REFERENCE element, got " + std::string(element.name()));
 }
 
-template <class T> CIMValue ElementDecoder::decodeArray(const XmlElement& element)
+template <typename T> CIMValue ElementDecoder::decodeArray(const XmlElement& element)
 {
     Array<T> array;
     for (XmlElement child = element.firstChild(); child; child = child.nextSibling()) {

@@ -122,13 +122,13 @@ void appendText(std::string& out, const CIMObject& x)
     appendEscaped(out, x.toString());
 }
 
-template <class T> void appendText(std::string& out, const T& x)
+template <typename T> void appendText(std::string& out, const T& x)
 {
     static_assert(std::is_integral_v<T>, "a number");
     out += std::to_string(x);
 }
 
-template <class T> void appendOne(std::string& out, const T& x)
+template <typename T> void appendOne(std::string& out, const T& x)
 {
     if constexpr (std::is_same_v<T, CIMObjectPath>) {
         appendReference(out, x);
@@ -139,7 +139,7 @@ template <class T> void appendOne(std::string& out, const T& x)
     }
 }
 
-template <class T> void appendAll(std::string& out, const Array<T>& array)
+template <typename T> void appendAll(std::string& out, const Array<T>& array)
 {
     const char* const name = std::is_same_v<T, CIMObjectPath> ? "VALUE.REFARRAY" : "VALUE.ARRAY";
     out.append("<").append(name).append(">\n");
@@ -175,7 +175,7 @@ void appendQualifier(std::string& out, const CIMConstQualifier& qualifier)
     out += "</QUALIFIER>\n";
 }
 
-template <class Holder> void appendQualifiers(std::string& out, const Holder& holder)
+template <typename Holder> void appendQualifiers(std::string& out, const Holder& holder)
 {
     for (Uint32 i = 0; i < holder.getQualifierCount(); ++i) {
         appendQualifier(out, holder.getQualifier(i));

@@ -19,7 +19,7 @@ struct TFileCloser
 {
     void operator()(std::FILE* file) const { static_cast<void>(std::fclose(file)); }
 };
-typedef std::unique_ptr<std::FILE, TFileCloser> TFile;
+using TFile = std::unique_ptr<std::FILE, TFileCloser>;
 
 // Opens a regular file for reading, close-on-exec; anything else (a pipe could block for ever) counts as not there.
 // Returns: null when it cannot be opened.

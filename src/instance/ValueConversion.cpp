@@ -11,7 +11,7 @@ namespace NKOLVRX20 {
 
 namespace {
 
-typedef TCIMValue::TCIMType TType;
+using TType = TCIMValue::TCIMType;
 
 constexpr unsigned char kDecimal = 10;
 

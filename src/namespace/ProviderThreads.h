@@ -12,7 +12,7 @@ class TPEGASUSProvider;
 // Returns: whether the host's settings ask for a thread for each provider.
 bool IsMultiThreaded();
 
-typedef boost::function<void(const boost::shared_ptr<TPEGASUSProvider>&)> TProviderTask;
+using TProviderTask = boost::function<void(const boost::shared_ptr<TPEGASUSProvider>&)>;
 
 // Runs the task for every provider, each on a thread of its own, and waits for all of them. What a task throws is
 // logged under the operation's name, with the provider.

@@ -13,7 +13,7 @@ namespace NKOLVRX20 {
 
 namespace {
 
-typedef TCIMValue::TCIMType TType;
+using TType = TCIMValue::TCIMType;
 
 constexpr char kQualifierFailure[] = "TPEGASUSClass::Initialize - Unable to retrieve qualifier: ";
 constexpr char kClassFailure[] = "- error when Adding Qualifiers for class: ";

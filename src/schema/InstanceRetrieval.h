@@ -19,7 +19,7 @@ class TPEGASUSInstance;
 class TInstanceRetrieval
 {
   public:
-    typedef Pegasus::Array<Pegasus::CIMInstance> TAnswer;
+    using TAnswer = Pegasus::Array<Pegasus::CIMInstance>;
 
     // The operation is the function's name, as the log has it.
     TInstanceRetrieval(TPEGASUSClass& instanceClass, const char* operation);

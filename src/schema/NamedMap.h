@@ -14,7 +14,7 @@ namespace NKOLVRX20 {
 template <typename TElement> class TNamedMap
 {
   public:
-    typedef boost::shared_ptr<TElement> TPointer;
+    using TPointer = boost::shared_ptr<TElement>;
 
     // Returns: null when there is none of that name.
     TPointer Find(const std::string& name) const

@@ -24,7 +24,7 @@ template <typename TBits> TBits BitsFromText(const std::string& text, const std:
 
 ICIMQualifierDecl::EFlavor FlavorFromText(const std::string& text)
 {
-    typedef ICIMQualifierDecl TDecl;
+    using TDecl = ICIMQualifierDecl;
     return BitsFromText<TDecl::EFlavor>(text, {{"OVERRIDABLE", TDecl::kFlavorOverridable},
                                                {"TOSUBCLASS", TDecl::kFlavorToSubclass},
                                                {"TOINSTANCE", TDecl::kFlavorToInstance},
@@ -35,7 +35,7 @@ ICIMQualifierDecl::EFlavor FlavorFromText(const std::string& text)
 
 ICIMQualifierDecl::EScope ScopeFromText(const std::string& text)
 {
-    typedef ICIMQualifierDecl TDecl;
+    using TDecl = ICIMQualifierDecl;
     return BitsFromText<TDecl::EScope>(text, {{"CLASS", TDecl::kScopeClass},
                                               {"ASSOCIATION", TDecl::kScopeAssociation},
                                               {"INDICATION", TDecl::kScopeIndication},

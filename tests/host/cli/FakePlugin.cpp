@@ -30,7 +30,7 @@
 namespace NKOLVRX20 {
 namespace {
 
-typedef TCIMValue::TCIMType TType;
+using TType = TCIMValue::TCIMType;
 
 bool HasFault(const char* name)
 {

@@ -10,7 +10,7 @@ namespace apinames {
 
 // ---- shapes that several classes share
 
-template <class T, class Const> void useHandle(T& x, const Const& readOnly)
+template <typename T, typename Const> void useHandle(T& x, const Const& readOnly)
 {
     T copy(x);
     copy = x;
@@ -20,7 +20,7 @@ template <class T, class Const> void useHandle(T& x, const Const& readOnly)
     (void)(readOnly.identical(twin) && readOnly.isUninitialized());
 }
 
-template <class T, class Const> void useQualifiers(T& x, const Const& readOnly)
+template <typename T, typename Const> void useQualifiers(T& x, const Const& readOnly)
 {
     x.addQualifier(CIMQualifier("Q", CIMValue(true)));
     CIMQualifier qualifier = x.getQualifier(x.findQualifier("Q"));
@@ -28,7 +28,7 @@ template <class T, class Const> void useQualifiers(T& x, const Const& readOnly)
     x.removeQualifier(0);
 }
 
-template <class T, class Const> void useProperties(T& x, const Const& readOnly)
+template <typename T, typename Const> void useProperties(T& x, const Const& readOnly)
 {
     x.addProperty(CIMProperty("P", CIMValue(true)));
     CIMProperty property = x.getProperty(x.findProperty("P"));
@@ -39,14 +39,14 @@ template <class T, class Const> void useProperties(T& x, const Const& readOnly)
     (void)name;
 }
 
-template <class T> void useOrigin(T& x)
+template <typename T> void useOrigin(T& x)
 {
     x.setName(x.getName());
     x.setClassOrigin(x.getClassOrigin());
     x.setPropagated(x.getPropagated());
 }
 
-template <class T> Uint32 useArray(const T& x)
+template <typename T> Uint32 useArray(const T& x)
 {
     Array<T> array;
     Array<T> sized(2);
@@ -95,7 +95,7 @@ void useStrings(String& x, const Char16* units)
     x.clear();
 }
 
-template <class Name> void useNames(Name& name)
+template <typename Name> void useNames(Name& name)
 {
     const String text = name.getString();
     name = Name("root");
@@ -143,7 +143,7 @@ void useDateTimes(CIMDateTime& x)
     x.clear();
 }
 
-template <class Flags> void useBits(Flags& x, const Flags& other)
+template <typename Flags> void useBits(Flags& x, const Flags& other)
 {
     Flags copy(x);
     copy = x + other;
@@ -293,7 +293,7 @@ void useArrays()
     useArray(CIMParamValue());
 }
 
-template <class Thrown, class... Arguments> void useException(const Arguments&... arguments)
+template <typename Thrown, typename... Arguments> void useException(const Arguments&... arguments)
 {
     Thrown thrown(arguments...);
     const Thrown copy(thrown);

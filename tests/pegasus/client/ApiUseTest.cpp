@@ -21,7 +21,8 @@ namespace {
 
 // ---- the exceptions and their one common root
 
-template <class T> constexpr bool kIsDirectException = is_base_of_v<Exception, T> && !is_base_of_v<std::exception, T>;
+template <typename T>
+constexpr bool kIsDirectException = is_base_of_v<Exception, T> && !is_base_of_v<std::exception, T>;
 static_assert(kIsDirectException<IndexOutOfBoundsException> && kIsDirectException<AlreadyExistsException> &&
               kIsDirectException<InvalidNameException> && kIsDirectException<InvalidNamespaceNameException> &&
               kIsDirectException<UninitializedObjectException> && kIsDirectException<TypeMismatchException> &&
@@ -41,7 +42,7 @@ static_assert(!is_convertible_v<CIMObject, CIMInstance> && is_constructible_v<CI
 
 // ---- every kind of value there and back
 
-template <class T> void expectThereAndBack(const T& x)
+template <typename T> void expectThereAndBack(const T& x)
 {
     const CIMValue value(x);
     CIMValue again;

@@ -60,7 +60,7 @@ void connect(CIMClient& client, const test::ScriptedPeer& peer, Uint32 timeoutMs
 }
 
 // "Pegasus::X: message" of what the call throws; "ok" when it does not.
-template <class Call> std::string outcome(Call&& call)
+template <typename Call> std::string outcome(Call&& call)
 {
     try {
         call();
@@ -73,7 +73,7 @@ template <class Call> std::string outcome(Call&& call)
 }
 
 // What the call throws, when it takes the time-out's time.
-template <class Call> std::string outcomeInTime(Call&& call)
+template <typename Call> std::string outcomeInTime(Call&& call)
 {
     const auto start = std::chrono::steady_clock::now();
     const std::string result = outcome(call);

@@ -31,7 +31,7 @@ std::string valueText(const CIMValue& value)
     return value.isNull() ? "NULL" : utf8(value.toString());
 }
 
-template <class Holder> std::string qualifierList(const Holder& holder)
+template <typename Holder> std::string qualifierList(const Holder& holder)
 {
     std::string out;
     for (Uint32 i = 0; i < holder.getQualifierCount(); ++i) {

@@ -12,7 +12,7 @@
 
 namespace NKOLVRX20 {
 
-typedef std::vector<boost::shared_ptr<TPEGASUSInstance>> TInstances;
+using TInstances = std::vector<boost::shared_ptr<TPEGASUSInstance>>;
 
 inline Pegasus::CIMInstance Instance(const char* className, const std::string& path,
                                      const std::vector<Pegasus::CIMProperty>& properties)

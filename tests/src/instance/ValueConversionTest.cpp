@@ -14,8 +14,8 @@
 namespace NKOLVRX20 {
 namespace {
 
-typedef TCIMValue::TCIMType TType;
-typedef std::vector<TCIMValue> TElements;
+using TType = TCIMValue::TCIMType;
+using TElements = std::vector<TCIMValue>;
 
 constexpr char kTime[] = "20261121041500.123456+060";
 constexpr char kInterval[] = "00000003040506.000000:000";

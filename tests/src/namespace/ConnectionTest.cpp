@@ -22,7 +22,7 @@ void Pegasus::CIMClient::setTimeout(Uint32 timeoutMs)
     if (gSettingsFail) {
         throw Exception("no memory");
     }
-    typedef void (*TFunction)(CIMClient*, Uint32);
+    using TFunction = void (*)(CIMClient*, Uint32);
     static const auto fgNext = reinterpret_cast<TFunction>(::dlsym(RTLD_NEXT, "_ZN7Pegasus9CIMClient10setTimeoutEj"));
     fgNext(this, timeoutMs);
 }

@@ -22,8 +22,8 @@ using ::testing::Contains;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 
-typedef TCIMValue::TCIMType TType;
-typedef ICIMQualifierDecl TDecl;
+using TType = TCIMValue::TCIMType;
+using TDecl = ICIMQualifierDecl;
 
 class ClassMirrorTest : public ::testing::Test
 {

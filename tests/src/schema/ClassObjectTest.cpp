@@ -24,7 +24,7 @@ using Pegasus::CIMValue;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 
-typedef TCIMValue::TCIMType TType;
+using TType = TCIMValue::TCIMType;
 
 class ClassObjectTest : public ::testing::Test
 {

@@ -19,8 +19,8 @@ namespace {
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 
-typedef TCIMValue::TCIMType TType;
-typedef ICIMQualifierDecl TDecl;
+using TType = TCIMValue::TCIMType;
+using TDecl = ICIMQualifierDecl;
 
 class DeclarationTest : public ::testing::Test
 {
