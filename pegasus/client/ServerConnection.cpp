@@ -1,6 +1,7 @@
 #include "pegasus/client/ServerConnection.h"
 
 #include "pegasus/base/LocalSocket.h"
+#include "pegasus/client/TreeRoute.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -70,10 +71,22 @@ void ServerConnection::open(const Deadline& deadline)
     close();
     fHasReceived = false;
     if (fAddress.isLocal) {
-        openLocal(deadline);
+        openLocal(base::localSocketHome(), "Cannot connect to local CIM server. Connection failed.", deadline);
+    } else if (isLocalRoute()) {
+        openLocal(treeHome(), "Cannot connect to " + fAddress.text() + ". Connection failed.", deadline);
     } else {
         openTcp(deadline);
     }
+}
+
+bool ServerConnection::isLocalRoute() const
+{
+    for (const addrinfo* candidate = fCandidates.get(); candidate; candidate = candidate->ai_next) {
+        if (isLoopback(*candidate->ai_addr)) {
+            return isReachedBySocket(treeHome(), fAddress.port, fAddress.text());
+        }
+    }
+    return false;
 }
 
 void ServerConnection::openTcp(const Deadline& deadline)
@@ -89,6 +102,9 @@ void ServerConnection::openTcp(const Deadline& deadline)
             // A request is one message; waiting to fill a packet would only delay it.
             const int on = 1;
             ::setsockopt(fFd, IPPROTO_TCP, TCP_NODELAY, &on, sizeof(on));
+            if (!treeHome().empty() && isLoopback(*candidate->ai_addr)) {
+                requireTrustedServer();
+            }
             return;
         }
         close();
@@ -96,12 +112,21 @@ void ServerConnection::openTcp(const Deadline& deadline)
     throw CannotConnectException(toString("Cannot connect to " + fAddress.text() + ". Connection failed."));
 }
 
-void ServerConnection::openLocal(const Deadline& deadline)
+void ServerConnection::requireTrustedServer()
+{
+    const std::string fault = serverFault(fFd, fAddress.port);
+    if (!fault.empty()) {
+        close();
+        throw CannotConnectException(toString("Cannot connect to " + fAddress.text() + ". " + fault + "."));
+    }
+}
+
+void ServerConnection::openLocal(const std::string& home, const std::string& refusal, const Deadline& deadline)
 {
     try {
-        fFd = base::connectLocalSocket(base::localSocketHome(), deadline).release();
+        fFd = base::connectLocalSocket(home, deadline).release();
     } catch (const std::system_error&) {
-        throw CannotConnectException("Cannot connect to local CIM server. Connection failed.");
+        throw CannotConnectException(toString(refusal));
     }
     const int flags = ::fcntl(fFd, F_GETFL);
     ::fcntl(fFd, F_SETFL, flags | O_NONBLOCK);

@@ -43,7 +43,9 @@ class ServerConnection
     // Where open() goes from now on. A host name is looked up here and not again, because nothing but the resolver's
     // own settings bounds that. Throws: InvalidLocatorException.
     void setAddress(const ServerAddress& address);
-    // Throws: CannotConnectException, also when the deadline passes. Requires: setAddress().
+    // A loopback address leads to the private socket of the library's own tree if the tree's server serves the port,
+    // and otherwise to a server of root or of the process's own user only. Throws: CannotConnectException, also when
+    // the deadline passes. Requires: setAddress().
     void open(const base::Deadline& deadline);
     void close();
     bool isOpen() const { return fFd >= 0; }
@@ -59,7 +61,11 @@ class ServerConnection
   private:
     Result waitFor(short events, const base::Deadline& deadline) const;
     void openTcp(const base::Deadline& deadline);
-    void openLocal(const base::Deadline& deadline);
+    void openLocal(const std::string& home, const std::string& refusal, const base::Deadline& deadline);
+    // Throws: CannotConnectException when another user serves the open connection, which is closed then.
+    void requireTrustedServer();
+    // Whether the tree's own server is meant. Throws: CannotConnectException when it does not serve the port.
+    bool isLocalRoute() const;
 
     ServerAddress fAddress;
     std::shared_ptr<addrinfo> fCandidates; // what a host name was looked up to; null for the private socket

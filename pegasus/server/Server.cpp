@@ -1,6 +1,7 @@
 #include "pegasus/server/Server.h"
 
 #include "pegasus/base/LocalSocket.h"
+#include "pegasus/base/TcpOwner.h"
 #include "pegasus/server/ServerSettings.h"
 #include "pegasus/server/admin/Log.h"
 #include "pegasus/server/admin/StopSignal.h"
@@ -92,7 +93,7 @@ std::vector<Acceptor::Source> acceptFrom(Listeners listeners, ConnectionGroup& r
 {
     std::vector<Acceptor::Source> sources;
     if (listeners.remote) {
-        const auto lookup = std::make_shared<TcpPeerLookup>();
+        const auto lookup = std::make_shared<base::TcpOwnerLookup>();
         sources.push_back({std::move(listeners.remote), [lookup](int fd) { return lookup->userOf(fd); }, &remote});
     }
     sources.push_back({std::move(listeners.local), localPeerUser, &local});

@@ -57,8 +57,8 @@ void PrintInventory(ICIMNamespace& ns)
 }
 
 // The core logger, which also notices in the process service's lines that cimserver failed to start. The plug-in
-// cannot: its client connects to whatever answers on the port, and that may be the server of another host that chose
-// the same port.
+// does not look at that: where its client cannot see whose server answers on the port, that may be the server of
+// another host that chose the same port.
 class TServerWatch : public ILogger
 {
   public:

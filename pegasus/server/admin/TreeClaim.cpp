@@ -84,7 +84,9 @@ void requireOwnTree(const Config& config)
 TreeClaim::~TreeClaim()
 {
     StartFile::remove(fRecord.startFile, fRecord.pid);
-    fLock.release();
+    if (fAnnounced) {
+        fLock.release();
+    }
 }
 
 void TreeClaim::lock(const std::string& home)
@@ -113,6 +115,7 @@ try {
 
 void TreeClaim::announce(const std::string& repository)
 {
+    fAnnounced = true;
     if (fReplaced != 0) {
         Log::write(LogLevel::kWarning,
                    "Ended the server of process " + std::to_string(fReplaced) + ", whose repository was gone.");

@@ -1,8 +1,8 @@
 #include "pegasus/server/net/Acceptor.h"
 
+#include "pegasus/base/TcpOwner.h"
 #include "pegasus/server/admin/Log.h"
 #include "pegasus/server/net/Listener.h"
-#include "pegasus/server/net/PeerCheck.h"
 
 #include <cerrno>
 
@@ -86,7 +86,7 @@ bool Acceptor::accept(Source& source)
         return !exhausted;
     }
     const std::optional<uid_t> user = source.peerUser(connection.get());
-    if (!mayConnect(user)) {
+    if (!base::isTrustedUser(user)) {
         fRefusalLog.note(user);
         return true;
     }

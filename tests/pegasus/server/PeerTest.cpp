@@ -1,7 +1,7 @@
 // Who may talk to the server: whose process is at the other end of a connection, and what the kernel says when that
 // changes while it is asked.
+#include "pegasus/base/TcpOwner.h"
 #include "pegasus/server/net/Listener.h"
-#include "pegasus/server/net/PeerCheck.h"
 
 #include <gtest/gtest.h>
 
@@ -98,7 +98,7 @@ class PeerTest : public testing::Test
 
     base::Descriptor fListener;
     std::uint16_t fPort;
-    TcpPeerLookup fLookup;
+    base::TcpOwnerLookup fLookup;
 };
 
 TEST_F(PeerTest, theKernelSaysWhoThePeerIs)
@@ -116,6 +116,35 @@ TEST_F(PeerTest, theKernelSaysWhoThePeerIs)
     EXPECT_FALSE(fLookup.userOf(server.get()));
 }
 
+// Before the connection is accepted the listener counts, afterwards the accepted socket; one that the server has closed
+// has no owner.
+TEST_F(PeerTest, theKernelSaysWhoServes)
+{
+    for (const bool isMapped : {false, true}) {
+        SCOPED_TRACE(isMapped ? "mapped" : "IPv4");
+        const base::Descriptor client = isMapped ? connectMapped(fPort) : connectTo(fPort);
+        if (!client) {
+            GTEST_SKIP() << "this machine has no IPv6";
+        }
+        EXPECT_EQ(fLookup.listenerFromNetlink(client.get()), ::geteuid());
+        EXPECT_EQ(fLookup.listenerFromTable(client.get()), ::geteuid());
+        EXPECT_FALSE(fLookup.userOf(client.get()));
+        EXPECT_EQ(fLookup.serverOf(client.get()), ::geteuid());
+        base::Descriptor server = accept();
+        EXPECT_EQ(fLookup.userFromNetlink(client.get()), ::geteuid());
+        EXPECT_EQ(fLookup.userFromTable(client.get()), ::geteuid());
+        server.reset();
+        EXPECT_EQ(fLookup.listenerFromNetlink(client.get()), ::geteuid()) << "the listener is still there";
+        EXPECT_FALSE(fLookup.serverOf(client.get()));
+    }
+    const base::Descriptor last = connectTo(fPort);
+    const base::Descriptor accepted = accept();
+    fListener.reset();
+    EXPECT_FALSE(fLookup.listenerFromNetlink(last.get()));
+    EXPECT_FALSE(fLookup.listenerFromTable(last.get()));
+    EXPECT_EQ(fLookup.serverOf(last.get()), ::geteuid());
+}
+
 TEST_F(PeerTest, aMappedAddressIsTheSamePeer)
 {
     const base::Descriptor client = connectMapped(fPort);
@@ -129,11 +158,11 @@ TEST_F(PeerTest, aMappedAddressIsTheSamePeer)
 // port: the pair's new owner must not be taken for the owner of the queued request.
 TEST_F(PeerTest, aPortThatChangesHandsDuringTheLookUpIsNobodys)
 {
-    using Look = std::optional<uid_t> (*)(TcpPeerLookup&, int);
+    using Look = std::optional<uid_t> (*)(base::TcpOwnerLookup&, int);
     const std::pair<const char*, Look> rows[] = {
-        {"netlink", [](TcpPeerLookup& lookup, int fd) { return lookup.userFromNetlink(fd); }},
-        {"table", [](TcpPeerLookup& lookup, int fd) { return lookup.userFromTable(fd); }},
-        {"either", [](TcpPeerLookup& lookup, int fd) { return lookup.userOf(fd); }}};
+        {"netlink", [](base::TcpOwnerLookup& lookup, int fd) { return lookup.userFromNetlink(fd); }},
+        {"table", [](base::TcpOwnerLookup& lookup, int fd) { return lookup.userFromTable(fd); }},
+        {"either", [](base::TcpOwnerLookup& lookup, int fd) { return lookup.userOf(fd); }}};
     for (const auto& [name, look] : rows) {
         SCOPED_TRACE(name);
         base::Descriptor attacker = connectTo(fPort);
@@ -165,7 +194,7 @@ TEST_F(PeerTest, theTableIsReadUnderTheSameRule)
     const base::Descriptor client = connectTo(fPort);
     const base::Descriptor server = accept();
     const std::string table = std::filesystem::temp_directory_path() / ("peer-table-" + std::to_string(::getpid()));
-    const TcpPeerLookup lookup(table);
+    const base::TcpOwnerLookup lookup(table);
     const auto write = [&](std::uint16_t from, const TableRow& row) {
         char text[200];
         std::snprintf(text, sizeof text,
@@ -193,10 +222,10 @@ TEST_F(PeerTest, theTableIsReadUnderTheSameRule)
 
 TEST(PeerRuleTest, onlyRootAndTheServersUserMayConnect)
 {
-    EXPECT_TRUE(mayConnect(0));
-    EXPECT_TRUE(mayConnect(::geteuid()));
-    EXPECT_FALSE(mayConnect(::geteuid() + 4711));
-    EXPECT_FALSE(mayConnect(std::nullopt));
+    EXPECT_TRUE(base::isTrustedUser(0));
+    EXPECT_TRUE(base::isTrustedUser(::geteuid()));
+    EXPECT_FALSE(base::isTrustedUser(::geteuid() + 4711));
+    EXPECT_FALSE(base::isTrustedUser(std::nullopt));
 }
 
 } // namespace
