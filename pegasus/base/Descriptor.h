@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cerrno>
 #include <utility>
 
 #include <unistd.h>
@@ -25,7 +26,15 @@ class Descriptor
     // Ownership: passes to the caller.
     int release() noexcept { return std::exchange(fFd, -1); }
     // Closes what it owns, then owns `fd`. errno stays as it was, so that it may be read after a failed call.
-    void reset(int fd = -1) noexcept;
+    void reset(int fd = -1) noexcept
+    {
+        if (fFd >= 0) {
+            const int error = errno;
+            ::close(fFd);
+            errno = error;
+        }
+        fFd = fd;
+    }
 
   private:
     int fFd = -1;

@@ -25,7 +25,10 @@ bool isAsciiBlock(const char* from) noexcept
 std::size_t copyAsciiBlocks(const char* from, std::size_t size, Char16* to) noexcept
 {
     std::size_t done = 0;
-    for (; size - done >= kBlock && isAsciiBlock(from + done); done += kBlock) {
+    for (; size - done >= kBlock; done += kBlock) {
+        if (!isAsciiBlock(from + done)) {
+            break;
+        }
         for (std::size_t i = 0; i < kBlock; ++i) {
             to[done + i] = Char16(static_cast<unsigned char>(from[done + i]));
         }

@@ -26,8 +26,8 @@ struct ClientLimits
 
 namespace Pegasus {
 
-// What a client is inside: an address, a connection that is opened when it is needed, and the exchange of one request
-// for its answer within the time-out.
+// The inside of a CIMClient: an address, a connection that is opened when it is needed, and the exchange of one request
+// and its answer within the time-out.
 class CIMClientRep
 {
   public:
@@ -43,10 +43,9 @@ class CIMClientRep
     void connect(const client::ServerAddress& address);
     void disconnect();
 
-    // Sends the request and gives each element of the result to `onContent`. Whatever goes wrong, the connection is
-    // closed and the next call opens a new one.
-    // An ERROR element that says success is an answer without a result.
-    // Throws: what CIMClient's operations throw.
+    // Sends the request and passes each element of the result to `onContent`. After a failure the connection is closed
+    // and the next call opens a new one. An ERROR element with the code 0 is an answer without a result. Throws: what
+    // CIMClient's operations throw.
     void exchange(const client::Request& request, const ContentHandler& onContent);
 
   private:

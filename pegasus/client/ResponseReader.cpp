@@ -41,7 +41,7 @@ constexpr std::string_view kIntrinsicMethods[] = {
     throw CIMClientResponseException(base::fromUtf8(text));
 }
 
-void expectVersion(const XmlElement& tag, std::string_view attribute, const XmlAttribute& value)
+void expectVersion(const XmlElement& tag, std::string_view attribute, XmlAttribute value)
 {
     if (!value) {
         tag.fail(Kind::kInvalid, "missing CIM." + std::string(attribute) + " attribute");
@@ -57,7 +57,7 @@ bool isProtocolOne(std::string_view version)
            version.find_first_not_of("0123456789", 2) == std::string_view::npos;
 }
 
-std::string_view required(const XmlElement& tag, std::string_view attribute, const XmlAttribute& value)
+std::string_view required(const XmlElement& tag, std::string_view attribute, XmlAttribute value)
 {
     if (!value) {
         tag.fail(Kind::kInvalid, "missing " + std::string(tag.name()) + "." + std::string(attribute) + " attribute");

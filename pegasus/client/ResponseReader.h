@@ -12,7 +12,7 @@
 
 namespace Pegasus::client {
 
-// What a request asked, and so what its answer has to be.
+// What the answer to a request has to be.
 struct ExpectedResponse
 {
     std::string messageId;
@@ -34,10 +34,10 @@ class ResponseReader : private wire::XmlSliceHandler
     ResponseReader(const ExpectedResponse& expected, wire::ElementDecoder& decoder, ContentHandler onContent);
 
     void feed(std::string_view bytes) { fSlicer.feed(bytes); }
-    // The body has ended as it should. Throws: XmlError when the answer has not.
+    // The body has ended. Throws: XmlError when the answer is not complete.
     void finish();
 
-    // The ERROR element of the answer, if there was one; it may say success.
+    // Returns: the answer's ERROR element, if there was one; its code may be 0, success.
     const std::optional<CIMException>& error() const { return fError; }
     wire::XmlPlace place() const { return fSlicer.place(); }
 

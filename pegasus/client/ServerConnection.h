@@ -40,8 +40,8 @@ class ServerConnection
     ServerConnection(const ServerConnection&) = delete;
     ServerConnection& operator=(const ServerConnection&) = delete;
 
-    // Where open() goes from now on. A host name is looked up here and not again, because nothing but the resolver's
-    // own settings bounds that. Throws: InvalidLocatorException.
+    // Sets where open() connects to. A host name is looked up here, once: only the resolver's own settings bound that.
+    // Throws: InvalidLocatorException.
     void setAddress(const ServerAddress& address);
     // A loopback address leads to the private socket of the library's own tree if the tree's server serves the port,
     // and otherwise to a server of root or of the process's own user only. Throws: CannotConnectException, also when
@@ -49,13 +49,13 @@ class ServerConnection
     void open(const base::Deadline& deadline);
     void close();
     bool isOpen() const { return fFd >= 0; }
-    // Has the server ever sent anything on it?
+    // Returns: whether the server has sent anything on it.
     bool hasReceived() const { return fHasReceived; }
-    // Has the server closed the idle connection, or sent what nobody asked for?
+    // Returns: whether the server has closed the idle connection, or sent something without a request.
     bool isStale() const;
 
     Result send(std::string_view bytes, const base::Deadline& deadline);
-    // Waits for bytes. `received` is how many came.
+    // Waits for bytes. `received` becomes how many came.
     Result receive(char* buffer, std::size_t capacity, const base::Deadline& deadline, std::size_t& received);
 
   private:

@@ -12,7 +12,7 @@
 
 namespace Pegasus {
 
-// In front of the elements, in one piece of memory. No header at all is the empty array.
+// The header of the elements, which follow it in the same piece of memory. An empty array may have none.
 struct ArrayHeader
 {
     std::atomic<Uint32> fRefs{1};
@@ -156,7 +156,7 @@ template <typename T> T* Array<T>::writable()
     return fHeader ? array_detail::elements<T>(fHeader) : nullptr;
 }
 
-// Opens a gap of default elements; the array is this one's own afterwards. Returns: the gap.
+// Opens a gap of default elements, in a copy when the array was shared. Returns: the gap.
 template <typename T> T* Array<T>::makeRoom(Uint32 index, Uint32 count)
 {
     const Uint32 oldSize = size();

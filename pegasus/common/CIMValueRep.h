@@ -11,7 +11,7 @@
 
 namespace Pegasus {
 
-// Element type T's number among the CIM types.
+// The CIM type of elements of the C++ type T.
 template <typename T> struct CIMTypeOf;
 #define PEGASUS_CIM_TYPE_OF(T, NUMBER)                                                                                 \
     template <> struct CIMTypeOf<T>                                                                                    \
@@ -126,7 +126,7 @@ template <typename Visitor> decltype(auto) visitType(CIMType type, Visitor&& vis
     }
 }
 
-// What the library itself does with values: no copies of what they hold.
+// The library's own access to values; it does not copy what they hold.
 struct ValueAccess
 {
     // A value that takes the object as it is.

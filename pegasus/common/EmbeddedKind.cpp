@@ -4,19 +4,10 @@
 
 namespace Pegasus {
 
-EmbeddedKind embeddedKind(CIMType type, const Array<CIMQualifier>& qualifiers)
+EmbeddedKind embeddedKindByQualifier(const Array<CIMQualifier>& qualifiers)
 {
     static const CIMName kEmbeddedObject("EmbeddedObject");
     static const CIMName kEmbeddedInstance("EmbeddedInstance");
-    if (type == CIMTYPE_OBJECT) {
-        return EmbeddedKind::kObject;
-    }
-    if (type == CIMTYPE_INSTANCE) {
-        return EmbeddedKind::kInstance;
-    }
-    if (type != CIMTYPE_STRING || qualifiers.size() == 0) {
-        return EmbeddedKind::kNone;
-    }
     if (ObjectAccess::isTrue(qualifiers, kEmbeddedObject)) {
         return EmbeddedKind::kObject;
     }

@@ -60,7 +60,7 @@ bool isDottedName(std::string_view text)
     return !isAllDigits(label);
 }
 
-// What is left of the text behind the parts that were read.
+// Reads the parts of a path from left to right; fText is what is left.
 class PathParser
 {
   public:

@@ -139,7 +139,7 @@ struct ObjectAccess
         return true;
     }
 
-    // Is there a qualifier of this name, boolean and true?
+    // Returns: whether there is a qualifier of this name that is boolean and true.
     static bool isTrue(const Array<CIMQualifier>& qualifiers, const CIMName& name)
     {
         const Uint32 index = find(qualifiers, name);

@@ -89,7 +89,7 @@ const char* notNull(const char* text)
     return text;
 }
 
-// The text up to the bad byte, then that byte and the few behind it in hex.
+// The text up to the bad byte, then that byte and the next few in hexadecimal.
 [[noreturn]] void throwNotUtf8(std::string_view text, std::size_t index)
 {
     constexpr std::size_t kShownBytes = 6;
@@ -310,7 +310,7 @@ void String::remove(Uint32 index, Uint32 size)
     }
     makeWritable(fRep, oldSize);
     Char16* hole = fRep->units() + index;
-    // The zero behind the text moves along.
+    // The zero after the text moves along.
     std::memmove(static_cast<void*>(hole), hole + size, (oldSize - index - size + 1) * sizeof(Char16));
     fRep->fSize = oldSize - size;
 }

@@ -11,7 +11,7 @@
 
 namespace Pegasus {
 
-// The code units follow in the same piece of memory, with a zero behind them.
+// The code units and a zero follow in the same piece of memory.
 struct StringRep : RefCounted
 {
     Uint32 fSize = 0;
@@ -28,7 +28,7 @@ struct StringRep : RefCounted
 // What the library itself does with strings beyond their public interface.
 struct StringAccess
 {
-    // Null for an empty text, perhaps.
+    // Returns: null for a text that has not held anything yet.
     static const StringRep* rep(const String& text) noexcept { return text.fRep.get(); }
 };
 

@@ -98,8 +98,7 @@ Uint32 countFrom(XmlElement child)
 
 // ---- attributes
 
-const CIMName& ElementDecoder::nameAttribute(const XmlElement& element, std::string_view attribute,
-                                             const XmlAttribute& value)
+const CIMName& ElementDecoder::nameAttribute(const XmlElement& element, std::string_view attribute, XmlAttribute value)
 {
     if (!value) {
         failMissing(element, attribute);
@@ -113,12 +112,12 @@ const CIMName& ElementDecoder::nameAttribute(const XmlElement& element, std::str
     }
 }
 
-CIMName ElementDecoder::optionalName(const XmlElement& element, std::string_view attribute, const XmlAttribute& value)
+CIMName ElementDecoder::optionalName(const XmlElement& element, std::string_view attribute, XmlAttribute value)
 {
     return !value ? CIMName() : nameAttribute(element, attribute, value);
 }
 
-bool ElementDecoder::boolAttribute(const XmlElement& element, std::string_view attribute, const XmlAttribute& value,
+bool ElementDecoder::boolAttribute(const XmlElement& element, std::string_view attribute, XmlAttribute value,
                                    bool ifMissing)
 {
     if (!value) {
@@ -133,7 +132,7 @@ bool ElementDecoder::boolAttribute(const XmlElement& element, std::string_view a
     failIllegal(element, attribute);
 }
 
-CIMType ElementDecoder::typeAttribute(const XmlElement& element, std::string_view attribute, const XmlAttribute& value)
+CIMType ElementDecoder::typeAttribute(const XmlElement& element, std::string_view attribute, XmlAttribute value)
 {
     if (!value) {
         failMissing(element, attribute);
@@ -149,7 +148,7 @@ CIMType ElementDecoder::typeAttribute(const XmlElement& element, std::string_vie
     failIllegal(element, attribute);
 }
 
-Uint32 ElementDecoder::sizeAttribute(const XmlElement& element, const XmlAttribute& value)
+Uint32 ElementDecoder::sizeAttribute(const XmlElement& element, XmlAttribute value)
 {
     if (!value) {
         return 0;
@@ -207,7 +206,7 @@ CIMQualifier ElementDecoder::decodeQualifier(const XmlElement& element)
     return CIMQualifier(name, value, flavor(element, values + kFirstFlavor), propagated);
 }
 
-// Returns: the first child that is no qualifier.
+// Returns: the first child that is not a qualifier.
 XmlElement ElementDecoder::decodeQualifiers(XmlElement child, Array<CIMQualifier>& qualifiers)
 {
     for (; child.is("QUALIFIER"); child = child.nextSibling()) {
@@ -270,7 +269,7 @@ CIMProperty ElementDecoder::decodeProperty(const XmlElement& element)
     return property;
 }
 
-// `values` begin with NAME, CLASSORIGIN, PROPAGATED. Returns: the first child that is no qualifier.
+// `values` begin with NAME, CLASSORIGIN, PROPAGATED. Returns: the first child that is not a qualifier.
 XmlElement ElementDecoder::beginProperty(const XmlElement& element, const XmlAttribute* values, CIMPropertyRep& rep)
 {
     rep.fName = nameAttribute(element, "NAME", values[0]);
@@ -305,7 +304,7 @@ void ElementDecoder::readReferenceProperty(const XmlElement& element, CIMPropert
     expectEnd(element, hasValue ? child.nextSibling() : child);
 }
 
-// Returns: the first child that is no property.
+// Returns: the first child that is not a property.
 XmlElement ElementDecoder::decodeProperties(XmlElement child, Array<CIMProperty>& properties)
 {
     properties.reserveCapacity(countFrom(child));

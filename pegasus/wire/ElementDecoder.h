@@ -13,8 +13,8 @@
 
 namespace Pegasus::wire {
 
-// CIM-XML elements (DSP0201) to objects. One decoder serves a whole message, or many: it remembers the names it has
-// seen, so that equal names share one text.
+// CIM-XML elements (DSP0201) to objects. One decoder serves many messages: it remembers the names that it has seen, so
+// that equal names share one text.
 //
 // Each function takes the element that its comment names and checks everything in it.
 // Throws: XmlError, with the place. Thread: one thread at a time.
@@ -52,8 +52,8 @@ class ElementDecoder
     CIMValue decodeValue(const XmlElement& element, CIMType type);
 
     // An attribute that holds a name. Throws: XmlError "Illegal value for PROPERTY.NAME attribute", or "missing ...".
-    const CIMName& nameAttribute(const XmlElement& element, std::string_view attribute, const XmlAttribute& value);
-    // UTF-8 to text, with its fault at the element.
+    const CIMName& nameAttribute(const XmlElement& element, std::string_view attribute, XmlAttribute value);
+    // Returns: the text. Throws: XmlError with the element's place when it is not UTF-8.
     String toString(const XmlElement& element, std::string_view utf8);
 
     const XmlLimits& limits() const { return fLimits; }
@@ -70,11 +70,10 @@ class ElementDecoder
     CIMScope decodeScope(const XmlElement& element);
     XmlElement decodeQualifiers(XmlElement child, Array<CIMQualifier>& qualifiers);
     XmlElement decodeProperties(XmlElement child, Array<CIMProperty>& properties);
-    CIMName optionalName(const XmlElement& element, std::string_view attribute, const XmlAttribute& value);
-    bool boolAttribute(const XmlElement& element, std::string_view attribute, const XmlAttribute& value,
-                       bool ifMissing);
-    CIMType typeAttribute(const XmlElement& element, std::string_view attribute, const XmlAttribute& value);
-    Uint32 sizeAttribute(const XmlElement& element, const XmlAttribute& value);
+    CIMName optionalName(const XmlElement& element, std::string_view attribute, XmlAttribute value);
+    bool boolAttribute(const XmlElement& element, std::string_view attribute, XmlAttribute value, bool ifMissing);
+    CIMType typeAttribute(const XmlElement& element, std::string_view attribute, XmlAttribute value);
+    Uint32 sizeAttribute(const XmlElement& element, XmlAttribute value);
     CIMFlavor flavor(const XmlElement& element, const XmlAttribute* values);
 
     // ElementDecoderPaths.cpp
@@ -83,15 +82,14 @@ class ElementDecoder
     CIMObjectPath decodeNameIn(const XmlElement& element, const String& host, const CIMNamespaceName& nameSpace);
 
     // ElementDecoderValues.cpp
-    template <class T> T parseText(const XmlElement& element, std::string_view text);
-    template <class T> CIMValue decodeScalar(const XmlElement& element);
-    template <class T> CIMValue decodeArray(const XmlElement& element);
-    template <class T> T parseUnsigned(const XmlElement& element, std::string_view text);
-    template <class T> T parseSigned(const XmlElement& element, std::string_view text);
+    template <typename T> T parseText(const XmlElement& element, std::string_view text);
+    template <typename T> CIMValue decodeScalar(const XmlElement& element);
+    template <typename T> CIMValue decodeArray(const XmlElement& element);
+    template <typename T> T parseUnsigned(const XmlElement& element, std::string_view text);
+    template <typename T> T parseSigned(const XmlElement& element, std::string_view text);
     CIMValue decodeParameterContent(const XmlElement& element, CIMType type);
     CIMObject decodeEmbedded(const XmlElement& element, std::string_view text);
-    CIMType embeddedType(const XmlElement& element, CIMType type, const XmlAttribute& value1,
-                         const XmlAttribute& value2);
+    CIMType embeddedType(const XmlElement& element, CIMType type, XmlAttribute value1, XmlAttribute value2);
 
     XmlLimits fLimits;
     NameCache fNames;

@@ -15,12 +15,12 @@ XmlElement childOf(const XmlElement& element, std::string_view name)
     return child;
 }
 
-// The sibling that must be there and be the last.
+// Returns: the next sibling, which must be there and be the last.
 XmlElement lastAfter(const XmlElement& child)
 {
     const XmlElement last = child.nextSibling();
     if (!last) {
-        child.fail(Kind::kInvalid, "missing element behind " + std::string(child.name()) + " element");
+        child.fail(Kind::kInvalid, "missing element after " + std::string(child.name()) + " element");
     }
     if (const XmlElement more = last.nextSibling()) {
         more.fail(Kind::kInvalid, "unexpected " + std::string(more.name()) + " element");
@@ -28,7 +28,7 @@ XmlElement lastAfter(const XmlElement& child)
     return last;
 }
 
-CIMKeyBinding::Type keyType(const XmlElement& element, const XmlAttribute& valueType)
+CIMKeyBinding::Type keyType(const XmlElement& element, XmlAttribute valueType)
 {
     if (!valueType || *valueType == "string") {
         return CIMKeyBinding::STRING;

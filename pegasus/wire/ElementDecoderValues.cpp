@@ -155,10 +155,9 @@ CIMObject ElementDecoder::decodeEmbedded(const XmlElement& element, std::string_
     }
 }
 
-CIMType ElementDecoder::embeddedType(const XmlElement& element, CIMType type, const XmlAttribute& value1,
-                                     const XmlAttribute& value2)
+CIMType ElementDecoder::embeddedType(const XmlElement& element, CIMType type, XmlAttribute value1, XmlAttribute value2)
 {
-    const XmlAttribute& kind = value1 ? value1 : value2;
+    const XmlAttribute kind = value1 ? value1 : value2;
     if (!kind) {
         return type;
     }
@@ -251,7 +250,7 @@ CIMParamValue ElementDecoder::decodeParamValue(const XmlElement& element)
     XmlAttribute values[4];
     element.attributes({"NAME", "PARAMTYPE", "EmbeddedObject", "EMBEDDEDOBJECT"}, values);
     const CIMName name = nameAttribute(element, "NAME", values[0]);
-    const bool isTyped = values[1].has_value();
+    const bool isTyped = bool(values[1]);
     // A null without a type: the value is the untyped one that a default-constructed CIMValue is.
     if (!isTyped && !element.firstChild()) {
         return CIMParamValue(name.getString(), CIMValue(), false);

@@ -206,7 +206,7 @@ void appendScope(std::string& out, const CIMScope& scope)
 
 // ---- properties, methods
 
-// The blank behind the name is there twice, as OpenPegasus writes it.
+// Two blanks follow the name, as OpenPegasus writes them.
 void appendPropertyStart(std::string& out, const char* element, const CIMConstProperty& property)
 {
     out.append("<").append(element);

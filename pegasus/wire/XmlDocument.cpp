@@ -182,7 +182,7 @@ XmlPlace XmlDocument::placeOf(const char* position) const
     return placeAtOffset(static_cast<std::size_t>(position - fText));
 }
 
-// The parser has put zeros over some delimiters by now; line feeds are still there, except one right behind a name.
+// The parser has put zeros over some delimiters by now; line feeds are still there, except one directly after a name.
 XmlPlace XmlDocument::placeAtOffset(std::size_t offset) const
 {
     return advance(fStart, std::string_view(fText, std::min(offset, fSize)));
@@ -227,7 +227,7 @@ XmlElement XmlElement::nextSibling() const
 {
     const pugi::xml_node sibling = nodeOf(fNode).next_sibling();
     if (sibling && sibling.type() != pugi::node_element) {
-        fail(Kind::kInvalid, "unexpected text behind " + std::string(name()) + " element");
+        fail(Kind::kInvalid, "unexpected text after " + std::string(name()) + " element");
     }
     return XmlElement(sibling.internal_object(), fDocument);
 }
@@ -263,7 +263,7 @@ void XmlElement::expectName(std::string_view expectedName) const
 void XmlElement::readAttributes(const std::string_view* names, XmlAttribute* values, std::size_t count) const
 {
     for (std::size_t i = 0; i < count; ++i) {
-        values[i].reset();
+        values[i] = XmlAttribute();
     }
     std::size_t seen = 0;
     for (pugi::xml_attribute attribute = nodeOf(fNode).first_attribute(); attribute;
@@ -283,7 +283,7 @@ void XmlElement::readAttributes(const std::string_view* names, XmlAttribute* val
             fail(Kind::kNotWellFormed, "attribute " + quoted(attributeName) + " twice");
         }
         const std::string_view value = attribute.value();
-        values[index] = value;
+        values[index] = XmlAttribute(value);
         if (value.find('<') != std::string_view::npos) {
             fail(Kind::kNotWellFormed, "'<' in attribute " + quoted(attributeName));
         }
@@ -354,7 +354,7 @@ void XmlElement::fail(XmlError::Kind kind, const std::string& cause) const
 
 XmlPlace XmlElement::place() const
 {
-    // The name stands one byte behind the '<'.
+    // The name begins one byte after the '<'.
     const XmlPlace name = fDocument->placeOf(nodeOf(fNode).name());
     return {name.line, name.column - 1};
 }

@@ -6,7 +6,7 @@
 
 namespace Pegasus::wire {
 
-// A line and column (in bytes), both from 1; 0 when not known.
+// A line and a column (in bytes), counted from 1; 0 means unknown.
 struct XmlPlace
 {
     std::size_t line = 0;
@@ -20,7 +20,7 @@ class XmlError : public Exception
   public:
     enum class Kind
     {
-        kNotWellFormed, // no XML: "Not well-formed"
+        kNotWellFormed, // not XML: "Not well-formed"
         kInvalid,       // XML, but not CIM-XML: "Validation error"
         kSemantic,      // CIM-XML whose values do not fit: "Semantic error"
         kTooLarge       // over one of the limits: "Limit exceeded"

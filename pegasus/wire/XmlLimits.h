@@ -4,7 +4,7 @@
 
 namespace Pegasus::wire {
 
-// Bounds on XML that comes from a socket. Each has an error of its own; none is ever reached by a sane message.
+// Bounds on XML that comes from a socket, far above what real messages need. Each has an error of its own.
 struct XmlLimits
 {
     // Elements open at once.

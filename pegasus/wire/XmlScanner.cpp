@@ -1,9 +1,8 @@
 #include "pegasus/wire/XmlScanner.h"
 
 #include <algorithm>
+#include <array>
 #include <cstring>
-
-#include <emmintrin.h>
 
 namespace Pegasus::wire {
 namespace {
@@ -34,26 +33,36 @@ std::size_t findQuote(std::string_view bytes, std::size_t from, char quote)
     return found ? static_cast<std::size_t>(static_cast<const char*>(found) - bytes.data()) : bytes.size();
 }
 
-// The next '>', '"' or ''' from `from`; the size when there is none.
+constexpr std::array<bool, 256> kIsTagMark = [] {
+    std::array<bool, 256> marks{};
+    for (const char c : {'>', '"', '\''}) {
+        marks[static_cast<unsigned char>(c)] = true;
+    }
+    return marks;
+}();
+
+// Returns: the offset of the next '>', '"' or '\'' from `from`; the size when there is none.
 std::size_t findTagMark(std::string_view bytes, std::size_t from)
 {
-    const __m128i greater = _mm_set1_epi8('>');
-    const __m128i quote = _mm_set1_epi8('"');
-    const __m128i apostrophe = _mm_set1_epi8('\'');
-    for (; from + sizeof(__m128i) <= bytes.size(); from += sizeof(__m128i)) {
-        const __m128i block = _mm_loadu_si128(reinterpret_cast<const __m128i*>(bytes.data() + from));
-        const __m128i hits =
-            _mm_or_si128(_mm_cmpeq_epi8(block, greater),
-                         _mm_or_si128(_mm_cmpeq_epi8(block, quote), _mm_cmpeq_epi8(block, apostrophe)));
-        const int mask = _mm_movemask_epi8(hits);
-        if (mask != 0) {
-            return from + static_cast<std::size_t>(__builtin_ctz(static_cast<unsigned>(mask)));
-        }
-    }
-    while (from < bytes.size() && bytes[from] != '>' && bytes[from] != '"' && bytes[from] != '\'') {
+    while (from < bytes.size() && !kIsTagMark[static_cast<unsigned char>(bytes[from])]) {
         ++from;
     }
     return from;
+}
+
+// In blocks of a fixed size, which the compiler counts many bytes at a time.
+std::size_t countLineFeeds(std::string_view bytes)
+{
+    constexpr std::size_t kBlock = 64; // at most 255, for the count of one block
+    std::size_t count = 0;
+    for (; bytes.size() >= kBlock; bytes.remove_prefix(kBlock)) {
+        unsigned char inBlock = 0;
+        for (std::size_t i = 0; i < kBlock; ++i) {
+            inBlock = static_cast<unsigned char>(inBlock + (bytes[i] == '\n' ? 1 : 0));
+        }
+        count += inBlock;
+    }
+    return count + static_cast<std::size_t>(std::count(bytes.begin(), bytes.end(), '\n'));
 }
 
 } // namespace
@@ -135,29 +144,6 @@ std::string_view XmlScanner::tagName(std::string_view tag)
     tag.remove_prefix(tag.substr(0, 2) == "</" ? 2 : 1);
     return tag.substr(0, tag.find_first_of(" \t\r\n/>"));
 }
-
-namespace {
-
-std::size_t countLineFeeds(std::string_view bytes)
-{
-    const __m128i lineFeed = _mm_set1_epi8('\n');
-    const __m128i zero = _mm_setzero_si128();
-    __m128i sums = zero;
-    std::size_t at = 0;
-    for (; at + sizeof(__m128i) <= bytes.size(); at += sizeof(__m128i)) {
-        const __m128i block = _mm_loadu_si128(reinterpret_cast<const __m128i*>(bytes.data() + at));
-        const __m128i ones = _mm_sub_epi8(zero, _mm_cmpeq_epi8(block, lineFeed));
-        sums = _mm_add_epi64(sums, _mm_sad_epu8(ones, zero));
-    }
-    std::size_t count =
-        static_cast<std::size_t>(_mm_cvtsi128_si64(sums) + _mm_cvtsi128_si64(_mm_unpackhi_epi64(sums, sums)));
-    for (; at < bytes.size(); ++at) {
-        count += bytes[at] == '\n' ? 1 : 0;
-    }
-    return count;
-}
-
-} // namespace
 
 XmlPlace advance(XmlPlace place, std::string_view bytes)
 {

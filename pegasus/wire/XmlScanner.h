@@ -28,8 +28,8 @@ struct XmlToken
     std::size_t size = 0;
 };
 
-// Finds where tokens end, and no more: names, attributes and nesting are for the parser.
-// Throws: XmlError (a DOCTYPE, other markup that is none, a token over its limit).
+// Finds where tokens end. Names, attributes and nesting are the parser's to check.
+// Throws: XmlError (a DOCTYPE or another declaration, a token over its limit).
 class XmlScanner
 {
   public:
@@ -38,7 +38,7 @@ class XmlScanner
     // Requires: `bytes` is not empty. `place` is where they begin.
     XmlToken next(std::string_view bytes, XmlPlace place) const;
 
-    // The name in a tag: behind "<" or "</".
+    // Returns: the name in a tag, which begins with "<" or "</".
     static std::string_view tagName(std::string_view tag);
 
   private:

@@ -176,7 +176,7 @@ void XmlSlicer::flush()
     fHasSlices = false;
     char* text = fBuffer.data() + fStart;
     const std::size_t size = fSlicesEnd - fStart;
-    // Counted first: parsing changes the text.
+    // The place is counted first, because parsing changes the text.
     const XmlPlace end = advance(fPlace, std::string_view(text, size));
     for (XmlElement element = fDocument.parseElement(text, size, fPlace); element; element = element.nextSibling()) {
         fHandler.slice(element);
@@ -217,7 +217,7 @@ void XmlSlicer::close(std::string_view name)
     fHandler.closeEnvelope(name);
 }
 
-// Leaves behind everything up to `size` bytes from where tokens were found.
+// Drops everything up to `size` bytes after the last token found.
 void XmlSlicer::consume(std::size_t size)
 {
     const std::size_t end = fScanned + size;

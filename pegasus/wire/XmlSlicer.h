@@ -21,9 +21,9 @@ class XmlSliceHandler
     virtual void slice(const XmlElement& element) = 0;
 };
 
-// Cuts a message that arrives in pieces: the outer elements (the envelope) tag by tag, each element inside them as
-// soon as it is there as a whole. Nothing of it is kept after it was delivered. Throws: XmlError, and what the handler
-// throws; the slicer is of no use afterwards.
+// Cuts a message that arrives in pieces. It delivers the outer elements (the envelope) tag by tag, and each element
+// inside them when all of it has come; then it forgets them.
+// Throws: XmlError, and what the handler throws. After an exception it must not be used again.
 class XmlSlicer
 {
   public:
@@ -31,10 +31,10 @@ class XmlSlicer
     XmlSlicer(std::vector<std::string_view> envelope, XmlSliceHandler& handler, const XmlLimits& limits);
 
     void feed(std::string_view bytes);
-    // The message has ended. Throws: XmlError when its XML has not.
+    // The message has ended. Throws: XmlError when its XML is not complete.
     void finish();
 
-    // How far the message was read.
+    // Returns: the place up to which the message was read.
     XmlPlace place() const { return fPlace; }
 
   private:

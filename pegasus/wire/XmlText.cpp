@@ -5,6 +5,7 @@
 #include "pegasus/base/Utf8.h"
 
 #include <algorithm>
+#include <array>
 #include <cstdint>
 #include <optional>
 
@@ -22,10 +23,20 @@ struct Entity
 };
 constexpr Entity kEntities[] = {{"lt", '<'}, {"gt", '>'}, {"amp", '&'}, {"quot", '"'}, {"apos", '\''}};
 
-bool isForbidden(char c)
+constexpr bool isForbidden(char c)
 {
     return static_cast<unsigned char>(c) < 0x20 && c != '\t' && c != '\n' && c != '\r';
 }
+
+// Per byte: 1 when it means itself in a message.
+constexpr std::array<unsigned char, 256> kPlain = [] {
+    std::array<unsigned char, 256> plain{};
+    for (std::size_t i = 0; i < plain.size(); ++i) {
+        const char c = static_cast<char>(i);
+        plain[i] = c != '&' && c != '\r' && !isForbidden(c) ? 1 : 0;
+    }
+    return plain;
+}();
 
 // `digits` of "#65" or "#x41".
 bool appendCharacter(std::string_view digits, std::string& out)
@@ -100,7 +111,12 @@ std::string_view trimBlanks(std::string_view text)
 
 bool needsResolving(std::string_view text)
 {
-    return std::any_of(text.begin(), text.end(), [](char c) { return c == '&' || c == '\r' || isForbidden(c); });
+    for (const char c : text) {
+        if (kPlain[static_cast<unsigned char>(c)] == 0) {
+            return true;
+        }
+    }
+    return false;
 }
 
 std::string resolveReferences(std::string_view text, std::string& out)

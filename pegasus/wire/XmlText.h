@@ -11,12 +11,12 @@ namespace Pegasus::wire {
 
 std::string_view trimBlanks(std::string_view text);
 
-// Is there a reference, a carriage return or a character that XML does not allow?
+// Returns: whether there is a reference, a carriage return or a character that XML does not allow.
 bool needsResolving(std::string_view text);
 
 // Appends `text` with the five entities and character references resolved and line ends as line feeds. References to
 // control characters are let through, because servers send them.
-// Returns: empty, or what was wrong (a reference that is none, a control character).
+// Returns: empty, or what was wrong (a malformed or unknown reference, a control character).
 std::string resolveReferences(std::string_view text, std::string& out);
 
 // Appends text of a CDATA section: only the line ends are changed.

@@ -181,7 +181,7 @@ bool ScriptedPeer::waitForRequests(std::size_t count, std::chrono::milliseconds 
     return fChanged.wait_for(lock, limit, [&] { return fRequests.size() >= count; });
 }
 
-// Returns: false when the peer is to stop, or the time is over.
+// Returns: false when the peer must stop, or the time is over.
 bool ScriptedPeer::waitFor(int socket, short events, int timeoutMs) const
 {
     pollfd entries[] = {{fStopEvent, POLLIN, 0}, {socket, events, 0}};

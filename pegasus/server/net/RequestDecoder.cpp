@@ -132,7 +132,7 @@ void checkMatch(const HttpRequest& http, const CimRequest& request)
     }
 }
 
-std::string requiredAttribute(XmlElement element, const XmlAttribute& value, const char* name)
+std::string requiredAttribute(XmlElement element, XmlAttribute value, const char* name)
 {
     if (!value) {
         element.fail(XmlError::Kind::kInvalid, std::string("missing ") + name + " attribute");

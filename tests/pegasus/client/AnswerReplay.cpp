@@ -144,7 +144,7 @@ std::vector<AnswerCase> sampleAnswers()
 
 namespace {
 
-// Where the bytes of the body are: all behind the header, or what the chunks hold. Requires: sound framing.
+// Returns: where the bytes of the body are: all after the header, or what the chunks hold. Requires: sound framing.
 std::vector<std::size_t> bodyBytes(std::string_view answer)
 {
     std::vector<std::size_t> places;

@@ -27,7 +27,7 @@ std::string readAnswer(const AnswerCase& answer, const std::vector<std::size_t>&
 std::vector<AnswerCase> sampleAnswers();
 
 // For each byte of the answer: does it belong to the XML's markup (tags without the values of attributes) or to the
-// framing of chunks? Elsewhere a changed byte may be other data, which nobody can tell.
+// framing of chunks? Elsewhere a changed byte is other valid data.
 std::vector<bool> markupBytes(std::string_view answer);
 
 } // namespace test

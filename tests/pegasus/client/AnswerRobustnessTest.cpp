@@ -62,7 +62,7 @@ TEST(AnswerRobustness, AnswerSplitAnywhereIsReadTheSame)
             everyByte.push_back(at);
         }
         for (const std::size_t cut : placesIn(answer)) {
-            // What comes after an error may differ in the place it names, never in being refused.
+            // The same error may name another place.
             const std::string result = readAnswer(answer, {cut});
             ASSERT_TRUE(result == whole || (isRefused(whole) && isRefused(result)))
                 << answer.name << " split at " << cut << ": " << result;

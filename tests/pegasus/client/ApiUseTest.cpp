@@ -137,7 +137,8 @@ TEST(ApiUse, StreamsAndMacros)
 {
     ostringstream out;
     out << String("é\xE5\x90\x8D") << Uint16(Char16('A'));
-    EXPECT_EQ(out.str(), "é\xE5\x90\x8D" "65");
+    EXPECT_EQ(out.str(), "é\xE5\x90\x8D"
+                         "65");
     EXPECT_EQ(inTheNamespace(), Uint32(-1));
     EXPECT_EQ(PEGASUS_UINT64_LITERAL(1), Uint64(1));
     EXPECT_EQ(cimTypeToString(CIMTYPE_INSTANCE), PEGASUS_STD(string)("instance"));

@@ -359,7 +359,7 @@ TEST(ClientConnection, NullNamespaceIsRefusedAndTheClientLives)
 
 TEST(ClientConnection, OnlyWhatReadsIsSentAgainAfterALostAnswer)
 {
-    // The second request of each connection finds it closed, as behind a server that gave up an idle one.
+    // The second request of each connection finds it closed, as when a server gives up an idle one.
     const auto answer = [](const PeerRequest& request) -> PeerAnswer {
         static thread_local std::size_t served = 0;
         if (++served % 2 == 0) {

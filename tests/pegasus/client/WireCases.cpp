@@ -24,7 +24,7 @@ std::string readFile(const std::filesystem::path& path)
     return std::string((std::istreambuf_iterator<char>(file)), std::istreambuf_iterator<char>());
 }
 
-// What stands behind the words that introduce the client's output.
+// Returns: the text after the words that introduce the client's output.
 std::string printedIn(const std::string& note)
 {
     const std::string printed = "Client printed: ";
@@ -73,7 +73,7 @@ wire::XmlElement RecordedCall::parameter(const std::string& name)
             continue;
         }
         child.attributes({"NAME", "PARAMTYPE"}, values);
-        if (values[0] == name) {
+        if (values[0] && *values[0] == name) {
             return child.onlyChild();
         }
     }

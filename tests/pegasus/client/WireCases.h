@@ -22,10 +22,10 @@ std::vector<WireCase> loadWireCases();
 std::string vectorsFolder();
 
 // Makes the recorded call with a client that is connected to `port` and prints the result as the recording did.
-// Returns: "unsupported" for an operation that this library has not.
+// Returns: "unsupported" for an operation that this library does not have.
 std::string replayCall(const WireCase& wireCase, std::uint16_t port, unsigned timeoutMs);
 
-// XML without what makes no difference: order of attributes, blanks between elements.
+// Returns: the XML with its attributes in order and without blanks between elements, for comparison.
 std::string canonicalXml(const std::string& xml);
 
 } // namespace test

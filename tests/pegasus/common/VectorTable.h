@@ -20,7 +20,7 @@ struct Vector
 
     // The text in quotes in the input, its escapes resolved.
     std::string quoted() const;
-    // The id behind its last dot.
+    // Returns: the id after its last dot.
     std::string lastWord() const;
 };
 

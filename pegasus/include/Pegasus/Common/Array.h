@@ -9,7 +9,7 @@ struct ArrayHeader;
 // A growing array; copies share until one is changed. The library holds the code for its own element types
 // (the basic types, Char16, String and the CIM classes); other element types do not link.
 // Throws: IndexOutOfBoundsException for every index or range outside the array.
-template <class T> class PEGASUS_COMMON_LINKAGE Array
+template <typename T> class PEGASUS_COMMON_LINKAGE Array
 {
   public:
     Array() noexcept = default;

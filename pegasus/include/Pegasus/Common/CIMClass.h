@@ -18,7 +18,7 @@ extern template class RepPointer<CIMClassRep>;
 
 // Read-only handle to a class. Copies of a handle share the class; clone() does not.
 // Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
-// IndexOutOfBoundsException; DynamicCastFailedException from an object that is no class.
+// IndexOutOfBoundsException; DynamicCastFailedException from an object that holds an instance.
 class PEGASUS_COMMON_LINKAGE CIMConstClass
 {
   public:

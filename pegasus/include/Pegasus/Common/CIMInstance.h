@@ -17,7 +17,7 @@ extern template class RepPointer<CIMInstanceRep>;
 
 // Read-only handle to an instance. Copies of a handle share the instance; clone() does not.
 // Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
-// IndexOutOfBoundsException; DynamicCastFailedException from an object that is no instance.
+// IndexOutOfBoundsException; DynamicCastFailedException from an object that holds a class.
 class PEGASUS_COMMON_LINKAGE CIMConstInstance
 {
   public:

@@ -5,7 +5,7 @@
 PEGASUS_NAMESPACE_BEGIN
 
 // Status codes of CIM operations (DSP0200); 18 and 19 are not used.
-// The type is given so that a server's code that is none of these can be held, too.
+// The underlying type is fixed, so that a server's code outside this list can be held too.
 enum CIMStatusCode : Uint32
 {
     CIM_ERR_SUCCESS = 0,

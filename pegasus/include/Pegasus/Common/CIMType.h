@@ -26,7 +26,7 @@ enum CIMType
     CIMTYPE_INSTANCE
 };
 
-// Returns: the type's name as MOF and CIM-XML spell it; "unknown" for a number that is no type.
+// Returns: the type's name as MOF and CIM-XML spell it; "unknown" for any other number.
 PEGASUS_COMMON_LINKAGE const char* cimTypeToString(const CIMType type);
 
 PEGASUS_NAMESPACE_END

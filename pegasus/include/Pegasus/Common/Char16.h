@@ -4,7 +4,7 @@
 
 PEGASUS_NAMESPACE_BEGIN
 
-// One UTF-16 code unit. There is no stream inserter of its own: a stream shows the decimal code.
+// One UTF-16 code unit. A stream shows its decimal code.
 class PEGASUS_COMMON_LINKAGE Char16
 {
   public:

@@ -7,7 +7,7 @@ PEGASUS_NAMESPACE_BEGIN
 // The one pointer inside every handle class: counted, to a representation that only the library knows.
 // Null is a state of its own (an uninitialised object, an empty string, a default value).
 // Thread: the count is atomic, so distinct handles may be used in distinct threads.
-template <class Rep> class PEGASUS_COMMON_LINKAGE RepPointer
+template <typename Rep> class PEGASUS_COMMON_LINKAGE RepPointer
 {
   public:
     RepPointer() noexcept = default;
