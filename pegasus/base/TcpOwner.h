@@ -1,8 +1,7 @@
 #pragma once
 
-#include "pegasus/base/Descriptor.h"
+#include "pegasus/base/SocketDiag.h"
 
-#include <cstdint>
 #include <optional>
 #include <string>
 
@@ -45,14 +44,11 @@ class TcpOwnerLookup
         bool known = false; // whether the kernel answered at all
         std::optional<uid_t> user;
     };
-    struct Wanted;
-    Answer askKernel(const Wanted& wanted);
     Answer askForPeer(int fd);
     Answer askForListener(int fd);
 
     std::string fTable;
-    Descriptor fNetlink; // kept open between look-ups
-    std::uint32_t fSequence = 0;
+    SocketDiag fKernel;
 };
 
 // Returns: whether a user's process may be talked to: root's and this process's own user's may.
