@@ -45,6 +45,7 @@ void TClientConnection::Connect(const std::string& host, unsigned short port, co
     LogProgress(fTexts.fEnter);
     for (int failedTries = 1; failedTries <= kTries; ++failedTries) {
         try {
+            // Also the timeout of all later calls, until one of them sets its own.
             fClient->setTimeout(kConnectedTimeoutMs);
             fClient->connect(host.c_str(), port, user.c_str(), password.c_str());
             fConnected = true;
@@ -52,7 +53,7 @@ void TClientConnection::Connect(const std::string& host, unsigned short port, co
             return;
         } catch (const Pegasus::Exception& exception) {
             LogProgress(fTexts.fFailed, ToStdString(exception.getMessage()), " try to reconnect ", failedTries);
-            ::sleep(kPauseSeconds);
+            ::sleep(kPauseSeconds); // after the last try too: a namespace restarts its server next
         }
     }
     throw TVRXException(TVRXStatusCode::kServerConnectionFailed);

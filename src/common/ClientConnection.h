@@ -31,12 +31,12 @@ class TClientConnection
     TClientConnection(const TClientConnection&) = delete;
     TClientConnection& operator=(const TClientConnection&) = delete;
 
-    // Makes the client unless there is one, and gives it the short time-out of an unconnected client.
+    // Makes the client unless there is one, and gives it the short timeout of an unconnected client.
     // Throws: TVRXException 42.
     void Init();
 
     // Connects, with three tries and a pause of one second after each failure; nothing happens when connected.
-    // From then on an operation waits as long as its own time-out says, for hours if nobody sets one.
+    // From then on an operation waits as long as its own timeout says, for hours if nobody sets one.
     // Requires: Init.
     // Throws: TVRXException 42 after the third failure.
     // Blocks: while the server accepts no connection, and the pauses.
@@ -54,7 +54,7 @@ class TClientConnection
     bool fConnected = false;
 };
 
-// What a namespace and a provider have in common: a client of their own, for all calls made on their behalf.
+// What a namespace and a provider share: a client of their own, for all calls made on their behalf.
 class TClientOwner
 {
   public:

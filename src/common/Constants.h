@@ -5,7 +5,7 @@
 
 namespace NKOLVRX20 {
 
-// The default time-out, in seconds.
+// The default timeout, in seconds.
 inline const std::string strTimeout = "60";
 
 // Milliseconds that a question for a class or a qualifier declaration may take, whatever timeout the client had before.
@@ -20,7 +20,7 @@ inline const std::string kRootClassName = "<root>";
 // The tag of a class that is fetched but not offered to the host.
 inline const std::string kCdmTag = "CDM";
 
-// Context keys that name a class's server namespace and its time-out in seconds; both hold strings.
+// Context keys that name a class's server namespace and its timeout in seconds; both hold strings.
 inline const std::string kNspKey = "nsp";
 inline const std::string kTimeoutKey = "timeout";
 

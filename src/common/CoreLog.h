@@ -20,7 +20,7 @@ std::string ToStdString(const Pegasus::String& text);
 
 void WriteCoreLog(ILogger::EVRXLogSeverity severity, const std::string& text);
 
-// Returns: the parts written one after the other; numbers in plain decimal whatever the host's locale is.
+// Returns: the parts, one after the other, with numbers in plain decimal whatever the host's locale is.
 template <typename... TParts> std::string JoinText(const TParts&... parts)
 {
     std::ostringstream text;
@@ -50,17 +50,18 @@ template <typename... TParts> [[noreturn]] void LogAndThrow(unsigned int status,
     throw TVRXException(status);
 }
 
-// Returns: what the exception in flight says, whichever family it is of.
+// Returns: the message of the exception in flight, of whichever family.
+// Requires: a catch block around the call.
 std::string DescribeCurrentException();
 
-// Logs the parts and the exception in flight as a failure; for places that must not throw, so a logger that fails is
-// given up on.
+// Logs the parts and the exception in flight as a failure. For places that must not throw: an exception of the logger
+// is dropped.
 // Requires: a catch block around the call.
 template <typename... TParts> void LogCaughtException(const TParts&... parts) noexcept
 {
     try {
         LogFailure(parts..., DescribeCurrentException());
-    } catch (...) { // nobody is left to tell
+    } catch (...) { // the logger was the last resort
     }
 }
 

@@ -8,7 +8,7 @@ namespace NKOLVRX20 {
 
 namespace {
 
-constexpr std::size_t kRootPathBytes = 1024;
+constexpr std::size_t kRootPathBytes = 1024; // the final null included
 
 } // namespace
 

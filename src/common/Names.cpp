@@ -11,6 +11,7 @@ namespace NKOLVRX20 {
 
 namespace {
 
+// The C library's tests: in an 8-bit locale of the host's process the locale's letters count too.
 bool IsNamePart(char character)
 {
     return character == '_' || std::isalnum(static_cast<unsigned char>(character)) != 0;

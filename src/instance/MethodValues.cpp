@@ -5,8 +5,8 @@
 
 namespace NKOLVRX20 {
 
-// The client library has several families of exceptions, and one of them is no std::exception: a host that passed a
-// text that is not a path must not be ended by it.
+// All families are caught: the client library's exceptions do not derive from std::exception, and one that got through
+// would end a host that passed an invalid path.
 Pegasus::CIMParamValue MethodInput(const char* operation, const std::string& method, const std::string& name,
                                    const boost::function<Pegasus::CIMValue()>& convert)
 {

@@ -17,11 +17,12 @@ Pegasus::CIMParamValue MethodInput(const char* operation, const std::string& met
                                    const boost::function<Pegasus::CIMValue()>& convert);
 
 // Returns: the value that came back from a method, by its own type; null for null and for what the host has no type
-// for. Throws: as pegValToVRX.
+// for.
+// Throws: as pegValToVRX.
 TCIMValue MethodValueToHost(const std::string& name, const Pegasus::CIMValue& value,
                             const boost::shared_ptr<ICIMClass>& forClass);
 
-// Enters the outputs under their names, replacing what is there, and tells onOutput each name.
+// Enters the outputs under their names, replacing what is there, and calls onOutput with each name.
 // Throws: as pegValToVRX; the outputs before the failing one have been entered.
 void AddOutputs(const Pegasus::Array<Pegasus::CIMParamValue>& outputs, const boost::shared_ptr<ICIMClass>& forClass,
                 const boost::function<void(const std::string&)>& onOutput, TCIMContext& entries);

@@ -16,7 +16,7 @@ namespace NKOLVRX20 {
 namespace {
 
 constexpr Pegasus::Uint32 kMethodTimeoutMs = 300000;
-constexpr unsigned char kDecimal = 10;
+constexpr unsigned char kDecimal = 10; // the radix of ToString
 
 boost::shared_ptr<ICIMParameterDecl> ParameterDeclOf(const ICIMClass& instanceClass, const std::string& method,
                                                      const std::string& parameter)
@@ -30,8 +30,8 @@ boost::shared_ptr<ICIMParameterDecl> ParameterDeclOf(const ICIMClass& instanceCl
     return parameterDecl;
 }
 
-// Returns: the namespace, which is the one that has the client for methods.
-// Throws: boost::bad_weak_ptr when it has gone.
+// Returns: the namespace, whose client carries method calls; it is kept alive during the call.
+// Throws: boost::bad_weak_ptr when it is gone.
 boost::shared_ptr<ICIMNamespace> NamespaceOf(const ICIMClass& instanceClass)
 {
     auto ns = instanceClass.GetNamespace({});

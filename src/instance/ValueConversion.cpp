@@ -13,9 +13,10 @@ namespace {
 
 using TType = TCIMValue::TCIMType;
 
-constexpr unsigned char kDecimal = 10;
+constexpr unsigned char kDecimal = 10; // the radix of ToString
 
-// One element of a host value, from what the client library holds. The two 64-bit types differ only in name.
+// One element of a host value from one of the client library's, one function for each type whose host type differs.
+// The library's 64-bit integers are long long, for which TCIMValue has no constructor; long has the same 64 bits.
 TCIMValue ToHost(Pegasus::Uint64 element)
 {
     return TCIMValue(static_cast<unsigned long>(element));
@@ -26,6 +27,7 @@ TCIMValue ToHost(Pegasus::Sint64 element)
     return TCIMValue(static_cast<long>(element));
 }
 
+// By the decimal text of the code ("65" for 'A'): the form in which hosts take a character from a server.
 TCIMValue ToHost(const Pegasus::Char16& element)
 {
     return TCIMValue(TCIMChar16(std::to_string(static_cast<Pegasus::Uint16>(element))));
@@ -36,7 +38,8 @@ TCIMValue ToHost(const Pegasus::CIMDateTime& element)
     return TCIMValue(TCIMDateTime(ToStdString(element.toString())));
 }
 
-// In an array a string takes the way through the stream, which is not UTF-8.
+// For the elements of arrays. The stream operator writes UTF-8 in this client library; in OpenPegasus its encoding
+// depends on how the library was built, and hosts rely on that text. A scalar is UTF-8 with either.
 TCIMValue ToHost(const Pegasus::String& element)
 {
     std::ostringstream text;
@@ -44,11 +47,14 @@ TCIMValue ToHost(const Pegasus::String& element)
     return TCIMValue(text.str());
 }
 
+// Booleans, integers up to 32 bits and reals: TCIMValue has a constructor for the very type.
 template <typename TPlain> TCIMValue ToHost(TPlain element)
 {
     return TCIMValue(element);
 }
 
+// Throws: Pegasus::TypeMismatchException when the value is of another type. Callers assign to the output only after
+// this has returned, so that a failure leaves the output as it was.
 template <typename TPeg> TPeg Get(const Pegasus::CIMValue& value)
 {
     TPeg held{};
@@ -61,6 +67,8 @@ template <typename TPeg> TCIMValue ScalarToHost(const Pegasus::CIMValue& value)
     return ToHost(Get<TPeg>(value));
 }
 
+// The keys stay in the path's text, as the client library writes it. The reference is bound to the namespace of the
+// class even when the path names another one: the host has one namespace for all server namespaces.
 TCIMValue ReferenceToHost(const Pegasus::CIMValue& value, const ICIMClass& forClass)
 {
     TCIMReference reference((boost::shared_ptr<ICIMNamespace>()), TCIMContext());
@@ -77,6 +85,7 @@ template <typename TPeg> TCIMValue ArrayToHost(const Pegasus::CIMValue& value, T
     for (Pegasus::Uint32 i = 0; i < held.size(); ++i) {
         elements.push_back(ToHost(held[i]));
     }
+    // The host wants the element's code here, where a declaration has the array's; the 0 is reserved.
     return TCIMValue(elementType, 0, elements);
 }
 
@@ -85,6 +94,7 @@ void ScalarFromPegasus(const Pegasus::CIMValue& value, Pegasus::CIMType type, TC
 {
     switch (type) {
     case Pegasus::CIMTYPE_BOOLEAN:
+        // By comparison: a value of another type is false and does not throw, unlike in all other cases.
         out = TCIMValue(value == Pegasus::CIMValue(true));
         break;
     case Pegasus::CIMTYPE_UINT8:
@@ -129,7 +139,7 @@ void ScalarFromPegasus(const Pegasus::CIMValue& value, Pegasus::CIMType type, TC
     case Pegasus::CIMTYPE_REFERENCE:
         out = ReferenceToHost(value, *forClass);
         break;
-    default:
+    default: // objects and instances: the host has no type for them, and the output stays as it was
         break;
     }
 }
@@ -179,16 +189,18 @@ void ArrayFromPegasus(const Pegasus::CIMValue& value, Pegasus::CIMType type, TCI
     case Pegasus::CIMTYPE_DATETIME:
         out = ArrayToHost<Pegasus::CIMDateTime>(value, TType::kDatetime);
         break;
-    default:
+    default: // references, objects and instances: the output stays as it was
         break;
     }
 }
 
+// Datetimes and references travel as their texts, which the client library parses again and may refuse.
 Pegasus::String DecimalText(const TCIMValue& value)
 {
     return Pegasus::String(value.ToString(kDecimal).c_str());
 }
 
+// GetType is the element's code for an array, so that this switch and the one for arrays have the same cases.
 void ScalarToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
 {
     switch (in.GetType()) {
@@ -225,7 +237,7 @@ void ScalarToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
     case TType::kReal64:
         out.set(static_cast<Pegasus::Real64>(static_cast<double>(in)));
         break;
-    case TType::kChar16:
+    case TType::kChar16: // by its code; the decimal text is for the other direction only
         out.set(Pegasus::Char16(static_cast<unsigned short>(in)));
         break;
     case TType::kString:
@@ -242,6 +254,7 @@ void ScalarToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
     }
 }
 
+// Unlike a scalar, an element has to be a string: the conversion throws TVRXException 14 where ToString would convert.
 void StringArrayToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
 {
     Pegasus::Array<Pegasus::String> elements;
@@ -272,7 +285,7 @@ void ArrayToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
     case TType::kSint8:
         vrxArrayToPeg(in, out, static_cast<signed char>(0), Pegasus::Sint8());
         break;
-    case TType::kUint16: // servers of this kind are sent 8-bit arrays; they rely on it
+    case TType::kUint16: // 8-bit elements on purpose: vendors' methods with 16-bit arrays rely on it
         vrxArrayToPeg(in, out, static_cast<unsigned short>(0), Pegasus::Uint8());
         break;
     case TType::kSint16: // as above
@@ -333,6 +346,7 @@ void vrxValToPeg(const TCIMValue& in, Pegasus::CIMValue& out)
 
 TCIMValue::TCIMType pegTypeToVRXType(Pegasus::CIMType type, bool isArray)
 {
+    // The host's code is the server's plus 1, because the host's 0 means "no type".
     const int code = type >= Pegasus::CIMTYPE_BOOLEAN && type <= Pegasus::CIMTYPE_REFERENCE ? int(type) + 1 : 0;
     return TType::ECIMType(code + (isArray ? int(TType::kArrayOffset) : 0));
 }

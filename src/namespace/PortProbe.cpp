@@ -21,6 +21,7 @@ TPortProbe::TPortProbe(const std::string& host) : fHost(host), fDescriptor(::soc
         LogFailure("TPEGASUSNamespace::getAvailablePort failed: no socket: ", std::strerror(errno));
         throw TVRXException(TVRXStatusCode::kServerConnectionFailed);
     }
+    // A program that the host starts meanwhile would inherit the socket and keep the port.
     static_cast<void>(::fcntl(fDescriptor, F_SETFD, FD_CLOEXEC));
 }
 
@@ -29,6 +30,7 @@ TPortProbe::~TPortProbe()
     static_cast<void>(::close(fDescriptor));
 }
 
+// The socket has no SO_REUSEADDR: a port on which a connection still ages in TIME_WAIT counts as taken.
 bool TPortProbe::CanBind(unsigned short port) const
 {
     sockaddr_in address = {};

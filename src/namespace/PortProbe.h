@@ -4,12 +4,12 @@
 
 namespace NKOLVRX20 {
 
-// Tries ports of one address, all with one socket, which is closed at the end. Nothing holds a port that was found
-// free: another process may take it before the server does.
+// Tries ports of one address, all with one socket, which the destructor closes. From then on a port that was found free
+// is open to every process, and another may take it before the server does.
 class TPortProbe
 {
   public:
-    // The host is an address in numbers. Throws: TVRXException 42, after a log line, when no socket can be made.
+    // The host is a numeric address. Throws: TVRXException 42, after a log line, when no socket can be made.
     explicit TPortProbe(const std::string& host);
     ~TPortProbe();
 

@@ -33,7 +33,7 @@ bool IsMultiThreaded()
 void RunOnThreads(const char* operation, const std::vector<boost::shared_ptr<TPEGASUSProvider>>& providers,
                   const TProviderTask& task)
 {
-    // Joining is an interruption point, and leaving it early would leave threads behind.
+    // Joining is an interruption point, and an early exit would abandon running threads.
     const boost::this_thread::disable_interruption uninterrupted;
     boost::thread_group threads;
     try {

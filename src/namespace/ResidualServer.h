@@ -1,4 +1,4 @@
-// How a server that an earlier run left behind is found: its start file names a process, and the process listing shows
+// How a server that an earlier run left running is found: its start file names a process, and the process listing shows
 // whether that process still is a server.
 #pragma once
 
@@ -15,8 +15,8 @@ class TStartFile
     // Requires: a consumer name that is safe in a shell command.
     explicit TStartFile(const std::string& consumer);
 
-    // Returns: the process id; 0, which no process has, when the file holds no number; nothing when there is no file
-    // that counts, which is logged.
+    // Returns: the process id; 0, which never matches a process, when the file does not begin with a number; nothing,
+    // after a log line, when there is no file that counts.
     std::optional<int> ReadProcessId() const;
 
     void Remove() const;

@@ -23,7 +23,7 @@ constexpr char kRepositoryDirectory[] = "/pegasus/repository";
 constexpr const char* kLibraryVendors[] = {"/broadcom", "/mellanox", "/intelCDM", "/brocade", "/fusionio", "/nvidia"};
 constexpr char kProgramVendor[] = "/mellanox";
 
-// The inherited library path is left out on purpose: the host's own libraries must not reach the server.
+// The inherited library path is left out on purpose, to keep the host's own libraries out of the server.
 std::string LibraryPath(const std::string& root)
 {
     std::string path = root + kLibraryDirectory + ":" + root;

@@ -59,17 +59,17 @@ class TPEGASUSNamespace : public ICIMNamespace,
     boost::shared_ptr<ICIMClass> AllocateClass(const std::string& name, boost::shared_ptr<ICIMClass> superClass,
                                                TCIMContext context) override;
     // Returns the cached class of that name, or fetches it from the server with its chain of superclasses, top-down.
-    // The context's "nsp" names the server namespace, "timeout" the class's time-out in seconds, both as strings.
+    // The context's "nsp" names the server namespace, "timeout" the class's timeout in seconds, both as strings.
     // Returns: null when not connected, for an empty name, and when the server does not give the class.
-    // Throws: TVRXException 25 (no CIM name), 14 ("nsp" or "timeout" is no string);
-    // Pegasus::UninitializedObjectException when the server's answer was no HTTP message.
+    // Throws: TVRXException 25 (invalid name), 14 ("nsp" or "timeout" is not a string);
+    // Pegasus::UninitializedObjectException when the server's answer was not an HTTP message.
     // Blocks: 5 seconds for each request to a silent server.
     boost::shared_ptr<ICIMClass> GetClass(const std::string& name, TCIMContext context) override;
     // Visits the whole class tree below the root class, depth-first; nothing when not connected.
     void EnumerateRootClasses(TClassVisitor visitor, TCIMContext context) override;
     // Visits the providers, unless the context holds another "pluginType" than 7; on a thread for each when the
     // host's "pegasus_multi_thread" is "on", and the visitor's results do not count then.
-    // Throws: TVRXException 14 when "pluginType" is no sint8; what the visitor throws, unless on threads;
+    // Throws: TVRXException 14 when "pluginType" is not a sint8; what the visitor throws, unless on threads;
     // boost::thread_resource_error, after the threads that run have ended.
     void EnumerateProviders(TProviderVisitor visitor, TCIMContext context) override;
     // Returns: a declaration owned by this namespace but not yet added to it.
@@ -84,7 +84,7 @@ class TPEGASUSNamespace : public ICIMNamespace,
     // Throws: TVRXException 1, always.
     void Subscribe(boost::shared_ptr<ICIMIndicationFilter> filter, TInstanceVisitor visitor,
                    TCIMContext context) override;
-    // Returns: null also when the reference's class is not to be had.
+    // Returns: null also when the server does not give the reference's class.
     boost::shared_ptr<ICIMInstance> GetInstance(const TCIMReference& reference, TCIMContext context) override;
     // Handed to the repository namespace. Throws: TVRXException 31 when there is none.
     void DeleteInstance(const TCIMReference& reference, TCIMContext context) override;
@@ -120,7 +120,7 @@ class TPEGASUSNamespace : public ICIMNamespace,
     void FindProviders();
     // Writes the server's provider directories and the vendors' own configuration files.
     void preConfig();
-    // Returns: the working directory; empty when it cannot be told or is longer than 1023 bytes.
+    // Returns: the working directory; empty when it cannot be read or is longer than 1023 bytes.
     static std::string GetVRXRootPath();
     // Returns: the namespace of the host. Throws: boost::bad_weak_ptr when it is gone or was never set.
     boost::shared_ptr<ICIMNamespace> GetUpcallNamespace() const;
@@ -161,7 +161,7 @@ class TPEGASUSNamespace : public ICIMNamespace,
     // Returns: the names of the immediate subdirectories, in the directory's order; none when it cannot be read.
     std::vector<std::string> FindSubDirs(const std::string& directory);
     // Reads one requested-class file. An unreadable one leaves the outputs as they are.
-    // Throws: TVRXException 4 when there is no memory for the file or it is larger than kMaxRequestedClassFileBytes.
+    // Throws: TVRXException 4 when memory is short or the file is larger than kMaxRequestedClassFileBytes.
     void parseProvider(const std::string& path, std::vector<std::string>& classes,
                        std::map<std::string, std::string>& information);
     void prepareRegProvider(const std::string& path);
@@ -176,7 +176,7 @@ class TPEGASUSNamespace : public ICIMNamespace,
     // --- schema cache ---
 
     // Returns: the lower-cased name, the key of every map of named elements; an empty name stays empty.
-    // Throws: TVRXException 25, after a log line, when it is no CIM name.
+    // Throws: TVRXException 25, after a log line, for an invalid name.
     static std::string NormalizeName(const std::string& name);
     // Throws, after a log line: TVRXException 16 when one of that name is there and redefinition is off, 14 for null.
     void AddClass(boost::shared_ptr<TPEGASUSClass> newClass);

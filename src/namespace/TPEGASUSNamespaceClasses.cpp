@@ -16,7 +16,7 @@ namespace {
 
 // No real schema comes near; a server that names classes as each other's superclass would never end.
 constexpr unsigned int kMaxSuperClassDepth = 128;
-constexpr unsigned char kDecimal = 10;
+constexpr unsigned char kDecimal = 10; // the radix of ToString
 
 std::string TextFromContext(const TCIMContext& context, const std::string& key, const std::string& fallback)
 {
@@ -89,8 +89,8 @@ boost::shared_ptr<ICIMClass> TPEGASUSNamespace::FetchClass(const std::string& na
     return mirrored;
 }
 
-// Returns: false when the server does not give the class. An answer that is no HTTP message counts as an answer, and
-// leaves the class uninitialised.
+// Returns: false when the server does not give the class. A malformed HTTP message counts as an answer and leaves the
+// class uninitialised.
 bool TPEGASUSNamespace::AskServerForClass(const std::string& cimNamespace, const std::string& name,
                                           Pegasus::CIMClass& answer)
 {

@@ -46,7 +46,7 @@ std::vector<std::string> SubDirectoriesAmong(const std::vector<std::string>& nam
     return subDirectories;
 }
 
-// Throws: TVRXException 4 when there is no memory for it, or it is larger than any requested-class file may be.
+// Throws: TVRXException 4 when memory is short, or the file is larger than any requested-class file may be.
 std::unique_ptr<char[]> AllocateFileBuffer(const std::string& path, std::size_t bytes)
 {
     std::unique_ptr<char[]> buffer;
@@ -95,6 +95,7 @@ std::vector<std::string> TPEGASUSNamespace::FindXmlFiles(const std::string& root
     return paths;
 }
 
+// Unlike FindXmlFiles it gives an empty list for a directory that cannot be read: the server runs without vendors too.
 std::vector<std::string> TPEGASUSNamespace::FindSubDirs(const std::string& directory)
 {
     std::vector<std::string> names;
@@ -109,6 +110,7 @@ void TPEGASUSNamespace::parseProvider(const std::string& path, std::vector<std::
 {
     const std::size_t bytes = TOSSpecific::GetFileSize(path);
     const std::unique_ptr<char[]> buffer = AllocateFileBuffer(path, bytes);
+    // The provider of an unreadable file is listed all the same, with no classes.
     TFile file = OpenRegularFile(path);
     if (!file) {
         return;
@@ -129,6 +131,7 @@ void TPEGASUSNamespace::parseProvider(const std::string& path, std::vector<std::
                 "\nDefault timeout = ", information["timeout"], "\nModule name = ", information["module"]);
 }
 
+// The path is the provider's identity: a second FindProviders adds only what is new on disk.
 void TPEGASUSNamespace::prepareRegProvider(const std::string& path)
 {
     const auto hasPath = [&path](const auto& provider) { return provider->GetPath() == path; };

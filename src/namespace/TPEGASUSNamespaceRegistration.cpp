@@ -17,10 +17,11 @@ namespace NKOLVRX20 {
 
 namespace {
 
+// Keys of the map that filterTag4classes fills from a requested entry.
 constexpr char kTimeOutTag[] = "TimeOut";
 constexpr char kTag[] = "Tag";
 constexpr char kPluginTypeKey[] = "pluginType";
-constexpr signed char kPluginTypeOfProviders = 7;
+constexpr signed char kPluginTypeOfProviders = 7; // the host's number for plug-ins of this kind
 
 // Returns: whether a host that asks with this context asks for this kind of provider.
 bool AsksForProviders(const TCIMContext& context)
@@ -47,6 +48,8 @@ void VisitInOrder(const std::vector<boost::shared_ptr<TPEGASUSProvider>>& provid
 
 } // namespace
 
+// "-aE" accepts classes with a true qualifier "Experimental". The compiler's output in the log is the only trace of an
+// error: the other files are compiled, and the classes that the server has are served.
 void TPEGASUSNamespace::callCimmof(const std::string& cimNamespace, const std::string& mofPath)
 {
     LogProgress(fTree.Run("cimmof", {"-n", cimNamespace, "-aE", mofPath}));
@@ -86,17 +89,20 @@ void TPEGASUSNamespace::RegisterProviders()
         }
     }
     LogProgress("after reg...");
+    // On the calling thread, whatever the setting: the class cache and the namespace's client have no lock.
     for (const auto& provider : fProviders) {
         finishRegProvider(provider->GetPath(), provider);
     }
 }
 
+// May run on a thread of its own, at the same time as other providers: it reads its own provider and what is fixed
+// after start-up. Definitions come before the registrations that name them.
 void TPEGASUSNamespace::regProvider(std::string path, boost::shared_ptr<TPEGASUSProvider> provider)
 {
     LogProgress("Entering TPEGASUSNamespace::regProvider: ", path);
     std::vector<std::string> specifications = BuildMofPath(path, kSpecificationExtension);
     std::vector<std::string> registrations = BuildMofPath(path, kRegistrationExtension);
-    // A directory has no order of its own, and one file may need what another defines: the vendor decides by the names.
+    // Directories are unordered, and one file may need what another defines: the vendor decides by the names.
     std::sort(specifications.begin(), specifications.end());
     std::sort(registrations.begin(), registrations.end());
     for (const std::string& file : specifications) {
@@ -122,13 +128,14 @@ void TPEGASUSNamespace::finishRegProvider(std::string path, boost::shared_ptr<TP
     LogProgress("TPEGASUSNamespace finished adding Provider ", path);
 }
 
+// A class that several providers request is fetched once and stays bound to the last of them.
 boost::shared_ptr<ICIMClass> TPEGASUSNamespace::CollectClass(const std::string& entry,
                                                              const boost::shared_ptr<TPEGASUSProvider>& provider)
 {
     std::map<std::string, std::string> tags = {{kTimeOutTag, provider->GetDefaultTimeoutVal()}};
     const std::string name = filterTag4classes(entry, tags);
     const std::string& timeout = tags[kTimeOutTag];
-    // Neither the file nor the entry need give a timeout, and 0 seconds would make every call fail.
+    // Both the file and the entry may leave the timeout out, and 0 seconds would make every call fail.
     const TCIMContext context = {{kNspKey, provider->GetServerNamespace()},
                                  {kTimeoutKey, timeout.empty() ? strTimeout : timeout}};
     const auto requestedClass = boost::dynamic_pointer_cast<TPEGASUSClass>(GetClass(name, context));
@@ -149,6 +156,7 @@ std::string TPEGASUSNamespace::filterTag4classes(const std::string& entry, std::
     const auto rightBracket = entry.find(']');
     const auto tagStart = entry.find("%^");
     const auto tagEnd = entry.find("^%");
+    // npos is larger than any position, so that the minimum is the mark that is there, or the whole entry.
     std::string name = entry.substr(0, std::min(leftBracket, tagStart));
     if (rightBracket != kNone && leftBracket < rightBracket) {
         tags[kTimeOutTag] = entry.substr(leftBracket + 1, rightBracket - leftBracket - 1);

@@ -100,6 +100,7 @@ boost::shared_ptr<TPEGASUSQualifierDecl> TPEGASUSNamespace::FindQualifierDecl(co
     return fQualifierDecls.Find(name);
 }
 
+// The upcall namespace answers for the host's whole model; this namespace's own declarations serve its classes.
 boost::shared_ptr<ICIMQualifierDecl> TPEGASUSNamespace::GetQualifierDecl(const std::string& name, TCIMContext context)
 {
     return GetUpcallNamespace()->GetQualifierDecl(name, context);

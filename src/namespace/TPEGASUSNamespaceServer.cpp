@@ -18,11 +18,13 @@ constexpr unsigned short kHighestPort = 65535;
 constexpr unsigned short kLowestPort = 1024;
 
 constexpr char kConfigName[] = "cimconfig";
-constexpr unsigned int kStartPauseSeconds = 1;
-constexpr unsigned int kStopPauseSeconds = 3;
+constexpr unsigned int kStartPauseSeconds = 1; // from the daemon's fork to its first connection
+constexpr unsigned int kStopPauseSeconds = 3;  // the grace period of a stopping server before it is killed
 
 } // namespace
 
+// Downwards, because the kernel gives outgoing connections ports up to 60999 unless it is configured otherwise: the
+// highest ports are the ones most likely to be free.
 unsigned short TPEGASUSNamespace::getAvailablePort()
 {
     const TPortProbe probe(fHostAddress);
@@ -35,9 +37,10 @@ unsigned short TPEGASUSNamespace::getAvailablePort()
             return port;
         }
     }
-    std::exit(1);
+    std::exit(1); // hosts rely on the end of the process here
 }
 
+// The directories are relative to PEGASUS_HOME. The colon after the last one belongs to the form.
 void TPEGASUSNamespace::callCimconfig()
 {
     std::string directories;
@@ -47,6 +50,7 @@ void TPEGASUSNamespace::callCimconfig()
     LogProgress(fTree.Run(kConfigName, {"-s", "providerDir=" + directories}));
 }
 
+// The exit status stays with the process service. Here a server that failed to start shows only when connecting fails.
 void TPEGASUSNamespace::callCimserver(unsigned short port)
 {
     const std::string output =
@@ -55,6 +59,7 @@ void TPEGASUSNamespace::callCimserver(unsigned short port)
     LogProgress(output);
 }
 
+// False in doubt: an unknown process must not be killed.
 bool TPEGASUSNamespace::isResidualCimserver(int pid)
 {
     const TProcessListing listing;
@@ -66,6 +71,8 @@ bool TPEGASUSNamespace::isResidualCimserver(int pid)
     }
 }
 
+// The start file may be older than the last boot, so that its process id belongs to another program by now: the listing
+// decides. The file is removed in every case.
 void TPEGASUSNamespace::killResidualCimserver()
 {
     const TStartFile startFile(fConsumerName);

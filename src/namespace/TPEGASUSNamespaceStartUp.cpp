@@ -23,7 +23,7 @@ constexpr char kDefaultConsumer[] = "quvex";
 
 constexpr int kStartAttempts = 6;
 constexpr unsigned int kRestartPauseSeconds = 1;
-constexpr unsigned char kDecimal = 10;
+constexpr unsigned char kDecimal = 10; // the radix of ToString
 
 // The LSI provider reads its configuration from the file-system root.
 constexpr char kLsiConfiguration[] = "/lsi_mr.conf";
@@ -40,6 +40,8 @@ std::string ConsumerFromContext(const TCIMContext& context)
     return entry == context.end() ? kDefaultConsumer : entry->second.ToString(kDecimal);
 }
 
+// Returns: what the adapter tool prints; the empty text when it cannot be run, so that a machine without the tool
+// counts as one without the adapter.
 std::string BrocadeVersion()
 {
     std::string output;
@@ -70,6 +72,8 @@ void TPEGASUSNamespace::Initialize(TCIMContext context)
     preConfig();
 }
 
+// Both names become part of commands that a shell runs with the host's rights. The flag outlives the exception: the
+// destructor must not remove anything below such a directory either.
 void TPEGASUSNamespace::RefuseUnsafeNames()
 {
     const bool safeConsumer = IsSafeNamePart(fConsumerName);
@@ -84,6 +88,7 @@ void TPEGASUSNamespace::RefuseUnsafeNames()
     throw TVRXException(TVRXStatusCode::kBadPath);
 }
 
+// After the last failure start-up goes on: a host without a connection gets empty answers and can still end cleanly.
 void TPEGASUSNamespace::StartServerAndConnect()
 {
     for (int attempt = 1; attempt <= kStartAttempts; ++attempt) {
@@ -93,6 +98,8 @@ void TPEGASUSNamespace::StartServerAndConnect()
     }
 }
 
+// Every attempt starts from an empty repository and a dead predecessor, so that nothing of a failed one is served. The
+// port is chosen last: another process may take it until the server binds it.
 bool TPEGASUSNamespace::TryToStartServer(int attempt)
 {
     try {
@@ -122,6 +129,7 @@ void TPEGASUSNamespace::connect(const std::string& host, unsigned short port, co
     fConnection.Connect(host, port, user, password);
 }
 
+// Works without a connection: the pseudo-class asks nothing of the server.
 void TPEGASUSNamespace::CreateRootClass()
 {
     TCIMContext context;
@@ -146,6 +154,8 @@ void TPEGASUSNamespace::preConfig()
     WriteLsiConfiguration();
 }
 
+// The file lies in the root of the file system, which root alone may write: for another user it is left out, without a
+// log line.
 void TPEGASUSNamespace::WriteLsiConfiguration() const
 {
     const std::string directory = fTree.LsiDirectory();

@@ -28,7 +28,7 @@ void CmpiInit()
 
 namespace {
 
-// Run by the loader.
+// Run by the loader, before the host can call anything: the module path is known from the first call on.
 [[maybe_unused]] const bool fgInitialized = (CmpiInit(), true);
 
 } // namespace
@@ -71,6 +71,8 @@ boost::shared_ptr<ICIMNamespace> TPEGASUSNamespaceProvider::AllocateNamespace(TC
 {
     const boost::shared_ptr<TPEGASUSNamespace> allocated =
         boost::make_shared<TPEGASUSNamespace>(context, kDefaultCimNamespace);
+    // Before starting: unless the host still holds the earlier namespace, its server ends here, before the new one
+    // starts.
     fNamespace = allocated;
     allocated->Initialize(context);
     allocated->FindProviders();

@@ -17,6 +17,7 @@ namespace NKOLVRX20 {
 
 namespace {
 
+// Log readers know these texts to the letter, the blank after "succeeded" included.
 constexpr TConnectionTexts kProviderConnectionTexts = {
     "TPEGASUSProvider: Pegasus Client Creation Fail: ",
     "TPEGASUSProvider::connect enter",
@@ -24,6 +25,7 @@ constexpr TConnectionTexts kProviderConnectionTexts = {
     "TPEGASUSProvider::connect failed: ",
 };
 
+// A vendor's mark on a class that hosts should not collect.
 constexpr char kDontCollectQualifier[] = "DONTCOLLECT";
 
 bool IsTaggedCdm(const boost::shared_ptr<ICIMClass>& collected)
@@ -32,6 +34,8 @@ bool IsTaggedCdm(const boost::shared_ptr<ICIMClass>& collected)
     return mirrored && mirrored->GetTag() == kCdmTag;
 }
 
+// A qualifier of a type that does not convert to a boolean throws TVRXException 14. The walk logs that, so that the
+// vendor learns of the mistake, and leaves the class out.
 bool IsNotToBeCollected(const ICIMClass& collected)
 {
     const boost::shared_ptr<ICIMQualifier> qualifier = collected.GetQualifier(kDontCollectQualifier, {});
@@ -85,6 +89,7 @@ void TPEGASUSProvider::EnumerateClassesProvided(TClassVisitor visitor, TCIMConte
     }
 }
 
+// Static, with the provider's name as an argument: an earlier visit may have destroyed the provider.
 void TPEGASUSProvider::OfferClass(const boost::shared_ptr<ICIMClass>& collected, const std::string& providerName,
                                   const TClassVisitor& visitor)
 {
@@ -116,6 +121,7 @@ void TPEGASUSProvider::connectPegasusClient(const std::string& host, unsigned sh
     fConnection.Connect(host, port, user, password);
 }
 
+// A requested-class file may leave the namespace out, but every request and every compilation needs one.
 const std::string& TPEGASUSProvider::GetServerNamespace() const
 {
     return fNameSpaceName.empty() ? kDefaultCimNamespace : fNameSpaceName;
@@ -126,6 +132,7 @@ Pegasus::CIMNamespaceName TPEGASUSProvider::GetPegNamespace() const
     return Pegasus::CIMNamespaceName(GetServerNamespace().c_str());
 }
 
+// Byte for byte, although CIM names ignore case: the host asks with the spelling that it got from the class.
 bool TPEGASUSProvider::IsClassesProvided(const std::string& className) const
 {
     const auto hasName = [&className](const auto& collected) { return collected->GetName({}) == className; };
@@ -166,6 +173,7 @@ void TPEGASUSProvider::SetNameSpaceName(std::string nameSpaceName)
     fNameSpaceName = std::move(nameSpaceName);
 }
 
+// The text is kept as the file has it; the class that is made with it converts it to milliseconds.
 void TPEGASUSProvider::SetDefaultTimeoutVal(std::string& seconds)
 {
     fDefaultTimeout = seconds;

@@ -74,7 +74,7 @@ class TPEGASUSProvider : public IProvider, public TClientOwner
     // Returns: the namespace as the requested-class file gives it, for instance "root/cimv2"; possibly empty.
     const std::string& GetNameSpaceName(const TCIMContext& context) const;
     const std::string& GetDefaultTimeoutVal() const { return fDefaultTimeout; }
-    // Returns: the requested entries as the file has them, time-outs and tags included.
+    // Returns: the requested entries as the file has them, timeouts and tags included.
     std::vector<std::string> GetClassVector() const { return fRequestedClasses; }
     const std::vector<boost::shared_ptr<ICIMClass>>& GetCollectedClasses() const { return fCollectedClasses; }
     bool GetDiagnosticOnly() const { return fDiagnosticOnly; }

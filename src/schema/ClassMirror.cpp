@@ -2,7 +2,7 @@
 
 #include "src/common/CoreLog.h"
 #include "src/instance/ValueConversion.h"
-#include "src/schema/QualifierBits.h"
+#include "src/schema/DeclarationAttributes.h"
 #include "src/schema/TPEGASUSClass.h"
 #include "src/schema/TPEGASUSMethodDecl.h"
 #include "src/schema/TPEGASUSParameterDecl.h"
@@ -113,13 +113,13 @@ boost::shared_ptr<ICIMQualifierDecl> TClassMirror::FetchDeclaration(const Pegasu
         return declaration;
     } catch (...) {
         LogFailure(kQualifierFailure, name, kDetail, DescribeCurrentException());
-        fUnknownQualifiers.insert(name);
+        fUnknownQualifiers.insert(name); // asked for once more by the next class, when the server may answer
         return nullptr;
     }
 }
 
-// A type that the host has no code for, an embedded object, is declared as text. That is how such a property is served,
-// and no loss: many DMTF classes have one.
+// A type that the host has no code for, an embedded object, is declared as text. Such a property is served that way,
+// and many DMTF classes have one: the line is progress.
 TType TClassMirror::PropertyType(const Pegasus::CIMConstProperty& source, const std::string& name) const
 {
     const TType type = pegTypeToVRXType(source.getType(), source.isArray());
@@ -141,6 +141,7 @@ void TClassMirror::MirrorProperty(const Pegasus::CIMConstProperty& source, const
         declaration->SetDefaultValue(defaultValue, {});
     }
     MirrorQualifiers(source, {*declaration, kPropertyFailure, name});
+    // After its qualifiers, because they decide how the class takes the declaration.
     if (declaration->GetQualifier(kOverrideQualifier, {})) {
         fTarget.AdoptPropertyDecl(name);
     }
@@ -158,7 +159,7 @@ void TClassMirror::MirrorMethod(const Pegasus::CIMConstMethod& source, const std
     for (Pegasus::Uint32 i = 0; i < source.getParameterCount(); ++i) {
         Guarded(kMethodFailure, name, [&] { MirrorParameter(source.getParameter(i), *method); });
     }
-    fTarget.EnterMethodDecl(method);
+    fTarget.EnterMethodDecl(method); // AddMethodDecl, the host's slot, does nothing
 }
 
 void TClassMirror::MirrorParameter(const Pegasus::CIMConstParameter& source, TPEGASUSMethodDecl& method)

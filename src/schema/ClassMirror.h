@@ -14,16 +14,16 @@ class TPEGASUSMethodDecl;
 class TPEGASUSQualifierDecl;
 
 // Carries the declarations of a server's class over into the host's image of it: qualifiers first, because a reference
-// property is only welcome in an association, then properties, then methods. What fails is logged and left out.
+// property is accepted in an association only, then properties, then methods. What fails is logged and left out.
 //
-// The declaration of a qualifier is asked for once a namespace, and after a failure once a class.
+// The server is asked for a qualifier's declaration once per namespace; after a failure, once per class.
 class TClassMirror
 {
   public:
     explicit TClassMirror(TPEGASUSClass& target);
 
     // Throws: Pegasus::UninitializedObjectException when the source holds no class.
-    // Blocks: up to the client's time-out for each qualifier that is new.
+    // Blocks: up to the client's timeout for each qualifier that is new.
     void Mirror(const Pegasus::CIMClass& source);
 
   private:

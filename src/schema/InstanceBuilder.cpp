@@ -16,7 +16,7 @@ namespace NKOLVRX20 {
 
 namespace {
 
-constexpr unsigned char kDecimal = 10;
+constexpr unsigned char kDecimal = 10; // the radix of ToString
 constexpr char kInstanceIdName[] = "InstanceID";
 constexpr char kSlotClass[] = "OMC_ProcessorSlot";
 constexpr char kSlotNumber[] = "Number";
@@ -30,7 +30,7 @@ std::optional<std::string> TextAfter(const std::string& text, const std::string&
 
 // Reads the class that a key reference names out of the path of the instance that holds it:
 // Holder.Property="ns:Class.Key=...".
-// Returns: nothing when the path has not that shape.
+// Returns: nothing when the path has another shape.
 std::optional<std::string> ReferencedClassName(const std::string& path, const std::string& property)
 {
     const auto fromProperty = TextAfter(path, property);
@@ -62,7 +62,7 @@ class TPropertyTransfer
     {
     }
 
-    // Returns: the name as the log gives it; the server's spelling where it is no name for the host.
+    // Returns: the name as the log gives it; the server's spelling where that is not a valid name.
     const std::string& Name() const { return fName.empty() ? fServerName : fName; }
 
     void To(TPEGASUSInstance& target)

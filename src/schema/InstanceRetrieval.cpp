@@ -15,12 +15,12 @@ namespace NKOLVRX20 {
 
 namespace {
 
-constexpr unsigned char kDecimal = 10;
+constexpr unsigned char kDecimal = 10; // the radix of ToString
 constexpr char kRecordClass[] = "CIM_RecordAppliesToElement";
-// The one operation whose timeout has a line of its own.
+// Only this operation has a log line of its own for a timeout.
 constexpr char kEnumeration[] = "EnumerateInstances";
 
-// What the host's pages lose when a class times out.
+// What the host's pages lose when a class times out. Log readers know the texts, double blanks included.
 struct TLossWarning
 {
     const char* fClassName;
@@ -110,12 +110,14 @@ std::optional<TInstanceRetrieval::TAnswer> TInstanceRetrieval::AskProvider(bool 
     });
 }
 
+// Local-only, without qualifiers and class origins: the mirrored class has the declarations already.
 TInstanceRetrieval::TAnswer TInstanceRetrieval::Enumerate(Pegasus::CIMClient& client,
                                                           const Pegasus::CIMNamespaceName& ns, bool deep) const
 {
     return client.enumerateInstances(ns, Pegasus::CIMName(fClassName.c_str()), deep, true, false, false);
 }
 
+// Asked before the instances: a class that was not compiled into the provider's namespace gets a log line of its own.
 bool TInstanceRetrieval::ServerHasClass(Pegasus::CIMClient& client, const Pegasus::CIMNamespaceName& ns) const
 {
     try {
@@ -148,6 +150,7 @@ boost::shared_ptr<TPEGASUSInstance> TInstanceRetrieval::Build(const TAnswer& ans
     return built;
 }
 
+// Byte for byte: the host returns a path that an enumeration gave it. Keys in another order do not match.
 boost::shared_ptr<TPEGASUSInstance> TInstanceRetrieval::Find(const TAnswer& answer,
                                                              const TCIMReference& reference) const
 {

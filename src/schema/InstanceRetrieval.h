@@ -13,8 +13,8 @@ namespace NKOLVRX20 {
 class TPEGASUSClass;
 class TPEGASUSInstance;
 
-// One retrieval of a class's instances under way. The class's three operations are one, told apart by the function's
-// name in the log and by where and how long they ask. Failures are logged and swallowed: the host gets fewer instances.
+// One retrieval of a class's instances. The class's three operations differ in the function's name in the log, in the
+// server namespace and in the timeout. Failures are logged and swallowed: the host gets fewer instances.
 // Ownership: the class outlives the retrieval.
 class TInstanceRetrieval
 {
@@ -29,13 +29,13 @@ class TInstanceRetrieval
 
     // Asks in the class's own server namespace.
     std::optional<TAnswer> Ask(unsigned int timeoutMs) const;
-    // Asks in the provider's namespace, once the server has said that it has the class: two requests.
+    // Asks in the provider's namespace, after the server has confirmed the class: two requests.
     std::optional<TAnswer> AskProvider(bool deep, unsigned int timeoutMs) const;
 
     // Each of these returns null after a failure, which is logged and costs no other instance.
 
     boost::shared_ptr<TPEGASUSInstance> Build(const TAnswer& answer, Pegasus::Uint32 index) const;
-    // Returns: the first instance whose path is the reference's to the letter; null also when there is none.
+    // Returns: the first instance whose path is the reference's to the letter; null also when none matches.
     boost::shared_ptr<TPEGASUSInstance> Find(const TAnswer& answer, const TCIMReference& reference) const;
 
     void LogCallingNamespace() const;

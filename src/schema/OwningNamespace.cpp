@@ -23,7 +23,8 @@ bool TOwningNamespace::IsConnected() const
     return Lock()->isConnected();
 }
 
-// The client belongs to the namespace, which outlives the call: nobody drops it while the calling thread is here.
+// The client belongs to the namespace, and the lock ends with this function. The namespace outlives the call all the
+// same: the one thread that could drop it is here.
 Pegasus::CIMClient& TOwningNamespace::ConnectedClient() const
 {
     return Lock()->ConnectedClient();

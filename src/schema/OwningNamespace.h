@@ -14,16 +14,16 @@ class TPEGASUSClass;
 class TPEGASUSNamespace;
 class TPEGASUSQualifierDecl;
 
-// The way from a class, or a qualifier declaration, back to the namespace that it belongs to, and all that it asks of
-// it. The one place in this folder that knows the namespace's class.
+// The link from a class, or a qualifier declaration, back to its namespace, with all that it asks of the namespace. The
+// one place in this folder that knows the namespace's class.
 // Ownership: weak; the namespace owns what points back to it. Every operation but Get throws boost::bad_weak_ptr when
-// the namespace has gone.
+// the namespace is gone.
 class TOwningNamespace
 {
   public:
     explicit TOwningNamespace(const boost::shared_ptr<TPEGASUSNamespace>& ns);
 
-    // Returns: the namespace as the host sees it; null when it has gone.
+    // Returns: the namespace as the host sees it; null when it is gone.
     boost::shared_ptr<ICIMNamespace> Get() const;
 
     bool IsConnected() const;

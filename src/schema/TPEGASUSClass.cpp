@@ -6,6 +6,8 @@
 
 namespace NKOLVRX20 {
 
+// Initialize links the superclass, and enters this class among its children once the server has given the class. A
+// class that the server refuses leaves no trace in the tree.
 TPEGASUSClass::TPEGASUSClass(const boost::shared_ptr<TPEGASUSNamespace>& ns, std::string name,
                              const boost::shared_ptr<TPEGASUSClass>&)
     : fNamespace(ns), fName(std::move(name))
@@ -57,6 +59,7 @@ bool TPEGASUSClass::operator<(const ICIMClass& other) const
     return fName < other.GetName({});
 }
 
+// What the server says of a class is not for a host to overwrite.
 ICIMClass& TPEGASUSClass::operator=(const ICIMClass&)
 {
     return *this;
@@ -69,6 +72,7 @@ bool TPEGASUSClass::hasCollected() const
 
 void TPEGASUSClass::SetCollected() {}
 
+// The links to the namespace and the superclass are weak and keep nothing alive.
 void TPEGASUSClass::ReleaseLinks()
 {
     fProvider.reset();
@@ -77,6 +81,7 @@ void TPEGASUSClass::ReleaseLinks()
     fChildClasses.clear();
 }
 
+// Declarations serve this slot (TQualifiedElement); hosts expect a class to refuse it.
 boost::shared_ptr<ICIMQualifier> TPEGASUSClass::GetQualifier(const std::string& name, bool&, TCIMContext) const
 {
     LogAndThrow(TVRXStatusCode::kOperationNotSupported, "TPEGASUSClass::GetQualifier failed: ", name, " of ", fName,

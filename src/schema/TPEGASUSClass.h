@@ -25,7 +25,7 @@ class TPEGASUSProvider;
 // The host's image of one class of the server. Declarations are read once, when the namespace makes the class;
 // instances are fetched from the server at every call.
 //
-// Names are looked up without regard to case; a name that is no CIM name throws TVRXException 25.
+// Names are looked up without regard to case; an invalid name throws TVRXException 25.
 // Ownership: always held by boost::shared_ptr. Owns its declarations and children, shares its provider; points to its
 // namespace and superclass weakly. What needs the namespace throws boost::bad_weak_ptr when it is gone.
 // Thread: one at a time.
@@ -42,7 +42,7 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
 
     // Reads the class's declarations from the server and takes its place below the superclass; the root class "<root>"
     // only takes its settings. An element that cannot be mirrored is logged and left out.
-    // Requires: a time-out in decimal seconds. The superclass may be null.
+    // Requires: a timeout in decimal seconds. The superclass may be null.
     // Throws: TVRXException 42, after a log line, when the server does not give the class.
     // Blocks: up to 5 seconds for the class, and again for each qualifier that is new to the namespace.
     void Initialize(const std::string& cimNamespace, const std::string& timeout,
@@ -94,7 +94,7 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     boost::shared_ptr<ICIMInstance> AllocateInstance(TCIMContext context) override;
     // Fetches the instances from the server and visits them in its order until the visitor returns false. Failures
     // are logged and leave fewer instances, or none; only the visitor's own exceptions leave.
-    // Blocks: up to the class's time-out, twice; longer for classes that are known to be slow (see the source).
+    // Blocks: up to the class's timeout, twice; longer for classes that are known to be slow (see the source).
     void EnumerateInstances(TInstanceVisitor visitor, bool deep, TCIMContext context) override;
     boost::shared_ptr<ICIMMethodDecl> AllocateMethodDecl(const std::string& name, TCIMValue::TCIMType returnType,
                                                          TCIMContext context) override;
@@ -125,7 +125,7 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     void RemoveAssociationClass(boost::shared_ptr<ICIMClass> association) override; // does nothing
     // Replaces what is there only when the declaration has the qualifier "OVERRIDE" and the same type, and the other
     // belongs to another class; or when its name contains "PortType".
-    // Throws, after a log line: TVRXException 22 (a reference in a class that is no association), 14 (another type, or
+    // Throws, after a log line: TVRXException 22 (a reference outside of an association), 14 (another type, or
     // no declaration of this plug-in), 16 (is there already).
     void AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declaration) override;
     void RemovePropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declaration) override; // does nothing
@@ -140,7 +140,7 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     // Parameters travel by their own types, whatever their declarations say; outputs replace entries of their names.
     // Throws: what the client throws, Pegasus::Exception; TVRXException 14, after a log line, for an input that does
     // not convert, and nothing is sent then.
-    // Blocks: up to the time-out that the namespace's client was given last.
+    // Blocks: up to the timeout that the namespace's client was given last.
     TCIMValue InvokeMethod(const TCIMReference& target, const std::string& name, const TCIMContext& inputs,
                            TCIMContext& outputs, TCIMContext context) override;
     // Also those of all subclasses.
@@ -150,9 +150,9 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
 
     // Fetches the class's instances and looks for one whose path is the reference's to the letter.
     // Returns: null when there is none, and after a failure, which is logged.
-    // Blocks: up to the class's time-out.
+    // Blocks: up to the class's timeout.
     boost::shared_ptr<ICIMInstance> GetInstance(const TCIMReference& reference, TCIMContext context);
-    // The same in the provider's namespace; the context's "nsp" is only logged. Blocks: twice the time-out.
+    // The same in the provider's namespace; the context's "nsp" is only logged. Blocks: up to twice the timeout.
     boost::shared_ptr<ICIMInstance> GetInstanceWithNsp(const TCIMReference& reference, TCIMContext context);
 
     // --- the class's place ---
@@ -163,7 +163,7 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     // The provider that serves the class; null when none was bound to it.
     boost::shared_ptr<TPEGASUSProvider> GetProvider() const { return fProvider; }
     void SetProvider(boost::shared_ptr<TPEGASUSProvider> provider) { fProvider = provider; }
-    // The mark of the requested-class file; empty at first.
+    // The tag of the requested entry ("CDM"); empty at first.
     const std::string& GetTag() const { return fTag; }
     void SetTag(const std::string& tag) { fTag = tag; }
     unsigned int GetDefaultTimeoutMs() const { return fDefaultTimeoutMs; }
@@ -173,12 +173,12 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     void LeaveSuperClass();
     // Takes over the children of the class that this one replaces in the namespace, and its place below the superclass.
     void TakePlaceOf(TPEGASUSClass& replaced);
-    // Lets go of provider, children and instances, so that nothing keeps itself alive in a circle.
+    // Releases provider, children and instances, so that a circle of pointers does not keep itself alive.
     void ReleaseLinks();
 
     // --- for initialisation ---
 
-    // Puts the superclass's declaration of that name in place, if it has one, to be overridden.
+    // Enters the superclass's declaration of that name, if it has one, so that it can be overridden.
     void AdoptPropertyDecl(const std::string& name);
     void EnterMethodDecl(const boost::shared_ptr<TPEGASUSMethodDecl>& declaration);
     // Gives the class a property of its own with the value; propagated when a superclass has declared it.

@@ -20,6 +20,7 @@ constexpr char kKeyQualifier[] = "KEY";
 
 } // namespace
 
+// A declaration that is not a key counts as visited, so that the walk goes on.
 void TPEGASUSClass::EnumerateKeyNames(TKeyNameVisitor visitor, TCIMContext context) const
 {
     fPropertyDecls.Visit([&](const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration) {
@@ -68,6 +69,7 @@ boost::shared_ptr<ICIMMethodDecl> TPEGASUSClass::AllocateMethodDecl(const std::s
     return boost::make_shared<TPEGASUSMethodDecl>(shared_from_this(), name, returnType);
 }
 
+// Null for an unknown method, where an unknown property throws: hosts test the one and catch the other.
 boost::shared_ptr<ICIMMethodDecl> TPEGASUSClass::GetMethodDecl(const std::string& name, TCIMContext) const
 {
     return fMethodDecls.Find(name);
@@ -98,6 +100,7 @@ void TPEGASUSClass::AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declarat
     try {
         OverridePropertyDecl(existing, own);
     } catch (const TVRXException& exception) {
+        // The second line of a refusal. Log readers know its text, with "failed" close to the class name.
         if (exception.GetStatusCode() == TVRXStatusCode::kUnknownProperty) {
             throw;
         }
@@ -107,6 +110,7 @@ void TPEGASUSClass::AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declarat
     }
 }
 
+// Without a declaration to override the new one is logged and added all the same: vendors' MOF has such classes.
 void TPEGASUSClass::OverridePropertyDecl(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing,
                                          const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration)
 {
@@ -144,6 +148,8 @@ void TPEGASUSClass::AddNewPropertyDecl(const boost::shared_ptr<TPEGASUSPropertyD
     fPropertyDecls.Put(name, declaration);
 }
 
+// An override needs something to override, but a new class starts with an empty map. The superclass's declaration is
+// shared and keeps its owner, by which OverridePropertyDecl knows that it was inherited.
 void TPEGASUSClass::AdoptPropertyDecl(const std::string& name)
 {
     const auto superClass = fSuperClass.lock();
@@ -165,6 +171,8 @@ void TPEGASUSClass::EnterMethodDecl(const boost::shared_ptr<TPEGASUSMethodDecl>&
 {
     fMethodDecls.Put(declaration->GetName({}), declaration);
 }
+
+// The server alone decides on methods, and on what a class loses.
 
 void TPEGASUSClass::RemovePropertyDecl(boost::shared_ptr<ICIMPropertyDecl>) {}
 

@@ -30,6 +30,7 @@ boost::shared_ptr<ICIMClass> TPEGASUSClass::GetSuperClass(TCIMContext context) c
     std::string superName;
     try {
         Pegasus::CIMClient& client = fNamespace.ConnectedClient();
+        // The client is shared, and an earlier call may have left it a timeout of minutes.
         client.setTimeout(kGetClassTimeoutMs);
         const Pegasus::CIMClass answer =
             client.getClass(fPegasusNsp, Pegasus::CIMName(fName.c_str()), true, true, false);
@@ -39,13 +40,13 @@ boost::shared_ptr<ICIMClass> TPEGASUSClass::GetSuperClass(TCIMContext context) c
                    " returned exception: ", ToStdString(exception.getMessage()));
         throw TVRXException(TVRXStatusCode::kServerConnectionFailed);
     }
-    // A class of the same name in another server namespace would be a stranger.
+    // A class of the same name in another server namespace would be a different class.
     context.emplace(kNspKey, fPegasusNspText);
     return fNamespace.GetClass(superName, context);
 }
 
-// A walk on a copy that keeps this class: the visitor may make the namespace fetch more classes, or drop it. The
-// visitor is wrapped, so that a child's own walk can tell that it was ended.
+// The walk runs on a copy and keeps this class alive: the visitor may make the namespace fetch more classes, or drop
+// it. The visitor is wrapped, so that a parent's walk sees that a child's walk was ended.
 void TPEGASUSClass::EnumerateSubClasses(TClassVisitor visitor, bool deep, TCIMContext context) const
 {
     const auto self = shared_from_this();
@@ -68,6 +69,7 @@ void TPEGASUSClass::EnumerateSubClasses(TClassVisitor visitor, bool deep, TCIMCo
     }
 }
 
+// Follows the weak links: a superclass that has been destroyed ends the chain.
 bool TPEGASUSClass::IsSubclassOf(boost::shared_ptr<const ICIMClass> other, TCIMContext context) const
 {
     if (!other) {

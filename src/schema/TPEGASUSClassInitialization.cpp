@@ -10,10 +10,10 @@ namespace NKOLVRX20 {
 
 namespace {
 
-constexpr int kDecimal = 10;
+constexpr int kDecimal = 10; // the radix of strtol
 constexpr unsigned long kMsPerSecond = 1000;
 
-// Wraps at 32 bits; a text that is no number gives 0.
+// Wraps at 32 bits; a text without a number gives 0.
 unsigned int MillisecondsFromText(const std::string& seconds)
 {
     const auto number = static_cast<unsigned long>(std::strtol(seconds.c_str(), nullptr, kDecimal));
@@ -35,13 +35,14 @@ void TPEGASUSClass::Initialize(const std::string& cimNamespace, const std::strin
             return;
         }
         Pegasus::CIMClient& client = fNamespace.ConnectedClient();
-        client.setTimeout(kGetClassTimeoutMs);
+        client.setTimeout(kGetClassTimeoutMs); // the class's own timeout is for its instances
         TClassMirror(*this).Mirror(client.getClass(fPegasusNsp, Pegasus::CIMName(fName.c_str()), false, true, false));
     } catch (const Pegasus::Exception& exception) {
         LogFailure("TPEGASUSClass::Initialize - Unable to retrieve class: ", fName,
                    "\tdetail: ", ToStdString(exception.getMessage()));
         throw TVRXException(TVRXStatusCode::kServerConnectionFailed);
     }
+    // Last, so that a class that cannot be had does not stay among its superclass's children.
     if (superClass) {
         superClass->AddChildClass(shared_from_this());
     }

@@ -1,4 +1,4 @@
-// What a class does with instances: fetched live from the server, never kept by the plug-in; and methods called on one.
+// What a class does with instances, fetched from the server at every call, and the methods called on one.
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/instance/MethodValues.h"
@@ -14,7 +14,7 @@ namespace NKOLVRX20 {
 
 namespace {
 
-constexpr unsigned char kDecimal = 10;
+constexpr unsigned char kDecimal = 10; // the radix of ToString
 
 // Vendors' diagnostic services and software inventories take minutes.
 constexpr char kDiagnosticServicePart[] = "AvailableDiagnosticService";
@@ -27,6 +27,7 @@ bool Contains(const std::string& text, const char* part)
     return text.find(part) != std::string::npos;
 }
 
+// The order decides for a name that contains both parts.
 unsigned int EnumerationTimeoutMs(const TPEGASUSClass& instanceClass)
 {
     const std::string name = instanceClass.GetName({});
@@ -63,6 +64,7 @@ void TPEGASUSClass::EnumerateInstances(TInstanceVisitor visitor, bool deep, TCIM
         if (!built) {
             continue;
         }
+        // Only an enumeration sets it: an instance that was fetched by its path keeps the empty text.
         built->SetPegasusNSPStr(fPegasusNspText);
         retrieval.LogBuilt(*built);
         goesOn = visitor(built);
@@ -145,6 +147,8 @@ TCIMValue TPEGASUSClass::InvokeMethod(const std::string&, TCIMContext&, TCIMCont
 TCIMValue TPEGASUSClass::InvokeMethod(const TCIMReference& target, const std::string& name, const TCIMContext& inputs,
                                       TCIMContext& outputs, TCIMContext)
 {
+    // Path, name and inputs are converted before anything is sent. The timeout stays as the last call on the shared
+    // client left it.
     const Pegasus::CIMObjectPath path(Pegasus::String(target.GetPath().c_str()));
     const Pegasus::CIMName method(name.c_str());
     Pegasus::Array<Pegasus::CIMParamValue> pegInputs;

@@ -15,6 +15,8 @@ TPEGASUSMethodDecl::TPEGASUSMethodDecl(const boost::shared_ptr<TPEGASUSClass>& o
 
 void TPEGASUSMethodDecl::Validate(TCIMContext) {}
 
+// A class takes its methods from the server alone (TPEGASUSClass::EnterMethodDecl) and ignores one that a host adds.
+// The conversion of the weak pointer throws when the class is gone, where lock would give null.
 void TPEGASUSMethodDecl::AddToClass(TCIMContext)
 {
     boost::shared_ptr<TPEGASUSClass>(fOwner)->AddMethodDecl(shared_from_this());
@@ -35,6 +37,7 @@ TCIMValue::TCIMType TPEGASUSMethodDecl::GetReturnType(TCIMContext) const
     return fReturnType;
 }
 
+// Not entered yet: the parameter gets its qualifiers first, and TPEGASUSParameterDecl::AddToMethod enters it.
 boost::shared_ptr<ICIMParameterDecl> TPEGASUSMethodDecl::AllocateParameterDecl(const std::string& name,
                                                                                TCIMValue::TCIMType type, TCIMContext)
 {

@@ -14,6 +14,8 @@ TPEGASUSParameterDecl::TPEGASUSParameterDecl(const boost::shared_ptr<TPEGASUSMet
 
 void TPEGASUSParameterDecl::Validate(TCIMContext) {}
 
+// The method owns its parameters and a parameter points back weakly, so that the two do not keep each other alive. A
+// host may hold a parameter for longer than its method: adding it throws then, and GetMethodDecl returns null.
 void TPEGASUSParameterDecl::AddToMethod(TCIMContext)
 {
     boost::shared_ptr<TPEGASUSMethodDecl>(fOwner)->AddParameterDecl(shared_from_this());

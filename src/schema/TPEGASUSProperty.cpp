@@ -1,7 +1,7 @@
 #include "src/schema/TPEGASUSProperty.h"
 
 #include "display/PropertyText.h"
-#include "src/schema/DeclaredType.h"
+#include "src/schema/DeclarationAttributes.h"
 
 #include <host/ICIMPropertyDecl.h>
 
@@ -15,6 +15,7 @@ TPEGASUSProperty::TPEGASUSProperty(TCIMValue value, const boost::shared_ptr<ICIM
 {
 }
 
+// The declaration comes first: a null value of an array property carries no array code.
 TCIMValue::TCIMType TPEGASUSProperty::GetType(TCIMContext context) const
 {
     const auto declaration = fDeclaration.lock();
@@ -42,6 +43,7 @@ void TPEGASUSProperty::SetValue(TCIMValue value, TCIMContext)
     fValue = std::move(value);
 }
 
+// Either is enough: the server's mark, or a declaration that belongs to another class.
 bool TPEGASUSProperty::GetPropagated(TCIMContext context) const
 {
     const auto declaration = fDeclaration.lock();
@@ -69,6 +71,7 @@ ICIMProperty& TPEGASUSProperty::operator=(const ICIMProperty& other)
     return *this;
 }
 
+// The previous value belongs to the host, which compares two inventories with it; nothing here sets it.
 TCIMValue TPEGASUSProperty::GetPrevValue() const
 {
     return fPrevValue;

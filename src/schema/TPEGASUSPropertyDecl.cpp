@@ -1,13 +1,14 @@
 #include "src/schema/TPEGASUSPropertyDecl.h"
 
 #include "src/common/CoreLog.h"
-#include "src/schema/DeclaredType.h"
+#include "src/schema/DeclarationAttributes.h"
 #include "src/schema/TPEGASUSClass.h"
 
 #include <utility>
 
 namespace NKOLVRX20 {
 
+// The order of the members matters: the type is read from the default before the default is moved.
 TPEGASUSPropertyDecl::TPEGASUSPropertyDecl(const boost::shared_ptr<TPEGASUSClass>& owner, std::string name,
                                            TCIMValue defaultValue)
     : fOwner(owner), fName(std::move(name)), fType(DeclaredType(defaultValue)), fDefaultValue(std::move(defaultValue))
@@ -52,6 +53,7 @@ TCIMValue TPEGASUSPropertyDecl::GetDefaultValue(TCIMContext) const
     return fDefaultValue;
 }
 
+// The type was fixed at construction: a null that replaces an empty array carries no type of its own.
 void TPEGASUSPropertyDecl::SetDefaultValue(TCIMValue value, TCIMContext)
 {
     fDefaultValue = std::move(value);

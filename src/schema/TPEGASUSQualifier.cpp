@@ -1,7 +1,7 @@
 #include "src/schema/TPEGASUSQualifier.h"
 
 #include "src/common/CoreLog.h"
-#include "src/schema/QualifierBits.h"
+#include "src/schema/DeclarationAttributes.h"
 
 #include <host/ICIMNamedElement.h>
 
@@ -9,6 +9,8 @@
 
 namespace NKOLVRX20 {
 
+// The declaration is shared, because the qualifier takes its name and type from it; the element is weak, because it
+// owns the qualifier.
 TPEGASUSQualifier::TPEGASUSQualifier(const boost::shared_ptr<ICIMNamedElement>& element,
                                      boost::shared_ptr<const ICIMQualifierDecl> declaration, TCIMValue value,
                                      ICIMQualifierDecl::EFlavor flavor)
@@ -64,6 +66,7 @@ void TPEGASUSQualifier::SetValue(TCIMValue value, TCIMContext)
     fValue = std::move(value);
 }
 
+// Flavors are bits: setting some keeps the others.
 void TPEGASUSQualifier::SetFlavor(ICIMQualifierDecl::EFlavor flavor, TCIMContext)
 {
     fFlavor = WithBits(fFlavor, flavor);
@@ -95,6 +98,7 @@ bool TPEGASUSQualifier::GetPropagated(TCIMContext) const
     return fPropagated;
 }
 
+// The value alone: name and type are the declaration's, and the flavor says how this element holds the qualifier.
 ICIMQualifier& TPEGASUSQualifier::operator=(const ICIMQualifier& other)
 {
     fValue = other.GetValue({});

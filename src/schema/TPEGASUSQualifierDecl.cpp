@@ -1,13 +1,13 @@
 #include "src/schema/TPEGASUSQualifierDecl.h"
 
 #include "src/common/CoreLog.h"
-#include "src/schema/DeclaredType.h"
-#include "src/schema/QualifierBits.h"
+#include "src/schema/DeclarationAttributes.h"
 
 #include <utility>
 
 namespace NKOLVRX20 {
 
+// The order of the members matters: the type is read from the default before the default is moved.
 TPEGASUSQualifierDecl::TPEGASUSQualifierDecl(const boost::shared_ptr<TPEGASUSNamespace>& ns, std::string name,
                                              TCIMValue defaultValue, EScope scope, EFlavor flavor)
     : fName(std::move(name)), fType(DeclaredType(defaultValue)), fDefaultValue(std::move(defaultValue)), fScope(scope),
@@ -17,6 +17,7 @@ TPEGASUSQualifierDecl::TPEGASUSQualifierDecl(const boost::shared_ptr<TPEGASUSNam
 
 void TPEGASUSQualifierDecl::Validate(TCIMContext) {}
 
+// Allocation and entry are two steps, because the namespace refuses a second declaration of a name.
 void TPEGASUSQualifierDecl::AddToNamespace(TCIMContext)
 {
     fNamespace.AddQualifierDecl(shared_from_this());
@@ -63,6 +64,7 @@ ICIMQualifierDecl::EScope TPEGASUSQualifierDecl::GetScope(TCIMContext) const
     return fScope;
 }
 
+// Flavors are bits: setting some keeps the others. A qualifier copied its flavor when it was made, and stays as it is.
 void TPEGASUSQualifierDecl::SetFlavor(EFlavor flavor, TCIMContext)
 {
     fFlavor = WithBits(fFlavor, flavor);

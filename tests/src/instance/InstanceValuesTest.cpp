@@ -70,8 +70,8 @@ TEST_F(InstanceValuesTest, AReferenceKnowsItsClassWhenThePathSpellsItOut)
         {"two keys", "CIM_L.Antecedent=" + reference + ",Z=\"a:b.c\"", "CIM_Y"},
         {"a colon before it", "CIM_L.Aa=\"x:y\",Antecedent=" + reference, "CIM_Y"},
         {"property not in the path", "CIM_L.Dependent=" + reference, nullptr},
-        {"no colon behind it", "CIM_L.Antecedent=\"CIM_Y\"", nullptr},
-        {"no dot behind it", "CIM_L.Antecedent=\"root/cimv2:CIM_Y\"", nullptr},
+        {"no colon after it", "CIM_L.Antecedent=\"CIM_Y\"", nullptr},
+        {"no dot after it", "CIM_L.Antecedent=\"root/cimv2:CIM_Y\"", nullptr},
         {"other case in the path", "CIM_L.antecedent=" + reference, nullptr},
         {"class not on the server", "CIM_L.Antecedent=\"root/cimv2:CIM_Gone.Key=\\\"1\\\"\"", nullptr},
     };

@@ -174,7 +174,7 @@ TEST_F(MethodTest, AParameterThatDoesNotConvertIsRefusedBeforeAnythingIsSent)
         {"instance: a null", true, TCIMValue()},
         {"instance: no path", true, TCIMValue(std::string("not a path."))},
         {"class: a typed null", false, TCIMValue(TCIMValue::TCIMType::kUint8, 0)},
-        {"class: a reference that is no path", false, TCIMValue(ReferenceTo("not a path."))},
+        {"class: a reference that is not a path", false, TCIMValue(ReferenceTo("not a path."))},
         {"class: an empty reference", false, TCIMValue(ReferenceTo(""))},
     };
     fServed.TakeRequests();

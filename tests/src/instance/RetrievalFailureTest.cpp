@@ -39,7 +39,7 @@ TEST_F(RetrievalFailureTest, ATimeoutSaysWhatMayBeLost)
     for (const auto& row : rows) {
         SCOPED_TRACE(row.fClass);
         const auto target = Serve(row.fClass, {});
-        // While the client waits for the class, its next question's time is cut.
+        // While the client waits for the class, the timeout of its next question is shortened.
         fServed.fModel.addFault("GetClass", [&](const test::PeerRequest& request) {
             fServed.fNamespace->getPegClient()->setTimeout(50);
             return test::classAnswer(request, Pegasus::CIMClass(CIMName(row.fClass)));

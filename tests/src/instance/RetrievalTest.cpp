@@ -1,4 +1,4 @@
-// Instances fetched from the server: who is asked, for what, how long it has, and which instance is the one.
+// Instances fetched from the server: who is asked, for what, with which timeout, and which instance matches.
 #include "tests/src/instance/RetrievalFixture.h"
 
 #include <gmock/gmock.h>

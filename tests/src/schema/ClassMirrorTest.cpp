@@ -1,5 +1,5 @@
 // What a new class takes over from the server, what it asks for, and what it does without.
-#include "src/schema/QualifierBits.h"
+#include "src/schema/DeclarationAttributes.h"
 #include "src/schema/TPEGASUSQualifierDecl.h"
 #include "tests/src/schema/ServedNamespace.h"
 

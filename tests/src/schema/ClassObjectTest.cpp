@@ -220,7 +220,7 @@ TEST_F(ClassObjectTest, AncestorsAreFoundByNameUpToButNotTheRoot)
     EXPECT_TRUE(*base < *lower);
 }
 
-TEST_F(ClassObjectTest, TheSuperclassIsAskedForAnewAndComesFromTheCache)
+TEST_F(ClassObjectTest, TheSuperclassIsAskedForEachTimeAndComesFromTheCache)
 {
     const auto base = Add("A");
     const auto derived = Add("A1", "A");

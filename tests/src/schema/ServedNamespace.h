@@ -22,7 +22,7 @@ class TServedNamespace
   public:
     TServedNamespace();
 
-    // Returns: the class through the namespace; null when it is not to be had.
+    // Returns: the class through the namespace; null when the server does not give it.
     boost::shared_ptr<TPEGASUSClass> Class(const std::string& name, const std::string& timeout = "60");
     // Returns: a connected provider of "root/cimv2".
     boost::shared_ptr<TPEGASUSProvider> MakeProvider(const std::string& cimNamespace = kNsp) const;
