@@ -1,3 +1,4 @@
+#include <host/ICIMInstance.h>
 #include <host/ICIMNamespace.h>
 #include <host/TCIMReference.h>
 #include <host/TCIMValue.h>
@@ -78,6 +79,12 @@ bool TCIMReference::operator==(const TCIMReference& other) const
 bool TCIMReference::operator<(const TCIMReference& other) const
 {
     return fPath < other.fPath;
+}
+
+// The only body of the interface; it also anchors the type information of ICIMInstance in this library.
+TCIMReference ICIMInstance::BuildPath(TCIMContext context) const
+{
+    return GetReference(context);
 }
 
 } // namespace NKOLVRX20

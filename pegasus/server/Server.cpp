@@ -8,7 +8,6 @@
 #include "pegasus/server/admin/TreeClaim.h"
 #include "pegasus/server/net/Acceptor.h"
 #include "pegasus/server/net/Listener.h"
-#include "pegasus/server/net/PeerCheck.h"
 #include "pegasus/server/operations/Dispatcher.h"
 
 #include <condition_variable>

@@ -3,7 +3,7 @@
 #include "pegasus/base/NumberText.h"
 #include "pegasus/base/Text.h"
 #include "pegasus/common/CIMValueRep.h"
-#include "pegasus/wire/XmlEscape.h"
+#include "pegasus/wire/XmlText.h"
 
 #include <cmath>
 

@@ -1,7 +1,7 @@
 #include "pegasus/wire/RequestEnvelope.h"
 
 #include "pegasus/wire/ElementEncoder.h"
-#include "pegasus/wire/XmlEscape.h"
+#include "pegasus/wire/XmlText.h"
 
 #include <Pegasus/Common/Exception.h>
 

@@ -2,12 +2,14 @@
 
 #include "pegasus/wire/XmlError.h"
 
+#include <Pegasus/Common/String.h>
+
 #include <string>
 #include <string_view>
 
 namespace Pegasus::wire {
 
-// Character data as it stands in a message, and what it means.
+// Character data as it stands in a message, and what it means: reading it, and at the end writing it. Thread: any.
 
 std::string_view trimBlanks(std::string_view text);
 
@@ -24,5 +26,10 @@ void appendNormalized(std::string& out, std::string_view text);
 
 // `<?xml version="1.x" encoding="utf-8"?>`; without an encoding it is UTF-8 too. Throws: XmlError.
 void checkXmlDeclaration(std::string_view declaration, XmlPlace place);
+
+// Appends `text` (UTF-8) as XML text or attribute value: & < > " ' become entities. What a parser would change becomes
+// a character reference: control characters, and a blank at the beginning, at the end or after another blank.
+void appendEscaped(std::string& out, std::string_view text);
+void appendEscaped(std::string& out, const String& text);
 
 } // namespace Pegasus::wire

@@ -1,7 +1,7 @@
 #include "tests/support/PeerAnswers.h"
 
 #include "pegasus/wire/ElementEncoder.h"
-#include "pegasus/wire/XmlEscape.h"
+#include "pegasus/wire/XmlText.h"
 
 #include <algorithm>
 #include <cctype>

@@ -22,8 +22,9 @@ class StartError : public std::runtime_error
 // Thread: any.
 void requireOwnTree(const Config& config);
 
-// This server's hold on its tree, and the files by which others find it. The destructor removes them; the lock file of a
-// server that failed to start stays, unlocked, so that the tree's clients do not take another server on its port for it.
+// This server's hold on its tree, and the files by which others find it. The destructor removes them; the lock file of
+// a server that failed to start stays, unlocked, so that the tree's clients do not take another server on its port for
+// it.
 //
 // A server that finds the tree held by another one whose repository has been deleted takes its place: the other one is
 // left over from a host that has ended.

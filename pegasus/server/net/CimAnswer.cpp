@@ -2,7 +2,7 @@
 
 #include "pegasus/base/Text.h"
 #include "pegasus/wire/ElementEncoder.h"
-#include "pegasus/wire/XmlEscape.h"
+#include "pegasus/wire/XmlText.h"
 
 namespace Pegasus::server {
 

@@ -3,7 +3,10 @@
 #include "pegasus/base/Descriptor.h"
 
 #include <cstdint>
+#include <optional>
 #include <string>
+
+#include <sys/types.h>
 
 namespace Pegasus::server {
 
@@ -18,5 +21,8 @@ base::Descriptor listenLocally(const std::string& home);
 // process or the system is out of descriptors or memory for it.
 // Thread: one at a time a listener.
 base::Descriptor acceptConnection(const base::Descriptor& listener, bool& exhausted);
+
+// Returns: the user at the other end of a Unix socket, as of its connect().
+std::optional<uid_t> localPeerUser(int fd);
 
 } // namespace Pegasus::server

@@ -31,16 +31,16 @@
 
 PEGASUS_NAMESPACE_BEGIN
 
-typedef bool Boolean;
-typedef unsigned char Uint8;
-typedef signed char Sint8;
-typedef unsigned short Uint16;
-typedef short Sint16;
-typedef unsigned int Uint32;
-typedef int Sint32;
-typedef unsigned long long Uint64;
-typedef long long Sint64;
-typedef float Real32;
-typedef double Real64;
+using Boolean = bool;
+using Uint8 = unsigned char;
+using Sint8 = signed char;
+using Uint16 = unsigned short;
+using Sint16 = short;
+using Uint32 = unsigned int;
+using Sint32 = int;
+using Uint64 = unsigned long long;
+using Sint64 = long long;
+using Real32 = float;
+using Real64 = double;
 
 PEGASUS_NAMESPACE_END
