@@ -21,9 +21,8 @@ class TTextRules
     // The first rule that applies gives the text:
     // 1. Values, for an integer, a string or a char16 that ValueMap has an entry for. Where ValueMap is missing, an
     //    integer is the index into Values.
-    // 2. BitValues, for an integer with bits that BitMap names: the texts of those bits, joined by " | ", and after
-    // them
-    //    the remaining bits in hexadecimal. Where BitMap is missing, the texts count from bit 0.
+    // 2. BitValues, for an integer with bits that BitMap names: the texts of those bits, joined by " | ", then the
+    //    remaining bits in hexadecimal. Where BitMap is missing, the texts count from bit 0.
     // 3. The plain text. A number gets a blank and Units, or PUnit where Units is missing.
     // Requires: a scalar other than null.
     std::string Text(const TCIMValue& value) const;
