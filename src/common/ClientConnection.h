@@ -31,15 +31,15 @@ class TClientConnection
     TClientConnection(const TClientConnection&) = delete;
     TClientConnection& operator=(const TClientConnection&) = delete;
 
-    // Makes the client unless there is one, and gives it the short timeout of an unconnected client.
+    // Makes the client on first use, and gives it the short timeout of an unconnected client.
     // Throws: TVRXException 42.
     void Init();
 
-    // Connects, with three tries and a pause of one second after each failure; nothing happens when connected.
-    // From then on an operation waits as long as its own timeout says, for hours if nobody sets one.
+    // Connects, with three tries and a pause of one second after each failure; returns at once when connected.
+    // From then on an operation waits as long as its own timeout says; the default is hours.
     // Requires: Init.
     // Throws: TVRXException 42 after the third failure.
-    // Blocks: while the server accepts no connection, and the pauses.
+    // Blocks: while a connection attempt is pending, and for the pauses.
     void Connect(const std::string& host, unsigned short port, const std::string& user, const std::string& password);
 
     // Returns: true once a Connect has succeeded, also when the server has gone since.
@@ -62,8 +62,8 @@ class TClientOwner
     // Returns: the client; null before it was made. Ownership: stays here.
     Pegasus::CIMClient* getPegClient() const { return fConnection.GetClient(); }
     // Returns: the client.
-    // Throws: Pegasus::NotConnectedException when it was never connected, so that a caller's handler for a failed call
-    // answers for this too.
+    // Throws: Pegasus::NotConnectedException before the first successful connect, so that a caller's handler for a
+    // failed call answers for this too.
     Pegasus::CIMClient& ConnectedClient() const;
 
   protected:

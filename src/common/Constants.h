@@ -11,13 +11,13 @@ inline const std::string strTimeout = "60";
 // Milliseconds that a question for a class or a qualifier declaration may take, whatever timeout the client had before.
 inline constexpr unsigned int kGetClassTimeoutMs = 5000;
 
-// The one CIM namespace that the plug-in offers; also the server namespace of a class that names none.
+// The one CIM namespace that the plug-in offers; also the default server namespace of a class.
 inline const std::string kDefaultCimNamespace = "root/cimv2";
 
-// The pseudo-class above every class without a superclass.
+// The pseudo-class above every top-level class.
 inline const std::string kRootClassName = "<root>";
 
-// The tag of a class that is fetched but not offered to the host.
+// The tag of a class that is fetched, but left out when classes are offered to the host.
 inline const std::string kCdmTag = "CDM";
 
 // Context keys that name a class's server namespace and its timeout in seconds; both hold strings.

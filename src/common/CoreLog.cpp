@@ -19,7 +19,7 @@ void WriteCoreLog(ILogger::EVRXLogSeverity severity, const std::string& text)
     TRootObject::GetCoreLogger()->Log(severity, text);
 }
 
-// Thrown once more to find its family: the client library's exceptions do not derive from std::exception.
+// Thrown once more to find its family: the client library's exceptions have a base class of their own.
 std::string DescribeCurrentException()
 {
     try {

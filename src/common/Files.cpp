@@ -23,7 +23,7 @@ bool HasFileType(const std::string& path, mode_t type)
     return ::stat(path.c_str(), &status) == 0 && (status.st_mode & S_IFMT) == type;
 }
 
-// Returns: what makes the opened file one that must not be read; null when nothing does.
+// Returns: why the opened file is refused; null when it may be read.
 const char* ReasonAgainst(int descriptor)
 {
     struct stat status = {};
@@ -75,7 +75,7 @@ TFile OpenRegularFile(const std::string& path)
 TFile OpenOwnFile(const std::string& path, std::string& reason)
 {
     reason.clear();
-    // Without O_NONBLOCK the opening of a pipe would wait for its writer.
+    // O_NONBLOCK, because opening a pipe would otherwise wait for its writer.
     const int descriptor = ::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_NOFOLLOW | O_NOCTTY | O_CLOEXEC);
     if (descriptor == -1) {
         if (errno != ENOENT) {

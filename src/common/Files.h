@@ -1,4 +1,4 @@
-// What the plug-in asks the file system, without exceptions.
+// What the plug-in asks the file system; failures are return values.
 #pragma once
 
 #include <cstdio>
@@ -12,7 +12,7 @@ bool IsDirectory(const std::string& path);
 bool IsRegularFile(const std::string& path);
 
 // Appends the names of all entries, "." and ".." too, in the directory's order.
-// Returns: false when the directory cannot be opened.
+// Returns: false when opening the directory fails.
 bool ReadDirectory(const std::string& path, std::vector<std::string>& names);
 
 struct TFileCloser
@@ -21,14 +21,14 @@ struct TFileCloser
 };
 using TFile = std::unique_ptr<std::FILE, TFileCloser>;
 
-// Opens a regular file for reading, close-on-exec; anything else (a pipe could block for ever) counts as not there.
-// Returns: null when it cannot be opened.
+// Opens a regular file for reading, close-on-exec; anything else (a pipe could block for ever) counts as absent.
+// Returns: null when it is absent or opening it fails.
 TFile OpenRegularFile(const std::string& path);
 
-// Opens a file in a directory where other users may write, so that nothing of theirs is read: a regular file that
-// belongs to root or to the user of this process, not reached through a link as its last part. Close-on-exec.
-// Returns: null when it cannot be opened or is something else; the reason then says why, and is empty when there is
-// no such file.
+// Opens a file in a directory where other users may write, and refuses theirs: it must be a regular file that belongs
+// to root or to the user of this process, and the last part of its path must be the file itself rather than a link.
+// Close-on-exec.
+// Returns: null when opening it fails or it is refused; the reason then says why, and is empty when the file is absent.
 // Blocks: never, whatever lies there.
 TFile OpenOwnFile(const std::string& path, std::string& reason);
 

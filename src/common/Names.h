@@ -12,7 +12,7 @@ std::string LowerCase(std::string text);
 bool IsCimName(const std::string& name);
 
 // Returns: the lower-cased name, the key of every map of named elements; an empty name stays empty.
-// Throws: TVRXException 25, after a log line, when it is not a CIM name.
+// Throws: TVRXException 25, after a log line, for an invalid name.
 std::string NormalizedName(const std::string& name);
 
 } // namespace NKOLVRX20

@@ -30,7 +30,7 @@ TPortProbe::~TPortProbe()
     static_cast<void>(::close(fDescriptor));
 }
 
-// The socket has no SO_REUSEADDR: a port on which a connection still ages in TIME_WAIT counts as taken.
+// SO_REUSEADDR stays off: a port on which a connection still ages in TIME_WAIT counts as taken.
 bool TPortProbe::CanBind(unsigned short port) const
 {
     sockaddr_in address = {};

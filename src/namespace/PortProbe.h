@@ -9,14 +9,14 @@ namespace NKOLVRX20 {
 class TPortProbe
 {
   public:
-    // The host is a numeric address. Throws: TVRXException 42, after a log line, when no socket can be made.
+    // The host is a numeric address. Throws: TVRXException 42, after a log line, when making the socket fails.
     explicit TPortProbe(const std::string& host);
     ~TPortProbe();
 
     TPortProbe(const TPortProbe&) = delete;
     TPortProbe& operator=(const TPortProbe&) = delete;
 
-    // Requires: that no earlier call has returned true; a socket is bound once.
+    // Requires: that every earlier call has returned false; a socket is bound once.
     bool CanBind(unsigned short port) const;
 
   private:

@@ -16,8 +16,8 @@ using TProviderTask = boost::function<void(const boost::shared_ptr<TPEGASUSProvi
 
 // Runs the task for every provider, each on a thread of its own, and waits for all of them. What a task throws is
 // logged under the operation's name, with the provider.
-// Throws: boost::thread_resource_error when a thread cannot be made; those that run have ended by then.
-// Blocks: until the last task ends; an interruption of the calling thread does not shorten it.
+// Throws: boost::thread_resource_error when making a thread fails; those that run have ended by then.
+// Blocks: until the last task ends; interruption of the calling thread is disabled meanwhile.
 void RunOnThreads(const char* operation, const std::vector<boost::shared_ptr<TPEGASUSProvider>>& providers,
                   const TProviderTask& task);
 

@@ -23,7 +23,7 @@ bool HasUnsafeCharacter(const std::string& text)
 
 } // namespace
 
-// The shell's status is not looked at: what is not there need not be removed.
+// The shell's status is ignored: an absent file counts as removed.
 void RemovePath(const std::string& path, const char* options)
 {
     const std::string command = "rm " + path + " " + options + " > nul 2>&1";

@@ -17,7 +17,7 @@ void RemovePath(const std::string& path, const char* options);
 // Returns: false for the empty name, and for one with a control byte, a blank or a character special to a shell.
 bool IsSafeDirectory(const std::string& path);
 
-// The same for a part of a file name, which holds no slash either, and may be empty.
+// The same for a part of a file name, in which a slash is refused too, and which may be empty.
 bool IsSafeNamePart(const std::string& name);
 
 } // namespace NKOLVRX20

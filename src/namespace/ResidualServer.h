@@ -15,8 +15,8 @@ class TStartFile
     // Requires: a consumer name that is safe in a shell command.
     explicit TStartFile(const std::string& consumer);
 
-    // Returns: the process id; 0, which never matches a process, when the file does not begin with a number; nothing,
-    // after a log line, when there is no file that counts.
+    // Returns: the process id; 0, for which HasServer is false, when the file begins with anything but a number;
+    // nullopt, after a log line, when a file that counts is absent.
     std::optional<int> ReadProcessId() const;
 
     void Remove() const;

@@ -25,7 +25,7 @@ class TServerTree
 
     // Runs one of the server's programs to its end, in the server's environment.
     // Returns: what it wrote to its standard output. Its exit status is the process service's business.
-    // Throws: TVRXException 12 when it cannot be run.
+    // Throws: TVRXException 12 when it fails to run or times out.
     // Blocks: until the program ends, at most 32767 seconds.
     std::string Run(const std::string& program, const std::vector<std::string>& arguments) const;
 

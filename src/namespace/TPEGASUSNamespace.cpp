@@ -71,8 +71,8 @@ TPEGASUSNamespace::~TPEGASUSNamespace()
     RunShutdownStep("release", [this] { ReleaseCycles(); });
 }
 
-// Providers and classes hold each other, and so do classes and their instances. Without this step one pointer in the
-// host's hands would keep all of them alive.
+// Providers and classes hold each other, and so do classes and their instances. This step breaks the cycles; otherwise
+// one pointer in the host's hands would keep all of them alive.
 void TPEGASUSNamespace::ReleaseCycles()
 {
     for (const auto& provider : fProviders) {

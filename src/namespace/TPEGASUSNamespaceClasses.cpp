@@ -14,7 +14,7 @@ namespace NKOLVRX20 {
 
 namespace {
 
-// No real schema comes near; a server that names classes as each other's superclass would never end.
+// Far above any real schema; it ends the chain of a server that names classes as each other's superclass.
 constexpr unsigned int kMaxSuperClassDepth = 128;
 constexpr unsigned char kDecimal = 10; // the radix of ToString
 
@@ -89,8 +89,8 @@ boost::shared_ptr<ICIMClass> TPEGASUSNamespace::FetchClass(const std::string& na
     return mirrored;
 }
 
-// Returns: false when the server does not give the class. A malformed HTTP message counts as an answer and leaves the
-// class uninitialised.
+// Returns: false when the request fails. A malformed HTTP message counts as an answer and leaves the class
+// uninitialised.
 bool TPEGASUSNamespace::AskServerForClass(const std::string& cimNamespace, const std::string& name,
                                           Pegasus::CIMClass& answer)
 {
@@ -110,8 +110,8 @@ bool TPEGASUSNamespace::AskServerForClass(const std::string& cimNamespace, const
 }
 
 // Builds the class below its superclass, which is mirrored first, and enters it into the cache.
-// Returns: false when it cannot be built.
-// Throws: Pegasus::UninitializedObjectException when the source holds no class.
+// Returns: false when building or entering it fails.
+// Throws: Pegasus::UninitializedObjectException when the source is uninitialised.
 bool TPEGASUSNamespace::MirrorClass(const Pegasus::CIMClass& source, const TCIMContext& callerContext,
                                     TCIMContext& classContext)
 {

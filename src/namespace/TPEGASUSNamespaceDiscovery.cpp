@@ -95,7 +95,7 @@ std::vector<std::string> TPEGASUSNamespace::FindXmlFiles(const std::string& root
     return paths;
 }
 
-// Unlike FindXmlFiles it gives an empty list for a directory that cannot be read: the server runs without vendors too.
+// Unlike FindXmlFiles it gives an empty list for an unreadable directory: vendors are optional for the server.
 std::vector<std::string> TPEGASUSNamespace::FindSubDirs(const std::string& directory)
 {
     std::vector<std::string> names;
@@ -110,7 +110,7 @@ void TPEGASUSNamespace::parseProvider(const std::string& path, std::vector<std::
 {
     const std::size_t bytes = TOSSpecific::GetFileSize(path);
     const std::unique_ptr<char[]> buffer = AllocateFileBuffer(path, bytes);
-    // The provider of an unreadable file is listed all the same, with no classes.
+    // The provider of an unreadable file is listed all the same, with an empty list of classes.
     TFile file = OpenRegularFile(path);
     if (!file) {
         return;

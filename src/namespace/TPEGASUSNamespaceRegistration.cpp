@@ -89,7 +89,7 @@ void TPEGASUSNamespace::RegisterProviders()
         }
     }
     LogProgress("after reg...");
-    // On the calling thread, whatever the setting: the class cache and the namespace's client have no lock.
+    // On the calling thread, whatever the setting: the class cache and the namespace's client serve one thread.
     for (const auto& provider : fProviders) {
         finishRegProvider(provider->GetPath(), provider);
     }

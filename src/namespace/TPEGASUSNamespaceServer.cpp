@@ -23,8 +23,8 @@ constexpr unsigned int kStopPauseSeconds = 3;  // the grace period of a stopping
 
 } // namespace
 
-// Downwards, because the kernel gives outgoing connections ports up to 60999 unless it is configured otherwise: the
-// highest ports are the ones most likely to be free.
+// Downwards, because the kernel's default port range for outgoing connections ends at 60999: the highest ports are the
+// ones most likely to be free.
 unsigned short TPEGASUSNamespace::getAvailablePort()
 {
     const TPortProbe probe(fHostAddress);

@@ -40,8 +40,8 @@ std::string ConsumerFromContext(const TCIMContext& context)
     return entry == context.end() ? kDefaultConsumer : entry->second.ToString(kDecimal);
 }
 
-// Returns: what the adapter tool prints; the empty text when it cannot be run, so that a machine without the tool
-// counts as one without the adapter.
+// Returns: what the adapter tool prints; empty when it fails to run or times out, so that a machine that lacks the tool
+// counts as one that lacks the adapter.
 std::string BrocadeVersion()
 {
     std::string output;
@@ -88,7 +88,7 @@ void TPEGASUSNamespace::RefuseUnsafeNames()
     throw TVRXException(TVRXStatusCode::kBadPath);
 }
 
-// After the last failure start-up goes on: a host without a connection gets empty answers and can still end cleanly.
+// After the last failure start-up goes on: an unconnected host gets empty answers and can still end cleanly.
 void TPEGASUSNamespace::StartServerAndConnect()
 {
     for (int attempt = 1; attempt <= kStartAttempts; ++attempt) {
@@ -98,7 +98,7 @@ void TPEGASUSNamespace::StartServerAndConnect()
     }
 }
 
-// Every attempt starts from an empty repository and a dead predecessor, so that nothing of a failed one is served. The
+// Every attempt starts from an empty repository and a dead predecessor, so that what a failed one left is gone. The
 // port is chosen last: another process may take it until the server binds it.
 bool TPEGASUSNamespace::TryToStartServer(int attempt)
 {
@@ -129,7 +129,7 @@ void TPEGASUSNamespace::connect(const std::string& host, unsigned short port, co
     fConnection.Connect(host, port, user, password);
 }
 
-// Works without a connection: the pseudo-class asks nothing of the server.
+// Works unconnected too: the pseudo-class is made from local data alone.
 void TPEGASUSNamespace::CreateRootClass()
 {
     TCIMContext context;
@@ -154,8 +154,7 @@ void TPEGASUSNamespace::preConfig()
     WriteLsiConfiguration();
 }
 
-// The file lies in the root of the file system, which root alone may write: for another user it is left out, without a
-// log line.
+// The file lies in the root of the file system, which root alone may write: for another user it is silently left out.
 void TPEGASUSNamespace::WriteLsiConfiguration() const
 {
     const std::string directory = fTree.LsiDirectory();

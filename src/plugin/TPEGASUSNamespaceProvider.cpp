@@ -71,8 +71,8 @@ boost::shared_ptr<ICIMNamespace> TPEGASUSNamespaceProvider::AllocateNamespace(TC
 {
     const boost::shared_ptr<TPEGASUSNamespace> allocated =
         boost::make_shared<TPEGASUSNamespace>(context, kDefaultCimNamespace);
-    // Before starting: unless the host still holds the earlier namespace, its server ends here, before the new one
-    // starts.
+    // Before starting: if the plug-in was the last owner of the earlier namespace, its server ends here, before the new
+    // one starts.
     fNamespace = allocated;
     allocated->Initialize(context);
     allocated->FindProviders();

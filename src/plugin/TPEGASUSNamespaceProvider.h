@@ -27,7 +27,7 @@ class TPEGASUSNamespaceProvider : public INamespaceProvider
     static boost::shared_ptr<TPEGASUSNamespace> GetNamespace();
     // Lets the current namespace go. The last owner's release stops its server and removes the repository.
     static void ClearNamespace();
-    // Returns: the directory of the plug-in's file, without a trailing slash; empty when it could not be found.
+    // Returns: the directory of the plug-in's file, trailing slash omitted; empty when looking it up failed.
     static std::string& GetfgModulePathName();
 
     // Returns: "pegasus".
@@ -35,8 +35,8 @@ class TPEGASUSNamespaceProvider : public INamespaceProvider
 
     // Starts a new private server and returns the "root/cimv2" that it serves, whatever the flag and the name say.
     // The namespace takes the place of the current one at once, and keeps it when starting fails.
-    // Throws: TVRXException 3 (unsafe directory or consumer name), 11 (no provider tree), 12 (a program cannot be
-    // run), 42 (no connection); Pegasus::Exception when the server's answer holds no class.
+    // Throws: TVRXException 3 (unsafe directory or consumer name), 11 (provider tree unreadable), 12 (a program
+    // fails to run or times out), 42 (connecting failed); Pegasus::Exception when the server's answer lacks the class.
     // Blocks: at least 4 seconds for each of up to six start attempts, and as long as the programs run.
     boost::shared_ptr<ICIMNamespace> AllocateNamespace(TCIMContext context, bool create,
                                                        std::string name) const override;

@@ -25,7 +25,7 @@ constexpr TConnectionTexts kProviderConnectionTexts = {
     "TPEGASUSProvider::connect failed: ",
 };
 
-// A vendor's mark on a class that hosts should not collect.
+// A vendor's mark on a class that hosts should skip.
 constexpr char kDontCollectQualifier[] = "DONTCOLLECT";
 
 bool IsTaggedCdm(const boost::shared_ptr<ICIMClass>& collected)
@@ -34,7 +34,7 @@ bool IsTaggedCdm(const boost::shared_ptr<ICIMClass>& collected)
     return mirrored && mirrored->GetTag() == kCdmTag;
 }
 
-// A qualifier of a type that does not convert to a boolean throws TVRXException 14. The walk logs that, so that the
+// A qualifier of a type that fails to convert to a boolean throws TVRXException 14. The walk logs that, so that the
 // vendor learns of the mistake, and leaves the class out.
 bool IsNotToBeCollected(const ICIMClass& collected)
 {

@@ -33,10 +33,10 @@ class TPEGASUSProvider : public IProvider, public TClientOwner
     std::string GetDescription(TCIMContext context) const override;
     // Throws: TVRXException 31, always.
     boost::shared_ptr<ICIMNamespace> GetNamespace(TCIMContext context) const override;
-    // Visits the collected classes in request order, without those tagged "CDM" and those whose qualifier
-    // "DONTCOLLECT" is true. The visitor's result does not count; a TVRXException costs only its own class.
+    // Visits the collected classes in request order; those tagged "CDM" and those whose qualifier "DONTCOLLECT" is true
+    // are left out. The visitor's result is ignored; a TVRXException costs only its own class.
     void EnumerateClassesProvided(TClassVisitor visitor, TCIMContext context) override;
-    // Copies nothing.
+    // Leaves this object as it is.
     IProvider& operator=(const IProvider& other) override;
 
     // Creates the client and connects it, as the namespace does.
@@ -53,7 +53,7 @@ class TPEGASUSProvider : public IProvider, public TClientOwner
     // Returns: whether a class of exactly this name, case included, was collected.
     bool IsClassesProvided(const std::string& className) const;
 
-    // Kept for the host's callers; do nothing.
+    // Kept for the host's callers; calls are ignored.
     void Initialize(const _CMPIBroker* broker, const _CMPIContext* context);
     void AddPluginToClass();
 
@@ -79,7 +79,7 @@ class TPEGASUSProvider : public IProvider, public TClientOwner
     const std::vector<boost::shared_ptr<ICIMClass>>& GetCollectedClasses() const { return fCollectedClasses; }
     bool GetDiagnosticOnly() const { return fDiagnosticOnly; }
     boost::shared_ptr<TProviderInfo> GetProviderInfo() const { return fProviderInfo; }
-    // Returns: false; nothing initialises a provider by way of CMPI.
+    // Returns: false, always: initialisation by way of CMPI is unused.
     bool IsInitialized() const { return fInitialized; }
 
   private:

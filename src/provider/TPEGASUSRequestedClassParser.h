@@ -18,9 +18,8 @@ inline constexpr std::size_t kMaxRequestedClassFileBytes = 16U << 20;
 //   <timeout value="seconds"/>  <nsp name="CIM namespace"/>  <module name="..."/>
 //   <functionality diagnosticonly="YES"/>  <class name="requested entry"/> ...
 //
-// Element names match in any case, attribute names in lower case only. Whatever is wrong in the file costs a log line
-// of severity 0 with its line number, and nothing else; even the end of every element but "class" and the root costs
-// one.
+// Element names match in any case, attribute names in lower case only. Whatever is wrong in the file costs only a log
+// line of severity 0 with its line number; even the end of every element but "class" and the root costs one.
 // Thread: one at a time; one file per object.
 class TPEGASUSRequestedClassParser : public TXmlParser
 {
