@@ -13,7 +13,7 @@ namespace Pegasus::mof {
 class AliasTable
 {
   public:
-    // Returns: the path, or null when the alias is not defined (yet).
+    // Returns: the path, or null while the alias is undefined.
     // Ownership: the table's; the path stays valid as long as the table.
     const CIMObjectPath* find(const std::string& name) const
     {

@@ -10,7 +10,7 @@
 
 namespace Pegasus::mof {
 
-// A class and the alias that its declaration gave it; empty for none.
+// A class and its declaration's alias, which may be empty.
 struct ParsedClass
 {
     CIMClass itsClass;

@@ -36,8 +36,8 @@ struct CompileOptions
 //
 // An include is looked for in the including file's directory, the current directory and the include directories.
 //
-// Throws: MofError at the first error; definitions before it have been delivered, nothing of the failed one. FileError
-//     when `path` cannot be read. Pegasus::Exception of the handler's useNamespace() for the initial namespace.
+// Throws: MofError at the first error; definitions before it have been delivered, the failed one is dropped. FileError
+//     when reading `path` fails. Pegasus::Exception of the handler's useNamespace() for the initial namespace.
 // Blocks: as long as the handler, and for reading files.
 void compileFile(const std::string& path, const CompileOptions& options, DefinitionHandler& handler);
 

@@ -14,7 +14,7 @@ bool isDataType(const Token& word, CIMType& type);
 
 // The next three parse at the cursor and throw MofError.
 
-// Parses "[]", "[n]" or nothing, and completes `type`.
+// Parses an optional "[]" or "[n]", and completes `type`.
 void parseArraySuffix(TokenCursor& cursor, ValueType& type);
 
 // Parses a data type, or a class name and REF, which also sets `referenceClass`.

@@ -10,7 +10,7 @@
 
 namespace Pegasus::mof {
 
-// Where the compiler delivers definitions and looks up earlier ones: a server, or memory for a check without one.
+// Where the compiler delivers definitions and looks up earlier ones: a server, or memory when a file is only checked.
 //
 // Throws: any function may throw a Pegasus::Exception. The compiler turns it into an error at the definition's place in
 //     the text and stops.
@@ -24,11 +24,11 @@ class DefinitionHandler
     virtual void useNamespace(const CIMNamespaceName& nameSpace) = 0;
 
     // Looks up a declaration, which gives a qualifier's value its type.
-    // Returns: false when there is none.
+    // Returns: false when it is absent.
     virtual bool findQualifier(const CIMName& name, CIMQualifierDecl& declaration) = 0;
     // Looks up a class with everything it inherits, for the types of an instance's properties and for the keys of an
     // alias's path.
-    // Returns: false when there is none.
+    // Returns: false when it is absent.
     virtual bool findClass(const CIMName& name, CIMClass& found) = 0;
 
     virtual void declareQualifier(const CIMQualifierDecl& declaration) = 0;

@@ -162,8 +162,8 @@ void FileCompiler::obeyPragma()
     }
 }
 
-// A file that does not exist is a warning, as with OpenPegasus's compiler. One that exists and cannot be read is an
-// error: its definitions are meant to be there.
+// A missing file is a warning, as with OpenPegasus's compiler. One that exists and is unreadable is an error: its
+// definitions are meant to be there.
 void FileCompiler::include(const std::string& name)
 {
     const CompileLimits& limits = fCompilation.options.limits;

@@ -44,7 +44,7 @@ void InstanceQueue::finish() const
     throw MofError(reference.place, "alias $" + reference.alias + " is not defined");
 }
 
-// Repeats until a whole round changes nothing: another instance may wait for an alias that this round gave its path.
+// Repeats as long as a round makes progress: another instance may wait for an alias that this round gave its path.
 void InstanceQueue::settle()
 {
     bool hasProgress = true;

@@ -10,7 +10,7 @@
 
 namespace Pegasus::mof {
 
-// A reference property whose value is an alias without a path yet.
+// A reference property whose value is an alias whose path is still unknown.
 struct OpenReference
 {
     CIMName property;
@@ -39,7 +39,7 @@ class InstanceQueue
     // Delivers the instance and those that waited for it, or lets it wait.
     // Throws: MofError for an alias that is defined already; what the handler throws.
     void submit(ParsedInstance parsed);
-    // Throws: MofError at a reference whose alias was never defined.
+    // Throws: MofError at a reference whose alias is still undefined.
     void finish() const;
 
   private:

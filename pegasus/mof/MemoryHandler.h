@@ -8,7 +8,7 @@
 
 namespace Pegasus::mof {
 
-// Keeps definitions in memory, one namespace at a time, for checking and comparing a file without a server. Of CIM's
+// Keeps definitions in memory, one namespace at a time, for checking and comparing a file offline. Of CIM's
 // rules it checks that superclasses exist.
 class MemoryHandler : public DefinitionHandler
 {

@@ -8,8 +8,8 @@
 namespace Pegasus::mof {
 
 // Returns: how many definitions (classes, instances, qualifier declarations) follow the faulty one, which starts at
-//     `faulty`, up to the end of the file; all of the file without one. The text may have any faults, so the count goes
-//     by the keywords with which definitions begin. Included files are not looked at.
+//     `faulty`, up to the end of the file; all in the file when `faulty` is empty. The text may have any faults, so the
+//     count goes by the keywords with which definitions begin. Included files are left out.
 std::size_t countDefinitionsAfter(const SourceText& source, const CompileLimits& limits,
                                   std::optional<std::size_t> faulty);
 

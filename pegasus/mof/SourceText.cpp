@@ -14,7 +14,7 @@ namespace Pegasus::mof {
 
 namespace {
 
-// A diagnostic shows lines up to this length; in a longer one nobody finds the caret.
+// A diagnostic shows lines up to this length; in a longer one the caret is hard to find.
 constexpr std::size_t kShownLineBytes = 240;
 
 ssize_t readSome(int descriptor, char* buffer, std::size_t size)

@@ -39,7 +39,7 @@ class SourceText
 
 // Finds an included file: the first that exists in the including file's directory (with its slash, or empty), the
 // current directory, and the include directories. An absolute name is taken as it is. Returns: its path; empty when
-// there is none.
+// it is absent.
 std::string findInclude(const std::string& name, const std::string& includingDirectory,
                         const std::vector<std::string>& includeDirectories);
 

@@ -17,12 +17,12 @@ struct ValueType
 };
 
 // Converts a written constant to its type. References to aliases take their paths from `aliases`.
-// Throws: MofError at the literal that does not fit.
+// Throws: MofError at the literal that the type rejects.
 CIMValue buildValue(const TokenCursor& cursor, const AliasTable& aliases, const Initializer& initializer,
                     const ValueType& type);
 
 // Converts UTF-8 to CIM text.
-// Throws: MofError at `offset` when the bytes are not valid UTF-8.
+// Throws: MofError at `offset` when the bytes are malformed UTF-8.
 String cimString(const TokenCursor& cursor, const std::string& text, std::size_t offset);
 
 } // namespace Pegasus::mof

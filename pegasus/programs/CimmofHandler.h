@@ -11,14 +11,14 @@ namespace Pegasus::cimmof {
 
 // Brings definitions into a server, and remembers the declarations and classes that it had to ask for.
 //
-// Thread: one thread at a time. Throws: Pegasus::Exception whose message names what could not be done.
+// Thread: one thread at a time. Throws: Pegasus::Exception whose message names the action that failed.
 class ServerHandler : public mof::DefinitionHandler
 {
   public:
     // Requires: client is connected and outlives the handler.
     ServerHandler(CIMClient& client, bool hideWarnings) : fClient(client), fHideWarnings(hideWarnings) {}
 
-    // Creates the namespace if it does not exist.
+    // Creates the namespace if it is missing.
     void useNamespace(const CIMNamespaceName& nameSpace) override;
     bool findQualifier(const CIMName& name, CIMQualifierDecl& declaration) override;
     bool findClass(const CIMName& name, CIMClass& found) override;

@@ -128,7 +128,7 @@ try {
     return 1;
 }
 
-// Returns: the running server's values; empty if no server runs.
+// Returns: the running server's values; empty if the server is stopped.
 std::optional<Array<CIMInstance>> serverSettings()
 {
     CIMClient client;

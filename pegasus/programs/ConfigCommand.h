@@ -35,7 +35,7 @@ extern const char* const kConfigUsage;
 // Carry a command out, on the running server for current values and on the planned file for planned ones, and print the
 // outcome.
 // Returns: the exit status.
-// Throws: Pegasus::Exception, std::system_error. Blocks: for a minute when the server does not answer.
+// Throws: Pegasus::Exception, std::system_error. Blocks: for a minute when the server stays silent.
 int setProperty(const ConfigCommand& command, const std::string& home);
 int getProperty(const ConfigCommand& command, const std::string& home);
 int listProperties(const ConfigCommand& command, const std::string& home);

@@ -31,8 +31,8 @@ ServerCommand parseServerCommand(const std::vector<std::string>& words);
 extern const char* const kServerUsage;
 
 // "cimserver -s": asks the server that holds the tree at `home` to end and waits until its process has ended; ends it
-// by force when it does not answer. Prints what the caller should know. Returns: the exit status. Throws:
-// std::system_error when the tree's lock file cannot be read. Blocks: for the server's shutdown time, and as long
+// by force when it stays silent. Prints what the caller should know. Returns: the exit status. Throws:
+// std::system_error when reading the tree's lock file fails. Blocks: for the server's shutdown time, and as long
 // again.
 int stopServer(const std::string& home);
 

@@ -31,7 +31,7 @@ CIMValue embeddedValue(const CIMConstProperty& property);
 // - Elements that the class leaves alone come first, in the superclass's order, marked propagated, with the
 //   superclass's qualifiers unchanged.
 // - Its own elements follow as declared. One that overrides an inherited element keeps that element's origin, and gets
-//   the inherited qualifiers whose flavor is ToSubclass and which it does not set, marked propagated, before its own.
+//   the inherited qualifiers whose flavor is ToSubclass and which it leaves unset, marked propagated, before its own.
 // - The qualifiers of the class itself are inherited in the same way.
 //
 // Requires: `local` passed checkClass() with this superclass; `superClass` is resolved, or uninitialised for a root

@@ -13,7 +13,7 @@ class ClassStore
   public:
     ClassStore(Storage& storage, ObjectCodec& codec, QualifierStore& qualifiers, const RepositoryLimits& limits);
 
-    // Returns: the class with everything that it inherits; uninitialised when there is none.
+    // Returns: the class with everything that it inherits; uninitialised when absent.
     CIMClass resolved(NamespaceId nameSpace, const CIMName& name);
     CIMClass get(NamespaceId nameSpace, const CIMName& name, const ClassOptions& options);
     // The same as a CLASS element.

@@ -11,7 +11,7 @@ struct sqlite3_stmt;
 namespace Pegasus::repository {
 
 // One SQLite file, held open by this process alone. What a statement wrote survives the death of the process once the
-// statement has returned; a power cut may lose it, because nothing waits for the disk.
+// statement has returned; a power cut may lose it, because a statement may return before the disk has the data.
 //
 // Throws: CIMException CIM_ERR_FAILED "cannot <operation> the repository: <SQLite's message>" from every member.
 // Thread: one thread at a time.

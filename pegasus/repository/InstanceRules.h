@@ -4,13 +4,13 @@
 
 namespace Pegasus::repository {
 
-// Returns: the instance to store. It has every property of its class: first those that were not given, with the class's
+// Returns: the instance to store. It has every property of its class: first the omitted ones, with the class's
 //     defaults and marked propagated, then the given ones in their order. Names and origins are the class's.
 // Requires: `itsClass` is resolved.
 // Throws: CIM_ERR_FAILED ("no such property: X", "type mismatch"), CIM_ERR_NOT_SUPPORTED (abstract class).
 CIMInstance completeInstance(const CIMConstInstance& given, const CIMConstClass& itsClass);
 
-// Returns: the path of a completed instance, without host and namespace. A null text key counts as empty.
+// Returns: the path of a completed instance: its class and keys. A null text key counts as empty.
 // Throws: CIM_ERR_FAILED "class has no keys: X", CIM_ERR_INVALID_PARAMETER for a null key of another type.
 CIMObjectPath instancePath(const CIMConstInstance& completed, const CIMConstClass& itsClass);
 

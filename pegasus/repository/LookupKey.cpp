@@ -10,7 +10,7 @@ namespace Pegasus::repository {
 
 namespace {
 
-// Returns: an integer in decimal, a zero without sign, whatever its spelling; any other text unchanged.
+// Returns: an integer in decimal, whatever its spelling ("-0" becomes "0"); any other text unchanged.
 std::string canonicalNumber(const std::string& text)
 {
     const bool isNegative = !text.empty() && text[0] == '-';

@@ -24,7 +24,7 @@ inline std::string nameKey(const CIMNamespaceName& name)
 
 // Returns: the key of an instance's path. Paths are equal (DSP0004) whatever the case of names, the order of keys and
 //     the spelling of numbers. The path's own host and namespace are left out.
-// Throws: Pegasus::Exception for a reference key that is not a path.
+// Throws: Pegasus::Exception for a reference key that holds a malformed path.
 std::string pathKey(const CIMObjectPath& path);
 
 } // namespace Pegasus::repository

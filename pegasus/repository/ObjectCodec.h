@@ -13,8 +13,8 @@ namespace Pegasus::repository {
 
 // Encodes objects as the texts in which they are stored, the elements of CIM-XML, and decodes them.
 //
-// Throws: CIM_ERR_SERVER_LIMITS_EXCEEDED for an object beyond the limit; CIM_ERR_FAILED for a stored text that cannot
-//     be read.
+// Throws: CIM_ERR_SERVER_LIMITS_EXCEEDED for an object beyond the limit; CIM_ERR_FAILED for a malformed stored
+//     text.
 // Thread: one thread at a time.
 class ObjectCodec
 {

@@ -8,12 +8,12 @@
 namespace Pegasus::repository {
 
 // Finds the declaration of a qualifier.
-// Returns: false when there is none.
+// Returns: false when it is absent.
 using QualifierLookup = std::function<bool(const CIMName& name, CIMQualifierDecl& declaration)>;
 
 // Checks one use of a qualifier against its declaration.
-// Returns: the use with the flavor of its declaration, narrowed by the flavor of the use. A use without any flavor
-//     arrives from the wire as neither overridable nor to subclass, and takes the declaration's flavor.
+// Returns: the use with the flavor of its declaration, narrowed by the flavor of the use. A use that omits its
+//     flavor arrives from the wire with overridable and to-subclass both off, and takes the declaration's flavor.
 // Throws: CIM_ERR_FAILED: "undeclared qualifier: X", "bad qualifier type: X",
 //     "qualifier invalid in this scope: X scope=CLASS".
 CIMQualifier checkedQualifier(const CIMConstQualifier& use, const CIMScope& scope, const QualifierLookup& lookup);

@@ -19,7 +19,7 @@ class QualifierStore
   public:
     QualifierStore(Storage& storage, ObjectCodec& codec) : fStorage(storage), fCodec(codec) {}
 
-    // Returns: the declaration; uninitialised when there is none.
+    // Returns: the declaration; uninitialised when absent.
     CIMQualifierDecl find(NamespaceId nameSpace, const CIMName& name);
     std::vector<CIMQualifierDecl> list(NamespaceId nameSpace);
     void set(NamespaceId nameSpace, const CIMConstQualifierDecl& declaration);

@@ -52,13 +52,13 @@ using InstanceVisitor = std::function<bool(const CIMInstance&)>;
 // objects to tables; Database and Statement are SQLite.
 //
 // Classes are stored as they were created and resolved with what they inherit when they are read. A write that has
-// returned survives the death of the process; a power cut may lose it. A failed write changes nothing.
+// returned survives the death of the process; a power cut may lose it. A failed write leaves the store as it was.
 //
 // Names compare in any case and are returned in the spelling of their creation. Enumerations are in order of
 // creation.
 //
-// Throws: every operation throws CIMException. Its message is the cause alone (in the simple cases the name), without
-//     the symbolic code. CIM_ERR_INVALID_NAMESPACE (message: the namespace) when the namespace does not exist;
+// Throws: every operation throws CIMException. Its message is the cause alone (in the simple cases the name); the
+//     symbolic code is left out. CIM_ERR_INVALID_NAMESPACE (message: the namespace) when the namespace is missing;
 //     CIM_ERR_FAILED when the storage fails.
 // Thread: all operations may be called on any thread at any time; they run one after the other.
 // Ownership: returned classes share their parts with the cache; clone() makes one that may be changed.
@@ -68,13 +68,13 @@ class Repository
   public:
     // Opens the store in `directory`, which is created with its parents if missing. The namespace root always exists.
     // The directory may be deleted while the repository is open: operations go on with the deleted file.
-    // Requires: no other process has it open.
+    // Requires: this process alone has it open.
     explicit Repository(const std::string& directory, const RepositoryLimits& limits = {});
     ~Repository();
     Repository(const Repository&) = delete;
     Repository& operator=(const Repository&) = delete;
 
-    // Parents need not exist.
+    // Parents are optional.
     // Throws: CIM_ERR_ALREADY_EXISTS.
     void createNamespace(const CIMNamespaceName& nameSpace);
     bool hasNamespace(const CIMNamespaceName& nameSpace) const;
@@ -104,8 +104,8 @@ class Repository
     //     rules of qualifiers, overriding, keys and references.
     void createClass(const CIMNamespaceName& nameSpace, const CIMConstClass& newClass);
 
-    // Stores an instance with every property of its class: those not given come first, with the class's defaults.
-    // Returns: its path, without host and namespace.
+    // Stores an instance with every property of its class: the omitted ones come first, with the class's defaults.
+    // Returns: its path (class and keys).
     // Throws: CIM_ERR_INVALID_CLASS, CIM_ERR_ALREADY_EXISTS (message: the path), CIM_ERR_FAILED ("no such property: X",
     //     "type mismatch", "class has no keys: X"), CIM_ERR_NOT_SUPPORTED for an abstract class.
     CIMObjectPath createInstance(const CIMNamespaceName& nameSpace, const CIMConstInstance& newInstance);
@@ -120,9 +120,9 @@ class Repository
                         const CIMPropertyList& propertyList);
     // Throws: CIM_ERR_INVALID_CLASS, CIM_ERR_NOT_FOUND.
     void deleteInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path);
-    // Passes the instances of the class and its subclasses, each with its path (without host and namespace), to the
-    // visitor. Memory stays bounded: they are read in batches. An instance that is created or deleted meanwhile may or
-    // may not be seen.
+    // Passes the instances of the class and its subclasses, each with its path (class and keys), to the visitor.
+    // Memory stays bounded: they are read in batches. An instance that is created or deleted meanwhile may appear or
+    // be missed.
     // Throws: CIM_ERR_INVALID_CLASS; what the visitor throws.
     void enumerateInstances(const CIMNamespaceName& nameSpace, const CIMName& className, const InstanceOptions& options,
                             const InstanceVisitor& visit) const;

@@ -19,9 +19,9 @@ class ResolvedClassCache
   public:
     explicit ResolvedClassCache(std::size_t capacity) : fCapacity(capacity) {}
 
-    // Returns: the class; uninitialised when it is not in the cache.
+    // Returns: the class; uninitialised when absent.
     CIMClass find(NamespaceId nameSpace, const std::string& nameKey);
-    // Requires: the class is not in the cache.
+    // Requires: the class is absent from the cache.
     void insert(NamespaceId nameSpace, const std::string& nameKey, const CIMClass& resolved);
     // Returns: the class as a CLASS element, encoded at the first request and kept for a while.
     // Requires: the class is in the cache; the options have no property list.

@@ -41,7 +41,7 @@ class Storage
     void putQualifier(NamespaceId id, const std::string& name, const std::string& body);
 
     std::optional<std::string> findClass(NamespaceId id, const std::string& name);
-    // Returns: the superclass's name, empty for a root class; nothing when there is no such class.
+    // Returns: the superclass's name, empty for a root class; nullopt when the class is absent.
     std::optional<std::string> findSuperClass(NamespaceId id, const std::string& name);
     // Returns: the names of the direct subclasses, or of all below when deep; of root classes when `name` is empty.
     std::vector<std::string> listSubclasses(NamespaceId id, const std::string& name, bool isDeep);
@@ -53,7 +53,7 @@ class Storage
     void updateInstance(std::int64_t sequence, const std::string& body);
     void deleteInstance(std::int64_t sequence);
     // Returns: instances of the class and of all below it with a sequence beyond `after`: at most `limit` of them, and
-    //     no further one once `maxBytes` are reached.
+    //     the one that reaches `maxBytes` is the last.
     std::vector<InstanceRow> listInstances(NamespaceId id, const std::string& className, std::int64_t after,
                                            std::size_t limit, std::size_t maxBytes);
 

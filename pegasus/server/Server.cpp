@@ -132,7 +132,7 @@ void Server::run(LaunchSignal& signal)
     Log::open(fConfig.home(), !fConfig.flag("daemon"));
     Log::setLevel(logLevel(fConfig));
     StopSignal stop;
-    // The port first: a server that cannot have it leaves the repository as it is.
+    // The port first: a server that fails to get it leaves the repository as it is.
     const LocalSocketFile socketFile(fConfig.home());
     Listeners listeners(fConfig);
     repository::Repository repository(repositoryPath(fConfig));

@@ -64,7 +64,7 @@ template <typename Interface> Interface* ProviderInterfaces::make(const char* ki
 }
 
 // Looks twice: while this thread waited for the factory's turn, another one may have made the interface.
-// Returns: null when the library has no factory of that kind.
+// Returns: null when the library lacks a factory of that kind.
 template <typename Interface>
 Interface* ProviderInterfaces::obtain(Interface* Provider::*kept, const char* kind, const std::string& provider)
 {

@@ -40,8 +40,8 @@ class ProviderInterfaces
     ProviderInterfaces& operator=(const ProviderInterfaces&) = delete;
 
     // Requires: a Use is held.
-    // Throws: CIM_ERR_FAILED as ProviderLibrary; CIM_ERR_NOT_SUPPORTED for a provider without instance interface,
-    //     CIM_ERR_METHOD_NOT_AVAILABLE for one without method interface.
+    // Throws: CIM_ERR_FAILED as ProviderLibrary; CIM_ERR_NOT_SUPPORTED for a provider that lacks an instance
+    //     interface, CIM_ERR_METHOD_NOT_AVAILABLE for one that lacks a method interface.
     CMPIInstanceMI& instance(const std::string& provider);
     CMPIMethodMI& method(const std::string& provider);
 

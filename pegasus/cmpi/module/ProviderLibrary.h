@@ -23,7 +23,7 @@ class ProviderLibrary
     void requireProvider(const std::string& provider) const;
 
     // Makes the provider's interface of one kind ("Instance", "Method") by its factory.
-    // Returns: null when the library has no factory of that kind for the provider.
+    // Returns: null when the library lacks a factory of that kind for the provider.
     // Throws: CIM_ERR_FAILED "ProviderInitFailure: ..." when the factory fails.
     template <typename Interface>
     Interface* create(const std::string& kind, const std::string& provider, const CMPIBroker& broker,

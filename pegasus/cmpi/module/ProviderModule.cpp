@@ -85,7 +85,8 @@ class Call
     const CMPIResult* result() const { return &fResult; }
 
     // Runs the provider's function.
-    // Throws: the sink's exception, which takes precedence over the provider's status; else that status unless OK.
+    // Throws: the sink's exception, which takes precedence over the provider's status; else that status if it differs
+    //     from OK.
     template <typename Function, typename... Arguments> void run(Function* function, Arguments... arguments) const
     {
         const CMPIStatus status =

@@ -14,7 +14,7 @@ namespace Pegasus::cmpi {
 // The paths of delivered instances, and delivered paths, consist of class and keys.
 //
 // Throws: CIMException with the provider's status code and text; CMPI's own codes become CIM_ERR_FAILED. Also
-//     CIM_ERR_FAILED: "ProviderLoadFailure: ..." when the library has no entry points for the provider, and
+//     CIM_ERR_FAILED: "ProviderLoadFailure: ..." when the library lacks entry points for the provider, and
 //     "ProviderInitFailure: ..." when its factory fails (the next request tries again).
 // Thread: every member except the destructor may be called on several threads at once. The provider runs on the
 //     caller's thread.
@@ -35,7 +35,7 @@ class ProviderModule
     ProviderModule(const std::string& moduleName, const std::string& libraryPath, BrokerServices& services);
 
     // Ends the interfaces by cleanup(terminating), whatever they answer, then unloads the library.
-    // Requires: no request is running.
+    // Requires: all requests have ended.
     ~ProviderModule();
 
     ProviderModule(const ProviderModule&) = delete;
@@ -56,7 +56,7 @@ class ProviderModule
                             const CIMPropertyList& properties);
 
     // Replaces `out`.
-    // Throws: CIM_ERR_FAILED also when the provider returns no value, or a null.
+    // Throws: CIM_ERR_FAILED also when the returned value is missing or null.
     CIMValue invokeMethod(const ProviderRequest& request, const CIMObjectPath& path, const CIMName& method,
                           const Array<CIMParamValue>& in, Array<CIMParamValue>& out);
 

@@ -6,7 +6,7 @@
 
 namespace Pegasus::cmpi {
 
-// Calls a function of a vendor's library. An exception that a provider in C++ throws fails its request; without this it
+// Calls a function of a vendor's library. An exception that a provider in C++ throws fails its request; uncaught, it
 // would end the agent process and every other request in it.
 // Requires: `fail` takes the exception's text and throws.
 // Returns: what the function returns.

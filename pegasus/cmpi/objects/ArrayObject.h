@@ -10,7 +10,7 @@ namespace Pegasus::cmpi {
 class ArrayObject final : public Owned, public CMPIArray
 {
   public:
-    // `type` with or without the array bit.
+    // The array bit of `type` is ignored.
     // Throws: CMPI_RC_ERR_INVALID_DATA_TYPE; CMPI_RC_ERR_INVALID_PARAMETER for more elements than kMaxElements.
     ArrayObject(Broker& broker, CMPICount size, CMPIType type);
     ArrayObject(Broker& broker, CMPIType type, std::vector<CIMValue> elements);

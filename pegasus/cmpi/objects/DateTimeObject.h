@@ -23,10 +23,10 @@ class DateTimeObject final : public Owned, public CMPIDateTime
 
 extern const CMPIDateTimeFT kDateTimeTable;
 
-// Throws: CMPI_RC_ERR_INVALID_PARAMETER for a time that CIM cannot express.
+// Throws: CMPI_RC_ERR_INVALID_PARAMETER for a time beyond CIM's range.
 CIMDateTime dateTimeFromBinary(CMPIUint64 microseconds, bool isInterval);
 
-// Throws: CMPI_RC_ERR_INVALID_PARAMETER for a text that is not a CIM datetime.
+// Throws: CMPI_RC_ERR_INVALID_PARAMETER for a malformed CIM datetime.
 CIMDateTime dateTimeFromText(const char* text);
 
 } // namespace Pegasus::cmpi

@@ -10,8 +10,8 @@
 //   end, the newest first.
 // - The provider may release an object earlier; it leaves its frame then.
 // - A clone stays outside of frames: the provider frees it by release, at any time and on any thread.
-// - The arguments of a call (context, path, result, args) live on the broker's stack. A provider's release of them does
-//   nothing.
+// - The arguments of a call (context, path, result, args) live on the broker's stack. A provider's release of them is
+//   ignored.
 // - A provider that loops over many objects may open a frame of its own by mark() and end it by release().
 // - A provider's own thread gets a frame by attachThread() and ends it by detachThread().
 namespace Pegasus::cmpi {
@@ -25,7 +25,7 @@ class Owned
     Owned& operator=(const Owned&) = delete;
     virtual ~Owned() { unlink(); }
 
-    // Leaves the frame that holds it; does nothing when no frame does.
+    // Leaves the frame that holds it, if any.
     void unlink();
 
   private:

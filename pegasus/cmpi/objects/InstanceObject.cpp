@@ -236,7 +236,7 @@ void InstanceObject::setPath(const PathState& path)
 CIMInstance InstanceObject::filtered(const PropertyFilter& filter) const
 {
     CIMInstance result(fPath.className);
-    // Appends without addProperty()'s search for the same name: the schema's names are different already.
+    // Appends directly and skips addProperty()'s search for the same name: the schema's names are distinct.
     Array<CIMProperty>& properties = ObjectAccess::rep(result).fProperties;
     properties.reserveCapacity(static_cast<Uint32>(fSet.size() + fExtra.size()));
     if (fPath.schema != nullptr) {

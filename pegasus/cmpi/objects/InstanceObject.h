@@ -31,7 +31,7 @@ class InstanceObject final : public Owned, public CMPIInstance
     CMPIData property(const char* name) const;
     CMPIData propertyAt(CMPICount index, CMPIString** name) const;
     // A property that the class lacks is dropped with a warning in the log: providers run against older schemas.
-    // Throws: CMPI_RC_ERR_INVALID_DATA_TYPE when the type is not the declared one.
+    // Throws: CMPI_RC_ERR_INVALID_DATA_TYPE when the type differs from the declared one.
     void setProperty(const char* name, const CMPIValue* value, CMPIType type);
 
     PathState completePath() const;

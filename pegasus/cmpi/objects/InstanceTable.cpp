@@ -32,7 +32,7 @@ CMPIObjectPath* getObjectPath(const CMPIInstance* self, CMPIStatus* rc)
     });
 }
 
-// Does nothing: the result filters every instance by the request's own list.
+// The lists are ignored: the result filters every instance by the request's own list.
 CMPIStatus setPropertyFilter(const CMPIInstance* self, const char**, const char**)
 {
     return perform([&] { objectOf<InstanceObject>(self); });

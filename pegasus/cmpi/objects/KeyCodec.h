@@ -3,8 +3,8 @@
 #include <Pegasus/Common/CIMValue.h>
 #include <cmpi/cmpi.h>
 
-// Keys of object paths. A path's text keeps no integer width and does not tell a datetime or reference from a string,
-// so a key's value is widened on the way to the provider, and takes its declared type on the way back.
+// Keys of object paths. A path's text drops the width of an integer and shows a datetime or reference as a string, so
+// a key's value is widened on the way to the provider, and takes its declared type on the way back.
 namespace Pegasus::cmpi {
 
 class Broker;
@@ -15,7 +15,7 @@ CMPIData encodeKey(Broker& broker, const CIMValue& value);
 
 // Converts a key's value to `type`: between integers of any width and char16, and from a string to a datetime or a
 // reference.
-// Returns: a null of `type` when the value does not fit it.
+// Returns: a null of `type` when the conversion fails.
 CIMValue convertKey(const CIMValue& value, CIMType type);
 
 } // namespace Pegasus::cmpi

@@ -13,7 +13,7 @@ class NamedValues
 {
   public:
     // Replaces the value of the same name.
-    // Throws: CMPI_RC_ERR_INVALID_PARAMETER for a text that is not a name; also as decodeValue.
+    // Throws: CMPI_RC_ERR_INVALID_PARAMETER for an illegal name; also as decodeValue.
     void set(const char* name, const CMPIValue* value, CMPIType type);
     // Appends, even when the name is there already; find() then returns the first one.
     void append(const CIMName& name, const CIMValue& value) { fValues.push_back({name, value}); }

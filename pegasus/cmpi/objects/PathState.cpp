@@ -73,7 +73,7 @@ CIMValue valueOfBinding(const CIMKeyBinding& binding)
     }
 }
 
-// The binding with the type that the class declares. Where the class is unknown or the text does not fit, the value
+// The binding with the type that the class declares. Where the class is unknown or the conversion fails, the value
 // keeps the type of its text: the provider decides.
 CIMValue typedKey(const ClassSchema* schema, const CIMKeyBinding& binding)
 {

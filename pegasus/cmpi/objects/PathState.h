@@ -15,7 +15,7 @@ namespace Pegasus::cmpi {
 struct PathState
 {
     // A null or empty text leaves that part unset.
-    // Throws: CMPI_RC_ERR_INVALID_PARAMETER for a text that is not a legal namespace or class name.
+    // Throws: CMPI_RC_ERR_INVALID_PARAMETER for an illegal namespace or class name.
     PathState(Broker& broker, const char* nameSpace, const char* className);
     // Keys take the types that the class declares; values that differ from it, and those of an unknown class, keep
     // their own.
@@ -23,7 +23,7 @@ struct PathState
 
     // Replaces the key of that name; a null value removes it.
     // Throws: CMPI_RC_ERR_INVALID_DATA_TYPE for arrays, instances and untyped nulls; CMPI_RC_ERR_INVALID_PARAMETER when
-    //     the class is known and has no such key.
+    //     the class is known and lacks that key.
     void addKey(const char* name, const CMPIValue* value, CMPIType type);
     // Returns: the key of that name (case-insensitive), or null.
     const NamedValue* findKey(std::string_view name) const;

@@ -35,8 +35,7 @@ enum class Lifetime
 // Requires: called from a catch block.
 CMPIStatus currentFailure() noexcept;
 
-// Returns: a status whose message, unless empty, belongs to the current frame; without the message when memory is
-// short.
+// Returns: a status. Its message, if any, belongs to the current frame; when memory is short, it is left out.
 CMPIStatus makeStatus(CMPIrc code, const std::string& text) noexcept;
 
 // Runs the body of a table function that returns a status only.
@@ -83,7 +82,7 @@ template <typename Object, typename Face> Object& objectOf(const Face* face)
 // Returns: `text`.
 // Throws: CMPI_RC_ERR_INVALID_PARAMETER when it is null.
 const char* requireText(const char* text);
-// Throws: CMPI_RC_ERR_INVALID_PARAMETER also for a text that is not a CIM name.
+// Throws: CMPI_RC_ERR_INVALID_PARAMETER also for an illegal CIM name.
 CIMName requireName(const char* text);
 
 // The release function of every kind of object.

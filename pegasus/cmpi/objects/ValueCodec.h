@@ -21,7 +21,7 @@ struct NamedValue
 CMPIType cmpiTypeOf(CIMType type, bool isArray);
 
 // Returns: the CIM type of a code, its array bit ignored; CMPI_chars and CMPI_charsptr are strings.
-// Throws: CMPI_RC_ERR_INVALID_DATA_TYPE for codes without a CIM type.
+// Throws: CMPI_RC_ERR_INVALID_DATA_TYPE for codes that lack a CIM type.
 CIMType cimTypeOf(CMPIType type);
 
 // Copies what a provider passes as (value, type). Text of type CMPI_chars starts at `value` itself. Of any other type

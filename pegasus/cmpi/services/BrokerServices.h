@@ -40,7 +40,7 @@ class BrokerServices
 
     virtual CIMInstance getInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path,
                                     const CIMPropertyList& properties) = 0;
-    // Subclasses' instances too, with all their properties. A path without namespace is in `nameSpace`.
+    // Subclasses' instances too, with all their properties. A path that omits its namespace is in `nameSpace`.
     virtual Array<CIMInstance> enumerateInstances(const CIMNamespaceName& nameSpace, const CIMName& className,
                                                   const CIMPropertyList& properties) = 0;
     virtual Array<CIMObjectPath> enumerateInstanceNames(const CIMNamespaceName& nameSpace,

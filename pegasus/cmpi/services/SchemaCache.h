@@ -21,7 +21,8 @@ class SchemaCache
     // Requires: `services` outlives the cache.
     explicit SchemaCache(BrokerServices& services) : fServices(services) {}
 
-    // Returns: the class, or null when the server does not know it or fails to answer (the failure is logged).
+    // Returns: the class, or null when the class is unknown to the server or the server fails to answer (the failure is
+    //     logged).
     // Ownership: the cache's; the class lives as long as the cache.
     // Blocks: the first time, as long as BrokerServices::getClass.
     const ClassSchema* find(std::string_view nameSpace, std::string_view className);

@@ -29,7 +29,7 @@ class ConfigError : public std::runtime_error
     Kind fKind;
 };
 
-// Throws: ConfigError when there is no such property.
+// Throws: ConfigError for an unknown property.
 const ConfigProperty& requireConfigProperty(const std::string& name);
 
 // The configuration of a running server. The table's defaults are overridden by the planned file's values, these by the
@@ -47,7 +47,7 @@ class Config
     // Throws: ConfigError.
     void setFromCommandLine(const std::string& name, const std::string& value);
 
-    // Throws: ConfigError; std::system_error when the current file cannot be written.
+    // Throws: ConfigError; std::system_error when writing the current file fails.
     void setCurrent(const std::string& name, const std::string& value);
     void setPlanned(const std::string& name, const std::string& value);
     void resetCurrent(const std::string& name);
@@ -56,7 +56,7 @@ class Config
     // Writes the current file. Throws: std::system_error.
     void save() const;
 
-    // Throws: ConfigError when there is no such property.
+    // Throws: ConfigError for an unknown property.
     std::string text(const std::string& name) const;
     bool flag(const std::string& name) const { return text(name) == "true"; }
     std::size_t number(const std::string& name) const;
@@ -67,8 +67,8 @@ class Config
     // Returns: a number that changes with every change of a current value.
     unsigned generation() const { return fGeneration; }
 
-    // The planned value, or the default if none is planned. Reads the file: cimconfig may have changed it.
-    // Throws: ConfigError when there is no such property.
+    // The planned value, or else the default. Reads the file: cimconfig may have changed it.
+    // Throws: ConfigError for an unknown property.
     std::string planned(const std::string& name) const;
 
   private:

@@ -31,7 +31,7 @@ struct ConfigProperty
 // Every property, in the order in which they are listed.
 const std::vector<ConfigProperty>& configTable();
 
-// Returns: null if there is no such property.
+// Returns: null for an unknown property.
 const ConfigProperty* findConfigProperty(const std::string& name);
 
 // Returns: whether a property may take a value; `home` is where relative directories start.

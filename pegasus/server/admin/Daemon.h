@@ -14,8 +14,8 @@ struct LaunchResult
     std::string error; // one line for standard error
 };
 
-// Reports to the launcher, once, that the server is ready or why it cannot start. Later calls have no effect, and
-// neither has any in the foreground.
+// Reports to the launcher, once, that the server is ready or why its start failed. Later calls are ignored, and so
+// is every call in the foreground.
 // Thread: one at a time.
 class LaunchSignal
 {
@@ -40,10 +40,10 @@ class LaunchSignal
 LaunchResult launchDaemon(const std::function<void(LaunchSignal&)>& server);
 
 // Opens /dev/null as standard input, output and error where the caller has closed them, so that a file that is opened
-// later never takes their place.
+// later gets a number above them.
 void openStandardDescriptors();
 
-// Closes all descriptors above standard error except `keep`; -1 keeps none.
+// Closes all descriptors above standard error except `keep`; with -1, all of them.
 void closeInheritedDescriptors(int keep);
 
 } // namespace Pegasus::server

@@ -16,7 +16,7 @@ enum class LogLevel
 // The server's log: one line an event, appended to <home>/cimserver.log (mode 0600). Past kMaxLogBytes the file is
 // renamed to cimserver.log.1, and a new one begins. Control bytes are written as "\n", "\x1b".
 //
-// Throws: nothing. A line that cannot be written is lost.
+// A line whose write fails is lost.
 // Thread: any.
 class Log
 {

@@ -14,14 +14,14 @@ namespace Pegasus::server {
 class ProcessHandle
 {
   public:
-    // The number of a process that does not exist gives a handle of one that has ended.
+    // An unused process number gives the handle of an ended process.
     explicit ProcessHandle(pid_t pid);
 
     // Returns: whether the process runs this program's file.
     bool runsThisProgram() const;
     // Returns: false if it still runs at the time-out.
     bool waitForEnd(std::chrono::milliseconds timeout) const;
-    // Sends SIGTERM, and SIGKILL when the process has not ended after `grace`.
+    // Sends SIGTERM, and SIGKILL when the process still runs after `grace`.
     // Blocks: for `grace`, and then until the kernel has taken the process down, at most kKillTimeout.
     void end(std::chrono::milliseconds grace) const;
 

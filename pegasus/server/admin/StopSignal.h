@@ -12,7 +12,7 @@ namespace Pegasus::server {
 class StopSignal
 {
   public:
-    // Throws: std::system_error. Requires: no other thread runs.
+    // Throws: std::system_error. Requires: the calling thread is the only one.
     StopSignal();
     ~StopSignal();
     StopSignal(const StopSignal&) = delete;

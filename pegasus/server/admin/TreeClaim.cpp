@@ -20,7 +20,7 @@ namespace fs = std::filesystem;
 constexpr int kMaxReplacements = 3; // others may be starting at the same time
 constexpr std::chrono::seconds kOrderlyEndTimeout{1};
 
-// Whether the folder that a server had opened as its repository is no longer what its path names.
+// Whether the folder that a server had opened as its repository has been deleted, moved or replaced.
 bool isRepositoryGone(const base::TreeLockRecord& record)
 {
     struct stat info = {};

@@ -44,7 +44,7 @@ class TreeClaim
     void take(const Config& config);
 
     // Publishes which process serves, from which repository: completes the lock file and writes the start file. A
-    // start file that cannot be written is a line in the log.
+    // start file whose write fails is a line in the log.
     // Throws: std::system_error. Requires: taken; the repository's folder exists.
     void announce(const std::string& repository);
 

@@ -13,7 +13,7 @@ class TreeLock
 {
   public:
     // Returns: false if another process holds the tree.
-    // Throws: std::system_error when the lock file cannot be opened.
+    // Throws: std::system_error when opening the lock file fails.
     bool acquire(const std::string& home);
     // Requires: acquired. Throws: std::system_error.
     void write(const base::TreeLockRecord& record) const { base::writeTreeLock(fFile, record); }

@@ -25,7 +25,7 @@ namespace {
 constexpr int kControlFd = 3;
 constexpr std::chrono::seconds kGraceForProviders{2};
 
-// The threads that serve channels. They are detached; the count says when none is left.
+// The threads that serve channels. They are detached; the count says when the last one has ended.
 class ChannelThreads
 {
   public:

@@ -21,7 +21,7 @@ class AgentGone : public AgentLost
     using AgentLost::AgentLost;
 };
 
-// The agent sent nothing for the whole timeout.
+// The agent was silent for the whole timeout.
 class AgentSilent : public std::runtime_error
 {
   public:
@@ -44,14 +44,14 @@ struct AgentRequest
 // the provider and its library, and the answer's body is only the elements within IRETURNVALUE or METHODRESPONSE, so
 // that they can be passed on unread, whatever their number.
 //
-// Thread: one at a time, except shutDown().
+// Thread: one at a time; shutDown(): any.
 class AgentChannel
 {
   public:
     explicit AgentChannel(base::Descriptor socket) : fStream(std::move(socket)) {}
 
     // Passes the answer's elements to the sink as they come. Returns: the operation's status.
-    // Throws: AgentLost, AgentGone; AgentSilent when nothing comes for `timeout` (0: any time); what the sink throws.
+    // Throws: AgentLost, AgentGone; AgentSilent after silence for `timeout` (0: any time); what the sink throws.
     // After an exception the rest of the answer is still under way, and the channel must be dropped.
     // Blocks: as long as the agent keeps sending.
     CimStatus request(const AgentRequest& request, ElementSink& sink, std::chrono::milliseconds timeout);

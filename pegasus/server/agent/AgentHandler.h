@@ -10,7 +10,7 @@ namespace Pegasus::server {
 
 // Carries out an agent's requests on its provider module, which the first request loads.
 //
-// Throws (handle): CIMException for an error of the operation or when the module cannot be loaded; what the answer
+// Throws (handle): CIMException for an error of the operation or when loading the module fails; what the answer
 // throws.
 // Thread: any.
 class AgentHandler : public RequestHandler

@@ -8,7 +8,7 @@
 namespace Pegasus::server {
 
 // Requests that the server makes for agents itself. A client's GetInstance is passed on as it came, and its method
-// calls too, unless they leave types out.
+// calls too if every parameter comes with its type.
 // Thread: any.
 
 // EnumerateInstances, with everything that the provider has, of one class alone.

@@ -96,7 +96,7 @@ CimStatus AgentPool::requestOnce(const std::string& module, const AgentRequest& 
     }
 }
 
-// Returns: the module's running agent, started if there is none; it counts as used until release().
+// Returns: the module's running agent, started if absent; it counts as used until release().
 std::shared_ptr<AgentProcess> AgentPool::acquire(const std::string& name)
 {
     const std::lock_guard<std::mutex> lock(fMutex);
@@ -208,7 +208,7 @@ std::vector<AgentPool::Candidate> AgentPool::findIdle(std::chrono::milliseconds 
     return candidates;
 }
 
-// Takes the agent out of use, unless a request came meanwhile.
+// Takes the agent out of use if it is still the same and idle.
 void AgentPool::retire(const Candidate& candidate)
 {
     const std::lock_guard<std::mutex> lock(fMutex);

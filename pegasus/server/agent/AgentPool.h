@@ -40,7 +40,7 @@ class AgentPool
     // `request.library` are filled in here.
     // Returns: the status that the provider gave.
     // Throws: CIMException with CIM_ERR_FAILED and a text that names module and cause: the module is of another
-    // interface type than CMPI, its library is not found, the agent is lost or silent; what the sink throws.
+    // interface type than CMPI, its library is missing, the agent is lost or silent; what the sink throws.
     // Blocks: as long as the provider keeps sending, and for the timeout of its silence.
     CimStatus request(const ProviderReference& provider, AgentRequest request, ElementSink& sink);
 

@@ -14,8 +14,8 @@ namespace Pegasus::server {
 // One running agent: the server's own program in agent mode, which has loaded one provider module.
 //
 // The two are joined by a control socket. Over it the agent receives its end of each channel; when it closes, however
-// the server ended, the agent ends too. A thread waits for the process, so that no zombie stays and the cause of its
-// end is known.
+// the server ended, the agent ends too. A thread waits for the process, so that it is reaped and the cause of its end
+// is known.
 //
 // Thread: any.
 class AgentProcess
@@ -29,12 +29,12 @@ class AgentProcess
 
     // Starts the process. Throws: std::system_error.
     AgentProcess(const std::string& module, const Options& options);
-    // Closes the control socket, and kills the process when it has not ended after a grace period.
+    // Closes the control socket, and kills the process if it still runs after a grace period.
     ~AgentProcess();
     AgentProcess(const AgentProcess&) = delete;
     AgentProcess& operator=(const AgentProcess&) = delete;
 
-    // Returns: an idle channel, or a new one. Throws: AgentGone; std::system_error without descriptors.
+    // Returns: an idle channel, or a new one. Throws: AgentGone; std::system_error when descriptors run out.
     // A request that waits on it fails when the process ends, also when children of the process keep its sockets open.
     std::shared_ptr<AgentChannel> takeChannel();
     void giveBack(std::shared_ptr<AgentChannel> channel);

@@ -13,7 +13,7 @@ namespace Pegasus::server {
 // Upcalls of an agent's providers: requests of an ordinary client to the server's local socket, on as many connections
 // as calls run at once.
 //
-// Throws: CIMException with the operation's status; another Pegasus::Exception when the server cannot be reached.
+// Throws: CIMException with the operation's status; another Pegasus::Exception when the server is unreachable.
 // Thread: any. Blocks: kUpcallTimeoutMs at most.
 class AgentServices : public cmpi::BrokerServices
 {

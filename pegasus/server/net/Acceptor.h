@@ -74,7 +74,7 @@ class Acceptor
     bool waitForWork(std::vector<bool>& ready);
     bool waitForStop() const;
     bool serveReady();
-    // Returns: false if there are no descriptors left.
+    // Returns: false if descriptors have run out.
     bool accept(Source& source);
 
     std::vector<Source> fSources;

@@ -22,7 +22,7 @@ std::string symbolicName(unsigned code)
                  : "Unrecognized CIM status code \"" + std::to_string(code) + "\"";
 }
 
-// A text that a vendor made too long would not fit into the trailer that its readers accept.
+// A text that a vendor made too long would exceed the trailer that its readers accept.
 void cutText(std::string& text)
 {
     if (text.size() <= CimAnswer::kMaxStatusTextBytes) {

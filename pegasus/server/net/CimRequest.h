@@ -11,7 +11,7 @@ namespace Pegasus::server {
 
 // The parameters of an intrinsic method, decoded from the message when an operation asks for them.
 //
-// Throws: wire::XmlError when a parameter does not have the form that is asked for; with the place of the call when a
+// Throws: wire::XmlError when a parameter has another form than is asked for; with the place of the call when a
 // required one is absent.
 // Thread: one at a time.
 class IntrinsicParameters

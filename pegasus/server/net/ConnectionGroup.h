@@ -25,7 +25,7 @@ class ConnectionGroup
     ConnectionGroup(const ConnectionGroup&) = delete;
     ConnectionGroup& operator=(const ConnectionGroup&) = delete;
 
-    // Serves a connection. Returns: false if `most` are being served already, or no thread can be started.
+    // Serves a connection. Returns: false if `most` are being served already, or starting a thread fails.
     // Ownership: `socket` passes to the group only when the connection is served.
     bool serve(base::Descriptor& socket, std::size_t most);
 

@@ -16,7 +16,7 @@ struct HttpLimits
     std::size_t maxBodyBytes = 16u << 20;
 };
 
-// One request as it came. The case of header names has no meaning.
+// One request as it came. Header names match in any case.
 struct HttpRequest
 {
     std::string method; // "POST"; "M-POST" has been resolved (its numbered headers bear their plain names)

@@ -96,7 +96,7 @@ std::size_t HttpRequestParser::putHead(std::string_view bytes)
 }
 
 // The parser takes a chunk's size line, and the last one with the trailer, only as a whole. It is offered at most as
-// many bytes as the limit at once; a line that does not fit in is refused, the same however its bytes arrive.
+// many bytes as the limit at once; a longer line is refused, the same however its bytes arrive.
 std::size_t HttpRequestParser::putBody(std::string_view bytes)
 {
     std::size_t taken = 0;
@@ -172,7 +172,7 @@ bool HttpRequestReader::fill(const base::Deadline& deadline)
     return n > 0;
 }
 
-// Returns: false if there will be none.
+// Returns: false when the connection or the idle time ends first.
 bool HttpRequestReader::waitForRequest(const ReadTimes& times)
 try {
     return fBegin < fEnd || fill(base::Deadline::afterOrNever(times.idle));

@@ -26,7 +26,7 @@ class HttpRequestParser
 
     // Feeds bytes. Returns: how many were taken; the rest has to be offered again, with more bytes after it. After the
     // head, the rest of an unfinished request is shorter than maxHeaderBytes.
-    // Throws: HttpError (501 no request line, 400 bad header, 413 body, 431 head, chunk extension or trailer).
+    // Throws: HttpError (501 malformed request line, 400 bad header, 413 body, 431 head, chunk extension or trailer).
     std::size_t put(std::string_view bytes);
 
     bool isHeaderDone() const;

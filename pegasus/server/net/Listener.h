@@ -17,8 +17,8 @@ base::Descriptor listenOnLoopback(std::uint16_t port);
 // Returns: a non-blocking socket that listens at <home>/cimxml.socket, mode 0600. Throws: std::system_error.
 base::Descriptor listenLocally(const std::string& home);
 
-// Returns: the next connection; an empty descriptor when none waits, or it broke already. Sets `exhausted` when the
-// process or the system is out of descriptors or memory for it.
+// Returns: the next connection; an empty descriptor when the queue is empty or the connection broke already. Sets
+//     `exhausted` when the process or the system is out of descriptors or memory for it.
 // Thread: one at a time a listener.
 base::Descriptor acceptConnection(const base::Descriptor& listener, bool& exhausted);
 

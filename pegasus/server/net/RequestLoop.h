@@ -26,8 +26,8 @@ class RequestHandler
     virtual ~RequestHandler() = default;
 
     // Writes the answer's elements.
-    // Throws: CIMException or OperationFailed for an error of the operation; wire::XmlError when a parameter does not
-    // have the form that the operation needs, and nothing has been written.
+    // Throws: CIMException or OperationFailed for an error of the operation; wire::XmlError for a parameter of another
+    // form than the operation needs, while the answer is still empty.
     virtual void handle(const HttpRequest& http, const CimRequest& request, CimAnswer& answer) = 0;
     // Returns: false for an unknown intrinsic method. It is answered with an ERROR element, as OpenPegasus does, also
     // when the client reads trailers.

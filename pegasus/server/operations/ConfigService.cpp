@@ -60,7 +60,7 @@ CIMValue argument(const CimRequest& request, const char* name)
     return CIMValue();
 }
 
-// Booleans may come without a type, that is as a string.
+// Booleans may come untyped, that is as a string.
 bool flagArgument(const CimRequest& request, const char* name)
 {
     const CIMValue value = argument(request, name);

@@ -12,8 +12,8 @@ bool isConfigClass(const CIMNamespaceName& nameSpace, const CIMName& className);
 std::unique_ptr<ServerInstances> makeConfigInstances(const ServerCore& core);
 
 // UpdatePropertyValue(PropertyValue, ResetValue, SetCurrentValue, SetPlannedValue).
-// Throws: CIMException: CIM_ERR_NOT_FOUND (no such property), CIM_ERR_NOT_SUPPORTED (not while the server runs),
-// CIM_ERR_FAILED (not a value of it, or the file cannot be written), CIM_ERR_METHOD_NOT_AVAILABLE.
+// Throws: CIMException: CIM_ERR_NOT_FOUND (unknown property), CIM_ERR_NOT_SUPPORTED (fixed while the server runs),
+// CIM_ERR_FAILED (illegal value, or writing the file failed), CIM_ERR_METHOD_NOT_AVAILABLE.
 CIMValue invokeConfigMethod(ServerCore& core, const CimRequest& request);
 
 } // namespace Pegasus::server

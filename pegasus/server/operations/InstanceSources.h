@@ -21,8 +21,8 @@ class InstanceSources
     const std::vector<std::pair<CIMName, ProviderReference>>& provided() const { return fProvided; }
     bool isProvided(const CIMName& className) const;
 
-    // Returns: the property list for one provided class. Without deep inheritance a subclass's instances are cut down
-    // to the named class's properties.
+    // Returns: the property list for one provided class. When deep inheritance is off, a subclass's instances are cut
+    // down to the named class's properties.
     CIMPropertyList propertiesOf(const CIMName& providedClass, const repository::InstanceOptions& options) const;
 
   private:

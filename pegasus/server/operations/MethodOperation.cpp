@@ -33,6 +33,7 @@ bool areAllTyped(const Array<CIMParamValue>& parameters)
     return true;
 }
 
+// Throws: CIM_ERR_NOT_FOUND when the class is absent, CIM_ERR_INVALID_NAMESPACE.
 MethodDeclaration declarationOf(ServerCore& core, const CimRequest& request)
 {
     repository::ClassOptions methodsOnly;
@@ -42,7 +43,7 @@ MethodDeclaration declarationOf(ServerCore& core, const CimRequest& request)
             CIMName(String(request.method.c_str()))};
 }
 
-// Returns: the message for the provider: the client's own, unless it left types out.
+// Returns: the message for the provider: the client's own if every argument has its type.
 std::string providerMessage(ServerCore& core, const HttpRequest& http, const CimRequest& request)
 {
     if (request.arguments.size() == 0) {

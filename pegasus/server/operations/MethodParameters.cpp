@@ -39,7 +39,7 @@ std::string typeText(CIMType type, bool isArray)
     return std::string(cimTypeToString(type)) + (isArray ? "[]" : "");
 }
 
-// Without a type, a value is a text, a reference or an embedded object by the element that it came in.
+// An untyped value is a text, a reference or an embedded object by the element that it came in.
 bool canBeReadAs(CIMType sent, CIMType declared)
 {
     return sent == CIMTYPE_STRING || sent == declared || (isEmbedded(sent) && isEmbedded(declared));
@@ -59,7 +59,7 @@ CIMValue readPaths(const CIMValue& texts)
 }
 
 // Reads the value again, by the rules for values that come with a type.
-// Throws: Exception when it does not convert.
+// Throws: Exception when the conversion fails.
 CIMValue readAs(const CIMValue& sent, CIMType type)
 {
     if (sent.getType() == type) {
@@ -97,7 +97,7 @@ MethodDeclaration::MethodDeclaration(const CIMConstClass& cimClass, const CIMNam
     }
 }
 
-// Returns: an uninitialized handle when the method does not declare the parameter.
+// Returns: an uninitialized handle for an undeclared parameter.
 CIMConstParameter MethodDeclaration::declared(const CIMParamValue& sent) const
 {
     const Uint32 index = fMethod.findParameter(CIMName(sent.getParameterName()));
@@ -150,7 +150,7 @@ std::string MethodDeclaration::difference(const CIMParamValue& sent) const
     const CIMValue value = sent.getValue();
     const CIMType type = valueType(declaration);
     const bool isOfType = value.getType() == type || (type == CIMTYPE_OBJECT && value.getType() == CIMTYPE_INSTANCE);
-    // A null travels without a sign of its being an array.
+    // A null travels in the same form for scalars and arrays.
     const bool isOfForm = value.isNull() || value.isArray() == declaration.isArray();
     if (!sent.isTyped() || (isOfType && isOfForm)) {
         return {};

@@ -29,23 +29,22 @@ class ParameterWarnings
 
 // A method as its class declares it, to read a call's parameters by.
 //
-// Throws (constructor): CIM_ERR_NOT_FOUND without such a class, CIM_ERR_INVALID_NAMESPACE.
 // Thread: one at a time.
 class MethodDeclaration
 {
   public:
-    // `cimClass` needs no properties, but the methods that it inherits and the qualifiers of their parameters.
+    // `cimClass` includes inherited methods and the qualifiers of their parameters; its properties are unused.
     MethodDeclaration(const CIMConstClass& cimClass, const CIMName& method);
 
-    // Returns: the parameters as the provider gets them. One that came without a type (PARAMTYPE is optional in
-    // DSP0201) is read as the declared type; the others, and what the method does not declare, stay as sent.
-    // Throws: CIM_ERR_METHOD_NOT_FOUND when a type is missing and the class does not declare the method;
+    // Returns: the parameters as the provider gets them. One that came untyped (PARAMTYPE is optional in DSP0201) is
+    //     read as the declared type; the others, and undeclared ones, stay as sent.
+    // Throws: CIM_ERR_METHOD_NOT_FOUND when a type is missing and the class lacks the method;
     //     CIM_ERR_TYPE_MISMATCH for an array where a scalar is declared and the other way round, and for a reference or
-    //     an embedded object where another type is declared; CIM_ERR_INVALID_PARAMETER for a text that does not
-    //     convert.
+    //     an embedded object where another type is declared; CIM_ERR_INVALID_PARAMETER for a text whose
+    //     conversion fails.
     Array<CIMParamValue> withTypes(const Array<CIMParamValue>& sent) const;
 
-    // Warns of each parameter that is not declared, or that came with another type than the declared one.
+    // Warns of each parameter that is undeclared, or that came with another type than the declared one.
     void warnOfDifferences(const Array<CIMParamValue>& sent, ParameterWarnings& warnings) const;
 
   private:

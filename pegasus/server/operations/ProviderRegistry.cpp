@@ -23,7 +23,7 @@ CIMNamespaceName interop()
     return CIMNamespaceName(kInteropNamespace);
 }
 
-// Returns: the stored instances of a class; empty while the class does not exist.
+// Returns: the stored instances of a class; empty while the class is missing.
 std::vector<CIMInstance> storedInstances(const repository::Repository& repository, const char* className)
 {
     std::vector<CIMInstance> instances;
@@ -143,7 +143,7 @@ void ProviderRegistry::checkNotTaken(const CIMInstance& capabilities)
     }
 }
 
-// Reads the registrations, unless that has been done. Requires: fMutex held.
+// Reads the registrations when the index is out of date. Requires: fMutex held.
 void ProviderRegistry::load()
 {
     if (fLoaded) {

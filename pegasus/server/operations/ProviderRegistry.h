@@ -33,11 +33,11 @@ class ProviderRegistry
 
     // Checks and stores a registration. Returns: its path.
     // Throws: CIMException: CIM_ERR_INVALID_PARAMETER (a required property is missing), CIM_ERR_NOT_SUPPORTED (a value
-    // that this server does not know), CIM_ERR_FAILED (out of order, or another provider has the class already), and
+    // that is unknown to this server), CIM_ERR_FAILED (out of order, or another provider has the class already), and
     // what the repository throws.
     CIMObjectPath registerInstance(const CIMInstance& instance);
 
-    // Returns: the provider of a class itself; nothing when it has none, whatever its superclass has.
+    // Returns: the provider of a class itself, whatever its superclass has; nullopt when absent.
     // Throws: what the repository throws.
     std::optional<ProviderReference> find(const CIMNamespaceName& nameSpace, const CIMName& className,
                                           ProviderType type);

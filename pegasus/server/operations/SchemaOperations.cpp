@@ -29,7 +29,7 @@ void enumerateClasses(ServerCore& core, const CimRequest& request, ElementSink& 
     const CIMName className = request.parameters.optionalClassName("ClassName");
     const bool deep = request.parameters.boolean("DeepInheritance", false);
     std::string text;
-    // Class by class, so that a whole schema is never in memory at once.
+    // Class by class, so that memory holds the text of one class at a time.
     for (const CIMName& name : core.repository.enumerateClassNames(request.nameSpace, className, deep)) {
         text.clear();
         wire::appendClass(text, core.repository.getClass(request.nameSpace, name, options));

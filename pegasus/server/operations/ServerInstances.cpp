@@ -47,7 +47,7 @@ class NamespaceInstances : public ServerInstances
     CIMNamespaceName fAbove;
 };
 
-// Removes the properties that the list does not name.
+// Keeps only the properties that the list names.
 void cutDown(CIMInstance& instance, const CIMPropertyList& properties)
 {
     if (properties.isNull()) {

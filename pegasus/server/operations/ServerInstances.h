@@ -16,8 +16,8 @@ class ServerInstances
   public:
     virtual ~ServerInstances() = default;
 
-    // Returns: null if the class is not one of the server's own.
-    // Throws: CIM_ERR_NOT_FOUND when it is, but its definition has not been compiled.
+    // Returns: null for a class other than the server's own.
+    // Throws: CIM_ERR_NOT_FOUND for one of the server's own whose definition has yet to be compiled.
     static std::unique_ptr<ServerInstances> find(ServerCore& core, const CIMNamespaceName& nameSpace,
                                                  const CIMName& className);
 
