@@ -7,7 +7,7 @@
 #include <string_view>
 
 // Case of ASCII letters, for CIM names and the words of protocols. All other bytes stay as they are. The process's
-// locale has no say: in some locales I and i are different letters.
+// locale is ignored: in some locales I and i are different letters.
 // Thread: any.
 namespace Pegasus::base {
 
@@ -31,7 +31,7 @@ constexpr bool isAsciiAlnum(char c) noexcept
     return isAsciiDigit(c) || (lowerAscii(c) >= 'a' && lowerAscii(c) <= 'z');
 }
 
-// Returns: the text in lower case. Texts that are equal without case have the same folded text.
+// Returns: the text in lower case. Texts that differ only in case have the same folded text.
 inline std::string foldCase(std::string text)
 {
     for (char& c : text) {

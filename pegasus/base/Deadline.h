@@ -29,8 +29,8 @@ class Deadline
 
     bool isNever() const noexcept { return fEnd == Clock::time_point::max(); }
     bool hasPassed() const noexcept { return !isNever() && Clock::now() >= fEnd; }
-    // The time-out of poll(2): rounded up, so that a wait does not end before the deadline; 0 when it has passed, -1
-    // when it never does.
+    // The time-out of poll(2): rounded up, so that a wait lasts until the deadline; 0 when it has passed, -1 for
+    // never().
     int pollTimeoutMs() const noexcept
     {
         if (isNever()) {

@@ -7,7 +7,7 @@
 
 namespace Pegasus::base {
 
-// Owns one file descriptor and closes it in the end; -1 means none.
+// Owns one file descriptor and closes it in the end; -1 means empty.
 class Descriptor
 {
   public:

@@ -90,7 +90,7 @@ Descriptor listenLocalSocket(const std::string& home, int backlog)
     if (::unlinkat(folder.get(), kLocalSocketName, 0) < 0 && errno != ENOENT) {
         fail("cannot remove", home);
     }
-    // The mode of the socket file is the descriptor's own, so there is no moment when others could connect.
+    // The mode of the socket file is the descriptor's own, so it keeps others out from the first moment.
     if (::fchmod(socket.get(), S_IRUSR | S_IWUSR) < 0) {
         fail("cannot set the mode of", home);
     }

@@ -20,7 +20,7 @@ std::string localSocketHome();
 Descriptor connectLocalSocket(const std::string& home, const Deadline& deadline);
 // Returns: a listening socket with mode 0600. A socket file left over is replaced.
 Descriptor listenLocalSocket(const std::string& home, int backlog);
-// Removes the socket file, if there is one. Throws: nothing.
+// Removes the socket file, if it exists.
 void removeLocalSocket(const std::string& home) noexcept;
 
 } // namespace Pegasus::base

@@ -129,7 +129,7 @@ std::optional<Sint64> parseSigned(std::string_view text)
     if (!magnitude || *magnitude > kMax + (negative ? 1 : 0)) {
         return std::nullopt;
     }
-    // The smallest number has no positive counterpart.
+    // The magnitude of the smallest number is beyond the positive range.
     return negative ? static_cast<Sint64>(~*magnitude + 1) : static_cast<Sint64>(*magnitude);
 }
 

@@ -10,21 +10,21 @@
 // Thread: any.
 namespace Pegasus::base {
 
-// Decimal without leading zeros, or hexadecimal after 0x; the whole text. Returns: nothing for any other text, and for
+// Decimal without leading zeros, or hexadecimal after 0x; the whole text. Returns: nullopt for any other text, and for
 // a number outside the type.
 std::optional<Uint64> parseUnsigned(std::string_view text);
 // The same with an optional minus.
 std::optional<Sint64> parseSigned(std::string_view text);
 
 // A decimal with a point, then an optional exponent; also INF, -INF and NaN in any case.
-// Returns: nothing for a number too big for the type; 0 for one too small.
+// Returns: nullopt for a number too big for the type; 0 for one too small.
 std::optional<Real64> parseReal64(std::string_view text);
 std::optional<Real32> parseReal32(std::string_view text);
 
 // As printf's %.16e in the C locale, infinities and NaN included.
 std::string formatReal(Real64 value, int digits = 16);
 
-// Returns: 0 to 15; -1 for what is not a hexadecimal digit.
+// Returns: 0 to 15; -1 for any other character.
 constexpr int hexDigitValue(char c) noexcept
 {
     if (c >= '0' && c <= '9') {

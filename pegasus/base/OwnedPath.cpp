@@ -17,7 +17,7 @@ namespace {
 
 constexpr std::size_t kMaxDatabaseEntryBytes = 64u << 10; // of one user or group
 
-// Returns: the user's name; its number when it has none.
+// Returns: the user's name, or the number of an unnamed user.
 std::string userName(uid_t user)
 {
     std::vector<char> space(kMaxDatabaseEntryBytes);
@@ -28,7 +28,7 @@ std::string userName(uid_t user)
                : std::to_string(user);
 }
 
-// Whether the group has the user's name and no other member.
+// Whether the group has the user's name, and all its listed members are that user.
 bool isPrivateGroup(gid_t group, uid_t user)
 {
     std::vector<char> space(kMaxDatabaseEntryBytes);
@@ -68,7 +68,7 @@ enum class Part
     kFolderAbove
 };
 
-// What is wrong with one file or folder; empty when nothing is.
+// What is wrong with one file or folder; empty when it is in order.
 std::string faultOf(const std::string& path, Part part)
 {
     struct stat info = {};

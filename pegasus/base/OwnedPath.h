@@ -13,7 +13,7 @@ namespace Pegasus::base {
 // A group counts as the user when it is the user's private one: of the user's name, with the user as its only member.
 // The same holds for root's.
 //
-// Returns: empty when the path is owned, or names nothing; else which part of it can be changed by others:
+// Returns: empty when the path is owned, or is absent; else which part of it can be changed by others:
 //   "/opt/tree/bin (owner nobody, mode 0755) can be changed by users other than root".
 std::string ownershipFault(const std::string& path);
 

@@ -16,8 +16,8 @@ enum class PercentSet
 
 std::string percentEncoded(std::string_view text, PercentSet kept);
 
-// Returns: the text with its escapes decoded, whatever set it was encoded with. A "%" without two hexadecimal digits
-// after it stays as it is.
+// Returns: the text with its escapes decoded, whatever set it was encoded with. A "%" that lacks two hexadecimal
+// digits after it stays as it is.
 std::string percentDecoded(std::string_view text);
 
 } // namespace Pegasus::base

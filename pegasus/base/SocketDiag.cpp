@@ -52,7 +52,7 @@ Descriptor openNetlink()
 }
 
 // Reads the answer to one request; answers to earlier ones, which came too late, are dropped.
-// Returns: its size; 0 when there is none.
+// Returns: its size; 0 when receiving fails or the answer is cut off.
 std::size_t receiveAnswer(const Descriptor& netlink, std::uint32_t sequence, char* answer, std::size_t capacity)
 {
     for (;;) {
@@ -71,7 +71,7 @@ std::size_t receiveAnswer(const Descriptor& netlink, std::uint32_t sequence, cha
     }
 }
 
-// Returns: whether the kernel lacks the facility. ENOENT comes from the facility itself: the socket does not exist.
+// Returns: whether the kernel lacks the facility. ENOENT comes from the facility itself: the socket is absent.
 bool isUnsupported(const char* answer, std::size_t size)
 {
     nlmsghdr header = {};
@@ -84,7 +84,7 @@ bool isUnsupported(const char* answer, std::size_t size)
     return error.error != -ENOENT;
 }
 
-// Returns: the socket in an answer; nothing when the answer is an error or is about another socket.
+// Returns: the socket in an answer; nullopt when the answer is an error or is about another socket.
 std::optional<TcpSocketRecord> socketIn(const char* answer, std::size_t size, const TcpSocketQuery& query)
 {
     nlmsghdr header = {};

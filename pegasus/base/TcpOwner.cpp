@@ -85,9 +85,9 @@ std::optional<uid_t> TcpOwnerLookup::userOf(int fd)
     return answer.known ? answer.user : userFromTable(fd);
 }
 
-// The listener first: a connection that is not accepted when it is looked at afterwards is still in the queue of the
-// listener that it came to, which therefore was the one on the port all the time. A connection that its server has
-// accepted and closed has no owner, and is not ESTABLISHED.
+// The listener first: a connection that still waits to be accepted when it is looked at afterwards is in the queue of
+// the listener that it came to, which therefore was the one on the port all the time. A connection that its server has
+// accepted and closed lacks an owner, and has left the state ESTABLISHED.
 std::optional<uid_t> TcpOwnerLookup::serverOf(int fd)
 {
     const Answer answer = askForListener(fd);

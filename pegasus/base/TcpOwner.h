@@ -21,11 +21,11 @@ namespace Pegasus::base {
 class TcpOwnerLookup
 {
   public:
-    // `table`, and the one of IPv6 with a "6" after its name, are read where the kernel has no NETLINK_SOCK_DIAG.
+    // `table`, and the one of IPv6 with a "6" after its name, are read where the kernel lacks NETLINK_SOCK_DIAG.
     explicit TcpOwnerLookup(std::string table = "/proc/net/tcp") : fTable(std::move(table)) {}
 
-    // Returns: the user of the socket at the other end; nothing when the kernel does not report one, as for a
-    // connection that its server has not accepted yet.
+    // Returns: the user of the socket at the other end; nullopt when the kernel leaves it out, as for a
+    // connection that its server is still to accept.
     // Blocks: for one exchange with the kernel, at most 1 s.
     std::optional<uid_t> userOf(int fd);
     // Returns: the user who serves a connection: of the accepted socket or, before it is accepted, of the listener.

@@ -26,10 +26,10 @@ struct TcpEndpoint
 
 // `address` is an in_addr or in6_addr, by the family; `port` is in network order.
 TcpEndpoint makeTcpEndpoint(int family, const void* address, std::uint16_t port);
-// Returns: the addresses of a connected socket; nothing when the kernel does not give them.
+// Returns: the addresses of a connected socket; nullopt on failure.
 std::optional<TcpEndpoint> ownEndpoint(int fd);
 std::optional<TcpEndpoint> peerEndpoint(int fd);
-// Returns: the state of a socket, as TCP_ESTABLISHED; 0 when the kernel does not give it.
+// Returns: the state of a socket, as TCP_ESTABLISHED; 0 on failure.
 unsigned tcpState(int fd);
 
 struct TcpSocketRecord

@@ -39,7 +39,7 @@ inline std::string utf8(const CIMNamespaceName& name)
 // Throws: Exception "The byte sequence starting at index ... is not valid UTF-8 encoding: ...".
 String fromUtf8(std::string_view text);
 
-// For text from elsewhere that must get through: each byte that is not UTF-8 becomes U+FFFD.
+// For text from elsewhere that must get through: each byte outside valid UTF-8 becomes U+FFFD.
 String fromUtf8Repaired(std::string_view text);
 
 } // namespace Pegasus::base

@@ -50,7 +50,7 @@ std::string contentOf(const Descriptor& file)
     return content;
 }
 
-// Returns: 0 if the text is not a number.
+// Returns: 0 if the text fails to parse.
 template <typename Number> Number numberIn(std::string_view text)
 {
     Number number = 0;

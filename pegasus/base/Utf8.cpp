@@ -42,7 +42,7 @@ struct Sequence
     std::size_t length; // 0 when it is not valid
 };
 
-// Returns: how many bytes the sequence of this lead byte has; 0 for a byte that cannot lead.
+// Returns: how many bytes the sequence of this lead byte has; 0 for any other byte.
 std::size_t lengthFromLead(unsigned char lead)
 {
     if (lead < 0x80) {
@@ -100,7 +100,7 @@ bool isLowSurrogate(std::uint32_t unit)
     return (unit & 0xFC00) == 0xDC00;
 }
 
-// Returns: the length of the valid sequence at `at`, 0 when there is none.
+// Returns: the length of the valid sequence at `at`, 0 when the bytes there are invalid.
 std::size_t validLength(std::string_view bytes, std::size_t at) noexcept
 {
     const Sequence next = readSequence(reinterpret_cast<const unsigned char*>(bytes.data() + at), bytes.size() - at);
@@ -149,7 +149,7 @@ Utf8DecodeResult decodeUtf8(const char* from, std::size_t size, Char16* to) noex
         const std::size_t copied = copyAsciiBlocks(from + at, size - at, to);
         at += copied;
         to += copied;
-        // A block was not all ASCII: decode its bytes, one sequence at a time.
+        // A block with other bytes, or the last few bytes: decode them, one sequence at a time.
         for (std::size_t i = 0; i < kBlock && at < size; ++i) {
             const Sequence next = readSequence(reinterpret_cast<const unsigned char*>(from + at), size - at);
             if (next.length == 0) {

@@ -11,7 +11,7 @@
 // Thread: any.
 namespace Pegasus::base {
 
-// Returns: whether all of it is UTF-8. Overlong and truncated sequences, surrogates and codes above U+10FFFF are not.
+// Returns: whether all of it is UTF-8. Overlong and truncated sequences, surrogates and codes above U+10FFFF fail.
 bool isUtf8(std::string_view bytes) noexcept;
 
 // Returns: the bytes, with U+FFFD in place of each byte that isUtf8() would reject.
@@ -23,8 +23,8 @@ struct Utf8DecodeResult
     const char* invalid; // the first byte of the sequence that is not UTF-8; null when all of the input was
 };
 
-// UTF-8 to UTF-16. It rejects what isUtf8() rejects, except that a surrogate in three bytes becomes that unit: CIM
-// strings may hold lone surrogates, and appendUtf8() writes them so.
+// UTF-8 to UTF-16. It rejects what isUtf8() rejects, but takes a surrogate in three bytes as that unit: CIM strings
+// may hold lone surrogates, and appendUtf8() writes them so.
 // Requires: `to` has room for `size` units; each unit comes from at least one byte.
 Utf8DecodeResult decodeUtf8(const char* from, std::size_t size, Char16* to) noexcept;
 

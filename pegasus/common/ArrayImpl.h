@@ -12,7 +12,7 @@
 
 namespace Pegasus {
 
-// The header of the elements, which follow it in the same piece of memory. An empty array may have none.
+// The header of the elements, which follow it in the same piece of memory. An empty array may lack it.
 struct ArrayHeader
 {
     std::atomic<Uint32> fRefs{1};

@@ -30,7 +30,7 @@ constexpr Uint32 kSignAt = 21;
 constexpr Uint32 kDigits = 20;
 constexpr Uint32 kMicroDigits = 6;
 
-// The 20 digits without the point.
+// The 20 digits; the point is left out.
 using Digits = std::array<char, kDigits>;
 
 struct Field
@@ -59,7 +59,7 @@ Digits readDigits(const Char16* text)
     return digits;
 }
 
-// Wildcards stand at the end of the digits and, except in the microseconds, fill whole fields.
+// Wildcards stand at the end of the digits and, outside the microseconds, fill whole fields.
 Uint32 countWildcards(const Digits& digits, bool isInterval)
 {
     const auto first = static_cast<Uint32>(std::find(digits.begin(), digits.end(), '*') - digits.begin());
@@ -75,7 +75,7 @@ Uint32 countWildcards(const Digits& digits, bool isInterval)
     return kDigits - first;
 }
 
-// A wildcard digit counts as 0, a field of nothing else as `ifWild`.
+// A wildcard digit counts as 0, a field of wildcards only as `ifWild`.
 Uint32 readField(const Digits& digits, const Field& field, Uint32 ifWild = 0)
 {
     if (digits[field.at] == '*') {

@@ -143,7 +143,7 @@ bool sameKeys(const Array<CIMKeyBinding>& x, const Array<CIMKeyBinding>& y)
     return x.size() == y.size() && std::equal(x.getData(), x.getData() + x.size(), y.getData());
 }
 
-// FNV-1a without ASCII case.
+// FNV-1a that ignores ASCII case.
 class Hash
 {
   public:

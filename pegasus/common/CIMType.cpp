@@ -42,7 +42,7 @@ const char* const kStatusNames[] = {
     "CIM_ERR_SERVER_IS_SHUTTING_DOWN",
 };
 
-// Returns: the name with that number; `otherwise` when there is none.
+// Returns: the name with that number; `otherwise` for a number outside the table.
 template <std::size_t N> const char* nameAt(const char* const (&names)[N], int number, const char* otherwise)
 {
     return number >= 0 && static_cast<std::size_t>(number) < N ? names[number] : otherwise;

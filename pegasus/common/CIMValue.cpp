@@ -23,7 +23,7 @@ template class RepPointer<CIMValueRep>;
 
 namespace {
 
-// Objects travel by clone, so that the holder's later changes are not seen; everything else is a value already.
+// Objects travel by clone, so that the holder's later changes stay with the holder; everything else is a value already.
 template <typename T> T passed(const T& x)
 {
     if constexpr (std::is_same_v<T, CIMObject> || std::is_same_v<T, CIMInstance>) {
@@ -59,8 +59,8 @@ RepPointer<CIMValueRep> makeNull(CIMType type, Boolean isArray, Uint32 arraySize
     return rep;
 }
 
-// Scalar nulls say nothing but their type, and classes are full of them. A representation is never changed, only
-// replaced, so all nulls of a type can have the same.
+// A scalar null carries its type only, and classes are full of them. A representation is always replaced as a whole, so
+// all nulls of a type can have the same.
 struct SharedNulls
 {
     SharedNulls()

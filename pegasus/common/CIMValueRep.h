@@ -37,7 +37,7 @@ PEGASUS_CIM_TYPE_OF(CIMObject, CIMTYPE_OBJECT);
 PEGASUS_CIM_TYPE_OF(CIMInstance, CIMTYPE_INSTANCE);
 #undef PEGASUS_CIM_TYPE_OF
 
-// What a value holds when it is not null: one T, or one Array<T>, in place where it is no bigger than a pointer.
+// What a non-null value holds: one T, or one Array<T>, in place where it is no bigger than a pointer.
 struct CIMValueRep : RefCounted
 {
     Uint8 fType = CIMTYPE_BOOLEAN;
@@ -132,7 +132,7 @@ struct ValueAccess
     // A value that takes the object as it is.
     template <typename T> static CIMValue make(T scalar) { return makeHeld<T, T>(std::move(scalar), false); }
     template <typename T> static CIMValue make(Array<T> array) { return makeHeld<T, Array<T>>(std::move(array), true); }
-    // Requires: not null, and exactly this type. T may be an Array.
+    // Requires: a non-null value of exactly this type. T may be an Array.
     template <typename Held> static const Held& held(const CIMValue& value) { return value.fRep->held<Held>(); }
 
   private:

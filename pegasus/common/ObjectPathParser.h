@@ -31,7 +31,7 @@ struct Parts
 };
 
 // `//host/namespace:Class.key=value,...`. A quoted value that is itself a path with keys is a reference.
-// Returns: empty when the text is well formed, else the reason why it is not.
+// Returns: empty when the text is well formed, else what is wrong with it.
 std::string parse(std::string_view text, Parts& parts);
 
 // A host name, dotted name, IPv4 or [IPv6] address, each with an optional :port.

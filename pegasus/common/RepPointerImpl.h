@@ -27,7 +27,7 @@ template <typename Rep> void RepPointer<Rep>::retain(Rep* rep) noexcept
 
 template <typename Rep> void RepPointer<Rep>::release(Rep* rep) noexcept
 {
-    // The last holder needs no atomic write: nobody else can take a count any more.
+    // The last holder skips the atomic write: only a holder can add a count.
     if (rep->fRefs.load(std::memory_order_acquire) == 1 || rep->fRefs.fetch_sub(1, std::memory_order_acq_rel) == 1) {
         delete rep;
     }
@@ -41,7 +41,7 @@ template <typename Rep> Rep& RepPointer<Rep>::checked() const
     return *fRep;
 }
 
-// A representation that may be changed: its own copy when it is shared, a new one when there is none.
+// A representation that may be changed: its own copy when it is shared, a new one for a null pointer.
 template <typename Rep> Rep& writable(RepPointer<Rep>& pointer)
 {
     if (!pointer) {

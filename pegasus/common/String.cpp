@@ -115,7 +115,7 @@ StringPointer repFromUtf8(std::string_view utf8)
         throwNotUtf8(utf8, static_cast<std::size_t>(result.invalid - utf8.data()));
     }
     const auto count = static_cast<std::size_t>(result.end - rep->units());
-    // Text that is mostly not ASCII would keep up to two thirds of its memory unused.
+    // Mostly non-ASCII text would keep up to two thirds of its memory unused.
     if (count < utf8.size()) {
         return makeRep(rep->units(), count);
     }

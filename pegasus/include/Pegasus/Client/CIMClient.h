@@ -77,7 +77,7 @@ class PEGASUS_CLIENT_LINKAGE CIMClient
     Array<CIMQualifierDecl> enumerateQualifiers(const CIMNamespaceName& nameSpace);
     void setQualifier(const CIMNamespaceName& nameSpace, const CIMQualifierDecl& qualifierDeclaration);
 
-    // The path's host and namespace are not used. `outParameters` is replaced.
+    // The path's host and namespace are ignored. `outParameters` is replaced.
     CIMValue invokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPath& instanceName,
                           const CIMName& methodName, const Array<CIMParamValue>& inParameters,
                           Array<CIMParamValue>& outParameters);

@@ -4,7 +4,7 @@
 
 PEGASUS_NAMESPACE_BEGIN
 
-// The server's answer is not a usable HTTP message.
+// The server's answer is unusable as an HTTP message.
 class PEGASUS_CLIENT_LINKAGE CIMClientMalformedHTTPException : public Exception
 {
   public:

@@ -7,7 +7,7 @@ PEGASUS_NAMESPACE_BEGIN
 struct ArrayHeader;
 
 // A growing array; copies share until one is changed. The library holds the code for its own element types
-// (the basic types, Char16, String and the CIM classes); other element types do not link.
+// (the basic types, Char16, String and the CIM classes); other element types fail to link.
 // Throws: IndexOutOfBoundsException for every index or range outside the array.
 template <typename T> class PEGASUS_COMMON_LINKAGE Array
 {

@@ -16,7 +16,7 @@ class CIMObject;
 struct CIMClassRep;
 extern template class RepPointer<CIMClassRep>;
 
-// Read-only handle to a class. Copies of a handle share the class; clone() does not.
+// Read-only handle to a class. Copies of a handle share the class; clone() copies it.
 // Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
 // IndexOutOfBoundsException; DynamicCastFailedException from an object that holds an instance.
 class PEGASUS_COMMON_LINKAGE CIMConstClass
@@ -31,7 +31,7 @@ class PEGASUS_COMMON_LINKAGE CIMConstClass
     Boolean isAbstract() const;
     const CIMName& getClassName() const;
     const CIMObjectPath& getPath() const;
-    // Returns: the null name when there is none.
+    // Returns: the null name when absent.
     const CIMName& getSuperClassName() const;
     // Returns: the index, or PEG_NOT_FOUND.
     Uint32 findQualifier(const CIMName& name) const;

@@ -9,7 +9,7 @@ PEGASUS_NAMESPACE_BEGIN
 struct CIMDateTimeRep;
 extern template class RepPointer<CIMDateTimeRep>;
 
-// A CIM time stamp or interval in its 25-character form (DSP0004), with `*` for what is not significant.
+// A CIM time stamp or interval in its 25-character form (DSP0004), with `*` for insignificant digits.
 class PEGASUS_COMMON_LINKAGE CIMDateTime
 {
   public:

@@ -5,7 +5,7 @@
 
 PEGASUS_NAMESPACE_BEGIN
 
-// How a qualifier may be overridden and passed on. Adding a flag never removes its opposite.
+// How a qualifier may be overridden and passed on. Adding a flag keeps its opposite.
 class PEGASUS_COMMON_LINKAGE CIMFlavor
 {
   public:

@@ -15,7 +15,7 @@ class CIMInstance;
 struct CIMInstanceRep;
 extern template class RepPointer<CIMInstanceRep>;
 
-// Read-only handle to an instance. Copies of a handle share the instance; clone() does not.
+// Read-only handle to an instance. Copies of a handle share the instance; clone() copies it.
 // Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
 // IndexOutOfBoundsException; DynamicCastFailedException from an object that holds a class.
 class PEGASUS_COMMON_LINKAGE CIMConstInstance
@@ -67,7 +67,7 @@ class PEGASUS_COMMON_LINKAGE CIMInstance : public CIMConstInstance
     using CIMConstInstance::getProperty;
     CIMProperty getProperty(Uint32 index);
     void removeProperty(Uint32 index);
-    // Drops the properties that are not in the list, and qualifiers and class origins that are not asked for.
+    // Keeps the listed properties (a null list: all), and qualifiers and class origins if they are asked for.
     void instanceFilter(Boolean includeQualifiers, Boolean includeClassOrigin, const CIMPropertyList& propertyList);
 };
 

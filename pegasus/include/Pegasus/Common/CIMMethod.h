@@ -10,7 +10,7 @@ class CIMMethod;
 struct CIMMethodRep;
 extern template class RepPointer<CIMMethodRep>;
 
-// Read-only handle to a method declaration. Copies of a handle share it; clone() does not.
+// Read-only handle to a method declaration. Copies of a handle share it; clone() copies it.
 // Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized().
 class PEGASUS_COMMON_LINKAGE CIMConstMethod
 {

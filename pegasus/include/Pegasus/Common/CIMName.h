@@ -5,7 +5,7 @@
 
 PEGASUS_NAMESPACE_BEGIN
 
-// Name of a CIM element: a letter, underscore or non-ASCII character, then digits too. Compared without (ASCII) case.
+// Name of a CIM element: a letter, underscore or non-ASCII character, then digits too. Comparisons ignore ASCII case.
 // The null name is only made by the default constructor. Throws: InvalidNameException from the constructors.
 class PEGASUS_COMMON_LINKAGE CIMName
 {
@@ -32,7 +32,7 @@ class PEGASUS_COMMON_LINKAGE CIMName
 PEGASUS_COMMON_LINKAGE Boolean operator==(const CIMName& name1, const CIMName& name2);
 PEGASUS_COMMON_LINKAGE Boolean operator!=(const CIMName& name1, const CIMName& name2);
 
-// Name of a CIM namespace: names joined by "/"; one leading "/" is taken off. Case is kept and not compared.
+// Name of a CIM namespace: names joined by "/"; one leading "/" is taken off. Case is kept; comparisons ignore it.
 // Throws: InvalidNamespaceNameException from the constructors.
 class PEGASUS_COMMON_LINKAGE CIMNamespaceName
 {

@@ -7,7 +7,7 @@ PEGASUS_NAMESPACE_BEGIN
 
 class CIMObject;
 
-// Read-only handle to what is either a class or an instance. Copies of a handle share it; clone() does not.
+// Read-only handle to what is either a class or an instance. Copies of a handle share it; clone() copies it.
 // Throws: UninitializedObjectException from every member of a default-constructed handle
 // but isUninitialized(), isClass() and isInstance().
 class PEGASUS_COMMON_LINKAGE CIMConstObject
@@ -60,7 +60,7 @@ class PEGASUS_COMMON_LINKAGE CIMObject : public CIMConstObject
     using CIMConstObject::getProperty;
     CIMProperty getProperty(Uint32 index);
     void removeProperty(Uint32 index);
-    // On a class: does nothing.
+    // A class stays as it is.
     void instanceFilter(Boolean includeQualifiers, Boolean includeClassOrigin, const CIMPropertyList& propertyList);
 };
 

@@ -13,7 +13,7 @@ extern template class RepPointer<CIMKeyBindingRep>;
 struct CIMObjectPathRep;
 extern template class RepPointer<CIMObjectPathRep>;
 
-// One key of an object path: name, text and kind. The text is not checked against the kind.
+// One key of an object path: name, text and kind. The text is taken unchecked, whatever the kind.
 class PEGASUS_COMMON_LINKAGE CIMKeyBinding
 {
   public:
@@ -43,7 +43,7 @@ class PEGASUS_COMMON_LINKAGE CIMKeyBinding
     RepPointer<CIMKeyBindingRep> fRep;
 };
 
-// Name without case; kind; then numbers by value, booleans without case, references as paths, strings exactly.
+// Name ignoring case; kind; then numbers by value, booleans ignoring case, references as paths, strings exactly.
 PEGASUS_COMMON_LINKAGE Boolean operator==(const CIMKeyBinding& x, const CIMKeyBinding& y);
 
 // Where a class or an instance is: host, namespace, class and keys, each of which may be absent.

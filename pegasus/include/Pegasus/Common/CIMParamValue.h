@@ -7,7 +7,7 @@ PEGASUS_NAMESPACE_BEGIN
 struct CIMParamValueRep;
 extern template class RepPointer<CIMParamValueRep>;
 
-// A method's argument: name, value, and whether the type travels with it. Copies share; clone() does not.
+// A method's argument: name, value, and whether the type travels with it. Copies share one argument; clone() copies it.
 // Throws: UninitializedObjectException for an empty name, and from a default-constructed one.
 class PEGASUS_COMMON_LINKAGE CIMParamValue
 {

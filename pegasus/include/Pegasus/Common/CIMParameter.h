@@ -9,9 +9,9 @@ class CIMParameter;
 struct CIMParameterRep;
 extern template class RepPointer<CIMParameterRep>;
 
-// Read-only handle to a parameter declaration. Copies of a handle share it; clone() does not.
+// Read-only handle to a parameter declaration. Copies of a handle share it; clone() copies it.
 // Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
-// TypeMismatchException for a fixed size on a scalar, and for a reference without a class or a class without one.
+// TypeMismatchException for a fixed size on a scalar, a reference that lacks a class, a class on another type.
 class PEGASUS_COMMON_LINKAGE CIMConstParameter
 {
   public:

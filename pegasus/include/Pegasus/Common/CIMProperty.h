@@ -10,7 +10,7 @@ class CIMProperty;
 struct CIMPropertyRep;
 extern template class RepPointer<CIMPropertyRep>;
 
-// Read-only handle to a property. Copies of a handle share the property; clone() does not.
+// Read-only handle to a property. Copies of a handle share the property; clone() copies it.
 // Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized();
 // TypeMismatchException for a fixed size on a scalar, a reference class on another type, an array of references.
 class PEGASUS_COMMON_LINKAGE CIMConstProperty
@@ -25,7 +25,7 @@ class PEGASUS_COMMON_LINKAGE CIMConstProperty
     const CIMValue& getValue() const;
     CIMType getType() const;
     Boolean isArray() const;
-    // Returns: the declared fixed size, 0 if none.
+    // Returns: the declared fixed size, 0 if absent.
     Uint32 getArraySize() const;
     const CIMName& getReferenceClassName() const;
     const CIMName& getClassOrigin() const;

@@ -10,7 +10,7 @@ class CIMQualifier;
 struct CIMQualifierRep;
 extern template class RepPointer<CIMQualifierRep>;
 
-// Read-only handle to a qualifier. Copies of a handle share the qualifier; clone() does not.
+// Read-only handle to a qualifier. Copies of a handle share the qualifier; clone() copies it.
 // Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized().
 class PEGASUS_COMMON_LINKAGE CIMConstQualifier
 {

@@ -11,7 +11,7 @@ class CIMQualifierDecl;
 struct CIMQualifierDeclRep;
 extern template class RepPointer<CIMQualifierDeclRep>;
 
-// Read-only handle to a qualifier declaration. Copies of a handle share the declaration; clone() does not.
+// Read-only handle to a qualifier declaration. Copies of a handle share the declaration; clone() copies it.
 // Throws: UninitializedObjectException from every member of a default-constructed handle but isUninitialized().
 class PEGASUS_COMMON_LINKAGE CIMConstQualifierDecl
 {

@@ -4,7 +4,7 @@
 
 PEGASUS_NAMESPACE_BEGIN
 
-// Status codes of CIM operations (DSP0200); 18 and 19 are not used.
+// Status codes of CIM operations (DSP0200); 18 and 19 are unused.
 // The underlying type is fixed, so that a server's code outside this list can be held too.
 enum CIMStatusCode : Uint32
 {
@@ -37,7 +37,7 @@ enum CIMStatusCode : Uint32
     CIM_ERR_SERVER_IS_SHUTTING_DOWN = 28
 };
 
-// Returns: the symbolic name ("CIM_ERR_FAILED"); "empty" for a number without one.
+// Returns: the symbolic name ("CIM_ERR_FAILED"); "empty" for any other number.
 PEGASUS_COMMON_LINKAGE const char* cimStatusCodeToString(CIMStatusCode code);
 
 PEGASUS_NAMESPACE_END

@@ -16,7 +16,7 @@ struct CIMValueRep;
 extern template class RepPointer<CIMValueRep>;
 
 // A value of any CIM type, scalar or array, or a typed null. The default is a null boolean.
-// There is no constructor from `const char*`: such an argument becomes the boolean true.
+// A `const char*` argument becomes the boolean true: pass a String for text.
 // Objects and instances are cloned on the way in and out.
 class PEGASUS_COMMON_LINKAGE CIMValue
 {

@@ -26,7 +26,7 @@
 #define PEGASUS_UNREACHABLE(CODE) CODE
 #define PEGASUS_FORMAT(FORMAT_INDEX, FIRST_ARGUMENT) __attribute__((format(printf, FORMAT_INDEX, FIRST_ARGUMENT)))
 
-// Returned by searches that find nothing.
+// Returned by searches that fail.
 #define PEG_NOT_FOUND (Pegasus::Uint32(-1))
 
 PEGASUS_NAMESPACE_BEGIN

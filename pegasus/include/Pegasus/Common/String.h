@@ -27,7 +27,7 @@ struct StringRep;
 extern template class RepPointer<StringRep>;
 
 // Text as UTF-16 code units; copies share until one is changed.
-// Every `const char*` is read as UTF-8. Throws: Exception (not UTF-8), NullPointer (null pointer).
+// Every `const char*` is read as UTF-8. Throws: Exception (invalid UTF-8), NullPointer (null pointer).
 class PEGASUS_COMMON_LINKAGE String
 {
   public:
@@ -74,7 +74,7 @@ class PEGASUS_COMMON_LINKAGE String
     Uint32 find(Uint32 index, Char16 c) const;
     Uint32 find(const String& s) const;
     Uint32 reverseFind(Char16 c) const;
-    // ASCII letters only, as in the comparisons without case.
+    // ASCII letters only, as in the comparisons that ignore case.
     void toLower();
     void appendPrintf(const char* format, ...) PEGASUS_FORMAT(2, 3);
 
