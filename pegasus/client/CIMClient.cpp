@@ -17,7 +17,7 @@ void failUnexpected(const XmlElement& element)
                  "Expected close of IRETURNVALUE element, got " + std::string(element.name()) + " instead");
 }
 
-// An operation whose result is one object. An answer that says success without a result gives an uninitialised one.
+// An operation whose result is one object. A success whose result is absent gives an uninitialised object.
 template <typename T>
 T readOne(CIMClientRep& rep, client::Request request, const char* elementName,
           T (ElementDecoder::*decode)(const XmlElement&))
@@ -51,7 +51,7 @@ void readNothing(CIMClientRep& rep, const client::Request& request)
     rep.exchange(request, [](const XmlElement& element, ElementDecoder&) { failUnexpected(element); });
 }
 
-// OpenPegasus's client gives a null output without its type, whatever type the answer names.
+// OpenPegasus's client drops the type of a null output, whatever type the answer names.
 CIMParamValue asOutput(const CIMParamValue& output)
 {
     return output.getValue().isNull() ? CIMParamValue(output.getParameterName(), CIMValue(), false) : output;

@@ -44,8 +44,8 @@ class CIMClientRep
     void disconnect();
 
     // Sends the request and passes each element of the result to `onContent`. After a failure the connection is closed
-    // and the next call opens a new one. An ERROR element with the code 0 is an answer without a result. Throws: what
-    // CIMClient's operations throw.
+    // and the next call opens a new one. An ERROR element with the code 0 is a success with an empty result. Throws:
+    // what CIMClient's operations throw.
     void exchange(const client::Request& request, const ContentHandler& onContent);
 
   private:

@@ -34,7 +34,7 @@ class ResponseReader : private wire::XmlSliceHandler
     ResponseReader(const ExpectedResponse& expected, wire::ElementDecoder& decoder, ContentHandler onContent);
 
     void feed(std::string_view bytes) { fSlicer.feed(bytes); }
-    // The body has ended. Throws: XmlError when the answer is not complete.
+    // The body has ended. Throws: XmlError when the answer is incomplete.
     void finish();
 
     // Returns: the answer's ERROR element, if there was one; its code may be 0, success.

@@ -187,7 +187,7 @@ ServerConnection::Result ServerConnection::receive(char* buffer, std::size_t cap
                                                    std::size_t& received)
 {
     for (;;) {
-        // Asked before each read: a server that never stops sending must not outlast the deadline.
+        // Asked before each read: the deadline also bounds a server that goes on sending.
         if (deadline.hasPassed()) {
             return Result::kTimedOut;
         }

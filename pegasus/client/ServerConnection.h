@@ -24,7 +24,7 @@ struct ServerAddress
     std::string text() const;
 };
 
-// One socket, close-on-exec and without SIGPIPE. No call lasts beyond the deadline that it is given.
+// One socket, close-on-exec and free of SIGPIPE. Every call ends by the deadline that it is given.
 class ServerConnection
 {
   public:
@@ -51,7 +51,7 @@ class ServerConnection
     bool isOpen() const { return fFd >= 0; }
     // Returns: whether the server has sent anything on it.
     bool hasReceived() const { return fHasReceived; }
-    // Returns: whether the server has closed the idle connection, or sent something without a request.
+    // Returns: whether the server has closed the idle connection, or sent unrequested bytes.
     bool isStale() const;
 
     Result send(std::string_view bytes, const base::Deadline& deadline);

@@ -24,7 +24,7 @@ enum class Route
 Route routeTo(Uint32 port, const base::TreeLockStatus& lock);
 
 // Returns: the home folder `R/pegasus` of the tree whose `R/pegasus/lib` holds the library; empty when the library lies
-// elsewhere, as in a build folder. Links are not resolved: the folders of a tree may hold links to another one's files.
+// elsewhere, as in a build folder. Links stay unresolved: the folders of a tree may hold links to another one's files.
 std::string homeOfLibrary(const std::string& libraryPath);
 // The same for this library, by the path by which it was loaded.
 const std::string& treeHome();
@@ -36,7 +36,7 @@ bool isLoopback(const sockaddr& address);
 // Throws: CannotConnectException when the tree's server does not serve the port. `address` is what it names.
 bool isReachedBySocket(const std::string& home, Uint32 port, const std::string& address);
 
-// Returns: why the server of a TCP connection within this machine is not to be trusted, with port and user; empty when
+// Returns: why the server of a TCP connection within this machine is untrusted, with port and user; empty when
 // it is root's or belongs to this process's own user. Blocks: for the kernel's answers, at most 2 s.
 std::string serverFault(int fd, Uint32 port);
 

@@ -14,7 +14,7 @@ bool isBlank(std::string_view text) noexcept
     return text.find_first_not_of(kBlanks) == std::string_view::npos;
 }
 
-// Removes the next word from `text`: a token, a quoted text (without its quotes), or one of the separators.
+// Removes the next word from `text`: a token, a quoted text (its quotes dropped), or one of the separators.
 std::string_view takeWord(std::string_view& text) noexcept
 {
     text.remove_prefix(std::min(text.find_first_not_of(kBlanks), text.size()));

@@ -11,7 +11,7 @@ namespace {
 
 using Kind = XmlError::Kind;
 
-// The attributes that DSP0201 gives each element; the language of texts is not kept.
+// The attributes that DSP0201 gives each element; the language of texts is dropped.
 constexpr std::string_view kPropertyAttributes[] = {"NAME",           "CLASSORIGIN",    "PROPAGATED", "TYPE",
                                                     "EmbeddedObject", "EMBEDDEDOBJECT", "ARRAYSIZE",  "xml:lang"};
 constexpr std::string_view kReferenceAttributes[] = {"NAME", "CLASSORIGIN", "PROPAGATED", "REFERENCECLASS"};
@@ -206,7 +206,7 @@ CIMQualifier ElementDecoder::decodeQualifier(const XmlElement& element)
     return CIMQualifier(name, value, flavor(element, values + kFirstFlavor), propagated);
 }
 
-// Returns: the first child that is not a qualifier.
+// Returns: the first child after the qualifiers.
 XmlElement ElementDecoder::decodeQualifiers(XmlElement child, Array<CIMQualifier>& qualifiers)
 {
     for (; child.is("QUALIFIER"); child = child.nextSibling()) {
@@ -269,7 +269,7 @@ CIMProperty ElementDecoder::decodeProperty(const XmlElement& element)
     return property;
 }
 
-// `values` begin with NAME, CLASSORIGIN, PROPAGATED. Returns: the first child that is not a qualifier.
+// `values` begin with NAME, CLASSORIGIN, PROPAGATED. Returns: the first child after the qualifiers.
 XmlElement ElementDecoder::beginProperty(const XmlElement& element, const XmlAttribute* values, CIMPropertyRep& rep)
 {
     rep.fName = nameAttribute(element, "NAME", values[0]);
@@ -304,7 +304,7 @@ void ElementDecoder::readReferenceProperty(const XmlElement& element, CIMPropert
     expectEnd(element, hasValue ? child.nextSibling() : child);
 }
 
-// Returns: the first child that is not a property.
+// Returns: the first child after the properties.
 XmlElement ElementDecoder::decodeProperties(XmlElement child, Array<CIMProperty>& properties)
 {
     properties.reserveCapacity(countFrom(child));

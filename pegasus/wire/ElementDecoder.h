@@ -43,17 +43,17 @@ class ElementDecoder
     // LOCALNAMESPACEPATH
     CIMNamespaceName decodeLocalNamespacePath(const XmlElement& element);
 
-    // PARAMVALUE. Without a PARAMTYPE the value is a string (or a reference) and the result is not typed.
+    // PARAMVALUE. If PARAMTYPE is absent, the value is a string (or a reference) and the result is untyped.
     CIMParamValue decodeParamValue(const XmlElement& element);
     // RETURNVALUE
     CIMValue decodeReturnValue(const XmlElement& element);
     // VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY, read as `type`. A null element of an array becomes the
-    // type's default, because arrays have no nulls.
+    // type's default, because arrays lack nulls.
     CIMValue decodeValue(const XmlElement& element, CIMType type);
 
     // An attribute that holds a name. Throws: XmlError "Illegal value for PROPERTY.NAME attribute", or "missing ...".
     const CIMName& nameAttribute(const XmlElement& element, std::string_view attribute, XmlAttribute value);
-    // Returns: the text. Throws: XmlError with the element's place when it is not UTF-8.
+    // Returns: the text. Throws: XmlError with the element's place on invalid UTF-8.
     String toString(const XmlElement& element, std::string_view utf8);
 
     const XmlLimits& limits() const { return fLimits; }

@@ -97,7 +97,7 @@ CIMObjectPath ElementDecoder::decodeNameIn(const XmlElement& element, const Stri
         }
         keys.append(decodeKeyBinding(child));
     }
-    // A single key may stand without its name.
+    // A single key may omit its name.
     if (child && keys.size() == 0 && !child.nextSibling()) {
         keys.append(child.is("KEYVALUE")
                         ? decodeKeyValue(child, CIMName())

@@ -226,7 +226,7 @@ CIMValue ElementDecoder::decodeValue(const XmlElement& element, CIMType type)
 
 // ---- parameters
 
-// What stands in a PARAMVALUE or RETURNVALUE: a value, a path that is a reference, or nothing.
+// What stands in a PARAMVALUE or RETURNVALUE: a value, or a path that is a reference; null when empty.
 CIMValue ElementDecoder::decodeParameterContent(const XmlElement& element, CIMType type)
 {
     const XmlElement child = element.firstChild();
@@ -251,7 +251,7 @@ CIMParamValue ElementDecoder::decodeParamValue(const XmlElement& element)
     element.attributes({"NAME", "PARAMTYPE", "EmbeddedObject", "EMBEDDEDOBJECT"}, values);
     const CIMName name = nameAttribute(element, "NAME", values[0]);
     const bool isTyped = bool(values[1]);
-    // A null without a type: the value is the untyped one that a default-constructed CIMValue is.
+    // An untyped null: the value is the untyped one that a default-constructed CIMValue is.
     if (!isTyped && !element.firstChild()) {
         return CIMParamValue(name.getString(), CIMValue(), false);
     }

@@ -299,7 +299,7 @@ void appendKeyBinding(std::string& out, const CIMKeyBinding& key)
     out += "</KEYBINDING>\n";
 }
 
-// INSTANCENAME, or CLASSNAME when there are no keys.
+// INSTANCENAME for a path with keys, else CLASSNAME.
 void appendName(std::string& out, const CIMObjectPath& path)
 {
     if (path.getKeyBindings().size() > 0) {

@@ -37,7 +37,7 @@ void appendLocalNamespacePath(std::string& out, const CIMNamespaceName& nameSpac
 // VALUE.REFERENCE, with as much of the path as it has
 void appendReference(std::string& out, const CIMObjectPath& path);
 
-// VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY; nothing for a null.
+// VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY; a null is left out.
 void appendValue(std::string& out, const CIMValue& value);
 // PARAMVALUE
 void appendParamValue(std::string& out, const CIMParamValue& parameter);

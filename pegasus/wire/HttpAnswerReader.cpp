@@ -195,7 +195,7 @@ void HttpAnswerReader::feedHeader(std::string_view& bytes)
 }
 
 // Returns: how many bytes were used; the rest must come again, with more after it. Only framing waits for more: the
-// head of a chunk, or a trailer. The parser takes it as a whole, so what does not fit into the window is too large,
+// head of a chunk, or a trailer. The parser takes it as a whole, so what exceeds the window is too large,
 // however the bytes were split.
 std::size_t HttpAnswerReader::put(std::string_view bytes)
 {

@@ -18,7 +18,7 @@ struct HttpAnswerLimits
     std::uint32_t maxHeaderBytes = 64 * 1024;
     // Bytes of the head of one chunk with its extensions; and of the last chunk's head with the trailer fields.
     std::uint32_t maxFramingBytes = 64 * 1024;
-    // Bytes of the body, without the framing of chunks.
+    // Bytes of the body, the framing of chunks excluded.
     std::uint64_t maxBodyBytes = std::uint64_t(4) * 1024 * 1024 * 1024;
 };
 
@@ -35,7 +35,7 @@ struct HttpAnswerFields
     std::string statusDescription; // CIMStatusCodeDescription, percent-decoded
 };
 
-// The bytes are not an HTTP answer, or they are beyond a limit. what() is empty, or names the limit: "a header of more
+// The bytes are malformed as an HTTP answer, or beyond a limit. what() is empty, or names the limit: "a header of more
 // than 65536 bytes".
 class HttpAnswerError : public std::runtime_error
 {
@@ -46,7 +46,7 @@ class HttpAnswerError : public std::runtime_error
 // Reads one HTTP/1.x answer piece by piece: a body with a length, in chunks with trailers, or up to the end of the
 // connection.
 //
-// Throws: HttpAnswerError; and what the handlers throw. After an exception the reader is of no more use.
+// Throws: HttpAnswerError; and what the handlers throw. After an exception the reader may only be destroyed.
 // Thread: one thread at a time.
 class HttpAnswerReader
 {
@@ -62,7 +62,7 @@ class HttpAnswerReader
     HttpAnswerReader& operator=(const HttpAnswerReader&) = delete;
 
     // The next bytes from the connection, split anywhere. Bytes after the answer are ignored; a connection that has
-    // them must not be used again.
+    // them must be closed.
     void feed(std::string_view bytes);
     // The connection has ended. Returns: whether the answer is complete.
     bool endOfConnection();

@@ -15,7 +15,7 @@ namespace Pegasus::wire {
 class NameCache
 {
   public:
-    // Returns: the name; valid until the next call. Throws: InvalidNameException; Exception when it is not UTF-8.
+    // Returns: the name; valid until the next call. Throws: InvalidNameException; Exception on invalid UTF-8.
     const CIMName& name(std::string_view utf8);
 
   private:

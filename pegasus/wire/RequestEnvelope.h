@@ -17,16 +17,16 @@ namespace Pegasus::wire {
 class IntrinsicCall
 {
   public:
-    // `method` needs no escaping. Throws: InvalidNamespaceNameException for a null namespace.
+    // `method` is written unescaped. Throws: InvalidNamespaceNameException for a null namespace.
     IntrinsicCall(std::string_view method, const CIMNamespaceName& nameSpace);
 
-    // Nothing for a null name.
+    // A null name is left out.
     IntrinsicCall& className(std::string_view parameter, const CIMName& name);
     IntrinsicCall& instanceName(const CIMObjectPath& path);
-    // Nothing when the value is what the server assumes without it.
+    // Left out when the value is `ifMissing`, the server's default.
     IntrinsicCall& flag(std::string_view parameter, Boolean value, Boolean ifMissing);
     IntrinsicCall& text(std::string_view parameter, const String& value);
-    // Nothing for a null list.
+    // A null list is left out.
     IntrinsicCall& propertyList(const CIMPropertyList& list);
     IntrinsicCall& newClass(const CIMClass& cimClass);
     IntrinsicCall& newInstance(const CIMInstance& instance);
@@ -47,11 +47,11 @@ class IntrinsicCall
 };
 
 // Returns: a METHODCALL element, on an instance when the path has keys, else on a class. The path's host and namespace
-// are not used.
+// are ignored.
 std::string encodeMethodCall(const CIMNamespaceName& nameSpace, const CIMObjectPath& path, const CIMName& method,
                              const Array<CIMParamValue>& parameters);
 
-// Returns: the whole message around a METHODCALL or IMETHODCALL element. `messageId` needs no escaping.
+// Returns: the whole message around a METHODCALL or IMETHODCALL element. `messageId` is written unescaped.
 std::string encodeRequestMessage(std::string_view messageId, std::string_view call);
 
 } // namespace Pegasus::wire

@@ -21,7 +21,7 @@ std::string quoted(std::string_view text)
     return "\"" + std::string(text) + "\"";
 }
 
-// Checks what the parser does not: one root, tokens and nesting within the limits, and no DOCTYPE.
+// Checks what the parser leaves open: one root, tokens and nesting within the limits, DOCTYPE absent.
 class MessageCheck
 {
   public:
@@ -182,7 +182,8 @@ XmlPlace XmlDocument::placeOf(const char* position) const
     return placeAtOffset(static_cast<std::size_t>(position - fText));
 }
 
-// The parser has put zeros over some delimiters by now; line feeds are still there, except one directly after a name.
+// The parser has put zeros over some delimiters by now, such as a line feed directly after a name; all other line feeds
+// are still there.
 XmlPlace XmlDocument::placeAtOffset(std::size_t offset) const
 {
     return advance(fStart, std::string_view(fText, std::min(offset, fSize)));

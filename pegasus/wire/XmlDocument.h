@@ -16,7 +16,7 @@ namespace Pegasus::wire {
 
 class XmlDocument;
 
-// The raw text of an attribute, a view into the message; nothing when the element does not have it. It is used like an
+// The raw text of an attribute, a view into the message, or the absence of the attribute. It is used like an
 // std::optional, but travels in two registers: decoders read millions of them.
 class XmlAttribute
 {
@@ -50,21 +50,21 @@ class XmlElement
     // The children that are elements. Text beside them is an error.
     XmlElement firstChild() const;
     XmlElement nextSibling() const;
-    // The one child. Throws: XmlError when there is none or a second one.
+    // The one child. Throws: XmlError for any other number of children.
     XmlElement onlyChild() const;
-    // Requires: no children. Throws: XmlError otherwise.
+    // Throws: XmlError when the element has a child.
     void expectNoChildren() const;
     void expectName(std::string_view expectedName) const;
 
     // Reads attributes: values[i] gets the value of names[i].
-    // Throws: XmlError for an attribute that is not listed or appears twice.
+    // Throws: XmlError for an attribute that is unlisted or appears twice.
     template <std::size_t N> void attributes(const std::string_view (&names)[N], XmlAttribute (&values)[N]) const
     {
         readAttributes(names, values, N);
     }
     void expectNoAttributes() const { readAttributes(nullptr, nullptr, 0); }
 
-    // The character data of an element without children, with blanks around the raw text taken off and references
+    // The character data of a childless element, with blanks around the raw text taken off and references
     // resolved. Returns: a view into the message or into `scratch`; valid until either changes.
     std::string_view text(std::string& scratch) const;
     // `raw` (an attribute's value) with references resolved; as text().

@@ -19,7 +19,7 @@ const char* wordFor(XmlError::Kind kind)
     }
 }
 
-// The cause may quote bytes of the message that are not UTF-8.
+// The cause may quote bytes of the message that are invalid UTF-8.
 String printable(std::string text)
 {
     try {

@@ -19,7 +19,7 @@ struct XmlLimits
     std::size_t maxElementBytes = 64UL * 1024 * 1024;
     // Elements of one array value.
     std::size_t maxArrayElements = 1024UL * 1024;
-    // Key bindings of one object path, nested ones not counted.
+    // Key bindings of one object path, nested ones excluded.
     std::size_t maxKeyBindings = 256;
     // Embedded objects in embedded objects.
     std::size_t maxEmbedding = 8;

@@ -41,7 +41,7 @@ constexpr std::array<bool, 256> kIsTagMark = [] {
     return marks;
 }();
 
-// Returns: the offset of the next '>', '"' or '\'' from `from`; the size when there is none.
+// Returns: the offset of the next '>', '"' or '\'' from `from`; the size when absent.
 std::size_t findTagMark(std::string_view bytes, std::size_t from)
 {
     while (from < bytes.size() && !kIsTagMark[static_cast<unsigned char>(bytes[from])]) {

@@ -35,7 +35,7 @@ class XmlScanner
   public:
     explicit XmlScanner(const XmlLimits& limits) : fLimits(limits) {}
 
-    // Requires: `bytes` is not empty. `place` is where they begin.
+    // Requires: at least one byte. `place` is where they begin.
     XmlToken next(std::string_view bytes, XmlPlace place) const;
 
     // Returns: the name in a tag, which begins with "<" or "</".

@@ -68,11 +68,11 @@ XmlToken XmlSlicer::nextToken() const
     }
 }
 
-// Takes one token. Returns: false when it is not complete.
+// Takes one token. Returns: false when it is incomplete.
 bool XmlSlicer::step()
 {
     const XmlToken token = nextToken();
-    // Text may go on with the next bytes; in a slice that does not matter.
+    // Text may go on with the next bytes; a slice may take it in parts.
     const bool isCut = token.type == Type::kText && token.size == rest().size() && fSliceDepth == 0;
     if (token.type == Type::kIncomplete || isCut) {
         return false;

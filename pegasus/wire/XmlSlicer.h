@@ -14,7 +14,7 @@ class XmlSliceHandler
 {
   public:
     virtual ~XmlSliceHandler() = default;
-    // A start tag of the envelope, as an element without content.
+    // A start tag of the envelope, as an empty element.
     virtual void openEnvelope(const XmlElement& tag) = 0;
     virtual void closeEnvelope(std::string_view name) = 0;
     // An element inside the envelope, with everything in it.
@@ -23,7 +23,7 @@ class XmlSliceHandler
 
 // Cuts a message that arrives in pieces. It delivers the outer elements (the envelope) tag by tag, and each element
 // inside them when all of it has come; then it forgets them.
-// Throws: XmlError, and what the handler throws. After an exception it must not be used again.
+// Throws: XmlError, and what the handler throws. After an exception it may only be destroyed.
 class XmlSlicer
 {
   public:
@@ -31,7 +31,7 @@ class XmlSlicer
     XmlSlicer(std::vector<std::string_view> envelope, XmlSliceHandler& handler, const XmlLimits& limits);
 
     void feed(std::string_view bytes);
-    // The message has ended. Throws: XmlError when its XML is not complete.
+    // The message has ended. Throws: XmlError when its XML is incomplete.
     void finish();
 
     // Returns: the place up to which the message was read.

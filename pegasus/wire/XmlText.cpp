@@ -81,7 +81,7 @@ bool appendReference(std::string_view reference, std::string& out)
     return true;
 }
 
-// Returns: the value of `name` in a declaration; nothing when it is not there.
+// Returns: the value of `name` in a declaration; nullopt when absent.
 std::optional<std::string_view> pseudoAttribute(std::string_view declaration, std::string_view name)
 {
     std::size_t at = declaration.find(name);

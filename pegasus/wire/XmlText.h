@@ -13,7 +13,7 @@ namespace Pegasus::wire {
 
 std::string_view trimBlanks(std::string_view text);
 
-// Returns: whether there is a reference, a carriage return or a character that XML does not allow.
+// Returns: whether there is a reference, a carriage return or a character that XML forbids.
 bool needsResolving(std::string_view text);
 
 // Appends `text` with the five entities and character references resolved and line ends as line feeds. References to
@@ -24,7 +24,7 @@ std::string resolveReferences(std::string_view text, std::string& out);
 // Appends text of a CDATA section: only the line ends are changed.
 void appendNormalized(std::string& out, std::string_view text);
 
-// `<?xml version="1.x" encoding="utf-8"?>`; without an encoding it is UTF-8 too. Throws: XmlError.
+// `<?xml version="1.x" encoding="utf-8"?>`; the default encoding is UTF-8. Throws: XmlError.
 void checkXmlDeclaration(std::string_view declaration, XmlPlace place);
 
 // Appends `text` (UTF-8) as XML text or attribute value: & < > " ' become entities. What a parser would change becomes
