@@ -1,4 +1,4 @@
-// A value as human-readable text where its declaration has none for it.
+// The human-readable text of a value whose declaration lacks one.
 #pragma once
 
 #include <host/TCIMValue.h>

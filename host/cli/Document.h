@@ -1,4 +1,4 @@
-// What vrxhost shows: plain data without a trace of the plug-in's objects, so that it outlives the plug-in.
+// What vrxhost shows: plain data, free of the plug-in's objects, so that it outlives the plug-in.
 #pragma once
 
 #include "host/cli/Options.h"
@@ -73,7 +73,7 @@ std::string RenderTable(const TDocument& document);
 
 // Returns: one JSON document (UTF-8, ends with a newline) with true types: numbers (64 bits exact), booleans, null,
 // arrays; datetimes and references as strings, a char16 as a one-character string. Bytes outside UTF-8 become U+FFFD, a
-// real that is not finite becomes null.
+// real that is infinite or NaN becomes null.
 std::string RenderJson(const TDocument& document);
 
 } // namespace vrxhost

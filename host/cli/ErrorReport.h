@@ -26,7 +26,7 @@ template <typename Call> std::string ErrorOf(const Call& call)
 }
 
 // For the end of a sentence about an unknown name.
-// Returns: "; did you mean NAME?" with the most similar of the names, case ignored; empty when none is similar.
+// Returns: "; did you mean NAME?" with the most similar of the names, case ignored; empty when all are too different.
 std::string Suggestion(const std::string& unknown, const std::vector<std::string>& names);
 
 } // namespace vrxhost

@@ -141,7 +141,7 @@ std::optional<std::string> LossOfProgram(const NKOLVRX20::TFailedProgram& progra
     {
         return std::nullopt;
     }
-    // Looks for a leftover server; without it none is found.
+    // Looks for a leftover server; its failure means the same as an empty result.
     if (program.fName == "ps") {
         return std::nullopt;
     }

@@ -16,13 +16,13 @@ struct TLoss
     std::string fEnd;
 };
 
-// Returns: the loss that a log line of the plug-in reports, whatever its severity; nothing for other lines.
+// Returns: the loss that a log line of the plug-in reports, whatever its severity; empty for other lines.
 std::optional<TLoss> LossOfLine(const std::string& line);
 
 // Returns: true for a line of severity 0 that only repeats what a failed program's sentence says.
 bool IsHarmless(const std::string& errorLine);
 
-// Returns: the sentence for a failed program; nothing when nothing was lost by it.
+// Returns: the sentence for a failed program; empty when its failure is harmless.
 // root: see TLossLog.
 std::optional<std::string> LossOfProgram(const NKOLVRX20::TFailedProgram& program, const std::string& root);
 

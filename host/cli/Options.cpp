@@ -108,7 +108,7 @@ std::vector<std::string> OptionNames(const CLI::App& app)
     return names;
 }
 
-// What nothing on the command line took, the first of it.
+// Refuses a missing command, and the first word that is left over: unknown options before other words.
 // Throws: TUsageError.
 void RefuseUnknown(CLI::App& app)
 {

@@ -61,7 +61,7 @@ constexpr char kConfigFile[] = "vrx.conf";
 constexpr char kLogFile[] = "vrxhost.log";
 
 // Reads the command line; paths come out absolute. Help goes to standard output. The format is filled in first, also
-// when the rest cannot be read. Returns: false when help was all that was wanted. Throws: TUsageError,
+// when reading the rest fails. Returns: false when help was all that was wanted. Throws: TUsageError,
 // std::filesystem::filesystem_error.
 bool ParseOptions(int argc, const char* const* argv, TOptions& options);
 

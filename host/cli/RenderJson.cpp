@@ -12,7 +12,7 @@ using NKOLVRX20::TCIMValue;
 using TJson = nlohmann::ordered_json;
 using TType = TCIMValue::TCIMType;
 
-// Through the shortest text, so that a real32 of 0.1 is shown as 0.1 and not as the double beside it.
+// Converts through the shortest text, so that a real32 of 0.1 is shown as 0.1 (widened: 0.10000000149011612).
 TJson RealValue(const TCIMValue& value)
 {
     const std::string text = value.ToString(10);

@@ -31,7 +31,7 @@ std::string TypeText(TCIMValue::TCIMType type)
     return std::string(type.GetName()) + (type.IsArray() ? "[]" : "");
 }
 
-// The contract's property has no name of its own; it is its declaration's, unless the property is the host's own kind.
+// The contract's property is named by its declaration; where that is absent, the host's own kind knows its name.
 std::string NameOf(const ICIMProperty& property)
 {
     const auto declaration = property.GetDeclaration(kNoContext);

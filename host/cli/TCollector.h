@@ -17,7 +17,7 @@ class TCollector
     // isStopped: asked between elements; once true, collecting ends early.
     TCollector(NKOLVRX20::ICIMNamespace& ns, TLossLog& losses, std::function<bool()> isStopped);
 
-    // Returns: the providers, filled to the depth of the command; of kInstances one without a name, with the one class.
+    // Returns: the providers, filled to the depth of the command; for kInstances a nameless one with the one class.
     std::vector<TProviderRecord> Collect(ECommand command, const std::string& className);
 
     // Returns: the names of the classes that were looked through for the one of kInstances.

@@ -12,7 +12,7 @@ enum class EServerKind
     kInstalled // an installed OpenPegasus's
 };
 
-// Why a directory is not used as root, as a sentence. Nothing has been changed or run.
+// Why a directory is refused as root, as a sentence. Thrown before anything is changed or run.
 class TTreeError : public std::runtime_error
 {
   public:

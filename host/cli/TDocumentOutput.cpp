@@ -57,7 +57,7 @@ int TDocumentOutput::Write(const std::string& text, int stopFd)
             stopped = true;
             deadline = TClock::now() + kTimeAfterStop;
         } else {
-            // A writable pipe takes this much without blocking.
+            // A writable pipe takes this much at once.
             const std::size_t count = std::min<std::size_t>(text.size() - written, PIPE_BUF);
             const ssize_t result = ::write(fFd.Get(), text.data() + written, count);
             if (result >= 0) {

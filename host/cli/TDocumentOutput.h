@@ -7,11 +7,11 @@
 namespace vrxhost {
 
 // Standard output, kept for the document alone: while an object lives, descriptor 1 leads to standard error, so that
-// whatever a plug-in prints does not end up inside the document.
+// whatever a plug-in prints stays out of the document.
 class TDocumentOutput
 {
   public:
-    // Throws: std::system_error when the descriptors cannot be arranged.
+    // Throws: std::system_error when arranging the descriptors fails.
     TDocumentOutput();
     ~TDocumentOutput();
 

@@ -10,7 +10,7 @@ namespace {
 constexpr char kRestart[] = " try to restart cimserver ";
 constexpr char kConnected[] = "TPEGASUSNamespace::connect succeeded";
 constexpr char kLoading[] = "Loading... ";
-// Every message about a provider description begins thus; those on names that the description's reader does not know
+// Every message about a provider description begins thus; those on names unknown to the description's reader
 // are routine, the root element's own name among them.
 constexpr char kDescription[] = "Performance Data RDD Parser line ";
 constexpr char kRoutine[] = ":Unrecognized ";

@@ -27,7 +27,7 @@ class TLossLog : public NKOLVRX20::ILogger
     // Forgets everything: the namespace is about to be opened once more.
     void StartOver();
 
-    // From now on lines are passed on and nothing is learned: what an interruption breaks is not a loss.
+    // From now on lines are only passed on: what an interruption breaks is excluded from the losses.
     void Freeze();
 
     // Enters what was held back in case that another attempt would succeed.

@@ -95,7 +95,7 @@ void CheckStatus(const std::string& path, const struct stat& status, bool others
                      (user == "root" ? "root" : "root or " + user) + ", and nobody else may write it");
 }
 
-// Returns: where the link leads; empty for what is not a link.
+// Returns: where the link leads; empty for anything else than a link.
 std::string LinkTarget(const std::string& path)
 {
     std::error_code error;

@@ -12,7 +12,7 @@ namespace vrxhost {
 class TOwnerCheck
 {
   public:
-    // What the plug-in or the server runs or loads below a root: its libraries, and pegasus without what a run writes.
+    // What the plug-in or the server runs or loads below a root: its libraries, and pegasus minus what a run writes.
     // Throws: TTreeError with path, owner and mode.
     void CheckTree(const std::string& root);
 

@@ -10,7 +10,7 @@
 
 namespace vrxhost {
 
-// Why a plug-in cannot be used, as a sentence.
+// Why a plug-in is unusable, as a sentence.
 class TPluginError : public std::runtime_error
 {
   public:
@@ -32,11 +32,11 @@ class TPluginLibrary
 
     const boost::shared_ptr<NKOLVRX20::INamespaceProvider>& GetProvider() const { return fProvider; }
 
-    // Has the plug-in shut its namespace down. Requires: nothing that came from the namespace is held any more.
+    // Has the plug-in shut its namespace down. Requires: everything that came from the namespace is released.
     // Returns: empty, or what went wrong, as a sentence.
     std::string Clear();
 
-    // Clears and unloads the library. Requires: nothing that came from the plug-in is held any more.
+    // Clears and unloads the library. Requires: everything that came from the plug-in is released.
     // Returns: empty, or what went wrong, as sentences; a library that left threads behind stays loaded.
     // Blocks: for the plug-in's own shutdown, and up to a second more for its threads to end.
     std::string Unload();

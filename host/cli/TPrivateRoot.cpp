@@ -67,7 +67,7 @@ void MakeFolders(const fs::path& path)
     }
 }
 
-// Returns: the real path; empty when the directory cannot be made or written.
+// Returns: the real path; empty when the directory is unsafe, or making it or writing to it fails.
 std::string MakePrivateDirectory(const fs::path& path)
 {
     try {
@@ -84,7 +84,7 @@ std::string MakePrivateDirectory(const fs::path& path)
     }
 }
 
-// All links below the mirrored folders are an earlier run's; a folder that holds nothing else goes with them.
+// All links below the mirrored folders are an earlier run's; a folder that becomes empty goes with them.
 void RemoveLinks(const fs::path& folder)
 {
     for (const auto& entry : fs::directory_iterator(folder)) {
@@ -97,7 +97,7 @@ void RemoveLinks(const fs::path& folder)
     }
 }
 
-// What is not a link is the user's and stays.
+// Anything but a link is the user's and stays.
 void Link(const fs::path& file, const fs::path& link)
 {
     const fs::file_status status = fs::symlink_status(link);

@@ -34,7 +34,7 @@ std::string RealPath(const std::string& path)
     return ::realpath(path.c_str(), resolved) ? resolved : "";
 }
 
-// Returns: the first token of the file as a process id, 0 for none.
+// Returns: the first token of the file as a process id; 0 when it is missing or invalid.
 pid_t ReadProcessId(const std::string& path)
 {
     const TUniqueFd file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW));

@@ -11,12 +11,12 @@ class TPrivateServer
     TPrivateServer(const std::string& root, const std::string& consumer);
 
     // Plans the consumer's name for the server's next start.
-    // Returns: empty, or why it could not be done.
+    // Returns: empty on success, else the reason of the failure.
     // Blocks: up to 30 seconds.
     std::string SetConsumer() const;
 
     // Ends the running server, if the start file names a process that runs this root's server program: in order, and by
-    // force when it has not gone after 2 seconds.
+    // force when it still runs after 2 seconds.
     // Thread: safe.
     void End() const;
 

@@ -70,7 +70,7 @@ EExitStatus TReport::Finish()
     return fReportedCount == 0 ? kComplete : kPartial;
 }
 
-// Those that were not reported yet.
+// Reports the losses that were added since the last call.
 void TReport::ReportLosses()
 {
     const auto sentences = fLosses.GetSentences();

@@ -21,11 +21,12 @@ class TReport
     // The arguments outlive the object.
     TReport(const TOptions& options, const TStopSignals& stop, TLossLog& losses);
 
-    // Writes the document; after an interruption it is marked as partial. Later calls do nothing.
-    // Blocks: while the reader does not read; after an interruption half a second at most.
+    // Writes the document; after an interruption it is marked as partial. Later calls are ignored.
+    // Blocks: until the reader has taken it all; after an interruption half a second at most.
     void Show(std::vector<TProviderRecord> providers);
 
-    // There is no inventory: shows the reason, and a document without providers.
+    // For a run that failed before its inventory: enters the reason as a loss and shows a document with an empty list
+    // of providers.
     void Fail(const std::string& reason);
 
     // Reports the losses since the document. Requires: the plug-in's work is over.

@@ -20,7 +20,7 @@ constexpr int kLongestPauseMs = 500;
 
 constexpr std::chrono::seconds kGraceOfAttempt{4}; // longer than the pauses of one attempt that is left in order
 
-// Returns: the first line that is not "key = value", a comment or empty; without one, what the reader said.
+// Returns: the first malformed line (valid are "key = value", comments and empty lines), else what the reader said.
 std::string SettingsError(const std::string& file, const std::string& error)
 {
     std::ifstream lines(file);
@@ -67,9 +67,9 @@ EExitStatus TRun::Execute()
     return fReport.Finish();
 }
 
-// On the signal thread: waiting programs end and no further one starts, which leads the plug-in out of its attempts;
-// then waiting calls fail. Without its server the plug-in would first try to connect again and again, so during an
-// attempt the server is ended only when the way out takes too long.
+// On the signal thread: waiting programs end and further starts are refused, which leads the plug-in out of its
+// attempts; then waiting calls fail. After the loss of its server the plug-in would first try to connect again and
+// again, so during an attempt the server is ended only when the way out takes too long.
 void TRun::Interrupt()
 {
     fLosses.Freeze();
@@ -104,7 +104,7 @@ void TRun::LoadSettings() const
     }
 }
 
-// A server of some other make need not know the setting; that matters only when a name was asked for.
+// A server of some other make may lack the setting; that matters only when a name was asked for.
 void TRun::SetConsumer() const
 {
     const std::string error = fServer.SetConsumer();
@@ -131,7 +131,7 @@ void TRun::OpenNamespace(TSession& session)
     }
 }
 
-// A growing and random time, so that hosts that met once do not meet again.
+// A growing and random time, so that hosts that collided once choose different moments.
 // Returns: false when interrupted.
 bool TRun::PauseBefore(int attempt) const
 {

@@ -22,12 +22,12 @@ class TSession
     // As Close, its sentences dropped.
     ~TSession();
 
-    // Allocates the namespace. Requires: none is open.
+    // Allocates the namespace. Requires: the session is closed.
     // Throws: TPluginError.
     // Blocks: for the start of the server, and as long again for each attempt that fails.
     void Open();
 
-    // Shuts the namespace down, so that it can be opened again. Requires: nothing that came from it is held any more.
+    // Shuts the namespace down, so that it can be opened again. Requires: everything that came from it is released.
     void Clear();
 
     NKOLVRX20::ICIMNamespace& GetNamespace() { return *fNamespace; }

@@ -12,7 +12,7 @@ namespace vrxhost {
 
 namespace {
 
-// Not through the streams, whose lock a blocked write of another thread may hold: the second signal must be heard.
+// Bypasses the streams, whose lock a blocked write of another thread may hold: the second signal must be heard.
 void Announce()
 {
     constexpr char kSentence[] = "vrxhost: stopping ...\n";

@@ -77,7 +77,7 @@ NKOLVRX20::TUniqueFd EnterRoot(const std::string& root)
     return directory;
 }
 
-// Before there is a run: the reason, and for a reader of JSON a document without providers.
+// Before there is a run: the reason, and for a reader of JSON a document with an empty list of providers.
 EExitStatus Refuse(const TOptions& options, const std::string& reason, EExitStatus status)
 {
     ReportError(reason);

@@ -72,7 +72,7 @@ TCIMValue& TCIMValue::operator=(const TCIMValue& other)
     if (this == &other) {
         return *this;
     }
-    // Whoever holds the lent vector may still write it, so a copy must not share it.
+    // Whoever holds the lent vector may still write it, so a copy gets a vector of its own.
     if (other.fRep && other.fRep->fLent) {
         fRep = boost::make_shared<TRep>(*other.fRep);
         fRep->fLent = false;

@@ -16,7 +16,7 @@ extern "C" {
 namespace NKOLVRX20 {
 namespace {
 
-// The interval between looks at the child on kernels that cannot announce its exit.
+// The interval between looks at the child on kernels that are unable to announce its exit.
 constexpr std::chrono::milliseconds kExitPollInterval{20};
 
 // Reads in one go: more than a pipe holds, so that all output is read after the exit; bounded, so that the deadline is
@@ -98,7 +98,7 @@ bool TChildProcess::PollOnce(TClock::time_point deadline)
     return true;
 }
 
-// Leaves the child waitable, so that its process id cannot be taken by another process before Kill and Reap.
+// Leaves the child waitable, so that its process id stays reserved until Kill and Reap.
 bool TChildProcess::HasExited() const
 {
     siginfo_t info{};

@@ -45,7 +45,7 @@ class TChildProcess
   public:
     explicit TChildProcess(const TProcessRequest& request);
 
-    // Returns: the outcome, also of a child that fails or cannot be started.
+    // Returns: the outcome, also of a child that fails, or fails to start.
     // Throws: std::bad_alloc.
     // Blocks: until the child itself exits (its descendants may keep the pipes open), the timeout expires or programs
     // are cancelled.

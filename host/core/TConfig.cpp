@@ -33,7 +33,7 @@ std::string ReadWhole(const std::string& path)
     return text;
 }
 
-// Some editors begin a UTF-8 file with this; it belongs to no key.
+// Some editors begin a UTF-8 file with this; it is cut off before the first key.
 std::string WithoutByteOrderMark(const std::string& text)
 {
     static constexpr char kMark[] = "\xef\xbb\xbf";

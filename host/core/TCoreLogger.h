@@ -8,7 +8,7 @@
 namespace NKOLVRX20 {
 
 // The host's own logger: time, severity and text of each entry, to a file, to standard error, to both or nowhere.
-// At first it writes errors to standard error and nothing else.
+// At first it writes errors only, to standard error.
 // Thread: safe.
 class TCoreLogger : public ILogger
 {
@@ -24,7 +24,7 @@ class TCoreLogger : public ILogger
     static TCoreLogger& Instance();
 
     // Replaces what was configured before.
-    // Throws: TVRXException 3 when the file cannot be opened for writing; the configuration then stays as it was.
+    // Throws: TVRXException 3 when opening the file for writing fails; the configuration then stays as it was.
     void Configure(const TOptions& options);
 
     void Log(EVRXLogSeverity severity, const std::string& text) override;

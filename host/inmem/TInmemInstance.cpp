@@ -12,7 +12,7 @@
 namespace NKOLVRX20 {
 namespace {
 
-// Returns: null for a property that the class does not declare: it is kept and shown with its plain text.
+// Returns: null for a property that the class lacks: it is kept and shown with its plain text.
 boost::shared_ptr<ICIMPropertyDecl> FindDeclaration(const boost::shared_ptr<ICIMClass>& instanceClass,
                                                     const std::string& name, const TCIMContext& context)
 {

@@ -29,7 +29,7 @@ class TInmemNamespace : public ICIMNamespace
                                                TCIMContext context) override;
     boost::shared_ptr<ICIMClass> GetClass(const std::string& name, TCIMContext context) override;
     void EnumerateRootClasses(TClassVisitor visitor, TCIMContext context) override;
-    // Visits nothing.
+    // Returns at once: the list of providers is empty.
     void EnumerateProviders(TProviderVisitor visitor, TCIMContext context) override;
     // Throws: TVRXException 31.
     boost::shared_ptr<ICIMQualifierDecl> AllocateQualifierDecl(const std::string& name, TCIMValue defaultValue,
@@ -43,9 +43,9 @@ class TInmemNamespace : public ICIMNamespace
                    TCIMContext context) override;
     // Finds an instance by its path text, byte for byte.
     boost::shared_ptr<ICIMInstance> GetInstance(const TCIMReference& reference, TCIMContext context) override;
-    // Throws: TVRXException 6 when there is no such instance.
+    // Throws: TVRXException 6 when the instance is absent.
     void DeleteInstance(const TCIMReference& reference, TCIMContext context) override;
-    // Throws: TVRXException 6 when there is no such instance.
+    // Throws: TVRXException 6 when the instance is absent.
     void ModifyInstance(const TCIMReference& reference, TCIMContext values, TCIMContext context) override;
     // Throws: TVRXException 31.
     void ExecuteQuery(TInstanceVisitor visitor, std::string& language, std::string& query,

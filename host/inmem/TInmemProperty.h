@@ -14,7 +14,7 @@ class TInmemProperty : public ICIMProperty
     TInmemProperty(const std::string& name, TCIMValue value, const boost::shared_ptr<ICIMPropertyDecl>& declaration,
                    const boost::shared_ptr<ICIMClass>& instanceClass);
 
-    // Returns: the declaration's name, or the name that the instance was given where the class declares none.
+    // Returns: the declaration's name, or the name that the instance was given where the class lacks the property.
     std::string GetName() const;
 
     // Returns: the value's type; for a null of unknown type the declaration's.

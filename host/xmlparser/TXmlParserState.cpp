@@ -19,7 +19,7 @@ bool IsPredefined(const std::string& entity)
            std::find(std::begin(kPredefined), std::end(kPredefined), entity) != std::end(kPredefined);
 }
 
-// Returns: the first entity of a well-formed piece of markup that a DTD must declare; empty if there is none.
+// Returns: the first entity of a well-formed piece of markup that a DTD must declare; empty if absent.
 std::string FindDeclaredEntity(const std::string& markup)
 {
     for (std::size_t at = markup.find('&'); at != std::string::npos; at = markup.find('&', at + 1)) {

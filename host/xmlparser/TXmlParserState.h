@@ -48,7 +48,7 @@ struct TXmlParser::TState
 
     static TState& From(void* state) { return *static_cast<TState*>(state); }
 
-    // Calls "call(state)" unless the parse has ended: expat delivers what it has already tokenised even after a stop.
+    // Calls "call(state)" while the parse goes on: expat delivers what it has already tokenised even after a stop.
     template <typename Call> static void Deliver(void* state, Call call)
     {
         TState& self = From(state);

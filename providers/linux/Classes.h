@@ -24,11 +24,11 @@ std::vector<Record> computerSystems(const SystemTree& tree);
 std::vector<Record> operatingSystems(const SystemTree& tree);
 // LNX_Processor: one for each "processor" of /proc/cpuinfo, that is, for each that is online.
 std::vector<Record> processors(const SystemTree& tree);
-// LNX_Memory: one for all of it, from /proc/meminfo; the result is empty when that cannot be read.
+// LNX_Memory: one for all of it, from /proc/meminfo; the result is empty when that is unreadable.
 std::vector<Record> memories(const SystemTree& tree);
 // LNX_NetworkPort: one for each interface of /sys/class/net in the process's network namespace, lo included.
-// Speeds are null while the driver reports none (link down, virtual ports). PermanentAddress is the hardware's address
-// and null for loopback and virtual ports; MACAddress and NetworkAddresses are those in use.
+// Speeds are null while they are unknown to the driver (link down, virtual ports). PermanentAddress is the hardware's
+// address and null for loopback and virtual ports; MACAddress and NetworkAddresses are those in use.
 std::vector<Record> networkPorts(const SystemTree& tree);
 // LNX_BlockDevice: one for each device of /sys/block that has a size. Partitions are part of their device.
 std::vector<Record> blockDevices(const SystemTree& tree);
@@ -41,11 +41,11 @@ struct ClassEntry
     std::vector<Record> (*collect)(const SystemTree& tree);
 };
 
-// Returns: the class of that name, case ignored; null for a class that is not of this provider.
+// Returns: the class of that name, case ignored; null for any class of other providers.
 const ClassEntry* findClass(const std::string& name);
 
 // The key values of the system that every device and operating system belongs to. The name is "localhost" on a machine
-// that gives none.
+// that lacks one.
 std::string systemName(const SystemTree& tree);
 extern const char* const kSystemClass;
 

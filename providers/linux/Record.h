@@ -40,7 +40,7 @@ struct Property
     bool isKey;
 };
 
-// One instance, before it becomes a broker's. A property that the machine gives no value for is left out, and so null.
+// One instance, before it becomes a broker's. A property whose value the machine lacks is left out, and so null.
 class Record
 {
   public:

@@ -10,7 +10,7 @@
 namespace lnx {
 
 // Asks the kernel for the address that an interface's hardware came with (ETHTOOL_GPERMADDR).
-// Returns: its octets; an empty vector for an interface that has none: loopback, bridges, most virtual ones.
+// Returns: its octets; an empty vector for an interface that lacks one: loopback, bridges, most virtual ones.
 std::vector<std::uint8_t> permanentAddressOf(const std::string& interface);
 
 // What the collectors see of a machine: the files of /proc, /sys and /etc below a root ("/" for this machine), and the
