@@ -1,5 +1,5 @@
 // Requests as a client might send them, in two pieces: the parser takes the same from both, or refuses both alike, and
-// it never leaves more bytes unparsed than a limit allows.
+// the bytes that it leaves unparsed stay within a limit.
 #include "pegasus/server/net/HttpRequestReader.h"
 
 #include <cstdint>

@@ -82,7 +82,7 @@ class TSoak
     TClock::time_point fStart = TClock::now();
 };
 
-// Times and counts one operation. Without a fault, less than the whole answer is a wrong one.
+// Times and counts one operation. While the tree is healthy, less than the whole answer is a wrong one.
 template <typename TCall> void TSoak::Do(const char* operation, bool healthy, const TCall& call)
 {
     const auto start = TClock::now();

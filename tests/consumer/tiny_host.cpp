@@ -57,7 +57,7 @@ void PrintInventory(ICIMNamespace& ns)
 }
 
 // The core logger, which also notices in the process service's lines that cimserver failed to start. The plug-in
-// does not look at that: where its client cannot see whose server answers on the port, that may be the server of
+// ignores that: where its client is unable to see whose server answers on the port, that may be the server of
 // another host that chose the same port.
 class TServerWatch : public ILogger
 {

@@ -34,7 +34,7 @@ TQualifiers Bits(const TTexts& bitMap, const TTexts& bitValues)
     return {{"BitMap", Strings(bitMap)}, {"BitValues", Strings(bitValues)}};
 }
 
-// An entry alone: "hit" where it covers the value, the plain text where it does not.
+// An entry alone: "hit" where it covers the value, the plain text elsewhere.
 TQualifiers Only(const char* entry)
 {
     return Map({entry}, {"hit"});

@@ -221,7 +221,7 @@ TEST(OperatingSystems, ReadReleaseTimesAndProcesses)
     EXPECT_EQ(countProcesses(fixture.tree(), std::string("nobody")), 0U);
 }
 
-// Every file missing, every file empty, every file a directory: properties are missing then, nothing else.
+// Every file missing, every file empty, every file a directory: the only effect is that properties are missing.
 TEST(AllClasses, SurviveAMachineWithoutFiles)
 {
     const std::vector<std::string> files{"/proc/cpuinfo",

@@ -80,8 +80,8 @@ TEST_F(LinuxProvider, ShowsAsManyProcessorsAsTheKernelLists)
     EXPECT_EQ(all("LNX_Processor").size(), listed);
 }
 
-// Paths are complete, unique, name the class and lead back to their instance; nothing that is set is unknown or
-// mistyped.
+// Paths are complete, unique, name the class and lead back to their instance; every property that is set is
+// declared and has its declared type.
 TEST_F(LinuxProvider, EveryInstanceIsFoundByItsPath)
 {
     for (const char* name : kClasses) {

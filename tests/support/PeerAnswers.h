@@ -29,7 +29,7 @@ PeerAnswer httpErrorAnswer(unsigned status, const std::string& reason, const std
 
 // The answer's XML: `content` goes into IRETURNVALUE.
 std::string intrinsicBody(const PeerRequest& request, const std::string& content);
-// The same without an IRETURNVALUE.
+// The same with the IRETURNVALUE left out.
 std::string intrinsicBodyWithout(const PeerRequest& request);
 std::string errorBody(const PeerRequest& request, unsigned code, const std::string& description);
 std::string extrinsicBody(const PeerRequest& request, const std::string& content);

@@ -50,7 +50,7 @@ void expectSuccess(const ProgramResult& result, const std::string& what)
     }
 }
 
-// Becomes readable when the process has ended. The process need not be a child of this one.
+// The descriptor becomes readable when the process has ended; this works for any process, child or other.
 bool waitForEnd(pid_t process, int timeoutMs)
 {
     const int descriptor = static_cast<int>(::syscall(SYS_pidfd_open, process, 0));

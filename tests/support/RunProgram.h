@@ -18,7 +18,7 @@ struct ProgramResult
 // Runs a program to its end. `environment` holds "NAME=value" entries that are added to this process's environment and
 // replace entries of the same name. The call returns when the program ends, even while a daemon that it started keeps
 // its output open.
-// Throws: std::runtime_error when the program cannot be started, or exceeds the limit and is killed.
+// Throws: std::runtime_error when the program fails to start, or exceeds the limit and is killed.
 ProgramResult runProgram(const std::vector<std::string>& arguments, const std::vector<std::string>& environment,
                          std::chrono::milliseconds limit = std::chrono::seconds(60));
 

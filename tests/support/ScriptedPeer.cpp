@@ -109,7 +109,7 @@ ScriptedPeer::~ScriptedPeer()
     ::close(fStopEvent);
 }
 
-// A bound socket that does not listen refuses connections, and nobody else gets its port.
+// A socket that is bound but yet to listen refuses connections and keeps its port reserved.
 void ScriptedPeer::bindPort()
 {
     fListener = ::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0);

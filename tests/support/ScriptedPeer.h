@@ -19,13 +19,13 @@ struct PeerRequest
     std::string body;
     std::size_t connection = 0; // which connection, counted from 0
 
-    // A header field's value, looked up without case; empty when it is not there.
+    // A header field's value, case of its name ignored; empty when absent.
     std::string header(std::string_view name) const;
     // CIMMethod and CIMObject, percent-decoded.
     std::string method() const;
     std::string object() const;
     std::string messageId() const;
-    // The name in the first element `<element ...NAME="x"`; empty when there is none.
+    // The name in the first element `<element ...NAME="x"`; empty when absent.
     std::string nameIn(std::string_view element) const;
 };
 

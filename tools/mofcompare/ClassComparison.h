@@ -14,11 +14,11 @@ using Declarations = std::function<bool(const Pegasus::CIMName& name, Pegasus::C
 
 // Returns: the differences between a class in its source and the local part of the class that a server returns, one
 // line each, beginning with the element. It compares names, order, types, values, qualifiers and their flavors; a use
-// without flavors in the source has those of its declaration.
+// that leaves its flavors out in the source has those of its declaration.
 std::vector<std::string> differences(const Pegasus::CIMConstClass& source, const Pegasus::CIMConstClass& readBack,
                                      const Declarations& declarations);
 
-// The same for a qualifier declaration: one line with both, or none.
+// The same for a qualifier declaration: one line with both.
 // Returns: an empty vector when they are equal.
 std::vector<std::string> differences(const Pegasus::CIMConstQualifierDecl& source,
                                      const Pegasus::CIMConstQualifierDecl& readBack);

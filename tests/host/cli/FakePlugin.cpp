@@ -1,6 +1,6 @@
-// A plug-in for the tests of vrxhost. It behaves well unless the host setting "fault" names how it is to misbehave;
-// what can only be wrong in the library itself is a macro:
-//   FAKE_WITHOUT_ENTRY_POINTS   there is nothing to call
+// A plug-in for the tests of vrxhost. It behaves well by default; the host setting "fault" names a fault to show,
+// and what can only be wrong in the library itself is a macro:
+//   FAKE_WITHOUT_ENTRY_POINTS   the entry points are missing
 // A namespace that is cleared leaves a file "cleared" in the working directory, so that a test sees that the host did
 // shut down.
 #include "host/inmem/TInmemNamespace.h"

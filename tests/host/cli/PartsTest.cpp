@@ -1,4 +1,4 @@
-// Parts of vrxhost that need no plug-in.
+// Parts of vrxhost, each tested apart from any plug-in.
 #include "host/cli/LossRules.h"
 #include "host/cli/TLossLog.h"
 #include "host/cli/TPrivateServer.h"
@@ -96,7 +96,7 @@ TEST(LossRules, Programs)
     }
 }
 
-// A failed attempt to start the server is a loss only when none succeeds, and then it is the cause that comes first.
+// A failed attempt to start the server is a loss only when every attempt fails, and then its cause comes first.
 TEST(TLossLog, FailedServerStartsCountWhenTheServerIsNeeded)
 {
     const auto run = [](const std::string& name) {

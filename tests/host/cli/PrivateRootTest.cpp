@@ -1,4 +1,4 @@
-// A root of the user's own, for a tree that a run must not or cannot write.
+// A root of the user's own, for a tree that is read-only or must stay unchanged.
 #include "tests/host/cli/VrxhostProgram.h"
 
 #include <gmock/gmock.h>

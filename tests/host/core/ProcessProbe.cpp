@@ -1,4 +1,4 @@
-// The child of the process tests: argv[1] says what it does. No mode outlives its reader or 30 seconds.
+// The child of the process tests: argv[1] says what it does. Every mode ends with its reader, or after 30 seconds.
 #include <csignal>
 #include <cstdio>
 #include <cstdlib>

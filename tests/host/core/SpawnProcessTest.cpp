@@ -115,7 +115,7 @@ TEST(SpawnProcess, SplitsACommandLineAndSearchesThePath)
     EXPECT_THROW(TOSSpecific::SpawnProcess("   ", kTimeoutSeconds), TVRXException);
 }
 
-// Opens the descriptors and sets the signals that a child must not see, and puts the signals back.
+// Opens the descriptors and sets the signals that must stay hidden from a child, and puts the signals back.
 class TDisturbedProcess
 {
   public:

@@ -261,7 +261,7 @@ TEST(TCIMValue, EqualValuesMadeApartAreEqual)
               TCIMValue(TType(TType::kChar16), 0, {TCIMValue(TCIMChar16("1"))}));
 }
 
-// No class is needed to see that the pointer is weak: any object of the type will do, and none is ever called.
+// A placeholder of the pointer's type shows that the pointer is weak; the test only compares and releases it.
 TEST(TCIMValue, ReferencedClassIsKeptWeakly)
 {
     int dummy = 0;

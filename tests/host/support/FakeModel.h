@@ -1,5 +1,5 @@
 // A small object model for the host's tests: declarations with settable qualifiers, and a class that holds them and
-// serves instances. What the host never asks for throws TVRXException 31.
+// serves instances. Operations that the host leaves unused throw TVRXException 31.
 #pragma once
 
 #include <host/ICIMClass.h>
@@ -186,7 +186,7 @@ class TFakeMethodDecl : public TFakeElement<ICIMMethodDecl>
     std::vector<boost::shared_ptr<ICIMParameterDecl>> fParameters;
 };
 
-// Serves the instances that were added to it, or what fEnumerate does instead.
+// Serves the instances that were added to it, or runs fEnumerate when that is set.
 class TFakeClass : public TFakeElement<ICIMClass>, public boost::enable_shared_from_this<TFakeClass>
 {
   public:

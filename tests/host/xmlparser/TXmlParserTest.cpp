@@ -157,7 +157,7 @@ TEST(TXmlParser, ExceptionOfACallbackEndsTheParseAndLeavesIt)
     EXPECT_THAT(parser.fEvents, ElementsAre("1 <a>", "1 <throw>"));
 }
 
-// The page after the text cannot be read, so one byte too many ends the test.
+// The page after the text is unreadable, so one byte too many ends the test.
 TEST(TXmlParser, NeverReadsPastTheText)
 {
     const std::size_t page = static_cast<std::size_t>(::sysconf(_SC_PAGESIZE));

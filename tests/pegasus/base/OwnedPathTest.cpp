@@ -75,7 +75,7 @@ TEST_F(OwnedPathTest, nobodyElseMayChangeTheFileOrAFolderAbove)
     }
 }
 
-// The sticky bit protects what lies in a folder, not the folder as something to search libraries in.
+// The sticky bit protects what lies in a folder; the folder itself stays unfit to search libraries in.
 TEST_F(OwnedPathTest, theStickyBitIsNoExcuseForTheFolderItself)
 {
     ASSERT_EQ(::chmod((fRoot + "/above").c_str(), 01777), 0);

@@ -173,7 +173,7 @@ std::vector<bool> markupBytes(std::string_view answer)
     if (body.empty()) {
         return marks;
     }
-    // Between the pieces of a body there is nothing but framing, which may not change either.
+    // Between the pieces of a body there is only framing, which is marked too.
     std::fill(marks.begin() + static_cast<std::ptrdiff_t>(body.front()),
               marks.begin() + static_cast<std::ptrdiff_t>(body.back()), true);
     char quote = 0;

@@ -8,7 +8,7 @@
 
 namespace test {
 
-// An answer and the request that it is for, without a socket between.
+// An answer and the request that it is for, passed in memory.
 struct AnswerCase
 {
     std::string name;
@@ -26,7 +26,7 @@ std::string readAnswer(const AnswerCase& answer, const std::vector<std::size_t>&
 // Answers with every kind of element, chunks, trailers and errors.
 std::vector<AnswerCase> sampleAnswers();
 
-// For each byte of the answer: does it belong to the XML's markup (tags without the values of attributes) or to the
+// For each byte of the answer: does it belong to the XML's markup (tags, minus the values of attributes) or to the
 // framing of chunks? Elsewhere a changed byte is other valid data.
 std::vector<bool> markupBytes(std::string_view answer);
 

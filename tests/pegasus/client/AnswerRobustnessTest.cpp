@@ -78,7 +78,7 @@ TEST(AnswerRobustness, AnswerCutShortIsRefused)
 {
     for (AnswerCase answer : allAnswers()) {
         const std::string bytes = answer.bytes;
-        // Without a length the end of the connection ends the body; blanks at its end may be missing.
+        // Where the length is missing, the end of the connection ends the body; blanks at its end may be missing.
         const std::size_t needed = bytes.find_last_not_of(" \r\n") + 1;
         for (const std::size_t size : placesIn(answer)) {
             if (size >= needed) {

@@ -1,5 +1,5 @@
 // Every public name and member, used as a user's program would use it, through one public header and with the one macro
-// that it asks for. Nothing here runs: that it compiles and links is the test. What the members do is tested elsewhere.
+// that it asks for. That it compiles and links is the whole test; what the members do is tested elsewhere.
 #include <Pegasus/Client/CIMClient.h>
 
 #include <initializer_list>

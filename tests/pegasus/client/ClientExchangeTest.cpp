@@ -31,7 +31,7 @@ constexpr const char* kNameSpace = "root/cimv2";
 // Far more than any of these calls needs, far less than a hang.
 constexpr Uint32 kTimeoutMs = 10000;
 constexpr Uint32 kShortTimeoutMs = 200;
-// Even a busy machine and a sanitizer do not make a call last that long.
+// Longer than a call lasts even on a busy machine with a sanitizer.
 constexpr std::chrono::minutes kHang(2);
 
 CIMClass fanClass()
@@ -59,7 +59,7 @@ void connect(CIMClient& client, const test::ScriptedPeer& peer, Uint32 timeoutMs
     client.connect("127.0.0.1", peer.port(), String(), String());
 }
 
-// "Pegasus::X: message" of what the call throws; "ok" when it does not.
+// "Pegasus::X: message" of what the call throws; "ok" when it returns.
 template <typename Call> std::string outcome(Call&& call)
 {
     try {
@@ -267,7 +267,7 @@ class DeafServer
     DeafServer& operator=(const DeafServer&) = delete;
 
     Uint32 port() const { return ntohs(fAddress.sin_port); }
-    // Connects until a connection is not taken any more. Returns: whether it came to that.
+    // Connects until a connection stays pending. Returns: whether it came to that.
     bool fill()
     {
         for (int tries = 0; tries < 16; ++tries) {

@@ -1,4 +1,4 @@
-// Connects to a port of this machine and prints "connected" or why not: the exception's message.
+// Connects to a port of this machine and prints "connected" or the exception's message.
 #include <Pegasus/Client/CIMClient.h>
 
 #include <cstdlib>

@@ -15,7 +15,7 @@ using test::WireCase;
 // Longer outputs were cut off when they were noted.
 constexpr std::size_t kCutBytes = 650;
 constexpr unsigned kTimeoutMs = 10000;
-// For the peers that do not answer in time.
+// For the peers that let a call time out.
 constexpr unsigned kShortTimeoutMs = 300;
 
 struct Deviation
@@ -24,7 +24,7 @@ struct Deviation
     const char* reason;
 };
 
-// Where the real client's result is a fault that is not worth keeping.
+// Where the real client's result is a fault and this one's differs.
 const std::map<std::string, Deviation>& deviations()
 {
     static const std::map<std::string, Deviation> table = {
@@ -64,7 +64,7 @@ std::string onOneLine(const std::string& result)
     return withoutTiming(out);
 }
 
-// Blanks are not compared: the notes have runs of them folded in places.
+// Blanks are ignored: the notes have runs of them folded in places.
 std::string withoutBlanks(std::string text)
 {
     text.erase(std::remove_if(text.begin(), text.end(), [](char c) { return c == ' ' || c == '|' || c == '\n'; }),
@@ -72,7 +72,7 @@ std::string withoutBlanks(std::string text)
     return text;
 }
 
-// The wording of complaints about XML is our own; the class is not.
+// The wording of complaints about XML is our own; the class is the real client's.
 std::string comparable(const std::string& text)
 {
     const std::string xmlException = "EXC Pegasus::CIMClientXmlException";

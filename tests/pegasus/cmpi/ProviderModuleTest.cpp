@@ -23,7 +23,7 @@ using testing::HasSubstr;
 
 constexpr const char* kProvider = "Conformance";
 
-// Returns: "code: text" of the call's exception, "" without one.
+// Returns: "code: text" of the call's exception, "" on success.
 template <typename Call> std::string errorOf(Call&& call)
 {
     try {

@@ -77,7 +77,7 @@ json describe(const CIMDateTime& dateTime)
 
 namespace {
 
-// Real answers that are faults and not kept.
+// Real answers that are faults, where ours differ.
 const std::map<std::string, const char*>& notImitated()
 {
     static const std::map<std::string, const char*> table = {

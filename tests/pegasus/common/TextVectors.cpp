@@ -37,7 +37,7 @@ std::string hex(const std::string& bytes)
     return out;
 }
 
-// Of both kinds of index: that of a string that may be changed, and that of one that may not.
+// Of both kinds of index: that of a changeable string and that of a const one.
 json unitAt(Uint32 index)
 {
     String text("abc");

@@ -37,7 +37,7 @@ MemoryHandler compile(const std::string& text, const CompileOptions& with = opti
     return handler;
 }
 
-// Returns: the error as "line:column: cause"; empty without one.
+// Returns: the error as "line:column: cause"; empty on success.
 std::string failureOf(const std::string& text, const CompileOptions& with = options())
 {
     try {

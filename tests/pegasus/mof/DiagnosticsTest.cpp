@@ -11,7 +11,7 @@
 
 // Compiles each cases/NAME.mof. cases/NAME.expected has what a user reads (the warnings, the error with its line and
 // caret, the number of skipped definitions) and how much was delivered.
-// With VRX_UPDATE_GOLDEN set in the environment, the expected files are written and not compared.
+// With VRX_UPDATE_GOLDEN set in the environment, the expected files are written and the comparison is skipped.
 
 using namespace Pegasus::mof;
 

@@ -168,7 +168,7 @@ TEST_F(InstanceTest, EnumeratesMoreThanOneBatchInOrderAndStopsWhenTold)
         EXPECT_EQ(utf8(paths[i].toString()), "Sub.Id=\"" + std::to_string(i) + "\"");
     }
     Uint32 seen = 0;
-    // The visitor may use the repository: no lock is held.
+    // The visitor may use the repository: it runs outside the lock.
     repository.enumerateInstances(kNamespace, CIMName("Base"), {}, [&](const CIMInstance& found) {
         repository.deleteInstance(kNamespace, found.getPath());
         return ++seen < 100;

@@ -19,7 +19,7 @@ mof::CompileOptions optionsFor(const char* nameSpace)
     return options;
 }
 
-// Keeps the last class; its superclass need not exist.
+// Keeps the last class; its superclass may be missing.
 class Collector : public mof::MemoryHandler
 {
   public:

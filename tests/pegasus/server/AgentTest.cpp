@@ -81,7 +81,7 @@ TEST_F(AgentTest, aLargeAnswerIsPassedOnWhole)
         EXPECT_EQ(bulk[i].getPath().toString(), String(path));
         EXPECT_EQ(bulk[i].getPropertyCount(), 17u);
     }
-    // A client that takes no trailers gets the same, with its length in front.
+    // A client that lacks support for trailers gets the same, with its length in front.
     const std::string request =
         intrinsicRequest("EnumerateInstances", "root/probe", classNameParameter("Probe_Bulk"), "");
     RawConnection withoutTrailers(fTree.port());
@@ -201,8 +201,8 @@ TEST_F(AgentTest, aDeathIsReportedWithModuleAndCauseAndTheOthersGoOn)
     const std::pair<const char*, std::string> rows[] = {
         {"Crash",
          "CIM_ERR_FAILED: Lost connection with cimprovagt \"ProbeModule\". killed by signal 11 (Segmentation fault)"},
-        // Its children, one of them in a session of its own, hold the agent's sockets: the caller must not wait for
-        // them.
+        // Its children, one of them in a session of its own, hold the agent's sockets: the caller must return while
+        // they run.
         {"ForkAndCrash",
          "CIM_ERR_FAILED: Lost connection with cimprovagt \"ProbeModule\". killed by signal 11 (Segmentation fault)"},
         {"Exit", "CIM_ERR_FAILED: Lost connection with cimprovagt \"ProbeModule\". exit status 3"},

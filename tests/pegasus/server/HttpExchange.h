@@ -30,7 +30,7 @@ class RawConnection
     RawConnection(const RawConnection&) = delete;
     RawConnection& operator=(const RawConnection&) = delete;
 
-    // Returns: false when the server does not take any more.
+    // Returns: false when the connection is broken.
     bool send(const std::string& bytes);
     void endSending();
     // Reads one answer; bytes after it are kept for the next. Ends at the time limit with what there is.

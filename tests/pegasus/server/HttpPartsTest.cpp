@@ -1,4 +1,4 @@
-// The HTTP layer without a server: bytes in, bytes out; what bounds them; what ends a connection.
+// The HTTP layer by itself: bytes in, bytes out; what bounds them; what ends a connection.
 #include "pegasus/base/PercentCoding.h"
 #include "pegasus/server/agent/AgentChannel.h"
 #include "pegasus/server/net/Acceptor.h"
@@ -188,7 +188,7 @@ TEST(CimAnswerTest, cutsALongErrorText)
     }
 }
 
-// A peer that takes nothing must not hold the thread.
+// A peer that stops reading may hold the thread for a bounded time only.
 TEST(SocketStreamTest, waitsForASlowReaderOnlySoLong)
 {
     int ends[2];
@@ -219,7 +219,7 @@ base::Descriptor connectionOf(ConnectionGroup& group)
     return base::Descriptor(ends[1]);
 }
 
-// What a connection's thread throws must end that connection, and nothing but it.
+// What a connection's thread throws must end that connection only.
 TEST(ConnectionGroupTest, anExceptionEndsOnlyItsConnection)
 {
     FaultyHandler handler;

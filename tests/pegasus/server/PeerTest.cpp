@@ -50,7 +50,7 @@ std::uint16_t portOf(const base::Descriptor& socket)
     return ntohs(address.sin_port);
 }
 
-// A connected client socket, from a given port if it is not 0.
+// A connected client socket, from the given port; 0 leaves the choice to the kernel.
 base::Descriptor connectTo(std::uint16_t port, std::uint16_t from = 0)
 {
     base::Descriptor socket(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0));
@@ -117,7 +117,7 @@ TEST_F(PeerTest, theKernelSaysWhoThePeerIs)
 }
 
 // Before the connection is accepted the listener counts, afterwards the accepted socket; one that the server has closed
-// has no owner.
+// lacks an owner.
 TEST_F(PeerTest, theKernelSaysWhoServes)
 {
     for (const bool isMapped : {false, true}) {

@@ -1,4 +1,4 @@
-/* A provider that does what a test asks for: many instances, instances without end, errors, crashes.
+/* A provider that does what a test asks for: many instances, endless instances, errors, crashes.
  * Probe_Bulk delivers as many instances as SetCount said (1000 at first); Probe_Endless delivers for ever;
  * Probe_FailAfter delivers one instance, then fails. */
 #include <cmpi/cmpi.h>
@@ -243,7 +243,7 @@ static CMPIStatus countByUpcall(const CMPIContext* context, const CMPIResult* re
     return returnNumber(result, count);
 }
 
-/* Takes memory until there is none. */
+/* Takes memory until it is exhausted. */
 static CMPIStatus grow(void)
 {
     enum

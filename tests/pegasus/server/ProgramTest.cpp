@@ -181,7 +181,7 @@ struct HostileRow
     bool isWritten; // whether the server gets its start file after all
 };
 
-// Whatever another user puts where the start file belongs, the server starts and says what it could not do.
+// Whatever another user puts where the start file belongs, the server starts and reports what failed.
 TEST(ProgramTest, startsWhateverLiesAtTheStartFilesPath)
 {
     const HostileRow rows[] = {
@@ -301,7 +301,7 @@ TEST(ProgramTest, refusesATreeThatOthersCanChange)
     EXPECT_NO_THROW(tree.start());
 }
 
-// A laboratory's exception is the user's own to make: another user's configuration file does not count.
+// A laboratory's exception is the user's own to make: another user's configuration file is ignored.
 TEST(ProgramTest, anotherUsersConfigurationIsNotRead)
 {
     if (::geteuid() != 0) {

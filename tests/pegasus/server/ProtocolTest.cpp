@@ -258,7 +258,7 @@ TEST_F(ProtocolTest, unknownAndUnsupportedOperations)
     }
 }
 
-// A configuration property that does not exist is refused, whatever the call asks to do with it.
+// An unknown configuration property is refused, whatever the call asks to do with it.
 TEST_F(ProtocolTest, anUnknownConfigurationPropertyIsNotFound)
 {
     fgTree->compileBase();

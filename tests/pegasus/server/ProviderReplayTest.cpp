@@ -122,7 +122,7 @@ class ProviderReplayTest : public ReplayFixture
         }
     }
 
-    // The provider's word in a recorded status: without the symbol that the server puts before it.
+    // The provider's word in a recorded status: what follows the symbol that the server puts first.
     static std::string statusLine(const HttpAnswer& answer)
     {
         const auto code = answer.trailers.find("cimstatuscode");
@@ -133,7 +133,7 @@ class ProviderReplayTest : public ReplayFixture
         return code->second + " " + std::regex_replace(text, std::regex("^(CIM_ERR_\\w+|Unrecognized.*\"): "), "");
     }
 
-    // Gives the provider the answer of a method; its inputs come back in `echo`'s way, if that is not null.
+    // Gives the provider the answer of a method. Its inputs come back in `echo`'s way; null turns that off.
     void provideMethod(const std::string& name, const char* echo) const
     {
         const RecordedExchange recorded(name);
@@ -213,7 +213,7 @@ TEST_F(ProviderReplayTest, methods)
     }
 }
 
-// Providers of other vendors: of most of their classes the recordings show nothing but the instances.
+// Providers of other vendors: of most of their classes the recordings show the instances only.
 TEST_F(ProviderReplayTest, otherVendors)
 {
     std::set<std::string> namespaces;

@@ -63,7 +63,7 @@ HttpAnswer parseAnswer(const std::string& bytes)
 
 void appendCanonical(std::string& out, const XmlElement& element, int depth, Order order);
 
-// The text of a VALUE; an embedded instance is taken apart where order does not matter, for it does not there either.
+// The text of a VALUE; an embedded instance is taken apart where order is ignored, since that holds inside it too.
 std::string canonicalText(std::string text, int depth, Order order)
 {
     if (order == Order::kAsSent || text.rfind("<INSTANCE ", 0) != 0) {

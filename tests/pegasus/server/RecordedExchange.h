@@ -10,14 +10,14 @@ namespace servertest {
 // A request and its answer as they once went over the wire, from the folder of recordings.
 struct RecordedExchange
 {
-    // Throws: std::runtime_error when there is none of that name.
+    // Throws: std::runtime_error when the recording is absent.
     explicit RecordedExchange(const std::string& name);
 
     std::string request;
     HttpAnswer answer;
 };
 
-// The recordings' folder, with a slash at the end; empty when the build knows of none.
+// The recordings' folder, with a slash at the end; empty when the build lacks one.
 std::string recordingsFolder();
 
 // The elements of one name in a body, each as text with the line feed after it. They do not nest.
@@ -31,10 +31,9 @@ enum class Order
     kSorted
 };
 
-// A body without what does not matter: blanks between tags, the order of attributes, how a character is escaped.
+// A body in canonical form: blanks between tags, the order of attributes and the escapes of characters are evened out.
 std::string canonicalBody(std::string body, Order order);
-// Status, CIM headers, trailer and body of an answer, one a line, without what does not matter: blanks between tags,
-// the order of attributes, how a character is escaped.
+// Status, CIM headers, trailer and body of an answer, one a line, in the same canonical form.
 std::string canonical(const HttpAnswer& answer, Order order = Order::kAsSent);
 
 // The line where two texts part, with a few that follow; empty if they are equal.

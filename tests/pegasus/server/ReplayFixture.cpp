@@ -16,7 +16,7 @@ enum class Body
     kOther
 };
 
-// An answer of ours that is not the recorded one, because it is better.
+// An answer of ours that differs from the recorded one because it is better.
 struct BetterRow
 {
     const char* name;

@@ -7,21 +7,21 @@
 
 namespace servertest {
 
-// A CMPI instance is born with its class's default values; the recorded providers' instances were not.
+// A CMPI instance is born with its class's default values; the recorded providers' instances lacked them.
 enum class Defaults
 {
     kKept,
     kLeftOut
 };
 
-// A server for recorded requests. Skips visibly where there are no recordings.
+// A server for recorded requests. Skips visibly where the recordings are missing.
 class ReplayFixture : public testing::Test
 {
   protected:
     void SetUp() override;
 
     HttpAnswer replay(const std::string& name) const { return exchange(fTree.port(), RecordedExchange(name).request); }
-    // The answer to a recorded request must be the recorded one, unless a row of the table says why ours is better.
+    // The answer to a recorded request must be the recorded one, or a row of the table says why ours is better.
     void expectRecorded(const std::string& name, Order order = Order::kAsSent) const;
 
     // Sends an intrinsic request that must succeed.
@@ -36,7 +36,7 @@ class ReplayFixture : public testing::Test
     void createClasses(const std::string& nameSpace, const std::string& recordedAnswer,
                        Defaults defaults = Defaults::kKept) const;
     // From the text of an INSTANCE element, and from all of a recorded answer, as they were
-    // created: without what the repository filled in.
+    // created, before the repository filled in the rest.
     void createInstance(const std::string& nameSpace, const std::string& instance) const;
     void createInstances(const std::string& nameSpace, const std::string& recordedAnswer) const;
     // The classes of root/cimv2 that the recordings ask about, built from the recorded answers about them.

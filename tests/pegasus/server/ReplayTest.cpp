@@ -1,5 +1,5 @@
 // Recorded requests against our server: the answer must be canonically equal to the recorded one, but for the rows that
-// say why ours is better. The recordings are not part of the project: VRX_VECTORS_DIR names their folder.
+// say why ours is better. The recordings lie outside the project: VRX_VECTORS_DIR names their folder.
 #include "tests/pegasus/server/ReplayFixture.h"
 
 #include <filesystem>

@@ -13,7 +13,7 @@ struct ProgramResult
     std::string err;
 };
 
-// A server tree of its own in a temporary folder, with a consumer name and a port that nobody else uses. The programs
+// A server tree of its own in a temporary folder, with a consumer name and a port of its own. The programs
 // are those of the build. The destructor stops the server, checks nothing, and removes the folder.
 class ServerTree
 {
@@ -29,13 +29,13 @@ class ServerTree
     std::string startFile() const { return "/var/tmp/cimserverkol_tc_" + fConsumer + "_start.conf"; }
     std::string log() const;
 
-    // Runs "cimserver", "cimconfig" or "cimmof" with PEGASUS_HOME set. A program that does not end within 30 s is
+    // Runs "cimserver", "cimconfig" or "cimmof" with PEGASUS_HOME set. A program that still runs after 30 s is
     // killed.
     ProgramResult run(const std::string& program, const std::vector<std::string>& arguments) const;
 
-    // Starts the server with further "name=value" words. Throws: std::runtime_error when it says that it cannot.
+    // Starts the server with further "name=value" words. Throws: std::runtime_error when it reports a failure.
     void start(const std::vector<std::string>& properties = {});
-    // The server's process; 0 when none holds the tree.
+    // The server's process; 0 when the tree is free.
     int serverProcess() const;
 
     // Compiles the two base schemas. Throws: std::runtime_error with what the compiler says.
@@ -65,7 +65,7 @@ template <typename Condition> bool eventually(const Condition& condition)
     return waitUntil([](const void* argument) { return (*static_cast<const Condition*>(argument))(); }, &condition);
 }
 
-// Whether a process runs (a zombie does not).
+// Whether a process runs (a zombie counts as ended).
 bool isRunning(int pid);
 // Processes whose parent is `pid`.
 std::vector<int> childrenOf(int pid);

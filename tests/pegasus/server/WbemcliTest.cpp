@@ -1,5 +1,5 @@
-// A foreign client, Debian's wbemcli, against our server: every verb that it has. It has none for qualifier
-// declarations (GetQualifier, EnumerateQualifiers, SetQualifier) and none for CreateClass.
+// A foreign client, Debian's wbemcli, against our server: every verb that it has. It lacks verbs for qualifier
+// declarations (GetQualifier, EnumerateQualifiers, SetQualifier) and for CreateClass.
 #include "tests/pegasus/server/ServerTree.h"
 
 #include <gtest/gtest.h>

@@ -24,7 +24,7 @@ static CMPIStatus enumerateInstances(CMPIInstanceMI* mi, const CMPIContext* ctx,
     return result->ft->returnInstance(result, gBroker->eft->newInstance(gBroker, path, NULL));
 }
 
-/* The members of an interface of version 1.0; the memory after it is not mapped. */
+/* The members of an interface of version 1.0; the memory after it is inaccessible. */
 static const CMPIInstanceMIFT* oldTable(void)
 {
     const size_t page = (size_t)sysconf(_SC_PAGESIZE);

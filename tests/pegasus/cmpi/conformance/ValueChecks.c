@@ -29,7 +29,7 @@ enum
     kScalarCount = sizeof kScalars / sizeof *kScalars
 };
 
-/* Copies `size` bytes of `source` to the end of a page after which nothing is mapped. */
+/* Copies `size` bytes of `source` to the end of a page; the page after it is inaccessible. */
 static void* atPageEnd(void** page, const void* source, size_t size)
 {
     const size_t bytes = (size_t)sysconf(_SC_PAGESIZE);

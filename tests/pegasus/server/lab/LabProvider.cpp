@@ -35,7 +35,7 @@ CMPIStatus failure(int code, const std::string& text)
     return {static_cast<CMPIrc>(code), broker->eft->newString(broker, text.c_str(), nullptr)};
 }
 
-// The content of a file of the library's folder; empty if there is none.
+// The content of a file of the library's folder; empty if absent.
 std::string contentOf(const std::string& name)
 {
     Dl_info library = {};
@@ -172,7 +172,7 @@ template <typename Interface> CMPIStatus cleanup(Interface*, const CMPIContext*,
     return {CMPI_RC_OK, nullptr};
 }
 
-// An older provider's tables: the slots for writing and querying are there and never called.
+// An older provider's tables: the slots for writing and querying are there and stay unused.
 const CMPIInstanceMIFT kInstanceTable = {CMPIVersion100,
                                          CMPIVersion100,
                                          "instanceLab",
