@@ -17,10 +17,10 @@
 //   contract: every operation keeps its place.
 //
 // Ownership
-//   Objects travel as boost::shared_ptr. Every pointer argument and every returned pointer refers to an object, unless
-//   the operation says that it may be null. An owner keeps what is below it alive (a namespace its classes, a class its
-//   declarations); the way back is weak. A host may therefore keep a class or an instance longer than its namespace:
-//   names, declarations and fetched values stay readable; an operation that needs the namespace throws
+//   Objects travel as boost::shared_ptr. Every pointer argument and every returned pointer refers to an object; where
+//   null is possible, the operation says so. An owner keeps what is below it alive (a namespace its classes, a class
+//   its declarations); the way back is weak. A host may therefore keep a class or an instance longer than its
+//   namespace: names, declarations and fetched values stay readable; an operation that needs the namespace throws
 //   boost::bad_weak_ptr or returns null, as it says. Every object that a plug-in made must be released before the
 //   plug-in's library is unloaded.
 //
@@ -60,8 +60,8 @@
 //   ended when the operation returns.
 //
 // Blocking
-//   An operation works in memory unless it has a "Blocks:", which states how long it may wait for a server or a
-//   program; a visitor's own time comes on top.
+//   An operation's "Blocks:" states how long it may wait for a server or a program; an operation that lacks it works
+//   in memory. A visitor's own time comes on top.
 #pragma once
 
 #include <boost/function.hpp>

@@ -17,7 +17,7 @@ namespace NKOLVRX20 {
 class ICIMClass : public ICIMElement, public ICIMNamedElement
 {
   public:
-    // Checks the class against its superclass and namespace. Here: does nothing.
+    // Checks the class against its superclass and namespace. Here: returns at once.
     virtual void Validate(TCIMContext context) = 0;
     // Enters the class into its namespace.
     // Here: GetClass has done it for every class that it returns.
@@ -45,7 +45,7 @@ class ICIMClass : public ICIMElement, public ICIMNamedElement
     // Here: asks the server for the superclass's name, then the namespace for the class (ICIMNamespace::GetClass with
     // the context).
     // Context: nsp (default: this class's own) and timeout, for a superclass that has yet to be fetched.
-    // Throws: TVRXException 42 when the server does not answer; what GetClass throws; boost::bad_weak_ptr.
+    // Throws: TVRXException 42 when the server fails to answer; what GetClass throws; boost::bad_weak_ptr.
     // Blocks: one request, then as GetClass.
     virtual boost::shared_ptr<ICIMClass> GetSuperClass(TCIMContext context) const = 0;
     // Visits the direct subclasses, or with deep the whole tree below, depth first, a class before its own subclasses.
@@ -56,7 +56,8 @@ class ICIMClass : public ICIMElement, public ICIMNamedElement
     // Here: compares names, case included; "<root>" is a subclass of itself only.
     virtual bool IsSubclassOf(boost::shared_ptr<const ICIMClass> other, TCIMContext context) const = 0;
     // Visits the classes that associations link with this one; an empty text lets every class pass.
-    // Here: this and the next one visit nothing. Associations are classes of their own, with instances and references.
+    // Here: this and the next one leave the visitor uncalled. Associations are classes of their own, with instances and
+    // references.
     virtual void EnumerateAssociatedClasses(TClassVisitor visitor, const std::string& associationClass,
                                             const std::string& resultClass, const std::string& role,
                                             const std::string& resultRole, TCIMContext context) = 0;
@@ -72,12 +73,12 @@ class ICIMClass : public ICIMElement, public ICIMNamedElement
     virtual boost::shared_ptr<ICIMPropertyDecl> AllocatePropertyDecl(const std::string& name, TCIMValue value,
                                                                      TCIMContext context) = 0;
     // Returns: the declaration; null for exactly "DateTimeOfCollection", in this spelling, when the class lacks it.
-    // Throws: TVRXException 15 for any other property that the class does not declare, 25.
+    // Throws: TVRXException 15 for any other undeclared property, 25.
     virtual boost::shared_ptr<ICIMPropertyDecl> GetPropertyDecl(const std::string& name, TCIMContext context) const = 0;
     // Visits the declarations, inherited ones included.
     virtual void EnumeratePropertyDecls(TPropertyDeclVisitor visitor, TCIMContext context) const = 0;
     // Returns: the class's own value of the property: its default.
-    // Throws: TVRXException 15 when the class has no property of that name or it has no default, 25.
+    // Throws: TVRXException 15 when the class lacks the property, or the property a default; 25.
     virtual boost::shared_ptr<ICIMProperty> GetProperty(const std::string& name, TCIMContext context) const = 0;
     // Sets a value on the class itself.
     // Here: unsupported. Throws: TVRXException 31, always.
@@ -90,7 +91,7 @@ class ICIMClass : public ICIMElement, public ICIMNamedElement
     // Visits the instances of the class and of its subclasses in the server's order, with deep also the properties that
     // subclasses add. The class of every visited instance is this one, also of an instance of a subclass.
     // Here: asks whether the server has the class, then for its instances, in the provider's server namespace over the
-    // provider's own connection; a class that nobody provides goes over the namespace's connection. All instances have
+    // provider's own connection; a class that lacks a provider goes over the namespace's connection. All instances have
     // arrived before the first is visited. A failure of the server or of an instance is a line in the log and costs the
     // instances concerned: zero instances can mean either. A property that fails to convert is missing
     // from its instance.
@@ -100,7 +101,7 @@ class ICIMClass : public ICIMElement, public ICIMNamedElement
     // for each class that a reference property names for the first time.
     virtual void EnumerateInstances(TInstanceVisitor visitor, bool deep, TCIMContext context) = 0;
     // Makes a method declaration that points back to this class. Its type is a scalar code.
-    // Returns: a declaration that the class does not list.
+    // Returns: a declaration outside of the class's list.
     virtual boost::shared_ptr<ICIMMethodDecl>
     AllocateMethodDecl(const std::string& name, TCIMValue::TCIMType returnType, TCIMContext context) = 0;
     // Returns: the declaration; null for an undeclared method.
@@ -108,40 +109,41 @@ class ICIMClass : public ICIMElement, public ICIMNamedElement
     // Visits the method declarations, inherited ones included.
     virtual void EnumerateMethodDecls(TMethodDeclVisitor visitor, TCIMContext context) const = 0;
     // Calls a static method of the class.
-    // Here: calls nothing. Returns: null, always; InvokeMethod with a target, at the end, is the one that works.
+    // Here: the call stays in the plug-in. Returns: null, always; InvokeMethod with a target, at the end, is the one
+    // that works.
     virtual TCIMValue InvokeMethod(const std::string& name, TCIMContext& parameters, TCIMContext context) = 0;
     // Equal names, byte for byte, in whatever namespaces.
     virtual bool operator==(const ICIMClass& other) const = 0;
     // Byte order of the names.
     virtual bool operator<(const ICIMClass& other) const = 0;
-    // Here: copies nothing.
+    // Here: leaves this class as it is.
     virtual ICIMClass& operator=(const ICIMClass& other) = 0;
 
     // Whether the host has collected the class already: a mark of the host's own.
-    // Here: always false; SetCollected does nothing.
+    // Here: always false; SetCollected is ignored.
     virtual bool hasCollected() const = 0;
     virtual void SetCollected() = 0;
 
     // Enters a direct subclass; one of the same name, case included, is ignored.
     // Here: GetClass has done it for every class that it returns.
     virtual void AddChildClass(boost::shared_ptr<ICIMClass> child) = 0;
-    // Takes a subclass out. Here: does nothing.
+    // Takes a subclass out. Here: ignored.
     virtual void RemoveChildClass(boost::shared_ptr<ICIMClass> child) = 0;
     // Keeps the instance with the class until RemoveInstance or ClearInstances; EnumerateInstances passes it over.
     // Here: an instance of another class also makes ClearInstances reach that class.
     virtual void AddInstance(boost::shared_ptr<ICIMInstance> instance) = 0;
     // Releases an instance that AddInstance took; any other is ignored.
     virtual void RemoveInstance(boost::shared_ptr<ICIMInstance> instance) = 0;
-    // Notes an association class that refers to this one. Here: both do nothing.
+    // Notes an association class that refers to this one. Here: both are ignored.
     virtual void AddAssociationClass(boost::shared_ptr<ICIMClass> association) = 0;
     virtual void RemoveAssociationClass(boost::shared_ptr<ICIMClass> association) = 0;
     // Adds a property declaration that AllocatePropertyDecl of this plug-in made.
     // Here: a declaration with the qualifier OVERRIDE replaces an inherited one of the same type, or is added; a name
     // that contains "PortType" replaces any declaration; every other name must be new.
-    // Throws, after a line in the log: TVRXException 22 (a reference in a class that is not an association), 14 (an
+    // Throws, after a line in the log: TVRXException 22 (a reference outside of an association), 14 (an
     // override of another type, or a declaration from elsewhere), 16 (the class has it already), 25.
     virtual void AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declaration) = 0;
-    // Here: does nothing, as the next two.
+    // Here: ignored, as the next two.
     virtual void RemovePropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declaration) = 0;
     virtual void AddMethodDecl(boost::shared_ptr<ICIMMethodDecl> declaration) = 0;
     virtual void RemoveMethodDecl(boost::shared_ptr<ICIMMethodDecl> declaration) = 0;
@@ -166,8 +168,8 @@ class ICIMClass : public ICIMElement, public ICIMNamedElement
     // Here: every input travels by its value's own type, whatever the method's declaration says; a 16-bit array travels
     // as an 8-bit one and keeps the low bytes.
     // Returns: the method's return value; null for a void one.
-    // Throws: TVRXException 14 (a value does not convert); Pegasus::CIMException when the server or the method refuses,
-    // any other Pegasus::Exception when there is no connection, no answer, or a name or path is malformed;
+    // Throws: TVRXException 14 (a value fails to convert); Pegasus::CIMException when the server or the method refuses,
+    // any other Pegasus::Exception when the connection or the answer is missing, or a name or path is malformed;
     // boost::bad_weak_ptr.
     // Blocks: up to the timeout that an earlier operation gave the namespace's client: 5 seconds after a GetClass, 300
     // seconds after an ICIMInstance::InvokeMethod, 65535 seconds before any.

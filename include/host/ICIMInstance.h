@@ -16,7 +16,7 @@ namespace NKOLVRX20 {
 class ICIMInstance : public ICIMElement
 {
   public:
-    // Checks the values against the class's declarations. Here: does nothing; values are kept as they were set.
+    // Checks the values against the class's declarations. Here: returns at once; values are kept as they were set.
     virtual void Validate(TCIMContext context) = 0;
     // Enters the instance into its class (ICIMClass::AddInstance).
     virtual void AddToNamespace(TCIMContext context) = 0;
@@ -35,7 +35,7 @@ class ICIMInstance : public ICIMElement
     // instance that ICIMNamespace::GetInstance or AllocateInstance made.
     virtual std::string GetPegasusNSPStr() const = 0;
     // Visits the instances that associations link with this one; an empty text lets every instance pass.
-    // Here: this and the next one visit nothing. Enumerate the association class and read its references.
+    // Here: this and the next one leave the visitor uncalled. Enumerate the association class and read its references.
     virtual void EnumerateAssociatedInstances(TInstanceVisitor visitor, const std::string& associationClass,
                                               const std::string& resultClass, const std::string& role,
                                               const std::string& resultRole, TCIMContext context) = 0;
@@ -43,7 +43,7 @@ class ICIMInstance : public ICIMElement
     virtual void EnumerateAssociationInstances(TInstanceVisitor visitor, const std::string& resultClass,
                                                const std::string& role, TCIMContext context) = 0;
     // Returns: the property; its value may be null.
-    // Throws: TVRXException 15 for a property that the instance does not hold.
+    // Throws: TVRXException 15 for a property that the instance lacks.
     virtual boost::shared_ptr<ICIMProperty> GetProperty(const std::string& name, TCIMContext context) const = 0;
     // Sets a value of any type, also of an undeclared property. In memory only.
     virtual void SetPropertyValue(const std::string& name, TCIMValue value, TCIMContext context) = 0;
@@ -56,9 +56,9 @@ class ICIMInstance : public ICIMElement
     // through the class (ICIMClass::InvokeMethod with the instance's path as target).
     // Returns: the method's return value; null for a void one, and when the server or the method refuses, which the
     // log says.
-    // Throws: TVRXException 6 when the class declares no such method or the method no such parameter, 14 when a
-    // parameter's text is not an object path, 25 (a parameter's name); Pegasus::Exception when the method's name is not
-    // a CIM name or an output does not convert; boost::bad_weak_ptr.
+    // Throws: TVRXException 6 for an undeclared method or parameter, 14 when a parameter's text is a malformed object
+    // path, 25 (a parameter's name); Pegasus::Exception when the method's name is an invalid CIM name or an output
+    // fails to convert; boost::bad_weak_ptr.
     // Blocks: up to 300 seconds. The namespace's client keeps that timeout.
     virtual TCIMValue InvokeMethod(const std::string& name, TCIMContext& parameters, TCIMContext context) = 0;
     // Equal class names, equal properties, equal values.

@@ -9,10 +9,10 @@ namespace NKOLVRX20 {
 class ICIMMethodDecl : public ICIMNamedElement
 {
   public:
-    // Checks the declaration. Here: does nothing.
+    // Checks the declaration. Here: returns at once.
     virtual void Validate(TCIMContext context) = 0;
     // Adds the declaration to its class.
-    // Here: does nothing, as ICIMClass::AddMethodDecl. Throws: boost::bad_weak_ptr when the class is gone.
+    // Here: ignored, as by ICIMClass::AddMethodDecl. Throws: boost::bad_weak_ptr when the class is gone.
     virtual void AddToClass(TCIMContext context) = 0;
     // Returns: the name as the server spells it.
     virtual std::string GetName(TCIMContext context) const = 0;
@@ -29,7 +29,7 @@ class ICIMMethodDecl : public ICIMNamedElement
                                                                   TCIMContext context) const = 0;
     // Visits the parameters in byte order of their lower-cased names; the order of the signature is lost.
     virtual void EnumerateParameterDecls(TParameterDeclVisitor visitor, TCIMContext context) const = 0;
-    // Comparisons are by name. Here: the assignment copies nothing.
+    // Comparisons are by name. Here: the assignment leaves this declaration as it is.
     virtual bool operator==(const ICIMMethodDecl& other) const = 0;
     virtual bool operator<(const ICIMMethodDecl& other) const = 0;
     virtual ICIMMethodDecl& operator=(const ICIMMethodDecl& other) = 0;

@@ -13,8 +13,8 @@ namespace NKOLVRX20 {
 // Here: one namespace, "root/cimv2", served by a private CIM server. The object owns that server: when its last shared
 // pointer goes, it stops the server and deletes the repository. This blocks for three seconds and the time of the
 // server's own stop command; failures are lines in the log.
-// Here: while unconnected (all start attempts failed) classes are null, enumerations visit nothing and
-// instances are null; the log has said why.
+// Here: while unconnected (all start attempts failed) classes are null, enumerations leave the visitor
+// uncalled and instances are null; the log has said why.
 class ICIMNamespace
 {
   public:
@@ -32,13 +32,13 @@ class ICIMNamespace
     // Here: unsupported. Returns: null, always; classes come from the server only.
     virtual boost::shared_ptr<ICIMClass> AllocateClass(const std::string& name, boost::shared_ptr<ICIMClass> superClass,
                                                        TCIMContext context) = 0;
-    // Returns: the class of that name; null for the empty name and for a class that cannot be had.
+    // Returns: the class of that name; null for the empty name and when the server fails to give the class.
     // Here: a class is fetched at its first mention, after its superclasses, and kept until the namespace ends; "nsp"
     // and "timeout" count at that time only. "timeout" bounds the enumerations of the class; this call has its own
     // bound. "<root>" is the pseudo-class above all others. A failure of the server is a line in the log and a null
     // class; a class whose superclass failed stands directly below "<root>".
     // Context: nsp, timeout.
-    // Throws: TVRXException 25 (not a CIM name), 14 (nsp or timeout is not a string);
+    // Throws: TVRXException 25 (an invalid CIM name), 14 (nsp or timeout of a type other than string);
     // Pegasus::UninitializedObjectException when the server's answer was not HTTP.
     // Blocks: 5 seconds for each request to a silent server: two a class of the chain, one a qualifier that is new.
     virtual boost::shared_ptr<ICIMClass> GetClass(const std::string& name, TCIMContext context) = 0;
@@ -46,12 +46,12 @@ class ICIMNamespace
     // Here: the classes that were fetched so far, as ICIMClass::EnumerateSubClasses of "<root>" does.
     virtual void EnumerateRootClasses(TClassVisitor visitor, TCIMContext context) = 0;
     // Visits the providers, in the order in which they were found.
-    // Context: pluginType. With a number other than 7 the call visits nothing; an absent key means 7.
+    // Context: pluginType. With a number other than 7 the call returns at once; an absent key means 7.
     // Threads: with the host's setting "pegasus_multi_thread" = "on" the visitor runs on one thread a provider, all at
     // once; what it returns is ignored. It may only collect, under a lock of its own: fetching classes and
     // instances uses the namespace's unguarded client and class map. Fetch after this call, on one thread.
     // Throws: TVRXException 14 when pluginType is not a kSint8 (a signed char: TCIMValue(static_cast<signed char>(7)));
-    // what the visitor throws, except on threads, where it is a line in the log; boost::thread_resource_error when a
+    // what the visitor throws (on threads a line in the log takes its place); boost::thread_resource_error when a
     // thread cannot be made, after those that run have ended.
     // Blocks: as long as the visitors.
     virtual void EnumerateProviders(TProviderVisitor visitor, TCIMContext context) = 0;
@@ -64,7 +64,7 @@ class ICIMNamespace
     // Looks a qualifier declaration up.
     // Here: the call goes to the upcall namespace with the same arguments; EnumerateQualifierDecls lists this
     // namespace's own declarations.
-    // Throws: boost::bad_weak_ptr when there is no upcall namespace or it is gone; what the upcall namespace throws.
+    // Throws: boost::bad_weak_ptr when the upcall namespace is unset or gone; what the upcall namespace throws.
     virtual boost::shared_ptr<ICIMQualifierDecl> GetQualifierDecl(const std::string& name, TCIMContext context) = 0;
     // Visits the declarations of all qualifiers that the fetched classes carry, and those that were added.
     virtual void EnumerateQualifierDecls(TQualifierDeclVisitor visitor, TCIMContext context) = 0;
@@ -82,7 +82,7 @@ class ICIMNamespace
     virtual boost::shared_ptr<ICIMInstance> GetInstance(const TCIMReference& reference, TCIMContext context) = 0;
     // Deletes the instance that the reference names.
     // Here: this and the next two go to the repository namespace, arguments unchanged.
-    // Throws: TVRXException 31 when AllocateNamespace was given no repository; what that namespace throws.
+    // Throws: TVRXException 31 when AllocateNamespace's context lacked a repository; what that namespace throws.
     virtual void DeleteInstance(const TCIMReference& reference, TCIMContext context) = 0;
     // Sets the named property values on the instance. Here: as DeleteInstance.
     virtual void ModifyInstance(const TCIMReference& reference, TCIMContext values, TCIMContext context) = 0;
@@ -90,7 +90,7 @@ class ICIMNamespace
     virtual void ExecuteQuery(TInstanceVisitor visitor, std::string& language, std::string& query,
                               TCIMContext context) = 0;
     // Forgets the instances that the namespace keeps.
-    // Here: does nothing; every request fetches again, and classes keep only what AddInstance gave them.
+    // Here: returns at once; every request fetches again, and classes keep only what AddInstance gave them.
     virtual void ClearInstances() = 0;
 };
 

@@ -9,7 +9,7 @@ namespace NKOLVRX20 {
 class ICIMParameterDecl : public ICIMNamedElement
 {
   public:
-    // Checks the declaration. Here: does nothing.
+    // Checks the declaration. Here: returns at once.
     virtual void Validate(TCIMContext context) = 0;
     // Adds the declaration to its method; it replaces one of the same name.
     // Throws: TVRXException 25; boost::bad_weak_ptr when the method is gone.
@@ -22,7 +22,7 @@ class ICIMParameterDecl : public ICIMNamedElement
     virtual TCIMValue::TCIMType GetType(TCIMContext context) const = 0;
     // Returns: whether GetType is an array code.
     virtual bool IsArray(TCIMContext context) const = 0;
-    // Comparisons are by name. Here: the assignment copies nothing.
+    // Comparisons are by name. Here: the assignment leaves this declaration as it is.
     virtual bool operator==(const ICIMParameterDecl& other) const = 0;
     virtual bool operator<(const ICIMParameterDecl& other) const = 0;
     virtual ICIMParameterDecl& operator=(const ICIMParameterDecl& other) = 0;

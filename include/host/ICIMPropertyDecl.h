@@ -9,7 +9,7 @@ namespace NKOLVRX20 {
 class ICIMPropertyDecl : public ICIMNamedElement
 {
   public:
-    // Checks the declaration. Here: does nothing.
+    // Checks the declaration. Here: returns at once.
     virtual void Validate(TCIMContext context) = 0;
     // Adds the declaration to its class.
     // Throws: what ICIMClass::AddPropertyDecl throws; boost::bad_weak_ptr when the class is gone.
@@ -30,7 +30,7 @@ class ICIMPropertyDecl : public ICIMNamedElement
     virtual TCIMValue GetDefaultValue(TCIMContext context) const = 0;
     // Replaces the default by a value of any type; the declared type stays.
     virtual void SetDefaultValue(TCIMValue value, TCIMContext context) = 0;
-    // Comparisons are by name. Here: the assignment copies nothing.
+    // Comparisons are by name. Here: the assignment leaves this declaration as it is.
     virtual bool operator==(const ICIMPropertyDecl& other) const = 0;
     virtual bool operator<(const ICIMPropertyDecl& other) const = 0;
     virtual ICIMPropertyDecl& operator=(const ICIMPropertyDecl& other) = 0;

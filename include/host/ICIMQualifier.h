@@ -13,7 +13,7 @@ class ICIMQualifier
   public:
     virtual ~ICIMQualifier() = default;
 
-    // Checks value and flavor against the declaration. Here: does nothing.
+    // Checks value and flavor against the declaration. Here: returns at once.
     virtual void Validate(TCIMContext context) = 0;
     // Enters the qualifier into its element.
     // Throws: what ICIMNamedElement::AddQualifier throws; boost::bad_weak_ptr when the element is gone.

@@ -38,7 +38,7 @@ class ICIMQualifierDecl
 
     virtual ~ICIMQualifierDecl() = default;
 
-    // Checks the declaration. Here: does nothing.
+    // Checks the declaration. Here: returns at once.
     virtual void Validate(TCIMContext context) = 0;
     // Enters the declaration into its namespace.
     // Throws: TVRXException 16 when one of that name is there, 25; boost::bad_weak_ptr when the namespace is gone.
@@ -64,9 +64,9 @@ class ICIMQualifierDecl
     virtual void SetFlavor(EFlavor flavor, TCIMContext context) = 0;
     // Takes the bits out of the flavor.
     virtual void UnsetFlavor(EFlavor flavor, TCIMContext context) = 0;
-    // Returns: the flavor that a qualifier of this declaration gets unless it is given another.
+    // Returns: the flavor that a qualifier of this declaration gets by default.
     virtual EFlavor GetFlavor(TCIMContext context) const = 0;
-    // Comparisons are by name. Here: the assignment copies nothing.
+    // Comparisons are by name. Here: the assignment leaves this declaration as it is.
     virtual bool operator==(const ICIMQualifierDecl& other) const = 0;
     virtual bool operator<(const ICIMQualifierDecl& other) const = 0;
     virtual ICIMQualifierDecl& operator=(const ICIMQualifierDecl& other) = 0;

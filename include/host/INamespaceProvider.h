@@ -41,8 +41,8 @@ class INamespaceProvider
     //   3   the working directory or the consumer holds a character that a shell reads (a blank, a control character,
     //       one of " ' \ ` $ & | ; < > ( ) * ? [ ] { } ! # ~, in the consumer also /); nothing was removed or started
     //   11  the plug-in's folder has no readable pegasus/provider, or a vendor's folder in it cannot be read
-    //   12  a program could not be run or did not end in time
-    //   25  a *.classes.xml names a class that is not a CIM name
+    //   12  a program failed to run, or ran out of time
+    //   25  a *.classes.xml names a class by an invalid CIM name
     //   42  no connection
     // Pegasus::UninitializedObjectException as ICIMNamespace::GetClass; boost::thread_resource_error.
     // Ends the process with exit(1) when no TCP port from 65535 down to 1024 can be bound on 127.0.0.1.

@@ -28,7 +28,7 @@ class IProvider
     // file tags "CDM" and those whose qualifier DONTCOLLECT is true are left out. What the visitor returns is ignored.
     // A TVRXException of the visitor is a line in the log and costs that class only; other exceptions leave.
     virtual void EnumerateClassesProvided(TClassVisitor visitor, TCIMContext context) = 0;
-    // Here: copies nothing.
+    // Here: leaves this provider as it is.
     virtual IProvider& operator=(const IProvider& other) = 0;
 };
 

@@ -12,15 +12,15 @@ namespace NKOLVRX20 {
 // An instance whose property values are kept in memory; the base of the instances that a plug-in serves. It implements
 // every slot of ICIMInstance, whose comments hold; what is said there of the host's part is this class.
 //
-// An implementer provides the constructor and these operations. A plug-in overrides AddToNamespace, GetPegasusNSPStr
-// and InvokeMethod, and nothing else.
+// An implementer provides the constructor and these operations. A plug-in overrides exactly AddToNamespace,
+// GetPegasusNSPStr and InvokeMethod.
 // Here and below, names are matched in lower case; an undeclared name is kept as well.
 // Ownership: always held by boost::shared_ptr. Keeps its class alive.
 // Thread: one at a time.
 class TInmemInstance : public ICIMInstance, public boost::enable_shared_from_this<TInmemInstance>
 {
   public:
-    // The class may be null: path and declarations are then empty, and AddToNamespace does nothing. The context is
+    // The class may be null: path and declarations are then empty, and AddToNamespace returns at once. The context is
     // ignored.
     TInmemInstance(boost::shared_ptr<ICIMClass> instanceClass, TCIMContext context);
     ~TInmemInstance() override;
@@ -39,13 +39,13 @@ class TInmemInstance : public ICIMInstance, public boost::enable_shared_from_thi
     boost::shared_ptr<ICIMClass> GetClass(TCIMContext context) const override;
     // Returns: the empty text.
     std::string GetPegasusNSPStr() const override;
-    // Visit nothing: associations are beyond an instance in memory.
+    // Leave the visitor uncalled: associations are beyond an instance in memory.
     void EnumerateAssociatedInstances(TInstanceVisitor visitor, const std::string& associationClass,
                                       const std::string& resultClass, const std::string& role,
                                       const std::string& resultRole, TCIMContext context) override;
     void EnumerateAssociationInstances(TInstanceVisitor visitor, const std::string& resultClass,
                                        const std::string& role, TCIMContext context) override;
-    // Throws: TVRXException 15 for a property that the instance does not hold.
+    // Throws: TVRXException 15 for a property that the instance lacks.
     boost::shared_ptr<ICIMProperty> GetProperty(const std::string& name, TCIMContext context) const override;
     // The declaration, where the class has one, gives the property its name's spelling and its texts. A property that
     // is there already keeps its object: pointers from GetProperty see the new value.

@@ -18,7 +18,7 @@ namespace NKOLVRX20 {
 // In the reference host: the child gets default signal dispositions, an empty signal mask, a process group of its own,
 // and the descriptors 0 to 2 alone. A timeout below 1 counts as 1; when it ends, the whole group is killed and the
 // child reaped. Output beyond 16 MiB and standard error beyond 64 KiB are dropped, and the log says so.
-// Throws: TVRXException 12 when the program cannot be run or its time ran out. While the host shuts down, an exception
+// Throws: TVRXException 12 when the program fails to run or runs out of time. While the host shuts down, an exception
 // of the host's own that does not derive from TVRXException: plug-ins let it pass.
 // Blocks: until the child exits or the timeout ends.
 // Thread: safe.

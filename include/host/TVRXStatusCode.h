@@ -17,14 +17,14 @@ class TVRXStatusCode
         kSuccess = 0, // reserved: success throws nothing
         // In ICIMNamespace::Subscribe, and in GetQualifier with a found flag on a class.
         kOperationNotSupported = 1,
-        // A path that cannot be used. In AllocateNamespace (working directory or consumer), TConfig::Load.
+        // An unusable path. In AllocateNamespace (working directory or consumer), TConfig::Load.
         kBadPath = 3,
         // Memory for a file is short, or the file exceeds its limit. Here: costs one vendor, inside AllocateNamespace.
         kAllocationFailed = 4,
         // In ICIMInstance::InvokeMethod: an undeclared method or parameter. In the reference host's own namespace:
         // an unknown instance.
         kNotFound = 6,
-        // In AllocateNamespace: the providers' folder or a vendor's folder cannot be read.
+        // In AllocateNamespace: the providers' folder or a vendor's folder is unreadable.
         kDirectoryNotOpened = 11,
         // A program failed to run, or ran out of time. In TOSSpecific::SpawnProcess, and so in AllocateNamespace.
         kProcessFailed = 12,

@@ -47,7 +47,7 @@ class TXmlParser
 
   protected:
     // The parser's own steps, in the host's slot order. Derived classes leave them alone.
-    // In the reference host: they do nothing.
+    // In the reference host: they return at once.
     virtual void ParseJSSP();
     virtual void ParseCharData();
     virtual void GetAttributeNValue();

@@ -5,8 +5,8 @@
 
 namespace NKOLVRX20 {
 
-// All families are caught: the client library's exceptions do not derive from std::exception, and one that got through
-// would end a host that passed an invalid path.
+// All families are caught: the client library's exceptions are a family apart from std::exception, and one that got
+// through would end a host that passed an invalid path.
 Pegasus::CIMParamValue MethodInput(const char* operation, const std::string& method, const std::string& name,
                                    const boost::function<Pegasus::CIMValue()>& convert)
 {

@@ -11,13 +11,12 @@
 namespace NKOLVRX20 {
 
 // Returns: an input parameter with the value that the conversion makes.
-// Throws: TVRXException 14, after a log line with the operation, the method and the parameter, when it does not
+// Throws: TVRXException 14, after a log line with the operation, the method and the parameter, when it fails to
 // convert.
 Pegasus::CIMParamValue MethodInput(const char* operation, const std::string& method, const std::string& name,
                                    const boost::function<Pegasus::CIMValue()>& convert);
 
-// Returns: the value that came back from a method, by its own type; null for null and for what the host has no type
-// for.
+// Returns: the value that came back from a method, by its own type; null for null and for a type that the host lacks.
 // Throws: as pegValToVRX.
 TCIMValue MethodValueToHost(const std::string& name, const Pegasus::CIMValue& value,
                             const boost::shared_ptr<ICIMClass>& forClass);

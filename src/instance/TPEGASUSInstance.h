@@ -21,14 +21,14 @@ class TPEGASUSInstance : public TInmemInstance
 
     // Enters the instance in its class. Throws: boost::bad_weak_ptr when no shared pointer owns it.
     void AddToNamespace(TCIMContext context) override;
-    // Returns: the server namespace; empty unless an enumeration of the class made the instance.
+    // Returns: the server namespace of the enumeration that made the instance; empty for any other instance.
     std::string GetPegasusNSPStr() const override;
     // Calls the method on the server. Every parameter whose declaration has the qualifier "OUT" travels as a reference
     // made of its text, and once more when it has "IN". Outputs replace entries of the same name.
     // Returns: null also when the server refuses the call, which the log says.
-    // Throws, after a log line: TVRXException 6 when the class declares no such method or the method no such parameter,
-    // 14 when a parameter's text is not an object path; nothing is sent then.
-    // Throws: Pegasus::Exception when the method's name is not a CIM name, or an output does not convert;
+    // Throws, after a log line and before anything is sent: TVRXException 6 for an undeclared method or parameter, 14
+    // when a parameter's text is a malformed object path.
+    // Throws: Pegasus::Exception when the method's name is an invalid CIM name, or an output fails to convert;
     // boost::bad_weak_ptr when the namespace is gone.
     // Blocks: up to 300 seconds.
     TCIMValue InvokeMethod(const std::string& name, TCIMContext& parameters, TCIMContext context) override;

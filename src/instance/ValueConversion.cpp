@@ -16,7 +16,7 @@ using TType = TCIMValue::TCIMType;
 constexpr unsigned char kDecimal = 10; // the radix of ToString
 
 // One element of a host value from one of the client library's, one function for each type whose host type differs.
-// The library's 64-bit integers are long long, for which TCIMValue has no constructor; long has the same 64 bits.
+// The library's 64-bit integers are long long, which TCIMValue lacks a constructor for; long has the same 64 bits.
 TCIMValue ToHost(Pegasus::Uint64 element)
 {
     return TCIMValue(static_cast<unsigned long>(element));
@@ -94,7 +94,7 @@ void ScalarFromPegasus(const Pegasus::CIMValue& value, Pegasus::CIMType type, TC
 {
     switch (type) {
     case Pegasus::CIMTYPE_BOOLEAN:
-        // By comparison: a value of another type is false and does not throw, unlike in all other cases.
+        // By comparison: a value of another type counts as false; in all other cases it throws.
         out = TCIMValue(value == Pegasus::CIMValue(true));
         break;
     case Pegasus::CIMTYPE_UINT8:

@@ -1,7 +1,7 @@
 // Values between the CIM client library and the host: the only place where the two meet.
 //
-// None of these functions catches or logs anything. Pegasus::TypeMismatchException (the declared type is not the
-// value's) and TVRXException 14 (a host value that does not convert) leave them, with the output as it was.
+// Failures leave these functions as exceptions, unlogged, with the output as it was: Pegasus::TypeMismatchException
+// (the declared type differs from the value's) and TVRXException 14 (a host value that fails to convert).
 #pragma once
 
 #include <Pegasus/Client/CIMClient.h>
@@ -16,12 +16,12 @@ namespace NKOLVRX20 {
 // Converts a server's value by its declared type. A char16 arrives as its code; the elements of a string array arrive
 // as the client library's stream operator writes them; a reference arrives as its whole path text, bound to the
 // namespace of the class. Objects, instances and arrays of references leave the output as it was.
-// Requires: a value that is not null; the class only for references.
+// Requires: a non-null value; the class only for references.
 void pegValToVRX(std::string name, Pegasus::CIMValue value, Pegasus::CIMType type, bool isArray, TCIMValue& out,
                  boost::shared_ptr<ICIMClass> forClass);
 
 // Converts a host's value for a method call. Elements of 16-bit integer arrays keep only their low byte and travel as
-// 8-bit arrays. A value without type and an array of references leave the output as it was.
+// 8-bit arrays. An untyped value and an array of references leave the output as it was.
 void vrxValToPeg(const TCIMValue& in, Pegasus::CIMValue& out);
 
 // Sets an array of TPeg from elements that are read as THost; the last two arguments only choose the types.
@@ -35,7 +35,7 @@ template <typename THost, typename TPeg> void vrxArrayToPeg(const TCIMValue& in,
     out.set(elements);
 }
 
-// Returns: the host's code; 0 for a scalar and 16 for an array of a type that the host does not have.
+// Returns: the host's code; 0 for a scalar and 16 for an array of a type that the host lacks.
 TCIMValue::TCIMType pegTypeToVRXType(Pegasus::CIMType type, bool isArray);
 
 } // namespace NKOLVRX20

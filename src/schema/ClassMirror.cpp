@@ -28,7 +28,7 @@ template <typename TElement> std::string NameOf(const TElement& element)
     return ToStdString(element.getName().getString());
 }
 
-// Runs the step for one element of the class, so that its failure costs no other.
+// Runs the step for one element of the class, so that its failure costs that element alone.
 template <typename TStep> void Guarded(const char* failureText, const std::string& name, TStep step)
 {
     try {
@@ -118,7 +118,7 @@ boost::shared_ptr<ICIMQualifierDecl> TClassMirror::FetchDeclaration(const Pegasu
     }
 }
 
-// A type that the host has no code for, an embedded object, is declared as text. Such a property is served that way,
+// A type that the host lacks a code for, an embedded object, is declared as text. Such a property is served that way,
 // and many DMTF classes have one: the line is progress.
 TType TClassMirror::PropertyType(const Pegasus::CIMConstProperty& source, const std::string& name) const
 {
@@ -136,7 +136,8 @@ void TClassMirror::MirrorProperty(const Pegasus::CIMConstProperty& source, const
     const TType type = PropertyType(source, name);
     const auto declaration = fTarget.AllocatePropertyDecl(name, TCIMValue(type, 0), {});
     const TCIMValue defaultValue = ValueOf(source, name);
-    // Without a default the typed null stays. The host has none for arrays, and an empty array would be a value.
+    // A scalar that lacks a default keeps the typed null. An array's default is always set: the empty array that the
+    // declaration starts with would be a value.
     if (type.IsArray() || !defaultValue.IsNull()) {
         declaration->SetDefaultValue(defaultValue, {});
     }

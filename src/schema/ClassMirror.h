@@ -22,7 +22,7 @@ class TClassMirror
   public:
     explicit TClassMirror(TPEGASUSClass& target);
 
-    // Throws: Pegasus::UninitializedObjectException when the source holds no class.
+    // Throws: Pegasus::UninitializedObjectException when the source is uninitialized.
     // Blocks: up to the client's timeout for each qualifier that is new.
     void Mirror(const Pegasus::CIMClass& source);
 

@@ -7,8 +7,8 @@ namespace NKOLVRX20 {
 
 namespace {
 
-// The words arrive in upper case from CIMFlavor and CIMScope, whatever the MOF had. A word that the host has no bit for
-// is skipped, so that a server of a later version can still be read.
+// The words arrive in upper case from CIMFlavor and CIMScope, whatever the MOF had. A word that the host lacks a bit
+// for is skipped, so that a server of a later version can still be read.
 template <typename TBits> TBits BitsFromText(const std::string& text, const std::map<std::string, TBits>& words)
 {
     TBits bits = TBits(0);

@@ -21,7 +21,7 @@ constexpr char kInstanceIdName[] = "InstanceID";
 constexpr char kSlotClass[] = "OMC_ProcessorSlot";
 constexpr char kSlotNumber[] = "Number";
 
-// Returns: the text after the first character of the first match; nothing without a match.
+// Returns: the text after the first character of the first match; nullopt when the text lacks it.
 std::optional<std::string> TextAfter(const std::string& text, const std::string& wanted)
 {
     const auto match = text.find(wanted);
@@ -30,7 +30,7 @@ std::optional<std::string> TextAfter(const std::string& text, const std::string&
 
 // Reads the class that a key reference names out of the path of the instance that holds it:
 // Holder.Property="ns:Class.Key=...".
-// Returns: nothing when the path has another shape.
+// Returns: nullopt when the path has another shape.
 std::optional<std::string> ReferencedClassName(const std::string& path, const std::string& property)
 {
     const auto fromProperty = TextAfter(path, property);
@@ -62,7 +62,7 @@ class TPropertyTransfer
     {
     }
 
-    // Returns: the name as the log gives it; the server's spelling where that is not a valid name.
+    // Returns: the name as the log gives it: normalised, or in the server's spelling where that is an invalid name.
     const std::string& Name() const { return fName.empty() ? fServerName : fName; }
 
     void To(TPEGASUSInstance& target)

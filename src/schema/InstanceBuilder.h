@@ -11,9 +11,9 @@ namespace NKOLVRX20 {
 class TPEGASUSClass;
 class TPEGASUSInstance;
 
-// Makes the host's instance of a class from the server's. A property that does not convert is left out and logged
+// Makes the host's instance of a class from the server's. A property that fails to convert is left out and logged
 // under the name of the operation that asked.
-// Throws: boost::bad_weak_ptr when the namespace is gone; Pegasus::Exception for an instance that cannot be read.
+// Throws: boost::bad_weak_ptr when the namespace is gone; Pegasus::Exception for an unreadable instance.
 // Blocks: for each reference property to a class that is new to the namespace, as long as its GetClass.
 boost::shared_ptr<TPEGASUSInstance> BuildInstance(TPEGASUSClass& instanceClass, const Pegasus::CIMInstance& source,
                                                   const std::string& operation);

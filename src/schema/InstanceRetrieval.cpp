@@ -2,8 +2,8 @@
 
 #include "src/common/CoreLog.h"
 #include "src/instance/TPEGASUSInstance.h"
-// Upwards, on purpose: a class holds its provider by the provider's own type, and asks on the provider's client. No
-// other source of this folder includes it.
+// Upwards, on purpose: a class holds its provider by the provider's own type, and asks on the provider's client. This
+// is the one source of the folder that includes it.
 #include "src/provider/TPEGASUSProvider.h"
 #include "src/schema/InstanceBuilder.h"
 #include "src/schema/TPEGASUSClass.h"
@@ -60,8 +60,8 @@ TInstanceRetrieval::TInstanceRetrieval(TPEGASUSClass& instanceClass, const char*
 {
 }
 
-// The provider's own client, unless the class has none. The namespace is asked first in either case: without its
-// connection nothing is served, whatever a provider still holds.
+// The client of the class's provider, else the namespace's. The namespace is asked first in either case: while it is
+// unconnected the request fails, even when a provider still holds a client.
 Pegasus::CIMClient& TInstanceRetrieval::Client(unsigned int timeoutMs) const
 {
     Pegasus::CIMClient& ofNamespace = fClass.GetOwningNamespace().ConnectedClient();
@@ -110,14 +110,14 @@ std::optional<TInstanceRetrieval::TAnswer> TInstanceRetrieval::AskProvider(bool 
     });
 }
 
-// Local-only, without qualifiers and class origins: the mirrored class has the declarations already.
+// Local-only; qualifiers and class origins are left out: the mirrored class has the declarations already.
 TInstanceRetrieval::TAnswer TInstanceRetrieval::Enumerate(Pegasus::CIMClient& client,
                                                           const Pegasus::CIMNamespaceName& ns, bool deep) const
 {
     return client.enumerateInstances(ns, Pegasus::CIMName(fClassName.c_str()), deep, true, false, false);
 }
 
-// Asked before the instances: a class that was not compiled into the provider's namespace gets a log line of its own.
+// Asked before the instances: a class that is missing from the provider's namespace gets a log line of its own.
 bool TInstanceRetrieval::ServerHasClass(Pegasus::CIMClient& client, const Pegasus::CIMNamespaceName& ns) const
 {
     try {
@@ -130,7 +130,7 @@ bool TInstanceRetrieval::ServerHasClass(Pegasus::CIMClient& client, const Pegasu
     }
 }
 
-// Runs a step for one instance, so that its failure costs no other.
+// Runs a step for one instance, so that its failure costs that instance alone.
 template <typename TStep> void TInstanceRetrieval::Guarded(Pegasus::Uint32 index, TStep step) const
 {
     try {
@@ -150,7 +150,7 @@ boost::shared_ptr<TPEGASUSInstance> TInstanceRetrieval::Build(const TAnswer& ans
     return built;
 }
 
-// Byte for byte: the host returns a path that an enumeration gave it. Keys in another order do not match.
+// Byte for byte: the host returns a path that an enumeration gave it. Keys in another order make another path.
 boost::shared_ptr<TPEGASUSInstance> TInstanceRetrieval::Find(const TAnswer& answer,
                                                              const TCIMReference& reference) const
 {

@@ -24,7 +24,7 @@ class TInstanceRetrieval
     // The operation is the function's name, as the log has it.
     TInstanceRetrieval(TPEGASUSClass& instanceClass, const char* operation);
 
-    // Each of these returns the server's answer, or nothing after a failure, which is logged.
+    // Each of these returns the server's answer; nullopt after a failure, which is logged.
     // Blocks: up to the timeout for each request.
 
     // Asks in the class's own server namespace.
@@ -32,10 +32,10 @@ class TInstanceRetrieval
     // Asks in the provider's namespace, after the server has confirmed the class: two requests.
     std::optional<TAnswer> AskProvider(bool deep, unsigned int timeoutMs) const;
 
-    // Each of these returns null after a failure, which is logged and costs no other instance.
+    // Each of these returns null after a failure, which is logged and costs the one instance alone.
 
     boost::shared_ptr<TPEGASUSInstance> Build(const TAnswer& answer, Pegasus::Uint32 index) const;
-    // Returns: the first instance whose path is the reference's to the letter; null also when none matches.
+    // Returns: the first instance whose path is the reference's to the letter; null also when every path differs.
     boost::shared_ptr<TPEGASUSInstance> Find(const TAnswer& answer, const TCIMReference& reference) const;
 
     void LogCallingNamespace() const;

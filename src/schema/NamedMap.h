@@ -9,14 +9,14 @@
 
 namespace NKOLVRX20 {
 
-// Named elements of one owner, found without regard to case and visited in byte order of their normalised names.
-// Every operation that takes a name throws TVRXException 25 for one that is not a CIM name.
+// Named elements of one owner, found by name, case ignored, and visited in byte order of their normalised names.
+// Every operation that takes a name throws TVRXException 25 for an invalid CIM name.
 template <typename TElement> class TNamedMap
 {
   public:
     using TPointer = boost::shared_ptr<TElement>;
 
-    // Returns: null when there is none of that name.
+    // Returns: null when the name is absent.
     TPointer Find(const std::string& name) const
     {
         const auto entry = fElements.find(NormalizedName(name));

@@ -1,7 +1,7 @@
 #include "src/schema/OwningNamespace.h"
 
-// Upwards, on purpose: a class holds its namespace by the namespace's own type. No other source of this folder
-// includes it.
+// Upwards, on purpose: a class holds its namespace by the namespace's own type. This is the one source of the
+// folder that includes it.
 #include "src/namespace/TPEGASUSNamespace.h"
 
 namespace NKOLVRX20 {

@@ -40,7 +40,7 @@ class TOwningNamespace
     boost::shared_ptr<ICIMQualifierDecl> AllocateQualifierDecl(const std::string& name, const TCIMValue& defaultValue,
                                                                ICIMQualifierDecl::EScope scope,
                                                                ICIMQualifierDecl::EFlavor flavor) const;
-    // Returns: the namespace's own declaration; null when it has none. Throws: TVRXException 25.
+    // Returns: the namespace's own declaration; null when absent. Throws: TVRXException 25.
     boost::shared_ptr<TPEGASUSQualifierDecl> FindQualifierDecl(const std::string& name) const;
     // Throws: TVRXException 16, 25.
     void AddQualifierDecl(const boost::shared_ptr<TPEGASUSQualifierDecl>& declaration) const;

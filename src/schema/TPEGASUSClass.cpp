@@ -7,7 +7,7 @@
 namespace NKOLVRX20 {
 
 // Initialize links the superclass, and enters this class among its children once the server has given the class. A
-// class that the server refuses leaves no trace in the tree.
+// class that the server refuses stays out of the tree.
 TPEGASUSClass::TPEGASUSClass(const boost::shared_ptr<TPEGASUSNamespace>& ns, std::string name,
                              const boost::shared_ptr<TPEGASUSClass>&)
     : fNamespace(ns), fName(std::move(name))
@@ -59,7 +59,7 @@ bool TPEGASUSClass::operator<(const ICIMClass& other) const
     return fName < other.GetName({});
 }
 
-// What the server says of a class is not for a host to overwrite.
+// The server alone defines a class: an assignment by the host is ignored.
 ICIMClass& TPEGASUSClass::operator=(const ICIMClass&)
 {
     return *this;
@@ -72,7 +72,7 @@ bool TPEGASUSClass::hasCollected() const
 
 void TPEGASUSClass::SetCollected() {}
 
-// The links to the namespace and the superclass are weak and keep nothing alive.
+// The links to the namespace and the superclass are weak and may stay.
 void TPEGASUSClass::ReleaseLinks()
 {
     fProvider.reset();

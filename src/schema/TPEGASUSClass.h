@@ -25,7 +25,7 @@ class TPEGASUSProvider;
 // The host's image of one class of the server. Declarations are read once, when the namespace makes the class;
 // instances are fetched from the server at every call.
 //
-// Names are looked up without regard to case; an invalid name throws TVRXException 25.
+// Names are looked up ignoring case; an invalid name throws TVRXException 25.
 // Ownership: always held by boost::shared_ptr. Owns its declarations and children, shares its provider; points to its
 // namespace and superclass weakly. What needs the namespace throws boost::bad_weak_ptr when it is gone.
 // Thread: one at a time.
@@ -41,16 +41,16 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     TPEGASUSClass& operator=(const TPEGASUSClass&) = delete;
 
     // Reads the class's declarations from the server and takes its place below the superclass; the root class "<root>"
-    // only takes its settings. An element that cannot be mirrored is logged and left out.
+    // only takes its settings. An element that fails to be mirrored is logged and left out.
     // Requires: a timeout in decimal seconds. The superclass may be null.
-    // Throws: TVRXException 42, after a log line, when the server does not give the class.
+    // Throws: TVRXException 42, after a log line, when the request for the class fails.
     // Blocks: up to 5 seconds for the class, and again for each qualifier that is new to the namespace.
     void Initialize(const std::string& cimNamespace, const std::string& timeout,
                     const boost::shared_ptr<TPEGASUSClass>& superClass);
 
     // --- ICIMClass, in slot order ---
 
-    // Does nothing.
+    // Returns at once.
     void Validate(TCIMContext context) override;
     void AddToNamespace(TCIMContext context) override;
     // Throws: TVRXException 31, always; so does ModifyClass.
@@ -64,15 +64,16 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     bool IsAbstract(TCIMContext context) const override;
     // Returns: true for the connected namespace's root class alone.
     bool IsRootClass(TCIMContext context) const override;
-    // Asks the server at every call, then the namespace's cache, for a class of this one's own server namespace unless
-    // the context's "nsp" names another. Returns: null also for the root class, and when the namespace is not
-    // connected. Throws: TVRXException 42, after a log line, when the server does not answer; what GetClass throws.
+    // Asks the server at every call, then the namespace's cache, for a class of the server namespace that the
+    // context's "nsp" names, by default this one's own. Returns: null also for the root class, and while the namespace
+    // is unconnected. Throws: TVRXException 42, after a log line, when the server fails to answer; what GetClass
+    // throws.
     boost::shared_ptr<ICIMClass> GetSuperClass(TCIMContext context) const override;
     // A visitor's std::exception is logged and costs only its own child. Returning false ends the whole walk.
     void EnumerateSubClasses(TClassVisitor visitor, bool deep, TCIMContext context) const override;
     // Compares names, case included. The root class counts as a superclass of itself only.
     bool IsSubclassOf(boost::shared_ptr<const ICIMClass> other, TCIMContext context) const override;
-    // Visit nothing.
+    // Return at once: the visitor stays uncalled.
     void EnumerateAssociatedClasses(TClassVisitor visitor, const std::string& associationClass,
                                     const std::string& resultClass, const std::string& role,
                                     const std::string& resultRole, TCIMContext context) override;
@@ -82,7 +83,7 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     void EnumerateKeyNames(TKeyNameVisitor visitor, TCIMContext context) const override;
     boost::shared_ptr<ICIMPropertyDecl> AllocatePropertyDecl(const std::string& name, TCIMValue value,
                                                              TCIMContext context) override;
-    // Returns: null for exactly "DateTimeOfCollection" when it is not declared. Throws: TVRXException 15 for others.
+    // Returns: null for exactly "DateTimeOfCollection" when it is undeclared. Throws: TVRXException 15 for others.
     boost::shared_ptr<ICIMPropertyDecl> GetPropertyDecl(const std::string& name, TCIMContext context) const override;
     void EnumeratePropertyDecls(TPropertyDeclVisitor visitor, TCIMContext context) const override;
     // The properties of the class itself are those that have a default value. Throws: TVRXException 15.
@@ -90,47 +91,47 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     // Throws: TVRXException 31, always.
     void SetPropertyValue(const std::string& name, TCIMValue value, TCIMContext context) override;
     void EnumerateStaticProperties(TPropertyVisitor visitor, TCIMContext context) const override;
-    // Returns: a new TPEGASUSInstance, not entered anywhere.
+    // Returns: a new TPEGASUSInstance; its AddToNamespace enters it.
     boost::shared_ptr<ICIMInstance> AllocateInstance(TCIMContext context) override;
     // Fetches the instances from the server and visits them in its order until the visitor returns false. Failures
-    // are logged and leave fewer instances, or none; only the visitor's own exceptions leave.
+    // are logged and cost the instances concerned, possibly all; only the visitor's own exceptions leave.
     // Blocks: up to the class's timeout, twice; longer for classes that are known to be slow (see the source).
     void EnumerateInstances(TInstanceVisitor visitor, bool deep, TCIMContext context) override;
     boost::shared_ptr<ICIMMethodDecl> AllocateMethodDecl(const std::string& name, TCIMValue::TCIMType returnType,
                                                          TCIMContext context) override;
-    // Returns: null when there is none.
+    // Returns: null when absent.
     boost::shared_ptr<ICIMMethodDecl> GetMethodDecl(const std::string& name, TCIMContext context) const override;
     void EnumerateMethodDecls(TMethodDeclVisitor visitor, TCIMContext context) const override;
-    // Returns: null, always; nothing is called without a target.
+    // Returns: null, always; a call needs a target.
     TCIMValue InvokeMethod(const std::string& name, TCIMContext& parameters, TCIMContext context) override;
     // By name, case included.
     bool operator==(const ICIMClass& other) const override;
     bool operator<(const ICIMClass& other) const override;
-    // Copies nothing.
+    // Leaves this class as it is.
     ICIMClass& operator=(const ICIMClass& other) override;
 
     // Returns: false, always.
     bool hasCollected() const override;
-    // Does nothing.
+    // Returns at once.
     void SetCollected() override;
 
-    // Does nothing when a child of that name is there. Throws: TVRXException 14, after a log line, for null.
+    // Ignores a child whose name is there already. Throws: TVRXException 14, after a log line, for null.
     void AddChildClass(boost::shared_ptr<ICIMClass> child) override;
-    void RemoveChildClass(boost::shared_ptr<ICIMClass> child) override; // does nothing
+    void RemoveChildClass(boost::shared_ptr<ICIMClass> child) override; // returns at once
     // While an instance of another class is here, that class's instances are cleared with this one's.
     // Throws: TVRXException 14, after a log line, for null.
     void AddInstance(boost::shared_ptr<ICIMInstance> instance) override;
     void RemoveInstance(boost::shared_ptr<ICIMInstance> instance) override;
-    void AddAssociationClass(boost::shared_ptr<ICIMClass> association) override;    // does nothing
-    void RemoveAssociationClass(boost::shared_ptr<ICIMClass> association) override; // does nothing
+    void AddAssociationClass(boost::shared_ptr<ICIMClass> association) override;    // returns at once
+    void RemoveAssociationClass(boost::shared_ptr<ICIMClass> association) override; // returns at once
     // Replaces what is there only when the declaration has the qualifier "OVERRIDE" and the same type, and the other
     // belongs to another class; or when its name contains "PortType".
     // Throws, after a log line: TVRXException 22 (a reference outside of an association), 14 (another type, or
-    // no declaration of this plug-in), 16 (is there already).
+    // a declaration from elsewhere), 16 (is there already).
     void AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declaration) override;
-    void RemovePropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declaration) override; // does nothing
-    void AddMethodDecl(boost::shared_ptr<ICIMMethodDecl> declaration) override;        // does nothing
-    void RemoveMethodDecl(boost::shared_ptr<ICIMMethodDecl> declaration) override;     // does nothing
+    void RemovePropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declaration) override; // returns at once
+    void AddMethodDecl(boost::shared_ptr<ICIMMethodDecl> declaration) override;        // returns at once
+    void RemoveMethodDecl(boost::shared_ptr<ICIMMethodDecl> declaration) override;     // returns at once
 
     using TQualifiedElement<TPEGASUSClass, ICIMClass>::GetQualifier;
     // Throws: TVRXException 1, always.
@@ -138,8 +139,8 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
                                                   TCIMContext context) const override;
 
     // Parameters travel by their own types, whatever their declarations say; outputs replace entries of their names.
-    // Throws: what the client throws, Pegasus::Exception; TVRXException 14, after a log line, for an input that does
-    // not convert, and nothing is sent then.
+    // Throws: what the client throws, Pegasus::Exception; TVRXException 14, after a log line and before anything is
+    // sent, for an input that fails to convert.
     // Blocks: up to the timeout that the namespace's client was given last.
     TCIMValue InvokeMethod(const TCIMReference& target, const std::string& name, const TCIMContext& inputs,
                            TCIMContext& outputs, TCIMContext context) override;
@@ -149,7 +150,7 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     // --- single instances ---
 
     // Fetches the class's instances and looks for one whose path is the reference's to the letter.
-    // Returns: null when there is none, and after a failure, which is logged.
+    // Returns: null when absent, and after a failure, which is logged.
     // Blocks: up to the class's timeout.
     boost::shared_ptr<ICIMInstance> GetInstance(const TCIMReference& reference, TCIMContext context);
     // The same in the provider's namespace; the context's "nsp" is only logged. Blocks: up to twice the timeout.
@@ -160,7 +161,7 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     const TOwningNamespace& GetOwningNamespace() const { return fNamespace; }
     const Pegasus::CIMNamespaceName& GetPegasusNSP() const { return fPegasusNsp; }
     const std::string& GetPegasusNSPStr() const { return fPegasusNspText; }
-    // The provider that serves the class; null when none was bound to it.
+    // The provider that serves the class; null for an unbound class.
     boost::shared_ptr<TPEGASUSProvider> GetProvider() const { return fProvider; }
     void SetProvider(boost::shared_ptr<TPEGASUSProvider> provider) { fProvider = provider; }
     // The tag of the requested entry ("CDM"); empty at first.
@@ -173,7 +174,7 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     void LeaveSuperClass();
     // Takes over the children of the class that this one replaces in the namespace, and its place below the superclass.
     void TakePlaceOf(TPEGASUSClass& replaced);
-    // Releases provider, children and instances, so that a circle of pointers does not keep itself alive.
+    // Releases provider, children and instances, which breaks circles of owning pointers.
     void ReleaseLinks();
 
     // --- for initialisation ---

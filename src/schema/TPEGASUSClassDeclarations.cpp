@@ -20,7 +20,7 @@ constexpr char kKeyQualifier[] = "KEY";
 
 } // namespace
 
-// A declaration that is not a key counts as visited, so that the walk goes on.
+// A declaration other than a key counts as visited, so that the walk goes on.
 void TPEGASUSClass::EnumerateKeyNames(TKeyNameVisitor visitor, TCIMContext context) const
 {
     fPropertyDecls.Visit([&](const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration) {
@@ -110,7 +110,8 @@ void TPEGASUSClass::AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declarat
     }
 }
 
-// Without a declaration to override the new one is logged and added all the same: vendors' MOF has such classes.
+// When the declaration to override is missing, the new one is logged and added all the same: vendors' MOF has such
+// classes.
 void TPEGASUSClass::OverridePropertyDecl(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing,
                                          const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration)
 {

@@ -13,7 +13,7 @@ namespace {
 constexpr int kDecimal = 10; // the radix of strtol
 constexpr unsigned long kMsPerSecond = 1000;
 
-// Wraps at 32 bits; a text without a number gives 0.
+// Wraps at 32 bits; a text that lacks a leading number gives 0.
 unsigned int MillisecondsFromText(const std::string& seconds)
 {
     const auto number = static_cast<unsigned long>(std::strtol(seconds.c_str(), nullptr, kDecimal));
@@ -42,7 +42,7 @@ void TPEGASUSClass::Initialize(const std::string& cimNamespace, const std::strin
                    "\tdetail: ", ToStdString(exception.getMessage()));
         throw TVRXException(TVRXStatusCode::kServerConnectionFailed);
     }
-    // Last, so that a class that cannot be had does not stay among its superclass's children.
+    // Last, so that only a class that was read joins its superclass's children.
     if (superClass) {
         superClass->AddChildClass(shared_from_this());
     }

@@ -37,7 +37,7 @@ TCIMValue::TCIMType TPEGASUSMethodDecl::GetReturnType(TCIMContext) const
     return fReturnType;
 }
 
-// Not entered yet: the parameter gets its qualifiers first, and TPEGASUSParameterDecl::AddToMethod enters it.
+// The parameter gets its qualifiers first; TPEGASUSParameterDecl::AddToMethod then enters it.
 boost::shared_ptr<ICIMParameterDecl> TPEGASUSMethodDecl::AllocateParameterDecl(const std::string& name,
                                                                                TCIMValue::TCIMType type, TCIMContext)
 {

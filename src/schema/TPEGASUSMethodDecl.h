@@ -24,7 +24,7 @@ class TPEGASUSMethodDecl : public TQualifiedElement<TPEGASUSMethodDecl, ICIMMeth
     TPEGASUSMethodDecl(const TPEGASUSMethodDecl&) = delete;
     TPEGASUSMethodDecl& operator=(const TPEGASUSMethodDecl&) = delete;
 
-    // Does nothing.
+    // Returns at once.
     void Validate(TCIMContext context) override;
     // Throws: boost::bad_weak_ptr when the class is gone.
     void AddToClass(TCIMContext context) override;
@@ -41,7 +41,7 @@ class TPEGASUSMethodDecl : public TQualifiedElement<TPEGASUSMethodDecl, ICIMMeth
     // By name, case included.
     bool operator==(const ICIMMethodDecl& other) const override;
     bool operator<(const ICIMMethodDecl& other) const override;
-    // Copies nothing.
+    // Leaves this declaration as it is.
     ICIMMethodDecl& operator=(const ICIMMethodDecl& other) override;
 
     // Takes the place of a parameter of the same name. Throws: TVRXException 25.

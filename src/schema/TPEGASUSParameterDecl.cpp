@@ -14,7 +14,7 @@ TPEGASUSParameterDecl::TPEGASUSParameterDecl(const boost::shared_ptr<TPEGASUSMet
 
 void TPEGASUSParameterDecl::Validate(TCIMContext) {}
 
-// The method owns its parameters and a parameter points back weakly, so that the two do not keep each other alive. A
+// The method owns its parameters and a parameter points back weakly, which avoids a circle of owning pointers. A
 // host may hold a parameter for longer than its method: adding it throws then, and GetMethodDecl returns null.
 void TPEGASUSParameterDecl::AddToMethod(TCIMContext)
 {

@@ -23,7 +23,7 @@ class TPEGASUSParameterDecl : public TQualifiedElement<TPEGASUSParameterDecl, IC
     TPEGASUSParameterDecl(const TPEGASUSParameterDecl&) = delete;
     TPEGASUSParameterDecl& operator=(const TPEGASUSParameterDecl&) = delete;
 
-    // Does nothing.
+    // Returns at once.
     void Validate(TCIMContext context) override;
     // Throws: boost::bad_weak_ptr when the method is gone; TVRXException 25.
     void AddToMethod(TCIMContext context) override;
@@ -35,7 +35,7 @@ class TPEGASUSParameterDecl : public TQualifiedElement<TPEGASUSParameterDecl, IC
     // By name, case included.
     bool operator==(const ICIMParameterDecl& other) const override;
     bool operator<(const ICIMParameterDecl& other) const override;
-    // Copies nothing.
+    // Leaves this declaration as it is.
     ICIMParameterDecl& operator=(const ICIMParameterDecl& other) override;
 
   private:

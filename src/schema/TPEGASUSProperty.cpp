@@ -71,7 +71,7 @@ ICIMProperty& TPEGASUSProperty::operator=(const ICIMProperty& other)
     return *this;
 }
 
-// The previous value belongs to the host, which compares two inventories with it; nothing here sets it.
+// The previous value belongs to the host, which alone sets it and compares two inventories with it.
 TCIMValue TPEGASUSProperty::GetPrevValue() const
 {
     return fPrevValue;

@@ -17,13 +17,13 @@ class TPEGASUSClass;
 class TPEGASUSPropertyDecl : public TQualifiedElement<TPEGASUSPropertyDecl, ICIMPropertyDecl>
 {
   public:
-    // The default also gives the type: a typed null, or an empty array, where there is none.
+    // The default also gives the type: a typed null, or an empty array, when the default is absent.
     TPEGASUSPropertyDecl(const boost::shared_ptr<TPEGASUSClass>& owner, std::string name, TCIMValue defaultValue);
 
     TPEGASUSPropertyDecl(const TPEGASUSPropertyDecl&) = delete;
     TPEGASUSPropertyDecl& operator=(const TPEGASUSPropertyDecl&) = delete;
 
-    // Does nothing.
+    // Returns at once.
     void Validate(TCIMContext context) override;
     // Throws: boost::bad_weak_ptr when the class is gone; what the class's AddPropertyDecl throws.
     void AddToClass(TCIMContext context) override;
@@ -39,7 +39,7 @@ class TPEGASUSPropertyDecl : public TQualifiedElement<TPEGASUSPropertyDecl, ICIM
     // By name, case included.
     bool operator==(const ICIMPropertyDecl& other) const override;
     bool operator<(const ICIMPropertyDecl& other) const override;
-    // Copies nothing.
+    // Leaves this declaration as it is.
     ICIMPropertyDecl& operator=(const ICIMPropertyDecl& other) override;
 
   private:

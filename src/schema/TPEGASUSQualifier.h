@@ -23,7 +23,7 @@ class TPEGASUSQualifier : public ICIMQualifier, public boost::enable_shared_from
     TPEGASUSQualifier(const TPEGASUSQualifier&) = delete;
     TPEGASUSQualifier& operator=(const TPEGASUSQualifier&) = delete;
 
-    // Does nothing.
+    // Returns at once.
     void Validate(TCIMContext context) override;
     // Throws: boost::bad_weak_ptr when the element is gone; TVRXException 25.
     void AddToClassOrProperty(TCIMContext context) override;

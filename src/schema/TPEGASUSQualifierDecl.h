@@ -16,14 +16,14 @@ namespace NKOLVRX20 {
 class TPEGASUSQualifierDecl : public ICIMQualifierDecl, public boost::enable_shared_from_this<TPEGASUSQualifierDecl>
 {
   public:
-    // The default also gives the type: a typed null, or an empty array, where there is none.
+    // The default also gives the type: a typed null, or an empty array, when the default is absent.
     TPEGASUSQualifierDecl(const boost::shared_ptr<TPEGASUSNamespace>& ns, std::string name, TCIMValue defaultValue,
                           EScope scope, EFlavor flavor);
 
     TPEGASUSQualifierDecl(const TPEGASUSQualifierDecl&) = delete;
     TPEGASUSQualifierDecl& operator=(const TPEGASUSQualifierDecl&) = delete;
 
-    // Does nothing.
+    // Returns at once.
     void Validate(TCIMContext context) override;
     // Throws: boost::bad_weak_ptr when the namespace is gone; TVRXException 16, 25.
     void AddToNamespace(TCIMContext context) override;
@@ -43,7 +43,7 @@ class TPEGASUSQualifierDecl : public ICIMQualifierDecl, public boost::enable_sha
     // By name, case included.
     bool operator==(const ICIMQualifierDecl& other) const override;
     bool operator<(const ICIMQualifierDecl& other) const override;
-    // Copies nothing.
+    // Leaves this declaration as it is.
     ICIMQualifierDecl& operator=(const ICIMQualifierDecl& other) override;
 
   private:

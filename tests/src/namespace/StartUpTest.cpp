@@ -1,4 +1,4 @@
-// Start-up without a server that answers: context, refusals, attempts, vendor preparation, and the whole life's traces.
+// Start-up with the server absent: context, refusals, attempts, vendor preparation, and the whole life's traces.
 #include "src/plugin/TPEGASUSNamespaceProvider.h"
 #include "tests/src/support/NamespaceRig.h"
 
@@ -21,7 +21,7 @@ using ::testing::IsEmpty;
 class StartUpTest : public ::testing::Test
 {
   protected:
-    // No bind is real, and nobody listens at the port that is chosen.
+    // Every bind is simulated, and the port that is chosen refuses connections.
     StartUpTest()
     {
         fRig.fWorld.fBindForReal = false;

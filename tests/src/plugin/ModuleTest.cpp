@@ -1,4 +1,4 @@
-// The library as a host loads it: what it exports, and what is left of it after unloading: nothing.
+// The library as a host loads it: what it exports, and that unloading removes all of it.
 #include "tests/src/support/CapturedLog.h"
 #include "tests/src/support/FakeCimServer.h"
 #include "tests/src/support/OutsideWorld.h"

@@ -1,4 +1,4 @@
-// What a provider says of itself, and what it does not serve.
+// What a provider says of itself, and which operations it refuses or ignores.
 #include "src/provider/TPEGASUSProvider.h"
 #include "tests/src/support/StatusOf.h"
 

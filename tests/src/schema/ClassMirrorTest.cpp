@@ -1,4 +1,4 @@
-// What a new class takes over from the server, what it asks for, and what it does without.
+// What a new class takes over from the server, what it asks for, and what it leaves out.
 #include "src/schema/DeclarationAttributes.h"
 #include "src/schema/TPEGASUSQualifierDecl.h"
 #include "tests/src/schema/ServedNamespace.h"

@@ -22,7 +22,7 @@ class TServedNamespace
   public:
     TServedNamespace();
 
-    // Returns: the class through the namespace; null when the server does not give it.
+    // Returns: the class through the namespace; null when the server refuses it.
     boost::shared_ptr<TPEGASUSClass> Class(const std::string& name, const std::string& timeout = "60");
     // Returns: a connected provider of "root/cimv2".
     boost::shared_ptr<TPEGASUSProvider> MakeProvider(const std::string& cimNamespace = kNsp) const;
@@ -43,7 +43,7 @@ class TServedNamespace
 // Returns: a boolean qualifier that is true, of the kind that Key is.
 Pegasus::CIMQualifier TrueQualifier(const char* name);
 Pegasus::CIMQualifier TextQualifier(const char* name, const char* text);
-// Returns: a property with the value and, if not null, a qualifier.
+// Returns: a property with the value, and with the qualifier if one is given.
 Pegasus::CIMProperty Property(const char* name, const Pegasus::CIMValue& value, const char* qualifier = nullptr);
 
 } // namespace NKOLVRX20

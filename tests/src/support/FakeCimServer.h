@@ -13,7 +13,7 @@ namespace NKOLVRX20 {
 // A CIM server on a loopback port that answers from a script. It has its port from the start, but refuses connections
 // until Listen.
 // A request is named by its operation and object: "GetClass CIM_Foo", "GetQualifier Key", "EnumerateInstances CIM_Foo".
-// What is not in the script is answered with CIM error 6.
+// A request that the script lacks is answered with CIM error 6.
 // Thread: safe.
 class TFakeCimServer
 {

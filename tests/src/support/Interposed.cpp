@@ -1,5 +1,5 @@
 // The functions that the test program puts in front of libc and of the host's process service. Each asks the current
-// TOutsideWorld, and forwards to the next definition when there is none or the call is not the plug-in's.
+// TOutsideWorld about the plug-in's calls; all others, and all while that object is absent, go to the next definition.
 #include "tests/src/support/OutsideWorld.h"
 
 #include <host/TOSSpecific.h>
@@ -44,7 +44,7 @@ std::FILE* OpenFile(const char* function, const char* path, const char* mode)
     return next(redirected->second.c_str(), mode);
 }
 
-// Returns: whether a thread with this start belongs to Boost, as the plug-in's do and the tests' own do not.
+// Returns: whether a thread with this start belongs to Boost, as those of the plug-in alone do.
 bool IsBoostThread(void* (*start)(void*))
 {
     Dl_info library = {};
@@ -53,7 +53,7 @@ bool IsBoostThread(void* (*start)(void*))
            std::string(library.dli_fname).find("boost_thread") != std::string::npos;
 }
 
-// Returns: whether the socket is one of the tests' own; the plug-in's probe sets no options.
+// Returns: whether the socket is one of the tests' own; the plug-in's probe keeps the default options.
 bool IsReusingAddresses(int descriptor)
 {
     int reuse = 0;

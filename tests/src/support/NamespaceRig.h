@@ -17,7 +17,7 @@
 namespace NKOLVRX20 {
 
 // What a namespace needs around it: a working directory R and a module path M of its own, a consumer of its own, the
-// captured log, and nothing that reaches the machine. One at a time.
+// captured log, and a TOutsideWorld between it and the machine. One at a time.
 class TNamespaceRig
 {
   public:
@@ -30,7 +30,7 @@ class TNamespaceRig
     TCIMContext Context() const;
     std::string StartFile() const;
     boost::shared_ptr<TPEGASUSNamespace> MakeNamespace() const;
-    // Returns: a namespace that knows its consumer but was never started.
+    // Returns: a namespace that knows its consumer, after start attempts that all failed.
     boost::shared_ptr<TPEGASUSNamespace> MakeNamespaceWithConsumer();
     // Returns: a namespace that is connected to the server, which listens from now on.
     boost::shared_ptr<TPEGASUSNamespace> MakeConnectedNamespace(TFakeCimServer& server);

@@ -19,8 +19,8 @@ struct TSpawnCall
 };
 
 // Stands, while it lives, between the plug-in and what it does to the machine: sleep, system, kill, bind, socket,
-// dladdr, new threads, some files, and the host's process service. Nothing sleeps, is removed, killed or run; it is
-// traced instead, in order, as "sleep 3", "system rm ...", "kill 12 9", "run cimserver -s".
+// dladdr, new threads, some files, and the host's process service. Every sleep, removal, kill and run is only
+// traced, in order, as "sleep 3", "system rm ...", "kill 12 9", "run cimserver -s".
 // The test program defines those functions itself; without an object of this class they forward to the real ones.
 // Thread: safe.
 class TOutsideWorld
@@ -33,7 +33,7 @@ class TOutsideWorld
     TOutsideWorld& operator=(const TOutsideWorld&) = delete;
 
     std::vector<std::string> Trace() const;
-    // Returns: the entries of one kind ("system"), without the kind.
+    // Returns: the entries of one kind ("system"), the kind cut off.
     std::vector<std::string> Traced(const std::string& kind) const;
     // Returns: the trace so far, which is then forgotten.
     std::vector<std::string> Take();
@@ -46,11 +46,11 @@ class TOutsideWorld
 
     // Called at every pause, before it "ends".
     std::function<void(unsigned int seconds)> fOnSleep;
-    // Gives a program's output, and may throw as the process service would; without it the output is empty.
+    // Gives a program's output, and may throw as the process service would; the default output is empty.
     std::function<void(const TSpawnCall&, std::string& output)> fRun;
-    // For fRun: hands a call without a program path to the host's own process service after all.
+    // For fRun: hands a call of the overload that searches PATH to the host's own process service after all.
     static void RunByPathForReal(const TSpawnCall& call, std::string& output);
-    // Decides about a port; without it every bind is real. Asked only for ports other than 0.
+    // Decides about a port; by default every bind is real. Asked only for ports other than 0.
     std::function<bool(unsigned short port)> fIsPortFree;
     bool fBindForReal = true; // false: a free port is only said to be bound
     bool fSocketFails = false;
@@ -59,7 +59,7 @@ class TOutsideWorld
     bool fKillFails = false;
     int fThreadsUntilFailure = -1; // -1: none fails
     std::string fUnreadableDirectory;
-    // Another file is opened instead; an empty name means that it cannot be opened.
+    // The file that is opened in place of the named one; an empty name makes the opening fail.
     std::map<std::string, std::string> fFiles;
 
     // --- for the interposed functions ---

@@ -4,7 +4,7 @@
 
 namespace NKOLVRX20 {
 
-// Returns: the status code that the call throws; 0 when it throws nothing.
+// Returns: the status code that the call throws; 0 when it returns.
 template <typename TCall> unsigned int StatusOf(TCall call)
 {
     try {

@@ -25,7 +25,7 @@ class TTempTree
     std::filesystem::path fPath;
 };
 
-// Returns: the file's bytes; empty when it cannot be read.
+// Returns: the file's bytes; empty for an unreadable file.
 std::string ReadWholeFile(const std::string& path);
 
 } // namespace NKOLVRX20
