@@ -202,6 +202,9 @@ std::size_t HttpAnswerReader::put(std::string_view bytes)
     std::size_t done = 0;
     while (done < bytes.size() && !isComplete()) {
         const std::string_view window = bytes.substr(done, fLimits.maxFramingBytes);
+        if (fParser->chunked() && mayBeCutLastChunk(window)) {
+            break;
+        }
         const std::size_t used = putSome(window);
         if (used == 0 && window.size() == fLimits.maxFramingBytes) {
             throwTooLarge("chunk framing", fLimits.maxFramingBytes);
@@ -258,6 +261,12 @@ bool HttpAnswerReader::keepsAlive() const
 const HttpAnswerFields& HttpAnswerReader::fields() const
 {
     return fParser->fields();
+}
+
+bool mayBeCutLastChunk(std::string_view bytes) noexcept
+{
+    constexpr std::size_t kShortestEndBytes = 5;
+    return bytes.size() < kShortestEndBytes && bytes.substr(0, 1) == "0";
 }
 
 } // namespace Pegasus::wire

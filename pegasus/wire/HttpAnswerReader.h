@@ -86,4 +86,10 @@ class HttpAnswerReader
     bool fHasSurplus = false;
 };
 
+// Whether these bytes of a chunked body, from a chunk's head on, may be the last chunk, cut. Beast asserts five bytes
+// ("0", CRLF, CRLF) once it has seen the last chunk's line, so a reader waits for them. They come: a chunked body that
+// goes on has at least five bytes more.
+// Thread: any.
+bool mayBeCutLastChunk(std::string_view bytes) noexcept;
+
 } // namespace Pegasus::wire

@@ -1,5 +1,7 @@
 #include "pegasus/server/net/HttpRequestReader.h"
 
+#include "pegasus/wire/HttpAnswerReader.h"
+
 #include <boost/beast/http/parser.hpp>
 #include <boost/beast/http/string_body.hpp>
 
@@ -102,6 +104,9 @@ std::size_t HttpRequestParser::putBody(std::string_view bytes)
     std::size_t taken = 0;
     while (taken < bytes.size() && !isDone()) {
         const std::string_view window = bytes.substr(taken, fImpl->maxHeadBytes);
+        if (fImpl->parser.chunked() && wire::mayBeCutLastChunk(window)) {
+            break;
+        }
         const std::size_t n = parse(window);
         if (n == 0 && window.size() == fImpl->maxHeadBytes) {
             throw HttpError(431, HttpError::After::kClose, "",

@@ -61,6 +61,7 @@ TEST(HttpAnswerReaderTest, ReadsTheSameHoweverTheBytesArrive)
          "400||-|x<y>|keep"},
         {"bytes after it", kHead + "Content-Length: 1\r\n\r\nabc", "200|a|-||close"},
         {"cut in the body", kHead + "Content-Length: 3\r\n\r\nab", "200|ab|incomplete"},
+        {"cut after the last chunk's line", kChunked + "0\r\nX", "200||incomplete"},
         {"cut in the trailer", kChunked + "1\r\na\r\n0\r\nX: y\r\n", "200|a|incomplete"},
         {"cut in the head", kHead, "|incomplete"},
         {"not HTTP", "SSH-2.0-x\r\n", "malformed "},
