@@ -168,6 +168,8 @@ class Interrupted(unittest.TestCase):
     STEP_SECONDS = 0.25
     WHOLE_RUN_SECONDS = 10
     END_SECONDS = 6.5
+    # The trees of this test may choose one port: the plug-in then begins another attempt, whose pauses no host can cut.
+    ATTEMPT_SECONDS = 5
 
     def interrupt_after(self, seconds):
         """Returns what is wrong."""
@@ -182,7 +184,9 @@ class Interrupted(unittest.TestCase):
             out, err = process.communicate(timeout=60)
             took = time.monotonic() - sent
             document = json.loads(out)
-            wrong = [f"{took:.1f} s"] if took > self.END_SECONDS else []
+            with open(os.path.join(tree.root, "vrxhost.log"), encoding="utf-8") as log:
+                attempts = log.read().count("try to restart cimserver")
+            wrong = [f"{took:.1f} s"] if took > self.END_SECONDS + min(attempts, 1) * self.ATTEMPT_SECONDS else []
             if process.returncode != (COMPLETE if document["complete"] else INTERRUPTED):
                 wrong.append(f"status {process.returncode}")
             if process.returncode == INTERRUPTED and err != "vrxhost: stopping ...\nvrxhost: interrupted\n":
