@@ -33,6 +33,7 @@ void ClassParser::parseFeature(CIMClass& owner)
     checkMemberCount(owner.getPropertyCount() + owner.getMethodCount());
     const Qualifiers qualifiers = fQualifiers.parseList();
     CIMName referenceClass;
+    const std::size_t typeOffset = fCursor.current().offset;
     const ValueType type = parseElementType(fCursor, referenceClass);
     const std::size_t offset = fCursor.current().offset;
     const CIMName name = parseName(fCursor, "a property or method name");
@@ -46,6 +47,7 @@ void ClassParser::parseFeature(CIMClass& owner)
     } else {
         CIMProperty property = parseProperty(name, type, referenceClass);
         addQualifiers(property, qualifiers);
+        checkNamedClasses(owner, property, typeOffset);
         addProperty(owner, property, offset);
     }
 }
@@ -90,7 +92,11 @@ CIMParameter ClassParser::parseParameter()
     const Qualifiers qualifiers = fQualifiers.parseList();
     CIMName referenceClass;
     ValueType type = parseElementType(fCursor, referenceClass);
+    const std::size_t offset = fCursor.current().offset;
     const CIMName name = parseName(fCursor, "a parameter name");
+    if (name.equal(CIMName("Ref"))) {
+        fCompilation.portability.report(fCursor, offset, "a parameter named Ref");
+    }
     parseArraySuffix(fCursor, type);
     if (fCursor.atPunctuation('=')) {
         fCursor.fail("a parameter cannot have a default value");
@@ -115,10 +121,34 @@ void ClassParser::addProperty(CIMClass& owner, const CIMProperty& property, std:
 
 void ClassParser::addMethod(CIMClass& owner, const CIMMethod& method, std::size_t offset)
 {
-    if (owner.findMethod(method.getName()) != PEG_NOT_FOUND) {
-        fCursor.failAt(offset, "method " + base::utf8(method.getName()) + " is given twice");
+    if (owner.findMethod(method.getName()) == PEG_NOT_FOUND) {
+        owner.addMethod(method);
+    } else {
+        fCursor.warn(offset, "Method " + base::utf8(method.getName()) + " already exists in class " +
+                                 base::utf8(owner.getClassName()));
     }
-    owner.addMethod(method);
+}
+
+// Other servers look a property's class up when the class is created; a class may name itself.
+void ClassParser::checkNamedClasses(const CIMClass& owner, const CIMConstProperty& property, std::size_t offset)
+{
+    const auto isUnknown = [&](const CIMName& name) {
+        CIMClass found;
+        return !name.isNull() && !name.equal(owner.getClassName()) && !fCompilation.handler.findClass(name, found);
+    };
+    if (isUnknown(property.getReferenceClassName())) {
+        fCompilation.portability.report(fCursor, offset, "a reference to a class that is not declared yet");
+    }
+    const Uint32 index = property.findQualifier(CIMName("EmbeddedInstance"));
+    const CIMValue embedded = index == PEG_NOT_FOUND ? CIMValue() : property.getQualifier(index).getValue();
+    if (embedded.isNull() || embedded.getType() != CIMTYPE_STRING || embedded.isArray()) {
+        return;
+    }
+    String name;
+    embedded.get(name);
+    if (CIMName::legal(name) && isUnknown(CIMName(name))) {
+        fCompilation.portability.report(fCursor, offset, "EmbeddedInstance of a class that is not declared yet");
+    }
 }
 
 void ClassParser::checkMemberCount(std::size_t count)

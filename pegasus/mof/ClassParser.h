@@ -37,6 +37,7 @@ class ClassParser
     CIMParameter parseParameter();
     void addProperty(CIMClass& owner, const CIMProperty& property, std::size_t offset);
     void addMethod(CIMClass& owner, const CIMMethod& method, std::size_t offset);
+    void checkNamedClasses(const CIMClass& owner, const CIMConstProperty& property, std::size_t offset);
     void checkMemberCount(std::size_t count);
 
     TokenCursor& fCursor;

@@ -8,7 +8,7 @@ namespace {
 
 void compile(const SourceText& source, const CompileOptions& options, DefinitionHandler& handler)
 {
-    Compilation compilation(options, handler);
+    Compilation compilation(options, source.name(), handler);
     handler.useNamespace(options.nameSpace);
     FileCompiler(source, compilation).run();
     compilation.instances.finish();

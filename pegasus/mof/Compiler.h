@@ -22,9 +22,11 @@ struct CompileLimits
 
 struct CompileOptions
 {
-    CIMNamespaceName nameSpace;                  // target until a `#pragma namespace` names another
+    CIMNamespaceName nameSpace;
     std::vector<std::string> includeDirectories; // searched last, in this order
+    bool includesAny = false;                    // also files outside the first file's folder and these directories
     bool allowExperimental = false;              // otherwise a class with a true Experimental is skipped with a warning
+    bool isStrict = false;                       // what OpenPegasus 2.14 refuses is an error; otherwise a warning
     CompileLimits limits = {};
 };
 
@@ -34,10 +36,11 @@ struct CompileOptions
 // from its declaration and an instance's value from its class, both as the handler knows them at that moment, so both
 // must come first in the text. Only aliases may be used before their definition: such instances wait.
 //
-// An include is looked for in the including file's directory, the current directory and the include directories.
+// An include is looked for in the including file's directory, the current directory and the include directories. A file
+// outside the first file's directory and the include directories is refused.
 //
 // Throws: MofError at the first error; definitions before it have been delivered, the failed one is dropped. FileError
-//     when reading `path` fails. Pegasus::Exception of the handler's useNamespace() for the initial namespace.
+//     when reading `path` fails. Pegasus::Exception of the handler's useNamespace().
 // Blocks: as long as the handler, and for reading files.
 void compileFile(const std::string& path, const CompileOptions& options, DefinitionHandler& handler);
 

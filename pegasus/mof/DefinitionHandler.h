@@ -20,7 +20,7 @@ class DefinitionHandler
   public:
     virtual ~DefinitionHandler() = default;
 
-    // Sets the target of all that follows: the initial one before the first definition, then each `#pragma namespace`.
+    // Sets the target of all definitions; called once, before the first one.
     virtual void useNamespace(const CIMNamespaceName& nameSpace) = 0;
 
     // Looks up a declaration, which gives a qualifier's value its type.

@@ -28,11 +28,13 @@ template <typename T> bool qualifierValue(const CIMConstClass& owner, const char
     return true;
 }
 
-// Returns: true for m.n.u, all digits (DSP0004, Version). Some files of the DMTF leave out the last parts.
+// Returns: true for m.n.u, all digits (DSP0004, Version). As with OpenPegasus's compiler the last parts may be left
+// out, a V may stand before them, and the text may be empty.
 bool isVersion(const std::string& text)
 {
+    const std::size_t start = text.empty() || (text[0] != 'v' && text[0] != 'V') ? 0 : 1;
     int dotCount = 0;
-    for (std::size_t at = 0;; ++dotCount) {
+    for (std::size_t at = start; !text.empty(); ++dotCount) {
         const std::size_t end = std::min(text.find('.', at), text.size());
         if (end == at || text.find_first_not_of("0123456789", at) < end) {
             return false;
@@ -42,15 +44,15 @@ bool isVersion(const std::string& text)
         }
         at = end + 1;
     }
+    return true;
 }
 
 } // namespace
 
 FileCompiler::FileCompiler(const SourceText& source, Compilation& compilation)
     : fSource(source), fCompilation(compilation),
-      fCursor(source, compilation.options.limits, [&compilation](const SourcePlace& place, const std::string& text) {
-          compilation.handler.warn(place.text(), text);
-      })
+      fCursor(source, compilation.options.limits,
+              [&compilation](const SourcePlace& place, const std::string& text) { compilation.warn(place, text); })
 {
 }
 
@@ -58,6 +60,9 @@ void FileCompiler::run()
 {
     std::optional<std::size_t> current; // where the definition starts that is being compiled
     try {
+        if (fSource.hasByteOrderMark()) {
+            fCompilation.portability.report(fCursor, 0, "a byte-order mark");
+        }
         while (fCursor.current().kind != TokenKind::kEnd) {
             current = fSubject = fCursor.current().offset;
             compileDefinition();
@@ -85,7 +90,12 @@ void FileCompiler::definition()
         return;
     }
     const Qualifiers qualifiers = QualifierParser(fCursor, fCompilation).parseList();
-    if (fCursor.skipWord("class")) {
+    if (fCursor.atWord("class")) {
+        const Token word = fCursor.take();
+        if (word.text != "class") {
+            fCompilation.portability.report(fCursor, word.offset,
+                                            "the word \"class\" in other letters than small ones");
+        }
         defineClass(qualifiers);
     } else if (fCursor.skipWord("instance")) {
         defineInstance();
@@ -111,24 +121,22 @@ void FileCompiler::defineClass(const Qualifiers& qualifiers)
     }
 }
 
-// Leaves out classes with a true Experimental or a malformed Version, with a warning, as OpenPegasus's compiler does.
+// Leaves out classes with a true Experimental, with a warning, as OpenPegasus's compiler does.
 bool FileCompiler::isWelcome(const CIMClass& newClass)
 {
-    const std::string start =
-        "Class " + base::utf8(newClass.getClassName().getString()) + " was not added or updated: ";
-    Boolean isExperimental = false;
-    if (!fCompilation.options.allowExperimental && qualifierValue(newClass, "Experimental", isExperimental) &&
-        isExperimental)
-    {
-        warn(start + "Experimental update not allowed (set appropriate compiler option)");
-        return false;
-    }
     String version;
     if (qualifierValue(newClass, "Version", version) && !isVersion(base::utf8(version))) {
-        warn(start + "Invalid version format in mof class or repository class (valid format is m.n.u)");
-        return false;
+        warn("Version \"" + base::utf8(version) + "\" is not of the form m.n.u");
     }
-    return true;
+    Boolean isExperimental = false;
+    if (fCompilation.options.allowExperimental || !qualifierValue(newClass, "Experimental", isExperimental) ||
+        !isExperimental)
+    {
+        return true;
+    }
+    warn("Class " + base::utf8(newClass.getClassName().getString()) +
+         " was not added or updated: Experimental update not allowed (set appropriate compiler option)");
+    return false;
 }
 
 void FileCompiler::defineInstance()
@@ -145,25 +153,25 @@ void FileCompiler::defineQualifier(const Qualifiers& qualifiers)
     fCompilation.handler.declareQualifier(QualifierParser(fCursor, fCompilation).parseDeclaration());
 }
 
+// OpenPegasus's compiler ignores `#pragma namespace` too: everything goes to the namespace of the command line.
 void FileCompiler::obeyPragma()
 {
     fCursor.take();
     const Token name = fCursor.expect(TokenKind::kIdentifier, "a pragma name");
     fCursor.expectPunctuation('(');
-    const Token parameter = fCursor.expect(TokenKind::kString, "a string");
+    const Token parameter =
+        name.isWord("include") ? fCursor.takePath() : fCursor.expect(TokenKind::kString, "a string");
     fSubject = parameter.offset;
     fCursor.expectPunctuation(')');
     if (name.isWord("include")) {
         include(parameter.text);
-    } else if (name.isWord("namespace")) {
-        changeNamespace(parameter.text);
     } else if (!name.isWord("locale") && !name.isWord("instancelocale")) {
         warn("Pragma \"" + name.text + "\" not implemented by the compiler. Ignored");
     }
 }
 
-// A missing file is a warning, as with OpenPegasus's compiler. One that exists and is unreadable is an error: its
-// definitions are meant to be there.
+// A missing file is a warning, as with OpenPegasus's compiler. One that exists and is refused or unreadable is an
+// error: its definitions are meant to be there.
 void FileCompiler::include(const std::string& name)
 {
     const CompileLimits& limits = fCompilation.options.limits;
@@ -175,29 +183,35 @@ void FileCompiler::include(const std::string& name)
         fCursor.failAt(fSubject,
                        "more includes than the limit includeCount (" + std::to_string(limits.includeCount) + ")");
     }
-    const std::string path = findInclude(name, fSource.directory(), fCompilation.options.includeDirectories);
+    const std::string path = fCompilation.includes.find(name, fSource.directory());
     if (path.empty()) {
         warn("Could not open include file " + name);
         return;
     }
+    if (name[0] == '/') {
+        fCompilation.portability.report(fCursor, fSubject, "an absolute include path");
+    }
+    compileIncluded(path);
+}
+
+void FileCompiler::compileIncluded(const std::string& path)
+{
+    const bool isOwn = fCompilation.includes.isOwn(path);
+    if (!isOwn && !fCompilation.options.includesAny) {
+        fCursor.failAt(fSubject, "include file " + path + " lies outside the folder of the compiled file and the -I " +
+                                     "folders; cimmof --any-include accepts it");
+    }
     try {
-        const SourceText source = SourceText::read(path, limits.fileBytes);
+        SourceText source = SourceText::read(path, fCompilation.options.limits.fileBytes);
+        if (!isOwn) {
+            source.hideLines();
+        }
         ++fCompilation.includeDepth;
         FileCompiler(source, fCompilation).run();
         --fCompilation.includeDepth;
     } catch (const FileError& error) {
         fCursor.failAt(fSubject, error.what());
     }
-}
-
-void FileCompiler::changeNamespace(const std::string& name)
-{
-    if (!CIMNamespaceName::legal(cimString(fCursor, name, fSubject))) {
-        warn("Pragma \"namespace\": " + name + " is not a namespace name. Ignored");
-        return;
-    }
-    fCompilation.nameSpace = CIMNamespaceName(name.c_str());
-    fCompilation.handler.useNamespace(fCompilation.nameSpace);
 }
 
 void FileCompiler::warn(const std::string& text)

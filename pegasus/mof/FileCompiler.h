@@ -28,7 +28,7 @@ class FileCompiler
     void defineQualifier(const std::vector<CIMQualifier>& qualifiers);
     void obeyPragma();
     void include(const std::string& name);
-    void changeNamespace(const std::string& name);
+    void compileIncluded(const std::string& path);
     bool isWelcome(const CIMClass& newClass);
     void warn(const std::string& text);
 

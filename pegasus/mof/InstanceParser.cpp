@@ -62,7 +62,7 @@ CIMClass InstanceParser::parseClass()
     CIMClass found;
     if (!fCompilation.handler.findClass(CIMName(name.text.c_str()), found)) {
         fCursor.failAt(name.offset, "Error getting class " + name.text + " from namespace " +
-                                        base::utf8(fCompilation.nameSpace.getString()) +
+                                        base::utf8(fCompilation.options.nameSpace.getString()) +
                                         ": CIM_ERR_NOT_FOUND: " + name.text);
     }
     return found;
@@ -97,6 +97,8 @@ void InstanceParser::setValue(ParsedInstance& parsed, const CIMConstProperty& de
         return;
     }
     if (!initializer.isNull() && embeddedKind(declared) != EmbeddedKind::kNone) {
+        fCompilation.portability.report(fCursor, initializer.offset,
+                                        "an instance with a value of an embedded property");
         parsed.instance.addProperty(CIMProperty(declared.getName(), embeddedValue(initializer, declared), 0, CIMName(),
                                                 declared.getClassOrigin()));
         return;

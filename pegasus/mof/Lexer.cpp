@@ -10,8 +10,6 @@ namespace Pegasus::mof {
 
 namespace {
 
-constexpr char kByteOrderMark[] = "\xEF\xBB\xBF";
-
 bool startsName(char c)
 {
     return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_';
@@ -88,7 +86,7 @@ char simpleEscape(char letter)
 Lexer::Lexer(const SourceText& source, const CompileLimits& limits, WarningSink warn)
     : fSource(source), fText(source.text()), fLimits(limits), fWarn(std::move(warn))
 {
-    if (fText.compare(0, 3, kByteOrderMark) == 0) {
+    if (source.hasByteOrderMark()) {
         fAt = 3;
     }
 }
@@ -126,6 +124,31 @@ Token Lexer::next()
         fail(directive.offset, "unknown directive '#" + directive.text + "'");
     }
     fail(fAt, "unexpected " + shownByte(c));
+}
+
+Token Lexer::path()
+{
+    skipBlanksAndComments();
+    Token token{TokenKind::kString, "", fAt};
+    if (peek() != '"') {
+        fail(fAt, "expected a path in quotes");
+    }
+    const std::size_t end = std::min(fText.find_first_of("\"\n", fAt + 1), fText.size());
+    if (end == fText.size() || fText[end] == '\n') {
+        fail(fAt, "string is not closed on its line");
+    }
+    if (end - fAt > fLimits.tokenBytes) {
+        fail(fAt, "path is longer than the limit tokenBytes (" + std::to_string(fLimits.tokenBytes) + ")");
+    }
+    while (++fAt < end) {
+        if (fText[fAt] != '\\') {
+            token.text += fText[fAt];
+        } else if (token.text.empty() || token.text.back() != '/') {
+            token.text += '/';
+        }
+    }
+    ++fAt;
+    return token;
 }
 
 void Lexer::skipBlanksAndComments()

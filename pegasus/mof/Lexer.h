@@ -22,6 +22,10 @@ class Lexer
     // Returns: the next token; kEnd at the end, repeatedly.
     // Throws: MofError at the offending byte.
     Token next();
+    // Cuts a string literal, without escapes: each run of backslashes becomes a slash, as vendors of another system
+    // write paths.
+    // Throws: MofError.
+    Token path();
 
     // Where next() starts; after an error, where it stopped.
     std::size_t offset() const noexcept { return fAt; }

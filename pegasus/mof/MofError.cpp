@@ -1,28 +1,29 @@
 #include "pegasus/mof/MofError.h"
 
+#include "pegasus/mof/ShownText.h"
+
 namespace Pegasus::mof {
 
 std::string SourcePlace::text() const
 {
-    return file + ":" + std::to_string(line) + ":" + std::to_string(column);
+    return shownText(file) + ":" + std::to_string(line) + ":" + std::to_string(column);
 }
 
 MofError::MofError(SourcePlace place, const std::string& cause)
-    : std::runtime_error(place.text() + ": error: " + cause), fPlace(std::move(place)), fCause(cause)
+    : std::runtime_error(place.text() + ": error: " + shownText(cause)), fPlace(std::move(place)), fCause(cause)
 {
 }
 
 namespace {
 
-// Returns: blanks up to the column. Tabs stay tabs, so that the caret lines up in any terminal.
-std::string caretIndent(const std::string& lineText, std::size_t column)
+// Returns: blanks below a text. Tabs stay tabs, so that the caret lines up in any terminal.
+std::string caretIndent(const std::string& textBefore)
 {
     std::string indent;
-    for (std::size_t i = 0; i + 1 < column && i < lineText.size(); ++i) {
-        const auto byte = static_cast<unsigned char>(lineText[i]);
-        const bool continuesCharacter = (byte & 0xC0u) == 0x80u;
+    for (const char c : textBefore) {
+        const bool continuesCharacter = (static_cast<unsigned char>(c) & 0xC0u) == 0x80u;
         if (!continuesCharacter) {
-            indent += byte == '\t' ? '\t' : ' ';
+            indent += c == '\t' ? '\t' : ' ';
         }
     }
     return indent;
@@ -34,7 +35,8 @@ std::string MofError::diagnostic() const
 {
     std::string text = std::string(what()) + "\n";
     if (!fPlace.lineText.empty()) {
-        text += fPlace.lineText + "\n" + caretIndent(fPlace.lineText, fPlace.column) + "^\n";
+        const std::string before = shownText(std::string_view(fPlace.lineText).substr(0, fPlace.column - 1));
+        text += shownText(fPlace.lineText) + "\n" + caretIndent(before) + "^\n";
     }
     if (fSkippedCount != 0) {
         text += std::to_string(fSkippedCount) + (fSkippedCount == 1 ? " definition after it was not compiled\n"
@@ -42,5 +44,7 @@ std::string MofError::diagnostic() const
     }
     return text;
 }
+
+FileError::FileError(Kind kind, const std::string& text) : std::runtime_error(shownText(text)), fKind(kind) {}
 
 } // namespace Pegasus::mof

@@ -12,9 +12,9 @@ struct SourcePlace
     std::string file;
     std::size_t line = 1;
     std::size_t column = 1;
-    std::string lineText; // the whole line, for the caret; empty when it is too long to show
+    std::string lineText; // the whole line, for the caret; empty when it is not to be shown
 
-    // Returns: "file:line:column".
+    // Returns: "file:line:column", for a terminal.
     std::string text() const;
 };
 
@@ -47,10 +47,10 @@ class FileError : public std::runtime_error
     enum class Kind
     {
         kNotOpened,
-        kNotReadable // a directory, too large, a device that fails
+        kNotReadable // not a regular file, too large, a disk that fails
     };
 
-    FileError(Kind kind, const std::string& text) : std::runtime_error(text), fKind(kind) {}
+    FileError(Kind kind, const std::string& text);
 
     Kind kind() const noexcept { return fKind; }
 

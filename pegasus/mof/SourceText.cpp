@@ -47,25 +47,26 @@ std::string readAll(int descriptor, const std::string& path, std::size_t maxByte
     }
 }
 
-bool isFile(const std::string& path)
-{
-    struct stat status = {};
-    return ::stat(path.c_str(), &status) == 0 && !S_ISDIR(status.st_mode);
-}
-
 } // namespace
 
 SourceText SourceText::read(const std::string& path, std::size_t maxBytes)
 {
-    const base::Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
+    const base::Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY));
     struct stat status = {};
     if (!file || ::fstat(file.get(), &status) != 0) {
         throw FileError(FileError::Kind::kNotOpened, "Can't open file " + path);
     }
-    if (S_ISDIR(status.st_mode)) {
-        throw FileError(FileError::Kind::kNotReadable, "Can't read file " + path + ": it is a directory");
+    if (!S_ISREG(status.st_mode)) {
+        throw FileError(FileError::Kind::kNotReadable,
+                        "Can't read file " + path + ": it is " +
+                            (S_ISDIR(status.st_mode) ? "a directory" : "a pipe or a device, not a regular file"));
     }
     return SourceText(path, readAll(file.get(), path, maxBytes));
+}
+
+bool SourceText::hasByteOrderMark() const noexcept
+{
+    return fText.compare(0, 3, "\xEF\xBB\xBF") == 0;
 }
 
 std::string SourceText::directory() const
@@ -97,7 +98,7 @@ SourcePlace SourceText::place(std::size_t offset) const
     place.file = fName;
     place.line = lineOf(offset);
     place.column = 1 + offset - lineStart;
-    if (lineEnd - lineStart <= kShownLineBytes) {
+    if (fShowsLines && lineEnd - lineStart <= kShownLineBytes) {
         place.lineText = fText.substr(lineStart, lineEnd - lineStart);
     }
     return place;
@@ -106,27 +107,6 @@ SourcePlace SourceText::place(std::size_t offset) const
 void SourceText::fail(std::size_t offset, const std::string& cause) const
 {
     throw MofError(place(offset), cause);
-}
-
-std::string findInclude(const std::string& name, const std::string& includingDirectory,
-                        const std::vector<std::string>& includeDirectories)
-{
-    const bool isAbsolute = !name.empty() && name[0] == '/';
-    if (!isAbsolute && isFile(includingDirectory + name)) {
-        return includingDirectory + name;
-    }
-    if (isFile(name)) {
-        return name;
-    }
-    if (isAbsolute) {
-        return "";
-    }
-    for (const std::string& directory : includeDirectories) {
-        if (isFile(directory + "/" + name)) {
-            return directory + "/" + name;
-        }
-    }
-    return "";
 }
 
 } // namespace Pegasus::mof

@@ -3,7 +3,6 @@
 #include "pegasus/mof/MofError.h"
 
 #include <string>
-#include <vector>
 
 namespace Pegasus::mof {
 
@@ -14,13 +13,16 @@ class SourceText
   public:
     SourceText(std::string name, std::string text) : fName(std::move(name)), fText(std::move(text)) {}
 
-    // Throws: FileError ("Can't open file <path>", "Can't read file …") also for a directory and a file beyond
-    //     `maxBytes`.
-    // Blocks: as long as the file does; a pipe, until its writer closes it.
+    // Throws: FileError ("Can't open file <path>", "Can't read file …") also for a file beyond `maxBytes` and for what
+    //     is not a regular file. A pipe or device is refused at once.
     static SourceText read(const std::string& path, std::size_t maxBytes);
 
     const std::string& name() const noexcept { return fName; }
     const std::string& text() const noexcept { return fText; }
+    bool hasByteOrderMark() const noexcept;
+    // Diagnostics show the place alone, without the line: the reader of a diagnostic may be somebody who may not read
+    // the file.
+    void hideLines() noexcept { fShowsLines = false; }
     // Returns: the name up to and including its last slash; empty for the current directory.
     std::string directory() const;
 
@@ -33,14 +35,9 @@ class SourceText
 
     std::string fName;
     std::string fText;
+    bool fShowsLines = true;
     mutable std::size_t fCountedOffset = 0; // of place()'s last call
     mutable std::size_t fCountedBreaks = 0; // line ends before fCountedOffset
 };
-
-// Finds an included file: the first that exists in the including file's directory (with its slash, or empty), the
-// current directory, and the include directories. An absolute name is taken as it is. Returns: its path; empty when
-// it is absent.
-std::string findInclude(const std::string& name, const std::string& includingDirectory,
-                        const std::vector<std::string>& includeDirectories);
 
 } // namespace Pegasus::mof

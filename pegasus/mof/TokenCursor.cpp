@@ -58,6 +58,13 @@ Token TokenCursor::expect(TokenKind kind, std::string_view what)
     return take();
 }
 
+Token TokenCursor::takePath()
+{
+    Token path = fLexer.path();
+    fIsCut = false;
+    return path;
+}
+
 void TokenCursor::failExpected(std::string_view what)
 {
     fail("expected " + std::string(what) + " instead of " + current().shown());

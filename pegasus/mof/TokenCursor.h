@@ -29,6 +29,8 @@ class TokenCursor
     // Throws: MofError "expected … instead of …" at the current token unless it is of this kind.
     void expectPunctuation(char sign);
     Token expect(TokenKind kind, std::string_view what);
+    // Takes a string whose backslashes separate folders. Requires: the current token has not been looked at.
+    Token takePath();
 
     const CompileLimits& limits() const noexcept { return fLimits; }
     SourcePlace place(std::size_t offset) const { return fSource.place(offset); }

@@ -2,19 +2,22 @@
 
 namespace Pegasus::cimmof {
 
-const char* const kHelp = "Usage: cimmof [options] file...\n"
-                          "Compiles MOF files into the CIM server of $PEGASUS_HOME.\n"
-                          "\n"
-                          "  -n, --namespace NAMESPACE  target namespace, created if missing (root/cimv2)\n"
-                          "  -I, --include DIRECTORY    look for included files there as well; may be repeated\n"
-                          "  -aE                        accept classes with a true Experimental qualifier\n"
-                          "  -E                         check the files without a server\n"
-                          "  -w                         no warnings\n"
-                          "  -h, --help                 this text\n"
-                          "\n"
-                          "Exit status: 0 done; 250 error in a file or from the server; 249 a file cannot be opened;\n"
-                          "2 it was opened but cannot be read; 247 bad namespace; 246 no server; 254 bad command line; "
-                          "255 after this text.\n";
+const char* const kHelp =
+    "Usage: cimmof [options] file...\n"
+    "Compiles MOF files into the CIM server of $PEGASUS_HOME.\n"
+    "\n"
+    "  -n, --namespace NAMESPACE  target namespace, created if missing (root/cimv2)\n"
+    "  -I, --include DIRECTORY    look for included files there as well; may be repeated\n"
+    "  --any-include              include files outside the folder of FILE and the -I folders, too\n"
+    "  --strict                   refuse what OpenPegasus 2.14's compiler refuses, instead of warning\n"
+    "  -aE                        accept classes with a true Experimental qualifier\n"
+    "  -E                         check the files without a server\n"
+    "  -w                         no warnings\n"
+    "  -h, --help                 this text\n"
+    "\n"
+    "Exit status: 0 done; 250 error in a file or from the server; 249 a file cannot be opened;\n"
+    "2 it was opened but cannot be read; 247 bad namespace; 246 no server; 254 bad command line; "
+    "255 after this text.\n";
 
 namespace {
 
@@ -49,6 +52,10 @@ bool setSwitch(Options& options, const std::string& flag)
         options.hideWarnings = true;
     } else if (flag == "-aE") {
         options.allowExperimental = true;
+    } else if (flag == "--any-include") {
+        options.includesAny = true;
+    } else if (flag == "--strict") {
+        options.isStrict = true;
     } else {
         return false;
     }

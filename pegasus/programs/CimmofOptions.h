@@ -13,6 +13,8 @@ struct Options
     bool syntaxOnly = false;        // -E
     bool hideWarnings = false;      // -w
     bool allowExperimental = false; // -aE
+    bool includesAny = false;       // --any-include
+    bool isStrict = false;          // --strict
     std::string nameSpace = "root/cimv2";
     std::vector<std::string> includeDirectories;
     std::vector<std::string> files;

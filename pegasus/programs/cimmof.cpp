@@ -1,8 +1,10 @@
 #include "pegasus/base/Text.h"
 #include "pegasus/mof/Compiler.h"
 #include "pegasus/mof/MemoryHandler.h"
+#include "pegasus/mof/ShownText.h"
 #include "pegasus/programs/CimmofHandler.h"
 #include "pegasus/programs/CimmofOptions.h"
+#include "pegasus/server/admin/ConfigFile.h"
 
 #include <functional>
 #include <iostream>
@@ -37,7 +39,7 @@ Status compileOne(const std::string& file, const mof::CompileOptions& options, m
         std::cerr << error.what() << "\n";
         return error.kind() == mof::FileError::Kind::kNotOpened ? kNoFile : kUnreadableFile;
     } catch (const Exception& error) {
-        std::cerr << file << ": error: " << base::utf8(error.getMessage()) << "\n";
+        std::cerr << mof::shownText(file + ": error: " + base::utf8(error.getMessage())) << "\n";
         return kFailed;
     }
 }
@@ -78,6 +80,12 @@ Status compileIntoServer(const Options& options, const mof::CompileOptions& comp
     return compileAll(options, compileOptions, handler);
 }
 
+// The server's property holds for its compiler too; whoever runs the compiler for a host cannot pass an option.
+bool isServerStrict()
+{
+    return server::readConfigFile(server::currentConfigPath(server::defaultHome()))["strictProviders"] == "true";
+}
+
 Status run(const Options& options)
 {
     if (options.showHelp) {
@@ -95,7 +103,9 @@ Status run(const Options& options)
     mof::CompileOptions compileOptions;
     compileOptions.nameSpace = CIMNamespaceName(options.nameSpace.c_str());
     compileOptions.includeDirectories = options.includeDirectories;
+    compileOptions.includesAny = options.includesAny;
     compileOptions.allowExperimental = options.allowExperimental;
+    compileOptions.isStrict = options.isStrict || isServerStrict();
     return options.syntaxOnly ? checkSyntax(options, compileOptions) : compileIntoServer(options, compileOptions);
 }
 

@@ -79,6 +79,8 @@ TEST_F(Cimmof, AnswersTheCommandLineAsOpenPegasusDoes)
 {
     const std::string good = directory.write("good.mof", "class Good {};");
     const std::string bad = directory.write("bad.mof", "class {};");
+    const std::string capital = directory.write("capital.mof", "Class Good {};");
+    const std::string outside = directory.write("below/outside.mof", "#pragma include (\"../good.mof\")");
     struct Row
     {
         const char* name;
@@ -95,6 +97,8 @@ TEST_F(Cimmof, AnswersTheCommandLineAsOpenPegasusDoes)
         {"twice", {"-n", "root/cl", good}, 0, "", ":1:7: warning: Class Good already exists in the repository\n"},
         {"checkOnly", {"-E", good, good}, 0, "", ""},
         {"checkOnlyBad", {"-E", bad}, 250, "", "bad.mof:1:7: error: expected a class name instead of '{'\n"},
+        {"strict", {"-E", "--strict", capital}, 250, "", ":1:1: error: fails on OpenPegasus 2.14: the word"},
+        {"anyInclude", {"-E", "--any-include", outside}, 0, "", ""},
         {"noFile", {"-n", "root/cl", "missing.mof"}, 249, "", "Can't open file missing.mof\n"},
         {"directory", {"-n", "root/cl", "/"}, 2, "", "it is a directory"},
         {"badNamespace",

@@ -223,6 +223,14 @@ TEST(Compiler, AcceptsWhatOpenPegasusAccepts)
          schema + "instance of X { id = \"1\"; r = $later; r = null; };",
          "instance X { string id=<1>; X ref r=null; }",
          {"t.mof:2:89: warning: property r is given twice: the last value holds"}},
+        {"methodTwice",
+         "class X { uint32 m(); string M(uint8 a); };",
+         "class X { uint32 m(); }",
+         {"t.mof:2:30: warning: Method M already exists in class X"}},
+        {"namespacePragma",
+         "#pragma namespace (\"root/other\")\nclass X {};",
+         "class X { }",
+         {"t.mof:2:20: warning: Pragma \"namespace\" not implemented by the compiler. Ignored"}},
         {"openComment",
          "class X {}; /* class Y {};",
          "class X { }",
@@ -239,6 +247,41 @@ TEST(Compiler, AcceptsWhatOpenPegasusAccepts)
               "2:18: type mismatch: a single uint32 value is expected");
     EXPECT_EQ(failureOf(schema + "instance of X { id = {}; };"),
               "2:72: type mismatch: a single string value is expected");
+}
+
+// Texts that OpenPegasus 2.14's compiler refuses: one warning for each kind, or an error.
+TEST(Compiler, ReportsWhatFailsOnOpenPegasus)
+{
+    struct Row
+    {
+        std::string text;
+        const char* place; // of the first of two
+        const char* kind;
+    };
+    const std::string embedded = "Qualifier EmbeddedInstance : string = null, Scope(property); ";
+    const Row rows[] = {
+        {"[Association] class L { No ref a; No2 ref b; };", "2:25", "a reference to a class that is not declared yet"},
+        {embedded + "class X { [EmbeddedInstance(\"No\")] string a; [EmbeddedInstance(\"No2\")] string b; };", "2:97",
+         "EmbeddedInstance of a class that is not declared yet"},
+        {embedded + "class I {}; class X { [EmbeddedInstance(\"I\")] string a; };"
+                    "instance of X { a = \"instance of I {};\"; }; instance of X { a = \"instance of I {};\"; };",
+         "2:140", "an instance with a value of an embedded property"},
+        {"class X { uint32 m(string Ref, X ref r); uint32 n(string rEF); };", "2:27", "a parameter named Ref"},
+        {"Class X {}; CLASS Y {};", "2:1", "the word \"class\" in other letters than small ones"},
+    };
+    CompileOptions strict = options();
+    strict.isStrict = true;
+    for (const Row& row : rows) {
+        const std::string place = row.place;
+        const std::string text = std::string("fails on OpenPegasus 2.14: ") + row.kind;
+        EXPECT_THAT(compile(row.text).warnings(),
+                    testing::ElementsAre("t.mof:" + place + ": warning: works here, " + text))
+            << row.text;
+        EXPECT_EQ(failureOf(row.text, strict), place + ": " + text) << row.text;
+    }
+    const char* const portable = "[Association] class L { L ref self; }; class X { uint32 m(No ref p); };";
+    EXPECT_THAT(compile(portable).warnings(), testing::IsEmpty());
+    EXPECT_EQ(failureOf(portable, strict), "");
 }
 
 // Each row: instances whose references use aliases before they exist; the values that must come out.

@@ -6,6 +6,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <sys/stat.h>
+
 using namespace Pegasus::mof;
 using mof_test::TemporaryDirectory;
 
@@ -51,11 +53,69 @@ TEST(Include, LooksBesideTheIncludingFileFirstThenHereThenInTheDirectoriesInOrde
     CompileOptions options;
     options.includeDirectories = {tree.path() + "/i1", tree.path() + "/i2"};
 
+    options.includesAny = true;
     EXPECT_EQ(classesOf(top, options), "Z_first Y_beside X_beside Top ");
     const WorkingDirectory here(tree.path() + "/here");
     EXPECT_EQ(classesOf(top, options), "Z_here Y_beside X_beside Top ");
     std::filesystem::remove(tree.path() + "/a/x.mof");
     EXPECT_EQ(classesOf("../a/top.mof", options), "X_here Top ");
+}
+
+TEST(Include, TakesBackslashesAndAbsolutePaths)
+{
+    const TemporaryDirectory tree;
+    tree.write("a/b.mof", "class B {};");
+    const std::string top = tree.write("t.mof", R"(#pragma include ("a\b.mof"))"
+                                                "\n"
+                                                R"(#pragma include ("a\\b.mof"))"
+                                                "\n#pragma include (\"" +
+                                                    tree.path() + "/a/b.mof\")");
+    MemoryHandler handler;
+    compileFile(top, {}, handler);
+    EXPECT_THAT(handler.warnings(),
+                testing::ElementsAre(testing::HasSubstr("Class B already exists"),
+                                     testing::HasSubstr("fails on OpenPegasus 2.14: an absolute include path"),
+                                     testing::HasSubstr("Class B already exists")));
+}
+
+// What a vendor's file includes is shown in diagnostics, so it must not lead to other files of the machine.
+TEST(Include, StaysBelowItsFolders)
+{
+    const TemporaryDirectory tree;
+    const std::string secret = tree.write("secret", "root:hash");
+    tree.write("own/sub/x.mof", "#pragma include (\"../y.mof\")");
+    tree.write("own/y.mof", "class Y {};");
+    tree.write("own-other/z.mof", "class Z {};");
+    std::filesystem::create_symlink(secret, tree.path() + "/own/link.mof");
+    std::filesystem::create_directory(tree.path() + "/private");
+    const std::string linked = tree.path() + "/private/top.mof";
+    std::filesystem::create_symlink(tree.write("own/linked.mof", "#pragma include (\"y.mof\")"), linked);
+    std::filesystem::create_symlink(tree.path() + "/own/y.mof", tree.path() + "/private/y.mof");
+    EXPECT_EQ(classesOf(linked, {}), "Y "); // a private root, whose files are links to those of the tree
+    EXPECT_EQ(classesOf(tree.write("own/inside.mof", "#pragma include (\"sub/x.mof\")"), {}), "Y ");
+
+    for (const char* outside : {"../secret", "sub/../../secret", "link.mof", "../own-other/z.mof"}) {
+        const std::string top =
+            tree.write("own/top.mof", std::string("#pragma include (\"") + outside + "\")\nclass A {};");
+        try {
+            classesOf(top, {});
+            ADD_FAILURE() << outside << ": no error";
+        } catch (const MofError& error) {
+            EXPECT_THAT(error.cause(), testing::HasSubstr("lies outside")) << outside;
+            EXPECT_THAT(error.diagnostic(), testing::Not(testing::HasSubstr("hash"))) << outside;
+        }
+    }
+    CompileOptions any;
+    any.includesAny = true;
+    try {
+        classesOf(tree.write("own/top.mof", "#pragma include (\"../secret\")"), any);
+        ADD_FAILURE() << "no error";
+    } catch (const MofError& error) {
+        EXPECT_THAT(error.diagnostic(), testing::Not(testing::HasSubstr("hash")));
+    }
+    any.includeDirectories = {tree.path() + "/own-other"};
+    any.includesAny = false;
+    EXPECT_EQ(classesOf(tree.write("own/top.mof", "#pragma include (\"z.mof\")"), any), "Z ");
 }
 
 TEST(Include, StopsAtTheLimits)
@@ -126,5 +186,11 @@ TEST(Include, ReportsAnUnreadableTopFileAsSuch)
     const TemporaryDirectory tree;
     MemoryHandler handler;
     EXPECT_THROW(compileFile(tree.path() + "/none.mof", {}, handler), FileError);
-    EXPECT_THROW(compileFile(tree.path(), {}, handler), FileError);
+    const std::string pipe = tree.path() + "/pipe.mof";
+    ASSERT_EQ(::mkfifo(pipe.c_str(), 0600), 0);
+    for (const std::string& path : {tree.path(), pipe, std::string("/dev/zero")}) {
+        EXPECT_THROW(compileFile(path, {}, handler), FileError) << path;
+    }
+    const std::string including = tree.write("t.mof", "#pragma include (\"pipe.mof\")");
+    EXPECT_THROW(compileFile(including, {}, handler), MofError);
 }

@@ -28,6 +28,7 @@ mof::MemoryHandler parse(const std::string& file)
     options.nameSpace = kNamespace;
     options.allowExperimental = true;
     mof::compileFile(file, options, source);
+    EXPECT_TRUE(source.warnings().empty()) << source.warnings()[0]; // OpenPegasus compiles the schema too
     return source;
 }
 
