@@ -94,7 +94,7 @@ void ResponseReader::openEnvelope(const XmlElement& tag)
     } else if (fDepth == kResponseLevel) {
         openMethodResponse(tag);
     } else {
-        tag.expectNoAttributes();
+        tag.ignoreAttributes();
         if (tag.is("IRETURNVALUE")) {
             if (!fExpected.isIntrinsic || fHasReturnValue || fError) {
                 tag.fail(Kind::kInvalid, "unexpected IRETURNVALUE element");
@@ -129,8 +129,8 @@ void ResponseReader::openMethodResponse(const XmlElement& tag)
     tag.attributes({"NAME"}, values);
     const std::string name(required(tag, "NAME", values[0]));
     const bool isIntrinsic = !tag.is(kExtrinsicResponse);
-    const bool isKnown =
-        std::find(std::begin(kIntrinsicMethods), std::end(kIntrinsicMethods), name) != std::end(kIntrinsicMethods);
+    const bool isKnown = std::any_of(std::begin(kIntrinsicMethods), std::end(kIntrinsicMethods),
+                                     [&](std::string_view known) { return base::equalNoCase(name, known); });
     if (isIntrinsic && !isKnown) {
         tag.fail(Kind::kInvalid, "Unrecognized IMethodResponse name \"" + name + "\"");
     }
@@ -165,7 +165,9 @@ void ResponseReader::readError(const XmlElement& element)
 {
     XmlAttribute values[2];
     element.attributes({"CODE", "DESCRIPTION"}, values);
-    const auto code = base::parseUnsigned(required(element, "CODE", values[0]));
+    const std::string_view digits = required(element, "CODE", values[0]);
+    // Some servers write "06".
+    const auto code = base::parseUnsigned(digits.substr(std::min(digits.find_first_not_of('0'), digits.size() - 1)));
     if (!code || *code > 0xFFFF) {
         element.fail(Kind::kInvalid, "missing ERROR.CODE attribute");
     }

@@ -37,16 +37,10 @@ bool isOneOf(const XmlElement& element, std::initializer_list<std::string_view> 
     return false;
 }
 
-[[noreturn]] void failUnexpected(const XmlElement& parent, const XmlElement& child)
-{
-    child.fail(Kind::kInvalid, "Expected close of " + std::string(parent.name()) + " element, got " +
-                                   std::string(child.name()) + " instead");
-}
-
 void expectEnd(const XmlElement& parent, const XmlElement& child)
 {
     if (child) {
-        failUnexpected(parent, child);
+        child.failIn(parent);
     }
 }
 
@@ -114,7 +108,7 @@ const CIMName& ElementDecoder::nameAttribute(const XmlElement& element, std::str
 
 CIMName ElementDecoder::optionalName(const XmlElement& element, std::string_view attribute, XmlAttribute value)
 {
-    return !value ? CIMName() : nameAttribute(element, attribute, value);
+    return !value || value->empty() ? CIMName() : nameAttribute(element, attribute, value);
 }
 
 bool ElementDecoder::boolAttribute(const XmlElement& element, std::string_view attribute, XmlAttribute value,
@@ -197,7 +191,7 @@ CIMQualifier ElementDecoder::decodeQualifier(const XmlElement& element)
     const bool propagated = boolAttribute(element, "PROPAGATED", values[2], false);
     const XmlElement child = element.firstChild();
     if (child && !isOneOf(child, {"VALUE", "VALUE.ARRAY"})) {
-        failUnexpected(element, child);
+        child.failIn(element);
     }
     if (child) {
         expectEnd(element, child.nextSibling());
@@ -388,7 +382,7 @@ CIMInstance ElementDecoder::decodeInstance(const XmlElement& element)
 CIMInstance ElementDecoder::decodeNamedInstance(const XmlElement& element)
 {
     element.expectName("VALUE.NAMEDINSTANCE");
-    element.expectNoAttributes();
+    element.ignoreAttributes();
     const XmlElement name = element.firstChild();
     if (!name) {
         element.fail(Kind::kInvalid, "expected INSTANCENAME element");

@@ -47,8 +47,8 @@ class ElementDecoder
     CIMParamValue decodeParamValue(const XmlElement& element);
     // RETURNVALUE
     CIMValue decodeReturnValue(const XmlElement& element);
-    // VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY, read as `type`. A null element of an array becomes the
-    // type's default, because arrays lack nulls.
+    // VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY, read as `type`. An empty embedded object is null. Arrays
+    // lack nulls, so VALUE.NULL in one is an error, as in OpenPegasus.
     CIMValue decodeValue(const XmlElement& element, CIMType type);
 
     // An attribute that holds a name. Throws: XmlError "Illegal value for PROPERTY.NAME attribute", or "missing ...".
@@ -83,6 +83,7 @@ class ElementDecoder
 
     // ElementDecoderValues.cpp
     template <typename T> T parseText(const XmlElement& element, std::string_view text);
+    template <typename T> T parseElement(const XmlElement& element);
     template <typename T> CIMValue decodeScalar(const XmlElement& element);
     template <typename T> CIMValue decodeArray(const XmlElement& element);
     template <typename T> T parseUnsigned(const XmlElement& element, std::string_view text);

@@ -105,8 +105,7 @@ CIMObjectPath ElementDecoder::decodeNameIn(const XmlElement& element, const Stri
         child = XmlElement();
     }
     if (child) {
-        child.fail(Kind::kInvalid,
-                   "Expected close of INSTANCENAME element, got " + std::string(child.name()) + " instead");
+        child.failIn(element);
     }
     return CIMObjectPath(host, nameSpace, className, keys);
 }
@@ -114,7 +113,7 @@ CIMObjectPath ElementDecoder::decodeNameIn(const XmlElement& element, const Stri
 CIMNamespaceName ElementDecoder::decodeLocalNamespacePath(const XmlElement& element)
 {
     element.expectName("LOCALNAMESPACEPATH");
-    element.expectNoAttributes();
+    element.ignoreAttributes();
     std::string text;
     XmlElement child = childOf(element, "NAMESPACE");
     for (; child; child = child.nextSibling()) {
@@ -133,7 +132,7 @@ CIMObjectPath ElementDecoder::decodeObjectPath(const XmlElement& element)
     if (element.is("INSTANCENAME") || element.is("CLASSNAME")) {
         return decodeNameIn(element, String(), CIMNamespaceName());
     }
-    element.expectNoAttributes();
+    element.ignoreAttributes();
     if (element.is("LOCALINSTANCEPATH") || element.is("LOCALCLASSPATH")) {
         const XmlElement nameSpace = childOf(element, "LOCALNAMESPACEPATH");
         return decodeNameIn(lastAfter(nameSpace), String(), decodeLocalNamespacePath(nameSpace));
@@ -155,7 +154,7 @@ CIMObjectPath ElementDecoder::decodeObjectPath(const XmlElement& element)
 CIMObjectPath ElementDecoder::decodeReference(const XmlElement& element)
 {
     element.expectName("VALUE.REFERENCE");
-    element.expectNoAttributes();
+    element.ignoreAttributes();
     return decodeObjectPath(element.onlyChild());
 }
 

@@ -3,6 +3,7 @@
 #include "pegasus/base/Text.h"
 #include "pegasus/common/CIMValueRep.h"
 #include "pegasus/wire/ElementDecoder.h"
+#include "pegasus/wire/XmlText.h"
 
 #include <limits>
 
@@ -173,9 +174,25 @@ CIMType ElementDecoder::embeddedType(const XmlElement& element, CIMType type, Xm
 
 // ---- VALUE, VALUE.ARRAY
 
+template <typename T> T ElementDecoder::parseElement(const XmlElement& element)
+{
+    if constexpr (std::is_same_v<T, Char16>) {
+        // Servers write the character 0, which a null element of an array is to them, as a reference.
+        if (isZeroReference(element.rawText())) {
+            return Char16(0);
+        }
+    }
+    return parseText<T>(element, element.text(fScratch));
+}
+
 template <typename T> CIMValue ElementDecoder::decodeScalar(const XmlElement& element)
 {
-    return ValueAccess::make(parseText<T>(element, element.text(fScratch)));
+    if constexpr (std::is_same_v<T, CIMObject> || std::is_same_v<T, CIMInstance>) {
+        if (element.text(fScratch).empty()) {
+            return CIMValue(CIMTypeOf<T>::kType, false);
+        }
+    }
+    return ValueAccess::make(parseElement<T>(element));
 }
 
 template <> CIMValue ElementDecoder::decodeScalar<CIMObjectPath>(const XmlElement& element)
@@ -191,15 +208,14 @@ template <typename T> CIMValue ElementDecoder::decodeArray(const XmlElement& ele
             child.fail(Kind::kTooLarge,
                        "an array of more than " + std::to_string(fLimits.maxArrayElements) + " elements");
         }
-        child.expectNoAttributes();
-        if (child.is("VALUE.NULL")) {
-            child.expectNoChildren();
-            array.append(T());
-        } else if constexpr (std::is_same_v<T, CIMObjectPath>) {
+        if constexpr (std::is_same_v<T, CIMObjectPath>) {
             array.append(decodeReference(child));
         } else {
-            child.expectName("VALUE");
-            array.append(parseText<T>(child, child.text(fScratch)));
+            if (!child.is("VALUE")) {
+                child.failIn(element);
+            }
+            child.ignoreAttributes();
+            array.append(parseElement<T>(child));
         }
     }
     return ValueAccess::make(std::move(array));
@@ -207,7 +223,7 @@ template <typename T> CIMValue ElementDecoder::decodeArray(const XmlElement& ele
 
 CIMValue ElementDecoder::decodeValue(const XmlElement& element, CIMType type)
 {
-    element.expectNoAttributes();
+    element.ignoreAttributes();
     if (element.is("VALUE.REFERENCE")) {
         return CIMValue(decodeReference(element));
     }

@@ -27,9 +27,13 @@ std::string decoded(BeastView text)
     return base::percentDecoded(std::string_view(text.data(), text.size()));
 }
 
+// The answer to an M-POST gives CIM's fields a prefix of two digits: "73-CIMOperation".
 bool isNamed(BeastView name, std::string_view expected)
 {
-    return base::equalNoCase(std::string_view(name.data(), name.size()), expected);
+    const bool hasPrefix =
+        name.size() > 3 && base::isAsciiDigit(name[0]) && base::isAsciiDigit(name[1]) && name[2] == '-';
+    const std::size_t start = hasPrefix ? 3 : 0;
+    return base::equalNoCase(std::string_view(name.data() + start, name.size() - start), expected);
 }
 
 [[noreturn]] void throwMalformed()

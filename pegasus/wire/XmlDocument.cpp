@@ -90,13 +90,16 @@ void MessageCheck::close(const char* end)
 
 void MessageCheck::expectOnlyBlanks(std::string_view text, XmlPlace place) const
 {
-    if (fDepth == 0 && text.find_first_not_of(" \t\r\n") != std::string_view::npos) {
+    if (fDepth == 0 && !(fRoot.empty() ? isBlank(text) : isPadding(text))) {
         throw XmlError(Kind::kNotWellFormed, place, "text outside the root element");
     }
 }
 
 void MessageCheck::takeDeclaration()
 {
+    const std::string_view blanks = fRest.substr(0, std::min(fRest.find_first_not_of(kBlanks), fRest.size()));
+    fPlace = advance(fPlace, blanks);
+    fRest.remove_prefix(blanks.size());
     const XmlToken token = fRest.empty() ? XmlToken() : fScanner.next(fRest, fPlace);
     if (token.type != XmlToken::Type::kDeclaration) {
         throw XmlError(Kind::kInvalid, fPlace, "Expected <?xml ... ?> style declaration");
@@ -240,8 +243,7 @@ XmlElement XmlElement::onlyChild() const
         fail(Kind::kInvalid, "missing element in " + std::string(name()) + " element");
     }
     if (const XmlElement second = child.nextSibling()) {
-        second.fail(Kind::kInvalid, "Expected close of " + std::string(name()) + " element, got " +
-                                        std::string(second.name()) + " instead");
+        second.failIn(*this);
     }
     return child;
 }
@@ -249,8 +251,7 @@ XmlElement XmlElement::onlyChild() const
 void XmlElement::expectNoChildren() const
 {
     if (const XmlElement child = firstChild()) {
-        child.fail(Kind::kInvalid, "Expected close of " + std::string(name()) + " element, got " +
-                                       std::string(child.name()) + " instead");
+        child.failIn(*this);
     }
 }
 
@@ -277,8 +278,7 @@ void XmlElement::readAttributes(const std::string_view* names, XmlAttribute* val
                                       std::string(name()) + " element");
         }
         if (index == count) {
-            fail(Kind::kInvalid,
-                 "unexpected attribute " + quoted(attributeName) + " in " + std::string(name()) + " element");
+            continue;
         }
         if (values[index]) {
             fail(Kind::kNotWellFormed, "attribute " + quoted(attributeName) + " twice");
@@ -300,6 +300,12 @@ std::string_view XmlElement::text(std::string& scratch) const
     return resolved(trimBlanks(node.value()), scratch);
 }
 
+std::string_view XmlElement::rawText() const
+{
+    const pugi::xml_node node = nodeOf(fNode);
+    return node.first_child() ? std::string_view() : trimBlanks(node.value());
+}
+
 // Character data in pieces: text beside CDATA sections or comments. Only the blanks outside CDATA are trimmed.
 std::string_view XmlElement::mixedText(std::string& scratch) const
 {
@@ -315,8 +321,7 @@ std::string_view XmlElement::mixedText(std::string& scratch) const
     }
     for (const pugi::xml_node child : node.children()) {
         if (child.type() == pugi::node_element) {
-            XmlElement(child.internal_object(), fDocument)
-                .fail(Kind::kInvalid, "Expected close of " + std::string(name()) + " element, got " + child.name());
+            XmlElement(child.internal_object(), fDocument).failIn(*this);
         }
         endsInCData = child.type() == pugi::node_cdata;
         if (endsInCData) {
@@ -351,6 +356,12 @@ std::string_view XmlElement::resolved(std::string_view raw, std::string& scratch
 void XmlElement::fail(XmlError::Kind kind, const std::string& cause) const
 {
     throw XmlError(kind, place(), cause);
+}
+
+void XmlElement::failIn(const XmlElement& parent) const
+{
+    fail(Kind::kInvalid,
+         "Expected close of " + std::string(parent.name()) + " element, got " + std::string(name()) + " instead");
 }
 
 XmlPlace XmlElement::place() const

@@ -56,21 +56,27 @@ class XmlElement
     void expectNoChildren() const;
     void expectName(std::string_view expectedName) const;
 
-    // Reads attributes: values[i] gets the value of names[i].
-    // Throws: XmlError for an attribute that is unlisted or appears twice.
+    // Reads attributes: values[i] gets the value of names[i]. Attributes of other names are ignored, as OpenPegasus
+    // ignores them: clients and servers add namespaces, languages and types of their own.
+    // Throws: XmlError when a listed attribute appears twice.
     template <std::size_t N> void attributes(const std::string_view (&names)[N], XmlAttribute (&values)[N]) const
     {
         readAttributes(names, values, N);
     }
-    void expectNoAttributes() const { readAttributes(nullptr, nullptr, 0); }
+    // For an element whose attributes have no meaning: only their number is checked.
+    void ignoreAttributes() const { readAttributes(nullptr, nullptr, 0); }
 
     // The character data of a childless element, with blanks around the raw text taken off and references
     // resolved. Returns: a view into the message or into `scratch`; valid until either changes.
     std::string_view text(std::string& scratch) const;
+    // The same with its references unresolved. Empty when it lies in pieces (CDATA sections, comments).
+    std::string_view rawText() const;
     // `raw` (an attribute's value) with references resolved; as text().
     std::string_view resolved(std::string_view raw, std::string& scratch) const;
 
     [[noreturn]] void fail(XmlError::Kind kind, const std::string& cause) const;
+    // Fails at an element that may not stand in `parent`, or not at this place.
+    [[noreturn]] void failIn(const XmlElement& parent) const;
     XmlPlace place() const;
 
   private:

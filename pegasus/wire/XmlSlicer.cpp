@@ -84,6 +84,9 @@ bool XmlSlicer::step()
 void XmlSlicer::take(const XmlToken& token)
 {
     if (!fHasDeclaration) {
+        if (token.type == Type::kText && isBlank(rest().substr(0, token.size))) {
+            return consume(token.size);
+        }
         if (token.type != Type::kDeclaration) {
             throw XmlError(Kind::kInvalid, fPlace, "Expected <?xml ... ?> style declaration");
         }
@@ -127,7 +130,7 @@ void XmlSlicer::takeInEnvelope(const XmlToken& token)
         break;
     case Type::kText:
     case Type::kCData:
-        if (text.find_first_not_of(" \t\r\n") != std::string_view::npos) {
+        if (!(fHasRoot && fOpen.empty() ? isPadding(text) : isBlank(text))) {
             throw XmlError(Kind::kInvalid, here(), "unexpected text between elements");
         }
         break;
@@ -236,8 +239,7 @@ void XmlSlicer::finish()
     if (!fHasDeclaration) {
         throw XmlError(Kind::kInvalid, fPlace, "Expected <?xml ... ?> style declaration");
     }
-    const bool onlyBlanks = rest().find_first_not_of(" \t\r\n") == std::string_view::npos;
-    if (!fHasRoot || !fOpen.empty() || fSliceDepth > 0 || !onlyBlanks) {
+    if (!fHasRoot || !fOpen.empty() || fSliceDepth > 0 || !isPadding(rest())) {
         throw XmlError(Kind::kNotWellFormed, fPlace, "the answer ends before its XML does");
     }
 }

@@ -13,9 +13,10 @@
 namespace Pegasus::wire {
 namespace {
 
-constexpr std::string_view kBlanks = " \t\r\n";
 // &#x10FFFF; and a few leading zeros.
 constexpr std::size_t kMaxReferenceBytes = 16;
+
+constexpr std::string_view kEncodings[] = {"utf-8", "us-ascii", "iso-8859-1"};
 
 struct Entity
 {
@@ -24,17 +25,12 @@ struct Entity
 };
 constexpr Entity kEntities[] = {{"lt", '<'}, {"gt", '>'}, {"amp", '&'}, {"quot", '"'}, {"apos", '\''}};
 
-constexpr bool isForbidden(char c)
-{
-    return static_cast<unsigned char>(c) < 0x20 && c != '\t' && c != '\n' && c != '\r';
-}
-
 // Per byte: 1 when it means itself in a message.
 constexpr std::array<unsigned char, 256> kPlain = [] {
     std::array<unsigned char, 256> plain{};
     for (std::size_t i = 0; i < plain.size(); ++i) {
         const char c = static_cast<char>(i);
-        plain[i] = c != '&' && c != '\r' && !isForbidden(c) ? 1 : 0;
+        plain[i] = c != '&' && c != '\r' ? 1 : 0;
     }
     return plain;
 }();
@@ -141,6 +137,17 @@ std::string_view trimBlanks(std::string_view text)
     return text.substr(first, text.find_last_not_of(kBlanks) - first + 1);
 }
 
+bool isBlank(std::string_view text)
+{
+    return text.find_first_not_of(kBlanks) == std::string_view::npos;
+}
+
+bool isPadding(std::string_view text)
+{
+    return std::all_of(text.begin(), text.end(),
+                       [](char c) { return c == '\0' || kBlanks.find(c) != std::string_view::npos; });
+}
+
 bool needsResolving(std::string_view text)
 {
     for (const char c : text) {
@@ -155,9 +162,6 @@ std::string resolveReferences(std::string_view text, std::string& out)
 {
     for (std::size_t i = 0; i < text.size(); ++i) {
         const char c = text[i];
-        if (isForbidden(c)) {
-            return "a control character";
-        }
         if (c == '\r') {
             out += '\n';
             i += i + 1 < text.size() && text[i + 1] == '\n' ? 1 : 0;
@@ -175,6 +179,14 @@ std::string resolveReferences(std::string_view text, std::string& out)
         }
     }
     return std::string();
+}
+
+bool isZeroReference(std::string_view text)
+{
+    const std::string_view zeros =
+        text.substr(0, 3) == "&#x" ? text.substr(3) : text.substr(std::min<std::size_t>(2, text.size()));
+    return text.substr(0, 2) == "&#" && zeros.size() > 1 && zeros.find_first_not_of('0') == zeros.size() - 1 &&
+           zeros.back() == ';';
 }
 
 void appendNormalized(std::string& out, std::string_view text)
@@ -195,7 +207,8 @@ void checkXmlDeclaration(std::string_view declaration, XmlPlace place)
         throw XmlError(XmlError::Kind::kInvalid, place, "Expected <?xml ... ?> style declaration with version 1.x");
     }
     const auto encoding = pseudoAttribute(declaration, "encoding");
-    if (encoding && !base::equalNoCase(*encoding, "utf-8")) {
+    const auto isTaken = [&](std::string_view name) { return base::equalNoCase(*encoding, name); };
+    if (encoding && std::none_of(std::begin(kEncodings), std::end(kEncodings), isTaken)) {
         throw XmlError(XmlError::Kind::kInvalid, place, "unsupported encoding \"" + std::string(*encoding) + "\"");
     }
 }

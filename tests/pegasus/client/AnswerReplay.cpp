@@ -178,6 +178,7 @@ std::vector<bool> markupBytes(std::string_view answer)
               marks.begin() + static_cast<std::ptrdiff_t>(body.back()), true);
     char quote = 0;
     bool inTag = false;
+    bool inAttributes = false;
     for (const std::size_t i : body) {
         const char c = answer[i];
         if (!inTag) {
@@ -187,7 +188,9 @@ std::vector<bool> markupBytes(std::string_view answer)
             marks[i] = c == quote;
             quote = c == quote ? 0 : quote;
         } else {
-            marks[i] = true;
+            inAttributes = (inAttributes || c == ' ') && c != '>';
+            // Attributes of other names are ignored, so a changed name or blank may be.
+            marks[i] = !inAttributes || std::string_view("=/<>\"'").find(c) != std::string_view::npos;
             quote = c == '"' || c == '\'' ? c : 0;
             inTag = c != '>';
         }

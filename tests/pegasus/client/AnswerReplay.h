@@ -26,8 +26,8 @@ std::string readAnswer(const AnswerCase& answer, const std::vector<std::size_t>&
 // Answers with every kind of element, chunks, trailers and errors.
 std::vector<AnswerCase> sampleAnswers();
 
-// For each byte of the answer: does it belong to the XML's markup (tags, minus the values of attributes) or to the
-// framing of chunks? Elsewhere a changed byte is other valid data.
+// For each byte of the answer: does it belong to the XML's markup (tags, minus the names and values of attributes) or
+// to the framing of chunks? Elsewhere a changed byte is other valid data.
 std::vector<bool> markupBytes(std::string_view answer);
 
 } // namespace test

@@ -59,6 +59,7 @@ TEST(HttpAnswerReaderTest, ReadsTheSameHoweverTheBytesArrive)
          "200|abcde|6|not there|keep"},
         {"error", "HTTP/1.1 400 Bad\r\nCIMError: x\r\nPGErrorDetail: %3Cy%3E\r\nContent-Length: 0\r\n\r\n",
          "400||-|x<y>|keep"},
+        {"the answer to an M-POST", "HTTP/1.1 400 Bad\r\n73-CIMError: x\r\nContent-Length: 0\r\n\r\n", "400||-|x|keep"},
         {"bytes after it", kHead + "Content-Length: 1\r\n\r\nabc", "200|a|-||close"},
         {"cut in the body", kHead + "Content-Length: 3\r\n\r\nab", "200|ab|incomplete"},
         {"cut after the last chunk's line", kChunked + "0\r\nX", "200||incomplete"},
