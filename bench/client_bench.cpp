@@ -286,7 +286,7 @@ void benchOverlap()
     connection.setAddress(address);
     connection.open(base::Deadline::after(std::chrono::seconds(10)));
     wire::IntrinsicCall call("EnumerateInstances", kNameSpace);
-    const client::Request request = client::makeRequest(call, true);
+    const client::Request request = client::makeRequest(call);
     const std::string message = client::encodeHttpRequest(request, "1000", address.text(), {});
     TCost overlapped;
     TCost inTurn;

@@ -11,7 +11,7 @@ using wire::ElementDecoder;
 using wire::IntrinsicCall;
 using wire::XmlElement;
 
-void failUnexpected(const XmlElement& element)
+[[noreturn]] void failUnexpected(const XmlElement& element)
 {
     element.fail(wire::XmlError::Kind::kInvalid,
                  "Expected close of IRETURNVALUE element, got " + std::string(element.name()) + " instead");
@@ -56,9 +56,6 @@ CIMParamValue asOutput(const CIMParamValue& output)
 {
     return output.getValue().isNull() ? CIMParamValue(output.getParameterName(), CIMValue(), false) : output;
 }
-
-constexpr bool kReads = true;
-constexpr bool kWrites = false;
 
 } // namespace
 
@@ -111,7 +108,7 @@ CIMClass CIMClient::getClass(const CIMNamespaceName& nameSpace, const CIMName& c
         .flag("IncludeQualifiers", includeQualifiers, true)
         .flag("IncludeClassOrigin", includeClassOrigin, false)
         .propertyList(propertyList);
-    return readOne(*fRep, makeRequest(call, kReads), "CLASS", &ElementDecoder::decodeClass);
+    return readOne(*fRep, makeRequest(call), "CLASS", &ElementDecoder::decodeClass);
 }
 
 Array<CIMClass> CIMClient::enumerateClasses(const CIMNamespaceName& nameSpace, const CIMName& className,
@@ -124,7 +121,7 @@ Array<CIMClass> CIMClient::enumerateClasses(const CIMNamespaceName& nameSpace, c
         .flag("LocalOnly", localOnly, true)
         .flag("IncludeQualifiers", includeQualifiers, true)
         .flag("IncludeClassOrigin", includeClassOrigin, false);
-    return readAll(*fRep, makeRequest(call, kReads), &ElementDecoder::decodeClass);
+    return readAll(*fRep, makeRequest(call), &ElementDecoder::decodeClass);
 }
 
 Array<CIMName> CIMClient::enumerateClassNames(const CIMNamespaceName& nameSpace, const CIMName& className,
@@ -132,14 +129,14 @@ Array<CIMName> CIMClient::enumerateClassNames(const CIMNamespaceName& nameSpace,
 {
     IntrinsicCall call("EnumerateClassNames", nameSpace);
     call.className("ClassName", className).flag("DeepInheritance", deepInheritance, false);
-    return readAll(*fRep, makeRequest(call, kReads), &ElementDecoder::decodeClassName);
+    return readAll(*fRep, makeRequest(call), &ElementDecoder::decodeClassName);
 }
 
 void CIMClient::createClass(const CIMNamespaceName& nameSpace, const CIMClass& newClass)
 {
     IntrinsicCall call("CreateClass", nameSpace);
     call.newClass(newClass);
-    readNothing(*fRep, makeRequest(call, kWrites));
+    readNothing(*fRep, makeRequest(call));
 }
 
 CIMInstance CIMClient::getInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& instanceName,
@@ -152,7 +149,7 @@ CIMInstance CIMClient::getInstance(const CIMNamespaceName& nameSpace, const CIMO
         .flag("IncludeQualifiers", includeQualifiers, false)
         .flag("IncludeClassOrigin", includeClassOrigin, false)
         .propertyList(propertyList);
-    return readOne(*fRep, makeRequest(call, kReads), "INSTANCE", &ElementDecoder::decodeInstance);
+    return readOne(*fRep, makeRequest(call), "INSTANCE", &ElementDecoder::decodeInstance);
 }
 
 Array<CIMInstance> CIMClient::enumerateInstances(const CIMNamespaceName& nameSpace, const CIMName& className,
@@ -166,42 +163,41 @@ Array<CIMInstance> CIMClient::enumerateInstances(const CIMNamespaceName& nameSpa
         .flag("IncludeQualifiers", includeQualifiers, false)
         .flag("IncludeClassOrigin", includeClassOrigin, false)
         .propertyList(propertyList);
-    return readAll(*fRep, makeRequest(call, kReads), &ElementDecoder::decodeNamedInstance);
+    return readAll(*fRep, makeRequest(call), &ElementDecoder::decodeNamedInstance);
 }
 
 Array<CIMObjectPath> CIMClient::enumerateInstanceNames(const CIMNamespaceName& nameSpace, const CIMName& className)
 {
     IntrinsicCall call("EnumerateInstanceNames", nameSpace);
     call.className("ClassName", className);
-    return readAll(*fRep, makeRequest(call, kReads), &ElementDecoder::decodeInstanceName);
+    return readAll(*fRep, makeRequest(call), &ElementDecoder::decodeInstanceName);
 }
 
 CIMObjectPath CIMClient::createInstance(const CIMNamespaceName& nameSpace, const CIMInstance& newInstance)
 {
     IntrinsicCall call("CreateInstance", nameSpace);
     call.newInstance(newInstance);
-    return readOne(*fRep, makeRequest(call, kWrites), "INSTANCENAME", &ElementDecoder::decodeInstanceName);
+    return readOne(*fRep, makeRequest(call), "INSTANCENAME", &ElementDecoder::decodeInstanceName);
 }
 
 CIMQualifierDecl CIMClient::getQualifier(const CIMNamespaceName& nameSpace, const CIMName& qualifierName)
 {
     IntrinsicCall call("GetQualifier", nameSpace);
     call.text("QualifierName", qualifierName.getString());
-    return readOne(*fRep, makeRequest(call, kReads), "QUALIFIER.DECLARATION",
-                   &ElementDecoder::decodeQualifierDeclaration);
+    return readOne(*fRep, makeRequest(call), "QUALIFIER.DECLARATION", &ElementDecoder::decodeQualifierDeclaration);
 }
 
 Array<CIMQualifierDecl> CIMClient::enumerateQualifiers(const CIMNamespaceName& nameSpace)
 {
     IntrinsicCall call("EnumerateQualifiers", nameSpace);
-    return readAll(*fRep, makeRequest(call, kReads), &ElementDecoder::decodeQualifierDeclaration);
+    return readAll(*fRep, makeRequest(call), &ElementDecoder::decodeQualifierDeclaration);
 }
 
 void CIMClient::setQualifier(const CIMNamespaceName& nameSpace, const CIMQualifierDecl& qualifierDeclaration)
 {
     IntrinsicCall call("SetQualifier", nameSpace);
     call.qualifierDeclaration(qualifierDeclaration);
-    readNothing(*fRep, makeRequest(call, kWrites));
+    readNothing(*fRep, makeRequest(call));
 }
 
 CIMValue CIMClient::invokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPath& instanceName,
@@ -210,15 +206,15 @@ CIMValue CIMClient::invokeMethod(const CIMNamespaceName& nameSpace, const CIMObj
 {
     CIMValue returnValue;
     Array<CIMParamValue> outputs;
-    bool isFirst = true;
+    bool hasReturned = false;
     fRep->exchange(client::makeMethodRequest(nameSpace, instanceName, methodName, inParameters),
                    [&](const XmlElement& element, ElementDecoder& decoder) {
-                       if (isFirst && element.is("RETURNVALUE")) {
+                       if (!hasReturned && element.is("RETURNVALUE")) {
                            returnValue = decoder.decodeReturnValue(element);
+                           hasReturned = true;
                        } else {
                            outputs.append(asOutput(decoder.decodeParamValue(element)));
                        }
-                       isFirst = false;
                    });
     outParameters = outputs;
     return returnValue;

@@ -157,39 +157,31 @@ void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHan
     const client::ExpectedResponse expected{nextMessageId(), request.method, request.isIntrinsic, request.result};
     const std::string message = client::encodeHttpRequest(request, expected.messageId, fAddress->text(),
                                                           fAddress->isLocal ? localUser() : std::string());
-    if (fConnection.isOpen() && fConnection.isStale()) {
+    ResponseReader reader(expected, fDecoder, onContent);
+    HttpAnswerReader response(fLimits.http, checkHeader, [&](std::string_view body) { reader.feed(body); });
+    send(message, deadline);
+    receive(response, deadline);
+    if (!response.isComplete()) {
+        throw wire::XmlError(wire::XmlError::Kind::kInvalid, reader.place(),
+                             "the connection was closed inside the answer");
+    }
+    if (!response.keepsAlive()) {
         fConnection.close();
     }
-    bool mayRepeat = fConnection.isOpen() && fConnection.hasReceived() && request.isRepeatable;
-    for (;;) {
-        ResponseReader reader(expected, fDecoder, onContent);
-        HttpAnswerReader response(fLimits.http, checkHeader, [&](std::string_view body) { reader.feed(body); });
-        if (sendAndReceive(message, response, deadline) == Outcome::kNothingReceived) {
-            if (!mayRepeat) {
-                throw CIMClientMalformedHTTPException(kClosed);
-            }
-            mayRepeat = false; // an idle connection that the server had given up; once more on a new one
-            continue;
-        }
-        if (!response.isComplete()) {
-            throw wire::XmlError(wire::XmlError::Kind::kInvalid, reader.place(),
-                                 "the connection was closed inside the answer");
-        }
-        if (!response.keepsAlive()) {
-            fConnection.close();
-        }
-        checkStatusField(response.fields());
-        reader.finish();
-        if (reader.error() && reader.error()->getCode() != CIM_ERR_SUCCESS) {
-            throw *reader.error();
-        }
-        return;
+    checkStatusField(response.fields());
+    reader.finish();
+    if (reader.error() && reader.error()->getCode() != CIM_ERR_SUCCESS) {
+        throw *reader.error();
     }
 }
 
-CIMClientRep::Outcome CIMClientRep::sendAndReceive(const std::string& message, HttpAnswerReader& response,
-                                                   const Deadline& deadline)
+// A server may act on a request whose first bytes it has, so a request is sent once. An idle connection that the server
+// has given up is noticed before.
+void CIMClientRep::send(const std::string& message, const Deadline& deadline)
 {
+    if (fConnection.isOpen() && fConnection.isStale()) {
+        fConnection.close();
+    }
     if (!fConnection.isOpen()) {
         fConnection.open(deadline);
     }
@@ -197,10 +189,9 @@ CIMClientRep::Outcome CIMClientRep::sendAndReceive(const std::string& message, H
     if (fConnection.send(message, deadline) == Result::kTimedOut) {
         throw ConnectionTimeoutException();
     }
-    return receive(response, deadline);
 }
 
-CIMClientRep::Outcome CIMClientRep::receive(HttpAnswerReader& response, const Deadline& deadline)
+void CIMClientRep::receive(HttpAnswerReader& response, const Deadline& deadline)
 {
     fReceiveBuffer.resize(kReceiveBytes);
     bool isFirst = true;
@@ -212,11 +203,8 @@ CIMClientRep::Outcome CIMClientRep::receive(HttpAnswerReader& response, const De
         }
         if (result == Result::kClosed) {
             fConnection.close();
-            if (isFirst) {
-                return Outcome::kNothingReceived;
-            }
             if (!response.hasHeader()) {
-                throw CIMClientMalformedHTTPException("Missing CIMOperation HTTP header");
+                throw CIMClientMalformedHTTPException(isFirst ? kClosed : "Missing CIMOperation HTTP header");
             }
             response.endOfConnection();
             break;
@@ -224,7 +212,6 @@ CIMClientRep::Outcome CIMClientRep::receive(HttpAnswerReader& response, const De
         isFirst = false;
         response.feed(std::string_view(fReceiveBuffer.data(), received));
     }
-    return Outcome::kAnswered;
 }
 
 } // namespace Pegasus

@@ -43,22 +43,15 @@ class CIMClientRep
     void connect(const client::ServerAddress& address);
     void disconnect();
 
-    // Sends the request and passes each element of the result to `onContent`. After a failure the connection is closed
-    // and the next call opens a new one. An ERROR element with the code 0 is a success with an empty result. Throws:
-    // what CIMClient's operations throw.
+    // Sends the request, once, and passes each element of the result to `onContent`. After a failure the connection is
+    // closed and the next call opens a new one. An ERROR element with the code 0 is a success with an empty result.
+    // Throws: what CIMClient's operations throw.
     void exchange(const client::Request& request, const ContentHandler& onContent);
 
   private:
-    enum class Outcome
-    {
-        kAnswered,
-        kNothingReceived // the server closed the connection before it answered
-    };
-
     void exchangeOnce(const client::Request& request, const ContentHandler& onContent);
-    Outcome sendAndReceive(const std::string& message, wire::HttpAnswerReader& response,
-                           const base::Deadline& deadline);
-    Outcome receive(wire::HttpAnswerReader& response, const base::Deadline& deadline);
+    void send(const std::string& message, const base::Deadline& deadline);
+    void receive(wire::HttpAnswerReader& response, const base::Deadline& deadline);
 
     client::ClientLimits fLimits;
     wire::ElementDecoder fDecoder{fLimits.xml}; // kept, so that the names of all answers share their texts

@@ -17,13 +17,12 @@ std::string encoded(const String& object)
 
 } // namespace
 
-Request makeRequest(wire::IntrinsicCall& call, bool isRepeatable)
+Request makeRequest(wire::IntrinsicCall& call)
 {
     Request request;
     request.method = call.method();
     request.object = encoded(call.nameSpace().getString());
     request.call = call.finish();
-    request.isRepeatable = isRepeatable;
     return request;
 }
 

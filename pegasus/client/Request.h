@@ -14,13 +14,11 @@ struct Request
     std::string object; // for the CIMObject field, percent-encoded
     std::string call;   // the METHODCALL or IMETHODCALL element
     bool isIntrinsic = true;
-    // May it be sent again when the answer was lost? True for what only reads.
-    bool isRepeatable = false;
     std::string_view result; // the element that an answer without an error has; empty when it may have none
 };
 
 // The call is empty afterwards.
-Request makeRequest(wire::IntrinsicCall& call, bool isRepeatable);
+Request makeRequest(wire::IntrinsicCall& call);
 
 // A call of a provider's method. Throws: InvalidNamespaceNameException (null).
 Request makeMethodRequest(const CIMNamespaceName& nameSpace, const CIMObjectPath& path, const CIMName& method,

@@ -69,7 +69,6 @@ void ServerConnection::setAddress(const ServerAddress& address)
 void ServerConnection::open(const Deadline& deadline)
 {
     close();
-    fHasReceived = false;
     if (fAddress.isLocal) {
         openLocal(base::localSocketHome(), "Cannot connect to local CIM server. Connection failed.", deadline);
     } else if (isLocalRoute()) {
@@ -194,7 +193,6 @@ ServerConnection::Result ServerConnection::receive(char* buffer, std::size_t cap
         const ssize_t count = ::recv(fFd, buffer, capacity, 0);
         if (count >= 0) {
             received = static_cast<std::size_t>(count);
-            fHasReceived = true;
             return count == 0 ? Result::kClosed : Result::kDone;
         }
         if (!isRetry(errno)) {

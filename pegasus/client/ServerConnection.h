@@ -49,8 +49,6 @@ class ServerConnection
     void open(const base::Deadline& deadline);
     void close();
     bool isOpen() const { return fFd >= 0; }
-    // Returns: whether the server has sent anything on it.
-    bool hasReceived() const { return fHasReceived; }
     // Returns: whether the server has closed the idle connection, or sent unrequested bytes.
     bool isStale() const;
 
@@ -70,7 +68,6 @@ class ServerConnection
     ServerAddress fAddress;
     std::shared_ptr<addrinfo> fCandidates; // what a host name was looked up to; null for the private socket
     int fFd = -1;
-    bool fHasReceived = false;
 };
 
 } // namespace Pegasus::client

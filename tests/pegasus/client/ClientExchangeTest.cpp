@@ -357,26 +357,20 @@ TEST(ClientConnection, NullNamespaceIsRefusedAndTheClientLives)
     EXPECT_EQ(getClassOutcome(client), "ok");
 }
 
-TEST(ClientConnection, OnlyWhatReadsIsSentAgainAfterALostAnswer)
+TEST(ClientConnection, RequestIsSentOnceWhateverItAsks)
 {
     // The second request of each connection finds it closed, as when a server gives up an idle one.
-    const auto answer = [](const PeerRequest& request) -> PeerAnswer {
+    test::ScriptedPeer peer([](const PeerRequest& request) -> PeerAnswer {
         static thread_local std::size_t served = 0;
-        if (++served % 2 == 0) {
-            return test::closedConnection();
-        }
-        return request.method() == "CreateClass" ? test::httpAnswer(test::intrinsicBodyWithout(request))
-                                                 : good(request);
-    };
-    test::ScriptedPeer peer(answer);
+        return ++served % 2 == 0 ? test::closedConnection() : good(request);
+    });
     CIMClient client;
     connect(client, peer);
-    EXPECT_EQ(getClassOutcome(client), "ok");
-    EXPECT_EQ(getClassOutcome(client), "ok") << "a read is repeated on a new connection";
-    EXPECT_EQ(peer.requests().size(), 3u);
-    EXPECT_EQ(outcome([&] { client.createClass(kNameSpace, fanClass()); }),
-              "Pegasus::CIMClientMalformedHTTPException: Connection closed by CIM Server.");
-    EXPECT_EQ(peer.requests().size(), 4u) << "a write is not";
+    for (std::size_t count = 1; count <= 4; ++count) {
+        EXPECT_EQ(getClassOutcome(client),
+                  count % 2 == 1 ? "ok" : "Pegasus::CIMClientMalformedHTTPException: Connection closed by CIM Server.");
+        EXPECT_EQ(peer.requests().size(), count);
+    }
 }
 
 TEST(ClientConnection, SocketsAreCloseOnExecAndBrokenOnesRaiseNoSignal)
@@ -433,9 +427,10 @@ TEST(ClientMethods, OutputsReplaceWhatWasThereAndNullsHaveNoType)
 {
     test::ServedModel model;
     model.addMethod("Spin", [](const PeerRequest& request) {
-        return test::methodAnswer(
-            request, CIMValue(Uint32(7)),
-            {CIMParamValue("a", CIMValue(String("x"))), CIMParamValue("b", CIMValue(CIMTYPE_UINT16, false))});
+        return test::httpAnswer(test::extrinsicBody( // OpenPegasus takes the return value at any place
+            request, "<PARAMVALUE NAME=\"a\" PARAMTYPE=\"string\"><VALUE>x</VALUE></PARAMVALUE>"
+                     "<RETURNVALUE PARAMTYPE=\"uint32\"><VALUE>7</VALUE></RETURNVALUE>"
+                     "<PARAMVALUE NAME=\"b\" PARAMTYPE=\"uint16\"/>"));
     });
     test::ScriptedPeer peer(model.handler());
     CIMClient client;

@@ -102,7 +102,7 @@ const TFaultRow kFaults[] = {
     {"longer than announced",
      [](const auto&, const auto& body) { return test::withWrongLength(test::httpAnswer(body), -5); }, true},
     {"not HTTP", [](const auto&, const auto&) { return test::notHttp(); }, true},
-    {"closed: asked again", [](const auto&, const auto&) { return test::closedConnection(); }, false},
+    {"closed without an answer", [](const auto&, const auto&) { return test::closedConnection(); }, true},
     {"an HTTP error", [](const auto&, const auto&) { return test::httpErrorAnswer(503, "Busy"); }, true},
     {"bad XML",
      [](const auto&, const auto& body) { return test::withReplaced(test::httpAnswer(body), "</CIM>", "</CIX>"); },
