@@ -28,7 +28,13 @@ AgentSettings agentSettings(const Config& config)
     settings.providerDirectories = config.directories("providerDir");
     settings.timeout = config.seconds("providerTimeout");
     settings.idle = config.seconds("agentIdleTimeout");
-    settings.process = {config.number("agentMemoryMegabytes"), config.flag("strictOwners")};
+    settings.confinement.memoryMegabytes = config.number("agentMemoryMegabytes");
+    settings.confinement.fileMegabytes = config.number("agentFileMegabytes");
+    settings.confinement.coreMegabytes = config.number("agentCoreMegabytes");
+    settings.confinement.processes = config.number("agentProcesses");
+    settings.confinement.newPrivileges = config.flag("agentNewPrivileges");
+    settings.confinement.capabilities = parseCapabilities(config.text("agentCapabilities")).value_or(0);
+    settings.confinement.strictOwners = config.flag("strictOwners");
     return settings;
 }
 

@@ -12,9 +12,11 @@
 namespace Pegasus::cmpi {
 namespace {
 
-CIMException noInterface(const std::string& provider, const char* kind, CIMStatusCode code)
+CIMException noInterface(const ProviderLibrary& library, const std::string& provider, const char* kind,
+                         CIMStatusCode code)
 {
-    return {code, base::fromUtf8Repaired("provider " + provider + " has no " + kind + " interface")};
+    return {code, base::fromUtf8Repaired("provider " + provider + " has no " + kind +
+                                         " interface: " + library.missingFactories(kind, provider))};
 }
 
 template <typename Interface> CMPIrc end(Interface*& mi, const CMPIContext& context, bool terminating)
@@ -89,7 +91,7 @@ CMPIInstanceMI& ProviderInterfaces::instance(const std::string& provider)
 {
     CMPIInstanceMI* mi = obtain(&Provider::instance, "Instance", provider);
     if (mi == nullptr) {
-        throw noInterface(provider, "instance", CIM_ERR_NOT_SUPPORTED);
+        throw noInterface(fLibrary, provider, "Instance", CIM_ERR_NOT_SUPPORTED);
     }
     return *mi;
 }
@@ -98,7 +100,7 @@ CMPIMethodMI& ProviderInterfaces::method(const std::string& provider)
 {
     CMPIMethodMI* mi = obtain(&Provider::method, "Method", provider);
     if (mi == nullptr) {
-        throw noInterface(provider, "method", CIM_ERR_METHOD_NOT_AVAILABLE);
+        throw noInterface(fLibrary, provider, "Method", CIM_ERR_METHOD_NOT_AVAILABLE);
     }
     return *mi;
 }

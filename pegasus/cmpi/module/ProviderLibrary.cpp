@@ -28,6 +28,13 @@ std::string factoryOf(const std::string& provider, const std::string& kind)
 
 const std::string kGeneric = "_Generic";
 
+std::string initFailure(const std::string& path, const std::string& provider, const std::string& factory,
+                        const std::string& reason)
+{
+    return "ProviderInitFailure: Error initializing " + path + ", provider " + provider + ", " + factory + ": " +
+           reason;
+}
+
 } // namespace
 
 ProviderLibrary::ProviderLibrary(const std::string& path)
@@ -84,10 +91,7 @@ void* ProviderLibrary::createAny(const std::string& kind, const std::string& pro
     if (specific == nullptr && generic == nullptr) {
         return nullptr;
     }
-    const auto fail = [&](const char* reason) {
-        throw failure("ProviderInitFailure: Error initializing " + fPath + ", provider " + provider + ", " + name +
-                      ": " + reason);
-    };
+    const auto fail = [&](const char* reason) { throw failure(initFailure(fPath, provider, name, reason)); };
     CMPIStatus status{CMPI_RC_OK, nullptr};
     const auto create = [&] {
         return specific != nullptr ? reinterpret_cast<Specific>(specific)(&broker, &context, &status)
@@ -99,6 +103,18 @@ void* ProviderLibrary::createAny(const std::string& kind, const std::string& pro
         fail(hasText ? static_cast<const char*>(status.msg->hdl) : "the factory gave no interface");
     }
     return made;
+}
+
+void ProviderLibrary::failWithoutTable(const std::string& kind, const std::string& provider) const
+{
+    const std::string specific = factoryOf(provider, kind);
+    throw failure(initFailure(fPath, provider, symbol(specific) != nullptr ? specific : factoryOf(kGeneric, kind),
+                              "the interface has no function table"));
+}
+
+std::string ProviderLibrary::missingFactories(const std::string& kind, const std::string& provider) const
+{
+    return fPath + " defines neither " + factoryOf(provider, kind) + " nor " + factoryOf(kGeneric, kind);
 }
 
 std::string findProviderLibrary(const std::vector<std::string>& directories, const std::string& location,

@@ -22,20 +22,30 @@ class ProviderLibrary
     // Throws: CIM_ERR_FAILED "ProviderLoadFailure: ...".
     void requireProvider(const std::string& provider) const;
 
+    // Returns: a sentence that names the library and the functions that would make a provider's interface of this kind.
+    std::string missingFactories(const std::string& kind, const std::string& provider) const;
+
     // Makes the provider's interface of one kind ("Instance", "Method") by its factory.
     // Returns: null when the library lacks a factory of that kind for the provider.
-    // Throws: CIM_ERR_FAILED "ProviderInitFailure: ..." when the factory fails.
+    // Throws: CIM_ERR_FAILED "ProviderInitFailure: ..." when the factory fails, or its interface lacks a function
+    // table.
     template <typename Interface>
     Interface* create(const std::string& kind, const std::string& provider, const CMPIBroker& broker,
                       const CMPIContext& context) const
     {
-        return static_cast<Interface*>(createAny(kind, provider, broker, context));
+        auto* const made = static_cast<Interface*>(createAny(kind, provider, broker, context));
+        if (made != nullptr && made->ft == nullptr) {
+            failWithoutTable(kind, provider);
+        }
+        return made;
     }
 
   private:
     void* symbol(const std::string& name) const;
     void* createAny(const std::string& kind, const std::string& provider, const CMPIBroker& broker,
                     const CMPIContext& context) const;
+
+    [[noreturn]] void failWithoutTable(const std::string& kind, const std::string& provider) const;
 
     std::string fPath;
     void* fHandle;

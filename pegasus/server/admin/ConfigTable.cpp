@@ -1,5 +1,7 @@
 #include "pegasus/server/admin/ConfigTable.h"
 
+#include "pegasus/server/admin/Capabilities.h"
+
 #include <algorithm>
 #include <charconv>
 #include <cstring>
@@ -8,6 +10,17 @@
 #include <unistd.h>
 
 namespace Pegasus::server {
+
+namespace {
+
+// What libraries that read and set up hardware use: raw access to devices, memory and network interfaces, device files,
+// other users' files, and helper programs under another user. Left out is what changes the system around them: kernel
+// modules, clock, restart, the limits of resources, security policies.
+constexpr const char* kAgentCapabilities =
+    "chown,dac_override,dac_read_search,fowner,fsetid,kill,setgid,setuid,net_bind_service,net_broadcast,net_admin,"
+    "net_raw,ipc_lock,ipc_owner,sys_rawio,sys_chroot,sys_ptrace,sys_admin,sys_nice,mknod,audit_write,syslog";
+
+} // namespace
 
 const std::vector<ConfigProperty>& configTable()
 {
@@ -36,7 +49,16 @@ const std::vector<ConfigProperty>& configTable()
          "bytes of an answer for a client that takes no chunked one with trailers"},
         {"providerTimeout", "600", Kind::kCount, true, "seconds of silence after which a provider's agent is ended"},
         {"agentIdleTimeout", "300", Kind::kCountOrZero, true, "seconds after which an idle agent is ended; 0: never"},
-        {"agentMemoryMegabytes", "4096", Kind::kCountOrZero, true, "memory that an agent may take; 0: any"},
+        {"agentMemoryMegabytes", "4096", Kind::kCountOrZero, true,
+         "private writable memory that an agent, and each process of its provider, may take; 0: any"},
+        {"agentFileMegabytes", "4096", Kind::kCountOrZero, true, "largest file that an agent may write; 0: any"},
+        {"agentCoreMegabytes", "0", Kind::kCountOrZero, true, "largest core file of an agent; 0: none"},
+        {"agentProcesses", "1024", Kind::kCountOrZero, true,
+         "processes and threads that may be added to the machine's by an agent of a user other than root; 0: any"},
+        {"agentNewPrivileges", "false", Kind::kBoolean, true,
+         "let agents gain privileges by programs with set-user-id bits or file capabilities"},
+        {"agentCapabilities", kAgentCapabilities, Kind::kCapabilities, true,
+         "capabilities that root's agents keep; all; none"},
     };
     return kTable;
 }
@@ -130,6 +152,8 @@ bool isValidConfigValue(const ConfigProperty& property, const std::string& value
         return areReadableDirectories(splitDirectoryList(value, home));
     case ConfigProperty::Kind::kLogLevel:
         return isLogLevel(value);
+    case ConfigProperty::Kind::kCapabilities:
+        return parseCapabilities(value).has_value();
     }
     return false;
 }

@@ -18,7 +18,8 @@ struct ConfigProperty
         kConsumer,    // becomes a part of a file name
         kDirectory,
         kDirectoryList, // colon-separated, each below the home directory unless absolute, each readable
-        kLogLevel
+        kLogLevel,
+        kCapabilities // as parseCapabilities() reads them
     };
 
     const char* name;

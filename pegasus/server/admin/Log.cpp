@@ -62,19 +62,7 @@ std::string stamp()
 
 std::string formatLine(LogLevel severity, const std::string& text)
 {
-    std::string line = stamp() + " [" + std::to_string(::getpid()) + "] " + label(severity) + ": ";
-    for (const char c : text) {
-        if (c == '\n') {
-            line += "\\n";
-        } else if (static_cast<unsigned char>(c) < 0x20 || c == 0x7f) { // a terminal must not obey a vendor's text
-            char escape[8];
-            std::snprintf(escape, sizeof escape, "\\x%02x", static_cast<unsigned>(static_cast<unsigned char>(c)));
-            line += escape;
-        } else {
-            line += c;
-        }
-    }
-    return line + "\n";
+    return stamp() + " [" + std::to_string(::getpid()) + "] " + label(severity) + ": " + printable(text) + "\n";
 }
 
 void put(int fd, const std::string& line)
@@ -85,6 +73,23 @@ void put(int fd, const std::string& line)
 }
 
 } // namespace
+
+std::string printable(std::string_view text)
+{
+    std::string shown;
+    for (const char c : text) {
+        if (c == '\n') {
+            shown += "\\n";
+        } else if (static_cast<unsigned char>(c) < 0x20 || c == 0x7f) {
+            char escape[8];
+            std::snprintf(escape, sizeof escape, "\\x%02x", static_cast<unsigned>(static_cast<unsigned char>(c)));
+            shown += escape;
+        } else {
+            shown += c;
+        }
+    }
+    return shown;
+}
 
 void Log::open(const std::string& home, bool alsoToStandardError) noexcept
 try {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <string>
+#include <string_view>
 
 namespace Pegasus::server {
 
@@ -12,6 +13,9 @@ enum class LogLevel
     kInformation,
     kDebug
 };
+
+// Returns: the text with its control bytes as "\\n", "\\x1b", so that a terminal which shows it obeys none of them.
+std::string printable(std::string_view text);
 
 // The server's log: one line an event, appended to <home>/cimserver.log (mode 0600). Past kMaxLogBytes the file is
 // renamed to cimserver.log.1, and a new one begins. Control bytes are written as "\n", "\x1b".

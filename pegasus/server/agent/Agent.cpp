@@ -2,20 +2,21 @@
 
 #include "pegasus/server/admin/ConfigFile.h"
 #include "pegasus/server/admin/Log.h"
+#include "pegasus/server/agent/AgentConfinement.h"
 #include "pegasus/server/agent/AgentHandler.h"
+#include "pegasus/server/agent/AgentKeeper.h"
 #include "pegasus/server/agent/AgentProcess.h"
 #include "pegasus/server/agent/AgentServices.h"
 
 #include <cerrno>
 #include <condition_variable>
-#include <cstdlib>
+#include <cstdio>
 #include <cstring>
-#include <system_error>
 #include <thread>
 
 #include <fcntl.h>
+#include <signal.h>
 #include <sys/prctl.h>
-#include <sys/resource.h>
 #include <sys/socket.h>
 
 namespace Pegasus::server {
@@ -96,34 +97,33 @@ base::Descriptor receiveChannel()
     return base::Descriptor(fd);
 }
 
-void limitMemory(std::size_t megabytes)
+// A provider that writes to a closed pipe, or beyond the limit of a file, gets an error; the signal would end its
+// agent. What it prints arrives line by line.
+void prepareForProviders()
 {
-#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__) // whose shadow memory is larger than any limit
-    if (megabytes == 0) {
-        return;
-    }
-    const rlimit limit = {megabytes << 20, megabytes << 20};
-    ::setrlimit(RLIMIT_AS, &limit);
-#else
-    (void)megabytes;
-#endif
+    ::signal(SIGPIPE, SIG_IGN);
+    ::signal(SIGXFSZ, SIG_IGN);
+    std::setvbuf(stdout, nullptr, _IOLBF, BUFSIZ);
 }
 
 } // namespace
 
 bool isAgentCommand(int argc, char** argv)
 {
-    return argc == 5 && std::strcmp(argv[1], "--agent") == 0;
+    return argc >= 3 && std::strcmp(argv[1], "--agent") == 0;
 }
 
 int runAgent(int, char** argv)
 {
-    ::prctl(PR_SET_NAME, kAgentProcessName);
     ::fcntl(kControlFd, F_SETFD, FD_CLOEXEC);
-    limitMemory(std::strtoul(argv[3], nullptr, 10));
+    splitOffKeeper(kControlFd);
+    ::prctl(PR_SET_NAME, kAgentProcessName);
+    const AgentConfinement confinement = agentConfinement(argv + 3);
+    confine(confinement);
+    prepareForProviders();
     Log::open(defaultHome(), false);
     AgentServices services(argv[2]);
-    auto handler = std::make_unique<AgentHandler>(argv[2], services, std::strcmp(argv[4], "any") != 0);
+    auto handler = std::make_unique<AgentHandler>(argv[2], services, confinement.strictOwners != 0);
     ChannelThreads threads;
     while (base::Descriptor channel = receiveChannel()) {
         threads.serve(std::move(channel), *handler);

@@ -5,6 +5,10 @@
 #include "pegasus/server/agent/AgentMessages.h"
 #include "pegasus/wire/ElementEncoder.h"
 
+#include <cstdlib>
+
+#include <unistd.h>
+
 namespace Pegasus::server {
 
 namespace {
@@ -35,6 +39,9 @@ cmpi::ProviderModule& AgentHandler::module(const HttpRequest& http)
             requireOwned(library);
         }
         fModule = std::make_unique<cmpi::ProviderModule>(fModuleName, library, fServices);
+        // A provider that calls exit() ends its agent as it says: this handler runs before the destructors of the
+        // library's objects, which its other threads may still use.
+        ::on_exit([](int status, void*) { ::_exit(status); }, nullptr);
     }
     return *fModule;
 }

@@ -1,5 +1,6 @@
 #include "pegasus/server/agent/AgentPool.h"
 
+#include "pegasus/base/Text.h"
 #include "pegasus/cmpi/module/ProviderLibrary.h"
 #include "pegasus/server/admin/Log.h"
 #include "pegasus/server/agent/AgentMessages.h"
@@ -18,7 +19,7 @@ constexpr std::chrono::seconds kUnloadTimeout{5};
 
 [[noreturn]] void fail(const std::string& text)
 {
-    throw CIMException(CIM_ERR_FAILED, String(text.c_str()));
+    throw CIMException(CIM_ERR_FAILED, base::fromUtf8Repaired(text));
 }
 
 std::chrono::seconds backOff(unsigned deaths)
@@ -110,12 +111,12 @@ std::shared_ptr<AgentProcess> AgentPool::acquire(const std::string& name)
                  " times without an answer; it is not started again yet.");
         }
         try {
-            module.process = std::make_shared<AgentProcess>(name, fMakeSettings().process);
+            module.process = std::make_shared<AgentProcess>(name, fMakeSettings().confinement);
         } catch (const std::system_error& error) {
             fail(error.what());
         }
-        Log::write(LogLevel::kInformation, "Started " + std::string(kAgentProcessName) + " \"" + name + "\", process " +
-                                               std::to_string(module.process->pid()) + ".");
+        Log::write(LogLevel::kInformation, "Started " + std::string(kAgentProcessName) + " \"" + name +
+                                               "\" under process " + std::to_string(module.process->pid()) + ".");
     }
     ++module.running;
     return module.process;
@@ -158,7 +159,9 @@ void AgentPool::lost(const std::string& name, const std::shared_ptr<AgentProcess
                        "A failure was detected in provider module " + name + ": " + reason + "; " + cause);
         }
     }
-    fail("Lost connection with cimprovagt \"" + name + "\". " + (cause.empty() ? reason : cause));
+    const std::string output = process->lastOutput();
+    fail("Lost connection with cimprovagt \"" + name + "\". " + (cause.empty() ? reason : cause) +
+         (output.empty() ? "" : "; its last output: " + output));
 }
 
 void AgentPool::shutDown() noexcept

@@ -14,7 +14,7 @@ struct AgentSettings
     std::vector<std::string> providerDirectories;
     std::chrono::milliseconds timeout = std::chrono::minutes(10); // of a provider's silence
     std::chrono::milliseconds idle = std::chrono::minutes(5);     // until an idle agent is ended; 0: never
-    AgentProcess::Options process;
+    AgentConfinement confinement;
 };
 
 // The agents, one a provider module: started at a module's first request, ended when idle, started again after a crash.

@@ -6,9 +6,11 @@
 #include <system_error>
 
 #include <fcntl.h>
+#include <poll.h>
 #include <signal.h>
 #include <spawn.h>
 #include <sys/socket.h>
+#include <sys/syscall.h>
 #include <sys/wait.h>
 
 extern char** environ;
@@ -43,10 +45,13 @@ struct SpawnPlan
     posix_spawn_file_actions_t actions{};
     posix_spawnattr_t attributes{};
 
-    explicit SpawnPlan(int control)
+    SpawnPlan(int control, int output)
     {
         ::posix_spawn_file_actions_init(&actions);
         ::posix_spawnattr_init(&attributes);
+        ::posix_spawn_file_actions_addopen(&actions, STDIN_FILENO, "/dev/null", O_RDWR, 0);
+        ::posix_spawn_file_actions_adddup2(&actions, output, STDOUT_FILENO);
+        ::posix_spawn_file_actions_adddup2(&actions, output, STDERR_FILENO);
         // spawnAgent() sees to it that `control` differs from 3: dup2 onto itself would keep close-on-exec.
         ::posix_spawn_file_actions_adddup2(&actions, control, kAgentControlFd);
         sigset_t none;
@@ -67,19 +72,24 @@ struct SpawnPlan
     SpawnPlan& operator=(const SpawnPlan&) = delete;
 };
 
-pid_t spawnAgent(const std::string& module, const AgentProcess::Options& options, base::Descriptor control)
+pid_t spawnAgent(const std::string& module, const AgentConfinement& confinement, base::Descriptor control,
+                 const base::Descriptor& output)
 {
     if (control.get() == kAgentControlFd) {
         control.reset(::fcntl(control.release(), F_DUPFD_CLOEXEC, kAgentControlFd + 1));
     }
-    const SpawnPlan plan(control.get());
-    std::string words[] = {kAgentProcessName, "--agent", module, std::to_string(options.memoryMegabytes),
-                           options.strictOwners ? "strict" : "any"};
-    char* argv[] = {words[0].data(), words[1].data(), words[2].data(), words[3].data(), words[4].data(), nullptr};
+    const SpawnPlan plan(control.get(), output.get());
+    std::vector<std::string> words = agentWords(confinement);
+    words.insert(words.begin(), {kAgentProcessName, "--agent", module});
+    std::vector<char*> argv;
+    for (std::string& word : words) {
+        argv.push_back(word.data());
+    }
+    argv.push_back(nullptr);
     pid_t pid = -1;
     // A process that runs through this link is called "exe" until it names itself; programs that look for cimserver
     // pass it over.
-    const int error = ::posix_spawn(&pid, "/proc/self/exe", &plan.actions, &plan.attributes, argv, environ);
+    const int error = ::posix_spawn(&pid, "/proc/self/exe", &plan.actions, &plan.attributes, argv.data(), environ);
     if (error != 0) {
         throw std::system_error(error, std::generic_category(), "cannot start the agent of module \"" + module + "\"");
     }
@@ -111,12 +121,17 @@ bool sendDescriptor(int control, int fd)
 
 } // namespace
 
-AgentProcess::AgentProcess(const std::string& module, const Options& options) : fModule(module)
+AgentProcess::AgentProcess(const std::string& module, const AgentConfinement& confinement)
+    : fModule(module), fOutput(module)
 {
     SocketPair control = makeSocketPair();
     fControl = std::move(control.ours);
-    fPid = spawnAgent(module, options, std::move(control.theirs));
+    fPid = spawnAgent(module, confinement, std::move(control.theirs), fOutput.open());
     try {
+        fEnd.reset(static_cast<int>(::syscall(SYS_pidfd_open, fPid, 0)));
+        if (!fEnd) {
+            throw std::system_error(errno, std::generic_category(), "cannot wait for an agent");
+        }
         fWatcher = std::thread([this] { watch(); });
     } catch (...) {
         ::kill(fPid, SIGKILL);
@@ -131,24 +146,30 @@ AgentProcess::~AgentProcess()
     if (!waitForEnd(base::Deadline::after(kGraceOfDestructor))) {
         kill();
     }
+    if (!waitForEnd(base::Deadline::after(kGraceOfDestructor))) { // the keeper has been stopped
+        signal(SIGKILL);
+    }
     fWatcher.join();
 }
 
 void AgentProcess::watch()
 {
-    // The process id stays ours until fEnded is set under the lock, so that kill() hits this process only.
-    siginfo_t info = {};
-    while (::waitid(P_PID, static_cast<id_t>(fPid), &info, WEXITED | WNOWAIT) != 0 && errno == EINTR) {
+    for (bool ended = false; !ended;) {
+        pollfd waits[] = {{fEnd.get(), POLLIN, 0}, {fOutput.fd(), POLLIN, 0}};
+        ::poll(waits, std::size(waits), fOutput.pollTimeoutMs());
+        fOutput.read();
+        ended = waits[0].revents != 0;
     }
-    ::kill(-fPid, SIGKILL); // what its provider started and left
+    fOutput.finish();
     const std::lock_guard<std::mutex> lock(fMutex);
+    // The process id stays ours until fEnded is set under the lock, so that signal() hits this process only.
     while (::waitpid(fPid, &fStatus, 0) < 0 && errno == EINTR) {
     }
     fEnded = true;
     fIdle.clear();
     for (const std::weak_ptr<AgentChannel>& entry : fInUse) {
         if (const std::shared_ptr<AgentChannel> channel = entry.lock()) {
-            channel->shutDown(); // a child in a session of its own may hold the other end
+            channel->shutDown(); // a process that survived its killing may hold the other end
         }
     }
     fChanged.notify_all();
@@ -203,10 +224,14 @@ void AgentProcess::close() noexcept
 
 void AgentProcess::kill() noexcept
 {
+    signal(SIGTERM); // to the keeper, which kills
+}
+
+void AgentProcess::signal(int number) noexcept
+{
     const std::lock_guard<std::mutex> lock(fMutex);
     if (!fEnded) {
-        ::kill(-fPid, SIGKILL);
-        ::kill(fPid, SIGKILL); // should it have left its group
+        ::kill(fPid, number);
     }
 }
 

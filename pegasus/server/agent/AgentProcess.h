@@ -1,6 +1,8 @@
 #pragma once
 
 #include "pegasus/server/agent/AgentChannel.h"
+#include "pegasus/server/agent/AgentConfinement.h"
+#include "pegasus/server/agent/AgentOutput.h"
 
 #include <condition_variable>
 #include <memory>
@@ -14,21 +16,16 @@ namespace Pegasus::server {
 // One running agent: the server's own program in agent mode, which has loaded one provider module.
 //
 // The two are joined by a control socket. Over it the agent receives its end of each channel; when it closes, however
-// the server ended, the agent ends too. A thread waits for the process, so that it is reaped and the cause of its end
-// is known.
+// the server ended, the agent ends too. The process that is started is the agent's keeper, which ends as the agent ends
+// (AgentKeeper.h). A thread waits for it, so that it is reaped and the cause of its end is known, and logs what the
+// agent writes to its standard output and error.
 //
 // Thread: any.
 class AgentProcess
 {
   public:
-    struct Options
-    {
-        std::size_t memoryMegabytes = 0; // bound of its address space; 0: any
-        bool strictOwners = true;        // whether a library that other users can change is refused
-    };
-
     // Starts the process. Throws: std::system_error.
-    AgentProcess(const std::string& module, const Options& options);
+    AgentProcess(const std::string& module, const AgentConfinement& confinement);
     // Closes the control socket, and kills the process if it still runs after a grace period.
     ~AgentProcess();
     AgentProcess(const AgentProcess&) = delete;
@@ -41,7 +38,7 @@ class AgentProcess
 
     // Asks the agent to end: it sees the end of its control socket.
     void close() noexcept;
-    // Kills the process and its process group.
+    // Has the process killed, and everything that it started.
     void kill() noexcept;
     bool isRunning() const;
     // Returns: false if it still runs at the deadline.
@@ -49,16 +46,22 @@ class AgentProcess
     // Returns: how it ended, human-readable: "killed by signal 11 (Segmentation fault)", "exit status 3". Empty while
     // it runs.
     std::string causeOfDeath() const;
+    // Returns: the last lines that it wrote to its standard output or error, as OutputLines::tail().
+    std::string lastOutput() const { return fOutput.tail(); }
 
+    // Returns: the id of the agent's keeper.
     pid_t pid() const { return fPid; }
 
   private:
     void watch();
+    void signal(int number) noexcept;
     std::shared_ptr<AgentChannel> inUse(std::shared_ptr<AgentChannel> channel);
 
     std::string fModule;
     base::Descriptor fControl;
+    AgentOutput fOutput;
     pid_t fPid = -1;
+    base::Descriptor fEnd; // readable when the process has ended
     mutable std::mutex fMutex;
     mutable std::condition_variable fChanged;
     bool fEnded = false;

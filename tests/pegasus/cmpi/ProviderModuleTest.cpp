@@ -374,6 +374,8 @@ TEST_F(Module, RefusesLibrariesThatAreNone)
         {"misspelt", FAULT_LIBRARY(MISSPELT), "Faulty", "Cannot find Faulty_Create<mi-type>MI symbol."},
         {"both styles", FAULT_LIBRARY(BOTH_STYLES), "Faulty", "both generic and Faulty entry points"},
         {"no interface", FAULT_LIBRARY(NULL_OK), "Faulty", "ProviderInitFailure: "},
+        {"no table", FAULT_LIBRARY(NO_TABLE), "Faulty",
+         "provider Faulty, Faulty_Create_InstanceMI: the interface has no function table"},
     };
     for (const Case& row : cases) {
         const std::string error = errorOf([&] {
@@ -391,7 +393,10 @@ TEST_F(Module, TriesAFailedFactoryAgain)
     const std::string error = errorOf([&] { items(); });
     EXPECT_THAT(error, HasSubstr("Faulty_Create_InstanceMI: no device yet"));
     EXPECT_EQ(items().size(), 1U);
-    EXPECT_EQ(errorOf([&] { invoke("Any", "X", CIMValue(Uint8{1})); }), "16: provider Faulty has no method interface");
+    EXPECT_EQ(errorOf([&] { invoke("Any", "X", CIMValue(Uint8{1})); }),
+              "16: provider Faulty has no Method interface: " FAULT_LIBRARY(
+                  FAILS_ONCE) " defines neither "
+                              "Faulty_Create_MethodMI nor _Generic_Create_MethodMI");
 }
 
 TEST_F(Module, SurvivesWhatProvidersInCppThrow)

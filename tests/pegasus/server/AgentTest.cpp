@@ -1,4 +1,5 @@
 // Vendor code under the server: what it delivers, and what becomes of everything else when it fails.
+#include "pegasus/server/admin/Capabilities.h"
 #include "tests/pegasus/server/HttpExchange.h"
 #include "tests/pegasus/server/ServerTree.h"
 
@@ -6,6 +7,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cerrno>
 #include <cstdio>
 #include <fstream>
 #include <memory>
@@ -17,6 +19,8 @@ namespace servertest {
 namespace {
 
 using namespace Pegasus;
+using server::CapabilitySet;
+using server::parseCapabilities;
 
 const CIMNamespaceName kNamespace("root/probe");
 
@@ -50,6 +54,18 @@ class AgentTest : public testing::Test
             return std::string(error.getMessage().getCString());
         }
         return "no error";
+    }
+
+    // Returns: a set of capabilities in the text of /proc/PID/status.
+    static CapabilitySet capabilitiesIn(const std::string& status, const std::string& name)
+    {
+        return std::stoull(status.substr(status.find(name) + name.size()), nullptr, 16);
+    }
+
+    static std::string ownStatus()
+    {
+        std::ifstream file("/proc/self/status");
+        return {std::istreambuf_iterator<char>(file), {}};
     }
 
     Uint32 countOf(const char* className, Boolean deep = true)
@@ -200,11 +216,13 @@ TEST_F(AgentTest, aDeathIsReportedWithModuleAndCauseAndTheOthersGoOn)
     start();
     const std::pair<const char*, std::string> rows[] = {
         {"Crash",
-         "CIM_ERR_FAILED: Lost connection with cimprovagt \"ProbeModule\". killed by signal 11 (Segmentation fault)"},
+         "CIM_ERR_FAILED: Lost connection with cimprovagt \"ProbeModule\". killed by signal 11 (Segmentation fault); "
+         "its last output: lane 3 is dark | \\x1b[2Jgiving up"},
         // Its children, one of them in a session of its own, hold the agent's sockets: the caller must return while
         // they run.
         {"ForkAndCrash",
          "CIM_ERR_FAILED: Lost connection with cimprovagt \"ProbeModule\". killed by signal 11 (Segmentation fault)"},
+        // The library's destructor, which would abort, is left out.
         {"Exit", "CIM_ERR_FAILED: Lost connection with cimprovagt \"ProbeModule\". exit status 3"},
     };
     const Uint32 other = call(fClient, "Probe_Other", "ProcessId");
@@ -245,8 +263,86 @@ TEST_F(AgentTest, memoryIsLimited)
     start({"agentMemoryMegabytes=300"});
     EXPECT_EQ(errorOf([&] { call(fClient, "Probe_Bulk", "Grow"); }), "CIM_ERR_FAILED: no more memory");
     EXPECT_EQ(countOf("Probe_Bulk"), 1000u);
+    EXPECT_EQ(call(fClient, "Probe_Bulk", "Reserve"), 1u) << "addresses are free";
 }
 #endif
+
+// What a provider sees of its own process.
+TEST_F(AgentTest, anAgentIsHeldToItsLimits)
+{
+    struct Row
+    {
+        const char* name;
+        std::vector<std::string> properties;
+        std::vector<const char*> lines;
+        CapabilitySet capabilities;
+    };
+    const Row rows[] = {
+        {"defaults",
+         {},
+         {"NoNewPrivs:\t1\n", "data=4294967296\n", "file=4294967296\n", "core=0\n", "address=-1\n"},
+         *parseCapabilities("chown,dac_override,dac_read_search,fowner,fsetid,kill,setgid,setuid,net_bind_service,"
+                            "net_broadcast,net_admin,net_raw,ipc_lock,ipc_owner,sys_rawio,sys_chroot,sys_ptrace,"
+                            "sys_admin,sys_nice,mknod,audit_write,syslog")},
+        {"changed",
+         {"agentMemoryMegabytes=1000", "agentFileMegabytes=7", "agentNewPrivileges=true", "agentCapabilities=net_raw"},
+         {"NoNewPrivs:\t0\n", "data=1048576000\n", "file=7340032\n"},
+         *parseCapabilities("net_raw")},
+    };
+    for (const Row& row : rows) {
+        SCOPED_TRACE(row.name);
+        ServerTree tree;
+        tree.start(row.properties);
+        tree.installProbe();
+        CIMClient client;
+        client.connect("127.0.0.1", tree.port(), String(), String());
+        Array<CIMParamValue> out;
+        const CIMValue value =
+            client.invokeMethod(kNamespace, CIMObjectPath("Probe_Bulk"), "Confinement", Array<CIMParamValue>(), out);
+        const std::string text(value.toString().getCString());
+        for (const char* line : row.lines) {
+            EXPECT_NE(text.find(line), std::string::npos) << line << " in:\n" << text;
+        }
+        for (const char* set : {"CapPrm:", "CapEff:", "CapBnd:"}) {
+            EXPECT_EQ(capabilitiesIn(text, set), capabilitiesIn(ownStatus(), set) & row.capabilities) << set;
+        }
+    }
+}
+
+TEST_F(AgentTest, aFloodOfOutputCostsTheLogALittle)
+{
+    start();
+    EXPECT_EQ(call(fClient, "Probe_Bulk", "Flood"), 60'000u);
+    EXPECT_EQ(call(fClient, "Probe_Bulk", "WriteToClosedPipe"), static_cast<Uint32>(EPIPE)) << "it lives";
+    ASSERT_TRUE(eventually([&] { return fTree.log().find("0000099 the probe has") != std::string::npos; }));
+    const std::string log = fTree.log();
+    EXPECT_NE(log.find("info: provider module \"ProbeModule\" wrote: 0000000 the probe has"), std::string::npos);
+    EXPECT_LT(log.size(), 40'000u);
+}
+
+// A vendor's process that has left group, session and parent.
+TEST_F(AgentTest, nothingThatAProviderStartsOutlivesItsAgent)
+{
+    using End = void (*)(const ServerTree&, CIMClient&);
+    const std::pair<const char*, End> rows[] = {
+        {"the agent crashes",
+         [](const ServerTree&, CIMClient& client) { errorOf([&] { call(client, "Probe_Bulk", "Crash"); }); }},
+        {"cimserver -s", [](const ServerTree& tree, CIMClient&) { tree.run("cimserver", {"-s"}); }},
+        {"the server is killed", [](const ServerTree& tree, CIMClient&) { ::kill(tree.serverProcess(), SIGKILL); }},
+    };
+    for (const auto& [name, end] : rows) {
+        SCOPED_TRACE(name);
+        ServerTree tree;
+        tree.start();
+        tree.installProbe();
+        CIMClient client;
+        client.connect("127.0.0.1", tree.port(), String(), String());
+        const int survivor = static_cast<int>(call(client, "Probe_Bulk", "LeaveChild"));
+        EXPECT_TRUE(isRunning(survivor));
+        end(tree, client);
+        EXPECT_TRUE(eventually([pid = survivor] { return !isRunning(pid); }));
+    }
+}
 
 TEST_F(AgentTest, anAgentKilledWhileIdleIsReplacedUnseen)
 {

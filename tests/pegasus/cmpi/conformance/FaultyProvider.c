@@ -100,6 +100,14 @@ CMPIInstanceMI* Faulty_Create_instanceMI(const CMPIBroker* broker, const CMPICon
     (void)ctx, (void)rc;
     return make(broker, NULL);
 }
+#elif defined(FAULT_NO_TABLE)
+CMPIInstanceMI* Faulty_Create_InstanceMI(const CMPIBroker* broker, const CMPIContext* ctx, CMPIStatus* rc)
+{
+    (void)ctx, (void)rc;
+    CMPIInstanceMI* mi = make(broker, NULL);
+    mi->ft = NULL;
+    return mi;
+}
 #else /* FAULT_OLD_TABLE */
 CMPIInstanceMI* Faulty_Create_InstanceMI(const CMPIBroker* broker, const CMPIContext* ctx, CMPIStatus* rc)
 {
