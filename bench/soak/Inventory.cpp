@@ -1,6 +1,6 @@
 #include "bench/soak/Inventory.h"
 
-#include "host/cli/ErrorReport.h"
+#include "host/cli/model/ErrorReport.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>

@@ -5,9 +5,9 @@
 #include "bench/soak/Faults.h"
 #include "bench/soak/Inventory.h"
 #include "bench/soak/Resources.h"
-#include "host/cli/ErrorReport.h"
 #include "host/cli/TPrivateServer.h"
 #include "host/cli/TSession.h"
+#include "host/cli/model/ErrorReport.h"
 #include "host/core/TProcessLog.h"
 
 #include <host/TConfig.h>

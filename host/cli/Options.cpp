@@ -1,6 +1,6 @@
 #include "host/cli/Options.h"
 
-#include "host/cli/ErrorReport.h"
+#include "host/cli/model/ErrorReport.h"
 
 #include <CLI/CLI.hpp>
 
@@ -31,9 +31,6 @@ void MakeAbsolute(std::string& path)
         path = fs::absolute(path).lexically_normal();
     }
 }
-
-// The one setting of this project's plug-in.
-constexpr char kThreadsKey[] = "pegasus_multi_thread";
 
 bool SplitSetting(const std::string& text, TOptions& options)
 {
@@ -131,21 +128,6 @@ void RefuseUnknown(CLI::App& app)
     }
 }
 
-// Other keys may be another plug-in's.
-// Throws: TUsageError.
-void RefuseMistyped(const TOptions& options)
-{
-    for (const auto& [key, value] : options.fSettings) {
-        const std::string suggestion = Suggestion(key, {kThreadsKey});
-        if (key != kThreadsKey && !suggestion.empty()) {
-            throw TUsageError("there is no setting " + key + suggestion);
-        }
-        if (key == kThreadsKey && value != "on" && value != "off") {
-            throw TUsageError(key + " is on or off, not \"" + value + "\"");
-        }
-    }
-}
-
 // The format is asked for before the command line is read, because an error in it is reported in that format too.
 EFormat WantedFormat(int argc, const char* const* argv)
 {
@@ -215,7 +197,6 @@ bool ParseOptions(int argc, const char* const* argv, TOptions& options)
     }
     RefuseUnknown(app);
     FillDefaults(options, settings);
-    RefuseMistyped(options);
     return true;
 }
 

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "host/cli/TDeployedTree.h"
+#include "host/cli/model/Document.h"
 
 #include <stdexcept>
 #include <string>
@@ -8,14 +9,6 @@
 #include <vector>
 
 namespace vrxhost {
-
-enum class ECommand
-{
-    kInventory, // providers, classes, instances
-    kProviders, // providers and the names of their classes
-    kClasses,   // providers and their classes' declarations
-    kInstances  // the instances of one class
-};
 
 enum class EFormat
 {

@@ -1,5 +1,5 @@
 #include "display/PlainText.h"
-#include "host/cli/Document.h"
+#include "host/cli/model/Document.h"
 
 #include <nlohmann/json.hpp>
 
@@ -118,6 +118,34 @@ TJson Provider(const TProviderRecord& provider, ECommand command)
     return json;
 }
 
+TJson Loss(const TLoss& loss)
+{
+    TJson json = {{"text", loss.GetText()}};
+    const std::pair<const char*, const std::string&> texts[] = {
+        {"vendor", loss.fVendor}, {"file", loss.fFile}, {"property", loss.fProperty}};
+    for (const auto& [name, text] : texts) {
+        if (!text.empty()) {
+            json[name] = text;
+        }
+    }
+    if (!loss.fClasses.empty()) {
+        json["classes"] = loss.fClasses;
+    }
+    if (!loss.fLog.empty()) {
+        json["log"] = loss.fLog;
+    }
+    return json;
+}
+
+void AddLosses(TJson& json, const std::vector<TLoss>& losses)
+{
+    json["losses"] = TJson::array();
+    json["notes"] = TJson::array();
+    for (const TLoss& loss : losses) {
+        json[loss.fIsNote ? "notes" : "losses"].push_back(Loss(loss));
+    }
+}
+
 TJson Body(const TDocument& document)
 {
     if (document.fCommand == ECommand::kInstances) {
@@ -141,7 +169,7 @@ std::string RenderJson(const TDocument& document)
 {
     TJson json = Body(document);
     json["complete"] = document.fComplete;
-    json["losses"] = document.fLosses;
+    AddLosses(json, document.fLosses);
     return json.dump(2, ' ', false, TJson::error_handler_t::replace) + "\n";
 }
 

@@ -1,4 +1,4 @@
-#include "host/cli/Document.h"
+#include "host/cli/model/Document.h"
 
 #include <algorithm>
 #include <cstdio>

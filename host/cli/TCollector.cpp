@@ -1,6 +1,6 @@
 #include "host/cli/TCollector.h"
 
-#include "host/cli/ErrorReport.h"
+#include "host/cli/model/ErrorReport.h"
 #include "host/inmem/TInmemProperty.h"
 
 #include <host/ICIMClass.h>

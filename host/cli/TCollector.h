@@ -1,7 +1,7 @@
 #pragma once
 
-#include "host/cli/Document.h"
-#include "host/cli/TLossLog.h"
+#include "host/cli/losses/TLossLog.h"
+#include "host/cli/model/Document.h"
 
 #include <host/ICIMNamespace.h>
 

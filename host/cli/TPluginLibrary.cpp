@@ -1,6 +1,6 @@
 #include "host/cli/TPluginLibrary.h"
 
-#include "host/cli/ErrorReport.h"
+#include "host/cli/model/ErrorReport.h"
 
 #include <host/INamespaceProviderManager.h>
 #include <host/PluginSymbols.h>

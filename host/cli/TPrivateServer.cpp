@@ -14,7 +14,7 @@ extern "C" {
 #include <sys/pidfd.h> // C only in glibc 2.36
 }
 
-#include "host/cli/ErrorReport.h"
+#include "host/cli/model/ErrorReport.h"
 #include "host/core/TProcessLog.h"
 #include "host/core/TUniqueFd.h"
 

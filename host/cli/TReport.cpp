@@ -1,6 +1,6 @@
 #include "host/cli/TReport.h"
 
-#include "host/cli/ErrorReport.h"
+#include "host/cli/model/ErrorReport.h"
 
 #include <cerrno>
 #include <cstring>
@@ -22,12 +22,12 @@ void TReport::Show(std::vector<TProviderRecord> providers)
     if (fInterrupted) {
         fLosses.Add("interrupted");
     }
-    ReportLosses();
     TDocument document;
     document.fCommand = fOptions.fCommand;
     document.fProviders = std::move(providers);
-    document.fLosses = fLosses.GetSentences();
-    document.fComplete = document.fLosses.empty();
+    document.fLosses = fLosses.GetLosses();
+    ReportLosses(document.fLosses);
+    document.fComplete = !fPartial;
     Write(fOptions.fFormat == EFormat::kJson ? RenderJson(document) : RenderTable(document));
 }
 
@@ -59,7 +59,7 @@ EExitStatus TReport::Finish()
     if (fStop.IsStopped()) {
         Show({});
     } else {
-        ReportLosses();
+        ReportLosses(fLosses.GetLosses());
     }
     if (fInterrupted) {
         return kInterrupted;
@@ -67,15 +67,22 @@ EExitStatus TReport::Finish()
     if (fFailed) {
         return kFailed;
     }
-    return fReportedCount == 0 ? kComplete : kPartial;
+    return fPartial ? kPartial : kComplete;
 }
 
-// Reports the losses that were added since the last call.
-void TReport::ReportLosses()
+// Reports the losses that were not reported before, each with the server's lines about its vendor.
+void TReport::ReportLosses(const std::vector<TLoss>& losses)
 {
-    const auto sentences = fLosses.GetSentences();
-    for (; fReportedCount < sentences.size(); ++fReportedCount) {
-        ReportError(sentences[fReportedCount]);
+    for (const TLoss& loss : losses) {
+        fPartial |= !loss.fIsNote;
+        const std::string text = loss.GetText();
+        if (!fReported.insert(text).second) {
+            continue;
+        }
+        ReportError((loss.fIsNote ? "note: " : "") + text);
+        for (const std::string& line : loss.fLog) {
+            ReportError("  server log: " + line);
+        }
     }
 }
 

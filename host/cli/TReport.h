@@ -1,12 +1,12 @@
 #pragma once
 
-#include "host/cli/Document.h"
 #include "host/cli/Options.h"
 #include "host/cli/TDocumentOutput.h"
-#include "host/cli/TLossLog.h"
 #include "host/cli/TStopSignals.h"
+#include "host/cli/losses/TLossLog.h"
+#include "host/cli/model/Document.h"
 
-#include <cstddef>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -35,7 +35,7 @@ class TReport
 
   private:
     void Write(const std::string& text);
-    void ReportLosses();
+    void ReportLosses(const std::vector<TLoss>& losses);
 
     const TOptions& fOptions;
     const TStopSignals& fStop;
@@ -44,7 +44,8 @@ class TReport
     bool fShown = false;
     bool fInterrupted = false; // before the document was written whole
     bool fFailed = false;
-    std::size_t fReportedCount = 0; // of the losses
+    bool fPartial = false;
+    std::set<std::string> fReported; // the sentences on standard error
 };
 
 } // namespace vrxhost

@@ -1,14 +1,14 @@
 #include "host/cli/TRun.h"
 
-#include "host/cli/ErrorReport.h"
 #include "host/cli/TCollector.h"
+#include "host/cli/losses/TRegistrationCheck.h"
+#include "host/cli/model/ErrorReport.h"
 #include "host/core/TProcessControl.h"
 
-#include <host/TConfig.h>
 #include <host/TRootObject.h>
 
 #include <chrono>
-#include <fstream>
+#include <csignal>
 #include <random>
 
 namespace vrxhost {
@@ -18,34 +18,37 @@ namespace {
 constexpr int kAttempts = 3;
 constexpr int kLongestPauseMs = 500;
 
-constexpr std::chrono::seconds kGraceOfAttempt{4}; // longer than the pauses of one attempt that is left in order
+// How long an interrupted attempt may take to end in order, and how often its pauses are cut.
+constexpr std::chrono::seconds kGraceOfAttempt{2};
+constexpr std::chrono::milliseconds kCutInterval{50};
+constexpr int kCutSignal = SIGUSR1;
 
-// Returns: the first malformed line (valid are "key = value", comments and empty lines), else what the reader said.
-std::string SettingsError(const std::string& file, const std::string& error)
+void IgnoreCut(int) {}
+
+// A pause of the plug-in is a sleep(), which ends early on the thread that handles a signal. Calls that wait for a
+// descriptor start again.
+void MakePausesCuttable()
 {
-    std::ifstream lines(file);
-    std::string line;
-    for (int number = 1; std::getline(lines, line); ++number) {
-        const std::size_t begin = line.find_first_not_of(" \t\r");
-        if (begin != std::string::npos && line[begin] != '#' && line.find('=') == std::string::npos) {
-            return "line " + std::to_string(number) + " is not \"key = value\"";
-        }
-    }
-    return error;
+    struct sigaction action = {};
+    action.sa_handler = IgnoreCut;
+    action.sa_flags = SA_RESTART;
+    ::sigaction(kCutSignal, &action, nullptr);
 }
 
 } // namespace
 
 using NKOLVRX20::ILogger;
-using NKOLVRX20::TConfig;
 using NKOLVRX20::TProcessControl;
 using NKOLVRX20::TRootObject;
 
 TRun::TRun(const TOptions& options)
     : fOptions(options), fConsumer(options.fConsumer.empty() ? options.fDefaultConsumer : options.fConsumer),
-      fServer(options.fRoot, fConsumer), fLosses(options.fRoot), fStop([this] { Interrupt(); }),
+      fServer(options.fRoot, fConsumer), fServerLog(options.fRoot), fVendors(ProviderDirectory(options.fPlugin)),
+      fThread(::pthread_self()), fLosses(options.fRoot), fStop([this] { Interrupt(); }),
       fReport(options, fStop, fLosses)
 {
+    fLosses.SetVendors(fVendors);
+    MakePausesCuttable();
 }
 
 TRun::~TRun()
@@ -56,7 +59,6 @@ TRun::~TRun()
 EExitStatus TRun::Execute()
 {
     try {
-        LoadSettings();
         SetConsumer();
         if (!fStop.IsStopped()) {
             UsePlugin();
@@ -68,18 +70,31 @@ EExitStatus TRun::Execute()
 }
 
 // On the signal thread: waiting programs end and further starts are refused, which leads the plug-in out of its
-// attempts; then waiting calls fail. After the loss of its server the plug-in would first try to connect again and
-// again, so during an attempt the server is ended only when the way out takes too long.
+// attempts; then waiting calls fail. After the loss of its server the plug-in would first try to connect again, so
+// during an attempt the server is ended only when the way out takes too long.
 void TRun::Interrupt()
 {
     fLosses.Freeze();
     TProcessControl::Instance().Cancel();
+    HurryAttempt();
     std::unique_lock<std::mutex> lock(fPhaseMutex);
-    fPhaseChanged.wait_for(lock, kGraceOfAttempt, [this] { return fPhase != EPhase::kOpening; });
     const bool isNeeded = fPhase != EPhase::kEnding;
     lock.unlock();
     if (isNeeded) {
         fServer.End();
+        HurryAttempt();
+    }
+}
+
+// The pauses between the tries of a start are the plug-in's; each is cut until the attempt is over. The pause of the
+// shutdown is left as it is: it is the server's grace period.
+void TRun::HurryAttempt()
+{
+    const auto deadline = std::chrono::steady_clock::now() + kGraceOfAttempt;
+    std::unique_lock<std::mutex> lock(fPhaseMutex);
+    while (fPhase == EPhase::kOpening && std::chrono::steady_clock::now() < deadline) {
+        ::pthread_kill(fThread, kCutSignal);
+        fPhaseChanged.wait_for(lock, kCutInterval);
     }
 }
 
@@ -88,20 +103,6 @@ void TRun::Enter(EPhase phase)
     const std::lock_guard<std::mutex> lock(fPhaseMutex);
     fPhase = phase;
     fPhaseChanged.notify_all();
-}
-
-void TRun::LoadSettings() const
-{
-    if (!fOptions.fConfigFile.empty()) {
-        const std::string error = ErrorOf([&] { TConfig::GetInstance()->Load(fOptions.fConfigFile); });
-        if (!error.empty()) {
-            throw TPluginError("the settings file " + fOptions.fConfigFile +
-                               " could not be read: " + SettingsError(fOptions.fConfigFile, error));
-        }
-    }
-    for (const auto& setting : fOptions.fSettings) {
-        TConfig::GetInstance()->setValue(setting.first, setting.second);
-    }
 }
 
 // A server of some other make may lack the setting; that matters only when a name was asked for.
@@ -124,7 +125,8 @@ void TRun::OpenNamespace(TSession& session)
             session.Clear();
             fLosses.StartOver();
         } else if (!error.empty()) {
-            throw TPluginError(error);
+            const std::string name = fVendors.DescribeInvalidName();
+            throw TPluginError(error + (name.empty() ? "" : ": " + name));
         } else {
             return;
         }
@@ -174,11 +176,23 @@ void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
     if (!error.empty()) {
         fLosses.Add("the inventory is incomplete: " + error);
     }
+    if (!fStop.IsStopped()) {
+        FindSilentLosses(ns, providers);
+    }
     if (!noClass.empty()) {
         fReport.Fail(noClass);
     } else {
         fReport.Show(std::move(providers));
     }
+}
+
+void TRun::FindSilentLosses(NKOLVRX20::ICIMNamespace& ns, const std::vector<TProviderRecord>& providers)
+{
+    TRegistrationCheck check(ns, fVendors, fLosses);
+    if (fOptions.fCommand == ECommand::kInventory || fOptions.fCommand == ECommand::kInstances) {
+        check.Run(providers);
+    }
+    fLosses.AddServerLog(fServerLog.Read(), check.GetModuleVendors());
 }
 
 } // namespace vrxhost

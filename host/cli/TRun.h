@@ -1,17 +1,21 @@
 #pragma once
 
 #include "host/cli/Options.h"
-#include "host/cli/TLossLog.h"
 #include "host/cli/TPrivateServer.h"
 #include "host/cli/TReport.h"
 #include "host/cli/TSession.h"
 #include "host/cli/TStopSignals.h"
+#include "host/cli/losses/TLossLog.h"
+#include "host/cli/losses/TServerLog.h"
+#include "host/cli/losses/TVendorFiles.h"
 
 #include <host/ICIMNamespace.h>
 
 #include <condition_variable>
 #include <mutex>
 #include <string>
+
+#include <pthread.h>
 
 namespace vrxhost {
 
@@ -37,17 +41,21 @@ class TRun
     };
 
     void Interrupt();
+    void HurryAttempt();
     void Enter(EPhase phase);
-    void LoadSettings() const;
     void SetConsumer() const;
     void UsePlugin();
     void OpenNamespace(TSession& session);
     bool PauseBefore(int attempt) const;
     void Show(NKOLVRX20::ICIMNamespace& ns);
+    void FindSilentLosses(NKOLVRX20::ICIMNamespace& ns, const std::vector<TProviderRecord>& providers);
 
     const TOptions& fOptions;
     const std::string fConsumer;
     const TPrivateServer fServer;
+    const TServerLog fServerLog;
+    const TVendorFiles fVendors;
+    const pthread_t fThread; // the one that calls the plug-in
     TLossLog fLosses;
     std::mutex fPhaseMutex;
     std::condition_variable fPhaseChanged;

@@ -1,6 +1,6 @@
 #include "host/cli/TSession.h"
 
-#include "host/cli/ErrorReport.h"
+#include "host/cli/model/ErrorReport.h"
 #include "host/core/TProcessControl.h"
 #include "host/inmem/TInmemNamespace.h"
 
@@ -18,18 +18,17 @@ namespace {
 // The name that is asked for; this kind of plug-in has one namespace, whatever the name.
 constexpr char kNamespaceName[] = "root/cimv2";
 
-// Where a plug-in looks for its vendors: beside itself.
-std::string ProviderTree(const std::string& pluginPath)
-{
-    return pluginPath.substr(0, pluginPath.rfind('/')) + "/pegasus/provider";
-}
-
 TCIMValue AddressOf(const boost::shared_ptr<ICIMNamespace>& ns)
 {
     return TCIMValue(static_cast<unsigned long>(reinterpret_cast<std::uintptr_t>(&ns)));
 }
 
 } // namespace
+
+std::string ProviderDirectory(const std::string& pluginPath)
+{
+    return pluginPath.substr(0, pluginPath.rfind('/')) + "/pegasus/provider";
+}
 
 TSession::TSession(const std::string& pluginPath, const std::string& consumer)
     : fPluginPath(pluginPath), fConsumer(consumer), fRepository(boost::make_shared<TInmemNamespace>()),
@@ -46,7 +45,7 @@ void TSession::Open()
 {
     std::string error = ErrorOf([this] { Allocate(); });
     if (error.find(TVRXStatusCode(TVRXStatusCode::kDirectoryNotOpened).TranslateStatusCode()) == 0) {
-        error += ": " + ProviderTree(fPluginPath) + " or a folder in it";
+        error += ": " + ProviderDirectory(fPluginPath) + " or a folder in it";
     } else if (error.empty() && !fNamespace) {
         error = "the plug-in returned none";
     }

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "host/cli/TLossLog.h"
 #include "host/cli/TPluginLibrary.h"
+#include "host/cli/losses/TLossLog.h"
 
 #include <host/ICIMNamespace.h>
 
@@ -9,6 +9,9 @@
 #include <string>
 
 namespace vrxhost {
+
+// Returns: where a plug-in looks for its vendors: a folder beside itself.
+std::string ProviderDirectory(const std::string& pluginPath);
 
 // One use of a plug-in: loaded, its namespace opened (more than once, if need be), everything released in the right
 // order. Thread: one at a time.

@@ -1,12 +1,13 @@
 // vrxhost: a command-line host for a namespace-provider plug-in.
-#include "host/cli/Document.h"
-#include "host/cli/ErrorReport.h"
 #include "host/cli/Options.h"
+#include "host/cli/Settings.h"
 #include "host/cli/TDeployedTree.h"
 #include "host/cli/TOwnerCheck.h"
 #include "host/cli/TPluginLibrary.h"
 #include "host/cli/TPrivateRoot.h"
 #include "host/cli/TRun.h"
+#include "host/cli/model/Document.h"
+#include "host/cli/model/ErrorReport.h"
 #include "host/core/TCoreLogger.h"
 #include "host/core/TUniqueFd.h"
 
@@ -85,7 +86,7 @@ EExitStatus Refuse(const TOptions& options, const std::string& reason, EExitStat
         TDocument document;
         document.fCommand = options.fCommand;
         document.fComplete = false;
-        document.fLosses.push_back(reason);
+        document.fLosses.push_back(LossOf(reason));
         std::cout << RenderJson(document) << std::flush;
     }
     return status;
@@ -100,6 +101,7 @@ EExitStatus Run(TOptions& options)
     root.Lay();
     SetRoot(TDeployedTree(root.GetPath()), options);
     CheckOwners(options, owners);
+    LoadSettings(options.fConfigFile, options.fSettings);
     std::signal(SIGPIPE, SIG_IGN); // a reader that has gone is a write error here
     OpenLog(options);
     TRun run(options);

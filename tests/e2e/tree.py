@@ -36,6 +36,17 @@ class Tree:
     def vendor(self, *parts):
         return self.path("pegasus", "provider", "linux", *parts)
 
+    def lay_lamps(self, text="", replacement=""):
+        """Adds the example vendor, with one text of its C source replaced."""
+        source = os.path.join(os.path.dirname(__file__), "..", "..")
+        example = os.path.join(source, "docs", "example-vendor")
+        folder = self.path("pegasus", "provider", "lamps")
+        shutil.copytree(example, folder)
+        with open(os.path.join(folder, "lamps.c"), encoding="ascii") as file:
+            code = "#include <unistd.h>\n" + file.read().replace(text, replacement, 1)
+        subprocess.run(["gcc", "-xc", "-shared", "-fPIC", "-I", os.path.join(source, "pegasus", "cmpi", "include"), "-o",
+                        os.path.join(folder, "liblamps.so"), "-"], input=code, text=True, check=True)
+
     @property
     def start_file(self):
         return f"/var/tmp/cimserverkol_tc_{self.consumer}_start.conf"

@@ -199,8 +199,9 @@ void InstanceObject::setProperty(const char* name, const CMPIValue* value, CMPIT
     const PropertySchema& declared = fPath.schema->properties()[at];
     CIMValue decoded = type == CMPI_null ? CIMValue(declared.type, declared.isArray) : decodeValue(value, type);
     if (!accepts(declared, decoded)) {
-        throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE,
-                        "property " + declared.text + " of " + fPath.schema->text() + " has another type"};
+        const std::string text = "property " + declared.text + " of " + fPath.schema->text() + " has another type";
+        broker.warnOnce("setProperty: " + text); // many a provider ignores the status
+        throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, text};
     }
     store(at, std::move(decoded));
 }

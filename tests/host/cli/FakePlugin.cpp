@@ -1,4 +1,4 @@
-// A plug-in for the tests of vrxhost. It behaves well by default; the host setting "fault" names a fault to show,
+// A plug-in for the tests of vrxhost. It behaves well by default; the host setting "fake.fault" names a fault to show,
 // and what can only be wrong in the library itself is a macro:
 //   FAKE_WITHOUT_ENTRY_POINTS   the entry points are missing
 // A namespace that is cleared leaves a file "cleared" in the working directory, so that a test sees that the host did
@@ -34,7 +34,7 @@ using TType = TCIMValue::TCIMType;
 
 bool HasFault(const char* name)
 {
-    return TConfig::GetInstance()->getValue("fault") == name;
+    return TConfig::GetInstance()->getValue("fake.fault") == name;
 }
 
 void Log(ILogger::EVRXLogSeverity severity, const std::string& text)
@@ -94,7 +94,7 @@ boost::shared_ptr<TFakeClass> EveryTypeClass(const boost::shared_ptr<ICIMNamespa
 boost::shared_ptr<TFakeClass> ManyClass()
 {
     const auto many = boost::make_shared<TFakeClass>("Fake_Many");
-    const int count = std::atoi(TConfig::GetInstance()->getValue("count").c_str());
+    const int count = std::atoi(TConfig::GetInstance()->getValue("fake.count").c_str());
     for (int i = 0; i < count; ++i) {
         const auto instance = boost::make_shared<TInmemInstance>(many, TCIMContext());
         Put(*instance, "Text", std::string(100, 'x'));
@@ -214,7 +214,7 @@ void MeetForeignServers()
 {
     static int fgAllocations = 0;
     std::ofstream("allocations") << ++fgAllocations;
-    if (fgAllocations <= std::atoi(TConfig::GetInstance()->getValue("foreign-servers").c_str())) {
+    if (fgAllocations <= std::atoi(TConfig::GetInstance()->getValue("fake.foreign-servers").c_str())) {
         std::string output;
         TOSSpecific::SpawnProcess("cimserver", {"-c", "exit 1"}, "/bin/sh", {}, output, 10);
         Log(ILogger::kInfo, "TPEGASUSNamespace::GetClass from Pegasus for: A returned exception: not this server's");

@@ -1,7 +1,7 @@
 // Parts of vrxhost, each tested apart from any plug-in.
-#include "host/cli/LossRules.h"
-#include "host/cli/TLossLog.h"
 #include "host/cli/TPrivateServer.h"
+#include "host/cli/losses/LossRules.h"
+#include "host/cli/losses/TLossLog.h"
 
 #include <host/TOSSpecific.h>
 #include <host/TRootObject.h>
@@ -43,18 +43,20 @@ const TLineRow kLines[] = {
      "instances of A could not be fetched: x y"},
     {"one instance", "DEBUG3:TPEGASUSClass::EI Error from Pegasus for: A, pegInst 2 returned exception: x",
      "an instance could not be built, A, pegInst 2: x"},
-    {"property", "4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: speed",
-     "property speed could not be converted and is missing from its instance"},
     {"qualifiers", " - error when Adding Qualifiers for property: Speed\tdetail: x",
      "qualifiers of property Speed could not be added: x"},
     {"progress", "before reg...", nullptr},
 };
 
+std::string TextOf(const std::optional<TLoss>& loss)
+{
+    return loss ? loss->GetText() : "none";
+}
+
 TEST(LossRules, LinesOfThePlugin)
 {
     for (const TLineRow& row : kLines) {
-        const TLoss loss = LossOfLine(row.fLine).value_or(TLoss{"none", "", ""});
-        EXPECT_EQ(loss.fBegin + loss.fObject + loss.fEnd, row.fSentence ? row.fSentence : "none") << row.fName;
+        EXPECT_EQ(TextOf(LossOfLine(row.fLine)), row.fSentence ? row.fSentence : "none") << row.fName;
     }
 }
 
@@ -76,7 +78,7 @@ const TProgramRow kPrograms[] = {
      "MOF file /r/pegasus/pegSchema/PG_InterOp/PG_InterOp.mof did not compile, cimmof: signal 9 (Killed)"},
     {"quotation in the error",
      {"cimmof", {"/r/provider/x/a.mof"}, TProcessOutcome::kExited, 250, "", "a.mof:3:1: expected ';'\nuint32 b;\n^\n"},
-     "MOF file /r/provider/x/a.mof of provider x did not compile, cimmof: exit status 250: a.mof:3:1: expected ';'"},
+     "MOF file /r/provider/x/a.mof of vendor x did not compile, cimmof: exit status 250: a.mof:3:1: expected ';'"},
     {"failed start",
      {"cimserver", {"httpPort=1"}, TProcessOutcome::kExited, 1, "\n", "in use\n"},
      "the server did not start, cimserver: exit status 1: in use"},
@@ -91,9 +93,18 @@ const TProgramRow kPrograms[] = {
 TEST(LossRules, Programs)
 {
     for (const TProgramRow& row : kPrograms) {
-        const auto sentence = LossOfProgram(row.fProgram, "/nonexistent");
-        EXPECT_EQ(sentence.value_or("none"), row.fSentence ? row.fSentence : "none") << row.fName;
+        EXPECT_EQ(TextOf(LossOfProgram(row.fProgram, "/nonexistent")), row.fSentence ? row.fSentence : "none")
+            << row.fName;
     }
+}
+
+std::vector<std::string> SentencesOf(const TLossLog& log)
+{
+    std::vector<std::string> sentences;
+    for (const TLoss& loss : log.GetLosses()) {
+        sentences.push_back(loss.GetText());
+    }
+    return sentences;
 }
 
 // A failed attempt to start the server is a loss only when every attempt fails, and then its cause comes first.
@@ -125,8 +136,48 @@ TEST(TLossLog, FailedServerStartsCountWhenTheServerIsNeeded)
     foreign.Log(NKOLVRX20::ILogger::kInfo, connected);
     EXPECT_TRUE(foreign.HasNoServer()) << "another host's server answered";
     NKOLVRX20::TRootObject::SetCoreLogger(nullptr);
-    EXPECT_EQ(retried.GetSentences(), (std::vector<std::string>{config}));
-    EXPECT_EQ(failed.GetSentences(), (std::vector<std::string>{start, config}));
+    EXPECT_EQ(SentencesOf(retried), (std::vector<std::string>{config}));
+    EXPECT_EQ(SentencesOf(failed), (std::vector<std::string>{start, config}));
+}
+
+// A vendor's losses name vendor and file, are folded by cause, and carry what the server's log says about the vendor.
+TEST(TLossLog, LossesAreFoldedUnderTheirCause)
+{
+    const fs::path vendors = testing::TempDir() + "/vendors-" + std::to_string(::getpid());
+    for (const std::string vendor : {"fan", "psu"}) {
+        fs::create_directories(vendors / vendor);
+        const std::string prefix = vendor == "fan" ? "FAN_" : "PSU_";
+        std::ofstream(vendors / vendor / "x.classes.xml")
+            << "<vrx><class name='" << prefix << "A[300]'/><class name='" << prefix << "B%^CDM^%'/><class name='"
+            << prefix << "C'/></vrx>";
+    }
+    TLossLog log("/");
+    log.SetVendors(TVendorFiles(vendors));
+    TLoss mof;
+    mof.fBegin = "MOF file";
+    mof.fVendor = "psu";
+    mof.fIsCause = true;
+    log.Add(mof);
+    for (const std::string name : {"PSU_A", "FAN_A", "PSU_C", "FAN_C", "PSU_A"}) {
+        log.Log(NKOLVRX20::ILogger::kInfo, "TPEGASUSNamespace::GetClass from Pegasus for: " + name +
+                                               " returned exception: none: \"" + name + "\"");
+    }
+    log.Log(NKOLVRX20::ILogger::kInfo, "TPEGASUSClass::EnumerateInstances FAN_C");
+    log.Log(NKOLVRX20::ILogger::kInfo, "4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: rpm");
+    log.AddServerLog(
+        {{"fans", "warning: a"}, {"fans", "warning: setProperty: class FAN_A has no property Rpm"}, {"x", "b"}},
+        {{"fans", "fan"}});
+    const std::string fan = "vendor fan, " + (vendors / "fan/x.classes.xml").string() + ": ";
+    EXPECT_EQ(SentencesOf(log),
+              (std::vector<std::string>{"MOF file; missing as a consequence: PSU_A, PSU_C",
+                                        fan + "class FAN_A, FAN_C could not be fetched: none",
+                                        fan + "property rpm of class FAN_C could not be converted and is missing from "
+                                              "its instance",
+                                        fan + "property Rpm of class FAN_A is not declared, so that the value which "
+                                              "provider module fans sets is lost"}));
+    EXPECT_EQ(log.GetLosses()[1].fLog, std::vector<std::string>{"warning: a"});
+    EXPECT_TRUE(log.GetLosses()[0].fLog.empty());
+    fs::remove_all(vendors);
 }
 
 // A tree whose "server" is a copy of a program that waits, and its start file.

@@ -19,7 +19,7 @@ class PrivateRoot : public VrxhostProgram
         fs::create_directories(fRoot / "pegasus/provider/acme/data");
         std::ofstream(fRoot / "pegasus/provider/acme/acme.classes.xml") << "classes";
         std::ofstream(fRoot / "pegasus/provider/acme/data/table") << "table";
-        std::ofstream(fRoot / "vrx.conf") << "count=2\n";
+        std::ofstream(fRoot / "vrx.conf") << "fake.count=2\n";
         fs::copy_file(FAKE_PLUGIN, fRoot / "libpegasus.nsp.so");
         for (const auto& entry : fs::recursive_directory_iterator(fRoot)) {
             fs::permissions(entry, fs::perms(0755));

@@ -86,8 +86,8 @@ class VrxhostProgram : public testing::Test
 
     std::vector<std::string> Command(const std::vector<std::string>& arguments, const std::string& fault = "") const
     {
-        std::vector<std::string> command = {VRXHOST,     "--root", fRoot,           "--plugin",
-                                            FAKE_PLUGIN, "--set",  "fault=" + fault};
+        std::vector<std::string> command = {
+            VRXHOST, "--root", fRoot, "--plugin", FAKE_PLUGIN, "--set", "fake.fault=" + fault};
         command.insert(command.end(), arguments.begin(), arguments.end());
         return command;
     }

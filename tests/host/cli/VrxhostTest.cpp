@@ -75,7 +75,8 @@ TEST_F(VrxhostProgram, InstancesAsJsonWithTrueTypes)
     }
   ],
   "complete": true,
-  "losses": []
+  "losses": [],
+  "notes": []
 }
 )");
 }
@@ -161,17 +162,23 @@ TEST_F(VrxhostProgram, LossesAreLearntFromTheLogAndFromPrograms)
     const auto outcome = Run({"inventory", "--format", "json"}, "losses");
     EXPECT_TRUE(HasStatus(outcome, 3));
     const std::vector<std::string> expected = {
-        "provider description /x/linux/a.classes.xml, line 3:syntax error",
+        "class list /x/linux/a.classes.xml, line 3:syntax error",
         "class CIM_Gone, CIM_Lost could not be fetched: not found",
         "class CIM_Odd  CIM_Base could not be built: The value has the wrong type",
-        "MOF file /x/provider/linux/bad.mof of provider linux did not compile, cimmof: exit status 250: "
+        "MOF file /x/provider/linux/bad.mof of vendor linux did not compile, cimmof: exit status 250: "
         "Parsing error: bad.mof:3"};
-    EXPECT_EQ(nlohmann::json::parse(outcome.fOutput)["losses"], nlohmann::json(expected));
-    std::string sentences;
+    const auto losses = nlohmann::json::parse(outcome.fOutput)["losses"];
+    std::vector<std::string> sentences;
+    std::transform(losses.begin(), losses.end(), std::back_inserter(sentences),
+                   [](const auto& loss) { return loss["text"]; });
+    EXPECT_EQ(sentences, expected);
+    EXPECT_EQ(losses[1]["classes"], nlohmann::json({"CIM_Gone", "CIM_Lost"}));
+    EXPECT_THAT(ReadFile(fRoot / "vrxhost.log"), HasSubstr("identifier:vrx [normal]"));
+    std::string error;
     for (const std::string& sentence : expected) {
-        sentences += "vrxhost: " + sentence + "\n";
+        error += "vrxhost: " + sentence + "\n";
     }
-    EXPECT_EQ(outcome.fErrorOutput, sentences);
+    EXPECT_EQ(outcome.fErrorOutput, error);
 }
 
 TEST_F(VrxhostProgram, MissingOrForeignPluginFails)
@@ -204,7 +211,8 @@ const TUsageRow kUsages[] = {
     {{"inventory", "--format", "xml"}, 2, "--format"},
     {{"inventory", "--set", "novalue"}, 2, "key=value is expected, not \"novalue\""},
     {{"inventory", "--set", "Pegasus_multithread=on"}, 2, "did you mean pegasus_multi_thread?"},
-    {{"inventory", "--set", "pegasus_multi_thread=yes"}, 2, "pegasus_multi_thread is on or off, not \"yes\""},
+    {{"inventory", "--set", "pegasus_multi_thread=yes"}, 2, "pegasus_multi_thread is \"yes\"; it can be: on, off"},
+    {{"inventory", "--set", "threads=on"}, 2, "there is no setting threads"},
     {{"inventory", "--config", "/nonexistent"}, 2, "/nonexistent"},
     {{"instances", "Fake_None"}, 1, "there is no class Fake_None"},
     {{"instances", "fake_evrytype"}, 1, "there is no class fake_evrytype; did you mean Fake_EveryType?"},
@@ -235,7 +243,7 @@ TEST_F(VrxhostProgram, UsageErrorIsOneSentenceAndADocument)
 
 TEST_F(VrxhostProgram, SettingsFileAndLogFile)
 {
-    std::ofstream(fRoot / "vrx.conf") << "fault=prints\ncount=2\n";
+    std::ofstream(fRoot / "vrx.conf") << "fake.fault=prints\nfake.count=2\n";
     const auto outcome = Start({VRXHOST, "--root", fRoot, "--plugin", FAKE_PLUGIN, "instances", "Fake_Many", "--log",
                                 fRoot / "other.log", "-v"});
     EXPECT_TRUE(HasStatus(outcome, 0));
@@ -243,10 +251,16 @@ TEST_F(VrxhostProgram, SettingsFileAndLogFile)
     EXPECT_THAT(outcome.fErrorOutput, HasSubstr("consumer vrxhost-")) << "-v shows the log";
     EXPECT_THAT(ReadFile(fRoot / "other.log"), HasSubstr("consumer vrxhost-"));
     EXPECT_FALSE(fs::exists(fRoot / "vrxhost.log"));
-    std::ofstream(fRoot / "vrx.conf") << "# comment\nno equals sign";
-    const auto bad = Run({"providers"});
-    EXPECT_TRUE(HasStatus(bad, 1));
-    EXPECT_THAT(bad.fErrorOutput, HasSubstr("vrx.conf could not be read: line 2 is not \"key = value\""));
+    for (const auto& [line, sentence] : std::map<std::string, std::string>{
+             {"no equals sign", "\"key = value\" is expected"},
+             {"pegasus_multithread = on",
+              "there is no setting pegasus_multithread; did you mean pegasus_multi_thread?"}})
+    {
+        std::ofstream(fRoot / "vrx.conf") << "# comment\n" << line;
+        const auto bad = Run({"providers"});
+        EXPECT_TRUE(HasStatus(bad, 2));
+        EXPECT_EQ(bad.fErrorOutput, "vrxhost: " + (fRoot / "vrx.conf:2: ").string() + sentence + "\n");
+    }
     const auto noLog = Run({"--config", "/dev/null", "--log", "/dev/null/x", "providers"});
     EXPECT_TRUE(HasStatus(noLog, 0));
     EXPECT_THAT(noLog.fErrorOutput, HasSubstr("the log file /dev/null/x could not be opened"));
@@ -285,11 +299,11 @@ TEST_F(VrxhostProgram, DefaultConsumerIsMadeOfTheRootUnlessTheServerIsAnInstalle
 
 TEST_F(VrxhostProgram, StartsOverWhenAnotherServerTookThePort)
 {
-    const auto healed = Run({"providers", "--format", "json", "--set", "foreign-servers=2"});
+    const auto healed = Run({"providers", "--format", "json", "--set", "fake.foreign-servers=2"});
     EXPECT_TRUE(HasStatus(healed, 0));
     EXPECT_TRUE(nlohmann::json::parse(healed.fOutput)["complete"]) << "losses of the attempts before do not count";
     EXPECT_EQ(ReadFile(fRoot / "allocations"), "3");
-    const auto failed = Run({"providers", "--set", "foreign-servers=9"});
+    const auto failed = Run({"providers", "--set", "fake.foreign-servers=9"});
     EXPECT_TRUE(HasStatus(failed, 1));
     EXPECT_EQ(ReadFile(fRoot / "allocations"), "3");
     EXPECT_THAT(failed.fErrorOutput, HasSubstr("the server did not start, cimserver: exit status 1"));
@@ -323,7 +337,7 @@ TEST_F(VrxhostProgram, InterruptionEndsWaitingProgramsAndEnumerations)
         EXPECT_EQ(json["providers"].empty() ? 0 : json["providers"][0]["classes"].size(), row.fClassesShown);
         if (row.fAnnounced) {
             EXPECT_EQ(outcome.fErrorOutput, "vrxhost: stopping ...\nvrxhost: interrupted\n");
-            EXPECT_EQ(json["losses"], nlohmann::json({"interrupted"}));
+            EXPECT_EQ(json["losses"][0]["text"], "interrupted");
         }
     }
     EXPECT_TRUE(fs::exists(fRoot / "shut-down-program-ran"));
@@ -350,7 +364,7 @@ TEST_F(VrxhostProgram, SecondHostInOneRootIsRefused)
 TEST_F(VrxhostProgram, ReaderThatLeavesEarlyIsNoCrash)
 {
     std::vector<std::string> command = {"/bin/bash", "-c", "\"$0\" \"$@\" | head -c 1; exit ${PIPESTATUS[0]}"};
-    const auto run = Command({"inventory", "--set", "count=5000"});
+    const auto run = Command({"inventory", "--set", "fake.count=5000"});
     command.insert(command.end(), run.begin(), run.end());
     const auto outcome = Start(command);
     EXPECT_TRUE(HasStatus(outcome, 1));

@@ -1,4 +1,4 @@
-#include "host/cli/ErrorReport.h"
+#include "host/cli/model/ErrorReport.h"
 
 #include <host/TVRXException.h>
 

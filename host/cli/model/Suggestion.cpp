@@ -1,5 +1,5 @@
 // Which known name an unknown one may have meant.
-#include "host/cli/ErrorReport.h"
+#include "host/cli/model/ErrorReport.h"
 
 #include <algorithm>
 #include <cctype>

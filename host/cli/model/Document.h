@@ -1,7 +1,7 @@
 // What vrxhost shows: plain data, free of the plug-in's objects, so that it outlives the plug-in.
 #pragma once
 
-#include "host/cli/Options.h"
+#include "host/cli/model/Loss.h"
 
 #include <host/TCIMValue.h>
 
@@ -9,6 +9,14 @@
 #include <vector>
 
 namespace vrxhost {
+
+enum class ECommand
+{
+    kInventory, // providers, classes, instances
+    kProviders, // providers and the names of their classes
+    kClasses,   // providers and their classes' declarations
+    kInstances  // the instances of one class
+};
 
 struct TPropertyRecord
 {
@@ -64,7 +72,7 @@ struct TDocument
 {
     ECommand fCommand = ECommand::kInventory;
     std::vector<TProviderRecord> fProviders; // of kInstances: one without a name, holding the one class
-    std::vector<std::string> fLosses;        // sentences
+    std::vector<TLoss> fLosses;              // and notes
     bool fComplete = true;
 };
 

@@ -1,0 +1,135 @@
+#include "host/cli/losses/TVendorFiles.h"
+
+#include <host/TXmlParser.h>
+
+#include <algorithm>
+#include <cctype>
+#include <filesystem>
+#include <fstream>
+
+#include <strings.h>
+
+namespace vrxhost {
+namespace {
+
+namespace fs = std::filesystem;
+
+constexpr char kDefaultNamespace[] = "root/cimv2";
+constexpr char kHiddenTag[] = "%^CDM^%";
+
+bool IsSame(const std::string& left, const std::string& right)
+{
+    return ::strcasecmp(left.c_str(), right.c_str()) == 0;
+}
+
+class TClassListParser : public NKOLVRX20::TXmlParser
+{
+  public:
+    explicit TClassListParser(TClassList& list) : fList(list) {}
+
+    void StartElement(const char* name, std::map<std::string, std::string>& attributes) override
+    {
+        if (IsSame(name, "nsp")) {
+            fList.fNamespace = attributes["name"];
+        } else if (IsSame(name, "module")) {
+            fList.fModule = attributes["name"];
+        } else if (IsSame(name, "class") && attributes["name"].find(kHiddenTag) == std::string::npos) {
+            const std::string& entry = attributes["name"];
+            fList.fClasses.push_back(entry.substr(0, std::min(entry.find('['), entry.find("%^"))));
+        }
+    }
+    void EndElement(const char*) override {}
+    void processingInstruction(const char*, const char*) override {}
+    void characters(const char*, unsigned int) override {}
+    void notationDecl(const char*, const char*, const char*) override {}
+    void FatalError(const char*) override {}
+
+  private:
+    TClassList& fList;
+};
+
+TClassList ReadClassList(const std::string& vendor, const std::string& path)
+{
+    TClassList list{vendor, path, "", "", {}};
+    std::string text(TVendorFiles::kMaxClassListBytes, '\0');
+    std::ifstream file(path, std::ios::binary);
+    file.read(text.data(), static_cast<std::streamsize>(text.size()));
+    TClassListParser(list).Parse(text.data(), static_cast<std::size_t>(file.gcount()));
+    if (list.fNamespace.empty()) {
+        list.fNamespace = kDefaultNamespace;
+    }
+    return list;
+}
+
+template <typename Entry> void SortByName(std::vector<Entry>& entries, std::string Entry::*name)
+{
+    std::sort(entries.begin(), entries.end(),
+              [name](const Entry& left, const Entry& right) { return left.*name < right.*name; });
+}
+
+bool IsCimName(const std::string& name)
+{
+    const auto isPart = [](unsigned char c) { return c == '_' || std::isalnum(c) != 0; };
+    return std::all_of(name.begin(), name.end(), isPart) &&
+           (name.empty() || std::isdigit(static_cast<unsigned char>(name.front())) == 0);
+}
+
+} // namespace
+
+TVendorFiles::TVendorFiles(const std::string& providerDirectory)
+{
+    std::error_code error;
+    for (const auto& folder : fs::directory_iterator(providerDirectory, error)) {
+        if (!folder.is_directory(error)) {
+            continue;
+        }
+        TVendorFolder found{folder.path().filename(), folder.path()};
+        for (const auto& file : fs::directory_iterator(folder.path(), error)) {
+            const std::string name = file.path().filename();
+            const auto has = [&name](const char* part) { return name.find(part) != std::string::npos; };
+            found.fHasDefinitions |= has(".properties.mof");
+            found.fHasRegistration |= has(".registration.mof");
+            found.fHasLibrary |= name.rfind("lib", 0) == 0 && has(".so");
+            if (has(".classes.xml") && file.is_regular_file(error)) {
+                found.fHasClassList = true;
+                fClassLists.push_back(ReadClassList(found.fName, file.path()));
+            }
+        }
+        fFolders.push_back(found);
+    }
+    SortByName(fFolders, &TVendorFolder::fName);
+    SortByName(fClassLists, &TClassList::fPath);
+}
+
+const TClassList* TVendorFiles::FindClass(const std::string& name) const
+{
+    for (const TClassList& list : fClassLists) {
+        for (const std::string& each : list.fClasses) {
+            if (IsSame(each, name)) {
+                return &list;
+            }
+        }
+    }
+    return nullptr;
+}
+
+const TVendorFolder* TVendorFiles::FindFolder(const std::string& name) const
+{
+    const auto found = std::find_if(fFolders.begin(), fFolders.end(),
+                                    [&name](const TVendorFolder& folder) { return folder.fName == name; });
+    return found == fFolders.end() ? nullptr : &*found;
+}
+
+std::string TVendorFiles::DescribeInvalidName() const
+{
+    for (const TClassList& list : fClassLists) {
+        for (const std::string& name : list.fClasses) {
+            if (!IsCimName(name)) {
+                return "vendor " + list.fVendor + ", " + list.fPath + ": the class name \"" + name + "\" is invalid";
+            }
+        }
+    }
+    return "";
+}
+
+} // namespace vrxhost

@@ -1,0 +1,54 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+namespace vrxhost {
+
+// One *.classes.xml: what a provider is asked for.
+struct TClassList
+{
+    std::string fVendor; // the folder's name
+    std::string fPath;
+    std::string fModule;
+    std::string fNamespace;
+    std::vector<std::string> fClasses; // names alone, without those that are tagged as hidden from hosts
+};
+
+// One folder below the provider directory.
+struct TVendorFolder
+{
+    std::string fName;
+    std::string fPath;
+    bool fHasClassList = false;
+    bool fHasDefinitions = false;  // *.properties.mof
+    bool fHasRegistration = false; // *.registration.mof
+    bool fHasLibrary = false;
+};
+
+// What the vendors' folders hold, read from the disk as the plug-in reads it (docs/vendors.md). What cannot be read is
+// left out: the plug-in reports it.
+class TVendorFiles
+{
+  public:
+    static constexpr std::size_t kMaxClassListBytes = 1024 * 1024;
+
+    TVendorFiles() = default;
+    explicit TVendorFiles(const std::string& providerDirectory);
+
+    const std::vector<TVendorFolder>& GetFolders() const { return fFolders; }
+    const std::vector<TClassList>& GetClassLists() const { return fClassLists; }
+
+    // Returns: the list that names the class (letter case ignored); null for an unlisted class.
+    const TClassList* FindClass(const std::string& name) const;
+    const TVendorFolder* FindFolder(const std::string& name) const;
+
+    // Returns: the first name of a list that is an invalid CIM name, as a sentence; empty when all are valid.
+    std::string DescribeInvalidName() const;
+
+  private:
+    std::vector<TVendorFolder> fFolders; // in the order of their names
+    std::vector<TClassList> fClassLists;
+};
+
+} // namespace vrxhost
