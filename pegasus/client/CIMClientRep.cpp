@@ -157,7 +157,7 @@ void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHan
     const client::ExpectedResponse expected{nextMessageId(), request.method, request.isIntrinsic, request.result};
     const std::string message = client::encodeHttpRequest(request, expected.messageId, fAddress->text(),
                                                           fAddress->isLocal ? localUser() : std::string());
-    ResponseReader reader(expected, fDecoder, onContent);
+    ResponseReader reader(expected, fDecoder, onContent, deadline);
     HttpAnswerReader response(fLimits.http, checkHeader, [&](std::string_view body) { reader.feed(body); });
     send(message, deadline);
     receive(response, deadline);

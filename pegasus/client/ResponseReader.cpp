@@ -68,8 +68,9 @@ std::string_view required(const XmlElement& tag, std::string_view attribute, Xml
 } // namespace
 
 ResponseReader::ResponseReader(const ExpectedResponse& expected, wire::ElementDecoder& decoder,
-                               ContentHandler onContent)
-    : fExpected(expected), fDecoder(decoder), fOnContent(std::move(onContent)),
+                               ContentHandler onContent, const base::Deadline& deadline)
+    : fExpected(expected), fDecoder(decoder), fOnContent(std::move(onContent)), fDeadline(deadline),
+      fBytesBefore(decoder.decodedBytes()),
       fSlicer({"CIM", "MESSAGE", "SIMPLERSP", "IMETHODRESPONSE", "METHODRESPONSE", "IRETURNVALUE"}, *this,
               decoder.limits())
 {
@@ -157,8 +158,20 @@ void ResponseReader::slice(const XmlElement& element)
         }
         element.fail(Kind::kInvalid, "unexpected " + std::string(element.name()) + " element");
     }
+    readContent(element);
+}
+
+void ResponseReader::readContent(const XmlElement& element)
+{
+    if (fDeadline.hasPassed()) {
+        throw ConnectionTimeoutException();
+    }
     fHasContent = true;
     fOnContent(element, fDecoder);
+    const std::size_t limit = fDecoder.limits().maxDecodedBytes;
+    if (fDecoder.decodedBytes() - fBytesBefore > limit) {
+        element.fail(Kind::kTooLarge, "objects of more than " + std::to_string(limit) + " bytes in one answer");
+    }
 }
 
 void ResponseReader::readError(const XmlElement& element)

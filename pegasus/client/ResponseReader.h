@@ -1,5 +1,6 @@
 #pragma once
 
+#include "pegasus/base/Deadline.h"
 #include "pegasus/wire/ElementDecoder.h"
 #include "pegasus/wire/XmlSlicer.h"
 
@@ -22,8 +23,9 @@ struct ExpectedResponse
 };
 
 // Reads the CIM-XML answer to one request while it arrives.
-// Throws: wire::XmlError; CIMClientResponseException (an answer to something else);
-// TypeMismatchException (an instance under another class's name).
+// Throws: wire::XmlError, also when the objects of the answer take more memory than the decoder's limit;
+// CIMClientResponseException (an answer to something else); TypeMismatchException (an instance under another class's
+// name); ConnectionTimeoutException when the deadline has passed and there is another element to decode.
 class ResponseReader : private wire::XmlSliceHandler
 {
   public:
@@ -31,7 +33,8 @@ class ResponseReader : private wire::XmlSliceHandler
     using ContentHandler = std::function<void(const wire::XmlElement&, wire::ElementDecoder&)>;
 
     // Both references must outlive the reader.
-    ResponseReader(const ExpectedResponse& expected, wire::ElementDecoder& decoder, ContentHandler onContent);
+    ResponseReader(const ExpectedResponse& expected, wire::ElementDecoder& decoder, ContentHandler onContent,
+                   const base::Deadline& deadline = base::Deadline::never());
 
     void feed(std::string_view bytes) { fSlicer.feed(bytes); }
     // The body has ended. Throws: XmlError when the answer is incomplete.
@@ -49,10 +52,13 @@ class ResponseReader : private wire::XmlSliceHandler
     void openMessage(const wire::XmlElement& tag);
     void openMethodResponse(const wire::XmlElement& tag);
     void readError(const wire::XmlElement& element);
+    void readContent(const wire::XmlElement& element);
 
     const ExpectedResponse& fExpected;
     wire::ElementDecoder& fDecoder;
     ContentHandler fOnContent;
+    base::Deadline fDeadline;
+    std::size_t fBytesBefore; // that the decoder had decoded before this answer
     std::size_t fDepth = 0;
     bool fHasResponse = false;
     bool fHasReturnValue = false;

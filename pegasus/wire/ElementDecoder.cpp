@@ -5,6 +5,7 @@
 #include "pegasus/base/Text.h"
 #include "pegasus/common/EmbeddedKind.h"
 #include "pegasus/common/ObjectReps.h"
+#include "pegasus/wire/MemberList.h"
 
 namespace Pegasus::wire {
 namespace {
@@ -56,16 +57,6 @@ void expectEnd(const XmlElement& parent, const XmlElement& child)
                  "missing " + std::string(element.name()) + "." + std::string(attribute) + " attribute");
 }
 
-// Adds an element's object, whose name must be new.
-template <typename Item> void addNew(const XmlElement& element, Array<Item>& items, const Item& item)
-{
-    if (ObjectAccess::find(items, item.getName()) != PEG_NOT_FOUND) {
-        element.fail(Kind::kSemantic, "a second " + std::string(element.name()) + " named \"" +
-                                          base::utf8(item.getName().getString()) + "\"");
-    }
-    items.append(item);
-}
-
 // The type of a property's value: embedded objects are known by the attribute, or by the qualifiers alone.
 CIMType valueType(CIMType declared, const Array<CIMQualifier>& qualifiers)
 {
@@ -97,6 +88,7 @@ const CIMName& ElementDecoder::nameAttribute(const XmlElement& element, std::str
     if (!value) {
         failMissing(element, attribute);
     }
+    fDecodedBytes += value->size();
     try {
         return fNames.name(element.resolved(*value, fScratch));
     } catch (const XmlError&) {
@@ -173,6 +165,7 @@ CIMFlavor ElementDecoder::flavor(const XmlElement& element, const XmlAttribute* 
 
 String ElementDecoder::toString(const XmlElement& element, std::string_view utf8)
 {
+    countBytes(utf8.size() * sizeof(Char16));
     try {
         return base::fromUtf8(utf8);
     } catch (const Exception&) {
@@ -197,14 +190,16 @@ CIMQualifier ElementDecoder::decodeQualifier(const XmlElement& element)
         expectEnd(element, child.nextSibling());
     }
     const CIMValue value = child ? decodeValue(child, type) : CIMValue(type, false);
+    countBytes(sizeof(CIMQualifierRep));
     return CIMQualifier(name, value, flavor(element, values + kFirstFlavor), propagated);
 }
 
 // Returns: the first child after the qualifiers.
 XmlElement ElementDecoder::decodeQualifiers(XmlElement child, Array<CIMQualifier>& qualifiers)
 {
+    MemberList<CIMQualifier> members(qualifiers, fLimits.maxMembers);
     for (; child.is("QUALIFIER"); child = child.nextSibling()) {
-        addNew(child, qualifiers, decodeQualifier(child));
+        members.add(child, decodeQualifier(child));
     }
     return child;
 }
@@ -254,6 +249,7 @@ CIMQualifierDecl ElementDecoder::decodeQualifierDeclaration(const XmlElement& el
 CIMProperty ElementDecoder::decodeProperty(const XmlElement& element)
 {
     CIMProperty property = ObjectAccess::wrap<CIMProperty>(new CIMPropertyRep());
+    countBytes(sizeof(CIMPropertyRep));
     CIMPropertyRep& rep = ObjectAccess::rep(property);
     if (element.is("PROPERTY.REFERENCE")) {
         readReferenceProperty(element, rep);
@@ -302,8 +298,9 @@ void ElementDecoder::readReferenceProperty(const XmlElement& element, CIMPropert
 XmlElement ElementDecoder::decodeProperties(XmlElement child, Array<CIMProperty>& properties)
 {
     properties.reserveCapacity(countFrom(child));
+    MemberList<CIMProperty> members(properties, fLimits.maxMembers);
     for (; isOneOf(child, {"PROPERTY", "PROPERTY.ARRAY", "PROPERTY.REFERENCE"}); child = child.nextSibling()) {
-        addNew(child, properties, decodeProperty(child));
+        members.add(child, decodeProperty(child));
     }
     return child;
 }
@@ -316,6 +313,7 @@ CIMParameter ElementDecoder::decodeParameter(const XmlElement& element)
     element.attributes(kParameterAttributes, values);
     const bool isReference = isOneOf(element, {"PARAMETER.REFERENCE", "PARAMETER.REFARRAY"});
     CIMParameter parameter = ObjectAccess::wrap<CIMParameter>(new CIMParameterRep());
+    countBytes(sizeof(CIMParameterRep));
     CIMParameterRep& rep = ObjectAccess::rep(parameter);
     rep.fName = nameAttribute(element, "NAME", values[0]);
     rep.fIsArray = isOneOf(element, {"PARAMETER.ARRAY", "PARAMETER.REFARRAY"});
@@ -332,16 +330,18 @@ CIMMethod ElementDecoder::decodeMethod(const XmlElement& element)
     XmlAttribute values[std::size(kMethodAttributes)];
     element.attributes(kMethodAttributes, values);
     CIMMethod method = ObjectAccess::wrap<CIMMethod>(new CIMMethodRep());
+    countBytes(sizeof(CIMMethodRep));
     CIMMethodRep& rep = ObjectAccess::rep(method);
     rep.fName = nameAttribute(element, "NAME", values[0]);
     rep.fType = embeddedType(element, typeAttribute(element, "TYPE", values[1]), values[4], values[5]);
     rep.fClassOrigin = optionalName(element, "CLASSORIGIN", values[2]);
     rep.fPropagated = boolAttribute(element, "PROPAGATED", values[3], false);
     XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
+    MemberList<CIMParameter> parameters(rep.fParameters, fLimits.maxMembers);
     for (; isOneOf(child, {"PARAMETER", "PARAMETER.ARRAY", "PARAMETER.REFERENCE", "PARAMETER.REFARRAY"});
          child = child.nextSibling())
     {
-        addNew(child, rep.fParameters, decodeParameter(child));
+        parameters.add(child, decodeParameter(child));
     }
     expectEnd(element, child);
     return method;
@@ -355,10 +355,12 @@ CIMClass ElementDecoder::decodeClass(const XmlElement& element)
     const CIMName name = nameAttribute(element, "NAME", values[0]);
     CIMClass cimClass(name, optionalName(element, "SUPERCLASS", values[1]));
     CIMClassRep& rep = ObjectAccess::rep(cimClass);
+    countBytes(sizeof(CIMClassRep));
     XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
     child = decodeProperties(child, rep.fProperties);
+    MemberList<CIMMethod> methods(rep.fMethods, fLimits.maxMembers);
     for (; child.is("METHOD"); child = child.nextSibling()) {
-        addNew(child, rep.fMethods, decodeMethod(child));
+        methods.add(child, decodeMethod(child));
     }
     expectEnd(element, child);
     return cimClass;
@@ -373,6 +375,7 @@ CIMInstance ElementDecoder::decodeInstance(const XmlElement& element)
     element.attributes({"CLASSNAME", "xml:lang"}, values);
     CIMInstance instance(nameAttribute(element, "CLASSNAME", values[0]));
     CIMInstanceRep& rep = ObjectAccess::rep(instance);
+    countBytes(sizeof(CIMInstanceRep));
     XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
     child = decodeProperties(child, rep.fProperties);
     expectEnd(element, child);

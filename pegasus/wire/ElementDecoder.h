@@ -57,8 +57,15 @@ class ElementDecoder
     String toString(const XmlElement& element, std::string_view utf8);
 
     const XmlLimits& limits() const { return fLimits; }
+    // Returns: about how many bytes of memory all objects that were decoded so far took, the allocator's share
+    // included. A name counts with its bytes in the message, each time.
+    std::size_t decodedBytes() const { return fDecodedBytes; }
 
   private:
+    // An object of so many bytes, its handle in the owner and the allocator's share.
+    void countBytes(std::size_t size) { fDecodedBytes += size + sizeof(void*) + kAllocationBytes; }
+    static constexpr std::size_t kAllocationBytes = 16;
+
     // ElementDecoder.cpp
     CIMProperty decodeProperty(const XmlElement& element);
     XmlElement beginProperty(const XmlElement& element, const XmlAttribute* values, CIMPropertyRep& rep);
@@ -96,6 +103,7 @@ class ElementDecoder
     NameCache fNames;
     std::string fScratch;
     std::size_t fEmbeddingDepth = 0;
+    std::size_t fDecodedBytes = 0;
 };
 
 } // namespace Pegasus::wire

@@ -63,6 +63,7 @@ CIMKeyBinding ElementDecoder::decodeKeyValue(const XmlElement& element, const CI
 
 CIMKeyBinding ElementDecoder::decodeKeyBinding(const XmlElement& element)
 {
+    countBytes(sizeof(CIMObjectPath)); // the binding's share of the path
     XmlAttribute values[1];
     element.attributes({"NAME"}, values);
     const CIMName name = nameAttribute(element, "NAME", values[0]);

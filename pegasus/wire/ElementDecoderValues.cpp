@@ -192,6 +192,7 @@ template <typename T> CIMValue ElementDecoder::decodeScalar(const XmlElement& el
             return CIMValue(CIMTypeOf<T>::kType, false);
         }
     }
+    countBytes(sizeof(CIMValueRep));
     return ValueAccess::make(parseElement<T>(element));
 }
 
@@ -218,6 +219,7 @@ template <typename T> CIMValue ElementDecoder::decodeArray(const XmlElement& ele
             array.append(parseElement<T>(child));
         }
     }
+    countBytes(sizeof(CIMValueRep) + array.size() * sizeof(T));
     return ValueAccess::make(std::move(array));
 }
 

@@ -19,7 +19,7 @@ struct HttpAnswerLimits
     // Bytes of the head of one chunk with its extensions; and of the last chunk's head with the trailer fields.
     std::uint32_t maxFramingBytes = 64 * 1024;
     // Bytes of the body, the framing of chunks excluded.
-    std::uint64_t maxBodyBytes = std::uint64_t(4) * 1024 * 1024 * 1024;
+    std::uint64_t maxBodyBytes = 512UL * 1024 * 1024;
 };
 
 // The fields of a CIM server's answer that mean something; those of the trailer are entered when they come.

@@ -19,10 +19,14 @@ struct XmlLimits
     std::size_t maxElementBytes = 64UL * 1024 * 1024;
     // Elements of one array value.
     std::size_t maxArrayElements = 1024UL * 1024;
+    // Members of one owner and kind: properties, methods or qualifiers of a class, parameters of a method.
+    std::size_t maxMembers = 16384;
     // Key bindings of one object path, nested ones excluded.
     std::size_t maxKeyBindings = 256;
     // Embedded objects in embedded objects.
     std::size_t maxEmbedding = 8;
+    // Bytes in memory of the objects that a client decodes one answer into, by ElementDecoder::decodedBytes().
+    std::size_t maxDecodedBytes = 256UL * 1024 * 1024;
 };
 
 } // namespace Pegasus::wire

@@ -253,6 +253,10 @@ void RequestDecoder::decodeExtrinsic(XmlElement call, CimRequest& request)
     request.object.setNameSpace(CIMNamespaceName());
     for (child = child.nextSibling(); child; child = child.nextSibling()) {
         child.expectName("PARAMVALUE");
+        if (request.arguments.size() >= fElements.limits().maxMembers) {
+            child.fail(XmlError::Kind::kTooLarge,
+                       "more than " + std::to_string(fElements.limits().maxMembers) + " arguments");
+        }
         request.arguments.append(fElements.decodeParamValue(child));
     }
 }

@@ -5,6 +5,8 @@
 
 #include <gtest/gtest.h>
 
+#include <ctime>
+
 namespace {
 
 using test::AnswerCase;
@@ -135,6 +137,12 @@ const LimitCase kLimits[] = {
     {"text", [](auto& l) { l.xml.maxTextBytes = 8; }, "class", "text of more than 8 bytes"},
     {"element bytes", [](auto& l) { l.xml.maxElementBytes = 300; }, "instances", "an element of more than 300 bytes"},
     {"array elements", [](auto& l) { l.xml.maxArrayElements = 1; }, "instances", "an array of more than 1 elements"},
+    {"properties", [](auto& l) { l.xml.maxMembers = 2; }, "class", "more than 2 members of one owner"},
+    {"qualifiers", [](auto& l) { l.xml.maxMembers = 0; }, "class", "more than 0 members of one owner"},
+    {"decoded bytes", [](auto& l) { l.xml.maxDecodedBytes = 3000; }, "instances",
+     "objects of more than 3000 bytes in one answer"},
+    {"decoded bytes of one object", [](auto& l) { l.xml.maxDecodedBytes = 300; }, "class",
+     "objects of more than 300 bytes in one answer"},
     {"key bindings", [](auto& l) { l.xml.maxKeyBindings = 1; }, "instances", "more than 1 key bindings"},
     {"embedded objects", [](auto& l) { l.xml.maxEmbedding = 0; }, "instances", "embedded more than 0 deep"},
 };
@@ -157,4 +165,59 @@ TEST(AnswerLimits, EachLimitHasAnErrorOfItsOwn)
         }
         EXPECT_TRUE(found) << limit.name;
     }
+}
+
+TEST(AnswerLimits, PassedDeadlineEndsTheDecodingBeforeTheNextElement)
+{
+    const Pegasus::client::ExpectedResponse expected{"1", "EnumerateClassNames"};
+    Pegasus::wire::ElementDecoder decoder;
+    std::size_t count = 0;
+    Pegasus::client::ResponseReader reader(
+        expected, decoder, [&](const auto&, auto&) { ++count; },
+        Pegasus::base::Deadline::after(std::chrono::milliseconds(0)));
+    EXPECT_THROW(reader.feed("<?xml version=\"1.0\"?><CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"><MESSAGE ID=\"1\" "
+                             "PROTOCOLVERSION=\"1.0\"><SIMPLERSP><IMETHODRESPONSE NAME=\"EnumerateClassNames\">"
+                             "<IRETURNVALUE><CLASSNAME NAME=\"A\"/></IRETURNVALUE>"),
+                 Pegasus::ConnectionTimeoutException);
+    EXPECT_EQ(count, 0u);
+}
+
+namespace {
+
+// Returns: the message of the error; else the seconds that it took to decode so many members and the last one.
+std::string decodeMembers(std::size_t count, const std::string& last, double& seconds)
+{
+    std::string text = "<INSTANCE CLASSNAME=\"A\">";
+    for (std::size_t i = 0; i < count; ++i) {
+        text += "<PROPERTY NAME=\"P" + std::to_string(i) + "\" TYPE=\"string\"/>";
+    }
+    text += last + "</INSTANCE>";
+    Pegasus::wire::XmlDocument document;
+    const std::clock_t start = std::clock();
+    try {
+        Pegasus::wire::ElementDecoder().decodeInstance(document.parseFragment(text.data(), text.size()));
+    } catch (const Pegasus::wire::XmlError& error) {
+        return std::string(error.getMessage().getCString());
+    }
+    seconds += double(std::clock() - start) / CLOCKS_PER_SEC;
+    return "";
+}
+
+} // namespace
+
+// 50,000 members took 25 s when each was compared with all before it.
+TEST(AnswerLimits, TimeGrowsWithTheNumberOfMembersAndNotWithItsSquare)
+{
+    const std::size_t limit = Pegasus::wire::XmlLimits().maxMembers;
+    double atLimit = 0;
+    double inEighths = 0;
+    EXPECT_EQ(decodeMembers(limit, "", atLimit), "");
+    for (int i = 0; i < 8; ++i) {
+        EXPECT_EQ(decodeMembers(limit / 8, "", inEighths), "");
+    }
+    EXPECT_LT(atLimit, 4 * inEighths + 0.01);
+    EXPECT_NE(decodeMembers(limit, "<PROPERTY NAME=\"Q\" TYPE=\"string\"/>", atLimit).find("more than 16384 members"),
+              std::string::npos);
+    EXPECT_NE(decodeMembers(limit / 2, "<PROPERTY NAME=\"p9\" TYPE=\"string\"/>", atLimit).find("named \"p9\""),
+              std::string::npos);
 }
