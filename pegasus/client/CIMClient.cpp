@@ -180,6 +180,23 @@ CIMObjectPath CIMClient::createInstance(const CIMNamespaceName& nameSpace, const
     return readOne(*fRep, makeRequest(call), "INSTANCENAME", &ElementDecoder::decodeInstanceName);
 }
 
+void CIMClient::modifyInstance(const CIMNamespaceName& nameSpace, const CIMInstance& modifiedInstance,
+                               Boolean includeQualifiers, const CIMPropertyList& propertyList)
+{
+    IntrinsicCall call("ModifyInstance", nameSpace);
+    call.modifiedInstance(modifiedInstance)
+        .flag("IncludeQualifiers", includeQualifiers, true)
+        .propertyList(propertyList);
+    readNothing(*fRep, makeRequest(call, kWrites));
+}
+
+void CIMClient::deleteInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& instanceName)
+{
+    IntrinsicCall call("DeleteInstance", nameSpace);
+    call.instanceName(instanceName);
+    readNothing(*fRep, makeRequest(call, kWrites));
+}
+
 CIMQualifierDecl CIMClient::getQualifier(const CIMNamespaceName& nameSpace, const CIMName& qualifierName)
 {
     IntrinsicCall call("GetQualifier", nameSpace);

@@ -101,24 +101,23 @@ CIMObjectPath instancePath(const CIMConstInstance& completed, const CIMConstClas
     return CIMObjectPath(String(), CIMNamespaceName(), itsClass.getClassName(), keys);
 }
 
-void mergeValues(CIMInstance& stored, const CIMConstInstance& modified, const CIMPropertyList& list)
+CIMInstance mergedInstance(const CIMInstance& stored, const CIMConstInstance& modified, const CIMConstClass& itsClass,
+                           const CIMPropertyList& list)
 {
+    CIMInstance changes(itsClass.getClassName());
     for (Uint32 i = 0; i < modified.getPropertyCount(); ++i) {
         const CIMConstProperty property = modified.getProperty(i);
-        if (!isListed(list, property.getName())) {
-            continue;
+        if (isListed(list, property.getName())) {
+            changes.addProperty(givenProperty(property, itsClass));
         }
-        const Uint32 index = stored.findProperty(property.getName());
-        if (index == PEG_NOT_FOUND) {
-            fail(CIM_ERR_FAILED, "no such property: " + base::utf8(property.getName()));
-        }
-        CIMProperty target = stored.getProperty(index);
-        if (property.getType() != target.getType() || property.isArray() != target.isArray()) {
-            fail(CIM_ERR_FAILED, "type mismatch");
-        }
-        target.setValue(property.getValue());
-        target.setPropagated(false);
     }
+    CIMInstance merged(itsClass.getClassName());
+    for (Uint32 i = 0; i < stored.getPropertyCount(); ++i) {
+        const CIMConstProperty kept = stored.getProperty(i);
+        const Uint32 changed = changes.findProperty(kept.getName());
+        merged.addProperty(changed == PEG_NOT_FOUND ? kept.clone() : changes.getProperty(changed));
+    }
+    return merged;
 }
 
 void filterInstance(CIMInstance& stored, const CIMConstClass& shape, const InstanceOptions& options)

@@ -14,10 +14,11 @@ CIMInstance completeInstance(const CIMConstInstance& given, const CIMConstClass&
 // Throws: CIM_ERR_FAILED "class has no keys: X", CIM_ERR_INVALID_PARAMETER for a null key of another type.
 CIMObjectPath instancePath(const CIMConstInstance& completed, const CIMConstClass& itsClass);
 
-// Puts the values of `modified` (all, or those listed) into a stored instance.
+// Returns: a stored instance with the values of `modified` (all, or those listed) in place of its own.
 // Requires: `stored` is complete. The caller checks that its path stays the same.
 // Throws: CIM_ERR_FAILED ("no such property: X", "type mismatch").
-void mergeValues(CIMInstance& stored, const CIMConstInstance& modified, const CIMPropertyList& list);
+CIMInstance mergedInstance(const CIMInstance& stored, const CIMConstInstance& modified, const CIMConstClass& itsClass,
+                           const CIMPropertyList& list);
 
 // Removes from a stored instance what the options leave out.
 // `shape`: the class whose properties are wanted; uninitialised for all.

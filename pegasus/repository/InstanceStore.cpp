@@ -46,12 +46,11 @@ void InstanceStore::modify(NamespaceId nameSpace, const CIMConstInstance& modifi
 {
     const InstanceRow row = find(nameSpace, modified.getPath());
     const CIMClass itsClass = classOf(nameSpace, modified.getPath().getClassName());
-    CIMInstance stored = fCodec.decodeInstance(row.body);
-    mergeValues(stored, modified, list);
-    if (pathKey(instancePath(stored, itsClass)) != pathKey(modified.getPath())) {
+    const CIMInstance merged = mergedInstance(fCodec.decodeInstance(row.body), modified, itsClass, list);
+    if (pathKey(instancePath(merged, itsClass)) != pathKey(modified.getPath())) {
         fail(CIM_ERR_INVALID_PARAMETER, "a key property cannot change");
     }
-    fStorage.updateInstance(row.sequence, fCodec.encodeInstance(stored));
+    fStorage.updateInstance(row.sequence, fCodec.encodeInstance(merged));
 }
 
 void InstanceStore::remove(NamespaceId nameSpace, const CIMObjectPath& path)

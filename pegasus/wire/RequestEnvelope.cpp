@@ -100,6 +100,14 @@ IntrinsicCall& IntrinsicCall::newInstance(const CIMInstance& instance)
     return *this;
 }
 
+IntrinsicCall& IntrinsicCall::modifiedInstance(const CIMInstance& instance)
+{
+    open("ModifiedInstance");
+    appendNamedInstance(fElement, instance);
+    close();
+    return *this;
+}
+
 IntrinsicCall& IntrinsicCall::qualifierDeclaration(const CIMQualifierDecl& declaration)
 {
     open("QualifierDeclaration");

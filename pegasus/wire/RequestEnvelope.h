@@ -30,6 +30,8 @@ class IntrinsicCall
     IntrinsicCall& propertyList(const CIMPropertyList& list);
     IntrinsicCall& newClass(const CIMClass& cimClass);
     IntrinsicCall& newInstance(const CIMInstance& instance);
+    // With its path.
+    IntrinsicCall& modifiedInstance(const CIMInstance& instance);
     IntrinsicCall& qualifierDeclaration(const CIMQualifierDecl& declaration);
 
     const std::string& method() const { return fMethod; }

@@ -7,6 +7,7 @@
 #include "pegasus/cmpi/module/VendorCall.h"
 #include "pegasus/cmpi/objects/ArgsObject.h"
 #include "pegasus/cmpi/objects/ContextObject.h"
+#include "pegasus/cmpi/objects/InstanceObject.h"
 #include "pegasus/cmpi/objects/ObjectPathObject.h"
 #include "pegasus/cmpi/objects/ResultObject.h"
 
@@ -17,14 +18,6 @@
 namespace Pegasus::cmpi {
 namespace {
 
-// CMPI's own codes mean something to brokers and providers only.
-CIMStatusCode statusCodeOf(CMPIrc code)
-{
-    const bool isCim =
-        (code >= CMPI_RC_ERR_FAILED && code <= CMPI_RC_ERR_METHOD_NOT_FOUND) || (code >= 20 && code <= 29);
-    return isCim ? static_cast<CIMStatusCode>(code) : CIM_ERR_FAILED;
-}
-
 // Requires: the frame of the call that returned the status is still open, since it owns the message.
 void throwUnlessOk(const CMPIStatus& status)
 {
@@ -32,7 +25,8 @@ void throwUnlessOk(const CMPIStatus& status)
         return;
     }
     const bool hasText = status.msg != nullptr && status.msg->hdl != nullptr;
-    throw CIMException(statusCodeOf(status.rc),
+    // A code that CIM lacks is passed on, as in OpenPegasus: clients see the number.
+    throw CIMException(static_cast<CIMStatusCode>(status.rc),
                        hasText ? base::fromUtf8Repaired(static_cast<const char*>(status.msg->hdl)) : String::EMPTY);
 }
 
@@ -177,6 +171,55 @@ CIMInstance ProviderModule::getInstance(const ProviderRequest& request, const CI
         throw CIMException(CIM_ERR_NOT_FOUND, path.toString());
     }
     return *found;
+}
+
+CIMObjectPath ProviderModule::createInstance(const ProviderRequest& request, const CIMInstance& instance)
+{
+    std::optional<CIMObjectPath> created;
+    const PropertyFilter filter;
+    ResultObject result(
+        filter, nullptr, [&created](const CIMObjectPath& path) { created = path; }, nullptr);
+    const Call call(fImpl->broker, fImpl->interfaces, request, classPath(instance.getClassName()), result);
+    InstanceObject argument(fImpl->broker, instance, request.nameSpace);
+    asArgument(argument);
+    CMPIInstanceMI& mi = fImpl->interfaces.instance(request.provider);
+    if (mi.ft->createInstance == nullptr) {
+        throw notServed(request, CIM_ERR_NOT_SUPPORTED, "createInstance");
+    }
+    call.run(mi.ft->createInstance, &mi, call.context(), call.result(), call.path(),
+             static_cast<const CMPIInstance*>(&argument));
+    if (!created) {
+        throw CIMException(CIM_ERR_FAILED, String("The provider returned no path."));
+    }
+    return *created;
+}
+
+void ProviderModule::modifyInstance(const ProviderRequest& request, const CIMInstance& modified,
+                                    const CIMPropertyList& properties)
+{
+    PropertyFilter filter(properties);
+    ResultObject result(filter, nullptr, nullptr, nullptr);
+    const Call call(fImpl->broker, fImpl->interfaces, request, modified.getPath(), result);
+    InstanceObject argument(fImpl->broker, modified, request.nameSpace);
+    asArgument(argument);
+    CMPIInstanceMI& mi = fImpl->interfaces.instance(request.provider);
+    if (mi.ft->modifyInstance == nullptr) {
+        throw notServed(request, CIM_ERR_NOT_SUPPORTED, "modifyInstance");
+    }
+    call.run(mi.ft->modifyInstance, &mi, call.context(), call.result(), call.path(),
+             static_cast<const CMPIInstance*>(&argument), filter.names());
+}
+
+void ProviderModule::deleteInstance(const ProviderRequest& request, const CIMObjectPath& path)
+{
+    const PropertyFilter filter;
+    ResultObject result(filter, nullptr, nullptr, nullptr);
+    const Call call(fImpl->broker, fImpl->interfaces, request, path, result);
+    CMPIInstanceMI& mi = fImpl->interfaces.instance(request.provider);
+    if (mi.ft->deleteInstance == nullptr) {
+        throw notServed(request, CIM_ERR_NOT_SUPPORTED, "deleteInstance");
+    }
+    call.run(mi.ft->deleteInstance, &mi, call.context(), call.result(), call.path());
 }
 
 CIMValue ProviderModule::invokeMethod(const ProviderRequest& request, const CIMObjectPath& path, const CIMName& method,

@@ -13,7 +13,7 @@ namespace Pegasus::cmpi {
 // The constructor loads the library. A provider's instance or method interface is made at its first request and kept.
 // The paths of delivered instances, and delivered paths, consist of class and keys.
 //
-// Throws: CIMException with the provider's status code and text; CMPI's own codes become CIM_ERR_FAILED. Also
+// Throws: CIMException with the provider's status code, whether CIM knows it or not, and its text. Also
 //     CIM_ERR_FAILED: "ProviderLoadFailure: ..." when the library lacks entry points for the provider, and
 //     "ProviderInitFailure: ..." when its factory fails (the next request tries again).
 // Thread: every member except the destructor may be called on several threads at once. The provider runs on the
@@ -54,6 +54,13 @@ class ProviderModule
     // Throws: CIM_ERR_NOT_FOUND also when the provider returns nothing.
     CIMInstance getInstance(const ProviderRequest& request, const CIMObjectPath& path,
                             const CIMPropertyList& properties);
+
+    // Returns: the path that the provider returns.
+    // Throws: CIM_ERR_FAILED also when it returns none.
+    CIMObjectPath createInstance(const ProviderRequest& request, const CIMInstance& instance);
+    // `modified` has its path; a null list stands for all properties that it has.
+    void modifyInstance(const ProviderRequest& request, const CIMInstance& modified, const CIMPropertyList& properties);
+    void deleteInstance(const ProviderRequest& request, const CIMObjectPath& path);
 
     // Replaces `out`.
     // Throws: CIM_ERR_FAILED also when the returned value is missing or null.

@@ -1,11 +1,13 @@
 #include "pegasus/server/agent/AgentHandler.h"
 
+#include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/OwnedPath.h"
 #include "pegasus/base/PercentCoding.h"
 #include "pegasus/server/agent/AgentMessages.h"
 #include "pegasus/wire/ElementEncoder.h"
 
 #include <cstdlib>
+#include <utility>
 
 #include <unistd.h>
 
@@ -61,23 +63,29 @@ void AgentHandler::requireOwned(const std::string& library) const
 
 void AgentHandler::handle(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)
 {
+    using Operation = void (AgentHandler::*)(const HttpRequest&, const CimRequest&, CimAnswer&);
+    static const std::pair<const char*, Operation> kOperations[] = {
+        {"EnumerateInstances", &AgentHandler::enumerateInstances},
+        {"EnumerateInstanceNames", &AgentHandler::enumerateInstanceNames},
+        {"GetInstance", &AgentHandler::getInstance},
+        {"CreateInstance", &AgentHandler::createInstance},
+        {"ModifyInstance", &AgentHandler::modifyInstance},
+        {"DeleteInstance", &AgentHandler::deleteInstance},
+        {kUnloadMethod, &AgentHandler::unload},
+    };
     if (!request.isIntrinsic) {
-        invokeMethod(http, request, answer);
-    } else if (request.method == "EnumerateInstances") {
-        enumerateInstances(http, request, answer);
-    } else if (request.method == "EnumerateInstanceNames") {
-        enumerateInstanceNames(http, request, answer);
-    } else if (request.method == "GetInstance") {
-        getInstance(http, request, answer);
-    } else if (request.method == kUnloadMethod) {
-        unload();
-    } else {
-        throw CIMException(CIM_ERR_NOT_SUPPORTED, String());
+        return invokeMethod(http, request, answer);
     }
+    for (const auto& [name, operation] : kOperations) {
+        if (base::equalNoCase(name, request.method)) {
+            return (this->*operation)(http, request, answer);
+        }
+    }
+    throw CIMException(CIM_ERR_NOT_SUPPORTED, String());
 }
 
 // Success says that the agent may be ended.
-void AgentHandler::unload()
+void AgentHandler::unload(const HttpRequest&, const CimRequest&, CimAnswer&)
 {
     const std::lock_guard<std::mutex> lock(fMutex);
     if (fModule && fModule->cleanupWhenIdle() != cmpi::ProviderModule::Cleanup::kReleased) {
@@ -114,6 +122,25 @@ void AgentHandler::getInstance(const HttpRequest& http, const CimRequest& reques
                                                         request.parameters.instanceName("InstanceName"),
                                                         request.parameters.propertyList()));
     answer.write(text);
+}
+
+void AgentHandler::createInstance(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)
+{
+    std::string text;
+    wire::appendInstanceName(
+        text, module(http).createInstance(providerRequest(http, request), request.parameters.instance("NewInstance")));
+    answer.write(text);
+}
+
+void AgentHandler::modifyInstance(const HttpRequest& http, const CimRequest& request, CimAnswer&)
+{
+    module(http).modifyInstance(providerRequest(http, request), request.parameters.namedInstance("ModifiedInstance"),
+                                request.parameters.propertyList());
+}
+
+void AgentHandler::deleteInstance(const HttpRequest& http, const CimRequest& request, CimAnswer&)
+{
+    module(http).deleteInstance(providerRequest(http, request), request.parameters.instanceName("InstanceName"));
 }
 
 void AgentHandler::invokeMethod(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)

@@ -29,10 +29,13 @@ class AgentHandler : public RequestHandler
   private:
     cmpi::ProviderModule& module(const HttpRequest& http);
     void requireOwned(const std::string& library) const;
-    void unload();
+    void unload(const HttpRequest& http, const CimRequest& request, CimAnswer& answer);
     void enumerateInstances(const HttpRequest& http, const CimRequest& request, CimAnswer& answer);
     void enumerateInstanceNames(const HttpRequest& http, const CimRequest& request, CimAnswer& answer);
     void getInstance(const HttpRequest& http, const CimRequest& request, CimAnswer& answer);
+    void createInstance(const HttpRequest& http, const CimRequest& request, CimAnswer& answer);
+    void modifyInstance(const HttpRequest& http, const CimRequest& request, CimAnswer& answer);
+    void deleteInstance(const HttpRequest& http, const CimRequest& request, CimAnswer& answer);
     void invokeMethod(const HttpRequest& http, const CimRequest& request, CimAnswer& answer);
 
     std::string fModuleName;

@@ -33,6 +33,19 @@ AgentRequest makeEnumerateInstanceNamesRequest(const CIMNamespaceName& nameSpace
     return makeRequest(wire::IntrinsicCall("EnumerateInstanceNames", nameSpace).className("ClassName", className));
 }
 
+AgentRequest makeGetInstanceRequest(const CIMNamespaceName& nameSpace, const CIMObjectPath& path,
+                                    const CIMPropertyList& properties)
+{
+    return makeRequest(wire::IntrinsicCall("GetInstance", nameSpace).instanceName(path).propertyList(properties));
+}
+
+AgentRequest makeModifyInstanceRequest(const CIMNamespaceName& nameSpace, const CIMInstance& modified,
+                                       const CIMPropertyList& properties)
+{
+    return makeRequest(
+        wire::IntrinsicCall("ModifyInstance", nameSpace).modifiedInstance(modified).propertyList(properties));
+}
+
 AgentRequest makeUnloadRequest()
 {
     wire::IntrinsicCall call(kUnloadMethod, CIMNamespaceName("root"));

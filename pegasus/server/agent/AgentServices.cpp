@@ -39,9 +39,14 @@ template <typename Call> auto AgentServices::withClient(const Call& call)
 {
     std::unique_ptr<CIMClient> client = takeClient();
     try {
-        auto result = call(*client);
-        giveBack(std::move(client));
-        return result;
+        if constexpr (std::is_void_v<decltype(call(*client))>) {
+            call(*client);
+            giveBack(std::move(client));
+        } else {
+            auto result = call(*client);
+            giveBack(std::move(client));
+            return result;
+        }
     } catch (const CIMException&) {
         giveBack(std::move(client));
         throw;
@@ -82,6 +87,17 @@ CIMValue AgentServices::invokeMethod(const CIMNamespaceName& nameSpace, const CI
 CIMObjectPath AgentServices::createInstance(const CIMNamespaceName& nameSpace, const CIMInstance& instance)
 {
     return withClient([&](CIMClient& client) { return client.createInstance(nameSpace, instance); });
+}
+
+void AgentServices::modifyInstance(const CIMNamespaceName& nameSpace, const CIMInstance& instance,
+                                   const CIMPropertyList& properties)
+{
+    withClient([&](CIMClient& client) { client.modifyInstance(nameSpace, instance, false, properties); });
+}
+
+void AgentServices::deleteInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path)
+{
+    withClient([&](CIMClient& client) { client.deleteInstance(nameSpace, path); });
 }
 
 void AgentServices::log(Severity severity, const std::string& text) noexcept

@@ -29,6 +29,9 @@ class AgentServices : public cmpi::BrokerServices
     CIMValue invokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPath& path, const CIMName& method,
                           const Array<CIMParamValue>& in, Array<CIMParamValue>& out) override;
     CIMObjectPath createInstance(const CIMNamespaceName& nameSpace, const CIMInstance& instance) override;
+    void modifyInstance(const CIMNamespaceName& nameSpace, const CIMInstance& instance,
+                        const CIMPropertyList& properties) override;
+    void deleteInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path) override;
     void log(Severity severity, const std::string& text) noexcept override;
 
   private:

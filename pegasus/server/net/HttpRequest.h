@@ -22,6 +22,7 @@ struct HttpRequest
     std::string method; // "POST"; "M-POST" has been resolved (its numbered headers bear their plain names)
     std::string body;
     std::vector<std::pair<std::string, std::string>> headers;
+    bool isVersion10 = false;    // of HTTP/1.0, which may leave the Host header out
     bool hasBodyLength = false;  // by Content-Length or chunks
     std::string extensionPrefix; // "NN-" of an M-POST, for the answer's headers
 

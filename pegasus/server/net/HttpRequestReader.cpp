@@ -151,6 +151,7 @@ HttpRequest HttpRequestParser::take()
     auto message = fImpl->parser.release();
     HttpRequest request;
     request.method = std::string(message.method_string());
+    request.isVersion10 = message.version() < 11;
     for (const auto& field : message) {
         request.headers.emplace_back(std::string(field.name_string()), std::string(field.value()));
     }

@@ -48,7 +48,7 @@ void checkHeaders(const HttpRequest& http)
     if (!http.hasBodyLength) {
         throw HttpError(411, HttpError::After::kClose);
     }
-    if (http.header("Host") == nullptr) {
+    if (http.header("Host") == nullptr && !http.isVersion10) {
         refuse("", "HTTP request message lacks a Host header field.");
     }
     const std::string* operation = http.header("CIMOperation");
@@ -230,10 +230,7 @@ void RequestDecoder::decodeIntrinsic(XmlElement call, CimRequest& request)
         child.expectName("IPARAMVALUE");
         child.attributes(kNames, values);
         requiredAttribute(child, values[0], "IPARAMVALUE.NAME");
-        const XmlElement value = child.firstChild();
-        if (value) {
-            request.parameters.add(*values[0], child.onlyChild());
-        }
+        request.parameters.add(*values[0], child.firstChild() ? child.onlyChild() : XmlElement());
     }
 }
 

@@ -15,61 +15,63 @@ void withoutHttp(ServerCore& core, const HttpRequest&, const CimRequest& request
     operation(core, request, answer);
 }
 
-void notSupported(ServerCore&, const HttpRequest&, const CimRequest&, ElementSink&)
-{
-    throw CIMException(CIM_ERR_NOT_SUPPORTED, String());
-}
-
+// The names in DSP0200 of an operation and its parameters, separated by blanks.
 struct Entry
 {
     const char* name;
-    Operation operation;
+    Operation operation; // null: CIM_ERR_NOT_SUPPORTED
+    const char* required = "";
+    const char* optional = "";
 };
 
 constexpr Entry kOperations[] = {
-    {"GetClass", withoutHttp<operations::getClass>},
-    {"EnumerateInstances", withoutHttp<operations::enumerateInstances>},
-    {"GetInstance", operations::getInstance},
-    {"EnumerateInstanceNames", withoutHttp<operations::enumerateInstanceNames>},
-    {"GetQualifier", withoutHttp<operations::getQualifier>},
+    {"GetClass", withoutHttp<operations::getClass>, "ClassName",
+     "LocalOnly IncludeQualifiers IncludeClassOrigin PropertyList"},
+    {"EnumerateInstances", withoutHttp<operations::enumerateInstances>, "ClassName",
+     "LocalOnly DeepInheritance IncludeQualifiers IncludeClassOrigin PropertyList"},
+    {"GetInstance", operations::getInstance, "InstanceName",
+     "LocalOnly IncludeQualifiers IncludeClassOrigin PropertyList"},
+    {"EnumerateInstanceNames", withoutHttp<operations::enumerateInstanceNames>, "ClassName"},
+    {"GetQualifier", withoutHttp<operations::getQualifier>, "QualifierName"},
     {"EnumerateQualifiers", withoutHttp<operations::enumerateQualifiers>},
-    {"EnumerateClasses", withoutHttp<operations::enumerateClasses>},
-    {"EnumerateClassNames", withoutHttp<operations::enumerateClassNames>},
-    {"CreateClass", withoutHttp<operations::createClass>},
-    {"CreateInstance", withoutHttp<operations::createInstance>},
-    {"SetQualifier", withoutHttp<operations::setQualifier>},
-    {"DeleteClass", notSupported},
-    {"DeleteInstance", notSupported},
-    {"DeleteQualifier", notSupported},
-    {"ModifyClass", notSupported},
-    {"ModifyInstance", notSupported},
-    {"GetProperty", notSupported},
-    {"SetProperty", notSupported},
-    {"ExecQuery", notSupported},
-    {"Associators", notSupported},
-    {"AssociatorNames", notSupported},
-    {"References", notSupported},
-    {"ReferenceNames", notSupported},
-    {"OpenEnumerateInstances", notSupported},
-    {"OpenEnumerateInstancePaths", notSupported},
-    {"OpenReferenceInstances", notSupported},
-    {"OpenReferenceInstancePaths", notSupported},
-    {"OpenAssociatorInstances", notSupported},
-    {"OpenAssociatorInstancePaths", notSupported},
-    {"OpenQueryInstances", notSupported},
-    {"PullInstancesWithPath", notSupported},
-    {"PullInstancePaths", notSupported},
-    {"PullInstances", notSupported},
-    {"CloseEnumeration", notSupported},
-    {"EnumerationCount", notSupported},
+    {"EnumerateClasses", withoutHttp<operations::enumerateClasses>, "",
+     "ClassName DeepInheritance LocalOnly IncludeQualifiers IncludeClassOrigin"},
+    {"EnumerateClassNames", withoutHttp<operations::enumerateClassNames>, "", "ClassName DeepInheritance"},
+    {"CreateClass", withoutHttp<operations::createClass>, "NewClass"},
+    {"CreateInstance", operations::createInstance, "NewInstance"},
+    {"ModifyInstance", operations::modifyInstance, "ModifiedInstance", "IncludeQualifiers PropertyList"},
+    {"DeleteInstance", operations::deleteInstance, "InstanceName"},
+    {"GetProperty", withoutHttp<operations::getProperty>, "InstanceName PropertyName"},
+    {"SetProperty", withoutHttp<operations::setProperty>, "InstanceName PropertyName", "NewValue"},
+    {"SetQualifier", withoutHttp<operations::setQualifier>, "QualifierDeclaration"},
+    {"DeleteClass", nullptr},
+    {"DeleteQualifier", nullptr},
+    {"ModifyClass", nullptr},
+    {"ExecQuery", nullptr},
+    {"Associators", nullptr},
+    {"AssociatorNames", nullptr},
+    {"References", nullptr},
+    {"ReferenceNames", nullptr},
+    {"OpenEnumerateInstances", nullptr},
+    {"OpenEnumerateInstancePaths", nullptr},
+    {"OpenReferenceInstances", nullptr},
+    {"OpenReferenceInstancePaths", nullptr},
+    {"OpenAssociatorInstances", nullptr},
+    {"OpenAssociatorInstancePaths", nullptr},
+    {"OpenQueryInstances", nullptr},
+    {"PullInstancesWithPath", nullptr},
+    {"PullInstancePaths", nullptr},
+    {"PullInstances", nullptr},
+    {"CloseEnumeration", nullptr},
+    {"EnumerationCount", nullptr},
 };
 
 // Returns: null for an unknown method.
-Operation findOperation(const CimRequest& request)
+const Entry* findOperation(const CimRequest& request)
 {
     for (const Entry& entry : kOperations) {
         if (base::equalNoCase(entry.name, request.method)) {
-            return entry.operation;
+            return &entry;
         }
     }
     return nullptr;
@@ -84,11 +86,15 @@ bool Dispatcher::knowsMethod(const CimRequest& request) const
 
 void Dispatcher::handle(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)
 {
-    if (request.isIntrinsic) {
-        findOperation(request)(fCore, http, request, answer);
-    } else {
-        operations::invokeMethod(fCore, http, request, answer);
+    if (!request.isIntrinsic) {
+        return operations::invokeMethod(fCore, http, request, answer);
     }
+    const Entry& entry = *findOperation(request);
+    if (entry.operation == nullptr) {
+        throw CIMException(CIM_ERR_NOT_SUPPORTED, String());
+    }
+    request.parameters.check(entry.required, entry.optional);
+    entry.operation(fCore, http, request, answer);
 }
 
 } // namespace Pegasus::server

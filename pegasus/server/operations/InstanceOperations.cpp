@@ -1,7 +1,7 @@
-#include "pegasus/base/Text.h"
 #include "pegasus/server/agent/AgentMessages.h"
 #include "pegasus/server/operations/InstanceSources.h"
 #include "pegasus/server/operations/Operations.h"
+#include "pegasus/server/operations/ProviderCall.h"
 #include "pegasus/server/operations/ServerInstances.h"
 #include "pegasus/wire/ElementEncoder.h"
 
@@ -48,13 +48,6 @@ class FirstError
     CimStatus fStatus;
 };
 
-void failUnlessGood(const CimStatus& status)
-{
-    if (status.code != 0) {
-        throw OperationFailed(status);
-    }
-}
-
 } // namespace
 
 void getInstance(ServerCore& core, const HttpRequest& http, const CimRequest& request, ElementSink& answer)
@@ -72,12 +65,7 @@ void getInstance(ServerCore& core, const HttpRequest& http, const CimRequest& re
         throw CIMException(CIM_ERR_INVALID_CLASS, path.getClassName().getString());
     }
     if (const auto provider = core.registry.find(request.nameSpace, path.getClassName(), ProviderType::kInstance)) {
-        AgentRequest passed;
-        passed.method = request.method;
-        passed.object = base::utf8(request.nameSpace);
-        passed.body = http.body;
-        failUnlessGood(core.agents.request(*provider, passed, answer));
-        return;
+        return askProvider(core, *provider, passedOn(http, request), answer);
     }
     repository::InstanceOptions options;
     options.includeClassOrigin = request.parameters.boolean("IncludeClassOrigin", false);
@@ -151,29 +139,6 @@ void enumerateInstanceNames(ServerCore& core, const CimRequest& request, Element
         answer.write(text);
     }
     error.rethrow();
-}
-
-void createInstance(ServerCore& core, const CimRequest& request, ElementSink& answer)
-{
-    const CIMInstance instance = request.parameters.instance("NewInstance");
-    const CIMName& className = instance.getClassName();
-    CIMObjectPath path;
-    if (isNamespaceClass(className)) {
-        path = createNamespace(core, request.nameSpace, instance);
-    } else if (ProviderRegistry::isRegistration(request.nameSpace, className)) {
-        path = core.registry.registerInstance(instance);
-    } else {
-        requireNamespace(core, request.nameSpace);
-        if (ServerInstances::find(core, request.nameSpace, className) ||
-            core.registry.find(request.nameSpace, className, ProviderType::kInstance))
-        {
-            throw CIMException(CIM_ERR_NOT_SUPPORTED, className.getString());
-        }
-        path = core.repository.createInstance(request.nameSpace, instance);
-    }
-    std::string text;
-    wire::appendInstanceName(text, path);
-    answer.write(text);
 }
 
 } // namespace Pegasus::server::operations

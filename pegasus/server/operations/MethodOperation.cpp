@@ -1,6 +1,7 @@
 #include "pegasus/base/PercentCoding.h"
 #include "pegasus/server/operations/ConfigService.h"
 #include "pegasus/server/operations/Operations.h"
+#include "pegasus/server/operations/ProviderCall.h"
 #include "pegasus/wire/ElementEncoder.h"
 #include "pegasus/wire/RequestEnvelope.h"
 
@@ -69,10 +70,7 @@ void passToProvider(ServerCore& core, const HttpRequest& http, const CimRequest&
     passed.method = request.method;
     passed.object = base::percentDecoded(*http.header("CIMObject"));
     passed.body = providerMessage(core, http, request);
-    const CimStatus status = core.agents.request(*provider, passed, answer);
-    if (status.code != 0) {
-        throw OperationFailed(status);
-    }
+    askProvider(core, *provider, passed, answer);
 }
 
 } // namespace

@@ -22,7 +22,11 @@ void setQualifier(ServerCore& core, const CimRequest& request, ElementSink& answ
 void getInstance(ServerCore& core, const HttpRequest& http, const CimRequest& request, ElementSink& answer);
 void enumerateInstances(ServerCore& core, const CimRequest& request, ElementSink& answer);
 void enumerateInstanceNames(ServerCore& core, const CimRequest& request, ElementSink& answer);
-void createInstance(ServerCore& core, const CimRequest& request, ElementSink& answer);
+void createInstance(ServerCore& core, const HttpRequest& http, const CimRequest& request, ElementSink& answer);
+void modifyInstance(ServerCore& core, const HttpRequest& http, const CimRequest& request, ElementSink& answer);
+void deleteInstance(ServerCore& core, const HttpRequest& http, const CimRequest& request, ElementSink& answer);
+void getProperty(ServerCore& core, const CimRequest& request, ElementSink& answer);
+void setProperty(ServerCore& core, const CimRequest& request, ElementSink& answer);
 
 // A method of the server's own services, or of the class's method provider through its agent. Parameters that
 // came with a type reach the provider as they were sent, and checking them is the provider's task; the others get the

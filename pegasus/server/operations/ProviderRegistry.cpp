@@ -124,6 +124,35 @@ CIMObjectPath ProviderRegistry::registerInstance(const CIMInstance& instance)
     return path;
 }
 
+void ProviderRegistry::removeInstance(const CIMObjectPath& path)
+{
+    const std::lock_guard<std::mutex> one(fRegistration);
+    const CIMInstance removed = fRepository.getInstance(interop(), path, {});
+    const bool isModule = removed.getClassName() == CIMName(kModuleClass);
+    const std::string name = stringProperty(removed, "Name");
+    const std::string module = isModule ? name : stringProperty(removed, "ProviderModuleName");
+    // The dependents first: what is left when the server dies in between is whole registrations.
+    if (removed.getClassName() != CIMName(kCapabilitiesClass)) {
+        for (const CIMInstance& capabilities : storedInstances(fRepository, kCapabilitiesClass)) {
+            if (stringProperty(capabilities, "ProviderModuleName") == module &&
+                (isModule || stringProperty(capabilities, "ProviderName") == name))
+            {
+                fRepository.deleteInstance(interop(), capabilities.getPath());
+            }
+        }
+    }
+    if (isModule) {
+        for (const CIMInstance& provider : storedInstances(fRepository, kProviderClass)) {
+            if (stringProperty(provider, "ProviderModuleName") == module) {
+                fRepository.deleteInstance(interop(), provider.getPath());
+            }
+        }
+    }
+    fRepository.deleteInstance(interop(), path);
+    const std::lock_guard<std::mutex> lock(fMutex);
+    fLoaded = false;
+}
+
 // Throws: when another registration has one of the instance's class, namespace and type already.
 void ProviderRegistry::checkNotTaken(const CIMInstance& capabilities)
 {

@@ -37,6 +37,11 @@ class ProviderRegistry
     // what the repository throws.
     CIMObjectPath registerInstance(const CIMInstance& instance);
 
+    // Removes a registration and those that build on it: a provider's capabilities, a module's providers. A module's
+    // agent that runs serves the requests that it has.
+    // Throws: CIM_ERR_NOT_FOUND, and what else the repository throws.
+    void removeInstance(const CIMObjectPath& path);
+
     // Returns: the provider of a class itself, whatever its superclass has; nullopt when absent.
     // Throws: what the repository throws.
     std::optional<ProviderReference> find(const CIMNamespaceName& nameSpace, const CIMName& className,

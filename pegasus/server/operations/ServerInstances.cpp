@@ -105,6 +105,13 @@ CIMInstance ServerInstances::get(const CIMObjectPath& path, const CIMPropertyLis
     throw CIMException(CIM_ERR_NOT_FOUND, path.toString());
 }
 
+void requireChangeable(ServerCore& core, const CIMNamespaceName& nameSpace, const CIMName& className)
+{
+    if (ProviderRegistry::isRegistration(nameSpace, className) || ServerInstances::find(core, nameSpace, className)) {
+        throw CIMException(CIM_ERR_NOT_SUPPORTED, className.getString());
+    }
+}
+
 CIMObjectPath createNamespace(ServerCore& core, const CIMNamespaceName& nameSpace, const CIMInstance& instance)
 {
     std::string name = base::utf8(nameSpace);

@@ -30,6 +30,9 @@ class ServerInstances
     virtual std::vector<CIMInstance> make() const = 0;
 };
 
+// Throws: CIM_ERR_NOT_SUPPORTED for the classes whose instances clients only read: the server's own, and registrations.
+void requireChangeable(ServerCore& core, const CIMNamespaceName& nameSpace, const CIMName& className);
+
 // Returns: whether the class is __Namespace.
 bool isNamespaceClass(const CIMName& className);
 

@@ -161,13 +161,9 @@ TEST_F(Module, PropertyListReachesProviderAndResult)
 TEST_F(Module, StatusDecidesAndKeepsItsCode)
 {
     load();
-    for (int code = 1; code <= 17; ++code) {
+    for (const int code : {1, 2, 16, 17, 18, 50, 61, 100, 200}) { // those that CIM lacks, too
         setMode("fail " + std::to_string(code));
         EXPECT_EQ(errorOf([&] { items(); }), std::to_string(code) + ": the reason");
-    }
-    for (const int code : {18, 50, 51, 60, 61, 100, 200, -1}) {
-        setMode("fail " + std::to_string(code));
-        EXPECT_EQ(errorOf([&] { items(); }), "1: the reason") << code;
     }
     setMode("fail without text");
     EXPECT_EQ(errorOf([&] { items(); }), "2: ");

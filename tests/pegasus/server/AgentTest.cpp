@@ -148,6 +148,33 @@ TEST_F(AgentTest, enumeratesNamesGetsAndInvokes)
     EXPECT_EQ(errorOf([&] { countOf("Nope"); }), "CIM_ERR_INVALID_CLASS: Nope");
 }
 
+TEST_F(AgentTest, changesReachTheProviderThatHasThem)
+{
+    start();
+    setCount(2);
+    CIMInstance instance("Probe_Bulk");
+    instance.addProperty(CIMProperty("T1", CIMValue(String("changed"))));
+    EXPECT_EQ(fClient.createInstance(kNamespace, instance).toString(), String("Probe_Bulk.Id=\"bulk-0000002\""));
+    EXPECT_EQ(countOf("Probe_Bulk"), 3u);
+    CIMObjectPath path("Probe_Bulk.Id=\"bulk-0000002\"");
+    instance.setPath(path);
+    EXPECT_EQ(errorOf([&] { fClient.modifyInstance(kNamespace, instance); }),
+              "CIM_ERR_NOT_SUPPORTED: only T1 can be changed");
+    Array<CIMName> t1;
+    t1.append("T1");
+    fClient.modifyInstance(kNamespace, instance, false, CIMPropertyList(t1));
+    const auto valueOf = [&] {
+        const std::string names =
+            "<IPARAMVALUE NAME=\"InstanceName\"><INSTANCENAME CLASSNAME=\"Probe_Bulk\"><KEYBINDING "
+            "NAME=\"Id\"><KEYVALUE>bulk-0000002</KEYVALUE></KEYBINDING></INSTANCENAME></IPARAMVALUE>"
+            "<IPARAMVALUE NAME=\"PropertyName\"><VALUE>T1</VALUE></IPARAMVALUE>";
+        return exchange(fTree.port(), intrinsicRequest("GetProperty", "root/probe", names)).body;
+    };
+    EXPECT_NE(valueOf().find("<IRETURNVALUE>\n<VALUE>changed</VALUE>"), std::string::npos) << valueOf();
+    EXPECT_EQ(errorOf([&] { fClient.deleteInstance(kNamespace, path); }),
+              "Unrecognized CIM status code \"99\": not this one");
+}
+
 TEST_F(AgentTest, aPropertyListReachesTheProvider)
 {
     start();
@@ -165,6 +192,7 @@ TEST_F(AgentTest, anUpcallIsServedWhileTheRequestWaits)
     setCount(5);
     EXPECT_EQ(call(fClient, "Probe_Bulk", "CountByUpcall"), 5u) << "into the agent that makes the call";
     EXPECT_EQ(call(fClient, "Probe_Other", "CountByUpcall"), 5u);
+    EXPECT_EQ(call(fClient, "Probe_Bulk", "ChangeByUpcall"), 7u) << "every step";
 }
 
 TEST_F(AgentTest, anErrorLeavesNothingDelivered)

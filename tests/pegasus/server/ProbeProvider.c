@@ -17,6 +17,7 @@
 /* Each factory sets it, maybe while the other one's interface works. */
 static const CMPIBroker* _Atomic gBroker;
 static CMPIUint32 gCount = 1000;
+static char gT1[80] = "A text of about sixty characters, as inventories are full of <them>.";
 
 static const CMPIStatus kOk = {CMPI_RC_OK, NULL};
 
@@ -63,7 +64,7 @@ static CMPIObjectPath* makePath(const CMPIObjectPath* of, CMPIUint32 number)
 
 static CMPIStatus deliver(const CMPIResult* result, const CMPIObjectPath* of, CMPIUint32 number)
 {
-    static const char* const kTexts[] = {"T1", "T2", "T3", "T4", "T5", "T6", "T7", "T8", "T9"};
+    static const char* const kTexts[] = {"T2", "T3", "T4", "T5", "T6", "T7", "T8", "T9"};
     char id[32];
     CMPIObjectPath* path = makePath(of, number);
     CMPIStatus status = kOk;
@@ -73,6 +74,7 @@ static CMPIStatus deliver(const CMPIResult* result, const CMPIObjectPath* of, CM
     }
     snprintf(id, sizeof id, "bulk-%07u", (unsigned)number);
     setText(instance, "Id", id);
+    setText(instance, "T1", gT1);
     for (size_t i = 0; i < sizeof kTexts / sizeof kTexts[0]; ++i) {
         setText(instance, kTexts[i], "A text of about sixty characters, as inventories are full of <them>.");
     }
@@ -125,31 +127,40 @@ static CMPIStatus getInstance(CMPIInstanceMI* mi, const CMPIContext* context, co
     return status.rc == CMPI_RC_OK ? result->ft->returnDone(result) : status;
 }
 
+/* One more instance, whatever it is to hold. */
 static CMPIStatus createInstance(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                                  const CMPIObjectPath* path, const CMPIInstance* instance)
 {
-    (void)mi, (void)context, (void)result, (void)path, (void)instance;
-    return failure(CMPI_RC_ERR_NOT_SUPPORTED, "");
+    (void)mi, (void)context, (void)instance;
+    result->ft->returnObjectPath(result, makePath(path, gCount++));
+    return result->ft->returnDone(result);
 }
 
+/* Sets the T1 of all instances. */
 static CMPIStatus modifyInstance(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                                  const CMPIObjectPath* path, const CMPIInstance* instance, const char** properties)
 {
-    (void)properties;
-    return createInstance(mi, context, result, path, instance);
+    (void)mi, (void)context, (void)path;
+    if (properties == NULL || properties[0] == NULL || strcasecmp(properties[0], "T1") != 0 || properties[1] != NULL) {
+        return failure(CMPI_RC_ERR_NOT_SUPPORTED, "only T1 can be changed");
+    }
+    snprintf(gT1, sizeof gT1, "%s", textOf(instance->ft->getProperty(instance, "T1", NULL).value.string));
+    return result->ft->returnDone(result);
 }
 
+/* Refused with a status that CIM does not know. */
 static CMPIStatus deleteInstance(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                                  const CMPIObjectPath* path)
 {
-    return createInstance(mi, context, result, path, NULL);
+    (void)mi, (void)context, (void)result, (void)path;
+    return failure((CMPIrc)99, "not this one");
 }
 
 static CMPIStatus execQuery(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                             const CMPIObjectPath* path, const char* language, const char* query)
 {
-    (void)language, (void)query;
-    return createInstance(mi, context, result, path, NULL);
+    (void)mi, (void)context, (void)result, (void)path, (void)language, (void)query;
+    return failure(CMPI_RC_ERR_NOT_SUPPORTED, "");
 }
 
 static CMPIStatus cleanupInstances(CMPIInstanceMI* mi, const CMPIContext* context, CMPIBoolean terminating)
@@ -245,6 +256,31 @@ static CMPIStatus countByUpcall(const CMPIContext* context, const CMPIResult* re
         ++count;
     }
     return returnNumber(result, count);
+}
+
+/* Creates, changes and deletes a stored instance. The number is that of the steps that succeeded. */
+static CMPIStatus changeByUpcall(const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path)
+{
+    CMPIStatus status = kOk;
+    CMPIUint32 steps = 0;
+    CMPIObjectPath* stored =
+        gBroker->eft->newObjectPath(gBroker, textOf(path->ft->getNameSpace(path, NULL)), "Probe_Stored", NULL);
+    stored->ft->addKey(stored, "Id", (const CMPIValue*)"by upcall", CMPI_chars);
+    CMPIInstance* instance = gBroker->eft->newInstance(gBroker, stored, NULL);
+    setText(instance, "Id", "by upcall");
+    steps += gBroker->bft->createInstance(gBroker, context, stored, instance, &status) != NULL;
+    setText(instance, "T1", "modified");
+    steps += gBroker->bft->modifyInstance(gBroker, context, stored, instance, NULL).rc == CMPI_RC_OK;
+    CMPIData data = gBroker->bft->getProperty(gBroker, context, stored, "T1", &status);
+    steps += data.type == CMPI_string && strcmp(textOf(data.value.string), "modified") == 0;
+    steps +=
+        gBroker->bft->setProperty(gBroker, context, stored, "T1", (const CMPIValue*)"set", CMPI_chars).rc == CMPI_RC_OK;
+    data = gBroker->bft->getProperty(gBroker, context, stored, "T1", &status);
+    steps += data.type == CMPI_string && strcmp(textOf(data.value.string), "set") == 0;
+    steps += gBroker->bft->deleteInstance(gBroker, context, stored).rc == CMPI_RC_OK;
+    steps += gBroker->bft->getInstance(gBroker, context, stored, NULL, &status) == NULL &&
+             status.rc == CMPI_RC_ERR_NOT_FOUND;
+    return returnNumber(result, steps);
 }
 
 /* Takes memory until it is exhausted. */
@@ -378,6 +414,9 @@ static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, con
     }
     if (strcasecmp(method, "CountByUpcall") == 0) {
         return countByUpcall(context, result, path);
+    }
+    if (strcasecmp(method, "ChangeByUpcall") == 0) {
+        return changeByUpcall(context, result, path);
     }
     if (strcasecmp(method, "ProcessId") == 0) {
         return returnNumber(result, (CMPIUint32)getpid());

@@ -97,8 +97,10 @@ const ErrorRow kErrorRows[] = {
     {"not UTF-8", post(kCim, getClassBody("CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"", "1.0", "<!-- \xff -->")), 400,
      "request-not-valid", "Invalid UTF-8 character detected.", false},
     {"overlong UTF-8", post(kCim, "\xc0\xaf"), 400, "request-not-valid", "Invalid UTF-8 character detected.", false},
-    {"no class name", post(kCim, getClassBody("CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"", "1.0", "")), 400,
-     "request-not-valid", "Validation error: on line 5: expected CLASSNAME element", false},
+    {"another element for a class name",
+     post(kCim, getClassBody("CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"", "1.0",
+                             "<IPARAMVALUE NAME=\"ClassName\"><VALUE>C</VALUE></IPARAMVALUE>")),
+     400, "request-not-valid", "Validation error: on line 9: expected CLASSNAME element", false},
     {"illegal class name",
      post(kCim, getClassBody("CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"", "1.0", classNameParameter("1bad"))), 400,
      "request-not-valid", "Semantic error: on line 10: Illegal value for CLASSNAME.NAME attribute", false},
@@ -106,8 +108,9 @@ const ErrorRow kErrorRows[] = {
      post(kCim, "<?xml version=\"1.0\"?>\n<!DOCTYPE CIM [<!ENTITY a \"b\">]>\n<CIM CIMVERSION=\"2.0\"></CIM>"), 400,
      "request-not-", "", false},
     {"unknown entity",
-     post(kCim, getClassBody("CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"", "1.0",
-                             "<IPARAMVALUE NAME=\"LocalOnly\"><VALUE>&x;</VALUE></IPARAMVALUE>")),
+     post(kCim,
+          getClassBody("CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"", "1.0",
+                       classNameParameter("C") + "<IPARAMVALUE NAME=\"LocalOnly\"><VALUE>&x;</VALUE></IPARAMVALUE>")),
      400, "request-not-", "", false},
 };
 
@@ -168,6 +171,33 @@ TEST_F(ProtocolTest, errorsGoIntoTheTrailerOrIntoTheBody)
     EXPECT_NE(plain.body.find("<ERROR CODE=\"6\" DESCRIPTION=\"CIM_ERR_NOT_FOUND: C\"/>"), std::string::npos);
 }
 
+// What the parameters of an operation are is known by their names: a fault in them is the operation's error.
+TEST_F(ProtocolTest, parametersAreCheckedByName)
+{
+    const std::string flag = "<IPARAMVALUE NAME=\"LocalOnly\"><VALUE>TRUE</VALUE></IPARAMVALUE>";
+    const std::string name = classNameParameter("C");
+    const std::tuple<const char*, const char*, std::string, const char*> rows[] = {
+        {"required one missing", "GetClass", flag, "4"},
+        {"required one without a value", "GetClass", "<IPARAMVALUE NAME=\"ClassName\"/>", "4"},
+        {"optional one without a value", "GetClass", name + "<IPARAMVALUE NAME=\"LocalOnly\"/>", "6"},
+        {"required one twice", "GetClass", name + name, "4"},
+        {"optional one twice, in another case", "GetClass",
+         name + flag + "<IPARAMVALUE NAME=\"localonly\"><VALUE>TRUE</VALUE></IPARAMVALUE>", "4"},
+        {"unknown one", "GetClass", name + "<IPARAMVALUE NAME=\"Local\"><VALUE>TRUE</VALUE></IPARAMVALUE>", "7"},
+        {"one of another operation", "EnumerateInstanceNames", name + flag, "7"},
+        {"any of an operation without parameters", "EnumerateQualifiers", flag, "7"},
+        {"one of two required", "GetProperty", "<IPARAMVALUE NAME=\"PropertyName\"><VALUE>P</VALUE></IPARAMVALUE>",
+         "4"},
+    };
+    for (const auto& [what, method, parameters, status] : rows) {
+        SCOPED_TRACE(what);
+        const HttpAnswer answer = exchange(fgTree->port(), intrinsicRequest(method, "root", parameters));
+        EXPECT_EQ(answer.status, 200);
+        EXPECT_EQ(answer.trailers.at("cimstatuscode"), status) << header(answer, "cimstatuscodedescription");
+    }
+    EXPECT_NE(fgTree->log().find("request refused: parameter LocalOnly is unknown"), std::string::npos);
+}
+
 struct AcceptedRow
 {
     const char* name;
@@ -183,7 +213,8 @@ TEST_F(ProtocolTest, servesEveryFormThatClientsUse)
         {"any path", "POST /other HTTP/1.1\r\nHost: x\r\n" + type + kCim + length + "\r\n" + body},
         {"padded length", "POST / HTTP/1.1\r\nHOST: \r\n" + type + kCim + "content-length: 0000000" +
                               std::to_string(body.size()) + "\r\n\r\n" + body},
-        {"HTTP/1.0", "POST / HTTP/1.0\r\nHost: x\r\n" + type + kCim + length + "\r\n" + body},
+        {"HTTP/1.0", "POST / HTTP/1.0\r\nHost: localhost\r\n" + type + kCim + length + "\r\n" + body},
+        {"HTTP/1.0 without Host", "POST / HTTP/1.0\r\n" + type + kCim + length + "\r\n" + body},
         {"quoted charset",
          "POST / HTTP/1.1\r\nHost: x\r\nContent-Type: text/xml; charset=\"UTF-8\"\r\n" + kCim + length + "\r\n" + body},
         {"40 KB header", "POST / HTTP/1.1\r\nHost: x\r\nX-Big: " + std::string(40'000, 'a') + "\r\n" + type + kCim +
@@ -251,7 +282,7 @@ TEST_F(ProtocolTest, unknownAndUnsupportedOperations)
     EXPECT_NE(unknown.body.find("<ERROR CODE=\"7\" DESCRIPTION=\"CIM_ERR_NOT_SUPPORTED: "
                                 "Unrecognized intrinsic method: FooBar\"/>"),
               std::string::npos);
-    for (const char* method : {"DeleteClass", "ExecQuery", "Associators", "OpenEnumerateInstances", "ModifyInstance"}) {
+    for (const char* method : {"DeleteClass", "ExecQuery", "Associators", "OpenEnumerateInstances", "ModifyClass"}) {
         SCOPED_TRACE(method);
         const HttpAnswer answer = exchange(fgTree->port(), intrinsicRequest(method, "root", ""));
         EXPECT_EQ(answer.trailers.at("cimstatuscode"), "7");

@@ -72,6 +72,11 @@ class PEGASUS_CLIENT_LINKAGE CIMClient
                                           const CIMPropertyList& propertyList = CIMPropertyList());
     Array<CIMObjectPath> enumerateInstanceNames(const CIMNamespaceName& nameSpace, const CIMName& className);
     CIMObjectPath createInstance(const CIMNamespaceName& nameSpace, const CIMInstance& newInstance);
+    // The instance at the path of `modifiedInstance` gets its values: all that it has, or those of the listed
+    // properties.
+    void modifyInstance(const CIMNamespaceName& nameSpace, const CIMInstance& modifiedInstance,
+                        Boolean includeQualifiers = true, const CIMPropertyList& propertyList = CIMPropertyList());
+    void deleteInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& instanceName);
 
     CIMQualifierDecl getQualifier(const CIMNamespaceName& nameSpace, const CIMName& qualifierName);
     Array<CIMQualifierDecl> enumerateQualifiers(const CIMNamespaceName& nameSpace);
