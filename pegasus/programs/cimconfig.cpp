@@ -2,6 +2,7 @@
 #include "pegasus/base/Text.h"
 #include "pegasus/programs/ConfigCommand.h"
 #include "pegasus/server/admin/ConfigFile.h"
+#include "pegasus/server/admin/Daemon.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -39,6 +40,7 @@ int run(const ConfigCommand& command)
 
 int main(int argc, char** argv)
 {
+    server::openStandardDescriptors();
     ConfigCommand command;
     try {
         command = programs::parseConfigCommand(std::vector<std::string>(argv + 1, argv + argc));

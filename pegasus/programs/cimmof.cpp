@@ -5,6 +5,7 @@
 #include "pegasus/programs/CimmofHandler.h"
 #include "pegasus/programs/CimmofOptions.h"
 #include "pegasus/server/admin/ConfigFile.h"
+#include "pegasus/server/admin/Daemon.h"
 
 #include <functional>
 #include <iostream>
@@ -113,6 +114,7 @@ Status run(const Options& options)
 
 int main(int argc, char** argv)
 {
+    server::openStandardDescriptors();
     try {
         return run(parseOptions(std::vector<std::string>(argv + 1, argv + argc)));
     } catch (const OptionError& error) {

@@ -4,17 +4,16 @@
 #include "pegasus/repository/CimError.h"
 #include "pegasus/repository/ClassRules.h"
 #include "pegasus/repository/LookupKey.h"
-#include "pegasus/wire/ElementEncoder.h"
 
 namespace Pegasus::repository {
 
-ClassStore::ClassStore(Storage& storage, ObjectCodec& codec, QualifierStore& qualifiers, const RepositoryLimits& limits)
-    : fStorage(storage), fCodec(codec), fQualifiers(qualifiers), fLimits(limits), fCache(limits.cachedClassCount)
+ClassStore::ClassStore(Storage& storage, ObjectCodec& codec, const RepositoryLimits& limits)
+    : fStorage(storage), fCodec(codec), fLimits(limits), fCache(limits.cachedClassCount)
 {
 }
 
-// Resolves from the root class down, and keeps every class on the way. The recursion is bounded: create() limits the
-// depth.
+// Resolves from the root class down, and keeps every class on the way. The recursion is bounded: superClassFor() limits
+// the depth.
 CIMClass ClassStore::resolved(NamespaceId nameSpace, const CIMName& name)
 {
     const std::string key = nameKey(name);
@@ -42,21 +41,16 @@ CIMClass ClassStore::existing(NamespaceId nameSpace, const CIMName& name)
     return whole;
 }
 
-CIMClass ClassStore::get(NamespaceId nameSpace, const CIMName& name, const ClassOptions& options)
+std::shared_ptr<const std::string> ClassStore::findText(NamespaceId nameSpace, const CIMName& name,
+                                                        const ClassOptions& options)
 {
-    return filterClass(existing(nameSpace, name), options);
+    return fCache.findText(nameSpace, nameKey(name), options);
 }
 
-std::shared_ptr<const std::string> ClassStore::text(NamespaceId nameSpace, const CIMName& name,
-                                                    const ClassOptions& options)
+void ClassStore::keepText(NamespaceId nameSpace, const CIMName& name, const ClassOptions& options,
+                          const std::shared_ptr<const std::string>& text)
 {
-    const CIMClass whole = existing(nameSpace, name);
-    if (options.propertyList.isNull()) {
-        return fCache.text(nameSpace, nameKey(name), options);
-    }
-    auto made = std::make_shared<std::string>();
-    wire::appendClass(*made, filterClass(whole, options));
-    return made;
+    fCache.keepText(nameSpace, nameKey(name), options, text);
 }
 
 bool ClassStore::has(NamespaceId nameSpace, const CIMName& name)
@@ -76,22 +70,17 @@ std::vector<CIMName> ClassStore::listNames(NamespaceId nameSpace, const CIMName&
     return names;
 }
 
-void ClassStore::create(NamespaceId nameSpace, const CIMConstClass& newClass)
+void ClassStore::requireAbsent(NamespaceId nameSpace, const CIMName& name)
 {
-    if (has(nameSpace, newClass.getClassName())) {
-        fail(CIM_ERR_ALREADY_EXISTS, base::utf8(newClass.getClassName()));
+    if (has(nameSpace, name)) {
+        fail(CIM_ERR_ALREADY_EXISTS, base::utf8(name));
     }
-    checkDepth(nameSpace, newClass);
-    const CIMClass superClass = resolvedSuperClass(nameSpace, newClass);
-    const CIMClass local = checkClass(newClass, superClass, fQualifiers.lookupIn(nameSpace));
-    const std::string text = fCodec.encodeClass(local);
-    fStorage.insertClass(nameSpace, base::utf8(local.getClassName()), base::utf8(local.getSuperClassName()), text);
-    // Into the cache at once: a compiler creates subclasses of it next.
-    fCache.insert(nameSpace, nameKey(local.getClassName()), resolveClass(local, superClass));
 }
 
-CIMClass ClassStore::resolvedSuperClass(NamespaceId nameSpace, const CIMConstClass& newClass)
+CIMClass ClassStore::superClassFor(NamespaceId nameSpace, const CIMConstClass& newClass)
 {
+    requireAbsent(nameSpace, newClass.getClassName());
+    checkDepth(nameSpace, newClass);
     const CIMName& superName = newClass.getSuperClassName();
     if (superName.isNull()) {
         return CIMClass();
@@ -101,6 +90,15 @@ CIMClass ClassStore::resolvedSuperClass(NamespaceId nameSpace, const CIMConstCla
         fail(CIM_ERR_INVALID_SUPERCLASS, base::utf8(superName));
     }
     return superClass;
+}
+
+void ClassStore::insert(NamespaceId nameSpace, const CIMConstClass& local, const std::string& text,
+                        const CIMClass& whole)
+{
+    requireAbsent(nameSpace, local.getClassName());
+    fStorage.insertClass(nameSpace, base::utf8(local.getClassName()), base::utf8(local.getSuperClassName()), text);
+    // Into the cache at once: a compiler creates subclasses of it next.
+    fCache.insert(nameSpace, nameKey(local.getClassName()), whole);
 }
 
 void ClassStore::checkDepth(NamespaceId nameSpace, const CIMConstClass& newClass)

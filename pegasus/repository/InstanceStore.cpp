@@ -22,17 +22,13 @@ CIMObjectPath withoutNamespace(CIMObjectPath path)
 
 } // namespace
 
-CIMObjectPath InstanceStore::create(NamespaceId nameSpace, const CIMConstInstance& newInstance)
+void InstanceStore::insert(NamespaceId nameSpace, const CIMObjectPath& path, const std::string& text)
 {
-    const CIMClass itsClass = classOf(nameSpace, newInstance.getClassName());
-    const CIMInstance completed = completeInstance(newInstance, itsClass);
-    CIMObjectPath path = instancePath(completed, itsClass);
     const std::string key = pathKey(path);
     if (fStorage.findInstance(nameSpace, key)) {
         fail(CIM_ERR_ALREADY_EXISTS, base::utf8(path.toString()));
     }
-    fStorage.insertInstance(nameSpace, base::utf8(itsClass.getClassName()), key, fCodec.encodeInstance(completed));
-    return path;
+    fStorage.insertInstance(nameSpace, base::utf8(path.getClassName()), key, text);
 }
 
 CIMInstance InstanceStore::get(NamespaceId nameSpace, const CIMObjectPath& path, const InstanceOptions& options)

@@ -15,7 +15,8 @@ class InstanceStore
     {
     }
 
-    CIMObjectPath create(NamespaceId nameSpace, const CIMConstInstance& newInstance);
+    // Stores an instance that was completed and encoded for its class. Throws: CIM_ERR_ALREADY_EXISTS.
+    void insert(NamespaceId nameSpace, const CIMObjectPath& path, const std::string& text);
     CIMInstance get(NamespaceId nameSpace, const CIMObjectPath& path, const InstanceOptions& options);
     void modify(NamespaceId nameSpace, const CIMConstInstance& modified, const CIMPropertyList& list);
     void remove(NamespaceId nameSpace, const CIMObjectPath& path);
@@ -24,8 +25,10 @@ class InstanceStore
     std::vector<CIMInstance> nextBatch(NamespaceId nameSpace, const CIMName& className, const InstanceOptions& options,
                                        std::int64_t& after);
 
-  private:
+    // Returns: the resolved class. Throws: CIM_ERR_INVALID_CLASS.
     CIMClass classOf(NamespaceId nameSpace, const CIMName& name);
+
+  private:
     InstanceRow find(NamespaceId nameSpace, const CIMObjectPath& path);
     CIMInstance withPath(NamespaceId nameSpace, const std::string& body);
 

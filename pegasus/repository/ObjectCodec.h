@@ -15,7 +15,7 @@ namespace Pegasus::repository {
 //
 // Throws: CIM_ERR_SERVER_LIMITS_EXCEEDED for an object beyond the limit; CIM_ERR_FAILED for a malformed stored
 //     text.
-// Thread: one thread at a time.
+// Thread: encoding any; decoding one thread at a time.
 class ObjectCodec
 {
   public:

@@ -58,12 +58,4 @@ void QualifierStore::set(NamespaceId nameSpace, const CIMConstQualifierDecl& dec
     fKnown.erase(keyOf(nameSpace, name));
 }
 
-QualifierLookup QualifierStore::lookupIn(NamespaceId nameSpace)
-{
-    return [this, nameSpace](const CIMName& name, CIMQualifierDecl& declaration) {
-        declaration = find(nameSpace, name);
-        return !declaration.isUninitialized();
-    };
-}
-
 } // namespace Pegasus::repository

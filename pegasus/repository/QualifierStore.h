@@ -1,7 +1,6 @@
 #pragma once
 
 #include "pegasus/repository/ObjectCodec.h"
-#include "pegasus/repository/QualifierRules.h"
 #include "pegasus/repository/Storage.h"
 
 #include <string>
@@ -23,9 +22,6 @@ class QualifierStore
     CIMQualifierDecl find(NamespaceId nameSpace, const CIMName& name);
     std::vector<CIMQualifierDecl> list(NamespaceId nameSpace);
     void set(NamespaceId nameSpace, const CIMConstQualifierDecl& declaration);
-
-    // Returns: find() for the rules, bound to a namespace; valid as long as the store.
-    QualifierLookup lookupIn(NamespaceId nameSpace);
 
   private:
     Storage& fStorage;

@@ -2,8 +2,12 @@
 
 #include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
+#include "pegasus/repository/ClassRules.h"
+#include "pegasus/repository/InstanceRules.h"
 #include "pegasus/repository/InstanceStore.h"
 #include "pegasus/repository/NamespaceTable.h"
+#include "pegasus/repository/QualifierStore.h"
+#include "pegasus/wire/ElementEncoder.h"
 
 #include <cerrno>
 #include <cstring>
@@ -47,8 +51,8 @@ class Repository::State
   public:
     State(const std::string& directory, const RepositoryLimits& givenLimits)
         : limits(givenLimits), storage(preparedFile(directory)), codec(limits.objectBytes),
-          namespaces(storage, limits.namespaceCount), qualifiers(storage, codec),
-          classes(storage, codec, qualifiers, limits), instances(storage, codec, classes)
+          namespaces(storage, limits.namespaceCount), qualifiers(storage, codec), classes(storage, codec, limits),
+          instances(storage, codec, classes)
     {
     }
 
@@ -112,15 +116,34 @@ void Repository::setQualifier(const CIMNamespaceName& nameSpace, const CIMConstQ
 CIMConstClass Repository::getClass(const CIMNamespaceName& nameSpace, const CIMName& className,
                                    const ClassOptions& options) const
 {
-    const Lock lock(fState->mutex);
-    return fState->classes.get(fState->namespaces.id(nameSpace), className, options);
+    CIMClass whole;
+    {
+        const Lock lock(fState->mutex);
+        whole = fState->classes.existing(fState->namespaces.id(nameSpace), className);
+    }
+    return filterClass(whole, options);
 }
 
 std::shared_ptr<const std::string> Repository::getClassText(const CIMNamespaceName& nameSpace, const CIMName& className,
                                                             const ClassOptions& options) const
 {
-    const Lock lock(fState->mutex);
-    return fState->classes.text(fState->namespaces.id(nameSpace), className, options);
+    const bool isKept = options.propertyList.isNull();
+    CIMClass whole;
+    {
+        const Lock lock(fState->mutex);
+        const NamespaceId id = fState->namespaces.id(nameSpace);
+        if (const auto kept = isKept ? fState->classes.findText(id, className, options) : nullptr) {
+            return kept;
+        }
+        whole = fState->classes.existing(id, className);
+    }
+    auto made = std::make_shared<std::string>();
+    wire::appendClass(*made, filterClass(whole, options));
+    if (isKept) {
+        const Lock lock(fState->mutex);
+        fState->classes.keepText(fState->namespaces.id(nameSpace), className, options, made);
+    }
+    return made;
 }
 
 bool Repository::hasClass(const CIMNamespaceName& nameSpace, const CIMName& className) const
@@ -136,16 +159,42 @@ std::vector<CIMName> Repository::enumerateClassNames(const CIMNamespaceName& nam
     return fState->classes.listNames(fState->namespaces.id(nameSpace), className, deepInheritance);
 }
 
+// The lock is held to fetch what the checks need, and to store; the lookup of a qualifier takes it for itself.
 void Repository::createClass(const CIMNamespaceName& nameSpace, const CIMConstClass& newClass)
 {
+    NamespaceId id = 0;
+    CIMClass superClass;
+    {
+        const Lock lock(fState->mutex);
+        id = fState->namespaces.id(nameSpace);
+        superClass = fState->classes.superClassFor(id, newClass);
+    }
+    const CIMClass local = checkClass(newClass, superClass, [&](const CIMName& name, CIMQualifierDecl& declaration) {
+        const Lock lock(fState->mutex);
+        declaration = fState->qualifiers.find(id, name);
+        return !declaration.isUninitialized();
+    });
+    const std::string text = fState->codec.encodeClass(local);
+    const CIMClass whole = resolveClass(local, superClass);
     const Lock lock(fState->mutex);
-    fState->classes.create(fState->namespaces.id(nameSpace), newClass);
+    fState->classes.insert(id, local, text, whole);
 }
 
 CIMObjectPath Repository::createInstance(const CIMNamespaceName& nameSpace, const CIMConstInstance& newInstance)
 {
+    NamespaceId id = 0;
+    CIMClass itsClass;
+    {
+        const Lock lock(fState->mutex);
+        id = fState->namespaces.id(nameSpace);
+        itsClass = fState->instances.classOf(id, newInstance.getClassName());
+    }
+    const CIMInstance completed = completeInstance(newInstance, itsClass);
+    const CIMObjectPath path = instancePath(completed, itsClass);
+    const std::string text = fState->codec.encodeInstance(completed);
     const Lock lock(fState->mutex);
-    return fState->instances.create(fState->namespaces.id(nameSpace), newInstance);
+    fState->instances.insert(id, path, text);
+    return path;
 }
 
 CIMInstance Repository::getInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path,

@@ -60,9 +60,11 @@ using InstanceVisitor = std::function<bool(const CIMInstance&)>;
 // Throws: every operation throws CIMException. Its message is the cause alone (in the simple cases the name); the
 //     symbolic code is left out. CIM_ERR_INVALID_NAMESPACE (message: the namespace) when the namespace is missing;
 //     CIM_ERR_FAILED when the storage fails.
-// Thread: all operations may be called on any thread at any time; they run one after the other.
+// Thread: all operations may be called on any thread at any time. Their accesses to the storage run one after the
+// other;
+//     new classes and instances are checked and encoded, and classes encoded for an answer, at the same time.
 // Ownership: returned classes share their parts with the cache; clone() makes one that may be changed.
-// Blocks: for file accesses of one operation, and while another thread's operation runs.
+// Blocks: for file accesses of one operation, and while another thread accesses the storage.
 class Repository
 {
   public:

@@ -1,8 +1,5 @@
 #include "pegasus/repository/ResolvedClassCache.h"
 
-#include "pegasus/repository/ClassRules.h"
-#include "pegasus/wire/ElementEncoder.h"
-
 namespace Pegasus::repository {
 
 namespace {
@@ -46,22 +43,26 @@ void ResolvedClassCache::insert(NamespaceId nameSpace, const std::string& nameKe
     }
 }
 
-std::shared_ptr<const std::string> ResolvedClassCache::text(NamespaceId nameSpace, const std::string& nameKey,
-                                                            const ClassOptions& options)
+std::shared_ptr<const std::string> ResolvedClassCache::findText(NamespaceId nameSpace, const std::string& nameKey,
+                                                                const ClassOptions& options)
 {
-    Entry& entry = *touch(keyOf(nameSpace, nameKey));
-    std::shared_ptr<const std::string>& kept = entry.texts[formIndex(options)];
-    if (kept) {
-        return kept;
+    const Entry* entry = touch(keyOf(nameSpace, nameKey));
+    return entry ? entry->texts[formIndex(options)] : nullptr;
+}
+
+void ResolvedClassCache::keepText(NamespaceId nameSpace, const std::string& nameKey, const ClassOptions& options,
+                                  const std::shared_ptr<const std::string>& text)
+{
+    Entry* entry = touch(keyOf(nameSpace, nameKey));
+    if (entry == nullptr || entry->texts[formIndex(options)]) {
+        return; // dropped meanwhile, or another request was faster
     }
-    auto made = std::make_shared<std::string>();
-    wire::appendClass(*made, filterClass(entry.resolved, options));
-    fTextBytes += made->size();
+    fTextBytes += text->size();
     if (fTextBytes > kMaxTextBytes) {
         forgetTexts();
-        fTextBytes = made->size();
+        fTextBytes = text->size();
     }
-    return kept = made;
+    entry->texts[formIndex(options)] = text;
 }
 
 void ResolvedClassCache::forgetTexts()

@@ -23,10 +23,13 @@ class ResolvedClassCache
     CIMClass find(NamespaceId nameSpace, const std::string& nameKey);
     // Requires: the class is absent from the cache.
     void insert(NamespaceId nameSpace, const std::string& nameKey, const CIMClass& resolved);
-    // Returns: the class as a CLASS element, encoded at the first request and kept for a while.
-    // Requires: the class is in the cache; the options have no property list.
-    std::shared_ptr<const std::string> text(NamespaceId nameSpace, const std::string& nameKey,
-                                            const ClassOptions& options);
+    // Returns: the class as a CLASS element, if keepText() got it; null else.
+    // Requires: the options have no property list.
+    std::shared_ptr<const std::string> findText(NamespaceId nameSpace, const std::string& nameKey,
+                                                const ClassOptions& options);
+    // Keeps a text for a while, if the class is in the cache.
+    void keepText(NamespaceId nameSpace, const std::string& nameKey, const ClassOptions& options,
+                  const std::shared_ptr<const std::string>& text);
 
   private:
     struct Entry

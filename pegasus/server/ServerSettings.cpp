@@ -19,6 +19,7 @@ ConnectionSettings connectionSettings(const Config& config)
     settings.writeTimeout = config.seconds("socketWriteTimeout");
     settings.maxXmlDepth = config.number("maxXmlDepth");
     settings.maxBufferedAnswerBytes = config.number("maxBufferedAnswerBytes");
+    settings.strictHosts = config.flag("strictHosts");
     return settings;
 }
 

@@ -45,9 +45,11 @@ void Config::setCurrent(const std::string& name, const std::string& value)
     }
     requireValid(name, value);
     const std::lock_guard<std::mutex> lock(fMutex);
-    fValues[name] = value;
+    ConfigValues values = fValues;
+    values[name] = value;
+    writeConfigFile(currentConfigPath(fHome), values); // a value that cannot be written does not take effect
+    fValues = std::move(values);
     ++fGeneration;
-    saveLocked();
 }
 
 void Config::resetCurrent(const std::string& name)
@@ -77,11 +79,6 @@ void Config::resetPlanned(const std::string& name)
 void Config::save() const
 {
     const std::lock_guard<std::mutex> lock(fMutex);
-    saveLocked();
-}
-
-void Config::saveLocked() const
-{
     writeConfigFile(currentConfigPath(fHome), fValues);
 }
 

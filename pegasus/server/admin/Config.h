@@ -47,7 +47,7 @@ class Config
     // Throws: ConfigError.
     void setFromCommandLine(const std::string& name, const std::string& value);
 
-    // Throws: ConfigError; std::system_error when writing the current file fails.
+    // Throws: ConfigError; std::system_error when writing the file fails. The value is then the one of before.
     void setCurrent(const std::string& name, const std::string& value);
     void setPlanned(const std::string& name, const std::string& value);
     void resetCurrent(const std::string& name);
@@ -73,7 +73,6 @@ class Config
 
   private:
     void requireValid(const std::string& name, const std::string& value) const;
-    void saveLocked() const;
 
     std::string fHome;
     mutable std::mutex fMutex;

@@ -8,6 +8,7 @@
 #include <mutex>
 
 #include <fcntl.h>
+#include <sys/file.h>
 #include <sys/stat.h>
 
 namespace Pegasus::server {
@@ -32,16 +33,29 @@ LogState& state()
 void reopen(LogState& log)
 {
     log.file.reset(::open(log.path.c_str(), O_WRONLY | O_CREAT | O_APPEND | O_NOFOLLOW | O_CLOEXEC, 0600));
+    ::fchmod(log.file.get(), 0600); // a file of before may be open to others
 }
 
+bool isAtPath(const LogState& log)
+{
+    struct stat opened = {};
+    struct stat named = {};
+    return ::fstat(log.file.get(), &opened) == 0 && ::lstat(log.path.c_str(), &named) == 0 &&
+           opened.st_dev == named.st_dev && opened.st_ino == named.st_ino;
+}
+
+// The server and its agents write one file. The first to lock the full one renames it; the others, who still have it
+// open, find a new one at its path.
 void rotateWhenFull(LogState& log)
 {
     struct stat info = {};
     if (::fstat(log.file.get(), &info) != 0 || static_cast<std::size_t>(info.st_size) < Log::kMaxLogBytes) {
         return;
     }
-    ::rename(log.path.c_str(), (log.path + ".1").c_str());
-    reopen(log);
+    if (::flock(log.file.get(), LOCK_EX) == 0 && isAtPath(log)) {
+        ::rename(log.path.c_str(), (log.path + ".1").c_str());
+    }
+    reopen(log); // closes the old file, which ends the lock
 }
 
 const char* label(LogLevel severity)

@@ -18,7 +18,8 @@ enum class LogLevel
 std::string printable(std::string_view text);
 
 // The server's log: one line an event, appended to <home>/cimserver.log (mode 0600). Past kMaxLogBytes the file is
-// renamed to cimserver.log.1, and a new one begins. Control bytes are written as "\n", "\x1b".
+// renamed to cimserver.log.1, and a new one begins. The server and its agents write the same file. Control bytes are
+// written as "\n", "\x1b".
 //
 // A line whose write fails is lost.
 // Thread: any.

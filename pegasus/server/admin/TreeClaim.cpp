@@ -108,9 +108,13 @@ try {
     fRecord.startFile = StartFile::pathOf(config.text("consumer"));
     fLock.write(fRecord);
     config.save();
-} catch (const std::system_error&) {
-    throw StartError("cimserver not started: Failed to save configuration properties to file: cannot open file: " +
-                     currentConfigPath(config.home()) + ". Configuration property not set.");
+} catch (const std::system_error& error) {
+    std::string text = "cimserver not started: Failed to save configuration properties to file: cannot open file: " +
+                       currentConfigPath(config.home()) + ". Configuration property not set.";
+    if (error.code() != std::errc::no_such_file_or_directory) { // OpenPegasus's sentence is about a missing home
+        text += std::string("\n") + error.what();
+    }
+    throw StartError(text);
 }
 
 void TreeClaim::announce(const std::string& repository)

@@ -20,6 +20,15 @@ AgentRequest makeRequest(wire::IntrinsicCall& call)
 
 } // namespace
 
+AgentRequest passedOn(const HttpRequest& http, const CimRequest& request)
+{
+    AgentRequest passed;
+    passed.method = request.method;
+    passed.object = base::utf8(request.nameSpace);
+    passed.body = http.body;
+    return passed;
+}
+
 AgentRequest makeEnumerateInstancesRequest(const CIMNamespaceName& nameSpace, const CIMName& className,
                                            const CIMPropertyList& properties)
 {

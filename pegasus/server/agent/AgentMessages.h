@@ -12,6 +12,9 @@ namespace Pegasus::server {
 // DeleteInstance are passed on as they came, and its method calls too if every parameter comes with its type.
 // Thread: any.
 
+// A client's intrinsic request as it came.
+AgentRequest passedOn(const HttpRequest& http, const CimRequest& request);
+
 // EnumerateInstances, with everything that the provider has, of one class alone.
 AgentRequest makeEnumerateInstancesRequest(const CIMNamespaceName& nameSpace, const CIMName& className,
                                            const CIMPropertyList& properties);

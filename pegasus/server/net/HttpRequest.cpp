@@ -44,6 +44,8 @@ const char* httpReason(unsigned status)
         return "OK";
     case 400:
         return "Bad Request";
+    case 403:
+        return "Forbidden";
     case 404:
         return "Not Found";
     case 408:

@@ -2,6 +2,7 @@
 
 #include "pegasus/base/Text.h"
 #include "pegasus/server/admin/Log.h"
+#include "pegasus/server/net/HostCheck.h"
 
 #include <system_error>
 
@@ -100,6 +101,9 @@ try {
         return false;
     }
     checkMethod(http);
+    if (fSettings.strictHosts) {
+        requireLocalHost(http);
+    }
     const bool closes = wantsClose(http);
     answer(http);
     return !closes;

@@ -85,11 +85,19 @@ void update(Config& config, const CimRequest& request, const std::string& name)
     const std::string value = base::utf8(argument(request, "PropertyValue").toString());
     const bool current = flagArgument(request, "SetCurrentValue");
     const bool planned = flagArgument(request, "SetPlannedValue");
+    const std::string before = config.text(name);
     if (current) {
         reset ? config.resetCurrent(name) : config.setCurrent(name, value);
     }
-    if (planned) {
-        reset ? config.resetPlanned(name) : config.setPlanned(name, value);
+    try {
+        if (planned) {
+            reset ? config.resetPlanned(name) : config.setPlanned(name, value);
+        }
+    } catch (...) {
+        if (current) { // a call that fails changes neither value
+            config.setCurrent(name, before);
+        }
+        throw;
     }
 }
 

@@ -1,7 +1,6 @@
 #include "pegasus/server/agent/AgentMessages.h"
 #include "pegasus/server/operations/InstanceSources.h"
 #include "pegasus/server/operations/Operations.h"
-#include "pegasus/server/operations/ProviderCall.h"
 #include "pegasus/server/operations/ServerInstances.h"
 #include "pegasus/wire/ElementEncoder.h"
 

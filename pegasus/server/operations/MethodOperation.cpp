@@ -1,7 +1,6 @@
 #include "pegasus/base/PercentCoding.h"
 #include "pegasus/server/operations/ConfigService.h"
 #include "pegasus/server/operations/Operations.h"
-#include "pegasus/server/operations/ProviderCall.h"
 #include "pegasus/wire/ElementEncoder.h"
 #include "pegasus/wire/RequestEnvelope.h"
 

@@ -1,7 +1,6 @@
 // One property of an instance: GetProperty and SetProperty, by means of the whole instance.
 #include "pegasus/server/agent/AgentMessages.h"
 #include "pegasus/server/operations/Operations.h"
-#include "pegasus/server/operations/ProviderCall.h"
 #include "pegasus/server/operations/ServerInstances.h"
 #include "pegasus/wire/ElementEncoder.h"
 

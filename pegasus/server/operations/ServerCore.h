@@ -30,4 +30,16 @@ inline void requireNamespace(const ServerCore& core, const CIMNamespaceName& nam
     }
 }
 
+// Sends a request to the agent of a class's provider, and its answer's elements to the sink.
+// Throws: OperationFailed with the provider's status; what AgentPool::request() throws.
+// Blocks: as AgentPool::request().
+inline void askProvider(ServerCore& core, const ProviderReference& provider, const AgentRequest& request,
+                        ElementSink& sink)
+{
+    const CimStatus status = core.agents.request(provider, request, sink);
+    if (status.code != 0) {
+        throw OperationFailed(status);
+    }
+}
+
 } // namespace Pegasus::server

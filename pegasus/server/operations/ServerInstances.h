@@ -33,11 +33,4 @@ class ServerInstances
 // Throws: CIM_ERR_NOT_SUPPORTED for the classes whose instances clients only read: the server's own, and registrations.
 void requireChangeable(ServerCore& core, const CIMNamespaceName& nameSpace, const CIMName& className);
 
-// Returns: whether the class is __Namespace.
-bool isNamespaceClass(const CIMName& className);
-
-// Makes the namespace that a __Namespace instance names, relative to the one it is created in; an empty name stands for
-// that one itself. Returns: the instance's path. Throws: CIM_ERR_ALREADY_EXISTS, CIM_ERR_INVALID_PARAMETER.
-CIMObjectPath createNamespace(ServerCore& core, const CIMNamespaceName& nameSpace, const CIMInstance& instance);
-
 } // namespace Pegasus::server

@@ -5,6 +5,9 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <atomic>
+#include <thread>
+
 using namespace Pegasus;
 using namespace Pegasus::repository;
 using mof_test::describe;
@@ -179,6 +182,38 @@ TEST_F(ClassTest, ListsSubclassesInOrderOfCreation)
     EXPECT_EQ(list(CIMName("base"), true), "Middle Leaf Other ");
     EXPECT_EQ(list(CIMName("Leaf"), true), "");
     EXPECT_EQ(failureOf([&] { list(CIMName("Nope"), true); }), "5 Nope");
+}
+
+// Classes are checked while the lock is free: each must be stored once, and the others' threads see it whole.
+TEST_F(ClassTest, CreationsOfOneClassAtTheSameTimeStoreItOnce)
+{
+    constexpr int kThreads = 4;
+    constexpr int kClassCount = 100;
+    std::vector<CIMClass> classes;
+    for (int i = 0; i < kClassCount; ++i) {
+        classes.push_back(parseClass(kQualifiers, ("[D(\"x\")] class C" + std::to_string(i) +
+                                                   " { [Key, D(\"id\")] string Id; [D(\"p\")] uint8 P = 7; };")
+                                                      .c_str()));
+    }
+    std::atomic<int> created{0};
+    std::atomic<int> refused{0};
+    std::vector<std::thread> threads;
+    for (int t = 0; t < kThreads; ++t) {
+        threads.emplace_back([&] {
+            for (const CIMClass& one : classes) {
+                const std::string failure = failureOf([&] { repository.createClass(kNamespace, one.clone()); });
+                created += failure == "no failure";
+                refused += failure == "11 " + utf8(one.getClassName().getString());
+                const CIMConstClass seen = repository.getClass(kNamespace, one.getClassName(), {});
+                EXPECT_EQ(seen.getPropertyCount(), 2u);
+            }
+        });
+    }
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
+    EXPECT_EQ(created, kClassCount);
+    EXPECT_EQ(refused, kClassCount * (kThreads - 1));
 }
 
 TEST_F(ClassTest, AnswersTheSameWithRoomForOneClassOnly)

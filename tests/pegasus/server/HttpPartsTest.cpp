@@ -4,6 +4,7 @@
 #include "pegasus/server/net/Acceptor.h"
 #include "pegasus/server/net/AnswerStream.h"
 #include "pegasus/server/net/CimAnswer.h"
+#include "pegasus/server/net/HostCheck.h"
 #include "pegasus/server/net/HttpRequestReader.h"
 #include "pegasus/server/net/Listener.h"
 
@@ -14,6 +15,7 @@
 #include <netinet/in.h>
 #include <sys/eventfd.h>
 #include <sys/socket.h>
+#include <unistd.h>
 
 namespace Pegasus::server {
 namespace {
@@ -35,6 +37,65 @@ HttpRequest parseSplit(const std::string& bytes, std::size_t at, std::size_t& ta
         taken += n;
     }
     return parser.take();
+}
+
+// A web page's requests carry the name that its browser knows this machine by.
+TEST(HostCheckTest, onlyNamesOfThisMachine)
+{
+    char own[256] = "";
+    ASSERT_EQ(::gethostname(own, sizeof own - 1), 0);
+    struct Row
+    {
+        const char* host; // null: absent
+        const char* origin;
+        bool isServed;
+    };
+    const Row rows[] = {
+        {nullptr, nullptr, true},
+        {"", nullptr, true},
+        {"localhost", nullptr, true},
+        {"LOCALHOST:5988", nullptr, true},
+        {"localhost.localdomain", nullptr, true},
+        {"app.localhost:1", nullptr, true},
+        {own, nullptr, true},
+        {"127.0.0.1:5988", nullptr, true},
+        {"127.255.1.2", nullptr, true},
+        {"[::1]:5988", nullptr, true},
+        {"[::ffff:127.0.0.1]", nullptr, true},
+        {"evil.example", nullptr, false},
+        {"localhost.evil.example", nullptr, false},
+        {"127.0.0.1.evil.example", nullptr, false},
+        {"notlocalhost", nullptr, false},
+        {".localhost", nullptr, false},
+        {"localhost:80@evil.example", nullptr, false},
+        {"[::1", nullptr, false},
+        {"[::ffff:10.0.0.1]", nullptr, false},
+        {"10.0.0.1", nullptr, false},
+        {"0.0.0.0", nullptr, false},
+        {"localhost", "http://localhost:3000", true},
+        {"localhost", "https://[::1]", true},
+        {"localhost", "https://evil.example", false},
+        {"localhost", "null", false},
+        {"localhost", "", false},
+        {nullptr, "http://evil.example:5988", false},
+    };
+    for (const Row& row : rows) {
+        HttpRequest http;
+        for (const auto& [name, value] : {std::pair("Host", row.host), {"Origin", row.origin}}) {
+            if (value != nullptr) {
+                http.headers.emplace_back(name, value);
+            }
+        }
+        SCOPED_TRACE(std::string("Host: ") + (row.host ? row.host : "-") +
+                     ", Origin: " + (row.origin ? row.origin : "-"));
+        unsigned status = 200;
+        try {
+            requireLocalHost(http);
+        } catch (const HttpError& error) {
+            status = error.status();
+        }
+        EXPECT_EQ(status, row.isServed ? 200u : 403u);
+    }
 }
 
 TEST(HttpRequestParserTest, takesARequestHoweverItArrives)

@@ -57,7 +57,7 @@ const ErrorRow kErrorRows[] = {
     {"page request", "GET / HTTP/1.1\r\nHost: x\r\n\r\n", 404, "", "", true},
     {"another method", "PUT /cimom HTTP/1.1\r\nHost: x\r\nContent-Length: 0\r\n\r\n", 400, "", "", true},
     {"header without colon", "POST / HTTP/1.1\r\nHost x\r\n\r\n", 400, "", "The HTTP request is malformed", true},
-    {"no length", "POST / HTTP/1.1\r\nHost: x\r\n" + kCim + "\r\n", 411, "", "", true},
+    {"no length", "POST / HTTP/1.1\r\nHost: localhost\r\n" + kCim + "\r\n", 411, "", "", true},
     {"two lengths", "POST / HTTP/1.1\r\nContent-Length: 1\r\nContent-Length: 2\r\n\r\nab", 400, "", "The HTTP", true},
     {"negative length", "POST / HTTP/1.1\r\nContent-Length: -1\r\n\r\n", 400, "", "The HTTP", true},
     {"length and chunks", "POST / HTTP/1.1\r\nContent-Length: 5\r\nTransfer-Encoding: chunked\r\n\r\n0\r\n\r\n", 400,
@@ -67,6 +67,10 @@ const ErrorRow kErrorRows[] = {
      true},
     {"chunk too large", "POST / HTTP/1.1\r\nTransfer-Encoding: chunked\r\n\r\n7fffffff\r\n", 413, "", "", true},
     {"no host", "POST / HTTP/1.1\r\nContent-Length: 0\r\n\r\n", 400, "", "HTTP request message lacks a Host", false},
+    {"another host", "POST / HTTP/1.1\r\nHost: evil.example\r\nContent-Length: 0\r\n\r\n", 403, "",
+     "The Host header names another machine: evil.example", true},
+    {"a web page's origin", post(kCim + "Origin: http://evil.example\r\n", getClassBody()), 403, "",
+     "The Origin header names another machine: http://evil.example", true},
     {"no operation", post(kMethod + kObject, getClassBody()), 400, "", "", false},
     {"other operation", post("CIMOperation: Bad\r\n" + kMethod + kObject, getClassBody()), 400, "unsupported-operation",
      "CIMOperation value \"Bad\"", false},
@@ -210,16 +214,16 @@ TEST_F(ProtocolTest, servesEveryFormThatClientsUse)
     const std::string length = "Content-Length: " + std::to_string(body.size()) + "\r\n";
     const std::string type = "Content-Type: application/xml; charset=utf-8\r\n";
     const AcceptedRow rows[] = {
-        {"any path", "POST /other HTTP/1.1\r\nHost: x\r\n" + type + kCim + length + "\r\n" + body},
+        {"any path", "POST /other HTTP/1.1\r\nHost: localhost\r\n" + type + kCim + length + "\r\n" + body},
         {"padded length", "POST / HTTP/1.1\r\nHOST: \r\n" + type + kCim + "content-length: 0000000" +
                               std::to_string(body.size()) + "\r\n\r\n" + body},
         {"HTTP/1.0", "POST / HTTP/1.0\r\nHost: localhost\r\n" + type + kCim + length + "\r\n" + body},
         {"HTTP/1.0 without Host", "POST / HTTP/1.0\r\n" + type + kCim + length + "\r\n" + body},
-        {"quoted charset",
-         "POST / HTTP/1.1\r\nHost: x\r\nContent-Type: text/xml; charset=\"UTF-8\"\r\n" + kCim + length + "\r\n" + body},
-        {"40 KB header", "POST / HTTP/1.1\r\nHost: x\r\nX-Big: " + std::string(40'000, 'a') + "\r\n" + type + kCim +
-                             length + "\r\n" + body},
-        {"chunks", "POST / HTTP/1.1\r\nHost: x\r\nTransfer-Encoding: chunked\r\n" + type + kCim + "\r\n5\r\n" +
+        {"quoted charset", "POST / HTTP/1.1\r\nHost: localhost\r\nContent-Type: text/xml; charset=\"UTF-8\"\r\n" +
+                               kCim + length + "\r\n" + body},
+        {"40 KB header", "POST / HTTP/1.1\r\nHost: localhost\r\nX-Big: " + std::string(40'000, 'a') + "\r\n" + type +
+                             kCim + length + "\r\n" + body},
+        {"chunks", "POST / HTTP/1.1\r\nHost: localhost\r\nTransfer-Encoding: chunked\r\n" + type + kCim + "\r\n5\r\n" +
                        body.substr(0, 5) + "\r\n" +
                        [](std::size_t n) {
                            char text[16];
@@ -227,9 +231,9 @@ TEST_F(ProtocolTest, servesEveryFormThatClientsUse)
                            return std::string(text);
                        }(body.size() - 5) +
                        "\r\n" + body.substr(5) + "\r\n0\r\n\r\n"},
-        {"M-POST", "M-POST / HTTP/1.1\r\nHost: x\r\nMan: http://www.dmtf.org/cim/mapping/http/v1.0; ns=40\r\n" + type +
-                       length + "40-CIMOperation: MethodCall\r\n40-CIMMethod: GetClass\r\n40-CIMObject: root\r\n\r\n" +
-                       body},
+        {"M-POST", "M-POST / HTTP/1.1\r\nHost: localhost\r\nMan: http://www.dmtf.org/cim/mapping/http/v1.0; ns=40\r\n" +
+                       type + length +
+                       "40-CIMOperation: MethodCall\r\n40-CIMMethod: GetClass\r\n40-CIMObject: root\r\n\r\n" + body},
     };
     for (const AcceptedRow& row : rows) {
         SCOPED_TRACE(row.name);

@@ -18,6 +18,7 @@
 
 #include <sched.h>
 #include <signal.h>
+#include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -112,6 +113,30 @@ TEST_F(StateTest, plannedValuesRuleTheNextStartAndCurrentOnesThisRun)
     EXPECT_EQ(Config(fHome).text("httpPort"), "5988");
 }
 
+// A file size limit fails a write as a full disk does.
+TEST_F(StateTest, aValueThatCannotBeWrittenStaysAsItWas)
+{
+    Config config(fHome);
+    config.setCurrent("maxConnections", "5");
+    config.setPlanned("maxConnections", "6");
+    const unsigned generation = config.generation();
+    rlimit usual = {};
+    ASSERT_EQ(::getrlimit(RLIMIT_FSIZE, &usual), 0);
+    const auto handler = ::signal(SIGXFSZ, SIG_IGN);
+    const rlimit full = {10, usual.rlim_max};
+    ASSERT_EQ(::setrlimit(RLIMIT_FSIZE, &full), 0);
+    EXPECT_THROW(config.setCurrent("maxConnections", "7"), std::system_error);
+    EXPECT_THROW(config.setPlanned("maxConnections", "7"), std::system_error);
+    EXPECT_THROW(config.resetCurrent("maxConnections"), std::system_error);
+    ::setrlimit(RLIMIT_FSIZE, &usual);
+    ::signal(SIGXFSZ, handler);
+    EXPECT_EQ(config.text("maxConnections"), "5");
+    EXPECT_EQ(config.generation(), generation);
+    EXPECT_EQ(config.planned("maxConnections"), "6");
+    EXPECT_EQ(readConfigFile(currentConfigPath(fHome)).at("maxConnections"), "5");
+    EXPECT_EQ(std::distance(fs::directory_iterator(fHome), {}), 3) << "two files and lib, no half-written ones";
+}
+
 TEST_F(StateTest, aPlannedValueThatIsNoLongerValidGivesWay)
 {
     fs::create_directories(fHome + "/vendor");
@@ -178,6 +203,36 @@ TEST_F(StateTest, controlBytesAreEscapedInTheLog)
     Log::write(LogLevel::kError, "a\nb\x1b[2J\x7f \xc3\xa9");
     const std::string log = readOwnFile(fHome + "/cimserver.log", 1000);
     EXPECT_NE(log.find("error: a\\nb\\x1b[2J\\x7f \xc3\xa9\n"), std::string::npos) << log;
+}
+
+// A server and its agents: together they fill the file once, so that two renames would lose lines.
+TEST_F(StateTest, processesThatShareTheLogRollItOnce)
+{
+    constexpr int kProcesses = 3;
+    constexpr int kLines = 4'000;
+    const std::string line(1000, 'x'); // 12 MB in all
+    pid_t children[kProcesses];
+    for (pid_t& child : children) {
+        child = ::fork();
+        if (child == 0) {
+            Log::open(fHome, false);
+            for (int i = 0; i < kLines; ++i) {
+                Log::write(LogLevel::kInformation, line);
+            }
+            ::_exit(0);
+        }
+    }
+    for (const pid_t child : children) {
+        int status = -1;
+        ::waitpid(child, &status, 0);
+        EXPECT_EQ(status, 0);
+    }
+    std::ptrdiff_t lines = 0;
+    for (const char* name : {"/cimserver.log", "/cimserver.log.1"}) {
+        const std::string text = readOwnFile(fHome + name, 2 * Log::kMaxLogBytes);
+        lines += std::count(text.begin(), text.end(), '\n');
+    }
+    EXPECT_EQ(lines, kProcesses * kLines);
 }
 
 TEST_F(StateTest, oneLockATree)

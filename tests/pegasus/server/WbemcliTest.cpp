@@ -29,6 +29,18 @@ std::string outputOf(const std::string& command)
     return text;
 }
 
+// `probe` is the address of the namespace, in an open quotation.
+void expectNotSupported(const std::string& probe)
+{
+    const std::string stored = probe + ":Probe_Stored.Id=\"stored-1\"' ";
+    for (const std::string& notSupported : std::vector<std::string>{"ai " + stored, "ain " + stored, "ri " + stored,
+                                                                    "rin " + stored, "dc " + probe + ":Probe_Stored' "})
+    {
+        const std::string output = outputOf("wbemcli " + notSupported + " 2>&1");
+        EXPECT_NE(output.find("CIM_ERR_NOT_SUPPORTED"), std::string::npos) << notSupported << ": " << output;
+    }
+}
+
 TEST(WbemcliTest, everyOperation)
 {
     if (std::system("command -v wbemcli >/dev/null") != 0) {
@@ -38,6 +50,7 @@ TEST(WbemcliTest, everyOperation)
     tree.start();
     tree.installProbe();
     const std::string probe = "'http://127.0.0.1:" + std::to_string(tree.port()) + "/root/probe";
+    const std::string interop = "'http://127.0.0.1:" + std::to_string(tree.port()) + "/root/PG_InterOp";
     const CliRow rows[] = {
         {"GetClass", "-nl gc " + probe + ":Probe_Base'", {"root/probe:Probe_Base", "-Id=", "-T1="}},
         {"GetClass with its declarations",
@@ -56,6 +69,10 @@ TEST(WbemcliTest, everyOperation)
         {"EnumerateInstanceNames",
          "ein " + probe + ":Probe_Family'",
          {":Probe_Provided.Id=\"bulk-0000001\"", "stored-1"}},
+        {"the namespaces", "ein " + interop + ":CIM_Namespace'", {"Name=\"root\"", "Name=\"root/probe\""}},
+        {"one namespace's instance",
+         "-nl ei " + interop + ":CIM_Namespace'",
+         {"-CreationClassName=\"CIM_Namespace\"", "-Name=\"root/PG_Internal\""}},
         {"GetInstance",
          "-nl gi " + probe + ":Probe_Bulk.Id=\"bulk-0000007\"'",
          {"-Id=\"bulk-0000007\"", "-N1=7000021"}},
@@ -76,13 +93,7 @@ TEST(WbemcliTest, everyOperation)
          {"CIM_ERR_INVALID_PARAMETER", "does not convert to uint32"}},
         {"an error", "gc " + probe + ":Nope' 2>&1", {"CIM_ERR_NOT_FOUND"}},
     };
-    const std::string stored = probe + ":Probe_Stored.Id=\"stored-1\"' ";
-    for (const std::string& notSupported : std::vector<std::string>{"ai " + stored, "ain " + stored, "ri " + stored,
-                                                                    "rin " + stored, "dc " + probe + ":Probe_Stored' "})
-    {
-        const std::string output = outputOf("wbemcli " + notSupported + " 2>&1");
-        EXPECT_NE(output.find("CIM_ERR_NOT_SUPPORTED"), std::string::npos) << notSupported << ": " << output;
-    }
+    expectNotSupported(probe);
     for (const CliRow& row : rows) {
         SCOPED_TRACE(row.name);
         const std::string output = outputOf("wbemcli " + row.arguments);
