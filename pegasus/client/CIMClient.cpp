@@ -187,14 +187,14 @@ void CIMClient::modifyInstance(const CIMNamespaceName& nameSpace, const CIMInsta
     call.modifiedInstance(modifiedInstance)
         .flag("IncludeQualifiers", includeQualifiers, true)
         .propertyList(propertyList);
-    readNothing(*fRep, makeRequest(call, kWrites));
+    readNothing(*fRep, makeRequest(call));
 }
 
 void CIMClient::deleteInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& instanceName)
 {
     IntrinsicCall call("DeleteInstance", nameSpace);
     call.instanceName(instanceName);
-    readNothing(*fRep, makeRequest(call, kWrites));
+    readNothing(*fRep, makeRequest(call));
 }
 
 CIMQualifierDecl CIMClient::getQualifier(const CIMNamespaceName& nameSpace, const CIMName& qualifierName)
