@@ -120,17 +120,24 @@ CIMInstance mergedInstance(const CIMInstance& stored, const CIMConstInstance& mo
     return merged;
 }
 
-void filterInstance(CIMInstance& stored, const CIMConstClass& shape, const InstanceOptions& options)
+CIMInstance filteredInstance(CIMInstance stored, const CIMConstClass& shape, const InstanceOptions& options)
 {
-    for (Uint32 i = stored.getPropertyCount(); i-- > 0;) {
-        CIMProperty property = stored.getProperty(i);
-        const bool fitsShape = shape.isUninitialized() || shape.findProperty(property.getName()) != PEG_NOT_FOUND;
-        if (!fitsShape || !isListed(options.propertyList, property.getName())) {
-            stored.removeProperty(i);
-        } else if (!options.includeClassOrigin) {
+    CIMInstance filtered(stored.getClassName());
+    filtered.setPath(stored.getPath());
+    const bool isWhole = shape.isUninitialized();
+    const Uint32 count = isWhole ? stored.getPropertyCount() : shape.getPropertyCount();
+    for (Uint32 i = 0; i < count; ++i) {
+        const Uint32 index = isWhole ? i : stored.findProperty(shape.getProperty(i).getName());
+        if (index == PEG_NOT_FOUND || !isListed(options.propertyList, stored.getProperty(index).getName())) {
+            continue;
+        }
+        CIMProperty property = stored.getProperty(index);
+        if (!options.includeClassOrigin) {
             property.setClassOrigin(CIMName());
         }
+        filtered.addProperty(property);
     }
+    return filtered;
 }
 
 } // namespace Pegasus::repository

@@ -20,8 +20,10 @@ CIMObjectPath instancePath(const CIMConstInstance& completed, const CIMConstClas
 CIMInstance mergedInstance(const CIMInstance& stored, const CIMConstInstance& modified, const CIMConstClass& itsClass,
                            const CIMPropertyList& list);
 
-// Removes from a stored instance what the options leave out.
-// `shape`: the class whose properties are wanted; uninitialised for all.
-void filterInstance(CIMInstance& stored, const CIMConstClass& shape, const InstanceOptions& options);
+// Returns: the part of a stored instance that the options ask for, with its path. Like OpenPegasus, what is picked
+// comes
+//     in the class's order, a whole instance in the order of storage.
+// `stored`: spent afterwards. `shape`: the class whose properties are picked; uninitialised for the whole instance.
+CIMInstance filteredInstance(CIMInstance stored, const CIMConstClass& shape, const InstanceOptions& options);
 
 } // namespace Pegasus::repository

@@ -33,9 +33,9 @@ void InstanceStore::insert(NamespaceId nameSpace, const CIMObjectPath& path, con
 
 CIMInstance InstanceStore::get(NamespaceId nameSpace, const CIMObjectPath& path, const InstanceOptions& options)
 {
-    CIMInstance instance = withPath(nameSpace, find(nameSpace, path).body);
-    filterInstance(instance, CIMClass(), options);
-    return instance;
+    const CIMInstance instance = withPath(nameSpace, find(nameSpace, path).body);
+    const bool isWhole = options.propertyList.isNull();
+    return filteredInstance(instance, isWhole ? CIMClass() : classOf(nameSpace, path.getClassName()), options);
 }
 
 void InstanceStore::modify(NamespaceId nameSpace, const CIMConstInstance& modified, const CIMPropertyList& list)
@@ -63,8 +63,14 @@ std::vector<CIMInstance> InstanceStore::nextBatch(NamespaceId nameSpace, const C
          fStorage.listInstances(nameSpace, base::utf8(className), after, kBatchSize, kBatchBytes))
     {
         after = row.sequence;
-        batch.push_back(withPath(nameSpace, row.body));
-        filterInstance(batch.back(), options.deepInheritance ? CIMClass() : itsClass, options);
+        const CIMInstance instance = withPath(nameSpace, row.body);
+        CIMClass shape;
+        if (!options.deepInheritance) {
+            shape = itsClass;
+        } else if (!options.propertyList.isNull()) {
+            shape = classOf(nameSpace, instance.getClassName());
+        }
+        batch.push_back(filteredInstance(instance, shape, options));
     }
     return batch;
 }

@@ -48,8 +48,9 @@ void checkInterface(const std::string& type, const std::string& version)
     if (!known) {
         refuse(CIM_ERR_NOT_SUPPORTED, "Unsupported InterfaceType value: \"" + type + "\"");
     }
-    const bool supported = type == "CMPI" ? isOneOf(version, {"2.0.0"})
-                                          : isOneOf(version, {"2.1.0", "2.2.0", "2.3.0", "2.5.0", "2.6.0", "2.9.0"});
+    const bool supported = type == "CMPI"
+                               ? isOneOf(version, {"", "2.0.0"})
+                               : isOneOf(version, {"", "2.1.0", "2.2.0", "2.3.0", "2.5.0", "2.6.0", "2.9.0"});
     if (!supported) {
         refuse(CIM_ERR_NOT_SUPPORTED, "Unsupported InterfaceVersion value: \"" + version + "\"");
     }
@@ -110,9 +111,6 @@ void checkModule(const CIMInstance& module)
                       kModuleClass);
     checkInterface(stringProperty(module, "InterfaceType"), stringProperty(module, "InterfaceVersion"));
     checkUserContext(module);
-    if (!valueOf(module, "Bitness").isNull()) {
-        refuse(CIM_ERR_NOT_SUPPORTED, "Bitness");
-    }
 }
 
 void checkProvider(const CIMInstance& provider)

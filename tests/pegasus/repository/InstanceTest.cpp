@@ -133,8 +133,8 @@ TEST_F(InstanceTest, EnumeratesSubclassesToo)
         {"shallow",
          "base",
          {false, false, {}},
-         "Leaf.Id=\"a\" instance Leaf { ~string Caption=<none>; string Id=<a>; }\n"
-         "Sub.Id=\"b\" instance Sub { ~string Caption=<none>; string Id=<b>; }\n"},
+         "Leaf.Id=\"a\" instance Leaf { string Id=<a>; ~string Caption=<none>; }\n"
+         "Sub.Id=\"b\" instance Sub { string Id=<b>; ~string Caption=<none>; }\n"},
         {"deep",
          "Base",
          {true, false, {}},

@@ -366,6 +366,18 @@ TEST(ProgramTest, aTakenPortIsNamed)
     ::close(taken);
 }
 
+TEST(ProgramTest, aConfigurationThatCannotBeSavedIsReportedWithItsCause)
+{
+    const ServerTree tree;
+    const std::string file = tree.home() + "/cimserver_current.conf";
+    fs::create_directory(file);
+    const ProgramResult result = tree.run("cimserver", {"httpPort=" + std::to_string(tree.port())});
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_EQ(result.err,
+              "cimserver not started: Failed to save configuration properties to file: cannot open file: " + file +
+                  ". Configuration property not set.\ncannot replace " + file + ": Is a directory\n");
+}
+
 // The launcher's caller may wait for the end of a pipe that the server would otherwise hold open.
 TEST(ProgramTest, theServerKeepsNoneOfItsCallersDescriptors)
 {

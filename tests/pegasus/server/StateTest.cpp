@@ -420,9 +420,9 @@ TEST_F(RegistryTest, registrationsAreCheckedInOrder)
          "4 Missing Location which is required property in PG_ProviderModule class."},
         {"type", module("Nonsense"), "7 Unsupported InterfaceType value: \"Nonsense\""},
         {"version", module("CMPI", "9.9.9"), "7 Unsupported InterfaceVersion value: \"9.9.9\""},
+        {"no version", module("CMPI", ""), ""},
         {"user context", module("CMPI", "2.0.0", text("x"), CIMValue(Uint16(9))),
          "7 Unsupported UserContext value: \"9\"."},
-        {"module", module(), ""},
         {"module again", module(), "11 PG_ProviderModule.Name=\"M\""},
         {"capabilities first", capabilities("P", "1"),
          "1 PG_Provider class needs to be registered before register the Provider capabilities class"},
@@ -451,6 +451,25 @@ TEST_F(RegistryTest, registrationsAreCheckedInOrder)
     EXPECT_EQ(found->location, "x");
     EXPECT_EQ(fRegistry.find(CIMNamespaceName("root/x"), CIMName("C"), ProviderType::kMethod)->provider, "Q");
     EXPECT_FALSE(fRegistry.find(CIMNamespaceName("root/y"), CIMName("C"), ProviderType::kMethod));
+    const std::tuple<const char*, int, int> removals[] = {
+        // and how many providers and capabilities are left
+        {"PG_ProviderCapabilities.CapabilityID=\"3\",ProviderModuleName=\"M\",ProviderName=\"Q\"", 2, 2},
+        {"PG_Provider.ProviderModuleName=\"M\",Name=\"P\"", 1, 1},
+        {"PG_ProviderModule.Name=\"M\"", 0, 0},
+    };
+    for (const auto& [path, providers, entries] : removals) {
+        SCOPED_TRACE(path);
+        fRegistry.removeInstance(CIMObjectPath(path));
+        const auto count = [&](const char* name) {
+            return static_cast<int>(
+                fRepository.enumerateInstanceNames(CIMNamespaceName(kInteropNamespace), CIMName(name)).size());
+        };
+        EXPECT_EQ(count(kProviderClass), providers);
+        EXPECT_EQ(count(kCapabilitiesClass), entries);
+        EXPECT_FALSE(fRegistry.find(CIMNamespaceName("root/y"), CIMName("C"), ProviderType::kInstance));
+        EXPECT_THROW(fRegistry.removeInstance(CIMObjectPath(path)), CIMException);
+    }
+    EXPECT_EQ(errorOf(module()), "") << "it can be registered again";
 }
 
 } // namespace
