@@ -22,3 +22,19 @@ foreach(program cimserver cimmof cimconfig cimprovagt)
     message(FATAL_ERROR "${PEGASUS_ROOT} holds no program ${program}")
   endif()
 endforeach()
+
+# That server loads these two from R/pegasus/lib under their plain names; whatever else they need they find themselves.
+foreach(manager CMPIProviderManager DefaultProviderManager)
+  file(GLOB candidates ${PEGASUS_ROOT}/lib/lib${manager}.so* ${PEGASUS_ROOT}/lib64/lib${manager}.so*
+    ${PEGASUS_ROOT}/lib/x86_64-linux-gnu/lib${manager}.so*)
+  if(NOT candidates)
+    message(FATAL_ERROR "${PEGASUS_ROOT} holds no library lib${manager}.so, without which its server loads no provider")
+  endif()
+  list(GET candidates 0 library)
+  file(REAL_PATH ${library} library)
+  install(FILES ${library} DESTINATION ${VRX_DEST_PEGASUS_LIB} RENAME lib${manager}.so)
+endforeach()
+
+# Of itself it listens on all interfaces.
+file(CONFIGURE OUTPUT ${CMAKE_CURRENT_BINARY_DIR}/cimserver_planned.conf CONTENT "listenAddress=127.0.0.1\n" @ONLY)
+install(FILES ${CMAKE_CURRENT_BINARY_DIR}/cimserver_planned.conf DESTINATION ${VRX_DEST_PEGASUS})

@@ -2,6 +2,7 @@
 set(VRX_TREE_SERVER embedded)
 if(PEGASUS_ROOT)
   set(VRX_TREE_SERVER "installed OpenPegasus")
+  set(VRX_TREE_CONSUMER "consumer = ${PEGASUS_CONSUMER}")
 endif()
 configure_file(${CMAKE_CURRENT_LIST_DIR}/tree.conf.in ${PROJECT_BINARY_DIR}/tree.conf @ONLY)
 install(FILES ${PROJECT_BINARY_DIR}/tree.conf DESTINATION ${VRX_DEST_PEGASUS})

@@ -164,7 +164,8 @@ void SetRoot(const TDeployedTree& tree, TOptions& options)
 {
     const std::string root = tree.GetRoot();
     options.fRoot = root;
-    options.fDefaultConsumer = tree.GetDefaultConsumer();
+    options.fTreeConsumer = tree.GetConsumer(options.fConsumer);
+    options.fPlansConsumer = tree.HasSettableConsumer();
     if (options.fPlugin.empty()) {
         options.fPlugin = fs::path(root) / kPluginFile;
     }

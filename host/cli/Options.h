@@ -41,9 +41,10 @@ struct TOptions
     std::string fRoot;  // the directory in which everything runs
     std::string fState; // the user's choice of a private root; empty for none
     std::string fPlugin;
-    std::string fConsumer;        // empty: fDefaultConsumer
-    std::string fDefaultConsumer; // of the tree's server
-    std::string fConfigFile;      // empty: none
+    std::string fConsumer;      // empty: fTreeConsumer
+    std::string fTreeConsumer;  // for which the tree's server runs
+    bool fPlansConsumer = true; // the server must be told
+    std::string fConfigFile;    // empty: none
     std::string fLogFile;
     std::vector<std::pair<std::string, std::string>> fSettings;
     bool fVerbose = false;
@@ -58,8 +59,8 @@ constexpr char kLogFile[] = "vrxhost.log";
 // std::filesystem::filesystem_error.
 bool ParseOptions(int argc, const char* const* argv, TOptions& options);
 
-// Makes a tree the root: the default place of the plug-in, the settings file and the log, and what the default consumer
-// is made of.
+// Makes a tree the root: the default place of the plug-in, the settings file and the log, and what decides on the
+// consumer. Throws: TTreeError when the tree's server does not run for the wanted consumer.
 void SetRoot(const TDeployedTree& tree, TOptions& options);
 
 } // namespace vrxhost

@@ -15,7 +15,7 @@ constexpr char kMark[] = "pegasus/tree.conf";
 constexpr char kServerKey[] = "server = ";
 constexpr char kEmbedded[] = "embedded";
 constexpr char kInstalled[] = "installed OpenPegasus";
-constexpr char kInstalledConsumer[] = "quvex";
+constexpr char kConsumerKey[] = "consumer = ";
 constexpr char kFormatLine[] = "format = 1";
 
 [[noreturn]] void Refuse(const std::string& root, const std::string& reason)
@@ -23,7 +23,14 @@ constexpr char kFormatLine[] = "format = 1";
     throw TTreeError("the root directory " + root + " is not a deployed tree: " + reason);
 }
 
-EServerKind ReadMark(const std::string& root)
+// What the mark says.
+struct TMark
+{
+    EServerKind fKind;
+    std::string fConsumer;
+};
+
+TMark ReadMark(const std::string& root)
 {
     std::ifstream mark(fs::path(root) / kMark);
     if (!mark) {
@@ -31,17 +38,21 @@ EServerKind ReadMark(const std::string& root)
     }
     bool hasFormat = false;
     std::string server;
+    std::string consumer;
     for (std::string line; std::getline(mark, line);) {
         if (line == kFormatLine) {
             hasFormat = true;
         } else if (line.rfind(kServerKey, 0) == 0) {
             server = line.substr(sizeof kServerKey - 1);
+        } else if (line.rfind(kConsumerKey, 0) == 0) {
+            consumer = line.substr(sizeof kConsumerKey - 1);
         }
     }
-    if (!hasFormat || (server != kEmbedded && server != kInstalled)) {
+    const bool isKnown = server == kEmbedded || (server == kInstalled && !consumer.empty());
+    if (!hasFormat || !isKnown) {
         Refuse(root, std::string("this program does not know the kind of tree that ") + kMark + " names");
     }
-    return server == kEmbedded ? EServerKind::kEmbedded : EServerKind::kInstalled;
+    return {server == kEmbedded ? EServerKind::kEmbedded : EServerKind::kInstalled, consumer};
 }
 
 // FNV-1a: the same in every build, because a later one must find the server that an earlier one left running.
@@ -66,8 +77,11 @@ std::string Resolved(const std::string& root)
 
 } // namespace
 
-TDeployedTree::TDeployedTree(const std::string& root) : fRoot(Resolved(root)), fKind(ReadMark(fRoot))
+TDeployedTree::TDeployedTree(const std::string& root) : fRoot(Resolved(root))
 {
+    const TMark mark = ReadMark(fRoot);
+    fKind = mark.fKind;
+    fBuiltConsumer = mark.fConsumer;
     std::error_code ignored;
     if (!fs::is_regular_file(fs::path(fRoot) / "pegasus/bin/cimserver", ignored)) {
         Refuse(fRoot, "it has no program pegasus/bin/cimserver");
@@ -84,9 +98,16 @@ std::string TDeployedTree::GetId() const
     return text;
 }
 
-std::string TDeployedTree::GetDefaultConsumer() const
+std::string TDeployedTree::GetConsumer(const std::string& wanted) const
 {
-    return fKind == EServerKind::kInstalled ? kInstalledConsumer : "vrxhost-" + GetId();
+    if (fKind == EServerKind::kEmbedded) {
+        return wanted.empty() ? "vrxhost-" + GetId() : wanted;
+    }
+    if (!wanted.empty() && wanted != fBuiltConsumer) {
+        throw TTreeError("the server of the tree " + fRoot + " was built for the consumer " + fBuiltConsumer +
+                         " and knows no other: leave --consumer out");
+    }
+    return fBuiltConsumer;
 }
 
 } // namespace vrxhost

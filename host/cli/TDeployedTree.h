@@ -31,13 +31,17 @@ class TDeployedTree
     const std::string& GetRoot() const { return fRoot; } // absolute, links resolved
     std::string GetId() const;                           // made of the root: letters and digits
 
-    // Returns: the consumer that keeps this tree's server apart from other trees': made of the root's path, or the one
-    // that an installed OpenPegasus was built for.
-    std::string GetDefaultConsumer() const;
+    // Returns: the consumer that keeps this tree's server apart from other trees': the wanted one or, when that is
+    // empty, one made of the root's path. An installed OpenPegasus was built for one consumer, which the mark names.
+    // Throws: TTreeError when that is another one than the wanted.
+    std::string GetConsumer(const std::string& wanted) const;
+    // Returns: whether the server must be told its consumer.
+    bool HasSettableConsumer() const { return fKind == EServerKind::kEmbedded; }
 
   private:
     std::string fRoot;
     EServerKind fKind;
+    std::string fBuiltConsumer; // of an installed OpenPegasus
 };
 
 } // namespace vrxhost

@@ -42,10 +42,9 @@ using NKOLVRX20::TProcessControl;
 using NKOLVRX20::TRootObject;
 
 TRun::TRun(const TOptions& options)
-    : fOptions(options), fConsumer(options.fConsumer.empty() ? options.fDefaultConsumer : options.fConsumer),
-      fServer(options.fRoot, fConsumer), fServerLog(options.fRoot), fVendors(ProviderDirectory(options.fPlugin)),
-      fThread(::pthread_self()), fLosses(options.fRoot), fStop([this] { Interrupt(); }),
-      fReport(options, fStop, fLosses)
+    : fOptions(options), fConsumer(options.fTreeConsumer), fServer(options.fRoot, fConsumer), fServerLog(options.fRoot),
+      fVendors(ProviderDirectory(options.fPlugin)), fThread(::pthread_self()), fLosses(options.fRoot),
+      fStop([this] { Interrupt(); }), fReport(options, fStop, fLosses)
 {
     fLosses.SetVendors(fVendors);
     MakePausesCuttable();
@@ -108,6 +107,9 @@ void TRun::Enter(EPhase phase)
 // A server of some other make may lack the setting; that matters only when a name was asked for.
 void TRun::SetConsumer() const
 {
+    if (!fOptions.fPlansConsumer) {
+        return;
+    }
     const std::string error = fServer.SetConsumer();
     if (!error.empty() && !fOptions.fConsumer.empty()) {
         throw TPluginError("the consumer " + fOptions.fConsumer + " could not be set, cimconfig: " + error);

@@ -35,20 +35,11 @@ class Readme(unittest.TestCase):
         if os.path.realpath(BUILD) != os.path.join(SOURCE, "build", "release"):
             self.skipTest("README.md is about build/release")
 
-    def installed_pegasus(self):
-        """What an installed OpenPegasus looks like to the build, of the embedded stack's parts."""
-        root = self.tree.path("installed")
-        os.mkdir(root)
-        os.symlink(os.path.join(SOURCE, "pegasus", "include"), os.path.join(root, "include"))
-        for name in ("lib", "bin"):
-            os.symlink(self.tree.path("pegasus", name), os.path.join(root, name))
-        return root
-
     def runnable(self, command):
         if command.startswith("cmake --install"):
             return command.replace("--prefix R", "--prefix " + self.tree.path("R"))
         if "/opt/pegasus" in command:
-            return command.replace("/opt/pegasus", self.installed_pegasus()) + " -B " + self.tree.path("build")
+            return command.replace("/opt/pegasus", self.tree.installed_pegasus(os.path.join(self.tree.folder, "installed"))) + " -B " + self.tree.path("build")
         if command == "./tools/run":
             return command + " --consumer " + self.tree.consumer
         return command

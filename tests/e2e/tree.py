@@ -8,6 +8,8 @@ import tempfile
 import time
 import uuid
 
+SOURCE = os.path.dirname(os.path.dirname(os.path.dirname(os.path.abspath(__file__))))
+MANAGERS = ("libCMPIProviderManager.so", "libDefaultProviderManager.so")
 RUN_SECONDS = 120
 
 
@@ -71,6 +73,19 @@ class Tree:
         """Returns (exit status, the JSON document, standard error)."""
         status, out, err = self.run("inventory", "--format", "json", *arguments)
         return status, json.loads(out), err
+
+    def installed_pegasus(self, root):
+        """Lays down what looks like an installed OpenPegasus to the build: this tree's parts and two empty managers."""
+        shutil.rmtree(root, ignore_errors=True)
+        os.mkdir(root)
+        os.symlink(os.path.join(SOURCE, "pegasus", "include"), os.path.join(root, "include"))
+        os.symlink(self.path("pegasus", "bin"), os.path.join(root, "bin"))
+        shutil.copytree(self.path("pegasus", "lib"), os.path.join(root, "lib"), symlinks=True)
+        for name in MANAGERS:
+            with open(os.path.join(root, "lib", name + ".1"), "w", encoding="ascii") as file:
+                file.write(name)
+            os.symlink(name + ".1", os.path.join(root, "lib", name))
+        return root
 
     def take_first_port_with(self, other):
         """The first start of this tree's server fails, because the other tree's has taken the port."""

@@ -293,8 +293,14 @@ TEST_F(VrxhostProgram, DefaultConsumerIsMadeOfTheRootUnlessTheServerIsAnInstalle
     EXPECT_EQ(first, consumer(fRoot));
     fs::copy(fRoot, fFolder / "copy", fs::copy_options::recursive);
     EXPECT_NE(first, consumer(fFolder / "copy"));
-    std::ofstream(fRoot / "pegasus/tree.conf") << "format = 1\nserver = installed OpenPegasus\n";
-    EXPECT_EQ(consumer(fRoot), "consumer quvex");
+    std::ofstream(fRoot / "pegasus/tree.conf") << "format = 1\nserver = installed OpenPegasus\nconsumer = built\n";
+    Install("cimconfig", "touch was-run");
+    EXPECT_EQ(consumer(fRoot), "consumer built");
+    EXPECT_FALSE(fs::exists(fRoot / "was-run")) << "such a server has no property of that name";
+    EXPECT_TRUE(HasStatus(Run({"providers", "--consumer", "built"}), 0));
+    const auto refused = Run({"providers", "--consumer", "me"});
+    EXPECT_TRUE(HasStatus(refused, 2));
+    EXPECT_THAT(refused.fErrorOutput, HasSubstr("was built for the consumer built and knows no other"));
 }
 
 TEST_F(VrxhostProgram, StartsOverWhenAnotherServerTookThePort)
