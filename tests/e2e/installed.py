@@ -17,14 +17,14 @@ class Installed(unittest.TestCase):
     def setUp(self):
         self.tree = Tree(BUILD)
         self.addCleanup(self.tree.remove)
-        # Always the same folders, so that the objects of an earlier run serve again.
-        self.build = os.path.join(os.path.abspath(BUILD), "e2e-installed")
+        # Always the same folder, beside the build, with its settings: objects of an earlier run and ccache's serve again.
+        self.build = os.path.join(os.path.dirname(os.path.abspath(BUILD)), "e2e-installed")
         self.pegasus = self.tree.installed_pegasus(self.build + "-pegasus")
         self.root = os.path.join(self.tree.folder, "staged")
 
     def configure(self):
-        options = ["-DCMAKE_BUILD_TYPE=Debug", "-DCMAKE_CXX_FLAGS_DEBUG=-O0", "-DVRX_BUILD_TESTS=OFF",
-                   "-DVRX_BUILD_BENCH=OFF", "-DVRX_BUILD_FUZZ=OFF", "-DPEGASUS_CONSUMER=lab"]
+        options = ["-DCMAKE_BUILD_TYPE=RelWithDebInfo", "-DVRX_BUILD_TESTS=OFF", "-DVRX_BUILD_BENCH=OFF",
+                   "-DVRX_BUILD_FUZZ=OFF", "-DPEGASUS_CONSUMER=lab"]
         return subprocess.run(["cmake", "-S", SOURCE, "-B", self.build, "-G", "Ninja", f"-DPEGASUS_ROOT={self.pegasus}",
                                *options], capture_output=True, text=True, timeout=120, check=False)
 

@@ -13,6 +13,7 @@ struct WireCase
     std::string name;
     PeerRequest request;
     std::string response; // as sent
+    std::string note;     // what the recording says about the case
     std::string printed;  // the result or "EXC class ..."; cut off at some length; empty when nothing was noted
 };
 

@@ -23,15 +23,24 @@ Evaluator equals(const CIMValue& x, const CIMValue& y)
     return [=](const Vector&) { return x == y; };
 }
 
-// "Real64(1.5)"
-double realIn(const Vector& vector)
+template <typename T> Evaluator integer()
 {
-    return std::strtod(vector.input.c_str() + vector.input.find('(') + 1, nullptr);
+    return [](const Vector& v) {
+        return describe(CIMValue(v.arguments[0][0] == '-' ? static_cast<T>(std::stoll(v.arguments[0]))
+                                                          : static_cast<T>(v.number())));
+    };
 }
 
-json typedNull(const Vector& vector, bool isArray)
+template <typename T> Evaluator real()
 {
-    return describe(CIMValue(CIMType(std::stoi(vector.lastWord())), isArray));
+    return [](const Vector& v) {
+        return describe(CIMValue(static_cast<T>(std::strtod(v.arguments[0].c_str(), nullptr))));
+    };
+}
+
+Evaluator typedNull(bool isArray)
+{
+    return [=](const Vector& v) { return describe(CIMValue(CIMType(v.number()), isArray)); };
 }
 
 // The values that get() is tried on; each number is 1.
@@ -89,10 +98,13 @@ json getAs(const CIMValue& value, const std::string& type)
     if (type == "CIMObjectPath") {
         return utf8(got(value, CIMObjectPath()).toString());
     }
-    if (type == "ArrayUint8") {
+    if (type == "Array<Uint8>") {
         return got(value, Array<Uint8>(1, 77)).size();
     }
-    return got(value, Array<String>(1, String("unset"))).size();
+    if (type == "Array<String>") {
+        return got(value, Array<String>(1, String("unset"))).size();
+    }
+    throw std::out_of_range(type);
 }
 
 CIMInstance fooInstance()
@@ -104,69 +116,69 @@ CIMInstance fooInstance()
 
 void addScalars(VectorTable& table)
 {
-    table["value.default"] = shown(CIMValue());
-    table["value.bool.t"] = shown(true);
-    table["value.bool.f"] = shown(false);
-    table["value.u8"] = shown(Uint8(255));
-    table["value.u16"] = shown(Uint16(65535));
-    table["value.s16"] = shown(Sint16(-32768));
-    table["value.u32"] = shown(Uint32(4294967295u));
-    table["value.s32"] = shown(std::numeric_limits<Sint32>::min());
-    table["value.u64"] = shown(std::numeric_limits<Uint64>::max());
-    table["value.s64"] = shown(std::numeric_limits<Sint64>::min());
-    table["value.r32."] = [](const Vector& v) { return describe(CIMValue(Real32(realIn(v)))); };
-    table["value.r64."] = [](const Vector& v) { return describe(CIMValue(Real64(realIn(v)))); };
-    table["value.c16.e9"] = shown(Char16(0xE9));
-    table["value.c16.5408"] = shown(Char16(0x540D));
-    table["value.c16.lt"] = shown(Char16('<'));
-    table["value.c16.space"] = shown(Char16(' '));
-    table["value.c16.0"] = shown(Char16(0));
-    table["value.str.empty"] = shown(String());
-    table["value.dt"] = shown(CIMDateTime("20200101000000.000000+000"));
-    table["value.dt.iv"] = shown(CIMDateTime("00000001020304.000005:000"));
-    table["value.ref"] = shown(CIMObjectPath("root/cimv2:A.K=\"1\""));
-    table["value.inst"] = shown(fooInstance());
-    table["value.obj.class"] = shown(CIMObject(CIMClass("Foo", "Sup")));
-    table["value.const.char"] = shown(String("lit"));
-    table["value.null."] = [](const Vector& v) { return typedNull(v, false); };
-    table["value.nullarr."] = [](const Vector& v) { return typedNull(v, true); };
-    table["value.nullarr.sized"] = shown(CIMValue(CIMTYPE_UINT8, true, 4));
-    table["value.ctor.sizedscalar"] = shown(CIMValue(CIMTYPE_UINT8, false, 4));
+    table["CIMValue()"] = shown(CIMValue());
+    table["CIMValue(true)"] = shown(true);
+    table["CIMValue(false)"] = shown(false);
+    table["Uint8(*)"] = integer<Uint8>();
+    table["Uint16(*)"] = integer<Uint16>();
+    table["Uint32(*)"] = integer<Uint32>();
+    table["Uint64(*)"] = integer<Uint64>();
+    table["Sint8(*)"] = integer<Sint8>();
+    table["Sint16(*)"] = integer<Sint16>();
+    table["Sint32(*)"] = integer<Sint32>();
+    table["Sint64(*)"] = integer<Sint64>();
+    table["Sint64(min)"] = shown(std::numeric_limits<Sint64>::min());
+    table["Real32(*)"] = real<Real32>();
+    table["Real64(*)"] = real<Real64>();
+    table["Char16(*)"] = [](const Vector& v) { return describe(CIMValue(Char16(static_cast<Uint16>(v.number())))); };
+    table["Char16('<')"] = shown(Char16('<'));
+    table["String(\"\")"] = shown(String());
+    table["CIMDateTime(20200101000000.000000+000)"] = shown(CIMDateTime("20200101000000.000000+000"));
+    table["interval 00000001020304.000005:000"] = shown(CIMDateTime("00000001020304.000005:000"));
+    table["CIMObjectPath(root/cimv2:A.K=\"1\")"] = shown(CIMObjectPath("root/cimv2:A.K=\"1\""));
+    table["CIMValue(CIMInstance(Foo){P=Uint32 1})"] = shown(fooInstance());
+    table["CIMValue(CIMObject(CIMClass(Foo)))"] = shown(CIMObject(CIMClass("Foo", "Sup")));
+    table["CIMValue from string literal via String"] = shown(String("lit"));
+    table["CIMValue(CIMType(*),false)"] = typedNull(false);
+    table["CIMValue(CIMType(*),true)"] = typedNull(true);
+    table["CIMValue(CIMTYPE_UINT8,true,4)"] = shown(CIMValue(CIMTYPE_UINT8, true, 4));
+    table["CIMValue(CIMTYPE_UINT8,false,4)"] = shown(CIMValue(CIMTYPE_UINT8, false, 4));
 }
 
 void addArrays(VectorTable& table)
 {
-    table["value.arr.bool"] = shown(arrayOf<Boolean>({true, false}));
-    table["value.arr.u8"] = shown(arrayOf<Uint8>({1, 2, 3}));
-    table["value.arr.u8.empty"] = shown(Array<Uint8>());
-    table["value.arr.str"] = shown(arrayOf<String>({"a", "", "b c"}));
-    table["value.arr.str.empty"] = shown(Array<String>());
-    table["value.arr.c16"] = shown(arrayOf<Char16>({Char16('A'), Char16('B')}));
-    table["value.arr.r64"] = shown(arrayOf<Real64>({1, 0.5}));
-    table["value.arr.ref"] = shown(arrayOf<CIMObjectPath>({CIMObjectPath("A.K=1"), CIMObjectPath("B.K=2")}));
-    table["value.arr.s64"] = shown(arrayOf<Sint64>({-1, std::numeric_limits<Sint64>::max()}));
+    table["Array<Boolean>{true,false}"] = shown(arrayOf<Boolean>({true, false}));
+    table["Array<Uint8>{1,2,3}"] = shown(arrayOf<Uint8>({1, 2, 3}));
+    table["Array<Uint8>{}"] = shown(Array<Uint8>());
+    table["Array<String>{a,\"\",b c}"] = shown(arrayOf<String>({"a", "", "b c"}));
+    table["Array<String>{}"] = shown(Array<String>());
+    table["Array<Char16>{A,B}"] = shown(arrayOf<Char16>({Char16('A'), Char16('B')}));
+    table["Array<Real64>{1,0.5}"] = shown(arrayOf<Real64>({1, 0.5}));
+    table["Array<CIMObjectPath>{A.K=1,B.K=2}"] =
+        shown(arrayOf<CIMObjectPath>({CIMObjectPath("A.K=1"), CIMObjectPath("B.K=2")}));
+    table["Array<Sint64>{-1,9223372036854775807}"] = shown(arrayOf<Sint64>({-1, std::numeric_limits<Sint64>::max()}));
 }
 
 void addComparisons(VectorTable& table)
 {
     const CIMValue nullBoolean(CIMTYPE_BOOLEAN, false);
-    table["value.eq.bool"] = equals(true, true);
-    table["value.eq.bool2"] = equals(true, false);
-    table["value.eq.type"] = equals(Uint8(1), Uint16(1));
-    table["value.eq.nullvs"] = equals(CIMValue(CIMTYPE_STRING, false), String());
-    table["value.eq.nullbool.true"] = equals(nullBoolean, true);
-    table["value.eq.default"] = equals(CIMValue(), CIMValue());
-    table["value.eq.default.bool"] = equals(CIMValue(), nullBoolean);
-    table["value.eq.strcase"] = equals(String("a"), String("A"));
-    table["value.eq.nullarr"] = equals(CIMValue(CIMTYPE_UINT8, true), Array<Uint8>());
-    table["value.eq.arrscalar"] = equals(CIMValue(CIMTYPE_UINT8, true), CIMValue(CIMTYPE_UINT8, false));
-    table["value.eq.r"] = equals(Real64(0.1), Real64(0.1));
-    table["value.eq.strbool"] = equals(String("true"), true);
-    table["value.eq.boolarr"] = equals(true, arrayOf<Boolean>({true}));
-    table["value.eq.ref"] = equals(CIMObjectPath("A.K=1,L=2"), CIMObjectPath("a.l=2,k=1"));
-    table["value.eq.dtutc"] =
+    table["true==true"] = equals(true, true);
+    table["true==false"] = equals(true, false);
+    table["Uint8(1)==Uint16(1)"] = equals(Uint8(1), Uint16(1));
+    table["null string==String(\"\")"] = equals(CIMValue(CIMTYPE_STRING, false), String());
+    table["null boolean==true"] = equals(nullBoolean, true);
+    table["CIMValue()==CIMValue()"] = equals(CIMValue(), CIMValue());
+    table["CIMValue()==null boolean"] = equals(CIMValue(), nullBoolean);
+    table["String(a)==String(A)"] = equals(String("a"), String("A"));
+    table["null uint8 array == empty uint8 array"] = equals(CIMValue(CIMTYPE_UINT8, true), Array<Uint8>());
+    table["null uint8 array == null uint8"] = equals(CIMValue(CIMTYPE_UINT8, true), CIMValue(CIMTYPE_UINT8, false));
+    table["Real64(0.1)==Real64(0.1)"] = equals(Real64(0.1), Real64(0.1));
+    table["String(true)==Boolean(true)"] = equals(String("true"), true);
+    table["Boolean(true)==Array<Boolean>{true}"] = equals(true, arrayOf<Boolean>({true}));
+    table["A.K=1,L=2 == a.l=2,k=1"] = equals(CIMObjectPath("A.K=1,L=2"), CIMObjectPath("a.l=2,k=1"));
+    table["01:00+060 == 00:00+000"] =
         equals(CIMDateTime("20200101010000.000000+060"), CIMDateTime("20200101000000.000000+000"));
-    table["value.typeCompatible"] = [](const Vector&) {
+    table["Uint8(1).typeCompatible(null uint8), vs array"] = [](const Vector&) {
         const CIMValue value(Uint8(1));
         return json{value.typeCompatible(CIMValue(CIMTYPE_UINT8, false)),
                     value.typeCompatible(CIMValue(CIMTYPE_UINT8, true))};
@@ -186,11 +198,12 @@ template <typename Change> Evaluator changed(const CIMValue& before, Change chan
 void addChanges(VectorTable& table)
 {
     const CIMValue five(Uint32(5));
-    table["value.set.changes.type"] = changed(String("s"), [](CIMValue& v) { v.set(Uint32(5)); });
-    table["value.set.on.default"] = changed(CIMValue(), [](CIMValue& v) { v.set(String("q")); });
-    table["value.clear"] = changed(five, [](CIMValue& v) { v.clear(); });
-    table["value.setNull"] = changed(five, [](CIMValue& v) { v.setNullValue(CIMTYPE_STRING, false); });
-    table["value.copy"] = [five](const Vector&) {
+    table["v=String; v.set(Uint32(5)) changes type"] = changed(String("s"), [](CIMValue& v) { v.set(Uint32(5)); });
+    table["CIMValue v; v.set(String)"] = changed(CIMValue(), [](CIMValue& v) { v.set(String("q")); });
+    table["v=Uint32(5); clear()"] = changed(five, [](CIMValue& v) { v.clear(); });
+    table["v=Uint32(5); setNullValue(CIMTYPE_STRING,false)"] =
+        changed(five, [](CIMValue& v) { v.setNullValue(CIMTYPE_STRING, false); });
+    table["a=Uint32(5); b=a; b.set(6); a unaffected"] = [five](const Vector&) {
         CIMValue copy = five;
         copy.set(Uint32(6));
         return json{utf8(five.toString()), utf8(copy.toString())};
@@ -205,11 +218,7 @@ void addValueVectors(VectorTable& table)
     addArrays(table);
     addComparisons(table);
     addChanges(table);
-    table["get."] = [](const Vector& v) {
-        const std::size_t kind = v.id.find('.') + 1;
-        const std::size_t type = v.id.find('.', kind) + 1;
-        return getAs(kinds().at(v.id.substr(kind, type - kind - 1)), v.id.substr(type));
-    };
+    table["value of kind * get(*)"] = [](const Vector& v) { return getAs(kinds().at(v.arguments[0]), v.arguments[1]); };
 }
 
 } // namespace test

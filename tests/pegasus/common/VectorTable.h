@@ -7,6 +7,7 @@
 #include <functional>
 #include <map>
 #include <string>
+#include <vector>
 
 namespace test {
 
@@ -17,14 +18,16 @@ struct Vector
 {
     std::string id;
     std::string input;
+    std::vector<std::string> arguments; // what the asterisks of the evaluator's name stand for
 
     // The text in quotes in the input, its escapes resolved.
     std::string quoted() const;
-    // Returns: the id after its last dot.
-    std::string lastWord() const;
+    // An argument as a number: decimal, or hexadecimal after 0x.
+    unsigned long long number(std::size_t index = 0) const { return std::stoull(arguments.at(index), nullptr, 0); }
 };
 
-// What computes the same here. A name stands for the vector of that id; one that ends in a dot for all that begin so.
+// What computes the same here, by the operation that a vector's input shows. An asterisk in a name stands for an
+// argument.
 using Evaluator = std::function<json(const Vector&)>;
 using VectorTable = std::map<std::string, Evaluator>;
 
