@@ -5,7 +5,9 @@ Usage: installed.py BUILD_DIRECTORY
 import os
 import subprocess
 import sys
+import tempfile
 import unittest
+import zlib
 
 from tree import MANAGERS, SOURCE, Tree
 
@@ -17,9 +19,11 @@ class Installed(unittest.TestCase):
     def setUp(self):
         self.tree = Tree(BUILD)
         self.addCleanup(self.tree.remove)
-        # Always the same folder, beside the build, with its settings: objects of an earlier run and ccache's serve again.
+        # Always the same folders, so that objects of an earlier run serve again: the build beside that of the tests, for
+        # ccache, and the other outside of the sources, as an installed one is.
         self.build = os.path.join(os.path.dirname(os.path.abspath(BUILD)), "e2e-installed")
-        self.pegasus = self.tree.installed_pegasus(self.build + "-pegasus")
+        name = f"vrx-installed-{os.geteuid()}-{zlib.crc32(self.build.encode()):08x}"
+        self.pegasus = self.tree.installed_pegasus(os.path.join(tempfile.gettempdir(), name))
         self.root = os.path.join(self.tree.folder, "staged")
 
     def configure(self):
