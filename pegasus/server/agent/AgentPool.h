@@ -1,12 +1,20 @@
 #pragma once
 
 #include "pegasus/server/agent/AgentProcess.h"
-#include "pegasus/server/agent/ProviderReference.h"
 
 #include <functional>
 #include <map>
 
 namespace Pegasus::server {
+
+// Which provider serves a class in a namespace.
+struct ProviderReference
+{
+    std::string module;
+    std::string provider;
+    std::string location;      // of the module's library: lib<location>.so
+    std::string interfaceType; // "CMPI" or "C++Default"
+};
 
 // Pool settings, read again on every use.
 struct AgentSettings

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "pegasus/repository/Repository.h"
-#include "pegasus/server/agent/ProviderReference.h"
+#include "pegasus/server/agent/AgentPool.h"
 
 #include <mutex>
 #include <optional>
