@@ -71,6 +71,19 @@ def copy_of_tree(top):
     subprocess.run(["git", "-C", top, "init", "-q"], check=True)
 
 
+def unhardened_files_missed():
+    """Links a library and a program without any protection. Returns what the check does not report of them."""
+    bare = ["gcc", "-x", "c", "-", "-U_FORTIFY_SOURCE", "-fno-stack-protector", "-Wl,-z,norelro,-z,lazy,-z,execstack", "-o"]
+    with tempfile.TemporaryDirectory(prefix="vrx-check-") as top:
+        for name, option in (("library", "-shared"), ("program", "-no-pie")):
+            subprocess.run([*bare, os.path.join(top, name), option], input="int main(void) { return 0; }", text=True,
+                           stderr=subprocess.DEVNULL, check=True)
+        done = subprocess.run(["tools/checks/hardening.py", top], stdout=subprocess.PIPE, text=True, check=False)
+    lacks = ["RELRO", "BIND_NOW", "stack that cannot be executed", "stack protector"]
+    expected = [f"{name} has no {what}" for name in ("library", "program") for what in lacks] + ["program has no PIE"]
+    return [line for line in expected if line not in done.stdout.splitlines()]
+
+
 def faults():
     """Yields (check, file, text, what its report holds)."""
     number = 0
@@ -99,6 +112,8 @@ def main():
     lines = done.stdout.splitlines()
     missed = [(check, file, report) for check, file, _, report in planted
               if not any(report in line and (file in line or "Planted" in report) for line in lines)]
+    for line in unhardened_files_missed():
+        print(f"hardening does not report: {line}")
     for check, file, report in missed:
         print(f"{check} does not report {file}: {report}")
     print(f"self-test: {len(planted) - len(missed)} of {len(planted)} planted faults reported", file=sys.stderr)
