@@ -5,6 +5,9 @@
 #include <string_view>
 
 #include <linux/capability.h>
+#include <sys/prctl.h>
+#include <sys/syscall.h>
+#include <unistd.h>
 
 namespace Pegasus::server {
 
@@ -74,6 +77,26 @@ std::optional<CapabilitySet> parseCapabilities(const std::string& list)
         begin = end + 1;
     }
     return set;
+}
+
+void keepCapabilities(CapabilitySet kept)
+{
+    for (int number = 0; ::prctl(PR_CAPBSET_READ, number) >= 0; ++number) {
+        if ((kept >> number & 1) == 0) {
+            ::prctl(PR_CAPBSET_DROP, number);
+        }
+    }
+    __user_cap_header_struct header = {_LINUX_CAPABILITY_VERSION_3, 0};
+    __user_cap_data_struct data[_LINUX_CAPABILITY_U32S_3] = {};
+    ::syscall(SYS_capget, &header, data);
+    for (__user_cap_data_struct& part : data) {
+        const auto mask = static_cast<std::uint32_t>(kept);
+        part.permitted &= mask;
+        part.effective &= mask;
+        part.inheritable &= mask;
+        kept >>= 32;
+    }
+    ::syscall(SYS_capset, &header, data);
 }
 
 } // namespace Pegasus::server

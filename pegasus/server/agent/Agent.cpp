@@ -4,7 +4,6 @@
 #include "pegasus/server/admin/Log.h"
 #include "pegasus/server/agent/AgentConfinement.h"
 #include "pegasus/server/agent/AgentHandler.h"
-#include "pegasus/server/agent/AgentKeeper.h"
 #include "pegasus/server/agent/AgentProcess.h"
 #include "pegasus/server/agent/AgentServices.h"
 

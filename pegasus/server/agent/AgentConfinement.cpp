@@ -4,11 +4,8 @@
 #include <cstdlib>
 #include <fstream>
 
-#include <linux/capability.h>
 #include <sys/prctl.h>
 #include <sys/resource.h>
-#include <sys/syscall.h>
-#include <unistd.h>
 
 namespace Pegasus::server {
 
@@ -48,27 +45,6 @@ std::uint64_t runningOnMachine()
         file >> word;
     }
     return std::strtoul(word.c_str() + std::min(word.find('/') + 1, word.size()), nullptr, 10);
-}
-
-// The bounding set too, so that a program which root's provider starts gets no more.
-void keepCapabilities(CapabilitySet kept)
-{
-    for (int number = 0; ::prctl(PR_CAPBSET_READ, number) >= 0; ++number) {
-        if ((kept >> number & 1) == 0) {
-            ::prctl(PR_CAPBSET_DROP, number);
-        }
-    }
-    __user_cap_header_struct header = {_LINUX_CAPABILITY_VERSION_3, 0};
-    __user_cap_data_struct data[_LINUX_CAPABILITY_U32S_3] = {};
-    ::syscall(SYS_capget, &header, data);
-    for (__user_cap_data_struct& part : data) {
-        const auto mask = static_cast<std::uint32_t>(kept);
-        part.permitted &= mask;
-        part.effective &= mask;
-        part.inheritable &= mask;
-        kept >>= 32;
-    }
-    ::syscall(SYS_capset, &header, data);
 }
 
 } // namespace

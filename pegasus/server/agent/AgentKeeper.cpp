@@ -1,7 +1,6 @@
-#include "pegasus/server/agent/AgentKeeper.h"
-
 #include "pegasus/base/Deadline.h"
 #include "pegasus/base/Descriptor.h"
+#include "pegasus/server/agent/AgentConfinement.h"
 
 #include <cstdio>
 #include <cstdlib>

@@ -17,7 +17,7 @@ namespace Pegasus::server {
 //
 // The two are joined by a control socket. Over it the agent receives its end of each channel; when it closes, however
 // the server ended, the agent ends too. The process that is started is the agent's keeper, which ends as the agent ends
-// (AgentKeeper.h). A thread waits for it, so that it is reaped and the cause of its end is known, and logs what the
+// (splitOffKeeper). A thread waits for it, so that it is reaped and the cause of its end is known, and logs what the
 // agent writes to its standard output and error.
 //
 // Thread: any.
