@@ -2,10 +2,14 @@
 
 #include "pegasus/base/PercentCoding.h"
 #include "pegasus/wire/XmlDocument.h"
+#include "tests/support/VectorsFolder.h"
 
 #include <algorithm>
 #include <cstdlib>
+#include <cstring>
+#include <filesystem>
 #include <fstream>
+#include <regex>
 #include <sstream>
 #include <stdexcept>
 
@@ -63,7 +67,8 @@ HttpAnswer parseAnswer(const std::string& bytes)
 
 void appendCanonical(std::string& out, const XmlElement& element, int depth, Order order);
 
-// The text of a VALUE; an embedded instance is taken apart where order is ignored, since that holds inside it too.
+// The text of a VALUE; an embedded instance is taken apart where order is
+// ignored, since that holds inside it too.
 std::string canonicalText(std::string text, int depth, Order order)
 {
     if (order == Order::kAsSent || text.rfind("<INSTANCE ", 0) != 0) {
@@ -126,15 +131,63 @@ std::string canonicalBody(std::string body, Order order)
     return out;
 }
 
-std::string recordingsFolder()
+std::string firstMatch(const std::string& text, const std::string& pattern)
 {
-    return std::string(VECTORS_DIRECTORY).empty() ? "" : std::string(VECTORS_DIRECTORY) + "/wire/";
+    std::smatch match;
+    return std::regex_search(text, match, std::regex(pattern)) ? match[1].str() : std::string();
 }
 
-RecordedExchange::RecordedExchange(const std::string& name)
-    : request(contentOf(recordingsFolder() + name + "/request.http")),
-      answer(parseAnswer(contentOf(recordingsFolder() + name + "/response.http")))
+RecordedExchange::RecordedExchange(const std::string& folder)
+    : name(std::filesystem::path(folder).filename()), request(contentOf(folder + "/request.http")),
+      answer(parseAnswer(contentOf(folder + "/response.http"))), note(contentOf(folder + "/note.md"))
 {
+    isRaw = note.find("(no client)") != std::string::npos;
+    const std::string head = request.substr(0, request.find("\r\n\r\n"));
+    method = firstMatch(head, "CIMMethod: *([^\r]*)");
+    nameSpace = Pegasus::base::percentDecoded(firstMatch(head, "CIMObject: *([^\r]*)"));
+    nameSpace.erase(std::min(nameSpace.find(':'), nameSpace.size()));
+    className = firstMatch(request.substr(head.size()), "(?:<INSTANCENAME CLASSNAME|<CLASSNAME NAME)=\"(\\w+)\"");
+    const std::size_t middle = note.find("; message ");
+    if (middle != std::string::npos) {
+        session = note.substr(0, middle);
+        message = std::atoi(note.c_str() + middle + std::strlen("; message "));
+    }
+}
+
+bool RecordedExchange::hasParameter(const std::string& parameter) const
+{
+    return request.find("<IPARAMVALUE NAME=\"" + parameter + "\"") != std::string::npos;
+}
+
+bool RecordedExchange::flag(const std::string& parameter, bool ifMissing) const
+{
+    const std::size_t at = request.find("<IPARAMVALUE NAME=\"" + parameter + "\">");
+    return at == std::string::npos ? ifMissing : request.compare(request.find("<VALUE>", at), 11, "<VALUE>TRUE") == 0;
+}
+
+int RecordedExchange::status() const
+{
+    const auto code = answer.trailers.find("cimstatuscode");
+    return code == answer.trailers.end() ? 0 : std::atoi(code->second.c_str());
+}
+
+const std::vector<RecordedExchange>& recordings()
+{
+    static const std::vector<RecordedExchange> kAll = [] {
+        std::vector<RecordedExchange> all;
+        const std::string folder = test::vectorsFolder(VECTORS_DIRECTORY);
+        if (folder.empty()) {
+            return all;
+        }
+        for (const auto& entry : std::filesystem::directory_iterator(folder + "/wire")) {
+            if (entry.is_directory() && contentOf(entry.path() / "note.md").rfind("FABRICATED", 0) != 0) {
+                all.emplace_back(entry.path());
+            }
+        }
+        std::sort(all.begin(), all.end(), [](const auto& x, const auto& y) { return x.name < y.name; });
+        return all;
+    }();
+    return kAll;
 }
 
 std::vector<std::string> elementsOf(const std::string& body, const std::string& element)
