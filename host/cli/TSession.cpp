@@ -9,6 +9,8 @@
 
 #include <boost/make_shared.hpp>
 
+#include <cstdlib>
+
 namespace vrxhost {
 
 using namespace NKOLVRX20;
@@ -22,6 +24,28 @@ TCIMValue AddressOf(const boost::shared_ptr<ICIMNamespace>& ns)
 {
     return TCIMValue(static_cast<unsigned long>(reinterpret_cast<std::uintptr_t>(&ns)));
 }
+
+// While it lives, a plug-in that ends the process is reported. It does so, silently, when no port is free
+// (INamespaceProvider.h), and exit handlers are all that runs then.
+class TExitReport
+{
+  public:
+    TExitReport()
+    {
+        static const int fgRegistered = std::atexit([] {
+            if (fgActive) {
+                ReportError("the plug-in ended the process: no TCP port from 65535 down to 1024 is free on 127.0.0.1");
+            }
+        });
+        fgActive = fgRegistered == 0;
+    }
+    ~TExitReport() { fgActive = false; }
+    TExitReport(const TExitReport&) = delete;
+    TExitReport& operator=(const TExitReport&) = delete;
+
+  private:
+    static inline bool fgActive = false;
+};
 
 } // namespace
 
@@ -56,6 +80,7 @@ void TSession::Open()
 
 void TSession::Allocate()
 {
+    const TExitReport exitReport;
     TCIMContext context;
     context["repository"] = AddressOf(fRepository);
     context["upcall"] = AddressOf(fUpcall);

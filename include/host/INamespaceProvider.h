@@ -45,7 +45,8 @@ class INamespaceProvider
     //   25  a *.classes.xml names a class by an invalid CIM name
     //   42  no connection
     // Pegasus::UninitializedObjectException as ICIMNamespace::GetClass; boost::thread_resource_error.
-    // Ends the process with exit(1) when no TCP port from 65535 down to 1024 can be bound on 127.0.0.1.
+    // Ends the process with exit(1), and leaves the log as it is, when no TCP port from 65535 down to 1024 can be bound
+    // on 127.0.0.1. A host that wants to report that needs an exit handler.
     // Blocks: at least 4 seconds for each start attempt, then as long as the programs run (the process service is given
     // 32767 seconds each), and 5 seconds for each request to a silent server.
     virtual boost::shared_ptr<ICIMNamespace> AllocateNamespace(TCIMContext context, bool create,

@@ -12,6 +12,8 @@ namespace NKOLVRX20 {
 
 namespace {
 
+constexpr mode_t kPublicMode = S_IRUSR | S_IWUSR | S_IRGRP | S_IROTH;
+
 struct TDirectoryCloser
 {
     void operator()(DIR* directory) const { static_cast<void>(::closedir(directory)); }
@@ -21,6 +23,12 @@ bool HasFileType(const std::string& path, mode_t type)
 {
     struct stat status = {};
     return ::stat(path.c_str(), &status) == 0 && (status.st_mode & S_IFMT) == type;
+}
+
+bool IsRegular(int descriptor)
+{
+    struct stat status = {};
+    return ::fstat(descriptor, &status) == 0 && S_ISREG(status.st_mode);
 }
 
 // Returns: why the opened file is refused; null when it may be read.
@@ -91,6 +99,23 @@ TFile OpenOwnFile(const std::string& path, std::string& reason)
         static_cast<void>(::close(descriptor));
     }
     return file;
+}
+
+bool WritePublicFile(const std::string& path, const std::string& content)
+{
+    const int descriptor = ::open(
+        path.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY | O_CLOEXEC, kPublicMode);
+    if (descriptor == -1) {
+        return false;
+    }
+    const TFile file(IsRegular(descriptor) ? ::fdopen(descriptor, "w") : nullptr);
+    if (!file) {
+        static_cast<void>(::close(descriptor));
+        return false;
+    }
+    // The umask has changed the mode of a new file. Where the mode belongs to another user, the content still counts.
+    static_cast<void>(::fchmod(descriptor, kPublicMode));
+    return std::fwrite(content.data(), 1, content.size(), file.get()) == content.size() && std::fflush(file.get()) == 0;
 }
 
 } // namespace NKOLVRX20

@@ -32,4 +32,10 @@ TFile OpenRegularFile(const std::string& path);
 // Blocks: never, whatever lies there.
 TFile OpenOwnFile(const std::string& path, std::string& reason);
 
+// Writes a file that every user may read: mode 0644 whatever the process's umask is. The content of a regular file is
+// replaced; a symbolic link and anything else is left alone.
+// Returns: false when opening or writing it fails, or it is left alone.
+// Blocks: never, whatever lies there.
+bool WritePublicFile(const std::string& path, const std::string& content);
+
 } // namespace NKOLVRX20

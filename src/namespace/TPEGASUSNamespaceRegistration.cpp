@@ -2,6 +2,7 @@
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/common/Files.h"
+#include "src/common/Timeouts.h"
 #include "src/namespace/NamespaceConstants.h"
 #include "src/namespace/ProviderThreads.h"
 #include "src/namespace/TPEGASUSNamespace.h"
@@ -134,10 +135,14 @@ boost::shared_ptr<ICIMClass> TPEGASUSNamespace::CollectClass(const std::string& 
 {
     std::map<std::string, std::string> tags = {{kTimeOutTag, provider->GetDefaultTimeoutVal()}};
     const std::string name = filterTag4classes(entry, tags);
-    const std::string& timeout = tags[kTimeOutTag];
     // Both the file and the entry may leave the timeout out, and 0 seconds would make every call fail.
-    const TCIMContext context = {{kNspKey, provider->GetServerNamespace()},
-                                 {kTimeoutKey, timeout.empty() ? strTimeout : timeout}};
+    const std::string timeout = tags[kTimeOutTag].empty() ? strTimeout : tags[kTimeOutTag];
+    if (!IsPlainTimeout(timeout)) {
+        LogProgress("TPEGASUSNamespace::CollectClass: the timeout of class ", name, " in ", provider->GetPath(),
+                    " is not a number of seconds up to 4294967: \"", timeout, "\" becomes ",
+                    MillisecondsFromText(timeout), " ms");
+    }
+    const TCIMContext context = {{kNspKey, provider->GetServerNamespace()}, {kTimeoutKey, timeout}};
     const auto requestedClass = boost::dynamic_pointer_cast<TPEGASUSClass>(GetClass(name, context));
     if (requestedClass) {
         if (tags[kTag] == kCdmTag) {

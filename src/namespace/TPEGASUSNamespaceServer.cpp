@@ -37,7 +37,7 @@ unsigned short TPEGASUSNamespace::getAvailablePort()
             return port;
         }
     }
-    std::exit(1); // hosts rely on the end of the process here
+    std::exit(1); // hosts rely on the end of the process here, and on a log without a line of it
 }
 
 // The directories are relative to PEGASUS_HOME. The colon after the last one belongs to the form.

@@ -2,6 +2,7 @@
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/common/Directories.h"
+#include "src/common/Files.h"
 #include "src/namespace/NamespaceConstants.h"
 #include "src/namespace/Removal.h"
 #include "src/namespace/TPEGASUSNamespace.h"
@@ -9,8 +10,6 @@
 
 #include <host/TOSSpecific.h>
 #include <host/TVRXException.h>
-
-#include <fstream>
 
 #include <unistd.h>
 
@@ -158,10 +157,7 @@ void TPEGASUSNamespace::preConfig()
 void TPEGASUSNamespace::WriteLsiConfiguration() const
 {
     const std::string directory = fTree.LsiDirectory();
-    std::ofstream file(kLsiConfiguration, std::ios::trunc);
-    if (file) {
-        file << "DATA_DIR=" << directory << "\nLIBRARY_DIR=" << directory;
-    }
+    WritePublicFile(kLsiConfiguration, "DATA_DIR=" + directory + "\nLIBRARY_DIR=" + directory);
 }
 
 } // namespace NKOLVRX20

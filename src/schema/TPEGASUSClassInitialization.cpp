@@ -1,26 +1,11 @@
 // How a new class gets its settings and its declarations from the server.
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
+#include "src/common/Timeouts.h"
 #include "src/schema/ClassMirror.h"
 #include "src/schema/TPEGASUSClass.h"
 
-#include <cstdlib>
-
 namespace NKOLVRX20 {
-
-namespace {
-
-constexpr int kDecimal = 10; // the radix of strtol
-constexpr unsigned long kMsPerSecond = 1000;
-
-// Wraps at 32 bits; a text that lacks a leading number gives 0.
-unsigned int MillisecondsFromText(const std::string& seconds)
-{
-    const auto number = static_cast<unsigned long>(std::strtol(seconds.c_str(), nullptr, kDecimal));
-    return static_cast<unsigned int>(number * kMsPerSecond);
-}
-
-} // namespace
 
 void TPEGASUSClass::Initialize(const std::string& cimNamespace, const std::string& timeout,
                                const boost::shared_ptr<TPEGASUSClass>& superClass)

@@ -268,6 +268,9 @@ boost::shared_ptr<ICIMNamespace> TPEGASUSNamespaceProvider::AllocateNamespace(TC
 {
     fNamespace = boost::make_shared<TFakeNamespace>();
     MeetForeignServers();
+    if (HasFault("exits")) {
+        std::exit(1);
+    }
     if (HasFault("throws-standard")) {
         throw std::runtime_error("out of luck");
     }

@@ -151,6 +151,13 @@ TEST_F(VrxhostProgram, WhatThePluginPrintsDoesNotReachTheDocument)
     EXPECT_EQ(outcome.fErrorOutput, "printed by the plug-in\n");
 }
 
+TEST_F(VrxhostProgram, APluginThatEndsTheProcessIsReported)
+{
+    const auto outcome = Run({"providers"}, "exits");
+    EXPECT_TRUE(HasStatus(outcome, 1));
+    EXPECT_THAT(outcome.fErrorOutput, HasSubstr("vrxhost: the plug-in ended the process: no TCP port"));
+}
+
 TEST_F(VrxhostProgram, ProvidersOfSeveralThreadsAreAllListed)
 {
     const auto json = nlohmann::json::parse(Run({"providers", "--format", "json"}, "threads").fOutput);

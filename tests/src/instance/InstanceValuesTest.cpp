@@ -45,9 +45,11 @@ TEST_F(InstanceValuesTest, ASlotsNumberIsAlways16BitsWide)
     const auto target = Serve("OMC_ProcessorSlot", {slot("Number", CIMValue(Pegasus::Uint32(70000))),
                                                     slot("Number", CIMValue(Pegasus::Uint8(3))),
                                                     slot("number", CIMValue(Pegasus::Uint32(70000))),
-                                                    slot("Number", CIMValue(Pegasus::CIMTYPE_UINT32, false))});
+                                                    slot("Number", CIMValue(Pegasus::CIMTYPE_UINT32, false)),
+                                                    slot("NumberOfPins", CIMValue(Pegasus::Uint32(70000)))});
     const auto instances = Enumerate(*target);
-    ASSERT_EQ(4U, instances.size());
+    ASSERT_EQ(5U, instances.size());
+    EXPECT_EQ(TCIMValue(70000U), ValueOf(*instances[4], "NumberOfPins"));
     EXPECT_EQ(TCIMValue(static_cast<unsigned short>(4464)), ValueOf(*instances[0], "Number"));
     EXPECT_EQ(TCIMValue(static_cast<unsigned short>(3)), ValueOf(*instances[1], "Number"));
     EXPECT_EQ(TCIMValue(70000U), ValueOf(*instances[2], "Number"));
@@ -92,13 +94,18 @@ TEST_F(InstanceValuesTest, AReferenceKnowsItsClassWhenThePathSpellsItOut)
     }
 }
 
-TEST_F(InstanceValuesTest, AReferenceToAClassWithABadNameKeepsItsValue)
+TEST_F(InstanceValuesTest, WhatFailsInOnePropertyCostsThatOneAndABadClassNameNotEvenThat)
 {
     const auto target = Serve("CIM_L", {});
+    fServed.fModel.addFault("GetClass", [](const test::PeerRequest& request) { // asked for before the instances
+        return test::classAnswer(request, Pegasus::CIMClass(CIMName("CIM_L")));
+    });
+    fServed.fModel.addFault("GetClass", [](const test::PeerRequest&) { return test::notHttp(); }); // of "Silent"
     fServed.fModel.addFault("EnumerateInstances", [&](const test::PeerRequest& request) {
         return test::instancesAnswer(
-            request, {Instance("CIM_L", "CIM_L.Antecedent=\"a:1b.c\"",
+            request, {Instance("CIM_L", "CIM_L.Antecedent=\"a:1b.c\",Silent=\"a:CIM_Y.K\"",
                                {Property("Antecedent", CIMObjectPath("CIM_Y.Key=\"1\"")),
+                                Property("Silent", CIMObjectPath("CIM_Y.Key=\"1\"")),
                                 Property("Gr\xC3\xB6n", CIMValue(true)), Property("Other", CIMValue(true))})});
     });
     const auto instances = Enumerate(*target);
@@ -108,7 +115,7 @@ TEST_F(InstanceValuesTest, AReferenceToAClassWithABadNameKeepsItsValue)
     EXPECT_FALSE(kept.GetReferencedClass());
     EXPECT_EQ(TCIMValue(true), ValueOf(*instances[0], "Other"));
     const std::string line = "3|4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: ";
-    EXPECT_THAT(fServed.fRig.fLog.LinesWith("3|4"), ElementsAre(line + "Gr\xC3\xB6n"));
+    EXPECT_THAT(fServed.fRig.fLog.LinesWith("3|4"), ElementsAre(line + "silent", line + "Gr\xC3\xB6n"));
     EXPECT_THAT(fServed.fRig.fLog.LinesWith("3|TPEGASUSClass::EnumerateInstances keeps"),
                 ElementsAre("3|TPEGASUSClass::EnumerateInstances keeps reference property Antecedent of CIM_L without "
                             "its class: \"1b\" is not a class name"));

@@ -97,14 +97,24 @@ TEST_F(MethodTest, AnInstanceSendsEveryParameterAsAReferenceOncePerDirection)
 
 TEST_F(MethodTest, OutputsReplaceWhatIsThereInBothRoutes)
 {
+    Pegasus::Array<Pegasus::Uint8> bytes;
+    bytes.append(9);
     fOutputs = {Pegasus::CIMParamValue("Both", CIMValue(Pegasus::Uint16(2))),
-                Pegasus::CIMParamValue("New", CIMValue(Pegasus::String("n")))};
+                Pegasus::CIMParamValue("List", CIMValue(bytes)),
+                Pegasus::CIMParamValue("New", CIMValue(Pegasus::String("n"))),
+                Pegasus::CIMParamValue("Peer", CIMValue(Pegasus::CIMObjectPath("CIM_Y.Key=\"9\"")))};
     TCIMContext parameters = {{"Both", TCIMValue(std::string("CIM_Y.Key=\"9\""))}};
     fInstance->InvokeMethod("Go", parameters, {});
-    const TCIMContext expected = {{"Both", TCIMValue(static_cast<unsigned short>(2))},
-                                  {"New", TCIMValue(std::string("n"))}};
+    TCIMReference peer = ReferenceTo("CIM_Y.Key=\"9\"");
+    peer.SetNamespace(fServed.fNamespace);
+    const TCIMContext expected = {
+        {"Both", TCIMValue(static_cast<unsigned short>(2))},
+        {"List", TCIMValue(TCIMValue::TCIMType::kUint8, 0, {TCIMValue(static_cast<unsigned char>(9))})},
+        {"New", TCIMValue(std::string("n"))},
+        {"Peer", TCIMValue(peer)}};
     EXPECT_EQ(expected, parameters);
-    EXPECT_THAT(fServed.Log(), ElementsAre("3|adding output param : Both", "3|adding output param : New"));
+    const std::string adding = "3|adding output param : ";
+    EXPECT_THAT(fServed.Log(), ElementsAre(adding + "Both", adding + "List", adding + "New", adding + "Peer"));
 
     TCIMReference target = ReferenceTo("CIM_A.K=\"1\"");
     TCIMContext outputs = {{"Both", TCIMValue(1)}};

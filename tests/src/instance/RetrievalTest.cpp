@@ -60,6 +60,7 @@ TEST_F(RetrievalTest, TheRequestSaysWhatTheCallerWants)
     EXPECT_EQ(deepAt, shallow.find("DeepInheritance\">\n<VALUE>FALSE"));
     EXPECT_THAT(bodyOf(true), ::testing::Not(HasSubstr("DeepInheritance\">\n<VALUE>FALSE")));
     EXPECT_THAT(shallow, ::testing::Not(HasSubstr("LocalOnly\">\n<VALUE>FALSE")));
+    EXPECT_THAT(shallow, ::testing::Not(HasSubstr("<VALUE>TRUE"))); // what is left out is false
     EXPECT_THAT(shallow, ::testing::Not(HasSubstr("PropertyList")));
 }
 
@@ -112,6 +113,30 @@ TEST_F(RetrievalTest, AProvidersClassIsAskedInTheProvidersNamespaceOnItsOwnConne
     EXPECT_EQ("root/cimv2", fServed.fPeer.requests().back().object());
     target->GetInstanceWithNsp(ReferenceTo("x"), {});
     EXPECT_EQ("root/vendor", fServed.fPeer.requests().back().object());
+}
+
+TEST_F(RetrievalTest, AClassOfAnotherServerNamespaceIsServedFromThereInEverything)
+{
+    const std::string path = "V.Peer=\"root/vendor:V_Peer.K=1\"";
+    fServed.fModel.addClass("root/vendor", Pegasus::CIMClass(CIMName("V")))
+        .addClass("root/vendor", Pegasus::CIMClass(CIMName("V_Peer")))
+        .addInstance("root/vendor", Instance("V", path, {Property("Peer", CIMObjectPath("V_Peer.K=1"))}))
+        .addMethod("Go", [](const test::PeerRequest& request) { return test::methodAnswer(request, CIMValue(true)); });
+    const auto lastNamespace = [&] { return fServed.fPeer.requests().back().object(); };
+    const auto found = fServed.fNamespace->GetInstance(ReferenceTo(path), {{"nsp", "root/vendor"}, {"timeout", "9"}});
+    EXPECT_TRUE(found);
+    EXPECT_EQ("root/vendor", lastNamespace());
+    const auto target = fServed.Class("V"); // from the cache
+    EXPECT_EQ(9000U, target->GetDefaultTimeoutMs());
+    const auto instances = Enumerate(*target);
+    ASSERT_EQ(1U, instances.size());
+    const auto peer = ValueOf(*instances[0], "Peer").GetReferencedClass();
+    EXPECT_EQ("V_Peer", peer ? peer->GetName({}) : "none");
+    TCIMContext none;
+    EXPECT_EQ(TCIMValue(true), instances[0]->InvokeMethod("Go", none, {}));
+    EXPECT_EQ(0U, lastNamespace().find("root/vendor"));
+    EXPECT_EQ(TCIMValue(true), target->InvokeMethod(ReferenceTo("V.K=1"), "Go", {}, none, {}));
+    EXPECT_EQ(0U, lastNamespace().find("root/vendor"));
 }
 
 TEST_F(RetrievalTest, TheRecordClassLogsWhatItJoins)

@@ -170,11 +170,8 @@ TEST_F(ConnectionTest, SucceedsAtWhicheverAttemptTheServerAppears)
             ns->Initialize(fRig.Context());
             EXPECT_TRUE(ns->isConnected());
             EXPECT_EQ(attempt, starts);
-            EXPECT_EQ(static_cast<std::size_t>(attempt - 1),
-                      fRig.fLog.LinesWith("0|TPEGASUSNamespace::connect failed: ").size());
             EXPECT_EQ(static_cast<std::size_t>(3 * (attempt - 1) + failedTries),
                       fRig.fLog.LinesWith("3|TPEGASUSNamespace::connect failed: ").size());
-            EXPECT_EQ(1U, fRig.fLog.LinesWith("3|TPEGASUSNamespace::connect succeeded ").size());
             fRig.fWorld.fOnSleep = nullptr;
             fRig.fWorld.fRun = nullptr;
         }
@@ -185,7 +182,13 @@ TEST_F(ConnectionTest, ACompleteStartRunsItsStepsInOrder)
 {
     fRig.OfferPortOf(fServer);
     fServer.Listen();
-    fRig.MakeNamespace()->Initialize(fRig.Context());
+    auto ns = fRig.MakeNamespace();
+    fRig.fWorld.fRun = [&](const TSpawnCall& call, std::string&) {
+        EXPECT_TRUE(call.fName != "cimmof" || ns->GetRootClass()); // the root class comes first
+    };
+    ns->Initialize(fRig.Context());
+    ns.reset();
+    fRig.fWorld.fRun = nullptr;
     const std::vector<std::string> wipe = {"system " + RemovalOf("R/pegasus/repository"),
                                            "system " + RemovalOf("R/pegasus/provider/lsi_mir/repository.xml")};
     const std::vector<std::string> kill = {"sleep 3", "system " + RemovalOf("START", "-f")};

@@ -12,6 +12,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <cstring>
+
 namespace NKOLVRX20 {
 namespace {
 
@@ -110,6 +112,24 @@ TEST_F(DelegateTest, OnlyAnUnsigned64BitAddressCounts)
         EXPECT_EQ(31U, StatusOf([&] { ns->DeleteInstance({}, {}); }));
         EXPECT_THROW(ns->GetUpcallNamespace(), boost::bad_weak_ptr);
     }
+}
+
+// In the Itanium C++ ABI a pointer to a virtual member function begins with 1 plus the byte offset of its slot.
+template <typename TFunction> std::size_t SlotOf(TFunction function)
+{
+    std::size_t pointer = 0;
+    std::memcpy(&pointer, &function, sizeof pointer);
+    return (pointer - 1) / sizeof(void*);
+}
+
+TEST(NamespaceSlotsTest, TheTwoOfItsOwnFollowTheInterface)
+{
+    using TOwn = TPEGASUSNamespace;
+    using TAllocateClass = boost::shared_ptr<ICIMClass> (TOwn::*)(
+        const std::string&, const std::string&, const std::string&, boost::shared_ptr<ICIMClass>, TCIMContext&);
+    const std::size_t last = SlotOf(&ICIMNamespace::ClearInstances);
+    EXPECT_EQ(last + 1, SlotOf(static_cast<TAllocateClass>(&TOwn::AllocateClass)));
+    EXPECT_EQ(last + 2, SlotOf(static_cast<ICIMNamespace& (TOwn::*)(const ICIMNamespace&)>(&TOwn::operator=)));
 }
 
 } // namespace

@@ -56,11 +56,14 @@ TEST_F(DiscoveryTest, FindsClassFilesOneDirectoryDeepInByteOrder)
     fRig.WriteProvider("broadcom", "a.properties.mof", "");
     fRig.WriteProvider("broadcom/deeper", "a.classes.xml", "");
     fRig.fModule.Write("pegasus/provider/stray.classes.xml", "");
-    ASSERT_EQ(0, ::symlink("nowhere", (fRig.M() + "/pegasus/provider/dangling").c_str()));
+    const std::string providers = fRig.M() + "/pegasus/provider";
+    ASSERT_EQ(0, ::symlink("nowhere", (providers + "/dangling").c_str()));
+    ASSERT_EQ(0, ::symlink("Zeta", (providers + "/linked").c_str()));
+    const std::string directory = fRig.fModule.MakeDirectory("pegasus/provider/broadcom/dir.classes.xml");
     const auto ns = fRig.MakeNamespace();
-    EXPECT_THAT(ns->FindXmlFiles(fRig.M() + "/pegasus/provider", ".classes.xml"),
-                ElementsAre(upper, broadcom, backup, mellanox));
-    EXPECT_THAT(ns->FindSubDirs(fRig.M() + "/pegasus/provider"), UnorderedElementsAre("mellanox", "broadcom", "Zeta"));
+    EXPECT_THAT(ns->FindXmlFiles(providers, ".classes.xml"),
+                ElementsAre(upper, broadcom, backup, directory, providers + "/linked/z.classes.xml", mellanox));
+    EXPECT_THAT(ns->FindSubDirs(providers), UnorderedElementsAre("mellanox", "broadcom", "Zeta", "linked"));
     EXPECT_EQ(11U, StatusOf([&] { ns->FindXmlFiles(fRig.M() + "/none", ".classes.xml"); }));
 }
 
@@ -162,6 +165,9 @@ TEST_F(DiscoveryTest, ATooLargeFileCostsItsOwnProviderOnly)
     EXPECT_THAT(
         fRig.fLog.LinesWith("3|TPEGASUSNamespace::P"),
         ElementsAre("3|TPEGASUSNamespace::Prefilter: 2 providers.", "3|TPEGASUSNamespace::Postfilter: 2 providers."));
+    fRig.fLog.FailOn("Loading... "); // an exception of another family costs the whole search
+    EXPECT_THROW(ns->FindProviders(), std::runtime_error);
+    fRig.fLog.FailOn("");
 }
 
 TEST_F(DiscoveryTest, SplitsARequestedEntry)

@@ -158,6 +158,10 @@ TEST_F(LifetimeTest, WhatTheHostStillHoldsNeitherDelaysTheEndNorReachesIntoIt)
     ASSERT_EQ(fClass, peer.GetReferencedClass());
     const auto decl = fClass->GetPropertyDecl("Id", {});
     const auto keptClass = fClass;
+    auto entered = fClass->AllocateInstance({});
+    entered->AddToNamespace({});
+    const boost::weak_ptr<ICIMInstance> watched = entered;
+    entered.reset();
     const auto keptProvider = fProvider;
     boost::weak_ptr<ICIMClass> other = fNamespace->GetClass("ACME_Two", {});
     fRig.fWorld.Take();
@@ -167,6 +171,7 @@ TEST_F(LifetimeTest, WhatTheHostStillHoldsNeitherDelaysTheEndNorReachesIntoIt)
                             "system " + RemovalOf("R/pegasus/repository"),
                             "system " + RemovalOf("R/pegasus/provider/lsi_mir/repository.xml")));
 
+    EXPECT_TRUE(watched.expired());
     EXPECT_TRUE(other.expired()); // nobody holds it: no class keeps another
     EXPECT_EQ("acme", keptProvider->GetName({}));
     int visits = 0;

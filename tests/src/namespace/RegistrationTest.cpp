@@ -14,7 +14,8 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <atomic>
+#include <chrono>
+#include <condition_variable>
 #include <mutex>
 #include <stdexcept>
 #include <thread>
@@ -65,21 +66,6 @@ class RegistrationTest : public ::testing::Test
     TFakeCimServer fServer;
     TNamespaceRig fRig;
 };
-
-TEST_F(RegistrationTest, WithoutProvidersOnlyTheMilestonesAreLogged)
-{
-    for (const char* setting : {"", "on"}) {
-        SCOPED_TRACE(setting);
-        TConfig::GetInstance()->setValue("pegasus_multi_thread", setting);
-        const auto ns = fRig.MakeConnectedNamespace(fServer);
-        ns->FindProviders();
-        ns->undoProvidersSetup();
-        EXPECT_THAT(fRig.fLog.Lines(),
-                    ElementsAre("3|TPEGASUSNamespace::Prefilter: 0 providers.",
-                                "3|TPEGASUSNamespace::Postfilter: 0 providers.", "3|before reg...", "3|after reg..."));
-        EXPECT_THAT(fRig.fWorld.Trace(), IsEmpty());
-    }
-}
 
 TEST_F(RegistrationTest, CompilesDefinitionsBeforeRegistrationsThenCollectsAndConnects)
 {
@@ -147,7 +133,7 @@ TEST_F(RegistrationTest, AVendorsFilesOfOneKindAreCompiledByTheirNames)
     EXPECT_EQ(trace, traced);
 }
 
-TEST_F(RegistrationTest, AFileWithoutTimeoutOrNamespaceGetsTheDefaults)
+TEST_F(RegistrationTest, AFilesTimeoutsAndNamespaceHaveDefaultsAndOddTimeoutsANote)
 {
     struct
     {
@@ -156,6 +142,7 @@ TEST_F(RegistrationTest, AFileWithoutTimeoutOrNamespaceGetsTheDefaults)
         const char* fEntry;
         unsigned int fTimeoutMs;
         std::string fNamespace;
+        const char* fOddText = nullptr;
     } const rows[] = {
         {"both given", "<nsp name='root/acme'/><timeout value='30'/>", "ACME_One", 30000, "root/acme"},
         {"neither", "", "ACME_One", 60000, "root/cimv2"},
@@ -163,16 +150,29 @@ TEST_F(RegistrationTest, AFileWithoutTimeoutOrNamespaceGetsTheDefaults)
         {"an empty bracket", "<timeout value='30'/>", "ACME_One[]", 60000, "root/cimv2"},
         {"an explicit 0", "<timeout value='0'/>", "ACME_One", 0, "root/cimv2"},
         {"a bracket with 0", "<timeout value='30'/>", "ACME_One[0]", 0, "root/cimv2"},
+        {"the longest", "", "ACME_One[4294967]", 4294967000, "root/cimv2"},
+        {"one that wraps", "", "ACME_One[4294968]", 704, "root/cimv2", "4294968"},
+        {"a negative one", "<timeout value='-1'/>", "ACME_One", 4294966296, "root/cimv2", "-1"},
+        {"beyond all numbers", "", "ACME_One[99999999999999999999]", 4294966296, "root/cimv2", "99999999999999999999"},
+        {"a unit", "", "ACME_One[5s]", 5000, "root/cimv2", "5s"},
+        {"a word", "", "ACME_One[soon]", 0, "root/cimv2", "soon"},
     };
     fServer.AnswerClass("ACME_One", "");
     fServer.Answer("EnumerateInstances ACME_One", "");
     fRig.WriteProvider("acme", "a.properties.mof", "");
     for (const auto& row : rows) {
         SCOPED_TRACE(row.fName);
-        fRig.WriteProvider("acme", "a.classes.xml",
-                           std::string("<vrx>") + row.fElements + "<class name='" + row.fEntry + "'/></vrx>");
+        const std::string path = fRig.WriteProvider(
+            "acme", "a.classes.xml", std::string("<vrx>") + row.fElements + "<class name='" + row.fEntry + "'/></vrx>");
         const auto ns = fRig.MakeConnectedNamespace(fServer);
         ns->FindProviders();
+        std::vector<std::string> notes;
+        if (row.fOddText) {
+            notes.push_back("3|TPEGASUSNamespace::CollectClass: the timeout of class ACME_One in " + path +
+                            " is not a number of seconds up to 4294967: \"" + row.fOddText + "\" becomes " +
+                            std::to_string(row.fTimeoutMs) + " ms");
+        }
+        EXPECT_EQ(notes, fRig.fLog.LinesWith("3|TPEGASUSNamespace::CollectClass"));
         EXPECT_EQ("run cimmof -n " + row.fNamespace + " -aE M/pegasus/provider/acme/a.properties.mof",
                   fRig.Abbreviate(fRig.fWorld.Take().front()));
         const auto collected = boost::dynamic_pointer_cast<TPEGASUSClass>(ns->GetClass("ACME_One", {}));
@@ -183,18 +183,19 @@ TEST_F(RegistrationTest, AFileWithoutTimeoutOrNamespaceGetsTheDefaults)
     }
 }
 
-TEST_F(RegistrationTest, UnknownClassesAreLeftOutAndTheNextFollow)
+TEST_F(RegistrationTest, UnknownClassesAreLeftOutAndTheLastProviderOfAClassServesIt)
 {
     AddProvider("acme", {"ACME_One", "ACME_None", "ACME_Two"});
+    AddProvider("beta", {"ACME_Two"});
     fServer.AnswerClass("ACME_One", "");
     fServer.AnswerClass("ACME_Two", "");
     const auto ns = fRig.MakeConnectedNamespace(fServer);
     ns->FindProviders();
     EXPECT_THAT(Offered(*ns->GetProvidersContainer().front()), ElementsAre("ACME_One", "ACME_Two"));
-    EXPECT_THAT(fRig.fLog.LinesWith("3|TPEGASUSNamespace::Getting class: "),
-                ElementsAre("3|TPEGASUSNamespace::Getting class: ACME_One from Pegasus CIMOM",
-                            "3|TPEGASUSNamespace::Getting class: ACME_None from Pegasus CIMOM",
-                            "3|TPEGASUSNamespace::Getting class: ACME_Two from Pegasus CIMOM"));
+    EXPECT_THAT(fRig.fLog.LinesWith("3|TPEGASUSNamespace::Getting class: ACME_None"),
+                ElementsAre("3|TPEGASUSNamespace::Getting class: ACME_None from Pegasus CIMOM"));
+    const auto twice = boost::dynamic_pointer_cast<TPEGASUSClass>(ns->GetClass("ACME_Two", {}));
+    EXPECT_EQ("beta", twice->GetProvider()->GetName({}));
 }
 
 TEST_F(RegistrationTest, ABadRequestedNameEndsTheRegistrationOfAllThatFollow)
@@ -210,8 +211,13 @@ TEST_F(RegistrationTest, ABadRequestedNameEndsTheRegistrationOfAllThatFollow)
 
 TEST_F(RegistrationTest, AProviderThatCannotConnectEndsTheRegistration)
 {
-    AddProvider("acme", {});
+    AddProvider("acme", {"ACME_One"});
+    fServer.AnswerClass("ACME_One", "");
     const auto ns = fRig.MakeConnectedNamespace(fServer);
+    fRig.fLog.FailOn("TPEGASUSProvider::connect enter");
+    EXPECT_THROW(ns->FindProviders(), std::runtime_error);
+    EXPECT_THAT(Offered(*ns->GetProvidersContainer().front()), ElementsAre("ACME_One")); // it has its classes by then
+    fRig.fLog.FailOn("");
     fServer.Refuse();
     EXPECT_EQ(42U, StatusOf([&] { ns->FindProviders(); }));
     EXPECT_EQ(3U, fRig.fLog.LinesWith("3|TPEGASUSProvider::connect failed: ").size());
@@ -262,14 +268,21 @@ TEST_F(RegistrationTest, AHostExceptionCostsOnlyItsClass)
 
 // --- threads ---
 
+constexpr std::chrono::seconds kDeadline(20);
+
 class ThreadedRegistrationTest : public RegistrationTest
 {
   protected:
     ThreadedRegistrationTest()
     {
-        for (const char* vendor : {"acme", "beta", "gamma"}) {
-            AddProvider(vendor, {});
+        for (const std::string vendor : {"acme", "beta", "delta", "gamma"}) {
+            const std::string name = vendor + "_Disk";
+            AddProvider(vendor, {name});
             fRig.WriteProvider(vendor, "a.properties.mof", "");
+            fServer.AnswerClass(name, "");
+            fServer.Answer("EnumerateInstances " + name, "<VALUE.NAMEDINSTANCE><INSTANCENAME CLASSNAME=\"" + name +
+                                                             "\"/><INSTANCE CLASSNAME=\"" + name +
+                                                             "\"/></VALUE.NAMEDINSTANCE>");
         }
     }
 
@@ -281,7 +294,7 @@ class ThreadedRegistrationTest : public RegistrationTest
     }
 };
 
-TEST_F(ThreadedRegistrationTest, OnlyTheExactSettingStartsThreads)
+TEST_F(ThreadedRegistrationTest, OnlyTheExactSettingStartsThreadsOnWhichVisitorsCollect)
 {
     struct
     {
@@ -292,27 +305,45 @@ TEST_F(ThreadedRegistrationTest, OnlyTheExactSettingStartsThreads)
         SCOPED_TRACE(row.fSetting);
         SetThreads(row.fSetting);
         const auto ns = fRig.MakeConnectedNamespace(fServer);
-        std::atomic<int> foreignThreads{0};
+        std::mutex mutex;
+        std::condition_variable arrival;
+        int foreignThreads = 0;
         fRig.fWorld.fRun = [&, self = std::this_thread::get_id()](const TSpawnCall&, std::string&) {
+            std::unique_lock<std::mutex> lock(mutex);
             foreignThreads += std::this_thread::get_id() != self;
+            arrival.notify_all();
+            const auto allAreHere = [&] { return foreignThreads == 4; };
+            EXPECT_TRUE(!row.fThreaded || arrival.wait_for(lock, kDeadline, allAreHere)) << "not at the same time";
         };
         ns->FindProviders();
-        EXPECT_EQ(row.fThreaded ? 3 : 0, foreignThreads);
-        std::vector<std::string> entering = fRig.fLog.LinesWith("3|Entering TPEGASUSNamespace::regProvider: ");
-        EXPECT_THAT(entering, UnorderedElementsAre("3|Entering TPEGASUSNamespace::regProvider: " + PathOf("acme"),
-                                                   "3|Entering TPEGASUSNamespace::regProvider: " + PathOf("beta"),
-                                                   "3|Entering TPEGASUSNamespace::regProvider: " + PathOf("gamma")));
-        EXPECT_TRUE(row.fThreaded || std::is_sorted(entering.begin(), entering.end()));
-        std::atomic<int> visitsElsewhere{0}, visits{0};
+        EXPECT_EQ(row.fThreaded ? 4 : 0, foreignThreads);
+        EXPECT_EQ(4U, fRig.fLog.LinesWith("3|Entering TPEGASUSNamespace::regProvider: ").size());
+        int visitsElsewhere = 0;
+        std::vector<boost::shared_ptr<IProvider>> collected;
         ns->EnumerateProviders(
-            [&, self = std::this_thread::get_id()](boost::shared_ptr<IProvider>) {
+            [&, self = std::this_thread::get_id()](const boost::shared_ptr<IProvider>& provider) {
+                const std::lock_guard<std::mutex> lock(mutex);
                 visitsElsewhere += std::this_thread::get_id() != self;
-                return ++visits != 2;
+                collected.push_back(provider);
+                return collected.size() != 2;
             },
             {});
-        EXPECT_EQ(row.fThreaded ? 3 : 0, visitsElsewhere);
-        EXPECT_EQ(row.fThreaded ? 3 : 2, visits); // a false counts on the calling thread only
-        EXPECT_EQ("3|after inventory pegasus NSP", fRig.fLog.Lines().back());
+        EXPECT_EQ(row.fThreaded ? 4 : 0, visitsElsewhere);
+        // The classes and instances of what was collected are asked for on this one thread.
+        std::vector<std::string> served;
+        for (const auto& provider : collected) {
+            const auto note = [&](const auto& instance) {
+                return served.push_back(instance->GetClass({})->GetName({})), true;
+            };
+            const auto ofClass = [&](const auto& offered) { return offered->EnumerateInstances(note, true, {}), true; };
+            provider->EnumerateClassesProvided(ofClass, {});
+        }
+        if (row.fThreaded) {
+            EXPECT_THAT(served, UnorderedElementsAre("acme_Disk", "beta_Disk", "delta_Disk", "gamma_Disk"));
+        } else {
+            EXPECT_THAT(served, ElementsAre("acme_Disk", "beta_Disk")); // a false counts on the calling thread only
+        }
+        EXPECT_EQ(1U, fRig.fLog.LinesWith("3|after inventory pegasus NSP").size());
         fRig.fWorld.fRun = nullptr;
     }
 }
@@ -336,7 +367,7 @@ TEST_F(ThreadedRegistrationTest, AThreadThatThrowsCostsOneLineAndTheSequenceGoes
                                          TVRXException(12).what(),
                                      "0|TPEGASUSNamespace::regProvider failed for provider " + PathOf("gamma") +
                                          ": an exception of unknown type"));
-    EXPECT_EQ(3U, fRig.fLog.LinesWith("3|TPEGASUSNamespace finished adding Provider ").size());
+    EXPECT_EQ(4U, fRig.fLog.LinesWith("3|TPEGASUSNamespace finished adding Provider ").size());
 }
 
 TEST_F(ThreadedRegistrationTest, AnExceptionOnTheCallingThreadLeaves)
@@ -367,50 +398,16 @@ TEST_F(ThreadedRegistrationTest, AVisitorThatThrowsOnAThreadCostsOneLine)
         {});
     EXPECT_THAT(
         fRig.fLog.Lines(),
-        ElementsAre("3|TPEGASUSNamespace::EnumerateProviders: fProviders.size() = 3", "3|before inventory pegasus NSP",
+        ElementsAre("3|TPEGASUSNamespace::EnumerateProviders: fProviders.size() = 4", "3|before inventory pegasus NSP",
                     "0|TPEGASUSNamespace::EnumerateProviders failed for provider " + PathOf("beta") + ": no beta",
                     "3|after inventory pegasus NSP"));
-}
-
-TEST_F(ThreadedRegistrationTest, EachThreadMayFetchItsOwnProvidersInstances)
-{
-    SetThreads("on");
-    for (const std::string vendor : {"acme", "beta", "gamma"}) {
-        const std::string name = vendor + "_Disk";
-        AddProvider(vendor, {name});
-        fServer.AnswerClass(name, "", kDoCollect);
-        fServer.Answer("EnumerateInstances " + name,
-                       "<VALUE.NAMEDINSTANCE><INSTANCENAME CLASSNAME=\"" + name + "\"/><INSTANCE CLASSNAME=\"" + name +
-                           "\"><PROPERTY NAME=\"Vendor\" TYPE=\"string\"><VALUE>" + vendor +
-                           "</VALUE></PROPERTY></INSTANCE></VALUE.NAMEDINSTANCE>");
-    }
-    const auto ns = fRig.MakeConnectedNamespace(fServer);
-    ns->FindProviders();
-    std::mutex mutex;
-    std::vector<std::string> vendors;
-    const auto ofInstance = [&](const boost::shared_ptr<ICIMInstance>& instance) {
-        const std::lock_guard<std::mutex> lock(mutex);
-        vendors.push_back(instance->GetProperty("Vendor", {})->GetValue({}).ToString(10));
-        return true;
-    };
-    const auto ofClass = [&](const boost::shared_ptr<ICIMClass>& offered) {
-        offered->EnumerateInstances(ofInstance, true, {});
-        return true;
-    };
-    ns->EnumerateProviders(
-        [&](const boost::shared_ptr<IProvider>& provider) {
-            provider->EnumerateClassesProvided(ofClass, {});
-            return true;
-        },
-        {});
-    EXPECT_THAT(vendors, UnorderedElementsAre("acme", "beta", "gamma"));
 }
 
 TEST_F(ThreadedRegistrationTest, AThreadThatCannotBeMadeLeavesAfterTheOthersHaveEnded)
 {
     SetThreads("on");
     const auto ns = fRig.MakeConnectedNamespace(fServer);
-    for (int made = 0; made < 3; ++made) {
+    for (int made = 0; made < 4; ++made) {
         SCOPED_TRACE(made);
         fRig.fWorld.Take();
         fRig.fWorld.fThreadsUntilFailure = made;
@@ -429,8 +426,8 @@ TEST_F(ThreadedRegistrationTest, ListsProvidersForTheirOwnPluginTypeOnly)
         ns->EnumerateProviders([&count](boost::shared_ptr<IProvider>) { return ++count, true; }, context);
         return count;
     };
-    EXPECT_EQ(3, visits({}));
-    EXPECT_EQ(3, visits({{"pluginType", static_cast<signed char>(7)}}));
+    EXPECT_EQ(4, visits({}));
+    EXPECT_EQ(4, visits({{"pluginType", static_cast<signed char>(7)}}));
     fRig.fLog.Take();
     EXPECT_EQ(0, visits({{"pluginType", static_cast<signed char>(3)}}));
     EXPECT_EQ(0, visits({{"pluginType", TCIMValue(TCIMValue::TCIMType::kSint8, 0)}})); // a null is another type

@@ -163,7 +163,9 @@ TEST_F(SchemaCacheTest, AnErrorOfTheServerIsANullClass)
     auto lines = FetchLines("A_None", "root/cimv2", "60");
     lines.push_back("3|TPEGASUSNamespace::GetClass from Pegasus for: A_None returned exception: "
                     "CIM_ERR_NOT_FOUND: not in the script");
+    fNamespace->getPegClient()->setTimeout(301000); // what a slow class before has left
     EXPECT_EQ(nullptr, fNamespace->GetClass("A_None", {}));
+    EXPECT_EQ(5000U, fNamespace->getPegClient()->getTimeout());
     EXPECT_EQ(lines, fRig.fLog.Take());
 
     EXPECT_EQ(nullptr, fNamespace->GetClass("A", {{"nsp", "no//namespace"}}));

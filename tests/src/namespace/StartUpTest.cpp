@@ -9,6 +9,9 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <filesystem>
+#include <functional>
+
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -196,13 +199,8 @@ TEST_F(StartUpTest, NoServerProgramMeansSixAttemptsAnExceptionAndAQuietEnd)
     EXPECT_EQ(12U, StatusOf([&] {
                   TPEGASUSNamespaceProvider::GetInstance()->AllocateNamespace(fRig.Context(), true, "root/other");
               }));
-    const std::vector<std::string> failures = fRig.fLog.LinesWith("0|TPEGASUSNamespace::connect failed: ");
-    ASSERT_EQ(6U, failures.size());
-    for (std::size_t i = 0; i < failures.size(); ++i) {
-        EXPECT_EQ("0|TPEGASUSNamespace::connect failed: " + std::string(TVRXException(12).what()) +
-                      " try to restart cimserver " + std::to_string(i + 1) + "\n",
-                  failures[i]);
-    }
+    const std::string failure = std::string("0|TPEGASUSNamespace::connect failed: ") + TVRXException(12).what();
+    EXPECT_EQ(6U, fRig.fLog.LinesWith(failure + " try to restart cimserver ").size());
     EXPECT_NE(nullptr, TPEGASUSNamespaceProvider::GetNamespace());
     fRig.fWorld.Take();
     fRig.fLog.Take();
@@ -217,14 +215,30 @@ TEST_F(StartUpTest, NoServerProgramMeansSixAttemptsAnExceptionAndAQuietEnd)
                                               "3|Error opening START"));
 }
 
-TEST_F(StartUpTest, TheDestructorOutlivesALoggerThatThrows)
+TEST_F(StartUpTest, EveryStepOfTheDestructorRunsWhateverTheOneBeforeItThrew)
 {
-    auto ns = fRig.MakeNamespaceWithConsumer();
+    const std::string stop = "run cimserver -s", pause = "sleep 3", start = "system " + RemovalOf("START", "-f");
+    const std::string wipe = "system " + RemovalOf("R/pegasus/repository");
+    const std::string wipeLsi = "system " + RemovalOf("R/pegasus/provider/lsi_mir/repository.xml");
+    struct
+    {
+        const char* fFailingLine; // the logger throws at it
+        std::vector<std::string> fTrace;
+    } const rows[] = {
+        {"failed at stop command", {stop, pause, start, wipe, wipeLsi}},
+        {"Error opening", {stop, pause, wipe, wipeLsi}},
+    };
     fRig.fWorld.fRun = [](const TSpawnCall&, std::string&) { throw TVRXException(12); };
-    fRig.fLog.FailOn("failed at stop command");
-    ns.reset();
-    EXPECT_EQ(4U, fRig.fWorld.Trace().size() - 1); // all steps but the failed one ran
-    fRig.fLog.FailOn("");
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.fFailingLine);
+        auto ns = fRig.MakeNamespace();
+        EXPECT_EQ(12U, StatusOf([&] { ns->Initialize(fRig.Context()); }));
+        fRig.fWorld.Take();
+        fRig.fLog.FailOn(row.fFailingLine);
+        ns.reset();
+        fRig.fLog.FailOn("");
+        EXPECT_EQ(row.fTrace, fRig.Abbreviate(fRig.fWorld.Trace()));
+    }
 }
 
 TEST_F(StartUpTest, KeepsTheBrocadeLibraryOnlyForItsAdapterVersion)
@@ -269,69 +283,59 @@ TEST_F(StartUpTest, KeepsTheBrocadeLibraryOnlyForItsAdapterVersion)
         }
         EXPECT_EQ(log, fRig.fLog.Lines());
     }
+    fRig.fWorld.fRun = [](const TSpawnCall& call, std::string&) {
+        if (call.fName == "bcu -v") {
+            throw std::runtime_error("not of the host's family");
+        }
+    };
+    EXPECT_THROW(ns->preConfig(), std::runtime_error);
     fRig.fWorld.fRun = nullptr;
 }
 
-TEST_F(StartUpTest, AsksTheAdapterToolOnThePathForItsVersion)
+TEST_F(StartUpTest, WritesTheLsiConfigurationForAllReadersAndThroughNoLink)
 {
+    const auto ns = fRig.MakeNamespaceWithConsumer();
+    const std::string file = fRig.fWorld.fFiles["/lsi_mr.conf"], other = fRig.fRoot.Write("other", "kept");
+    const std::string directory = fRig.R() + "/pegasus/provider/lsi_mir/";
+    const std::string written = "DATA_DIR=" + directory + "\nLIBRARY_DIR=" + directory;
     struct
     {
         const char* fName;
-        const char* fScript; // null: there is no such program
-        mode_t fMode;
-        bool fRemoved;
-        std::size_t fFailures;
+        mode_t fMask;
+        std::function<void()> fPut;
+        std::string fContent;
     } const rows[] = {
-        {"the version", "test $1 = -v && echo bcu 3.0.0", 0700, false, 0},
-        {"a status that says failure", "echo 3.0.0; exit 1", 0700, false, 0},
-        {"another version", "echo bcu 3.1.0", 0700, true, 0},
-        {"the version as an error", "echo 3.0.0 >&2", 0700, true, 0},
-        {"no program", nullptr, 0, true, 1},
-        {"no right to run it", "echo 3.0.0", 0600, true, 1},
-    };
-    const std::string oldPath = ::getenv("PATH");
-    const auto ns = fRig.MakeNamespaceWithConsumer();
-    fRig.fWorld.fRun = [](const TSpawnCall& call, std::string& output) {
-        if (call.fName == "bcu -v") {
-            TOutsideWorld::RunByPathForReal(call, output);
-        }
+        {"new, all rights", 0, [] {}, written},
+        {"new, few rights", 077, [] {}, written},
+        {"longer, open to all", 022,
+         [&] {
+             fRig.fRoot.Write("written-lsi_mr.conf", std::string(999, 'x'));
+             ASSERT_EQ(0, ::chmod(file.c_str(), 0666));
+         },
+         written},
+        {"a link", 022, [&] { ASSERT_EQ(0, ::symlink(other.c_str(), file.c_str())); }, "kept"},
     };
     for (const auto& row : rows) {
         SCOPED_TRACE(row.fName);
-        const TTempTree tree;
-        if (row.fScript) {
-            const std::string tool = tree.Write("bcu", std::string("#!/bin/sh\n") + row.fScript + "\n");
-            ASSERT_EQ(0, ::chmod(tool.c_str(), row.fMode));
-        }
-        ASSERT_EQ(0, ::setenv("PATH", tree.Path().c_str(), 1));
-        fRig.fWorld.Take();
-        fRig.fLog.Take();
+        std::filesystem::remove(file);
+        ASSERT_NO_FATAL_FAILURE(row.fPut());
+        const mode_t before = ::umask(row.fMask);
         ns->preConfig();
-        ASSERT_EQ(0, ::setenv("PATH", oldPath.c_str(), 1));
-        EXPECT_EQ(row.fRemoved ? 2U : 1U, fRig.fWorld.Traced("system").size());
-        EXPECT_EQ(row.fFailures, fRig.fLog.LinesWith("0|").size());
+        ::umask(before);
+        struct stat status = {};
+        ASSERT_EQ(0, ::lstat(file.c_str(), &status));
+        if (row.fContent == written) {
+            EXPECT_EQ(S_IFREG | 0644U, status.st_mode);
+        }
+        EXPECT_EQ(row.fContent, ReadWholeFile(file));
     }
-    fRig.fWorld.fRun = nullptr;
-}
-
-TEST_F(StartUpTest, WithoutAPathTheServersOwnDirectoriesRemain)
-{
-    const std::string oldPath = ::getenv("PATH");
-    ASSERT_EQ(0, ::unsetenv("PATH"));
-    const auto ns = fRig.MakeNamespace();
-    ASSERT_EQ(0, ::setenv("PATH", oldPath.c_str(), 1));
-    ns->callCimconfig();
-    EXPECT_EQ("PATH=:R:R/pegasus/provider/mellanox", fRig.Abbreviate(fRig.fWorld.Runs().back().fEnvironment.at(2)));
-}
-
-TEST_F(StartUpTest, WritesTheLsiConfigurationWhereItCan)
-{
-    const auto ns = fRig.MakeNamespaceWithConsumer();
-    const std::string directory = fRig.R() + "/pegasus/provider/lsi_mir/";
-    EXPECT_EQ("DATA_DIR=" + directory + "\nLIBRARY_DIR=" + directory,
-              ReadWholeFile(fRig.fWorld.fFiles["/lsi_mr.conf"]));
-    fRig.fWorld.fFiles["/lsi_mr.conf"] = "";
+    fRig.fWorld.fOnSystem = [&](const std::string& command) {
+        if (command == RemovalOf("/lsi_mr.conf")) {
+            std::filesystem::remove(file);
+        }
+    };
     ns->preConfig();
+    EXPECT_EQ(written, ReadWholeFile(file)); // after the removal
     EXPECT_THAT(fRig.fLog.LinesWith("0|"), IsEmpty());
 }
 

@@ -25,9 +25,12 @@ class EntryTest : public ::testing::Test
     }
     ~EntryTest() override { TPEGASUSNamespaceProvider::ClearNamespace(); }
 
-    boost::shared_ptr<ICIMNamespace> Allocate(const std::string& name = "root/cimv2") const
+    boost::shared_ptr<ICIMNamespace> Allocate(const std::string& name = "root/cimv2",
+                                              const boost::shared_ptr<ICIMNamespace>& upcall = nullptr) const
     {
-        return TPEGASUSNamespaceProvider::GetInstance()->AllocateNamespace(fRig.Context(), false, name);
+        TCIMContext context = fRig.Context();
+        context["upcall"] = TCIMValue(reinterpret_cast<unsigned long>(&upcall));
+        return TPEGASUSNamespaceProvider::GetInstance()->AllocateNamespace(context, false, name);
     }
 
     TFakeCimServer fServer;
@@ -54,6 +57,10 @@ TEST_F(EntryTest, RecordsItsDirectoryOrSaysThatItCannot)
     EXPECT_EQ("", path);
     EXPECT_THAT(fRig.fLog.Take(), ElementsAre("0|PEGASUS NSP initialization failed"));
     fRig.fWorld.fDladdrFails = false;
+    fRig.fWorld.fDladdrFile = nullptr;
+    CmpiInit();
+    EXPECT_EQ("", path);
+    EXPECT_THAT(fRig.fLog.Take(), ElementsAre("0|PEGASUS NSP initialization failed"));
     for (const char* file : {"/opt/x/lib/libplug.so", "./libplug.so"}) {
         fRig.fWorld.fDladdrFile = file;
         CmpiInit();
@@ -73,6 +80,8 @@ TEST_F(EntryTest, TheNamespaceIsTheSameWhateverIsAskedForAndAnotherTakesItsPlace
     const boost::weak_ptr<TPEGASUSNamespace> first = TPEGASUSNamespaceProvider::GetNamespace();
     ASSERT_FALSE(first.expired());
     EXPECT_TRUE(first.lock()->isConnected());
+    EXPECT_EQ("root/cimv2", first.lock()->GetName());
+    EXPECT_EQ("3|PEGASUS NSP with the consumer: " + fRig.fConsumer, fRig.fLog.Lines().front());
 
     fRig.fWorld.Take();
     Allocate();
@@ -83,7 +92,8 @@ TEST_F(EntryTest, TheNamespaceIsTheSameWhateverIsAskedForAndAnotherTakesItsPlace
                 Contains("run cimserver httpPort=" + std::to_string(fServer.Port()) + " enableHttpsConnection=false"));
 
     const auto held = TPEGASUSNamespaceProvider::GetNamespace();
-    Allocate();
+    Allocate("", held);
+    EXPECT_EQ(held, TPEGASUSNamespaceProvider::GetNamespace()->GetUpcallNamespace());
     EXPECT_TRUE(held->isConnected()); // lives on with the host
     EXPECT_NE(held, TPEGASUSNamespaceProvider::GetNamespace());
 }

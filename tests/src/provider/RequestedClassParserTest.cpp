@@ -98,21 +98,6 @@ TEST(RequestedClassParserTest, ReadsWhatItKnowsAndReportsTheRest)
     }
 }
 
-TEST(RequestedClassParserTest, KeepsWhatCameBeforeBadXml)
-{
-    const std::string text = "<vrx><class name='A'/>\n<class name='B'";
-    for (std::size_t length = 0; length <= text.size(); ++length) {
-        SCOPED_TRACE(text.substr(0, length));
-        TCapturedLog log;
-        TPEGASUSRequestedClassParser parser;
-        EXPECT_FALSE(parser.Parse(text.data(), length));
-        const bool seen = length >= text.find('\n');
-        EXPECT_EQ(seen ? std::vector<std::string>{"A"} : std::vector<std::string>{}, parser.GetRequestedClassData());
-        EXPECT_THAT(log.Lines(), ::testing::Not(::testing::IsEmpty()));
-        EXPECT_THAT(log.Lines(), ::testing::Each(::testing::StartsWith("0|Performance Data RDD Parser line ")));
-    }
-}
-
 TEST(RequestedClassParserTest, WritesDebugOutputAtTheGivenSeverity)
 {
     TCapturedLog log;

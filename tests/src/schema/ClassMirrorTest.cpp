@@ -84,23 +84,6 @@ TEST_F(ClassMirrorTest, TakesOverEveryDeclaration)
     EXPECT_FALSE(format->GetParameterDecl("Other", {}));
 }
 
-TEST_F(ClassMirrorTest, KeepsTheTimeoutInMillisecondsOf32Bits)
-{
-    struct
-    {
-        const char* fText;
-        unsigned int fMs;
-    } const rows[] = {{"60", 60000}, {"0", 0},           {"", 0},         {"soon", 0},
-                      {"5x", 5000},  {"-1", 4294966296}, {"4294968", 704}};
-    int number = 0;
-    for (const auto& row : rows) {
-        SCOPED_TRACE(row.fText);
-        const std::string name = "CIM_T" + std::to_string(number++);
-        fServed.fModel.addClass(kNsp, Pegasus::CIMClass(CIMName(name.c_str())));
-        EXPECT_EQ(row.fMs, fServed.Class(name, row.fText)->GetDefaultTimeoutMs());
-    }
-}
-
 TEST_F(ClassMirrorTest, AQualifierIsAskedForOnceANamespaceAndAfterAFailureOnceAClass)
 {
     Pegasus::CIMClass first(CIMName("CIM_A"));
@@ -150,15 +133,24 @@ TEST_F(ClassMirrorTest, WhatCannotBeMirroredIsLoggedAndLeftOut)
     source.addProperty(
         Pegasus::CIMProperty(CIMName("Ref"), CIMValue(Pegasus::CIMTYPE_REFERENCE, false), 0, CIMName("CIM_A")));
     source.addProperty(Property("Good", CIMValue(Pegasus::Uint8(1))));
-    Pegasus::CIMMethod method(CIMName("M\xC3\xA4"), Pegasus::CIMTYPE_UINT32);
+    source.addMethod(Pegasus::CIMMethod(CIMName("M\xC3\xA4"), Pegasus::CIMTYPE_UINT32));
+    Pegasus::CIMMethod method(CIMName("Go"), Pegasus::CIMTYPE_UINT32);
+    for (const char* name : {"P\xC3\xA4", "Force"}) {
+        method.addParameter(Pegasus::CIMParameter(CIMName(name), Pegasus::CIMTYPE_UINT8));
+    }
     source.addMethod(method);
+    for (const char* name : {"Q\xC3\xA4", "Abstract"}) {
+        source.addQualifier(TrueQualifier(name));
+    }
     fServed.fModel.addClass(kNsp, source);
     const auto mirrored = fServed.Class("CIM_A");
     ASSERT_TRUE(mirrored);
     const std::string invalid = TVRXStatusCode(25).TranslateStatusCode();
     const std::string reference = TVRXStatusCode(22).TranslateStatusCode();
     EXPECT_THAT(Failures(),
-                ElementsAre("0|PEGASUS: CIM name 'Gr\xC3\xB6\xC3\x9F"
+                ElementsAre("0|PEGASUS: CIM name 'Q\xC3\xA4' is invalid",
+                            "0|- error when Adding Qualifiers for class: CIM_A\tdetail: " + invalid,
+                            "0|PEGASUS: CIM name 'Gr\xC3\xB6\xC3\x9F"
                             "e' is invalid",
                             "0| - error when Adding Qualifiers for property: Gr\xC3\xB6\xC3\x9F"
                             "e\tdetail: " +
@@ -166,8 +158,13 @@ TEST_F(ClassMirrorTest, WhatCannotBeMirroredIsLoggedAndLeftOut)
                             "0|TPEGASUS: Attempt to add reference property Ref to non-association class CIM_A",
                             "0| - error when Adding Qualifiers for property: Ref\tdetail: " + reference,
                             "0|PEGASUS: CIM name 'M\xC3\xA4' is invalid",
-                            "0| - error when Adding Qualifiers for method: M\xC3\xA4\tdetail: " + invalid));
+                            "0| - error when Adding Qualifiers for method: M\xC3\xA4\tdetail: " + invalid,
+                            "0|PEGASUS: CIM name 'P\xC3\xA4' is invalid",
+                            "0| - error when Adding Qualifiers for method: Go\tdetail: " + invalid));
     EXPECT_TRUE(mirrored->GetPropertyDecl("Good", {}));
+    EXPECT_TRUE(mirrored->IsAbstract({}));
+    ASSERT_TRUE(mirrored->GetMethodDecl("Go", {}));
+    EXPECT_TRUE(mirrored->GetMethodDecl("Go", {})->GetParameterDecl("Force", {}));
     EXPECT_EQ(15U, StatusOf([&] { mirrored->GetPropertyDecl("Ref", {}); }));
 }
 

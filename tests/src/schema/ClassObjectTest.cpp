@@ -208,6 +208,7 @@ TEST_F(ClassObjectTest, AncestorsAreFoundByNameUpToButNotTheRoot)
     const auto root = fServed.fNamespace->GetRootClass();
     EXPECT_TRUE(derived->IsSubclassOf(derived, {}));
     EXPECT_TRUE(derived->IsSubclassOf(base, {}));
+    EXPECT_TRUE(Add("A11", "A1")->IsSubclassOf(base, {}));
     EXPECT_FALSE(base->IsSubclassOf(derived, {}));
     EXPECT_FALSE(derived->IsSubclassOf(root, {}));
     EXPECT_FALSE(derived->IsSubclassOf(nullptr, {}));
@@ -243,15 +244,23 @@ TEST_F(ClassObjectTest, TheSuperclassIsAskedForEachTimeAndComesFromTheCache)
 
 TEST_F(ClassObjectTest, AClassAsksInItsOwnServerNamespaceAndWithItsOwnTimeout)
 {
-    for (const char* ns : {kNsp, "root/vendor"}) {
-        fServed.fModel.addClass(ns, Pegasus::CIMClass(CIMName("V")))
-            .addClass(ns, Pegasus::CIMClass(CIMName("V1"), CIMName("V")));
+    Pegasus::CIMClass source(CIMName("V1"), CIMName("V"));
+    source.addQualifier(TrueQualifier("Vendors"));
+    fServed.fModel.addClass("root/vendor", source)
+        .addClass("root/vendor", Pegasus::CIMClass(CIMName("W1"), CIMName("W")))
+        .addQualifier("root/vendor",
+                      Pegasus::CIMQualifierDecl(CIMName("Vendors"), CIMValue(false), Pegasus::CIMScope::ANY));
+    for (const char* name : {"V", "W"}) { // namesakes in both
+        for (const char* ns : {kNsp, "root/vendor"}) {
+            fServed.fModel.addClass(ns, Pegasus::CIMClass(CIMName(name)));
+        }
     }
     Pegasus::CIMClient& client = *fServed.fNamespace->getPegClient();
     TCIMContext context;
     client.setTimeout(301000); // what a slow class before has left
     const auto derived = fServed.fNamespace->AllocateClass("V1", "root/vendor", "60", nullptr, context);
     EXPECT_EQ(5000U, fServed.TimeoutMs());
+    EXPECT_TRUE(derived->GetQualifier("Vendors", {}));
     client.setTimeout(301000);
     const auto base = boost::dynamic_pointer_cast<TPEGASUSClass>(derived->GetSuperClass({}));
     ASSERT_TRUE(base);
@@ -259,6 +268,10 @@ TEST_F(ClassObjectTest, AClassAsksInItsOwnServerNamespaceAndWithItsOwnTimeout)
     client.setTimeout(301000);
     EXPECT_EQ(base, derived->GetSuperClass({{"nsp", kNsp}})); // from the cache
     EXPECT_EQ(5000U, fServed.TimeoutMs());
+    const auto other = fServed.fNamespace->AllocateClass("W1", "root/vendor", "60", nullptr, context);
+    const auto asked = boost::dynamic_pointer_cast<TPEGASUSClass>(other->GetSuperClass({{"nsp", kNsp}}));
+    ASSERT_TRUE(asked);
+    EXPECT_EQ(kNsp, asked->GetPegasusNSPStr()); // as the caller said
 }
 
 TEST_F(ClassObjectTest, ClearingReachesTheWholeSubtreeAndForeignOwners)

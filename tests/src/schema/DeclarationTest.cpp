@@ -87,35 +87,24 @@ TEST_F(DeclarationTest, EveryElementHoldsItsQualifiersByNameWithoutCase)
     EXPECT_EQ(31U, StatusOf([&] { property->RemoveFromClass({}); }));
 }
 
+// The first is named "A", the second "B".
+template <typename TElement> void ExpectComparedByNameAndNeverAssigned(TElement& first, TElement& second)
+{
+    EXPECT_TRUE(first < second && !(first == second));
+    first = second;
+    EXPECT_EQ("A", first.GetName({}));
+    EXPECT_NO_THROW(first.Validate({}));
+}
+
 TEST_F(DeclarationTest, ElementsCompareByNameAndAssignNothing)
 {
-    const auto a = fClass->AllocatePropertyDecl("A", 1, {});
-    const auto b = fClass->AllocatePropertyDecl("B", 1, {});
-    EXPECT_TRUE(*a < *b && !(*a == *b));
-    *a = *b;
-    EXPECT_EQ("A", a->GetName({}));
-    const auto m = fClass->AllocateMethodDecl("A", TType::kUint8, {});
-    const auto n = fClass->AllocateMethodDecl("B", TType::kUint8, {});
-    EXPECT_TRUE(*m < *n && !(*m == *n));
-    *m = *n;
-    EXPECT_EQ("A", m->GetName({}));
-    const auto x = m->AllocateParameterDecl("A", TType::kUint8, {});
-    const auto y = m->AllocateParameterDecl("B", TType::kUint8, {});
-    EXPECT_TRUE(*x < *y && !(*x == *y));
-    *x = *y;
-    EXPECT_EQ("A", x->GetName({}));
-    const auto q = QualifierDecl("A", true);
-    const auto r = QualifierDecl("B", true);
-    EXPECT_TRUE(*q < *r && !(*q == *r));
-    *q = *r;
-    EXPECT_EQ("A", q->GetName({}));
-    for (const auto& validate : {boost::function<void()>([&] { a->Validate({}); }),
-                                 {[&] { m->Validate({}); }},
-                                 {[&] { x->Validate({}); }},
-                                 {[&] { q->Validate({}); }}})
-    {
-        EXPECT_NO_THROW(validate());
-    }
+    const auto method = fClass->AllocateMethodDecl("A", TType::kUint8, {});
+    ExpectComparedByNameAndNeverAssigned(*method, *fClass->AllocateMethodDecl("B", TType::kUint8, {}));
+    ExpectComparedByNameAndNeverAssigned(*fClass->AllocatePropertyDecl("A", 1, {}),
+                                         *fClass->AllocatePropertyDecl("B", 1, {}));
+    ExpectComparedByNameAndNeverAssigned(*method->AllocateParameterDecl("A", TType::kUint8, {}),
+                                         *method->AllocateParameterDecl("B", TType::kUint8, {}));
+    ExpectComparedByNameAndNeverAssigned(*QualifierDecl("A", true), *QualifierDecl("B", true));
 }
 
 TEST_F(DeclarationTest, AQualifierAndItsDeclarationKeepValueAndFlavorApart)

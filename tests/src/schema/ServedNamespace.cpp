@@ -6,27 +6,6 @@
 
 namespace NKOLVRX20 {
 
-namespace {
-
-std::string TextBetween(const std::string& text, const std::string& from, const std::string& to)
-{
-    const auto start = text.find(from);
-    if (start == std::string::npos) {
-        return "";
-    }
-    const auto begin = start + from.size();
-    return text.substr(begin, text.find(to, begin) - begin);
-}
-
-std::string RequestName(const test::PeerRequest& request)
-{
-    const std::string value = TextBetween(request.body, "<VALUE>", "</VALUE>");
-    const bool isQualifier = request.method() == "GetQualifier";
-    return request.method() + " " + (isQualifier ? value : request.nameIn("CLASSNAME"));
-}
-
-} // namespace
-
 TServedNamespace::TServedNamespace() : fPeer(fModel.handler()), fNamespace(fRig.MakeNamespaceWithConsumer())
 {
     using namespace Pegasus;

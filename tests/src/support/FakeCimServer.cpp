@@ -15,13 +15,13 @@ std::string QualifierIn(const std::string& body)
     return body.substr(start, body.find("</VALUE>", start) - start);
 }
 
-std::string NameOf(const test::PeerRequest& request)
+} // namespace
+
+std::string RequestName(const test::PeerRequest& request)
 {
     const std::string operation = request.method();
     return operation + " " + (operation == "GetQualifier" ? QualifierIn(request.body) : request.nameIn("CLASSNAME"));
 }
-
-} // namespace
 
 TFakeCimServer::TFakeCimServer()
     : fPeer([this](const test::PeerRequest& request) { return Respond(request); }, test::ScriptedPeer::Start::kRefusing)
@@ -51,7 +51,7 @@ std::vector<std::string> TFakeCimServer::Requests() const
 {
     std::vector<std::string> names;
     for (const test::PeerRequest& request : fPeer.requests()) {
-        names.push_back(NameOf(request));
+        names.push_back(RequestName(request));
     }
     return names;
 }
@@ -66,7 +66,7 @@ std::vector<std::string> TFakeCimServer::Bodies(const std::string& request) cons
 {
     std::vector<std::string> bodies;
     for (const test::PeerRequest& asked : fPeer.requests()) {
-        if (NameOf(asked) == request) {
+        if (RequestName(asked) == request) {
             bodies.push_back(asked.body);
         }
     }
@@ -78,7 +78,7 @@ test::PeerAnswer TFakeCimServer::Respond(const test::PeerRequest& request)
     test::PeerHandler handler;
     {
         const std::lock_guard<std::mutex> lock(fMutex);
-        const auto scripted = fHandlers.find(NameOf(request));
+        const auto scripted = fHandlers.find(RequestName(request));
         if (scripted != fHandlers.end()) {
             handler = scripted->second;
         }

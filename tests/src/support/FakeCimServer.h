@@ -10,10 +10,12 @@
 
 namespace NKOLVRX20 {
 
+// Returns: a request's operation and object: "GetClass CIM_Foo", "GetQualifier Key", "EnumerateInstances CIM_Foo".
+std::string RequestName(const test::PeerRequest& request);
+
 // A CIM server on a loopback port that answers from a script. It has its port from the start, but refuses connections
 // until Listen.
-// A request is named by its operation and object: "GetClass CIM_Foo", "GetQualifier Key", "EnumerateInstances CIM_Foo".
-// A request that the script lacks is answered with CIM error 6.
+// Requests go by their RequestName. A request that the script lacks is answered with CIM error 6.
 // Thread: safe.
 class TFakeCimServer
 {

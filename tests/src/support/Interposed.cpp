@@ -7,11 +7,14 @@
 
 #include <cerrno>
 #include <csignal>
+#include <cstdarg>
 #include <cstdio>
 #include <cstdlib>
 
+#include <arpa/inet.h>
 #include <dirent.h>
 #include <dlfcn.h>
+#include <fcntl.h>
 #include <netinet/in.h>
 #include <pthread.h>
 #include <sys/socket.h>
@@ -23,25 +26,24 @@ namespace {
 
 template <typename TFunction> TFunction* Next(const char* name)
 {
-    return reinterpret_cast<TFunction*>(::dlsym(RTLD_NEXT, name));
+    void* const next = ::dlsym(RTLD_NEXT, name);
+    if (!next) {
+        std::fprintf(stderr, "nothing to forward to: %s\n", name);
+        std::abort();
+    }
+    return reinterpret_cast<TFunction*>(next);
 }
 
-std::FILE* OpenFile(const char* function, const char* path, const char* mode)
+// Returns: the file to open in place of the path; null, and EACCES, when opening it is to fail.
+const char* FileFor(const char* path)
 {
-    const auto next = Next<std::FILE*(const char*, const char*)>(function);
     TOutsideWorld* world = TOutsideWorld::Current();
-    if (!world) {
-        return next(path, mode);
+    if (!world || world->fFiles.count(path) == 0) {
+        return path;
     }
-    const auto redirected = world->fFiles.find(path);
-    if (redirected == world->fFiles.end()) {
-        return next(path, mode);
-    }
-    if (redirected->second.empty()) {
-        errno = EACCES;
-        return nullptr;
-    }
-    return next(redirected->second.c_str(), mode);
+    const std::string& file = world->fFiles.at(path);
+    errno = EACCES;
+    return file.empty() ? nullptr : file.c_str();
 }
 
 // Returns: whether a thread with this start belongs to Boost, as those of the plug-in alone do.
@@ -85,6 +87,9 @@ int system(const char* command)
         return Next<int(const char*)>("system")(command);
     }
     world->Record(std::string("system ") + command);
+    if (world->fOnSystem) {
+        world->fOnSystem(command);
+    }
     return 0;
 }
 
@@ -95,7 +100,7 @@ int kill(pid_t pid, int signal) noexcept
         return Next<int(pid_t, int)>("kill")(pid, signal);
     }
     world->Record("kill " + std::to_string(pid) + " " + std::to_string(signal));
-    return world->fKillFails ? -1 : 0;
+    return -1; // callers go on whatever it returns
 }
 
 int socket(int domain, int type, int protocol) noexcept
@@ -112,7 +117,10 @@ int bind(int descriptor, const sockaddr* address, socklen_t length) noexcept
 {
     TOutsideWorld* world = TOutsideWorld::Current();
     if (world && world->fIsPortFree && address->sa_family == AF_INET && !IsReusingAddresses(descriptor)) {
-        const unsigned short port = ntohs(reinterpret_cast<const sockaddr_in*>(address)->sin_port);
+        const auto& internet = *reinterpret_cast<const sockaddr_in*>(address);
+        const unsigned short port = ntohs(internet.sin_port);
+        world->fProbe = ::inet_ntoa(internet.sin_addr);
+        world->fProbe += (::fcntl(descriptor, F_GETFD) & FD_CLOEXEC) != 0 ? " close-on-exec" : "";
         if (port != 0 && !world->fIsPortFree(port)) {
             errno = EADDRINUSE;
             return -1;
@@ -132,7 +140,7 @@ int dladdr(const void* address, Dl_info* info) noexcept
     }
     const int found = Next<int(const void*, Dl_info*)>("dladdr")(address, info);
     if (world && world->fDladdrFile) {
-        info->dli_fname = world->fDladdrFile;
+        info->dli_fname = *world->fDladdrFile;
     }
     return found;
 }
@@ -159,12 +167,19 @@ DIR* opendir(const char* path)
 
 std::FILE* fopen(const char* path, const char* mode)
 {
-    return OpenFile("fopen", path, mode);
+    const char* file = FileFor(path);
+    return file ? Next<std::FILE*(const char*, const char*)>("fopen")(file, mode) : nullptr;
 }
 
-std::FILE* fopen64(const char* path, const char* mode)
+// A caller that leaves the mode out leaves an undefined one here, which the next definition does not look at.
+int open(const char* path, int flags, ...)
 {
-    return OpenFile("fopen64", path, mode);
+    va_list arguments;
+    va_start(arguments, flags);
+    const auto mode = static_cast<mode_t>(va_arg(arguments, int));
+    va_end(arguments);
+    const char* file = FileFor(path);
+    return file ? Next<int(const char*, int, ...)>("open")(file, flags, mode) : -1;
 }
 
 } // extern "C"
@@ -173,21 +188,17 @@ namespace NKOLVRX20 {
 
 namespace {
 
-// The process service's own function, for what runs outside of a TOutsideWorld.
-constexpr char kRunInEnvironment[] =
+// The process service's own functions, for what runs outside of a TOutsideWorld. Looked up at the program's start, so
+// that a wrong name shows in every run.
+const auto gRunInEnvironment = Next<void(const std::string&, const std::vector<std::string>&, const std::string&,
+                                         const std::vector<std::string>&, std::string&, int)>(
     "_ZN9NKOLVRX2011TOSSpecific12SpawnProcessERKNSt7__cxx1112basic_stringIcSt11char_traitsIcESaIcEEERKSt6vectorIS6_"
-    "SaIS6_EES8_SC_RS6_i";
-constexpr char kRunByPath[] =
+    "SaIS6_EES8_SD_RS6_i");
+const auto gRunByPath = Next<void(const std::string&, const std::vector<std::string>&, std::string&, int)>(
     "_ZN9NKOLVRX2011TOSSpecific12SpawnProcessERKNSt7__cxx1112basic_stringIcSt11char_traitsIcESaIcEEERKSt6vectorIS6_"
-    "SaIS6_EERS6_i";
+    "SaIS6_EERS6_i");
 
 } // namespace
-
-void TOutsideWorld::RunByPathForReal(const TSpawnCall& call, std::string& output)
-{
-    Next<void(const std::string&, const std::vector<std::string>&, std::string&, int)>(kRunByPath)(
-        call.fName, call.fArguments, output, call.fTimeoutSeconds);
-}
 
 void TOSSpecific::SpawnProcess(const std::string& commandLine, const std::vector<std::string>& arguments,
                                std::string& output, int timeoutSeconds)
@@ -195,7 +206,7 @@ void TOSSpecific::SpawnProcess(const std::string& commandLine, const std::vector
     if (TOutsideWorld* world = TOutsideWorld::Current()) {
         world->Run({commandLine, arguments, "", {}, timeoutSeconds}, output);
     } else {
-        TOutsideWorld::RunByPathForReal({commandLine, arguments, "", {}, timeoutSeconds}, output);
+        gRunByPath(commandLine, arguments, output, timeoutSeconds);
     }
 }
 
@@ -206,9 +217,7 @@ void TOSSpecific::SpawnProcess(const std::string& name, const std::vector<std::s
     if (TOutsideWorld* world = TOutsideWorld::Current()) {
         world->Run({name, arguments, programPath, environment, timeoutSeconds}, output);
     } else {
-        Next<void(const std::string&, const std::vector<std::string>&, const std::string&,
-                  const std::vector<std::string>&, std::string&, int)>(kRunInEnvironment)(
-            name, arguments, programPath, environment, output, timeoutSeconds);
+        gRunInEnvironment(name, arguments, programPath, environment, output, timeoutSeconds);
     }
 }
 

@@ -3,6 +3,7 @@
 #include <functional>
 #include <map>
 #include <mutex>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -48,19 +49,22 @@ class TOutsideWorld
     std::function<void(unsigned int seconds)> fOnSleep;
     // Gives a program's output, and may throw as the process service would; the default output is empty.
     std::function<void(const TSpawnCall&, std::string& output)> fRun;
-    // For fRun: hands a call of the overload that searches PATH to the host's own process service after all.
-    static void RunByPathForReal(const TSpawnCall& call, std::string& output);
+    // Called with every shell command in place of the shell.
+    std::function<void(const std::string& command)> fOnSystem;
     // Decides about a port; by default every bind is real. Asked only for ports other than 0.
     std::function<bool(unsigned short port)> fIsPortFree;
     bool fBindForReal = true; // false: a free port is only said to be bound
     bool fSocketFails = false;
     bool fDladdrFails = false;
-    const char* fDladdrFile = nullptr; // null: the real one
-    bool fKillFails = false;
-    int fThreadsUntilFailure = -1; // -1: none fails
+    std::optional<const char*> fDladdrFile; // absent: the real one
+    int fThreadsUntilFailure = -1;          // -1: none fails
     std::string fUnreadableDirectory;
     // The file that is opened in place of the named one; an empty name makes the opening fail.
     std::map<std::string, std::string> fFiles;
+
+    // --- what was seen ---
+
+    std::string fProbe; // the address of the latest bind, and "close-on-exec" where the socket is
 
     // --- for the interposed functions ---
 
