@@ -1,6 +1,5 @@
-#include "pegasus/server/net/HostCheck.h"
-
 #include "pegasus/base/AsciiCase.h"
+#include "pegasus/server/net/HttpRequest.h"
 
 #include <array>
 #include <cstring>

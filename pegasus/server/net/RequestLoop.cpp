@@ -2,7 +2,6 @@
 
 #include "pegasus/base/Text.h"
 #include "pegasus/server/admin/Log.h"
-#include "pegasus/server/net/HostCheck.h"
 
 #include <system_error>
 

@@ -5,7 +5,7 @@
 
 namespace Pegasus::server {
 
-// Finds the operation that a request names and runs it.
+// Finds the operation that a request names, checks the names of its parameters, and runs it.
 // Thread: any.
 class Dispatcher : public RequestHandler
 {

@@ -1,7 +1,6 @@
 // The operations that change instances: of classes with a provider through its agent, of registrations through the
 // registry, of the others in the repository.
 #include "pegasus/server/agent/AgentMessages.h"
-#include "pegasus/server/operations/NamespaceService.h"
 #include "pegasus/server/operations/Operations.h"
 #include "pegasus/server/operations/ServerInstances.h"
 #include "pegasus/wire/ElementEncoder.h"

@@ -1,7 +1,6 @@
 #include "pegasus/server/operations/ServerInstances.h"
 
 #include "pegasus/server/operations/ConfigService.h"
-#include "pegasus/server/operations/NamespaceService.h"
 
 namespace Pegasus::server {
 

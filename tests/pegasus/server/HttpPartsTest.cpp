@@ -4,7 +4,6 @@
 #include "pegasus/server/net/Acceptor.h"
 #include "pegasus/server/net/AnswerStream.h"
 #include "pegasus/server/net/CimAnswer.h"
-#include "pegasus/server/net/HostCheck.h"
 #include "pegasus/server/net/HttpRequestReader.h"
 #include "pegasus/server/net/Listener.h"
 

@@ -218,6 +218,9 @@ TEST_F(ProtocolTest, servesEveryFormThatClientsUse)
         {"padded length", "POST / HTTP/1.1\r\nHOST: \r\n" + type + kCim + "content-length: 0000000" +
                               std::to_string(body.size()) + "\r\n\r\n" + body},
         {"HTTP/1.0", "POST / HTTP/1.0\r\nHost: localhost\r\n" + type + kCim + length + "\r\n" + body},
+        {"no charset",
+         "POST / HTTP/1.1\r\nHost: localhost\r\nContent-Type: text/xml\r\n" + kCim + length + "\r\n" + body},
+        {"unknown attributes", post(kCim, getClassBody("xmlns=\"urn:x\" CIMVERSION=\"2.0\" DTDVERSION=\"2.0\""))},
         {"HTTP/1.0 without Host", "POST / HTTP/1.0\r\n" + type + kCim + length + "\r\n" + body},
         {"quoted charset", "POST / HTTP/1.1\r\nHost: localhost\r\nContent-Type: text/xml; charset=\"UTF-8\"\r\n" +
                                kCim + length + "\r\n" + body},

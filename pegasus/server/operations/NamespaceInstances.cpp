@@ -1,8 +1,7 @@
-#include "pegasus/server/operations/NamespaceService.h"
-
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/Text.h"
 #include "pegasus/server/operations/RegistrationChecks.h"
+#include "pegasus/server/operations/ServerInstances.h"
 
 #include <array>
 
