@@ -229,9 +229,13 @@ TEST_F(StateTest, aFloodOfRefusalsIsOneLineWithACount)
 }
 
 // What a vendor writes must neither forge a line nor reach a terminal.
-TEST_F(StateTest, controlBytesAreEscapedInTheLog)
+TEST_F(StateTest, controlBytesAreEscapedInTheLogAndOthersCannotReadIt)
 {
+    const std::string path = fHome + "/cimserver.log";
+    std::ofstream(path) << "";
+    ASSERT_EQ(::chmod(path.c_str(), 0666), 0); // by an earlier host
     Log::open(fHome, false);
+    EXPECT_EQ(fs::status(path).permissions(), fs::perms::owner_read | fs::perms::owner_write);
     Log::write(LogLevel::kError, "a\nb\x1b[2J\x7f \xc3\xa9");
     const std::string log = readOwnFile(fHome + "/cimserver.log", 1000);
     EXPECT_NE(log.find("error: a\\nb\\x1b[2J\\x7f \xc3\xa9\n"), std::string::npos) << log;
