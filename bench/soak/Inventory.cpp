@@ -143,6 +143,24 @@ EAnswer TInventory::EnumerateProcessors()
     return count == expected ? EAnswer::kRight : EAnswer::kLess;
 }
 
+EAnswer TInventory::EnumerateEndless()
+{
+    const auto endless = FindClass("Probe_Endless");
+    if (endless) {
+        InstancesOf(*endless);
+    }
+    return endless ? EAnswer::kRight : EAnswer::kLess;
+}
+
+EAnswer TInventory::ForkAndCrash()
+{
+    if (fProbe) {
+        TCIMContext none;
+        ErrorOf([&] { fProbe->InvokeMethod("ForkAndCrash", none, {}); });
+    }
+    return fProbe ? EAnswer::kRight : EAnswer::kLess;
+}
+
 // By the instance's route.
 pid_t TInventory::ProbeProcess()
 {

@@ -33,6 +33,11 @@ class TInventory
     // This machine's processors.
     EAnswer EnumerateProcessors();
 
+    // A class whose provider never ends its answer. Returns: whether the call gave up.
+    EAnswer EnumerateEndless();
+    // A method whose provider starts a process and crashes.
+    EAnswer ForkAndCrash();
+
     // Returns: the process that runs the probe's library; 0 when the probe fails to answer.
     pid_t ProbeProcess();
 

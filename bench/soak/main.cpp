@@ -14,11 +14,14 @@
 #include <host/TRootObject.h>
 
 #include <algorithm>
+#include <atomic>
 #include <chrono>
+#include <csignal>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <map>
+#include <random>
 #include <thread>
 
 #include <unistd.h>
@@ -68,6 +71,8 @@ class TSoak
   private:
     void Cycle(EFault fault);
     void UseNamespace(NKOLVRX20::ICIMNamespace& ns, EFault fault);
+    void Suffer(TInventory& inventory, EFault fault, pid_t process);
+    void SufferBefore(EFault fault);
     void Recover(TInventory& inventory);
     void Rounds(TInventory& inventory, bool healthy);
     void Note(const char* operation, bool healthy, EAnswer (TInventory::*ask)(), TInventory& inventory);
@@ -80,6 +85,8 @@ class TSoak
     TResources fWarm{};
     TResources fLast{};
     TClock::time_point fStart = TClock::now();
+    std::mt19937 fRandom{1};
+    std::atomic<bool> fSecondFailed{false};
 };
 
 // Times and counts one operation. While the tree is healthy, less than the whole answer is a wrong one.
@@ -134,8 +141,7 @@ void TSoak::UseNamespace(NKOLVRX20::ICIMNamespace& ns, EFault fault)
         std::fprintf(stderr, "soak: cycle %ld: no process to do \"%s\" to\n", fCounts.fCycles, NameOf(fault));
         return;
     }
-    Inject(fault, process,
-           [&] { Note("enumerate 1,000 instances", IsHarmless(fault), &TInventory::EnumerateProbe, inventory); });
+    Suffer(inventory, fault, process);
     ++fCounts.fFaults[NameOf(fault)];
     if (IsServerFault(fault)) {
         Rounds(inventory, false);
@@ -144,10 +150,65 @@ void TSoak::UseNamespace(NKOLVRX20::ICIMNamespace& ns, EFault fault)
     }
 }
 
+void TSoak::Suffer(TInventory& inventory, EFault fault, pid_t process)
+{
+    switch (fault) {
+    case EFault::kEndlessVendor:
+        Note("enumerate without end", true, &TInventory::EnumerateEndless, inventory);
+        return;
+    case EFault::kForkingVendor:
+        Note("fork and crash", true, &TInventory::ForkAndCrash, inventory);
+        return;
+    case EFault::kNoDescriptors: {
+        const TLoweredLimit limit(RLIMIT_NOFILE, 3);
+        Note("enumerate 1,000 instances", false, &TInventory::EnumerateProbe, inventory);
+        return;
+    }
+    case EFault::kSecondHost: {
+        std::thread other([this] {
+            const int status = RunHost(fRoot + "-second", fConsumer + "-second", 0ms);
+            if (status != 0) {
+                std::fprintf(stderr, "soak: the second host ended with status %d\n", status);
+                fSecondFailed = true;
+            }
+        });
+        Rounds(inventory, true);
+        other.join();
+        fCounts.fWrong += fSecondFailed.exchange(false) ? 1 : 0;
+        return;
+    }
+    default:
+        Inject(fault, process,
+               [&] { Note("enumerate 1,000 instances", IsHarmless(fault), &TInventory::EnumerateProbe, inventory); });
+    }
+}
+
+// What happens to the tree while no namespace is open; the next start must overcome it.
+void TSoak::SufferBefore(EFault fault)
+{
+    constexpr int kHostsLifeMs = 8000;
+    constexpr rlim_t kFullDiskBytes = 16 << 10;
+    if (fault == EFault::kHostKilled) {
+        RunHost(fRoot, fConsumer, std::chrono::milliseconds(std::uniform_int_distribution<>(1, kHostsLifeMs)(fRandom)));
+    } else if (fault == EFault::kForeignRepository) {
+        LayForeignRepository(fRoot);
+    } else if (fault == EFault::kFullDisk) {
+        std::signal(SIGXFSZ, SIG_IGN); // a write fails then, here and in the programs that are run
+        const TLoweredLimit limit(RLIMIT_FSIZE, kFullDiskBytes);
+        const std::string error = vrxhost::ErrorOf([&] {
+            vrxhost::TSession session(fRoot + "/libpegasus.nsp.so", fConsumer);
+            session.Open();
+            session.Close();
+        });
+        fCounts.fLost += error.empty() ? 0 : 1;
+    }
+}
+
 void TSoak::Cycle(EFault fault)
 {
     ::alarm(kHungSeconds);
     TConfig::GetInstance()->setValue("pegasus_multi_thread", fCounts.fCycles % 2 == 0 ? "off" : "on");
+    SufferBefore(fault);
     const std::string error = vrxhost::ErrorOf([&] {
         vrxhost::TSession session(fRoot + "/libpegasus.nsp.so", fConsumer);
         session.Open();

@@ -43,7 +43,7 @@ struct TOptions
     std::string fPlugin;
     std::string fConsumer;      // empty: fTreeConsumer
     std::string fTreeConsumer;  // for which the tree's server runs
-    bool fPlansConsumer = true; // the server must be told
+    bool fPlansConsumer = true; // the server has to know it
     std::string fConfigFile;    // empty: none
     std::string fLogFile;
     std::vector<std::pair<std::string, std::string>> fSettings;

@@ -35,7 +35,7 @@ class TDeployedTree
     // empty, one made of the root's path. An installed OpenPegasus was built for one consumer, which the mark names.
     // Throws: TTreeError when that is another one than the wanted.
     std::string GetConsumer(const std::string& wanted) const;
-    // Returns: whether the server must be told its consumer.
+    // Returns: whether the server has to get its consumer from the host.
     bool HasSettableConsumer() const { return fKind == EServerKind::kEmbedded; }
 
   private:

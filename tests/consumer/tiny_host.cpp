@@ -145,6 +145,9 @@ int main(int argc, char** argv)
     } catch (const std::exception& e) {
         std::fprintf(stderr, "tiny_host: %s\n", e.what());
         status = 1;
+    } catch (...) { // exceptions of the client library have a base class of their own
+        std::fprintf(stderr, "tiny_host: an exception of the client library\n");
+        status = 1;
     }
     clearNamespace();
     return ::dlclose(plugin) == 0 ? status : 1;

@@ -89,15 +89,19 @@ class Tree:
 
     def take_first_port_with(self, other):
         """The first start of this tree's server fails, because the other tree's has taken the port."""
-        program = self.path("pegasus", "bin", "cimserver")
-        os.rename(program, program + ".real")
         subprocess.run([other.path("pegasus", "bin", "cimconfig"), "-s", f"consumer={other.consumer}", "-p"], check=True,
                        stdout=subprocess.DEVNULL)
+        self.replace_first_server(f'PEGASUS_HOME={other.path("pegasus")} {other.path("pegasus", "bin", "cimserver")} "$@"')
+
+    def replace_first_server(self, command):
+        """The first start of this tree's server runs a shell command and fails."""
+        program = self.path("pegasus", "bin", "cimserver")
+        os.rename(program, program + ".real")
         with open(program, "w", encoding="ascii") as file:
             file.write(f"""#!/bin/sh
 case "$1" in httpPort=*) if [ ! -e {self.root}/taken ]; then
     touch {self.root}/taken
-    PEGASUS_HOME={other.path("pegasus")} {other.path("pegasus", "bin", "cimserver")} "$@"
+    {command}
     exit 1
 fi ;; esac
 exec {program}.real "$@"

@@ -116,6 +116,21 @@ void addArrayVectors(VectorTable& table)
     table["Array<Uint32>(3,7)[2]"] = [](const Vector&) { return Array<Uint32>(3, 7)[2]; };
 }
 
+void addDecodingVectors(VectorTable& table)
+{
+    const auto literal = [](const char* bytes) { return sizeOf([=] { return String(bytes); }); };
+    table["String(UTF-8 é) size"] = literal("\xC3\xA9");
+    table["String(UTF-8 😀) size and units"] = [](const Vector&) {
+        const String emoji("\xF0\x9F\x98\x80");
+        return json{emoji.size(), Uint16(emoji[0]), Uint16(emoji[1])};
+    };
+    table["String(invalid UTF-8 C3 28)"] = literal("\xC3\x28");
+    table["String(truncated UTF-8 'abc' E5 90)"] = literal("abc\xE5\x90");
+    table["String(Latin-1 E9 then text)"] = literal("caf\xE9 x");
+    table["String(overlong C0 80)"] = literal("\xC0\x80");
+    table["String(UTF-8 surrogate ED A0 80)"] = literal("\xED\xA0\x80");
+}
+
 } // namespace
 
 void addExceptionVectors(VectorTable& table)
@@ -170,17 +185,7 @@ void addExceptionVectors(VectorTable& table)
 
 void addStringVectors(VectorTable& table)
 {
-    const auto literal = [](const char* bytes) { return sizeOf([=] { return String(bytes); }); };
-    table["String(UTF-8 é) size"] = literal("\xC3\xA9");
-    table["String(UTF-8 😀) size and units"] = [](const Vector&) {
-        const String emoji("\xF0\x9F\x98\x80");
-        return json{emoji.size(), Uint16(emoji[0]), Uint16(emoji[1])};
-    };
-    table["String(invalid UTF-8 C3 28)"] = literal("\xC3\x28");
-    table["String(truncated UTF-8 'abc' E5 90)"] = literal("abc\xE5\x90");
-    table["String(Latin-1 E9 then text)"] = literal("caf\xE9 x");
-    table["String(overlong C0 80)"] = literal("\xC0\x80");
-    table["String(UTF-8 surrogate ED A0 80)"] = literal("\xED\xA0\x80");
+    addDecodingVectors(table);
     table["subString(*,*) of *"] = [](const Vector& v) {
         return utf8(text(v.arguments[2]).subString(static_cast<Uint32>(v.number()), static_cast<Uint32>(v.number(1))));
     };
