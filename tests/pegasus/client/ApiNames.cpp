@@ -370,6 +370,9 @@ void useOperations(CIMClient& client, const CIMPropertyList& list)
     client.setQualifier("root/cimv2", declaration);
     client.createClass("root/cimv2", cimClass);
     const CIMObjectPath created = client.createInstance("root/cimv2", instance);
+    client.modifyInstance("root/cimv2", instance);
+    client.modifyInstance("root/cimv2", instance, false, list);
+    client.deleteInstance("root/cimv2", created);
     Array<CIMParamValue> outputs;
     const CIMValue result = client.invokeMethod("root/cimv2", created, "M", Array<CIMParamValue>(), outputs);
     client.disconnect();

@@ -167,6 +167,8 @@ std::string RecordedCall::run(CIMClient& client)
         client.createClass(ns, fDecoder.decodeClass(parameter("NewClass")));
     } else if (fMethod == "SetQualifier") {
         client.setQualifier(ns, fDecoder.decodeQualifierDeclaration(parameter("QualifierDeclaration")));
+    } else if (fMethod == "DeleteInstance") {
+        client.deleteInstance(ns, fDecoder.decodeInstanceName(parameter("InstanceName")));
     } else if (fMethod == "CreateInstance") {
         return std::string(
             client.createInstance(ns, fDecoder.decodeInstance(parameter("NewInstance"))).toString().getCString());

@@ -201,7 +201,8 @@ bool isReplayed(const RecordedExchange& recorded)
         return false;
     }
     const bool isMethod = recorded.request.find("<METHODCALL ") != std::string::npos;
-    return (isMethod || recorded.method == "EnumerateInstances" || recorded.method == "GetInstance") &&
+    return (isMethod || recorded.method == "EnumerateInstances" || recorded.method == "GetInstance" ||
+            recorded.method == "DeleteInstance") &&
            isOfProviders(recorded);
 }
 

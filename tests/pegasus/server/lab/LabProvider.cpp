@@ -131,6 +131,12 @@ CMPIStatus getInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* re
     });
 }
 
+// Deletes nothing: the recorded provider refuses, with the status of its class.
+CMPIStatus deleteInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath* of)
+{
+    return statusOf(textOf(of->ft->getClassName(of, nullptr)));
+}
+
 void giveBack(const std::string& prefix, const CMPIArgs* in, CMPIArgs* out)
 {
     const CMPICount count = in->ft->getArgCount(in, nullptr);
@@ -172,7 +178,7 @@ template <typename Interface> CMPIStatus cleanup(Interface*, const CMPIContext*,
     return {CMPI_RC_OK, nullptr};
 }
 
-// An older provider's tables: the slots for writing and querying are there and stay unused.
+// An older provider's tables: the slots for other writing and for querying are there and stay unused.
 const CMPIInstanceMIFT kInstanceTable = {CMPIVersion100,
                                          CMPIVersion100,
                                          "instanceLab",
@@ -182,7 +188,7 @@ const CMPIInstanceMIFT kInstanceTable = {CMPIVersion100,
                                          getInstance,
                                          nullptr,
                                          nullptr,
-                                         nullptr,
+                                         deleteInstance,
                                          nullptr,
                                          nullptr};
 const CMPIMethodMIFT kMethodTable = {CMPIVersion100, CMPIVersion100, "methodLab", cleanup<CMPIMethodMI>, invokeMethod};
