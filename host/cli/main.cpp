@@ -102,6 +102,7 @@ EExitStatus Run(TOptions& options)
     SetRoot(TDeployedTree(root.GetPath()), options);
     CheckOwners(options, owners);
     LoadSettings(options.fConfigFile, options.fSettings);
+    std::signal(SIGCHLD, SIG_DFL); // inherited as ignored, it would hide how programs ended
     std::signal(SIGPIPE, SIG_IGN); // a reader that has gone is a write error here
     OpenLog(options);
     TRun run(options);

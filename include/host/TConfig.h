@@ -22,8 +22,8 @@ class TConfig
     // Returns: the value of the key, an override first; the empty text when it is unset.
     std::string getValue(const std::string& key) const;
 
-    // Reads a file of "key = value" lines; "#" starts a comment line, blanks around key and value are cut off. Values
-    // replace those of earlier files.
+    // Reads a file of "key = value" lines; "#" starts a comment line, blanks around key and value are cut off. A
+    // byte-order mark at the start is skipped. Values replace those of earlier files.
     // Throws: TVRXException 3 when the file cannot be read or is larger than 1 MiB, 14 for a line without "="; nothing
     // is taken over then.
     void Load(const std::string& path);

@@ -33,8 +33,9 @@ class TInmemInstance : public ICIMInstance, public boost::enable_shared_from_thi
     void AddToNamespace(TCIMContext context) override;
     void ModifyInstance(boost::shared_ptr<ICIMInstance> newValues, TCIMContext context) override;
     void Delete(TCIMContext context) override;
-    // Returns: the class's namespace, and a path made of the class name and the values of its key properties; strings
-    // are quoted, numbers and booleans are bare.
+    // Returns: the class's namespace, and a path made of the class name and the values of its key properties, in the
+    // order in which the class enumerates its keys and with the types that it declares; strings are quoted, numbers and
+    // booleans are bare.
     TCIMReference GetReference(TCIMContext context) const override;
     boost::shared_ptr<ICIMClass> GetClass(TCIMContext context) const override;
     // Returns: the empty text.

@@ -37,7 +37,8 @@ class TXmlParser
     virtual void FatalError(const char* message) = 0;
 
     // Parses a whole document. What precedes an error has been delivered.
-    // In the reference host: at most 16 MiB and 64 levels; entity declarations are refused.
+    // In the reference host: at most 16 MiB and 64 levels; entity declarations are refused. References to entities of
+    // unread DTDs and parameter entities are refused too.
     // Returns: true when the text was well formed.
     // Throws: what a callback throws, after the parser has stopped; std::bad_alloc.
     bool Parse(const char* buffer, std::size_t length);

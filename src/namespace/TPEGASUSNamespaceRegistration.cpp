@@ -2,7 +2,6 @@
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/common/Files.h"
-#include "src/common/Timeouts.h"
 #include "src/namespace/NamespaceConstants.h"
 #include "src/namespace/ProviderThreads.h"
 #include "src/namespace/TPEGASUSNamespace.h"

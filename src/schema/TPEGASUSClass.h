@@ -22,6 +22,13 @@ class TPEGASUSNamespace;
 class TPEGASUSPropertyDecl;
 class TPEGASUSProvider;
 
+// Returns: the leading number of seconds of a class's timeout text in milliseconds. The product wraps at 32 bits; a
+// text that lacks a leading number gives 0.
+unsigned int MillisecondsFromText(const std::string& seconds);
+
+// Returns: whether the text is a number of seconds, and its milliseconds fit into 32 bits.
+bool IsPlainTimeout(const std::string& seconds);
+
 // The host's image of one class of the server. Declarations are read once, when the namespace makes the class;
 // instances are fetched from the server at every call.
 //

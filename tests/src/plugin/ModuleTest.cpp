@@ -18,13 +18,19 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <clocale>
+#include <csignal>
 #include <cstdio>
 #include <filesystem>
+#include <functional>
+#include <locale>
 #include <memory>
 #include <set>
 
 #include <dlfcn.h>
 #include <malloc.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 namespace NKOLVRX20 {
@@ -195,6 +201,81 @@ TEST_F(ModuleTest, LeavesNothingBehindHoweverOftenItIsLoaded)
 #if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
     EXPECT_LT(::mallinfo2().uordblks, bytes + 16384) << "forty rounds more";
 #endif
+}
+
+// Returns: what the plug-in must leave as it is, one line for each thing.
+std::vector<std::string> StateOfTheProcess()
+{
+    std::vector<std::string> state = {std::filesystem::current_path(), std::setlocale(LC_ALL, nullptr),
+                                      std::locale().name()};
+    const mode_t mask = ::umask(0);
+    ::umask(mask);
+    rlimit files = {};
+    ::getrlimit(RLIMIT_NOFILE, &files);
+    for (const long number : {static_cast<long>(mask), static_cast<long>(files.rlim_cur), CountEntries("/proc/self/fd"),
+                              CountEntries("/proc/self/task")})
+    {
+        state.push_back(std::to_string(number));
+    }
+    sigset_t blocked = {};
+    ::pthread_sigmask(SIG_BLOCK, nullptr, &blocked);
+    for (int number = 1; number < NSIG; ++number) {
+        struct sigaction action = {};
+        ::sigaction(number, nullptr, &action);
+        state.push_back(std::to_string(number) + (::sigismember(&blocked, number) == 1 ? " blocked " : " ") +
+                        ::testing::PrintToString(action.sa_handler));
+    }
+    for (char** entry = environ; *entry; ++entry) {
+        state.emplace_back(*entry);
+    }
+    return state;
+}
+
+TEST_F(ModuleTest, IsAGuestThatWorksInEveryProcessAndChangesNothing)
+{
+    const auto limitFiles = [](rlim_t files) {
+        rlimit limit = {};
+        ::getrlimit(RLIMIT_NOFILE, &limit);
+        limit.rlim_cur = std::min(files, limit.rlim_max);
+        ASSERT_EQ(0, ::setrlimit(RLIMIT_NOFILE, &limit));
+    };
+    const auto block = [](int how) {
+        sigset_t all = {};
+        ::sigfillset(&all);
+        ::pthread_sigmask(how, &all, nullptr);
+    };
+    struct
+    {
+        const char* fName;
+        std::function<void()> fSet, fReset;
+    } const rows[] = {
+        {"SIGCHLD ignored", [] { std::signal(SIGCHLD, SIG_IGN); }, [] { std::signal(SIGCHLD, SIG_DFL); }},
+        {"SIGPIPE ignored", [] { std::signal(SIGPIPE, SIG_IGN); }, [] { std::signal(SIGPIPE, SIG_DFL); }},
+        {"SIGPIPE handled", [] { std::signal(SIGPIPE, [](int) {}); }, [] { std::signal(SIGPIPE, SIG_DFL); }},
+        {"signals blocked", [&] { block(SIG_BLOCK); }, [&] { block(SIG_UNBLOCK); }},
+        {"another locale", [] { std::locale::global(std::locale("C.UTF-8")); },
+         [] { std::locale::global(std::locale::classic()); }},
+        {"umask 0", [] { ::umask(0); }, [] { ::umask(022); }},
+        {"few descriptors", [&] { limitFiles(64); }, [&] { limitFiles(1024); }},
+        {"many descriptors", [&] { limitFiles(1UL << 20); }, [&] { limitFiles(1024); }},
+    };
+    for (const char* threads : {"off", "on"}) {
+        TConfig::GetInstance()->setValue("pegasus_multi_thread", threads);
+        for (const auto& row : rows) {
+            SCOPED_TRACE(std::string(row.fName) + ", threads " + threads);
+            row.fSet();
+            const auto before = StateOfTheProcess();
+            {
+                const auto server = StartServer();
+                TDeployedModule module("acme");
+                module.Load();
+                EXPECT_EQ(1, CountInstances(module)) << ::testing::PrintToString(fLog.Lines());
+                module.Clear();
+            }
+            EXPECT_EQ(before, StateOfTheProcess());
+            row.fReset();
+        }
+    }
 }
 
 TEST_F(ModuleTest, TwoCopiesDoNotMeet)
