@@ -23,13 +23,15 @@ std::string Trimmed(const std::string& text)
 std::string ReadWhole(const std::string& path)
 {
     std::ifstream file(path, std::ios::binary);
-    std::string text(kMaxFileBytes + 1, '\0');
-    file.read(&text[0], static_cast<std::streamsize>(text.size()));
+    std::string text;
+    for (char piece[4096]; file.good() && text.size() <= kMaxFileBytes;) {
+        file.read(piece, sizeof piece);
+        text.append(piece, static_cast<std::size_t>(file.gcount()));
+    }
     // A directory opens like a file; only reading it fails.
-    if (!file.is_open() || file.bad() || static_cast<std::size_t>(file.gcount()) > kMaxFileBytes) {
+    if (!file.is_open() || file.bad() || text.size() > kMaxFileBytes) {
         throw TVRXException(TVRXStatusCode::kBadPath);
     }
-    text.resize(static_cast<std::size_t>(file.gcount()));
     return text;
 }
 
