@@ -7,6 +7,7 @@ import glob
 import json
 import os
 import re
+import resource
 import shutil
 import signal
 import subprocess
@@ -99,6 +100,21 @@ class HealthyTree(TreeTest):
         self.assertEqual(status, COMPLETE)
         self.assertEqual(len(instances(document, "LNX_NetworkPort")), len(interfaces()))
         self.assert_nothing_left()
+
+    def test_hosts_of_other_habits(self):
+        for files, umask, disposition in (64, 0, signal.SIG_IGN), (4096, 0o077, signal.SIG_DFL):
+            def change():
+                signal.signal(signal.SIGCHLD, disposition)
+                signal.signal(signal.SIGPIPE, disposition)
+                signal.pthread_sigmask(signal.SIG_BLOCK, {signal.SIGCHLD, signal.SIGPIPE, signal.SIGUSR1})
+                os.umask(umask)
+                resource.setrlimit(resource.RLIMIT_NOFILE, (files, files))
+            out, err = self.tree.start("inventory", "--format", "json", preexec_fn=change).communicate(timeout=120)
+            self.assertEqual(err, "")
+            document = json.loads(out)
+            self.assertTrue(document["complete"])
+            self.assertEqual([row["name"] for row in document["providers"][0]["classes"]], CLASSES)
+            self.assertEqual(len(instances(document, "LNX_NetworkPort")), len(interfaces()))
 
 
 class InstalledTree(TreeTest):
