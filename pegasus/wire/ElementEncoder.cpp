@@ -282,11 +282,15 @@ const char* keyTypeName(CIMKeyBinding::Type type)
     }
 }
 
+// The one key of a path may come without its name (DSP0201, INSTANCENAME).
 void appendKeyBinding(std::string& out, const CIMKeyBinding& key)
 {
-    out += "<KEYBINDING";
-    appendAttribute(out, "NAME", key.getName().getString());
-    out += ">\n";
+    const bool isNamed = !key.getName().isNull();
+    if (isNamed) {
+        out += "<KEYBINDING";
+        appendAttribute(out, "NAME", key.getName().getString());
+        out += ">\n";
+    }
     if (key.getType() == CIMKeyBinding::REFERENCE) {
         appendReference(out, CIMObjectPath(key.getValue()));
     } else {
@@ -296,7 +300,9 @@ void appendKeyBinding(std::string& out, const CIMKeyBinding& key)
         appendEscaped(out, key.getValue());
         out += "</KEYVALUE>\n";
     }
-    out += "</KEYBINDING>\n";
+    if (isNamed) {
+        out += "</KEYBINDING>\n";
+    }
 }
 
 // INSTANCENAME for a path with keys, else CLASSNAME.
