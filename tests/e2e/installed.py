@@ -29,7 +29,7 @@ class Installed(unittest.TestCase):
     def configure(self):
         options = ["-DCMAKE_BUILD_TYPE=RelWithDebInfo", "-DVRX_BUILD_TESTS=OFF", "-DVRX_BUILD_BENCH=OFF",
                    "-DVRX_BUILD_FUZZ=OFF", "-DPEGASUS_CONSUMER=lab"]
-        return subprocess.run(["cmake", "-S", SOURCE, "-B", self.build, "-G", "Ninja", f"-DPEGASUS_ROOT={self.pegasus}",
+        return subprocess.run(["cmake", "--fresh", "-S", SOURCE, "-B", self.build, "-G", "Ninja", f"-DPEGASUS_ROOT={self.pegasus}",
                                *options], capture_output=True, text=True, timeout=120, check=False)
 
     def text(self, *parts):
