@@ -1,6 +1,6 @@
 # Flags that make a fault of the programs hard to exploit, for the targets of the current folder and of those that are
 # added after this. tools/check hardening looks for them in the compile commands and in the files of a staged tree.
-# The builds with sanitizers keep to the sanitizers' own checks.
+# The release preset switches them on. The builds with sanitizers keep to the sanitizers' own checks.
 option(VRX_HARDENING "Stack protector, FORTIFY, BIND_NOW and the like in the product" OFF)
 if(NOT VRX_HARDENING OR CMAKE_CXX_FLAGS MATCHES "-fsanitize")
   return()
