@@ -23,7 +23,8 @@ void CmpiInit()
         return;
     }
     const std::string file = library.dli_fname;
-    TPEGASUSNamespaceProvider::GetfgModulePathName() = file.substr(0, file.rfind('/'));
+    const auto slash = file.rfind('/');
+    TPEGASUSNamespaceProvider::GetfgModulePathName() = slash == std::string::npos ? "." : file.substr(0, slash);
 }
 
 namespace {

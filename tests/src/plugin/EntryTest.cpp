@@ -61,16 +61,16 @@ TEST_F(EntryTest, RecordsItsDirectoryOrSaysThatItCannot)
     CmpiInit();
     EXPECT_EQ("", path);
     EXPECT_THAT(fRig.fLog.Take(), ElementsAre("0|PEGASUS NSP initialization failed"));
-    for (const char* file : {"/opt/x/lib/libplug.so", "./libplug.so"}) {
-        fRig.fWorld.fDladdrFile = file;
-        CmpiInit();
-        EXPECT_EQ(std::string(file).substr(0, std::string(file).rfind('/')), path);
-    }
     const std::string deep = "/" + std::string(600, 'd');
-    const std::string file = deep + "/libplug.so";
-    fRig.fWorld.fDladdrFile = file.c_str();
-    CmpiInit();
-    EXPECT_EQ(deep, path);
+    const std::pair<std::string, std::string> rows[] = {{"/opt/x/lib/libplug.so", "/opt/x/lib"},
+                                                        {"./libplug.so", "."},
+                                                        {"libplug.so", "."},
+                                                        {deep + "/libplug.so", deep}};
+    for (const auto& [file, directory] : rows) {
+        fRig.fWorld.fDladdrFile = file.c_str();
+        CmpiInit();
+        EXPECT_EQ(directory, path);
+    }
 }
 
 TEST_F(EntryTest, TheNamespaceIsTheSameWhateverIsAskedForAndAnotherTakesItsPlace)
