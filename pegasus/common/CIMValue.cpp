@@ -4,21 +4,6 @@
 
 namespace Pegasus {
 
-CIMValueRep::~CIMValueRep()
-{
-    if (fIsNull) {
-        return;
-    }
-    visitType(CIMType(fType), [this](auto tag) {
-        using T = typename decltype(tag)::Type;
-        if (fIsArray) {
-            drop<Array<T>>();
-        } else {
-            drop<T>();
-        }
-    });
-}
-
 template class RepPointer<CIMValueRep>;
 
 namespace {

@@ -126,6 +126,21 @@ template <typename Visitor> decltype(auto) visitType(CIMType type, Visitor&& vis
     }
 }
 
+inline CIMValueRep::~CIMValueRep()
+{
+    if (fIsNull) {
+        return;
+    }
+    visitType(CIMType(fType), [this](auto tag) {
+        using T = typename decltype(tag)::Type;
+        if (fIsArray) {
+            drop<Array<T>>();
+        } else {
+            drop<T>();
+        }
+    });
+}
+
 // The library's own access to values; it does not copy what they hold.
 struct ValueAccess
 {

@@ -69,6 +69,25 @@ class Staging(TreeTest):
             self.assertIn(os.path.join(root, "pegasus", "tree.conf"), modes)
 
 
+class TwoTrees(TreeTest):
+    """One host process uses a tree and then another, as two builds: each brings its own libraries and takes them away."""
+
+    def test_each_has_its_own_client_library_and_leaves_none(self):
+        other = Tree(BUILD)
+        self.addCleanup(other.remove)
+        command = [os.path.join(BUILD, "tests", "e2e", "two_trees")]
+        for tree in (self.tree, other):
+            subprocess.run([tree.path("pegasus", "bin", "cimconfig"), "-s", f"consumer={tree.consumer}", "-p"], check=True,
+                           stdout=subprocess.DEVNULL)
+            command += [tree.root, tree.consumer]
+        done = subprocess.run(command, stdout=subprocess.PIPE, stderr=subprocess.PIPE, text=True, timeout=300, check=False)
+        self.assertEqual((done.returncode, done.stderr), (0, ""), done.stdout)
+        counts, libraries = zip(*(line.split() for line in done.stdout.splitlines()))
+        self.assertEqual(list(libraries), [tree.path("pegasus", "lib", "libpegclient.so.1") for tree in (self.tree, other)])
+        self.assertGreater(min(map(int, counts)), 0)
+        self.assertEqual(self.tree.leftovers() + other.leftovers(), [])
+
+
 class HealthyTree(TreeTest):
     def test_json_shows_this_machine(self):
         status, document, err = self.tree.inventory()
