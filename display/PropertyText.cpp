@@ -9,7 +9,9 @@
 
 namespace NKOLVRX20 {
 
-std::vector<std::string> PropertyTexts(const TCIMValue& value, const boost::shared_ptr<ICIMPropertyDecl>& declaration)
+namespace {
+
+std::vector<std::string> Texts(const TCIMValue& value, const ICIMNamedElement* declaration)
 {
     if (value.IsNull()) {
         return {};
@@ -28,9 +30,21 @@ std::vector<std::string> PropertyTexts(const TCIMValue& value, const boost::shar
     return texts;
 }
 
+} // namespace
+
+std::vector<std::string> PropertyTexts(const TCIMValue& value, const boost::shared_ptr<ICIMPropertyDecl>& declaration)
+{
+    return Texts(value, declaration.get());
+}
+
 std::string PropertyText(const TCIMValue& value, const boost::shared_ptr<ICIMPropertyDecl>& declaration)
 {
     return JoinTexts(PropertyTexts(value, declaration), ", ");
+}
+
+std::string ElementText(const TCIMValue& value, const ICIMNamedElement* declaration)
+{
+    return JoinTexts(Texts(value, declaration), ", ");
 }
 
 } // namespace NKOLVRX20

@@ -10,6 +10,7 @@
 
 namespace NKOLVRX20 {
 
+class ICIMNamedElement;
 class ICIMPropertyDecl;
 
 // The text of each element, by the rules of TTextRules; the plain text where the declaration is null.
@@ -19,5 +20,8 @@ std::vector<std::string> PropertyTexts(const TCIMValue& value, const boost::shar
 
 // Returns: the same texts joined by ", ".
 std::string PropertyText(const TCIMValue& value, const boost::shared_ptr<ICIMPropertyDecl>& declaration);
+
+// Returns: the same for a value that a method or a parameter declares; the declaration may be null.
+std::string ElementText(const TCIMValue& value, const ICIMNamedElement* declaration);
 
 } // namespace NKOLVRX20

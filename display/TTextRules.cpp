@@ -2,7 +2,7 @@
 
 #include "display/PlainText.h"
 
-#include <host/ICIMPropertyDecl.h>
+#include <host/ICIMNamedElement.h>
 #include <host/ICIMQualifier.h>
 
 #include <algorithm>
@@ -63,13 +63,13 @@ std::string HexText(unsigned long number)
     return "0x" + std::string(digits, end.ptr);
 }
 
-TCIMValue QualifierValue(const ICIMPropertyDecl& declaration, const char* name)
+TCIMValue QualifierValue(const ICIMNamedElement& declaration, const char* name)
 {
     const auto qualifier = declaration.GetQualifier(name, {});
     return qualifier ? qualifier->GetValue({}) : TCIMValue();
 }
 
-TTexts QualifierTexts(const ICIMPropertyDecl& declaration, const char* name)
+TTexts QualifierTexts(const ICIMNamedElement& declaration, const char* name)
 {
     TTexts texts;
     const TCIMValue value = QualifierValue(declaration, name);
@@ -82,7 +82,7 @@ TTexts QualifierTexts(const ICIMPropertyDecl& declaration, const char* name)
 }
 
 // Units is deprecated in favour of PUnit (DSP0004, 5.6.3), but reads better.
-std::string UnitText(const ICIMPropertyDecl& declaration)
+std::string UnitText(const ICIMNamedElement& declaration)
 {
     const std::string units = QualifierValue(declaration, "Units").ToString(kDecimal);
     return units.empty() ? QualifierValue(declaration, "PUnit").ToString(kDecimal) : units;
@@ -106,7 +106,7 @@ void AddOnce(TTexts& texts, const std::string& text)
 
 } // namespace
 
-TTextRules::TTextRules(const ICIMPropertyDecl& declaration)
+TTextRules::TTextRules(const ICIMNamedElement& declaration)
     : fValueMap(QualifierTexts(declaration, "ValueMap")), fValues(QualifierTexts(declaration, "Values")),
       fBitMap(QualifierTexts(declaration, "BitMap")), fBitValues(QualifierTexts(declaration, "BitValues")),
       fUnit(UnitText(declaration))

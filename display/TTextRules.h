@@ -9,14 +9,15 @@
 
 namespace NKOLVRX20 {
 
-class ICIMPropertyDecl;
+class ICIMNamedElement;
 
-// What the qualifiers of a property's declaration say about texts, read once for all elements of a value.
+// What the qualifiers of a declaration (of a property, a method, a parameter) say about texts, read once for all
+// elements of a value.
 class TTextRules
 {
   public:
     // Throws: what the declaration throws.
-    explicit TTextRules(const ICIMPropertyDecl& declaration);
+    explicit TTextRules(const ICIMNamedElement& declaration);
 
     // The first rule that applies gives the text:
     // 1. Values, for an integer, a string or a char16 that ValueMap has an entry for. Where ValueMap is missing, an

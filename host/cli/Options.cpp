@@ -1,11 +1,17 @@
 #include "host/cli/Options.h"
 
 #include "host/cli/model/ErrorReport.h"
+#include "host/cli/model/Loss.h"
 
 #include <CLI/CLI.hpp>
 
+#include <algorithm>
+#include <cstdlib>
 #include <filesystem>
 #include <iostream>
+
+#include <sys/ioctl.h>
+#include <unistd.h>
 
 namespace vrxhost {
 namespace {
@@ -42,13 +48,36 @@ bool SplitSetting(const std::string& text, TOptions& options)
     return true;
 }
 
+// Of the terminal; a pipe has none.
+std::size_t LineWidth()
+{
+    constexpr std::size_t kDefaultWidth = 80;
+    const char* const columns = std::getenv("COLUMNS");
+    const long wanted = columns ? std::strtol(columns, nullptr, 10) : 0;
+    if (wanted > 0) {
+        return static_cast<std::size_t>(wanted);
+    }
+    winsize size = {};
+    return ::ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) == 0 && size.ws_col > 0 ? size.ws_col : kDefaultWidth;
+}
+
+bool IsColorWanted()
+{
+    const char* const noColor = std::getenv("NO_COLOR"); // any text but the empty one (no-color.org)
+    return ::isatty(STDOUT_FILENO) == 1 && !(noColor && *noColor != '\0');
+}
+
+void AddFormatOptions(CLI::App& app, TOptions& options)
+{
+    app.add_option("--format", options.fFormat, "Of the document (default table)")->check(CLI::IsMember(FormatNames()));
+    app.add_flag("--all", options.fFormatOptions.fAll, "Show keys too that repeat the class's or the system's name");
+    app.add_flag("--raw", options.fFormatOptions.fRaw, "Show numbers as they were delivered");
+    app.add_flag("--stable", options.fFormatOptions.fStable,
+                 "Leave out what differs between two runs: counters, gauges, times");
+}
+
 void AddOptions(CLI::App& app, TOptions& options, std::vector<std::string>& settings)
 {
-    app.add_option_function<std::string>(
-           "--format",
-           [&options](const std::string& name) { options.fFormat = name == "json" ? EFormat::kJson : EFormat::kTable; },
-           "Of the document (default table)")
-        ->check(CLI::IsMember({"table", "json"}));
     app.add_option("--consumer", options.fConsumer,
                    "Name that keeps this host's server apart from others' (default: made of the root)");
     app.add_option("--config", options.fConfigFile, "Settings file, lines \"key = value\" (default ROOT/vrx.conf)")
@@ -70,19 +99,21 @@ void AddOptions(CLI::App& app, TOptions& options, std::vector<std::string>& sett
     app.add_flag("-v,--verbose", options.fVerbose, "Show the log on standard error too");
 }
 
-void AddCommands(CLI::App& app, TOptions& options)
+constexpr char kHelpCommand[] = "help";
+
+void AddCommands(CLI::App& app, TOptions& options, std::string& helpTopic)
 {
-    const auto add = [&](const char* name, const char* text, ECommand command) {
-        CLI::App* const added = app.add_subcommand(name, text)->fallthrough();
+    const auto add = [&app](const char* name, const char* purpose) {
+        CLI::App* const added = app.add_subcommand(name, purpose)->fallthrough();
         added->set_help_flag(); // --help is the program's, with all options
-        return added->callback([&options, command] { options.fCommand = command; });
+        return added;
     };
-    add("inventory", "Show every provider's classes and their instances", ECommand::kInventory);
-    add("providers", "List the providers and their classes", ECommand::kProviders);
-    add("classes", "List the classes with their properties and methods", ECommand::kClasses);
-    add("instances", "Show one class's instances", ECommand::kInstances)
-        ->add_option("CLASS", options.fClassName, "The class's name")
-        ->required();
+    for (const std::shared_ptr<ICommand>& command : MakeCommands()) {
+        CLI::App* const added = add(command->GetName(), command->GetPurpose());
+        command->AddArguments(*added);
+        added->callback([&options, command] { options.fCommand = command; });
+    }
+    add(kHelpCommand, "Describe a command")->add_option("COMMAND", helpTopic, "The command's name");
 }
 
 std::vector<std::string> CommandNames(CLI::App& app)
@@ -118,7 +149,7 @@ void RefuseUnknown(CLI::App& app)
     }
     const bool hasCommand = !app.get_subcommands().empty();
     if (!hasCommand && unknown.empty()) {
-        throw TUsageError("a command is missing: inventory, providers, classes or instances; --help describes them");
+        throw TUsageError("a command is missing: " + JoinNames(CommandNames(app)) + "; --help describes them");
     }
     if (!hasCommand) {
         throw TUsageError("there is no command " + unknown.front() + Suggestion(unknown.front(), CommandNames(app)));
@@ -129,18 +160,33 @@ void RefuseUnknown(CLI::App& app)
 }
 
 // The format is asked for before the command line is read, because an error in it is reported in that format too.
-EFormat WantedFormat(int argc, const char* const* argv)
+std::string WantedFormat(int argc, const char* const* argv)
 {
     const std::vector<std::string> words(argv + 1, argv + argc);
-    const auto isJson = [](const std::string& word, const std::string& next) {
-        return word == "--format=json" || (word == "--format" && next == "json");
-    };
+    constexpr char kOption[] = "--format";
     for (std::size_t i = 0; i < words.size(); ++i) {
-        if (isJson(words[i], i + 1 < words.size() ? words[i + 1] : "")) {
-            return EFormat::kJson;
+        if (words[i] == kOption && i + 1 < words.size()) {
+            return words[i + 1];
+        }
+        if (words[i].rfind(std::string(kOption) + "=", 0) == 0) {
+            return words[i].substr(sizeof kOption);
         }
     }
-    return EFormat::kTable;
+    return "table";
+}
+
+// Throws: TUsageError for an unknown topic.
+void ShowHelp(CLI::App& app, const std::string& topic)
+{
+    const auto names = CommandNames(app);
+    if (topic.empty()) {
+        app.clear(); // with a command it would be the command's help alone, without the options
+        std::cout << app.help();
+    } else if (std::find(names.begin(), names.end(), topic) == names.end()) {
+        throw TUsageError("there is no command " + topic + Suggestion(topic, names));
+    } else {
+        std::cout << app.get_subcommand(topic)->help();
+    }
 }
 
 void FillDefaults(TOptions& options, const std::vector<std::string>& settings)
@@ -182,21 +228,33 @@ bool ParseOptions(int argc, const char* const* argv, TOptions& options)
 {
     CLI::App app("Shows the inventory that a namespace-provider plug-in serves.", "vrxhost");
     std::vector<std::string> settings;
+    std::string helpTopic;
     options.fFormat = WantedFormat(argc, argv);
+    options.fFormatOptions.fWidth = LineWidth();
+    options.fFormatOptions.fColor = IsColorWanted();
     app.footer(kFooter);
     app.allow_extras();
+    app.set_version_flag("--version", std::string("vrxhost ") + VRX_VERSION, "Print the version and exit");
+    AddFormatOptions(app, options);
     AddOptions(app, options, settings);
-    AddCommands(app, options);
+    AddCommands(app, options, helpTopic);
     try {
         app.parse(argc, argv);
     } catch (const CLI::CallForHelp&) {
-        app.clear(); // with a command it would be the command's help alone, without the options
-        std::cout << app.help();
+        ShowHelp(app, "");
+        return false;
+    } catch (const CLI::CallForVersion& e) {
+        std::cout << e.what() << "\n";
         return false;
     } catch (const CLI::ParseError& e) {
         throw TUsageError(e.what());
     }
     RefuseUnknown(app);
+    if (!options.fCommand) {
+        ShowHelp(app, helpTopic);
+        return false;
+    }
+    options.fCommandName = options.fCommand->GetName();
     FillDefaults(options, settings);
     return true;
 }

@@ -1,20 +1,16 @@
 #pragma once
 
 #include "host/cli/TDeployedTree.h"
-#include "host/cli/model/Document.h"
+#include "host/cli/commands/ICommand.h"
+#include "host/cli/formats/IFormat.h"
 
+#include <memory>
 #include <stdexcept>
 #include <string>
 #include <utility>
 #include <vector>
 
 namespace vrxhost {
-
-enum class EFormat
-{
-    kTable,
-    kJson
-};
 
 // What is wrong with the command line, as a sentence.
 class TUsageError : public std::runtime_error
@@ -35,9 +31,10 @@ enum EExitStatus : int
 
 struct TOptions
 {
-    ECommand fCommand = ECommand::kInventory;
-    std::string fClassName; // of kInstances
-    EFormat fFormat = EFormat::kTable;
+    std::shared_ptr<const ICommand> fCommand;
+    std::string fCommandName; // as far as it is known when the command line is wrong
+    std::string fFormat = "table";
+    TFormatOptions fFormatOptions;
     std::string fRoot;  // the directory in which everything runs
     std::string fState; // the user's choice of a private root; empty for none
     std::string fPlugin;
@@ -54,9 +51,9 @@ constexpr char kPluginFile[] = "libpegasus.nsp.so";
 constexpr char kConfigFile[] = "vrx.conf";
 constexpr char kLogFile[] = "vrxhost.log";
 
-// Reads the command line; paths come out absolute. Help goes to standard output. The format is filled in first, also
-// when reading the rest fails. Returns: false when help was all that was wanted. Throws: TUsageError,
-// std::filesystem::filesystem_error.
+// Reads the command line; paths come out absolute. Help and the version go to standard output. The format is filled in
+// first, also when reading the rest fails. Returns: false when help or the version was all that was wanted. Throws:
+// TUsageError, std::filesystem::filesystem_error.
 bool ParseOptions(int argc, const char* const* argv, TOptions& options);
 
 // Makes a tree the root: the default place of the plug-in, the settings file and the log, and what decides on the

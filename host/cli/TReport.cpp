@@ -9,11 +9,17 @@
 namespace vrxhost {
 
 TReport::TReport(const TOptions& options, const TStopSignals& stop, TLossLog& losses)
-    : fOptions(options), fStop(stop), fLosses(losses)
+    : fStop(stop), fLosses(losses), fHead(MakeHead(options.fCommandName)),
+      fFormat(MakeFormat(options.fFormat, options.fFormatOptions, [this](const std::string& text) { Write(text); }))
 {
 }
 
-void TReport::Show(std::vector<TProviderRecord> providers)
+IInstanceSink* TReport::BeginStream()
+{
+    return fFormat->BeginStream(fHead);
+}
+
+void TReport::Show(TDocument document)
 {
     if (std::exchange(fShown, true)) {
         return;
@@ -22,13 +28,12 @@ void TReport::Show(std::vector<TProviderRecord> providers)
     if (fInterrupted) {
         fLosses.Add("interrupted");
     }
-    TDocument document;
-    document.fCommand = fOptions.fCommand;
-    document.fProviders = std::move(providers);
     document.fLosses = fLosses.GetLosses();
     ReportLosses(document.fLosses);
     document.fComplete = !fPartial;
-    Write(fOptions.fFormat == EFormat::kJson ? RenderJson(document) : RenderTable(document));
+    fHead.fEnded = TimeNow();
+    document.fHead = fHead;
+    Write(fFormat->Finish(document));
 }
 
 void TReport::Write(const std::string& text)
@@ -51,13 +56,13 @@ void TReport::Fail(const std::string& reason)
         fLosses.AddHeldBack();
         fLosses.Add(reason);
     }
-    Show({});
+    Show(TDocument());
 }
 
 EExitStatus TReport::Finish()
 {
     if (fStop.IsStopped()) {
-        Show({});
+        Show(TDocument());
     } else {
         ReportLosses(fLosses.GetLosses());
     }

@@ -6,6 +6,7 @@
 #include "host/cli/losses/TLossLog.h"
 #include "host/cli/model/Document.h"
 
+#include <memory>
 #include <set>
 #include <string>
 #include <vector>
@@ -18,12 +19,15 @@ namespace vrxhost {
 class TReport
 {
   public:
-    // The arguments outlive the object.
+    // stop and losses outlive the object.
     TReport(const TOptions& options, const TStopSignals& stop, TLossLog& losses);
 
-    // Writes the document; after an interruption it is marked as partial. Later calls are ignored.
-    // Blocks: until the reader has taken it all; after an interruption half a second at most.
-    void Show(std::vector<TProviderRecord> providers);
+    // Returns: what takes the instances while they are collected; null for a format that needs the whole document.
+    IInstanceSink* BeginStream();
+
+    // Writes the document, whose head and losses are filled in here; after an interruption it is marked as partial.
+    // Later calls are ignored. Blocks: until the reader has taken it all; after an interruption half a second at most.
+    void Show(TDocument document);
 
     // For a run that failed before its inventory: enters the reason as a loss and shows a document with an empty list
     // of providers.
@@ -37,10 +41,11 @@ class TReport
     void Write(const std::string& text);
     void ReportLosses(const std::vector<TLoss>& losses);
 
-    const TOptions& fOptions;
     const TStopSignals& fStop;
     TLossLog& fLosses;
     TDocumentOutput fOutput;
+    TDocumentHead fHead;
+    const std::unique_ptr<IFormat> fFormat;
     bool fShown = false;
     bool fInterrupted = false; // before the document was written whole
     bool fFailed = false;

@@ -1,6 +1,6 @@
 #include "host/cli/TRun.h"
 
-#include "host/cli/TCollector.h"
+#include "host/cli/collect/TCollector.h"
 #include "host/cli/losses/TRegistrationCheck.h"
 #include "host/cli/model/ErrorReport.h"
 #include "host/core/TProcessControl.h"
@@ -165,34 +165,35 @@ void TRun::UsePlugin()
 
 void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
 {
-    std::vector<TProviderRecord> providers;
-    std::string noClass;
+    TDocument document;
+    std::string refused;
     const std::string error = ErrorOf([&] {
         TCollector collector(ns, fLosses, [this] { return fStop.IsStopped(); });
-        providers = collector.Collect(fOptions.fCommand, fOptions.fClassName);
-        if (fOptions.fCommand == ECommand::kInstances && providers.empty()) {
-            noClass =
-                "there is no class " + fOptions.fClassName + Suggestion(fOptions.fClassName, collector.GetClassNames());
+        collector.SetSink(fReport.BeginStream());
+        try {
+            fOptions.fCommand->Fill(collector, document);
+        } catch (const TRequestError& e) {
+            refused = e.what();
         }
     });
     if (!error.empty()) {
         fLosses.Add("the inventory is incomplete: " + error);
     }
     if (!fStop.IsStopped()) {
-        FindSilentLosses(ns, providers);
+        FindSilentLosses(ns, document);
     }
-    if (!noClass.empty()) {
-        fReport.Fail(noClass);
+    if (!refused.empty()) {
+        fReport.Fail(refused);
     } else {
-        fReport.Show(std::move(providers));
+        fReport.Show(std::move(document));
     }
 }
 
-void TRun::FindSilentLosses(NKOLVRX20::ICIMNamespace& ns, const std::vector<TProviderRecord>& providers)
+void TRun::FindSilentLosses(NKOLVRX20::ICIMNamespace& ns, const TDocument& document)
 {
     TRegistrationCheck check(ns, fVendors, fLosses);
-    if (fOptions.fCommand == ECommand::kInventory || fOptions.fCommand == ECommand::kInstances) {
-        check.Run(providers);
+    if (document.fDetail == EDetail::kInstances) {
+        check.Run(document.fProviders);
     }
     fLosses.AddServerLog(fServerLog.Read(), check.GetModuleVendors());
 }

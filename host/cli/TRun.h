@@ -48,7 +48,7 @@ class TRun
     void OpenNamespace(TSession& session);
     bool PauseBefore(int attempt) const;
     void Show(NKOLVRX20::ICIMNamespace& ns);
-    void FindSilentLosses(NKOLVRX20::ICIMNamespace& ns, const std::vector<TProviderRecord>& providers);
+    void FindSilentLosses(NKOLVRX20::ICIMNamespace& ns, const TDocument& document);
 
     const TOptions& fOptions;
     const std::string fConsumer;

@@ -78,16 +78,18 @@ NKOLVRX20::TUniqueFd EnterRoot(const std::string& root)
     return directory;
 }
 
-// Before there is a run: the reason, and for a reader of JSON a document with an empty list of providers.
+// Before there is a run: the reason, and for a program that reads JSON a document with an empty list of providers.
 EExitStatus Refuse(const TOptions& options, const std::string& reason, EExitStatus status)
 {
     ReportError(reason);
-    if (options.fFormat == EFormat::kJson) {
+    if (options.fFormat == "json" || options.fFormat == "ndjson") {
         TDocument document;
-        document.fCommand = options.fCommand;
+        document.fHead = MakeHead(options.fCommandName);
         document.fComplete = false;
         document.fLosses.push_back(LossOf(reason));
-        std::cout << RenderJson(document) << std::flush;
+        const auto format = MakeFormat(options.fFormat, options.fFormatOptions, nullptr);
+        format->BeginStream(document.fHead);
+        std::cout << format->Finish(document) << std::flush;
     }
     return status;
 }

@@ -15,6 +15,8 @@ import sys
 import time
 import unittest
 
+import jsonschema
+
 from tree import Tree
 
 BUILD = sys.argv[1] if len(sys.argv) > 1 else None
@@ -113,6 +115,35 @@ class HealthyTree(TreeTest):
             self.assertIn(name, shown)
             self.assertIn(address, shown)
         self.assert_nothing_left()
+
+    def test_documents_match_their_schemas(self):
+        schema = self.schema("document")
+        for arguments in (["inventory"], ["summary"], ["class", "LNX_OperatingSystem"],
+                          ["invoke", "LNX_OperatingSystem", "CountProcesses", "name=no-such-command"], ["inventry"]):
+            _, out, _ = self.tree.run(*arguments, "--format", "json")
+            jsonschema.Draft7Validator(schema).validate(json.loads(out))
+        _, out, _ = self.tree.run("inventory", "--format", "ndjson")
+        for line in out.splitlines():
+            jsonschema.Draft7Validator(self.schema("record")).validate(json.loads(line))
+
+    @staticmethod
+    def schema(name):
+        with open(os.path.join(SOURCE, "docs", "schema", f"{name}.schema.json"), encoding="ascii") as file:
+            schema = json.loads(file.read().replace("document.schema.json#", "#"))
+        if name != "document":
+            schema["definitions"] = HealthyTree.schema("document")["definitions"]
+        return schema
+
+    def test_stable_documents_are_equal(self):
+        first, second = (self.tree.run("inventory", "--format", "json", "--stable")[1] for _ in range(2))
+        self.assertEqual(first, second)
+
+    def test_summary_fits_on_a_screen(self):
+        status, out, _ = self.tree.run("summary")
+        self.assertEqual(status, COMPLETE)
+        self.assertLessEqual(len(out.splitlines()), 24)
+        for word in ("Machine", "System", "Processor", "Memory", "Adapter", "Vendor linuxinventory", *interfaces()):
+            self.assertIn(word, out)
 
     def test_threads_give_the_same_inventory(self):
         status, document, _ = self.tree.inventory("--set", "pegasus_multi_thread=on")

@@ -84,7 +84,7 @@ void TRegistrationCheck::CheckClasses(const std::vector<TProviderRecord>& provid
 {
     for (const TProviderRecord& provider : providers) {
         for (const TClassRecord& each : provider.fClasses) {
-            const TClassList* const list = each.fInstances.empty() ? fFiles.FindClass(each.fName) : nullptr;
+            const TClassList* const list = each.fInstanceCount == 0 ? fFiles.FindClass(each.fName) : nullptr;
             if (list) {
                 CheckClass(*list, each.fName);
             }

@@ -1,10 +1,18 @@
 // What went wrong, as text: what an exception says, what an unknown name may have meant, and how the user hears of it.
 #pragma once
 
+#include <stdexcept>
 #include <string>
 #include <vector>
 
 namespace vrxhost {
+
+// What a command asks for does not exist: a sentence.
+class TRequestError : public std::runtime_error
+{
+  public:
+    using std::runtime_error::runtime_error;
+};
 
 // Writes a sentence of the host's own to standard error, after "vrxhost: ".
 void ReportError(const std::string& sentence);

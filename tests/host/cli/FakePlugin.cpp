@@ -61,13 +61,16 @@ boost::shared_ptr<TFakeClass> EveryTypeClass(const boost::shared_ptr<ICIMNamespa
     each->fNamespace = ns;
     each->Declare("ID", TType::kString, true);
     each->Declare("Speed", TType::kUint64)->SetQualifier("Units", TCIMValue("Bits per second"));
-    each->Declare("MixedCase", TType::kSint8);
+    each->Declare("MixedCase", TType::kSint8)->SetQualifier("Counter", TCIMValue(true));
     each->Declare("Names", TType::kStringArray);
-    each->DeclareMethod(
+    const auto reset =
         boost::make_shared<TFakeMethodDecl>("Reset", TType::kUint32,
                                             std::vector<boost::shared_ptr<ICIMParameterDecl>>{
                                                 boost::make_shared<TFakeParameterDecl>("Force", TType::kBoolean),
-                                                boost::make_shared<TFakeParameterDecl>("Ports", TType::kUint16Array)}));
+                                                boost::make_shared<TFakeParameterDecl>("Ports", TType::kUint16Array)});
+    reset->SetQualifier("ValueMap", TCIMValue(TType::kString, 0, {TCIMValue("true")}));
+    reset->SetQualifier("Values", TCIMValue(TType::kString, 0, {TCIMValue("Done")}));
+    each->DeclareMethod(reset);
 
     const auto instance = boost::make_shared<TInmemInstance>(each, TCIMContext());
     Put(*instance, "id", "one \"two\"\x1b[31m");
@@ -94,9 +97,11 @@ boost::shared_ptr<TFakeClass> EveryTypeClass(const boost::shared_ptr<ICIMNamespa
 boost::shared_ptr<TFakeClass> ManyClass()
 {
     const auto many = boost::make_shared<TFakeClass>("Fake_Many");
+    many->Declare("Number", TType::kSint32);
     const int count = std::atoi(TConfig::GetInstance()->getValue("fake.count").c_str());
     for (int i = 0; i < count; ++i) {
         const auto instance = boost::make_shared<TInmemInstance>(many, TCIMContext());
+        Put(*instance, "Number", i);
         Put(*instance, "Text", std::string(100, 'x'));
         many->AddInstance(instance);
     }

@@ -25,9 +25,9 @@ TEST_F(VrxhostProgram, InventoryAsTable)
       Boolean    true
       Character  €
       Date       2026-11-21 04:15:00 +01:00
-      Empty      
+      Empty
       ID         one "two"\x1b[31m
-      Minimum    -9223372036854775808
+      Minimum    -9,223,372,036,854,775,808
       MixedCase  -128
       Names      a, b)"
                                "\xff"
@@ -35,7 +35,7 @@ TEST_F(VrxhostProgram, InventoryAsTable)
       Real32     0.1
       Real64     1e+300
       Reference  root/cimv2:A.k="1"
-      Speed      18446744073709551615 Bits per second
+      Speed      18.4 Ebit/s
   Fake_Broken: 0 instances
   Fake_Many: 0 instances
 )");
@@ -48,9 +48,7 @@ TEST_F(VrxhostProgram, InstancesAsJsonWithTrueTypes)
 {
     const auto outcome = Run({"instances", "fake_everytype", "--format", "json"});
     EXPECT_TRUE(HasStatus(outcome, 0));
-    EXPECT_EQ(outcome.fOutput, R"({
-  "name": "Fake_EveryType",
-  "instances": [
+    EXPECT_EQ(outcome.fOutput.substr(outcome.fOutput.find("  \"instances\"")), R"(  "instances": [
     {
       "path": "Fake_EveryType.ID=\"one \\\"two\\\"\u001b[31m\"",
       "properties": {
@@ -92,6 +90,7 @@ TEST_F(VrxhostProgram, ClassesAndProviders)
     uint32     Reset(boolean Force, uint16[] Ports)
   Fake_Broken
   Fake_Many
+    sint32     Number
 )");
     EXPECT_EQ(Run({"providers"}).fOutput, R"(Provider fake (libfake): 3 classes
   Fake_EveryType
@@ -100,8 +99,8 @@ TEST_F(VrxhostProgram, ClassesAndProviders)
 )");
     const auto json = nlohmann::json::parse(Run({"classes", "--format", "json"}).fOutput);
     EXPECT_EQ(json["providers"][0]["classes"][0]["methods"][0].dump(),
-              R"({"name":"Reset","parameters":[{"name":"Force","type":"boolean"},{"name":"Ports","type":"uint16[]"}],)"
-              R"("type":"uint32"})");
+              R"({"name":"Reset","parameters":[{"in":true,"name":"Force","out":false,"type":"boolean"},)"
+              R"({"in":true,"name":"Ports","out":false,"type":"uint16[]"}],"type":"uint32"})");
     EXPECT_EQ(json["providers"][0]["classes"][1]["superclass"], nullptr);
 }
 
@@ -209,7 +208,7 @@ struct TUsageRow
 };
 
 const TUsageRow kUsages[] = {
-    {{}, 2, "a command is missing: inventory, providers, classes or instances"},
+    {{}, 2, "a command is missing: summary, doctor, inventory"},
     {{"frobnicate"}, 2, "there is no command frobnicate"},
     {{"inventry"}, 2, "there is no command inventry; did you mean inventory?"},
     {{"inventory", "--formt", "json"}, 2, "there is no option --formt; did you mean --format?"},
@@ -222,6 +221,15 @@ const TUsageRow kUsages[] = {
     {{"inventory", "--set", "threads=on"}, 2, "there is no setting threads"},
     {{"inventory", "--config", "/nonexistent"}, 2, "/nonexistent"},
     {{"instances", "Fake_None"}, 1, "there is no class Fake_None"},
+    {{"help", "invok"}, 2, "there is no command invok; did you mean invoke?"},
+    {{"instances", "Fake_EveryType", "--where", "Sped=1"}, 1, "has no property Sped; did you mean Speed?"},
+    {{"instances", "Fake_EveryType", "--props", "ID,Nmes"}, 1, "has no property Nmes; did you mean Names?"},
+    {{"instances", "Fake_EveryType", "--where", "ID"}, 2, "PROPERTY=VALUE is expected, not \"ID\""},
+    {{"get", "Fake_Many.Number=1"}, 1, "there is no instance Fake_Many.Number=1"},
+    {{"invoke", "Fake_EveryType", "Rest"}, 1, "class Fake_EveryType has no method Rest; did you mean Reset?"},
+    {{"invoke", "Fake_EveryType", "Reset", "Port=1"}, 1, "method Reset has no parameter Port; did you mean Ports?"},
+    {{"invoke", "Fake_EveryType", "Reset", "Ports=1,70000"}, 1, "parameter Ports: \"70000\" is not a uint16"},
+    {{"invoke", "Fake_EveryType", "Reset", "Force=yes"}, 1, "parameter Force: \"yes\" is not a boolean"},
     {{"instances", "fake_evrytype"}, 1, "there is no class fake_evrytype; did you mean Fake_EveryType?"},
 };
 
@@ -245,6 +253,81 @@ TEST_F(VrxhostProgram, UsageErrorIsOneSentenceAndADocument)
         EXPECT_TRUE(HasStatus(help, 0));
         EXPECT_THAT(help.fOutput, HasSubstr("Exit status: 0 complete"));
         EXPECT_THAT(help.fOutput, HasSubstr("--consumer"));
+    }
+}
+
+struct TCommandRow
+{
+    std::vector<std::string> fArguments;
+    const char* fOutput;
+};
+
+const TCommandRow kCommands[] = {
+    {{"--version"}, "vrxhost 0.1.0\n"},
+    {{"classes", "--tree"}, "CIM_Thing\n  Fake_EveryType\nFake_Broken\nFake_Many\n"},
+    {{"class", "Fake_EveryType"}, R"(Fake_EveryType : CIM_Thing
+
+  [key] string ID
+
+  uint64 Speed
+      unit  Bits per second
+
+  sint8 MixedCase
+      counter  yes
+
+  string[] Names
+
+  uint32 Reset(boolean Force, uint16[] Ports)
+)"},
+    {{"instances", "Fake_Many", "--set", "fake.count=9", "--where", "number=7", "--props", "Number"},
+     "Fake_Many: 1 instance\n  #1\n    Number  7\n"},
+    {{"instances", "Fake_Many", "--set", "fake.count=5", "--props", "Number"},
+     "Fake_Many: 5 instances\n  Number\n  0\n  1\n  2\n  3\n  4\n"},
+    {{"instances", "Fake_EveryType", "--raw", "--props", "Speed"},
+     "Fake_EveryType: 1 instance\n  #1\n    Speed  18446744073709551615 Bits per second\n"},
+    {{"invoke", "Fake_EveryType.ID=\"x\"", "reset", "ports=80,443"}, R"(ReturnValue  80, 443
+Ports        80, 443
+Target       Fake_EveryType.ID="x" Reset
+)"},
+    {{"instances", "Fake_EveryType", "--format", "csv", "--stable", "--props", "ID,MixedCase"},
+     "provider,class,path,property,type,value,text\n"
+     R"(fake,Fake_EveryType,"Fake_EveryType.ID=""one \""two\""\x1b[31m""",ID,string,)"
+     R"("one ""two""\x1b[31m","one ""two""\x1b[31m")"
+     "\n"},
+};
+
+TEST_F(VrxhostProgram, CommandsShowWhatTheyAreAskedFor)
+{
+    for (const TCommandRow& row : kCommands) {
+        const auto outcome = Run(row.fArguments);
+        EXPECT_TRUE(HasStatus(outcome, 0));
+        EXPECT_EQ(outcome.fOutput, row.fOutput);
+    }
+}
+
+TEST_F(VrxhostProgram, NdjsonRecordsStandOnTheirOwnAndTheLastOneCountsThem)
+{
+    std::istringstream lines(Run({"inventory", "--format", "ndjson", "--set", "fake.count=3"}).fOutput);
+    std::map<std::string, int> counts;
+    nlohmann::json last;
+    for (std::string line; std::getline(lines, line);) {
+        last = nlohmann::json::parse(line);
+        ++counts[last["record"]];
+        EXPECT_EQ(last["run"].get<std::string>().size(), 36u);
+    }
+    EXPECT_EQ(counts, (std::map<std::string, int>{{"class", 3}, {"instance", 4}, {"end", 1}}));
+    EXPECT_EQ(last["instances"], 4);
+    EXPECT_EQ(last["complete"], true);
+}
+
+TEST_F(VrxhostProgram, StableDocumentsOfTwoRunsAreEqual)
+{
+    for (const std::string format : {"json", "ndjson", "csv", "table"}) {
+        const auto run = [&] { return Run({"inventory", "--stable", "--format", format}).fOutput; };
+        const std::string first = run();
+        EXPECT_EQ(first, run());
+        EXPECT_THAT(first, HasSubstr("Speed"));
+        EXPECT_THAT(first, Not(HasSubstr("-128"))) << "a counter in " << format;
     }
 }
 

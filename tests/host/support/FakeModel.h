@@ -86,7 +86,12 @@ template <typename Interface> class TFakeElement : public Interface
         const auto found = fQualifiers.find(name);
         return found == fQualifiers.end() ? boost::shared_ptr<ICIMQualifier>() : found->second;
     }
-    void EnumerateQualifiers(TQualifierVisitor, TCIMContext) const override { ThrowUnused(); }
+    void EnumerateQualifiers(TQualifierVisitor visitor, TCIMContext) const override
+    {
+        for (const auto& qualifier : fQualifiers) {
+            visitor(qualifier.second);
+        }
+    }
     boost::shared_ptr<ICIMQualifier> GetQualifier(const std::string&, bool&, TCIMContext) const override
     {
         ThrowUnused();
@@ -258,10 +263,13 @@ class TFakeClass : public TFakeElement<ICIMClass>, public boost::enable_shared_f
     void RemovePropertyDecl(boost::shared_ptr<ICIMPropertyDecl>) override { ThrowUnused(); }
     void AddMethodDecl(boost::shared_ptr<ICIMMethodDecl>) override { ThrowUnused(); }
     void RemoveMethodDecl(boost::shared_ptr<ICIMMethodDecl>) override { ThrowUnused(); }
-    TCIMValue InvokeMethod(const TCIMReference&, const std::string&, const TCIMContext&, TCIMContext&,
-                           TCIMContext) override
+    // Returns its first input; the outputs are the path, and the inputs again.
+    TCIMValue InvokeMethod(const TCIMReference& target, const std::string& name, const TCIMContext& inputs,
+                           TCIMContext& outputs, TCIMContext) override
     {
-        ThrowUnused();
+        outputs = inputs;
+        outputs["Target"] = TCIMValue(target.GetPath() + " " + name);
+        return inputs.empty() ? TCIMValue() : inputs.begin()->second;
     }
     void ClearInstances() override { fInstances.clear(); }
 

@@ -1,0 +1,155 @@
+#include "host/cli/collect/TCollector.h"
+
+#include "host/cli/collect/ClassReader.h"
+#include "host/cli/model/ErrorReport.h"
+
+#include <host/IProvider.h>
+
+#include <mutex>
+
+#include <strings.h>
+
+namespace vrxhost {
+
+using namespace NKOLVRX20;
+
+namespace {
+
+// What every question carries, and the one that lists this kind of plug-in's providers.
+const TCIMContext kNoContext;
+constexpr signed char kPluginType = 7;
+
+} // namespace
+
+TCollector::TCollector(ICIMNamespace& ns, TLossLog& losses, std::function<bool()> isStopped)
+    : fNamespace(ns), fLosses(losses), fIsStopped(std::move(isStopped))
+{
+}
+
+std::vector<TProviderRecord> TCollector::ReadProviders(EDetail detail)
+{
+    std::vector<TProviderRecord> records;
+    for (const TProviderPtr& provider : ListProviders()) {
+        if (!fIsStopped()) {
+            records.push_back(ReadProvider(*provider, detail));
+        }
+    }
+    return records;
+}
+
+void TCollector::Ask(const std::string& what, const std::function<void()>& question)
+{
+    const std::string error = ErrorOf(question);
+    if (!error.empty() && !fIsStopped()) {
+        fLosses.Add(what + ": " + error);
+    }
+}
+
+// The plug-in may call back on several threads at once, so the callback only collects.
+std::vector<TCollector::TProviderPtr> TCollector::ListProviders()
+{
+    std::mutex mutex;
+    std::vector<TProviderPtr> providers;
+    TCIMContext context;
+    context["pluginType"] = TCIMValue(kPluginType);
+    Ask("the providers could not be listed", [&] {
+        fNamespace.EnumerateProviders(
+            [&](TProviderPtr provider) {
+                const std::lock_guard<std::mutex> lock(mutex);
+                providers.push_back(std::move(provider));
+                return true;
+            },
+            context);
+    });
+    return providers;
+}
+
+std::vector<TCollector::TClassPtr> TCollector::ListClasses(IProvider& provider, const std::string& name)
+{
+    std::vector<TClassPtr> classes;
+    Ask("the classes of provider " + name + " could not be listed", [&] {
+        provider.EnumerateClassesProvided(
+            [&](TClassPtr each) {
+                classes.push_back(std::move(each));
+                return true;
+            },
+            kNoContext);
+    });
+    return classes;
+}
+
+TCollector::TClassPtr TCollector::FindClass(const std::string& name)
+{
+    std::vector<std::string> names;
+    for (const TProviderPtr& provider : ListProviders()) {
+        const std::string providerName = provider->GetName(kNoContext);
+        for (const TClassPtr& each : ListClasses(*provider, providerName)) {
+            names.push_back(each->GetName(kNoContext));
+            if (::strcasecmp(names.back().c_str(), name.c_str()) == 0) {
+                fProviderName = providerName;
+                return each;
+            }
+        }
+    }
+    const TClassPtr found = fNamespace.GetClass(name, kNoContext);
+    if (!found) {
+        throw TRequestError("there is no class " + name + Suggestion(name, names));
+    }
+    return found;
+}
+
+TProviderRecord TCollector::ReadProvider(IProvider& provider, EDetail detail)
+{
+    TProviderRecord record;
+    Ask("a provider could not be described", [&] {
+        record.fName = provider.GetName(kNoContext);
+        record.fModule = provider.GetModuleName(kNoContext);
+        record.fDescription = provider.GetDescription(kNoContext);
+    });
+    fProviderName = record.fName;
+    for (const TClassPtr& each : ListClasses(provider, record.fName)) {
+        if (!fIsStopped()) {
+            record.fClasses.push_back(ReadClass(*each, detail));
+        }
+    }
+    return record;
+}
+
+TClassRecord TCollector::ReadClass(ICIMClass& each, EDetail detail, const TFilter& filter)
+{
+    TClassRecord record;
+    Ask("a class could not be named", [&] { record.fName = each.GetName(kNoContext); });
+    if (detail != EDetail::kNames) {
+        Ask("class " + record.fName + " could not be described", [&] { ReadDeclarations(each, record); });
+    }
+    if (fSink && detail != EDetail::kNames) {
+        fSink->BeginClass(fProviderName, record);
+    }
+    if (detail == EDetail::kInstances) {
+        Ask("instances of " + record.fName + " could not be fetched", [&] { ReadInstances(each, record, filter); });
+    }
+    return record;
+}
+
+void TCollector::ReadInstances(ICIMClass& each, TClassRecord& record, const TFilter& filter)
+{
+    each.EnumerateInstances(
+        [&](boost::shared_ptr<ICIMInstance> instance) {
+            Ask("an instance of " + record.fName + " could not be read", [&] {
+                TInstanceRecord found = ReadInstance(*instance);
+                ++record.fInstanceCount;
+                if (filter && !filter(found)) {
+                    return;
+                }
+                if (fSink) {
+                    fSink->Add(record, found);
+                } else {
+                    record.fInstances.push_back(std::move(found));
+                }
+            });
+            return !fIsStopped();
+        },
+        false, kNoContext);
+}
+
+} // namespace vrxhost

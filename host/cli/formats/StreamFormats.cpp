@@ -1,0 +1,186 @@
+// Formats that write each instance as it comes, so that memory does not grow with their number.
+#include "host/cli/formats/JsonValues.h"
+#include "host/cli/formats/TextLayout.h"
+#include "host/cli/formats/ValueText.h"
+
+#include <utility>
+
+namespace vrxhost {
+namespace {
+
+// What the two have in common: where the text goes, and how much has gone.
+class TStreamFormat : public IFormat, public IInstanceSink
+{
+  public:
+    TStreamFormat(const TFormatOptions& options, TDocumentWriter write) : fOptions(options), fWrite(std::move(write)) {}
+
+    IInstanceSink* BeginStream(const TDocumentHead& head) override
+    {
+        fHead = head;
+        return this;
+    }
+
+  protected:
+    void Write(const std::string& text) const { fWrite(text); }
+
+    const TFormatOptions fOptions;
+    TDocumentHead fHead;
+    std::string fProvider;
+    std::size_t fClassCount = 0;
+    std::size_t fInstanceCount = 0;
+
+  private:
+    TDocumentWriter fWrite;
+};
+
+// One JSON object a line: a class record before the instances of a class, which they refer to by name; a record an
+// instance, which stands on its own; a closing record, without which the document is not whole.
+class TNdjsonFormat : public TStreamFormat
+{
+  public:
+    using TStreamFormat::TStreamFormat;
+
+    void BeginClass(const std::string& provider, const TClassRecord& each) override
+    {
+        fProvider = provider;
+        ++fClassCount;
+        TJson json = Record("class");
+        json["class"] = each.fName;
+        json["superclass"] = each.fAncestors.empty() ? TJson() : TJson(each.fAncestors.front());
+        json["properties"] = JsonDeclarations(each);
+        Write(JsonText(json, -1));
+    }
+
+    void Add(const TClassRecord& each, const TInstanceRecord& instance) override
+    {
+        ++fInstanceCount;
+        TJson json = Record("instance");
+        json["class"] = each.fName;
+        json["path"] = instance.fPath;
+        json["key"] = TJson::object();
+        for (const TPropertyRecord& property : instance.fProperties) {
+            const TPropertyDeclRecord* const declaration = each.Find(property.fName);
+            if (declaration && declaration->fIsKey) {
+                json["key"][property.fName] = JsonValue(property.fValue);
+            }
+        }
+        json["properties"] = JsonProperties(each, instance, fOptions);
+        Write(JsonText(json, -1));
+    }
+
+    std::string Finish(const TDocument& document) override
+    {
+        fHead = document.fHead;
+        fProvider.clear();
+        TJson json = Record("end");
+        json["command"] = fHead.fCommand;
+        json["hostFacts"] = JsonHost(fHead.fHost);
+        json["classes"] = fClassCount;
+        json["instances"] = fInstanceCount;
+        AddLosses(json, document);
+        return JsonText(json, -1);
+    }
+
+  private:
+    TJson Record(const char* kind) const
+    {
+        TJson json = {{"record", kind}, {"format", kFormatVersion}};
+        json["host"] = fHead.fHost.fMachineId.empty() ? fHead.fHost.fName : fHead.fHost.fMachineId;
+        if (!fOptions.fStable) {
+            json["run"] = fHead.fRunId;
+            json["time"] = TimeNow();
+        }
+        if (!fProvider.empty()) {
+            json["provider"] = fProvider;
+        }
+        return json;
+    }
+};
+
+// One property a line, since classes differ in their columns (RFC 4180, lines end with a line feed).
+class TCsvFormat : public TStreamFormat
+{
+  public:
+    using TStreamFormat::TStreamFormat;
+
+    IInstanceSink* BeginStream(const TDocumentHead& head) override
+    {
+        Write("provider,class,path,property,type,value,text\n");
+        return TStreamFormat::BeginStream(head);
+    }
+
+    void BeginClass(const std::string& provider, const TClassRecord&) override { fProvider = provider; }
+
+    void Add(const TClassRecord& each, const TInstanceRecord& instance) override
+    {
+        std::string lines;
+        for (const TPropertyRecord& property : instance.fProperties) {
+            if (property.fValue.IsNull() || !IsKept(each, property, fOptions)) {
+                continue;
+            }
+            const TPropertyDeclRecord* const declaration = each.Find(property.fName);
+            const std::string value = JsonText(JsonValue(property.fValue), -1);
+            const bool isText = !property.fValue.IsArray() && value.front() == '"';
+            lines += Quoted(fProvider) + "," + Quoted(each.fName) + "," + Quoted(instance.fPath) + "," +
+                     Quoted(property.fName) + "," + (declaration ? declaration->fType : "") + "," +
+                     Quoted(isText ? property.fValue.ToString(10) : value.substr(0, value.size() - 1)) + "," +
+                     Quoted(property.fText) + "\n";
+        }
+        Write(lines);
+    }
+
+    std::string Finish(const TDocument&) override { return ""; }
+
+  private:
+    // Control bytes as escapes, so that a record stays one line.
+    static std::string Quoted(const std::string& field)
+    {
+        const std::string text = Printable(field);
+        if (text.find_first_of(",\"") == std::string::npos) {
+            return text;
+        }
+        std::string quoted = "\"";
+        for (const char c : text) {
+            quoted += c == '"' ? "\"\"" : std::string(1, c);
+        }
+        return quoted + "\"";
+    }
+};
+
+} // namespace
+
+IInstanceSink* IFormat::BeginStream(const TDocumentHead&)
+{
+    return nullptr;
+}
+
+std::unique_ptr<IFormat> MakeNdjsonFormat(const TFormatOptions& options, TDocumentWriter write)
+{
+    return std::make_unique<TNdjsonFormat>(options, std::move(write));
+}
+
+std::unique_ptr<IFormat> MakeCsvFormat(const TFormatOptions& options, TDocumentWriter write)
+{
+    return std::make_unique<TCsvFormat>(options, std::move(write));
+}
+
+std::vector<std::string> FormatNames()
+{
+    return {"table", "tree", "json", "ndjson", "csv"};
+}
+
+std::unique_ptr<IFormat> MakeFormat(const std::string& name, const TFormatOptions& options, TDocumentWriter write)
+{
+    if (name == "tree") {
+        return MakeTreeFormat(options);
+    }
+    if (name == "json") {
+        return MakeJsonFormat(options);
+    }
+    if (name == "ndjson") {
+        return MakeNdjsonFormat(options, std::move(write));
+    }
+    return name == "csv" ? MakeCsvFormat(options, std::move(write)) : MakeTableFormat(options);
+}
+
+} // namespace vrxhost

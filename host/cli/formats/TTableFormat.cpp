@@ -1,0 +1,317 @@
+// Text for people.
+#include "host/cli/formats/TextLayout.h"
+#include "host/cli/formats/ValueText.h"
+
+#include <algorithm>
+
+namespace vrxhost {
+namespace {
+
+constexpr std::size_t kInstancesOfATable = 5; // fewer are shown one below the other
+constexpr std::size_t kTypeWidth = 11;
+
+class TTableFormat : public IFormat
+{
+  public:
+    explicit TTableFormat(const TFormatOptions& options) : fOptions(options) {}
+
+    std::string Finish(const TDocument& document) override;
+
+  private:
+    std::string Heading(const std::string& text) const;
+    std::string Providers(const TDocument& document) const;
+    std::string Provider(const TProviderRecord& provider, EDetail detail) const;
+    std::string Class(const TClassRecord& each, EDetail detail, const std::string& indent) const;
+    std::string Instances(const TClassRecord& each, const std::string& indent) const;
+    std::string InstanceLines(const TClassRecord& each, const TInstanceRecord& instance,
+                              const std::string& indent) const;
+    std::string InstanceTable(const TClassRecord& each, const std::string& indent) const;
+    std::string Declaration(const TClassRecord& each) const;
+    std::string Invocation(const TInvocation& invocation) const;
+
+    const TFormatOptions fOptions;
+};
+
+std::string ParameterList(const TMethodRecord& method)
+{
+    std::string list;
+    for (const auto& parameter : method.fParameters) {
+        const char* const direction = !parameter.fIsOut ? "" : parameter.fIsIn ? "in out " : "out ";
+        list += (list.empty() ? "" : ", ") + std::string(direction) + parameter.fType + " " + parameter.fName;
+    }
+    return list;
+}
+
+std::string ClassLine(const TClassRecord& each)
+{
+    return each.fName + (each.fAncestors.empty() ? "" : " : " + each.fAncestors.front());
+}
+
+std::string DeclarationLines(const TClassRecord& each)
+{
+    std::string out = "  " + ClassLine(each) + "\n";
+    for (const auto& property : each.fProperties) {
+        out += "    " + Padded(property.fType, kTypeWidth) + property.fName + (property.fIsKey ? "  [key]" : "") + "\n";
+    }
+    for (const auto& method : each.fMethods) {
+        out += "    " + Padded(method.fReturnType, kTypeWidth) + method.fName + "(" + ParameterList(method) + ")\n";
+    }
+    return out;
+}
+
+// Classes below their superclasses, each name once.
+std::string ClassTree(const std::vector<TProviderRecord>& providers)
+{
+    std::vector<std::vector<std::string>> lines; // from the top of the hierarchy down
+    for (const TProviderRecord& provider : providers) {
+        for (const TClassRecord& each : provider.fClasses) {
+            std::vector<std::string> names(each.fAncestors.rbegin(), each.fAncestors.rend());
+            names.push_back(each.fName);
+            lines.push_back(std::move(names));
+        }
+    }
+    std::sort(lines.begin(), lines.end());
+    std::string text;
+    std::vector<std::string> above;
+    for (const auto& names : lines) {
+        const auto common = std::mismatch(names.begin(), names.end(), above.begin(), above.end()).first;
+        for (auto name = common; name != names.end(); ++name) {
+            text += std::string(2 * static_cast<std::size_t>(name - names.begin()), ' ') + *name + "\n";
+        }
+        above = names;
+    }
+    return text;
+}
+
+// "2 Unknown, 3 Other": a text for each value.
+std::string ValueList(const TPropertyDeclRecord& property)
+{
+    std::string list;
+    for (std::size_t i = 0; i < property.fValues.size(); ++i) {
+        const std::string value = property.fValueMap.empty()      ? std::to_string(i)
+                                  : i < property.fValueMap.size() ? property.fValueMap[i]
+                                                                  : "";
+        list += (list.empty() ? "" : ", ") + value + (value.empty() ? "" : " ") + property.fValues[i];
+    }
+    return list;
+}
+
+std::string LossLines(const std::vector<TLoss>& losses, std::size_t width)
+{
+    std::vector<TLabelled> rows;
+    for (const TLoss& loss : losses) {
+        rows.push_back({loss.fIsNote ? "note" : "missing", Printable(loss.GetText())});
+    }
+    if (rows.empty()) {
+        rows.push_back({"ok", "nothing is missing"});
+    }
+    return "\n" + LabelledLines(rows, "", width);
+}
+
+std::string TTableFormat::Finish(const TDocument& document)
+{
+    if (!document.fFacts.empty()) {
+        std::vector<TLabelled> rows;
+        for (const TFact& fact : document.fFacts) {
+            rows.push_back({fact.fLabel, Printable(fact.fText)});
+        }
+        return LabelledLines(rows, "", fOptions.fWidth) +
+               (document.fListsLosses ? LossLines(document.fLosses, fOptions.fWidth) : "");
+    }
+    if (!document.fInvocations.empty()) {
+        return Invocation(document.fInvocations.front());
+    }
+    return document.fIsTree ? ClassTree(document.fProviders) : Providers(document);
+}
+
+std::string TTableFormat::Heading(const std::string& text) const
+{
+    return fOptions.fColor ? "\x1b[1m" + text + "\x1b[0m" : text;
+}
+
+std::string TTableFormat::Providers(const TDocument& document) const
+{
+    std::string out;
+    for (const auto& provider : document.fProviders) {
+        out += out.empty() ? "" : "\n";
+        if (!document.fIsOneClass) {
+            out += Provider(provider, document.fDetail);
+        } else if (!provider.fClasses.empty()) {
+            const TClassRecord& each = provider.fClasses.front();
+            out += document.fDetail == EDetail::kInstances ? Instances(each, "") : Declaration(each);
+        }
+    }
+    return out;
+}
+
+std::string TTableFormat::Provider(const TProviderRecord& provider, EDetail detail) const
+{
+    std::string out = Heading("Provider " + (provider.fName.empty() ? "without a name" : Printable(provider.fName))) +
+                      " (" + Printable(provider.fModule) + "): " + Counted(provider.fClasses.size(), "class") + "\n";
+    for (const auto& each : provider.fClasses) {
+        out += Class(each, detail, "  ");
+    }
+    return out;
+}
+
+std::string TTableFormat::Class(const TClassRecord& each, EDetail detail, const std::string& indent) const
+{
+    switch (detail) {
+    case EDetail::kInstances:
+        return Instances(each, indent);
+    case EDetail::kDeclarations:
+        return DeclarationLines(each);
+    default:
+        return indent + each.fName + "\n";
+    }
+}
+
+std::string TTableFormat::Instances(const TClassRecord& each, const std::string& indent) const
+{
+    std::string out = indent + Heading(each.fName) + ": " + Counted(each.fInstances.size(), "instance") + "\n";
+    const std::string tree = each.fIsAssociation && !fOptions.fRaw ? AssociationTree({&each}, indent + "  ") : "";
+    if (!tree.empty()) {
+        return out + tree;
+    }
+    if (each.fInstances.size() >= kInstancesOfATable) {
+        return out + InstanceTable(each, indent + "  ");
+    }
+    std::size_t number = 0;
+    for (const auto& instance : each.fInstances) {
+        out += indent + "  #" + std::to_string(++number) + "\n" + InstanceLines(each, instance, indent + "    ");
+    }
+    return out;
+}
+
+std::string TTableFormat::InstanceLines(const TClassRecord& each, const TInstanceRecord& instance,
+                                        const std::string& indent) const
+{
+    std::vector<TLabelled> rows;
+    for (const auto& property : instance.fProperties) {
+        if (IsShown(each, property, fOptions)) {
+            rows.push_back({property.fName, ValueText(property, each.Find(property.fName), fOptions)});
+        }
+    }
+    return LabelledLines(rows, indent, fOptions.fWidth);
+}
+
+// The first column is the one that tells instances apart: a key that is shown, where there is one.
+std::string TTableFormat::InstanceTable(const TClassRecord& each, const std::string& indent) const
+{
+    std::vector<std::string> headings;
+    for (const auto& instance : each.fInstances) {
+        for (const auto& property : instance.fProperties) {
+            if (IsShown(each, property, fOptions) &&
+                std::find(headings.begin(), headings.end(), property.fName) == headings.end())
+            {
+                headings.push_back(property.fName);
+            }
+        }
+    }
+    std::stable_partition(headings.begin(), headings.end(), [&each](const std::string& name) {
+        const TPropertyDeclRecord* const declaration = each.Find(name);
+        return declaration && declaration->fIsKey;
+    });
+    std::vector<std::vector<std::string>> rows;
+    for (const auto& instance : each.fInstances) {
+        std::vector<std::string> row;
+        for (const std::string& name : headings) {
+            const TPropertyRecord* const property = instance.Find(name);
+            row.push_back(property ? ValueText(*property, each.Find(name), fOptions) : "");
+        }
+        rows.push_back(std::move(row));
+    }
+    return TableBlocks(headings, rows, indent, fOptions.fWidth);
+}
+
+std::string TTableFormat::Declaration(const TClassRecord& each) const
+{
+    std::vector<TLabelled> qualifiers;
+    for (const TQualifierRecord& qualifier : each.fQualifiers) {
+        qualifiers.push_back({"[" + qualifier.fName + "]", Printable(qualifier.fText)});
+    }
+    std::string out = Heading(ClassLine(each)) + "\n" + LabelledLines(qualifiers, "  ", fOptions.fWidth);
+    for (const TPropertyDeclRecord& property : each.fProperties) {
+        out += "\n  " + std::string(property.fIsKey ? "[key] " : "") + property.fType + " " + property.fName + "\n";
+        std::vector<TLabelled> rows = {{"", Printable(property.fDescription)},
+                                       {"unit", property.fUnits.empty() ? property.fPUnit : property.fUnits},
+                                       {"values", Printable(ValueList(property))},
+                                       {"counter", property.fIsCounter ? "yes" : ""}};
+        rows.erase(std::remove_if(rows.begin(), rows.end(), [](const TLabelled& row) { return row.fText.empty(); }),
+                   rows.end());
+        out += LabelledLines(rows, "      ", fOptions.fWidth);
+    }
+    for (const TMethodRecord& method : each.fMethods) {
+        out += "\n  " + method.fReturnType + " " + method.fName + "(" + ParameterList(method) + ")\n";
+    }
+    return out;
+}
+
+std::string TTableFormat::Invocation(const TInvocation& invocation) const
+{
+    std::vector<TPropertyRecord> values = {invocation.fReturned};
+    values.insert(values.end(), invocation.fOutputs.begin(), invocation.fOutputs.end());
+    std::vector<TLabelled> rows;
+    for (const TPropertyRecord& value : values) {
+        const std::string plain = value.fValue.IsNull() ? "null" : value.fValue.ToString(10);
+        const bool hasText = !value.fText.empty() && value.fText != plain && !value.fValue.IsArray();
+        rows.push_back({value.fName, Printable(hasText               ? plain + " (" + value.fText + ")"
+                                               : value.fText.empty() ? plain
+                                                                     : value.fText)});
+    }
+    return LabelledLines(rows, "", fOptions.fWidth);
+}
+
+// Devices below what they belong to, then what no association names.
+class TTreeFormat : public IFormat
+{
+  public:
+    explicit TTreeFormat(const TFormatOptions& options) : fOptions(options) {}
+
+    std::string Finish(const TDocument& document) override
+    {
+        std::vector<const TClassRecord*> associations;
+        std::string rest;
+        for (const TProviderRecord& provider : document.fProviders) {
+            for (const TClassRecord& each : provider.fClasses) {
+                if (each.fIsAssociation) {
+                    associations.push_back(&each);
+                }
+            }
+        }
+        const std::string tree = AssociationTree(associations, "");
+        for (const TProviderRecord& provider : document.fProviders) {
+            for (const TClassRecord& each : provider.fClasses) {
+                rest += each.fIsAssociation ? "" : Unlinked(each, tree);
+            }
+        }
+        return tree.empty() && rest.empty() ? TTableFormat(fOptions).Finish(document) : tree + rest;
+    }
+
+  private:
+    static std::string Unlinked(const TClassRecord& each, const std::string& tree)
+    {
+        std::string lines;
+        for (const TInstanceRecord& instance : each.fInstances) {
+            const std::string line = PathLabel(instance.fPath) + "\n";
+            lines += tree.find(line) == std::string::npos ? line : "";
+        }
+        return lines;
+    }
+
+    const TFormatOptions fOptions;
+};
+
+} // namespace
+
+std::unique_ptr<IFormat> MakeTableFormat(const TFormatOptions& options)
+{
+    return std::make_unique<TTableFormat>(options);
+}
+
+std::unique_ptr<IFormat> MakeTreeFormat(const TFormatOptions& options)
+{
+    return std::make_unique<TTreeFormat>(options);
+}
+
+} // namespace vrxhost
