@@ -1,24 +1,14 @@
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/Text.h"
-#include "pegasus/common/ArrayImpl.h"
+#include "pegasus/common/CIMObjectPathRep.h"
 #include "pegasus/common/ObjectPathParser.h"
-#include "pegasus/common/RepPointerImpl.h"
 
-#include <Pegasus/Common/CIMObjectPath.h>
 #include <Pegasus/Common/Exception.h>
 
 #include <algorithm>
 #include <vector>
 
 namespace Pegasus {
-
-struct CIMObjectPathRep : RefCounted
-{
-    String fHost;
-    CIMNamespaceName fNameSpace;
-    CIMName fClassName;
-    Array<CIMKeyBinding> fKeys;
-};
 
 template class RepPointer<CIMObjectPathRep>;
 

@@ -167,23 +167,23 @@ void appendClass(std::string& out, const CIMConstClass& cimClass)
     out += "</CLASS>\n";
 }
 
-void appendInstance(std::string& out, const CIMConstInstance& instance)
+void appendInstance(std::string& out, const CIMConstInstance& instance, Blanks blanks)
 {
     out += "<INSTANCE";
     appendAttribute(out, "CLASSNAME", instance.getClassName().getString());
     out += " >\n";
     appendQualifiers(out, instance);
     for (Uint32 i = 0; i < instance.getPropertyCount(); ++i) {
-        appendProperty(out, instance.getProperty(i));
+        appendProperty(out, instance.getProperty(i), blanks);
     }
     out += "</INSTANCE>\n";
 }
 
-void appendNamedInstance(std::string& out, const CIMConstInstance& instance)
+void appendNamedInstance(std::string& out, const CIMConstInstance& instance, Blanks blanks)
 {
     out += "<VALUE.NAMEDINSTANCE>\n";
-    appendInstanceName(out, instance.getPath());
-    appendInstance(out, instance);
+    appendInstanceName(out, instance.getPath(), blanks);
+    appendInstance(out, instance, blanks);
     out += "</VALUE.NAMEDINSTANCE>\n";
 }
 
@@ -201,7 +201,7 @@ void appendQualifierDeclaration(std::string& out, const CIMConstQualifierDecl& d
     out += "</QUALIFIER.DECLARATION>\n";
 }
 
-void appendProperty(std::string& out, const CIMConstProperty& property)
+void appendProperty(std::string& out, const CIMConstProperty& property, Blanks blanks)
 {
     const char* element = propertyElement(property);
     const CIMType type = property.getType();
@@ -221,7 +221,7 @@ void appendProperty(std::string& out, const CIMConstProperty& property)
     }
     out += ">\n";
     appendQualifiers(out, property);
-    appendValue(out, property.getValue());
+    appendValue(out, property.getValue(), blanks);
     out.append("</").append(element).append(">\n");
 }
 

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "pegasus/wire/XmlText.h"
+
 #include <Pegasus/Common/CIMClass.h>
 #include <Pegasus/Common/CIMObject.h>
 #include <Pegasus/Common/CIMParamValue.h>
@@ -16,18 +18,18 @@ namespace Pegasus::wire {
 // CLASS
 void appendClass(std::string& out, const CIMConstClass& cimClass);
 // INSTANCE
-void appendInstance(std::string& out, const CIMConstInstance& instance);
+void appendInstance(std::string& out, const CIMConstInstance& instance, Blanks blanks = Blanks::kReferences);
 // VALUE.NAMEDINSTANCE, from the instance's path and the instance
-void appendNamedInstance(std::string& out, const CIMConstInstance& instance);
+void appendNamedInstance(std::string& out, const CIMConstInstance& instance, Blanks blanks = Blanks::kReferences);
 // QUALIFIER.DECLARATION
 void appendQualifierDeclaration(std::string& out, const CIMConstQualifierDecl& declaration);
 // PROPERTY, PROPERTY.ARRAY or PROPERTY.REFERENCE
-void appendProperty(std::string& out, const CIMConstProperty& property);
+void appendProperty(std::string& out, const CIMConstProperty& property, Blanks blanks = Blanks::kReferences);
 
 // CLASSNAME
 void appendClassName(std::string& out, const CIMName& className);
 // INSTANCENAME
-void appendInstanceName(std::string& out, const CIMObjectPath& path);
+void appendInstanceName(std::string& out, const CIMObjectPath& path, Blanks blanks = Blanks::kReferences);
 // LOCALINSTANCEPATH: namespace and INSTANCENAME
 void appendLocalInstancePath(std::string& out, const CIMNamespaceName& nameSpace, const CIMObjectPath& path);
 // LOCALCLASSPATH: namespace and CLASSNAME
@@ -38,7 +40,7 @@ void appendLocalNamespacePath(std::string& out, const CIMNamespaceName& nameSpac
 void appendReference(std::string& out, const CIMObjectPath& path);
 
 // VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY; a null is left out.
-void appendValue(std::string& out, const CIMValue& value);
+void appendValue(std::string& out, const CIMValue& value, Blanks blanks = Blanks::kReferences);
 // PARAMVALUE
 void appendParamValue(std::string& out, const CIMParamValue& parameter);
 // RETURNVALUE

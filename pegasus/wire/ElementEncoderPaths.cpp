@@ -21,7 +21,7 @@ const char* keyTypeName(CIMKeyBinding::Type type)
 }
 
 // The one key of a path may come without its name (DSP0201, INSTANCENAME).
-void appendKeyBinding(std::string& out, const CIMKeyBinding& key)
+void appendKeyBinding(std::string& out, const CIMKeyBinding& key, Blanks blanks)
 {
     const bool isNamed = !key.getName().isNull();
     if (isNamed) {
@@ -35,7 +35,7 @@ void appendKeyBinding(std::string& out, const CIMKeyBinding& key)
         out += "<KEYVALUE";
         appendAttribute(out, "VALUETYPE", keyTypeName(key.getType()));
         out += '>';
-        appendEscaped(out, key.getValue());
+        appendEscaped(out, key.getValue(), blanks);
         out += "</KEYVALUE>\n";
     }
     if (isNamed) {
@@ -81,14 +81,14 @@ void appendClassName(std::string& out, const CIMName& className)
     out += "/>\n";
 }
 
-void appendInstanceName(std::string& out, const CIMObjectPath& path)
+void appendInstanceName(std::string& out, const CIMObjectPath& path, Blanks blanks)
 {
     out += "<INSTANCENAME";
     appendAttribute(out, "CLASSNAME", path.getClassName().getString());
     out += ">\n";
     const Array<CIMKeyBinding>& keys = path.getKeyBindings();
     for (Uint32 i = 0; i < keys.size(); ++i) {
-        appendKeyBinding(out, keys[i]);
+        appendKeyBinding(out, keys[i], blanks);
     }
     out += "</INSTANCENAME>\n";
 }

@@ -213,14 +213,15 @@ void checkXmlDeclaration(std::string_view declaration, XmlPlace place)
     }
 }
 
-void appendEscaped(std::string& out, std::string_view text)
+void appendEscaped(std::string& out, std::string_view text, Blanks blanks)
 {
+    const bool isRaw = blanks == Blanks::kRaw;
     for (std::size_t i = 0; i < text.size(); ++i) {
         const char c = text[i];
         const bool isEdge = i == 0 || i + 1 == text.size();
         if (const char* entity = entityOf(c)) {
             out += entity;
-        } else if (isControl(c) || (c == ' ' && (isEdge || text[i - 1] == ' '))) {
+        } else if (isControl(c) || (c == ' ' && !isRaw && (isEdge || text[i - 1] == ' '))) {
             appendCharacterReference(out, c);
         } else {
             out += c;
@@ -228,9 +229,9 @@ void appendEscaped(std::string& out, std::string_view text)
     }
 }
 
-void appendEscaped(std::string& out, const String& text)
+void appendEscaped(std::string& out, const String& text, Blanks blanks)
 {
-    appendEscaped(out, base::utf8(text));
+    appendEscaped(out, base::utf8(text), blanks);
 }
 
 } // namespace Pegasus::wire

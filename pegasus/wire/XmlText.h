@@ -37,9 +37,16 @@ bool isZeroReference(std::string_view text);
 // UTF-8 all the same, because HTTP's charset goes before this one. Throws: XmlError.
 void checkXmlDeclaration(std::string_view declaration, XmlPlace place);
 
+// How blanks are written that a parser would cut: at the beginning, at the end and after another blank.
+enum class Blanks
+{
+    kReferences, // as character references: the reader keeps them
+    kRaw         // as they are
+};
+
 // Appends `text` (UTF-8) as XML text or attribute value: & < > " ' become entities. What a parser would change becomes
-// a character reference: control characters, and a blank at the beginning, at the end or after another blank.
-void appendEscaped(std::string& out, std::string_view text);
-void appendEscaped(std::string& out, const String& text);
+// a character reference: control characters and, unless `blanks` says otherwise, blanks.
+void appendEscaped(std::string& out, std::string_view text, Blanks blanks = Blanks::kReferences);
+void appendEscaped(std::string& out, const String& text, Blanks blanks = Blanks::kReferences);
 
 } // namespace Pegasus::wire

@@ -6,6 +6,7 @@
 #include "pegasus/cmpi/objects/ArgsObject.h"
 #include "pegasus/cmpi/objects/ArrayObject.h"
 #include "pegasus/cmpi/objects/DateTimeObject.h"
+#include "pegasus/cmpi/objects/ErrorObject.h"
 #include "pegasus/cmpi/objects/InstanceObject.h"
 #include "pegasus/cmpi/objects/StringObject.h"
 
@@ -39,7 +40,10 @@ CMPIObjectPath* newObjectPath(const CMPIBroker* broker, const char* nameSpace, c
 {
     return made<CMPIObjectPath>(rc, [&] {
         Broker& owner = Broker::of(broker);
-        return Frame::current().make<ObjectPathObject>(owner, PathState(owner, nameSpace, className));
+        Frame& frame = Frame::current();
+        const std::string own = base::utf8(frame.origin().nameSpace);
+        const bool isNamed = nameSpace != nullptr && *nameSpace != '\0';
+        return frame.make<ObjectPathObject>(owner, PathState(owner, isNamed ? nameSpace : own.c_str(), className));
     });
 }
 
@@ -147,6 +151,9 @@ CMPIString* getMessage2(const CMPIBroker*, const char*, CMPIMsgFileHandle, const
 // "<id or component>: <text>", the text from either argument.
 std::string logLine(const char* id, const char* text, const CMPIString* string)
 {
+    if (text == nullptr && string == nullptr) {
+        throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, {}};
+    }
     std::string line = id != nullptr && *id != '\0' ? std::string(id) + ": " : std::string();
     if (text != nullptr) {
         line += text;
@@ -175,23 +182,27 @@ CMPIStatus trace(const CMPIBroker* broker, CMPILevel, const char* component, con
         [&] { Broker::of(broker).services().log(BrokerServices::Severity::kDebug, logLine(component, text, string)); });
 }
 
-CMPIError* newCMPIError(const CMPIBroker*, const char*, const char*, const char*, CMPIErrorSeverity,
-                        CMPIErrorProbableCause, CMPIrc, CMPIStatus* rc)
+CMPIError* newCMPIError(const CMPIBroker* broker, const char* owner, const char* messageId, const char* message,
+                        CMPIErrorSeverity severity, CMPIErrorProbableCause cause, CMPIrc code, CMPIStatus* rc)
 {
-    return notSupported<CMPIError>(rc);
+    return made<CMPIError>(rc, [&] {
+        return Frame::current().make<ErrorObject>(Broker::of(broker), owner, messageId, message, severity, cause, code);
+    });
 }
 
+// A message file has no translations here: getMessage2 formats the default text.
 CMPIStatus openMessageFile(const CMPIBroker*, const char*, CMPIMsgFileHandle* handle)
 {
+    static char fgNoTranslations;
     if (handle != nullptr) {
-        *handle = nullptr;
+        *handle = &fgNoTranslations;
     }
-    return makeStatus(CMPI_RC_ERR_NOT_SUPPORTED, {});
+    return makeStatus(CMPI_RC_OK, {});
 }
 
 CMPIStatus closeMessageFile(const CMPIBroker*, CMPIMsgFileHandle)
 {
-    return makeStatus(CMPI_RC_ERR_NOT_SUPPORTED, {});
+    return makeStatus(CMPI_RC_OK, {});
 }
 
 CMPIPropertyList* newPropertyList(const CMPIBroker*, const char**, CMPIStatus* rc)

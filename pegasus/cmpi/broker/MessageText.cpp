@@ -66,11 +66,11 @@ std::string formatMessage(const char* text, CMPICount count, va_list args)
 
     std::string result;
     for (const char* at = text; at != nullptr && *at != '\0'; ++at) {
-        const bool isPlace = at[0] == '$' && at[1] >= '0' && at[1] <= '9';
-        if (isPlace && static_cast<std::size_t>(at[1] - '0') < arguments.size()) {
-            result += arguments[static_cast<std::size_t>(*++at - '0')];
-        } else {
+        if (*at != '$') {
             result += *at;
+        } else if (at[1] >= '0' && at[1] <= '9') { // a place without an argument leaves nothing
+            const auto place = static_cast<std::size_t>(*++at - '0');
+            result += place < arguments.size() ? arguments[place] : std::string();
         }
     }
     return result;

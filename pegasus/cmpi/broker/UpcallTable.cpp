@@ -3,6 +3,7 @@
 #include "pegasus/cmpi/objects/ArgsObject.h"
 #include "pegasus/cmpi/objects/ContextObject.h"
 #include "pegasus/cmpi/objects/EnumerationObject.h"
+#include "pegasus/cmpi/objects/Habits.h"
 #include "pegasus/cmpi/objects/InstanceObject.h"
 #include "pegasus/cmpi/objects/StringObject.h"
 
@@ -17,8 +18,12 @@ namespace {
 // serves, which the context carries.
 struct Target
 {
-    Target(const CMPIContext* context, const CMPIObjectPath* target)
+    // Throws: with strict providers also for a thread that was not attached.
+    Target(Broker& owner, const CMPIContext* context, const CMPIObjectPath* target)
     {
+        if (Frame::current().origin().broker == nullptr) {
+            tolerate(Habit::kNoAttach, owner, std::string());
+        }
         if (target == nullptr) {
             throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, {}};
         }
@@ -65,7 +70,7 @@ CMPIStatus attachThread(const CMPIBroker*, const CMPIContext* context)
         if (prepared.threadFrame) {
             throw CmpiError{CMPI_RC_ERR_FAILED, "the context's thread is attached already"};
         }
-        prepared.threadFrame = std::make_unique<Frame>();
+        prepared.threadFrame = std::make_unique<Frame>(prepared.origin);
     });
 }
 
@@ -80,10 +85,14 @@ CMPIStatus detachThread(const CMPIBroker*, const CMPIContext* context)
     });
 }
 
-// Refused: a provider may deliver indications once it was asked to enable them, and this server never asks.
-CMPIStatus deliverIndication(const CMPIBroker*, const CMPIContext*, const char*, const CMPIInstance*)
+// Accepted and dropped: this server has no subscriptions. The log names each class once.
+CMPIStatus deliverIndication(const CMPIBroker* broker, const CMPIContext*, const char*, const CMPIInstance* indication)
 {
-    return makeStatus(CMPI_RC_ERR_FAILED, "indications are not enabled");
+    return perform([&] {
+        const std::string name = base::utf8(objectOf<InstanceObject>(indication).value().getClassName());
+        Broker::of(broker).warnOnce("deliverIndication: indications of class " + name +
+                                    " are dropped, because nobody can subscribe to them here");
+    });
 }
 
 CMPIEnumeration* enumerateInstanceNames(const CMPIBroker* broker, const CMPIContext* context,
@@ -91,7 +100,7 @@ CMPIEnumeration* enumerateInstanceNames(const CMPIBroker* broker, const CMPICont
 {
     return answer(rc, static_cast<CMPIEnumeration*>(nullptr), [&]() -> CMPIEnumeration* {
         Broker& owner = Broker::of(broker);
-        const Target target(context, path);
+        const Target target(owner, context, path);
         const Array<CIMObjectPath> found =
             owner.services().enumerateInstanceNames(target.nameSpace, target.className());
         return Frame::current().make<EnumerationObject>(owner, found, target.nameSpace);
@@ -103,7 +112,7 @@ CMPIEnumeration* enumerateInstances(const CMPIBroker* broker, const CMPIContext*
 {
     return answer(rc, static_cast<CMPIEnumeration*>(nullptr), [&]() -> CMPIEnumeration* {
         Broker& owner = Broker::of(broker);
-        const Target target(context, path);
+        const Target target(owner, context, path);
         const Array<CIMInstance> found =
             owner.services().enumerateInstances(target.nameSpace, target.className(), listOf(properties));
         return Frame::current().make<EnumerationObject>(owner, found, target.nameSpace);
@@ -124,7 +133,7 @@ CMPIInstance* getInstance(const CMPIBroker* broker, const CMPIContext* context, 
 {
     return answer(rc, static_cast<CMPIInstance*>(nullptr), [&]() -> CMPIInstance* {
         Broker& owner = Broker::of(broker);
-        const Target target(context, path);
+        const Target target(owner, context, path);
         const CIMInstance found = instanceAt(owner, target, listOf(properties));
         return Frame::current().make<InstanceObject>(owner, found, target.nameSpace);
     });
@@ -135,7 +144,7 @@ CMPIObjectPath* createInstance(const CMPIBroker* broker, const CMPIContext* cont
 {
     return answer(rc, static_cast<CMPIObjectPath*>(nullptr), [&]() -> CMPIObjectPath* {
         Broker& owner = Broker::of(broker);
-        const Target target(context, path);
+        const Target target(owner, context, path);
         CIMObjectPath created =
             owner.services().createInstance(target.nameSpace, objectOf<InstanceObject>(instance).value());
         created.setNameSpace(target.nameSpace);
@@ -148,7 +157,7 @@ CMPIStatus modifyInstance(const CMPIBroker* broker, const CMPIContext* context, 
 {
     return perform([&] {
         Broker& owner = Broker::of(broker);
-        const Target target(context, path);
+        const Target target(owner, context, path);
         CIMInstance modified = objectOf<InstanceObject>(instance).value();
         modified.setPath(target.path);
         owner.services().modifyInstance(target.nameSpace, modified, listOf(properties));
@@ -158,24 +167,25 @@ CMPIStatus modifyInstance(const CMPIBroker* broker, const CMPIContext* context, 
 CMPIStatus deleteInstance(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* path)
 {
     return perform([&] {
-        const Target target(context, path);
-        Broker::of(broker).services().deleteInstance(target.nameSpace, target.path);
+        Broker& owner = Broker::of(broker);
+        const Target target(owner, context, path);
+        owner.services().deleteInstance(target.nameSpace, target.path);
     });
 }
 
 CMPIData invokeMethod(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* path,
                       const char* method, const CMPIArgs* in, CMPIArgs* out, CMPIStatus* rc)
 {
-    return answer(rc, kNothing, [&] {
+    return answer(rc, kNull, [&] {
         Broker& owner = Broker::of(broker);
-        const Target target(context, path);
+        const Target target(owner, context, path);
         const Array<CIMParamValue> input =
             in == nullptr ? Array<CIMParamValue>() : objectOf<ArgsObject>(in).parameters();
         Array<CIMParamValue> output;
         const CIMValue result =
             owner.services().invokeMethod(target.nameSpace, target.path, requireName(method), input, output);
         if (out != nullptr) {
-            const ArgsObject received(owner, output);
+            const ArgsObject received(owner, output, target.nameSpace);
             for (const NamedValue& value : received.values.all()) {
                 objectOf<ArgsObject>(out).values.append(value.name, value.value);
             }
@@ -189,7 +199,7 @@ CMPIStatus setProperty(const CMPIBroker* broker, const CMPIContext* context, con
 {
     return perform([&] {
         Broker& owner = Broker::of(broker);
-        const Target target(context, path);
+        const Target target(owner, context, path);
         const std::string nameSpace = base::utf8(target.nameSpace.getString());
         PathState state = objectOf<ObjectPathObject>(path).state;
         state.schema = owner.classes().find(nameSpace, base::utf8(target.className()));
@@ -207,7 +217,7 @@ CMPIData getProperty(const CMPIBroker* broker, const CMPIContext* context, const
 {
     return answer(rc, kNothing, [&] {
         Broker& owner = Broker::of(broker);
-        const Target target(context, path);
+        const Target target(owner, context, path);
         const char* names[] = {requireText(name), nullptr};
         const CIMInstance found = instanceAt(owner, target, listOf(names));
         return InstanceObject(owner, found, target.nameSpace).property(name);
@@ -268,8 +278,8 @@ CMPIEnumeration* referencesFiltered(const CMPIBroker*, const CMPIContext*, const
     return noOperation<CMPIEnumeration*>(rc, "References with a filter");
 }
 
-constexpr unsigned int kCapabilities =
-    CMPI_MB_InstanceManipulation | CMPI_MB_OSEncapsulationSupport | CMPI_MB_Supports_MemEnhancements;
+constexpr unsigned int kCapabilities = CMPI_MB_InstanceManipulation | CMPI_MB_OSEncapsulationSupport |
+                                       CMPI_MB_Supports_MemEnhancements | CMPI_MB_Supports_Extended_Error;
 
 } // namespace
 

@@ -107,7 +107,7 @@ CMPIMethodMI& ProviderInterfaces::method(const std::string& provider)
 
 CMPIrc ProviderInterfaces::cleanup(Provider& provider, bool terminating)
 {
-    const Frame frame;
+    const Frame frame(std::make_shared<const CallOrigin>(CallOrigin{&fBroker, {}, {}}));
     ContextObject context(fBroker);
     context.lifetime = Lifetime::kArgument;
     const CMPIrc instance = end(provider.instance, context, terminating);

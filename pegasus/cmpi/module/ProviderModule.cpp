@@ -7,6 +7,7 @@
 #include "pegasus/cmpi/module/VendorCall.h"
 #include "pegasus/cmpi/objects/ArgsObject.h"
 #include "pegasus/cmpi/objects/ContextObject.h"
+#include "pegasus/cmpi/objects/Habits.h"
 #include "pegasus/cmpi/objects/InstanceObject.h"
 #include "pegasus/cmpi/objects/ObjectPathObject.h"
 #include "pegasus/cmpi/objects/ResultObject.h"
@@ -14,6 +15,8 @@
 #include <Pegasus/Common/Exception.h>
 
 #include <optional>
+
+#include <unistd.h>
 
 namespace Pegasus::cmpi {
 namespace {
@@ -33,6 +36,17 @@ void throwUnlessOk(const CMPIStatus& status)
 CIMException notServed(const ProviderRequest& request, CIMStatusCode code, const char* slot)
 {
     return {code, base::fromUtf8Repaired("provider " + request.provider + " does not implement " + slot)};
+}
+
+// Providers find it in the paths that they get.
+const String& machineName()
+{
+    static const String kName = [] {
+        char name[256] = "";
+        ::gethostname(name, sizeof name - 1);
+        return base::fromUtf8Repaired(name);
+    }();
+    return kName;
 }
 
 template <typename Object> Object& asArgument(Object& object)
@@ -59,15 +73,15 @@ class ProviderModule::Impl
 
 namespace {
 
-// One call into a provider: its frame, its arguments and its result. The order of the members matters: the frame ends
-// after the arguments, and the interface may end only after both.
+// One call into a provider: its frame, its arguments and its result. The order of the members matters: the interface
+// may end only after everything else.
 class Call
 {
   public:
     Call(Broker& owner, ProviderInterfaces& interfaces, const ProviderRequest& request, const CIMObjectPath& target,
          ResultObject& resultObject)
-        : fUse(interfaces), fContext(owner, request), fPath(owner, placed(target, request.nameSpace)),
-          fResult(resultObject)
+        : fUse(interfaces), fContext(owner, request), fFrame(fContext.origin),
+          fPath(owner, placed(target, request.nameSpace)), fResult(resultObject)
     {
         owner.classes().beginRequest();
         asArgument(fContext);
@@ -94,12 +108,13 @@ class Call
     static CIMObjectPath placed(CIMObjectPath path, const CIMNamespaceName& nameSpace)
     {
         path.setNameSpace(nameSpace);
+        path.setHost(machineName());
         return path;
     }
 
     ProviderInterfaces::Use fUse;
-    Frame fFrame;
     ContextObject fContext;
+    Frame fFrame;
     ObjectPathObject fPath;
     ResultObject& fResult;
 };
@@ -226,15 +241,11 @@ CIMValue ProviderModule::invokeMethod(const ProviderRequest& request, const CIMO
                                       const Array<CIMParamValue>& in, Array<CIMParamValue>& out)
 {
     CIMValue returned;
-    bool hasReturned = false;
-    const auto take = [&](const CIMValue& value) {
-        returned = value;
-        hasReturned = true;
-    };
+    const auto take = [&](const CIMValue& value) { returned = value; };
     const PropertyFilter filter;
     ResultObject result(filter, nullptr, nullptr, take);
     const Call call(fImpl->broker, fImpl->interfaces, request, path, result);
-    ArgsObject input(fImpl->broker, in);
+    ArgsObject input(fImpl->broker, in, request.nameSpace);
     ArgsObject output(fImpl->broker);
     asArgument(input);
     asArgument(output);
@@ -245,11 +256,18 @@ CIMValue ProviderModule::invokeMethod(const ProviderRequest& request, const CIMO
     const std::string name = base::utf8(method);
     call.run(mi.ft->invokeMethod, &mi, call.context(), call.result(), call.path(), name.c_str(),
              static_cast<const CMPIArgs*>(&input), static_cast<CMPIArgs*>(&output));
-    if (!hasReturned || returned.isNull()) {
-        throw CIMException(CIM_ERR_FAILED, String("The object is not initialized."));
+    if (!result.isDone()) {
+        missedReturnDone(request);
     }
     out = output.parameters();
     return returned;
+}
+
+void ProviderModule::missedReturnDone(const ProviderRequest& request)
+try {
+    tolerate(Habit::kNoReturnDone, fImpl->broker, request.provider);
+} catch (const CmpiError& error) {
+    throw CIMException(CIM_ERR_FAILED, base::fromUtf8Repaired(error.text));
 }
 
 ProviderModule::Cleanup ProviderModule::cleanupWhenIdle()

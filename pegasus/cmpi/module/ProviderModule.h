@@ -63,7 +63,7 @@ class ProviderModule
     void deleteInstance(const ProviderRequest& request, const CIMObjectPath& path);
 
     // Replaces `out`.
-    // Throws: CIM_ERR_FAILED also when the returned value is missing or null.
+    // Returns: a null value when the provider returns none.
     CIMValue invokeMethod(const ProviderRequest& request, const CIMObjectPath& path, const CIMName& method,
                           const Array<CIMParamValue>& in, Array<CIMParamValue>& out);
 
@@ -71,6 +71,8 @@ class ProviderModule
     Cleanup cleanupWhenIdle();
 
   private:
+    void missedReturnDone(const ProviderRequest& request);
+
     class Impl;
     std::unique_ptr<Impl> fImpl;
 };

@@ -30,6 +30,19 @@ CMPICount getArgCount(const CMPIArgs* self, CMPIStatus* rc)
                   [&] { return static_cast<CMPICount>(objectOf<ArgsObject>(self).values.all().size()); });
 }
 
+CIMValue placed(const CIMValue& value, const CIMNamespaceName& nameSpace)
+{
+    if (value.getType() != CIMTYPE_REFERENCE || value.isArray() || value.isNull()) {
+        return value;
+    }
+    CIMObjectPath path;
+    value.get(path);
+    if (path.getNameSpace().isNull()) {
+        path.setNameSpace(nameSpace);
+    }
+    return CIMValue(path);
+}
+
 } // namespace
 
 const CMPIArgsFT kArgsTable{
@@ -41,10 +54,11 @@ ArgsObject::ArgsObject(Broker& owner) : CMPIArgs{nullptr, &kArgsTable}, broker(o
     hdl = this;
 }
 
-ArgsObject::ArgsObject(Broker& owner, const Array<CIMParamValue>& parameters) : ArgsObject(owner)
+ArgsObject::ArgsObject(Broker& owner, const Array<CIMParamValue>& parameters, const CIMNamespaceName& nameSpace)
+    : ArgsObject(owner)
 {
     for (Uint32 i = 0; i < parameters.size(); ++i) {
-        values.append(CIMName(parameters[i].getParameterName()), parameters[i].getValue());
+        values.append(CIMName(parameters[i].getParameterName()), placed(parameters[i].getValue(), nameSpace));
     }
 }
 

@@ -11,8 +11,9 @@ class ArgsObject final : public Owned, public CMPIArgs
 {
   public:
     explicit ArgsObject(Broker& owner);
-    // Takes the parameters as they came, repeated and wrongly typed ones included: the provider judges them.
-    ArgsObject(Broker& owner, const Array<CIMParamValue>& parameters);
+    // Takes the parameters as they came, repeated and wrongly typed ones included: the provider judges them. References
+    // without a namespace get `nameSpace`.
+    ArgsObject(Broker& owner, const Array<CIMParamValue>& parameters, const CIMNamespaceName& nameSpace);
     ArgsObject(const ArgsObject& other) : ArgsObject(other.broker) { values = other.values; }
 
     Array<CIMParamValue> parameters() const;

@@ -1,11 +1,14 @@
 #include "pegasus/cmpi/objects/ArrayObject.h"
 
+#include "pegasus/cmpi/objects/DateTimeObject.h"
+#include "pegasus/cmpi/objects/Habits.h"
 #include "pegasus/cmpi/objects/StringObject.h"
 
 #include <Pegasus/Common/CIMDateTime.h>
 #include <Pegasus/Common/CIMInstance.h>
 #include <Pegasus/Common/CIMObjectPath.h>
 
+#include <type_traits>
 #include <utility>
 
 namespace Pegasus::cmpi {
@@ -27,7 +30,7 @@ CMPIType getSimpleType(const CMPIArray* self, CMPIStatus* rc)
 
 CMPIData getElementAt(const CMPIArray* self, CMPICount index, CMPIStatus* rc)
 {
-    return answer(rc, kNothing, [&] { return objectOf<ArrayObject>(self).at(index); });
+    return answer(rc, kNull, [&] { return objectOf<ArrayObject>(self).at(index); });
 }
 
 CMPIStatus setElementAt(const CMPIArray* self, CMPICount index, const CMPIValue* value, CMPIType type)
@@ -55,6 +58,9 @@ template <typename T> CIMValue typedArray(const std::vector<CIMValue>& elements)
     Array<T> array;
     array.reserveCapacity(static_cast<Uint32>(elements.size()));
     for (const CIMValue& element : elements) {
+        if (std::is_same_v<T, CIMDateTime> && element.isNull()) {
+            tolerate(Habit::kNullDateTimeElement);
+        }
         array.append(element.isNull() ? T{} : valueOf<T>(element));
     }
     return CIMValue(array);
@@ -147,12 +153,47 @@ CMPIData ArrayObject::at(CMPICount index) const
 void ArrayObject::set(CMPICount index, const CMPIValue* value, CMPIType type)
 {
     requireIndex(index);
+    if (value == nullptr) {
+        tolerate(Habit::kNullElement);
+    }
     if (type == CMPI_null) {
         value = nullptr;
+        type = fType;
     } else if (cimTypeOf(type) != cimTypeOf(fType) || (type & CMPI_ARRAY) != 0) {
         throw CmpiError{CMPI_RC_ERR_TYPE_MISMATCH, {}};
     }
-    fElements[index] = decodeValue(value, type == CMPI_null ? fType : type);
+    if (value != nullptr && type != fType) {
+        tolerate(fType == CMPI_string ? Habit::kCharsInStringArray : Habit::kStringInCharsArray);
+    }
+    fElements[index] = decodeValue(value, type);
+    if (value != nullptr && (type == CMPI_string || type == CMPI_dateTime)) {
+        keepHandle(*value, type);
+    }
+}
+
+// OpenPegasus keeps the handle itself; this notes on the element that an unused array holds it.
+void ArrayObject::keepHandle(const CMPIValue& value, CMPIType type)
+{
+    if (!fUnused) {
+        fUnused = std::make_shared<bool>(true);
+    }
+    if (type == CMPI_string && value.string != nullptr) {
+        static_cast<StringObject&>(*value.string).holder = fUnused;
+    } else if (type == CMPI_dateTime && value.dateTime != nullptr) {
+        static_cast<DateTimeObject&>(*value.dateTime).holder = fUnused;
+    }
+}
+
+void ArrayObject::markUsed() const
+{
+    if (fUnused) {
+        *fUnused = false;
+    }
+}
+
+ArrayObject::~ArrayObject()
+{
+    markUsed();
 }
 
 void ArrayObject::requireIndex(CMPICount index) const

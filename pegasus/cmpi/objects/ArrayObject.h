@@ -2,6 +2,7 @@
 
 #include "pegasus/cmpi/objects/ValueCodec.h"
 
+#include <memory>
 #include <vector>
 
 namespace Pegasus::cmpi {
@@ -15,6 +16,7 @@ class ArrayObject final : public Owned, public CMPIArray
     ArrayObject(Broker& broker, CMPICount size, CMPIType type);
     ArrayObject(Broker& broker, CMPIType type, std::vector<CIMValue> elements);
     ArrayObject(const ArrayObject& other) : ArrayObject(other.fBroker, other.fType, other.fElements) {}
+    ~ArrayObject() override;
 
     CMPIType elementType() const { return fType; }
     const std::vector<CIMValue>& elements() const { return fElements; }
@@ -23,15 +25,19 @@ class ArrayObject final : public Owned, public CMPIArray
     CMPIData at(CMPICount index) const;
     // Throws: also CMPI_RC_ERR_TYPE_MISMATCH.
     void set(CMPICount index, const CMPIValue* value, CMPIType type);
+    // The array's elements have been copied: what it was filled with may be released.
+    void markUsed() const;
 
     Lifetime lifetime = Lifetime::kFrame;
 
   private:
     void requireIndex(CMPICount index) const;
+    void keepHandle(const CMPIValue& value, CMPIType type);
 
     Broker& fBroker;
     CMPIType fType; // of one element, as the provider named it
     std::vector<CIMValue> fElements;
+    std::shared_ptr<bool> fUnused; // shared with the strings and datetimes that it was given
 };
 
 extern const CMPIArrayFT kArrayTable;

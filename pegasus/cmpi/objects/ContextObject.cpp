@@ -55,6 +55,8 @@ ContextObject::ContextObject(Broker& owner, const ProviderRequest& request) : Co
     values.append(CIMName(CMPIPrincipal), CIMValue(request.principal));
     values.append(CIMName(CMPIAcceptLanguage), CIMValue(request.acceptLanguages));
     values.append(CIMName(CMPIInitNameSpace), CIMValue(request.nameSpace.getString()));
+    values.append(CIMName(CMPIRole), CIMValue(String())); // this server has no roles
+    origin = std::make_shared<const CallOrigin>(CallOrigin{&owner, request.provider, request.nameSpace});
 }
 
 std::string ContextObject::text(const char* name) const

@@ -15,7 +15,11 @@ class ContextObject final : public Owned, public CMPIContext
     // An empty context, for factories and cleanup functions.
     explicit ContextObject(Broker& owner);
     ContextObject(Broker& owner, const ProviderRequest& request);
-    ContextObject(const ContextObject& other) : ContextObject(other.broker) { values = other.values; }
+    ContextObject(const ContextObject& other) : ContextObject(other.broker)
+    {
+        values = other.values;
+        origin = other.origin;
+    }
 
     // Returns: the text of a string entry, or "".
     std::string text(const char* name) const;
@@ -23,6 +27,7 @@ class ContextObject final : public Owned, public CMPIContext
     Broker& broker;
     NamedValues values;
     Lifetime lifetime = Lifetime::kFrame;
+    std::shared_ptr<const CallOrigin> origin; // of the request; null in an empty context
     // Set in a context that was prepared for another thread: that thread's frame, while it is attached.
     std::unique_ptr<Frame> threadFrame;
 };

@@ -1,6 +1,7 @@
 #include "pegasus/cmpi/objects/DateTimeObject.h"
 
 #include "pegasus/base/Text.h"
+#include "pegasus/cmpi/objects/Habits.h"
 #include "pegasus/cmpi/objects/StringObject.h"
 
 #include <Pegasus/Common/Exception.h>
@@ -39,7 +40,7 @@ CMPIBoolean isInterval(const CMPIDateTime* self, CMPIStatus* rc)
 } // namespace
 
 const CMPIDateTimeFT kDateTimeTable{kTableVersion,
-                                    releaseObject<DateTimeObject, CMPIDateTime>,
+                                    releaseHeld<DateTimeObject, CMPIDateTime>,
                                     cloneObject<DateTimeObject, CMPIDateTime>,
                                     getBinaryFormat,
                                     getStringFormat,

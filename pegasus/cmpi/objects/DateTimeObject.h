@@ -4,6 +4,8 @@
 
 #include <Pegasus/Common/CIMDateTime.h>
 
+#include <memory>
+
 namespace Pegasus::cmpi {
 
 // A CMPIDateTime. Its binary form is in microseconds: since 1970, or the length of an interval.
@@ -16,6 +18,7 @@ class DateTimeObject final : public Owned, public CMPIDateTime
     const CIMDateTime& value() const { return fValue; }
 
     Lifetime lifetime = Lifetime::kFrame;
+    std::shared_ptr<const bool> holder; // true while an array that was not used yet holds this; may be null
 
   private:
     CIMDateTime fValue;

@@ -16,7 +16,7 @@ CIMObjectPath placed(CIMObjectPath path, const CIMName& className, const CIMName
 
 CMPIData getNext(const CMPIEnumeration* self, CMPIStatus* rc)
 {
-    return answer(rc, kNothing, [&] { return objectOf<EnumerationObject>(self).next(); });
+    return answer(rc, kNull, [&] { return objectOf<EnumerationObject>(self).next(); });
 }
 
 CMPIBoolean hasNext(const CMPIEnumeration* self, CMPIStatus* rc)

@@ -17,7 +17,9 @@ void Owned::unlink()
     fPrevious = fNext = nullptr;
 }
 
-Frame::Frame() : fOuter(tCurrent)
+Frame::Frame() : Frame(tCurrent == nullptr ? nullptr : tCurrent->fOrigin) {}
+
+Frame::Frame(std::shared_ptr<const CallOrigin> origin) : fOuter(tCurrent), fOrigin(std::move(origin))
 {
     fObjects.fPrevious = fObjects.fNext = &fObjects;
     tCurrent = this;
@@ -43,6 +45,12 @@ Frame& Frame::current()
         tCurrent = &fgRoot;
     }
     return *tCurrent;
+}
+
+const CallOrigin& Frame::origin() const
+{
+    static const CallOrigin kNone;
+    return fOrigin ? *fOrigin : kNone;
 }
 
 void Frame::adopt(Owned& object)

@@ -1,5 +1,9 @@
 #pragma once
 
+#include <Pegasus/Common/CIMName.h>
+
+#include <memory>
+#include <string>
 #include <utility>
 
 // Who frees what a provider holds, and when. CMPI lets a provider drop every object that the broker makes for it: the
@@ -15,6 +19,16 @@
 // - A provider that loops over many objects may open a frame of its own by mark() and end it by release().
 // - A provider's own thread gets a frame by attachThread() and ends it by detachThread().
 namespace Pegasus::cmpi {
+
+class Broker;
+
+// Whose request the objects of a frame are made for.
+struct CallOrigin
+{
+    Broker* broker = nullptr; // null: outside of a request
+    std::string provider;
+    CIMNamespaceName nameSpace;
+};
 
 // Base of everything that a frame can free.
 class Owned
@@ -44,8 +58,9 @@ class Owned
 class Frame
 {
   public:
-    // Opens a frame, which becomes the current one.
+    // Opens a frame, which becomes the current one, for the same request as the frame around it.
     Frame();
+    explicit Frame(std::shared_ptr<const CallOrigin> origin);
     // Frees the frame's objects, the newest first, and those of frames that were opened later and are still open.
     ~Frame();
     Frame(const Frame&) = delete;
@@ -53,6 +68,8 @@ class Frame
 
     // Returns: the calling thread's innermost open frame.
     static Frame& current();
+
+    const CallOrigin& origin() const;
 
     // Makes an object in this frame.
     // Ownership: the frame's, until the object is deleted or unlinked.
@@ -72,6 +89,7 @@ class Frame
 
     Owned fObjects; // fixed node of the ring; the newest object comes first
     Frame* fOuter;
+    std::shared_ptr<const CallOrigin> fOrigin; // may be null
 };
 
 } // namespace Pegasus::cmpi

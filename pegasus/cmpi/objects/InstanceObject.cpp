@@ -3,6 +3,7 @@
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/Text.h"
 #include "pegasus/cmpi/objects/Broker.h"
+#include "pegasus/cmpi/objects/Habits.h"
 #include "pegasus/cmpi/objects/KeyCodec.h"
 #include "pegasus/cmpi/objects/NamedValues.h"
 #include "pegasus/cmpi/services/PropertyFilter.h"
@@ -11,6 +12,7 @@
 #include <Pegasus/Common/CIMObject.h>
 #include <Pegasus/Common/CIMProperty.h>
 
+#include <algorithm>
 #include <utility>
 
 namespace Pegasus::cmpi {
@@ -39,7 +41,13 @@ bool accepts(const PropertySchema& property, const CIMValue& value)
 // CMPI has one type for embedded objects of either kind; the class says which kind its property has.
 CIMValue asDeclared(const PropertySchema& property, const CIMValue& value)
 {
-    if (property.embedded != EmbeddedKind::kObject || value.getType() != CIMTYPE_INSTANCE || value.isNull()) {
+    if (property.embedded == EmbeddedKind::kNone) {
+        return value;
+    }
+    if (value.isNull()) { // a null embedded object is marked as an instance or not at all
+        return {property.embedded == EmbeddedKind::kInstance ? CIMTYPE_INSTANCE : CIMTYPE_STRING, property.isArray};
+    }
+    if (property.embedded != EmbeddedKind::kObject || value.getType() != CIMTYPE_INSTANCE) {
         return value;
     }
     if (!value.isArray()) {
@@ -56,10 +64,25 @@ CIMValue asDeclared(const PropertySchema& property, const CIMValue& value)
     return CIMValue(objects);
 }
 
+Uint32 sizeOf(const CIMValue& value)
+{
+    return value.isArray() && !value.isNull() ? value.getArraySize() : 0;
+}
+
 CIMProperty propertyOf(const PropertySchema& declared, const CIMValue& value)
 {
     const bool isReference = declared.type == CIMTYPE_REFERENCE && !declared.isArray;
-    return {declared.name, asDeclared(declared, value), 0, isReference ? declared.referenceClass : CIMName()};
+    const CIMValue typed = asDeclared(declared, value);
+    return {declared.name,       typed, sizeOf(typed), isReference ? declared.referenceClass : CIMName(), CIMName(),
+            declared.isInherited};
+}
+
+// The bit in fPathKeys of a key property; none for other properties, and for keys beyond the 32nd.
+std::uint32_t keyBit(const ClassSchema& schema, std::size_t property)
+{
+    const std::vector<std::size_t>& keys = schema.keys();
+    const auto at = std::find(keys.begin(), keys.end(), property) - keys.begin();
+    return at < std::min<std::ptrdiff_t>(32, keys.end() - keys.begin()) ? 1U << at : 0U;
 }
 
 } // namespace
@@ -82,7 +105,7 @@ InstanceObject::InstanceObject(Broker& owner, const CIMInstance& instance, const
 
 InstanceObject::InstanceObject(const InstanceObject& other)
     : CMPIInstance{nullptr, &kInstanceTable}, broker(other.broker), fPath(other.fPath), fPlaces(other.fPlaces),
-      fSet(other.fSet), fExtra(other.fExtra)
+      fSet(other.fSet), fPathKeys(other.fPathKeys), fExtra(other.fExtra)
 {
     hdl = this;
 }
@@ -94,6 +117,7 @@ void InstanceObject::takeKeys()
         const std::size_t at = fPath.schema ? fPath.schema->findKey(key.name) : ClassSchema::kNotFound;
         if (at != ClassSchema::kNotFound) {
             store(at, convertKey(key.value, fPath.schema->properties()[at].type));
+            fPathKeys |= keyBit(*fPath.schema, at);
         } else if (fPath.schema == nullptr) {
             storeExtra(key.name, key.value);
         }
@@ -113,6 +137,7 @@ void InstanceObject::takeProperties(const CIMInstance& instance)
             store(at, property.getValue());
         }
     }
+    fPathKeys = 0; // an instance of the server's
 }
 
 void InstanceObject::store(std::size_t index, CIMValue value)
@@ -149,11 +174,7 @@ CMPICount InstanceObject::propertyCount() const
 CMPIData InstanceObject::encode(std::size_t index) const
 {
     const CIMValue& value = fPath.schema ? valueAt(index) : fExtra[index].value;
-    CMPIData data = encodeValue(broker, value);
-    if (fPath.schema != nullptr && fPath.schema->properties()[index].isKey) {
-        data.state = static_cast<CMPIValueState>(data.state | CMPI_keyValue);
-    }
-    return data;
+    return encodeValue(broker, value);
 }
 
 CMPIData InstanceObject::property(const char* name) const
@@ -197,6 +218,11 @@ void InstanceObject::setProperty(const char* name, const CMPIValue* value, CMPIT
         return;
     }
     const PropertySchema& declared = fPath.schema->properties()[at];
+    if (type == CMPI_null) {
+        tolerate(Habit::kUntypedNull);
+    } else if (declared.embedded != EmbeddedKind::kNone && value != nullptr && cimTypeOf(type) == CIMTYPE_STRING) {
+        tolerate(Habit::kEmbeddedAsText);
+    }
     CIMValue decoded = type == CMPI_null ? CIMValue(declared.type, declared.isArray) : decodeValue(value, type);
     if (!accepts(declared, decoded)) {
         const std::string text = "property " + declared.text + " of " + fPath.schema->text() + " has another type";
@@ -204,6 +230,9 @@ void InstanceObject::setProperty(const char* name, const CMPIValue* value, CMPIT
         throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, text};
     }
     store(at, std::move(decoded));
+    if (declared.isKey) {
+        fPathKeys &= ~keyBit(*fPath.schema, at);
+    }
 }
 
 // Most providers set keys as properties only; the path that goes to the client needs them all.
@@ -239,13 +268,11 @@ CIMInstance InstanceObject::filtered(const PropertyFilter& filter) const
     CIMInstance result(fPath.className);
     // Appends directly and skips addProperty()'s search for the same name: the schema's names are distinct.
     Array<CIMProperty>& properties = ObjectAccess::rep(result).fProperties;
-    properties.reserveCapacity(static_cast<Uint32>(fSet.size() + fExtra.size()));
+    properties.reserveCapacity(static_cast<Uint32>(propertyCount()));
     if (fPath.schema != nullptr) {
         const auto& declared = fPath.schema->properties();
-        for (std::size_t i = 0; i < declared.size(); ++i) {
-            if ((fPlaces[i] != 0 || !declared[i].initial.isNull()) && filter.passes(*fPath.schema, i)) {
-                properties.append(propertyOf(declared[i], valueAt(i)));
-            }
+        for (const std::size_t i : filter.passing(*fPath.schema)) {
+            properties.append(propertyOf(declared[i], valueAt(i)));
         }
     }
     for (const NamedValue& extra : fExtra) {
@@ -253,13 +280,24 @@ CIMInstance InstanceObject::filtered(const PropertyFilter& filter) const
             properties.append(CIMProperty(extra.name, extra.value));
         }
     }
-    result.setPath(completePath().withoutNameSpace());
+    return result;
+}
+
+CIMInstance InstanceObject::delivered(const PropertyFilter& filter) const
+{
+    if (fPathKeys != 0) {
+        tolerate(Habit::kKeysOnPathOnly);
+    }
+    CIMInstance result = filtered(filter);
+    result.setPath(completePath().delivered());
     return result;
 }
 
 CIMInstance InstanceObject::value() const
 {
-    return filtered(PropertyFilter());
+    CIMInstance result = filtered(PropertyFilter());
+    result.setPath(completePath().withoutNameSpace());
+    return result;
 }
 
 } // namespace Pegasus::cmpi

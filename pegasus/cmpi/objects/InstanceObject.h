@@ -13,8 +13,8 @@ class PropertyFilter;
 
 // A CMPIInstance.
 //
-// An instance of a known class shows every declared property, with its default or null until it is set. It delivers the
-// properties that were set or have a default. An instance of an unknown class has the properties that were set.
+// An instance of a known class shows and delivers every declared property, with its default or null until it is set. An
+// instance of an unknown class has the properties that were set.
 // Path and key properties are separate, as in CMPI: a key that is missing in the path is taken from the property when
 // the path is asked for.
 class InstanceObject final : public Owned, public CMPIInstance
@@ -38,9 +38,9 @@ class InstanceObject final : public Owned, public CMPIInstance
     // Throws: CMPI_RC_ERR_FAILED when the class differs.
     void setPath(const PathState& path);
 
-    // Returns: the instance for the wire: its path is local, its properties are in the class's order.
-    CIMInstance filtered(const PropertyFilter& filter) const;
-    // Returns: the same with all properties, for embedding.
+    // Returns: the instance for the wire: its path is local, keys and properties are in the class's order.
+    CIMInstance delivered(const PropertyFilter& filter) const;
+    // Returns: the instance with all properties, for embedding and upcalls.
     CIMInstance value() const;
 
     Broker& broker;
@@ -53,10 +53,12 @@ class InstanceObject final : public Owned, public CMPIInstance
     void takeKeys();
     void takeProperties(const CIMInstance& instance);
     CMPIData encode(std::size_t index) const;
+    CIMInstance filtered(const PropertyFilter& filter) const;
 
     PathState fPath;
     std::vector<std::uint16_t> fPlaces; // by declared property: 0 when not set, else its index in fSet, plus 1
     std::vector<CIMValue> fSet;
+    std::uint32_t fPathKeys = 0;    // by key of the class, up to 32: its property has the path's value alone
     std::vector<NamedValue> fExtra; // the properties, when the class is unknown
 };
 

@@ -115,6 +115,11 @@ CIMValue valueOfText(const String& text, CIMType type)
 
 } // namespace
 
+bool isInteger(CIMType type)
+{
+    return type >= CIMTYPE_UINT8 && type <= CIMTYPE_SINT64;
+}
+
 CIMValue convertKey(const CIMValue& value, CIMType type)
 {
     if (value.isNull() || value.isArray()) {

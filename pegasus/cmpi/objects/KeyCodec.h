@@ -13,6 +13,8 @@ class Broker;
 // Ownership: objects in it belong to the current frame.
 CMPIData encodeKey(Broker& broker, const CIMValue& value);
 
+bool isInteger(CIMType type);
+
 // Converts a key's value to `type`: between integers of any width and char16, and from a string to a datetime or a
 // reference.
 // Returns: a null of `type` when the conversion fails.

@@ -4,18 +4,16 @@
 #include "pegasus/base/Text.h"
 #include "pegasus/cmpi/objects/StringObject.h"
 
+#include <algorithm>
+
 namespace Pegasus::cmpi {
 
 void NamedValues::set(const char* name, const CMPIValue* value, CMPIType type)
 {
     const CIMName parsed = requireName(name);
-    CIMValue decoded = decodeValue(value, type);
-    for (NamedValue& held : fValues) {
-        if (held.name.equal(parsed)) {
-            held.value = decoded;
-            return;
-        }
-    }
+    const CIMValue decoded = decodeValue(value, type);
+    const auto isSame = [&](const NamedValue& held) { return held.name.equal(parsed); };
+    fValues.erase(std::remove_if(fValues.begin(), fValues.end(), isSame), fValues.end());
     append(parsed, decoded);
 }
 

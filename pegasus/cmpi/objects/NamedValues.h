@@ -12,7 +12,7 @@ namespace Pegasus::cmpi {
 class NamedValues
 {
   public:
-    // Replaces the value of the same name.
+    // Appends; a value of the same name goes.
     // Throws: CMPI_RC_ERR_INVALID_PARAMETER for an illegal name; also as decodeValue.
     void set(const char* name, const CMPIValue* value, CMPIType type);
     // Appends, even when the name is there already; find() then returns the first one.

@@ -3,8 +3,10 @@
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/Text.h"
 #include "pegasus/cmpi/objects/Broker.h"
+#include "pegasus/cmpi/objects/Habits.h"
 #include "pegasus/cmpi/objects/KeyCodec.h"
 #include "pegasus/cmpi/objects/TableFunction.h"
+#include "pegasus/common/CIMObjectPathRep.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -91,6 +93,21 @@ bool isKeyType(CMPIType type)
     return (type & CMPI_ARRAY) == 0 && type != CMPI_instance && type != CMPI_null;
 }
 
+// A 64-bit integer may stand for any integer of its sign: that is how a provider gets keys.
+bool isSameKeyKind(CIMType declared, CIMType given)
+{
+    return declared == given || (given == CIMTYPE_UINT64 && isInteger(declared)) ||
+           (given == CIMTYPE_SINT64 && isInteger(declared));
+}
+
+CIMKeyBinding missingKey(const PropertySchema& declared)
+{
+    const CIMKeyBinding::Type type = declared.type == CIMTYPE_BOOLEAN ? CIMKeyBinding::BOOLEAN
+                                     : isInteger(declared.type)       ? CIMKeyBinding::NUMERIC
+                                                                      : CIMKeyBinding::STRING;
+    return {declared.name, String(), type};
+}
+
 } // namespace
 
 PathState::PathState(Broker& broker, const char* ns, const char* cls)
@@ -117,22 +134,34 @@ void PathState::lookUp(Broker& broker)
     schema = isNamed ? broker.classes().find(base::utf8(nameSpace.getString()), base::utf8(className)) : nullptr;
 }
 
+// Returns: the name as the class spells it.
+CIMName PathState::keyNameOf(const char* name, CMPIType type) const
+{
+    const std::size_t at = schema != nullptr ? schema->find(requireText(name)) : ClassSchema::kNotFound;
+    if (at == ClassSchema::kNotFound || !schema->properties()[at].isKey) {
+        CIMName other = requireName(name);
+        if (Broker* broker = Frame::current().origin().broker; schema != nullptr && broker != nullptr) {
+            broker->warnOnce("addKey: " + std::string(name) + " is not a key of class " + schema->text());
+        }
+        return at == ClassSchema::kNotFound ? other : schema->properties()[at].name;
+    }
+    const PropertySchema& declared = schema->properties()[at];
+    if (!isSameKeyKind(declared.type, cimTypeOf(type))) {
+        tolerate(Habit::kKeyOfOtherType);
+    }
+    return declared.name;
+}
+
 void PathState::addKey(const char* name, const CMPIValue* value, CMPIType type)
 {
     if (!isKeyType(type)) {
         throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, {}};
     }
-    CIMName keyName;
-    if (schema != nullptr) {
-        const std::size_t at = schema->find(requireText(name));
-        if (at == ClassSchema::kNotFound || !schema->properties()[at].isKey) {
-            throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, std::string(name) + " is not a key of " + schema->text()};
-        }
-        keyName = schema->properties()[at].name;
-    } else {
-        keyName = requireName(name);
-    }
+    CIMName keyName = keyNameOf(name, type);
     CIMValue decoded = decodeValue(value, type);
+    if (decoded.isNull()) {
+        tolerate(Habit::kNullKey);
+    }
     const auto held =
         std::find_if(keys.begin(), keys.end(), [&](const NamedValue& key) { return key.name.equal(keyName); });
     if (held != keys.end()) {
@@ -171,6 +200,35 @@ CIMObjectPath PathState::withNameSpace() const
 CIMObjectPath PathState::withoutNameSpace() const
 {
     return {String::EMPTY, CIMNamespaceName(), className, bindings()};
+}
+
+CIMObjectPath PathState::delivered() const
+{
+    if (schema == nullptr) {
+        return withoutNameSpace();
+    }
+    Array<CIMKeyBinding> result;
+    for (const std::size_t key : schema->keys()) {
+        const PropertySchema& declared = schema->properties()[key];
+        if (const NamedValue* held = findKey(declared.name)) {
+            result.append(CIMKeyBinding(held->name, held->value));
+        } else if (declared.type != CIMTYPE_REFERENCE) { // an empty reference is not CIM-XML
+            result.append(missingKey(declared));
+        }
+    }
+    std::vector<const NamedValue*> others;
+    for (const NamedValue& key : keys) {
+        if (schema->findKey(key.name) == ClassSchema::kNotFound) {
+            others.push_back(&key);
+        }
+    }
+    std::sort(others.begin(), others.end(), [](const NamedValue* x, const NamedValue* y) {
+        return String::compareNoCase(x->name.getString(), y->name.getString()) < 0;
+    });
+    for (const NamedValue* key : others) {
+        result.append(CIMKeyBinding(key->name, key->value));
+    }
+    return PathAccess::inOrder(className, result);
 }
 
 Array<CIMKeyBinding> PathState::bindings() const

@@ -21,9 +21,8 @@ struct PathState
     // their own.
     PathState(Broker& broker, const CIMObjectPath& path);
 
-    // Replaces the key of that name; a null value removes it.
-    // Throws: CMPI_RC_ERR_INVALID_DATA_TYPE for arrays, instances and untyped nulls; CMPI_RC_ERR_INVALID_PARAMETER when
-    //     the class is known and lacks that key.
+    // Replaces the key of that name; a null value removes it. A name other than a key of the class is taken and logged.
+    // Throws: CMPI_RC_ERR_INVALID_DATA_TYPE for arrays, instances and untyped nulls.
     void addKey(const char* name, const CMPIValue* value, CMPIType type);
     // Returns: the key of that name (case-insensitive), or null.
     const NamedValue* findKey(std::string_view name) const;
@@ -33,6 +32,9 @@ struct PathState
 
     CIMObjectPath withNameSpace() const;
     CIMObjectPath withoutNameSpace() const; // nor host
+    // Returns: the local path for the wire: the class's keys in its order, those that are missing empty, then the
+    // others.
+    CIMObjectPath delivered() const;
 
     const ClassSchema* schema = nullptr; // null: unknown class. The broker's cache owns it
     CIMNamespaceName nameSpace;
@@ -42,6 +44,7 @@ struct PathState
 
   private:
     Array<CIMKeyBinding> bindings() const;
+    CIMName keyNameOf(const char* name, CMPIType type) const;
 };
 
 } // namespace Pegasus::cmpi

@@ -1,5 +1,6 @@
 #include "pegasus/cmpi/objects/ResultObject.h"
 
+#include "pegasus/cmpi/objects/ErrorObject.h"
 #include "pegasus/cmpi/objects/InstanceObject.h"
 #include "pegasus/cmpi/objects/ObjectPathObject.h"
 #include "pegasus/cmpi/objects/ValueCodec.h"
@@ -36,9 +37,13 @@ CMPIStatus returnDone(const CMPIResult* self)
     return perform([&] { objectOf<ResultObject>(self).done(); });
 }
 
-CMPIStatus returnError(const CMPIResult*, const CMPIError*)
+// The error object adds to the status that the provider's function returns; the wire has room for that status alone.
+CMPIStatus returnError(const CMPIResult* self, const CMPIError* error)
 {
-    return perform([] { throw CmpiError{CMPI_RC_ERR_NOT_SUPPORTED, {}}; });
+    return perform([&] {
+        objectOf<ResultObject>(self);
+        objectOf<ErrorObject>(error);
+    });
 }
 
 } // namespace
@@ -76,12 +81,12 @@ template <typename Sink, typename Make> void ResultObject::deliver(const Sink& s
 
 void ResultObject::returnInstance(const CMPIInstance* instance)
 {
-    deliver(fInstances, [&] { return objectOf<InstanceObject>(instance).filtered(fFilter); });
+    deliver(fInstances, [&] { return objectOf<InstanceObject>(instance).delivered(fFilter); });
 }
 
 void ResultObject::returnPath(const CMPIObjectPath* path)
 {
-    deliver(fPaths, [&] { return objectOf<ObjectPathObject>(path).state.withoutNameSpace(); });
+    deliver(fPaths, [&] { return objectOf<ObjectPathObject>(path).state.delivered(); });
 }
 
 void ResultObject::returnData(const CMPIValue* value, CMPIType type)

@@ -26,6 +26,7 @@ class ResultObject final : public Owned, public CMPIResult
     void returnData(const CMPIValue* value, CMPIType type);
     // Everything after this is refused.
     void done() { fDone = true; }
+    bool isDone() const { return fDone; }
 
     // Throws: what the sink threw, if it did.
     void rethrow() const;

@@ -1,5 +1,7 @@
 #include "pegasus/cmpi/objects/StringObject.h"
 
+#include "pegasus/cmpi/objects/Habits.h"
+
 #include <utility>
 
 namespace Pegasus::cmpi {
@@ -17,7 +19,7 @@ char* newCharsCP(const CMPIString*, CMPICodepageID, CMPIStatus* rc)
 
 } // namespace
 
-const CMPIStringFT kStringTable{kTableVersion, releaseObject<StringObject, CMPIString>,
+const CMPIStringFT kStringTable{kTableVersion, releaseHeld<StringObject, CMPIString>,
                                 cloneObject<StringObject, CMPIString>, getCharPtr, newCharsCP};
 
 StringObject::StringObject(std::string text) : CMPIString{nullptr, &kStringTable}, fText(std::move(text))

@@ -2,6 +2,7 @@
 
 #include "pegasus/cmpi/objects/TableFunction.h"
 
+#include <memory>
 #include <string>
 
 namespace Pegasus::cmpi {
@@ -16,6 +17,7 @@ class StringObject final : public Owned, public CMPIString
     const std::string& text() const { return fText; }
 
     Lifetime lifetime = Lifetime::kFrame;
+    std::shared_ptr<const bool> holder; // true while an array that was not used yet holds this; may be null
 
   private:
     std::string fText;

@@ -109,5 +109,7 @@ template <typename Object, typename Face> Face* cloneObject(const Face* face, CM
 
 // What a function that returns data returns when it fails.
 constexpr CMPIData kNothing{CMPI_null, CMPI_nullValue | CMPI_notFound, {}};
+// The same where there is no name that could be missing.
+constexpr CMPIData kNull{CMPI_null, CMPI_nullValue, {}};
 
 } // namespace Pegasus::cmpi

@@ -4,7 +4,9 @@
 #include "pegasus/cmpi/objects/ArrayObject.h"
 #include "pegasus/cmpi/objects/Broker.h"
 #include "pegasus/cmpi/objects/DateTimeObject.h"
+#include "pegasus/cmpi/objects/Habits.h"
 #include "pegasus/cmpi/objects/InstanceObject.h"
+#include "pegasus/cmpi/objects/KeyCodec.h"
 #include "pegasus/cmpi/objects/ObjectPathObject.h"
 #include "pegasus/cmpi/objects/StringObject.h"
 
@@ -12,6 +14,7 @@
 #include <Pegasus/Common/CIMObject.h>
 
 #include <array>
+#include <cmath>
 #include <cstring>
 
 namespace Pegasus::cmpi {
@@ -36,6 +39,19 @@ constexpr std::array kTypes{
     TypePair{CIMTYPE_STRING, CMPI_charsptr},
 };
 
+// The element of an array that was made with another type than it is passed with.
+// Throws: CMPI_RC_ERR_INVALID_DATA_TYPE for a value that does not fit, and for other types than integers.
+CIMValue convertInteger(const CIMValue& element, CIMType wanted)
+{
+    if (isInteger(wanted) && isInteger(element.getType())) {
+        CIMValue converted = convertKey(element, wanted);
+        if (!converted.isNull()) {
+            return converted;
+        }
+    }
+    throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, "an element of the array does not fit the array's new type"};
+}
+
 // The value's memory may end right after the type's own bytes, and may be aligned for that type only.
 template <typename T> T read(const CMPIValue* value)
 {
@@ -50,17 +66,37 @@ template <typename Object, typename Face> CIMValue decodeObject(const CMPIValue*
     return face == nullptr ? CIMValue(type, false) : CIMValue(objectOf<Object>(face).value());
 }
 
-CIMValue decodeString(const CMPIString* string)
-{
-    if (string == nullptr || string->hdl == nullptr) {
-        return {CIMTYPE_STRING, false};
-    }
-    return base::fromUtf8Repaired(static_cast<const char*>(string->hdl));
-}
-
 CIMValue decodeText(const char* text)
 {
-    return text == nullptr ? CIMValue(CIMTYPE_STRING, false) : CIMValue(base::fromUtf8Repaired(text));
+    if (text == nullptr) {
+        return {CIMTYPE_STRING, false};
+    }
+    const std::string_view bytes = text;
+    if (!base::isUtf8(bytes)) {
+        tolerate(Habit::kTextNotUtf8);
+    }
+    return CIMValue(base::fromUtf8Repaired(bytes));
+}
+
+CIMValue decodeString(const CMPIString* string)
+{
+    return decodeText(string == nullptr ? nullptr : static_cast<const char*>(string->hdl));
+}
+
+template <typename Real> CIMValue decodeReal(Real value)
+{
+    if (value != 0 && !std::isnormal(value)) {
+        tolerate(Habit::kRealNotNormal);
+    }
+    return CIMValue(value);
+}
+
+CIMValue decodeChar16(CMPIChar16 value)
+{
+    if (value >= 0xD800 && value <= 0xDFFF) {
+        tolerate(Habit::kHalfSurrogate);
+    }
+    return CIMValue(Char16(value));
 }
 
 CIMValue decodeArray(const CMPIArray* array, CMPIType type)
@@ -69,10 +105,16 @@ CIMValue decodeArray(const CMPIArray* array, CMPIType type)
         return {cimTypeOf(type), true};
     }
     const ArrayObject& object = objectOf<ArrayObject>(array);
-    if (cimTypeOf(object.elementType()) != cimTypeOf(type)) {
-        throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, {}};
+    object.markUsed();
+    const CIMType wanted = cimTypeOf(type);
+    if (cimTypeOf(object.elementType()) == wanted) {
+        return arrayOf(wanted, object.elements());
     }
-    return arrayOf(cimTypeOf(type), object.elements());
+    std::vector<CIMValue> converted;
+    for (const CIMValue& element : object.elements()) {
+        converted.push_back(element.isNull() ? CIMValue(wanted, false) : convertInteger(element, wanted));
+    }
+    return arrayOf(wanted, converted);
 }
 
 CIMValue decodeScalar(const CMPIValue* value, CMPIType type)
@@ -81,7 +123,7 @@ CIMValue decodeScalar(const CMPIValue* value, CMPIType type)
     case CMPI_boolean:
         return CIMValue(Boolean{read<CMPIBoolean>(value) != 0});
     case CMPI_char16:
-        return CIMValue(Char16(read<CMPIChar16>(value)));
+        return decodeChar16(read<CMPIChar16>(value));
     case CMPI_uint8:
         return CIMValue(read<Uint8>(value));
     case CMPI_uint16:
@@ -99,9 +141,9 @@ CIMValue decodeScalar(const CMPIValue* value, CMPIType type)
     case CMPI_sint64:
         return CIMValue(read<Sint64>(value));
     case CMPI_real32:
-        return CIMValue(read<Real32>(value));
+        return decodeReal(read<Real32>(value));
     case CMPI_real64:
-        return CIMValue(read<Real64>(value));
+        return decodeReal(read<Real64>(value));
     case CMPI_string:
         return decodeString(read<const CMPIString*>(value));
     case CMPI_chars:

@@ -62,6 +62,9 @@ class BrokerServices
         throw CIMException(CIM_ERR_NOT_SUPPORTED, String("DeleteInstance"));
     }
 
+    // Whether calls fail that would fail on OpenPegasus 2.14, though the broker could carry them out.
+    virtual bool strictProviders() const { return false; }
+
     // A message of a provider, or of the broker about a provider. `text` is UTF-8, one line or several.
     virtual void log(Severity severity, const std::string& text) noexcept = 0;
 };

@@ -54,6 +54,7 @@ void ClassSchema::addProperty(const CIMConstProperty& property)
     added.type = property.getType();
     added.isArray = property.isArray();
     added.isKey = isTrue(property, "Key");
+    added.isInherited = property.getPropagated();
     added.embedded = embeddedKind(property);
     added.referenceClass = property.getReferenceClassName();
     added.initial = property.getValue();

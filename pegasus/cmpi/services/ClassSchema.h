@@ -23,6 +23,7 @@ struct PropertySchema
     CIMType type = CIMTYPE_STRING;
     bool isArray = false;
     bool isKey = false;
+    bool isInherited = false;
     EmbeddedKind embedded = EmbeddedKind::kNone;
     CIMName referenceClass;
     CIMValue initial; // null of the declared type, or the class's default

@@ -26,19 +26,23 @@ bool PropertyFilter::passes(const CIMName& name) const
     return fAll || std::any_of(fList.begin(), fList.end(), [&](const CIMName& listed) { return listed.equal(name); });
 }
 
-bool PropertyFilter::passes(const ClassSchema& schema, std::size_t index) const
+const std::vector<std::size_t>& PropertyFilter::passing(const ClassSchema& schema) const
 {
-    if (fAll) {
-        return true;
+    if (fSchema == &schema) {
+        return fPassing;
     }
-    if (fSchema != &schema) {
-        fPasses.clear();
-        for (const PropertySchema& property : schema.properties()) {
-            fPasses.push_back(passes(property.name));
+    fSchema = &schema;
+    fPassing.clear();
+    for (std::size_t i = 0; fAll && i < schema.properties().size(); ++i) {
+        fPassing.push_back(i);
+    }
+    for (const std::string& text : fTexts) {
+        const std::size_t at = schema.find(text);
+        if (at != ClassSchema::kNotFound && std::find(fPassing.begin(), fPassing.end(), at) == fPassing.end()) {
+            fPassing.push_back(at);
         }
-        fSchema = &schema;
     }
-    return fPasses[index];
+    return fPassing;
 }
 
 } // namespace Pegasus::cmpi

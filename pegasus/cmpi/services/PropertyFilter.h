@@ -9,7 +9,7 @@
 
 namespace Pegasus::cmpi {
 
-// A request's property list, asked once per property and instance.
+// A request's property list, asked once per instance.
 // Thread: one thread at a time.
 class PropertyFilter
 {
@@ -19,8 +19,9 @@ class PropertyFilter
     explicit PropertyFilter(const CIMPropertyList& list);
 
     bool passes(const CIMName& name) const;
-    // The same by the property's index in `schema`. The answers for one class are kept: results come class by class.
-    bool passes(const ClassSchema& schema, std::size_t index) const;
+    // Returns: the indices of the properties that pass: all in the class's order, or the listed ones in the list's
+    // order. The answer for one class is kept: results come class by class.
+    const std::vector<std::size_t>& passing(const ClassSchema& schema) const;
 
     // Returns: the names as CMPI passes them, ending in a null; null for "all".
     // Ownership: the filter's.
@@ -32,7 +33,7 @@ class PropertyFilter
     std::vector<std::string> fTexts; // fNames point into these
     mutable std::vector<const char*> fNames;
     mutable const ClassSchema* fSchema = nullptr;
-    mutable std::vector<bool> fPasses; // by property of fSchema
+    mutable std::vector<std::size_t> fPassing; // of fSchema
 };
 
 } // namespace Pegasus::cmpi

@@ -99,7 +99,7 @@ void AgentHandler::enumerateInstances(const HttpRequest& http, const CimRequest&
     module(http).enumerateInstances(providerRequest(http, request), request.parameters.className("ClassName"),
                                     request.parameters.propertyList(), [&](const CIMInstance& instance) {
                                         text.clear();
-                                        wire::appendNamedInstance(text, instance);
+                                        wire::appendNamedInstance(text, instance, wire::Blanks::kRaw);
                                         answer.write(text);
                                     });
 }
@@ -110,7 +110,7 @@ void AgentHandler::enumerateInstanceNames(const HttpRequest& http, const CimRequ
     module(http).enumerateInstanceNames(providerRequest(http, request), request.parameters.className("ClassName"),
                                         [&](const CIMObjectPath& path) {
                                             text.clear();
-                                            wire::appendInstanceName(text, path);
+                                            wire::appendInstanceName(text, path, wire::Blanks::kRaw);
                                             answer.write(text);
                                         });
 }
@@ -118,9 +118,11 @@ void AgentHandler::enumerateInstanceNames(const HttpRequest& http, const CimRequ
 void AgentHandler::getInstance(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)
 {
     std::string text;
-    wire::appendInstance(text, module(http).getInstance(providerRequest(http, request),
-                                                        request.parameters.instanceName("InstanceName"),
-                                                        request.parameters.propertyList()));
+    wire::appendInstance(text,
+                         module(http).getInstance(providerRequest(http, request),
+                                                  request.parameters.instanceName("InstanceName"),
+                                                  request.parameters.propertyList()),
+                         wire::Blanks::kRaw);
     answer.write(text);
 }
 
@@ -149,7 +151,9 @@ void AgentHandler::invokeMethod(const HttpRequest& http, const CimRequest& reque
     const CIMValue result = module(http).invokeMethod(providerRequest(http, request), request.object,
                                                       CIMName(String(request.method.c_str())), request.arguments, out);
     std::string text;
-    wire::appendReturnValue(text, result);
+    if (!result.isNull()) {
+        wire::appendReturnValue(text, result);
+    }
     for (Uint32 i = 0; i < out.size(); ++i) {
         wire::appendParamValue(text, out[i]);
     }

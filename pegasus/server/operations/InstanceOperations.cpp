@@ -91,8 +91,8 @@ void enumerateInstances(ServerCore& core, const CimRequest& request, ElementSink
     }
     const InstanceSources sources(core, request.nameSpace, className);
     FirstError error;
+    const CIMPropertyList list = sources.properties(options);
     for (const auto& [name, provider] : sources.provided()) {
-        const CIMPropertyList list = sources.propertiesOf(name, options);
         error.run([&, providedClass = name, reference = provider] {
             return core.agents.request(reference, makeEnumerateInstancesRequest(request.nameSpace, providedClass, list),
                                        answer);

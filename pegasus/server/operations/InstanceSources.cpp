@@ -25,10 +25,9 @@ bool InstanceSources::isProvided(const CIMName& className) const
                        [&](const auto& provided) { return provided.first == className; });
 }
 
-CIMPropertyList InstanceSources::propertiesOf(const CIMName& providedClass,
-                                              const repository::InstanceOptions& options) const
+CIMPropertyList InstanceSources::properties(const repository::InstanceOptions& options) const
 {
-    if (options.deepInheritance || providedClass == fClassName) {
+    if (options.deepInheritance) {
         return options.propertyList;
     }
     repository::ClassOptions classOptions;

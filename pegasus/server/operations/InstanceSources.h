@@ -21,9 +21,9 @@ class InstanceSources
     const std::vector<std::pair<CIMName, ProviderReference>>& provided() const { return fProvided; }
     bool isProvided(const CIMName& className) const;
 
-    // Returns: the property list for one provided class. When deep inheritance is off, a subclass's instances are cut
+    // Returns: the property list for the providers. When deep inheritance is off, all instances are cut
     // down to the named class's properties.
-    CIMPropertyList propertiesOf(const CIMName& providedClass, const repository::InstanceOptions& options) const;
+    CIMPropertyList properties(const repository::InstanceOptions& options) const;
 
   private:
     const ServerCore& fCore;

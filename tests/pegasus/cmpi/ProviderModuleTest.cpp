@@ -7,6 +7,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <atomic>
 #include <memory>
 #include <thread>
@@ -130,7 +131,7 @@ TEST_F(Module, InstancesHaveWhatWasSetAndTheirKeys)
     EXPECT_EQ(text(item.getPath().toString()), "TST_Item.Id=\"1\"");
     EXPECT_EQ(propertyText(item, "Id"), "1");
     EXPECT_EQ(propertyText(item, "Number"), "1");
-    EXPECT_EQ(propertyText(item, "Unset"), "<none>");
+    EXPECT_EQ(propertyText(item, "Unset"), "<null>");
 }
 
 TEST_F(Module, PropertyListReachesProviderAndResult)
@@ -144,7 +145,7 @@ TEST_F(Module, PropertyListReachesProviderAndResult)
     };
     Array<CIMName> one;
     one.append(CIMName("text"));
-    const std::vector<Case> cases{{"all", CIMPropertyList(), "1: all", 3},
+    const std::vector<Case> cases{{"all", CIMPropertyList(), "1: all", 4},
                                   {"none", CIMPropertyList(Array<CIMName>()), "1: ", 0},
                                   {"one", CIMPropertyList(one), "1: text;", 1}};
     load();
@@ -257,11 +258,14 @@ TEST_F(Module, MethodsEchoEveryType)
     }
 }
 
-TEST_F(Module, MethodWithoutResultFails)
+TEST_F(Module, MethodWithoutReturnValueSucceeds)
 {
     load();
-    EXPECT_EQ(errorOf([&] { invoke("Echo", "Null", CIMValue(CIMTYPE_UINT8, false)); }),
-              "1: The object is not initialized.");
+    Array<CIMParamValue> in;
+    Array<CIMParamValue> out;
+    in.append(CIMParamValue(String("Null"), CIMValue(CIMTYPE_UINT8, false)));
+    EXPECT_TRUE(invoke("Echo", in, out).isNull());
+    EXPECT_EQ(out.size(), 1U) << "outputs arrive";
     EXPECT_EQ(errorOf([&] { invoke("Nope", "X", CIMValue(Uint8{1})); }), "17: Nope");
 }
 
@@ -271,7 +275,8 @@ TEST_F(Module, UnknownPropertyIsLoggedOnce)
     for (int i = 0; i < 2; ++i) {
         invoke("Run", "Name", CIMValue(String("unknown and mistyped properties")));
     }
-    EXPECT_THAT(services.logged(), ElementsAre("setProperty: class TST_Everything has no property Nope"));
+    const std::vector<std::string> lines = services.logged();
+    EXPECT_EQ(std::count(lines.begin(), lines.end(), "setProperty: class TST_Everything has no property Nope"), 1);
 }
 
 TEST_F(Module, AsksForAClassOnce)

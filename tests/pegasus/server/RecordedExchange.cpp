@@ -71,6 +71,10 @@ void appendCanonical(std::string& out, const XmlElement& element, int depth, Ord
 // ignored, since that holds inside it too.
 std::string canonicalText(std::string text, int depth, Order order)
 {
+    if (order == Order::kSorted) {
+        text.erase(text.find_last_not_of(' ') + 1);
+        text.erase(0, text.find_first_not_of(' '));
+    }
     if (order == Order::kAsSent || text.rfind("<INSTANCE ", 0) != 0) {
         return ": " + text;
     }
@@ -78,6 +82,12 @@ std::string canonicalText(std::string text, int depth, Order order)
     std::string out = "\n";
     appendCanonical(out, document.parseFragment(text.data(), text.size()), depth + 1, order);
     return out;
+}
+
+// What a CMPI instance has from its class, and the instance of a provider in C++ lacks.
+bool isOfClassOnly(std::string_view attribute)
+{
+    return attribute == "PROPAGATED" || attribute == "ARRAYSIZE";
 }
 
 void appendCanonical(std::string& out, const XmlElement& element, int depth, Order order)
@@ -95,7 +105,7 @@ void appendCanonical(std::string& out, const XmlElement& element, int depth, Ord
     element.attributes(kNames, values);
     out += std::string(static_cast<std::size_t>(depth), ' ') + std::string(element.name());
     for (std::size_t i = 0; i < std::size(kNames); ++i) {
-        if (values[i]) {
+        if (values[i] && !(order == Order::kSorted && isOfClassOnly(kNames[i]))) {
             out += " " + std::string(kNames[i]) + "=" + std::string(element.resolved(*values[i], scratch));
         }
     }
@@ -108,7 +118,9 @@ void appendCanonical(std::string& out, const XmlElement& element, int depth, Ord
     }
     std::vector<std::string> children;
     for (XmlElement child = element.firstChild(); child; child = child.nextSibling()) {
-        appendCanonical(children.emplace_back(), child, depth + 1, order);
+        if (order == Order::kAsSent || child.name().substr(0, 8) != "PROPERTY" || child.firstChild()) {
+            appendCanonical(children.emplace_back(), child, depth + 1, order);
+        }
     }
     if (order == Order::kSorted && (element.is("IRETURNVALUE") || element.is("INSTANCE"))) {
         std::sort(children.begin(), children.end());

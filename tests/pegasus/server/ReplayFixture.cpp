@@ -48,9 +48,9 @@ const BetterRow kBetter[] = {
      "failed"},
     {"EnumerateInstances", "CIMStatusCodeDescription: lab failure",
      "cimstatuscodedescription: CIM_ERR_FAILED: File \"libNoSuchLibrary.so\"", Body::kSame, "likewise"},
-    {"", "CIMStatusCodeDescription: Unrecognized CIM status code", "cimstatuscode: 1\n", Body::kSame,
-     "a number outside the CIM status codes arrives as one that clients know"},
     {"InOut", "sent twice", "VALUE: again", Body::kOther, "CMPI keeps one argument of a name, the last"},
+    {"InOut", "sent as a reference value", "LOCALNAMESPACEPATH", Body::kOther,
+     "a CMPI provider gets a reference with the request's namespace, and gives it back so"},
     {"EmbIn", "embedded instance", "EmbeddedObject=instance EMBEDDEDOBJECT=instance NAME=oobj", Body::kOther,
      "CMPI has one type for an instance and an object, and nothing declares "
      "which one a parameter is"},

@@ -78,6 +78,7 @@ class PEGASUS_COMMON_LINKAGE CIMObjectPath
     Uint32 makeHashCode() const;
 
   private:
+    friend struct PathAccess;
     RepPointer<CIMObjectPathRep> fRep;
 };
 

@@ -50,6 +50,7 @@ static CMPIInstance* makeItem(int id)
     path->ft->addKey(path, "Id", (const CMPIValue*)text, CMPI_chars);
     CMPIInstance* instance = gBroker->eft->newInstance(gBroker, path, NULL);
     path->ft->release(path);
+    instance->ft->setProperty(instance, "Id", (const CMPIValue*)text, CMPI_chars);
     snprintf(text, sizeof text, "item %d", id);
     instance->ft->setProperty(instance, "Text", (const CMPIValue*)text, CMPI_chars);
     const CMPIValue number = {.uint32 = (CMPIUint32)id};
@@ -216,14 +217,14 @@ static CMPIStatus listChecks(const CMPIResult* result, CMPIArgs* out)
             ++count;
         }
     }
-    CMPIValue names = {.array = gBroker->eft->newArray(gBroker, count, CMPI_string, NULL)};
+    CMPIValue names = {.array = gBroker->eft->newArray(gBroker, count, CMPI_chars, NULL)};
     count = 0;
     for (int t = 0; t < kTableCount; ++t) {
         for (const CheckRow* row = kTables[t]; row->name != NULL; ++row) {
             names.array->ft->setElementAt(names.array, count++, (const CMPIValue*)row->name, CMPI_chars);
         }
     }
-    out->ft->addArg(out, "Names", &names, CMPI_stringA);
+    out->ft->addArg(out, "Names", &names, CMPI_charsA);
     const CMPIValue zero = {.uint32 = 0};
     return result->ft->returnData(result, &zero, CMPI_uint32);
 }
@@ -329,7 +330,7 @@ static CMPIStatus tstInvokeMethod(CMPIMethodMI* mi, const CMPIContext* ctx, cons
         status = failure(CMPI_RC_ERR_METHOD_NOT_FOUND, method);
     }
     --gRunning;
-    return status;
+    return status.rc == CMPI_RC_OK && strcmp(gMode, "no done") != 0 ? result->ft->returnDone(result) : status;
 }
 
 static CMPIStatus tstMethodCleanup(CMPIMethodMI* mi, const CMPIContext* ctx, CMPIBoolean terminating)

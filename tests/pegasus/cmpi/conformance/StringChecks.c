@@ -102,12 +102,12 @@ static const char* messagesTakeArguments(const Env* env)
     const CMPIString* made =
         env->mb->eft->getMessage(env->mb, "id", "$0, $1, $2, $3, $4, $9, 5$", &rc, 5, CMPI_sint16, -3, CMPI_uint64,
                                  (CMPIUint64)1 << 40, CMPI_chars, "chars", CMPI_string, text, CMPI_boolean, 1);
-    REQUIRE(rc.rc == CMPI_RC_OK && strcmp(textOf(made), "-3, 1099511627776, chars, string, true, $9, 5$") == 0);
+    REQUIRE(rc.rc == CMPI_RC_OK && strcmp(textOf(made), "-3, 1099511627776, chars, string, true, , 5") == 0);
     CMPIMsgFileHandle handle = &rc;
-    REQUIRE(env->mb->eft->openMessageFile(env->mb, "file", &handle).rc == CMPI_RC_ERR_NOT_SUPPORTED);
+    REQUIRE(env->mb->eft->openMessageFile(env->mb, "file", &handle).rc == CMPI_RC_OK);
     made = env->mb->eft->getMessage2(env->mb, "id", handle, "$0", NULL, 1, CMPI_real64, 0.5);
     REQUIRE(strncmp(textOf(made), "0.5", 3) == 0);
-    REQUIRE(env->mb->eft->closeMessageFile(env->mb, handle).rc == CMPI_RC_ERR_NOT_SUPPORTED);
+    REQUIRE(env->mb->eft->closeMessageFile(env->mb, handle).rc == CMPI_RC_OK);
     return NULL;
 }
 

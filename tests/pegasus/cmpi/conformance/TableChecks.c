@@ -50,6 +50,8 @@ static const char* objectTables(const Env* env)
     REQUIRE_OBJECT(eft->newString(env->mb, "x", NULL));
     REQUIRE_OBJECT(eft->newArray(env->mb, 1, CMPI_uint8, NULL));
     REQUIRE_OBJECT(eft->newDateTime(env->mb, NULL));
+    REQUIRE_OBJECT(
+        eft->newCMPIError(env->mb, "o", "i", "m", ErrorSevLow, ErrorProbCauseOther, CMPI_RC_ERR_FAILED, NULL));
     REQUIRE_OBJECT(env->mb->bft->enumerateInstanceNames(env->mb, env->ctx, newPath(env, "TST_Item"), NULL));
     return NULL;
 }
@@ -89,15 +91,11 @@ static const char* unsupportedSlotsAnswer(const Env* env)
     CMPIStatus rc = kGarbage;
     REQUIRE(mb->eft->newSelectExp(mb, "select * from X", "WQL", NULL, &rc) == NULL && rc.rc != CMPI_RC_OK);
     rc = kGarbage;
-    REQUIRE(mb->eft->newCMPIError(mb, "o", "i", "m", ErrorSevLow, ErrorProbCauseOther, CMPI_RC_ERR_FAILED, &rc) ==
-            NULL);
-    REQUIRE(rc.rc == CMPI_RC_ERR_NOT_SUPPORTED);
-    rc = kGarbage;
     REQUIRE(mb->bft->execQuery(mb, env->ctx, env->op, "q", "WQL", &rc) == NULL && rc.rc == CMPI_RC_ERR_NOT_SUPPORTED);
     rc = kGarbage;
     REQUIRE(mb->bft->associators(mb, env->ctx, env->op, NULL, NULL, NULL, NULL, NULL, &rc) == NULL);
     REQUIRE(rc.rc == CMPI_RC_ERR_NOT_SUPPORTED);
-    REQUIRE(mb->bft->deliverIndication(mb, env->ctx, NS, newInst(env, "TST_Item")).rc == CMPI_RC_ERR_FAILED);
+    REQUIRE(mb->bft->deliverIndication(mb, env->ctx, NS, newInst(env, "TST_Item")).rc == CMPI_RC_OK);
     rc = kGarbage;
     const CMPIData none = env->op->ft->getClassQualifier(env->op, "Version", &rc);
     REQUIRE(rc.rc == CMPI_RC_ERR_NOT_SUPPORTED && (none.state & CMPI_nullValue) != 0);

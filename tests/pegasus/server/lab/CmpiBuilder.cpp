@@ -125,6 +125,9 @@ CMPIObjectPath* CmpiBuilder::path(const CIMObjectPath& from, const CIMInstance* 
     CMPIObjectPath* made =
         fBroker->eft->newObjectPath(fBroker, nameSpace.isNull() ? "" : c_str(nameSpace.getString().getCString()),
                                     c_str(from.getClassName().getString().getCString()), nullptr);
+    if (nameSpace.isNull()) {
+        made->ft->setNameSpace(made, ""); // the broker gave it the request's
+    }
     if (from.getHost().size() != 0) {
         made->ft->setHostname(made, c_str(from.getHost().getCString()));
     }

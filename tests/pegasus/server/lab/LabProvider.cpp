@@ -121,7 +121,10 @@ CMPIStatus enumerateInstanceNames(CMPIInstanceMI*, const CMPIContext*, const CMP
 CMPIStatus getInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result, const CMPIObjectPath* wanted,
                        const char**)
 {
-    const std::string wantedText = textOf(wanted->ft->toString(wanted, nullptr));
+    CMPIObjectPath* local = wanted->ft->clone(wanted, nullptr);
+    local->ft->setHostname(local, "");
+    const std::string wantedText = textOf(local->ft->toString(local, nullptr));
+    local->ft->release(local);
     return deliver(result, wanted, [&](const CmpiBuilder& builder, const Pegasus::CIMInstance& instance) {
         CMPIInstance* made = builder.instance(instance);
         const CMPIObjectPath* path = made->ft->getObjectPath(made, nullptr);
