@@ -36,6 +36,7 @@ AgentSettings agentSettings(const Config& config)
     settings.confinement.newPrivileges = config.flag("agentNewPrivileges");
     settings.confinement.capabilities = parseCapabilities(config.text("agentCapabilities")).value_or(0);
     settings.confinement.strictOwners = config.flag("strictOwners");
+    settings.confinement.strictProviders = config.flag("strictProviders");
     return settings;
 }
 

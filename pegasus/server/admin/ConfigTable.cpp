@@ -61,6 +61,8 @@ const std::vector<ConfigProperty>& configTable()
          "let agents gain privileges by programs with set-user-id bits or file capabilities"},
         {"agentCapabilities", kAgentCapabilities, Kind::kCapabilities, true,
          "capabilities that root's agents keep; all; none"},
+        {"strictProviders", "false", Kind::kBoolean, true,
+         "refuse calls of providers that fail on OpenPegasus 2.14; agents that start later do"},
     };
     return kTable;
 }

@@ -121,7 +121,7 @@ int runAgent(int, char** argv)
     confine(confinement);
     prepareForProviders();
     Log::open(defaultHome(), false);
-    AgentServices services(argv[2]);
+    AgentServices services(argv[2], confinement.strictProviders != 0);
     auto handler = std::make_unique<AgentHandler>(argv[2], services, confinement.strictOwners != 0);
     ChannelThreads threads;
     while (base::Descriptor channel = receiveChannel()) {

@@ -23,7 +23,7 @@ constexpr Field kFields[] = {
     {"memory=", &AgentConfinement::memoryMegabytes},      {"file=", &AgentConfinement::fileMegabytes},
     {"core=", &AgentConfinement::coreMegabytes},          {"processes=", &AgentConfinement::processes},
     {"newPrivileges=", &AgentConfinement::newPrivileges}, {"capabilities=", &AgentConfinement::capabilities},
-    {"strictOwners=", &AgentConfinement::strictOwners},
+    {"strictOwners=", &AgentConfinement::strictOwners},   {"strictProviders=", &AgentConfinement::strictProviders},
 };
 
 // A limit that is lower already stays.

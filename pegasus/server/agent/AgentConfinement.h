@@ -19,7 +19,8 @@ struct AgentConfinement
     std::uint64_t processes = 0;     // that it may add to the machine's as RLIMIT_NPROC counts them; 0: any
     std::uint64_t newPrivileges = 1; // whether programs may gain it privileges by set-user-id bits
     CapabilitySet capabilities = kAllCapabilities;
-    std::uint64_t strictOwners = 1; // whether a library that other users can change is refused
+    std::uint64_t strictOwners = 1;    // whether a library that other users can change is refused
+    std::uint64_t strictProviders = 0; // whether calls fail that would fail on OpenPegasus 2.14
 };
 
 // As words of a command line, "name=number", and back. Unknown words are passed over.

@@ -18,7 +18,9 @@ namespace Pegasus::server {
 class AgentServices : public cmpi::BrokerServices
 {
   public:
-    explicit AgentServices(const std::string& module) : fModule(module) {}
+    AgentServices(const std::string& module, bool strictProviders) : fModule(module), fStrictProviders(strictProviders)
+    {
+    }
 
     CIMClass getClass(const CIMNamespaceName& nameSpace, const CIMName& className) override;
     CIMInstance getInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path,
@@ -32,6 +34,7 @@ class AgentServices : public cmpi::BrokerServices
     void modifyInstance(const CIMNamespaceName& nameSpace, const CIMInstance& instance,
                         const CIMPropertyList& properties) override;
     void deleteInstance(const CIMNamespaceName& nameSpace, const CIMObjectPath& path) override;
+    bool strictProviders() const override { return fStrictProviders; }
     void log(Severity severity, const std::string& text) noexcept override;
 
   private:
@@ -41,6 +44,7 @@ class AgentServices : public cmpi::BrokerServices
     void giveBack(std::unique_ptr<CIMClient> client);
 
     std::string fModule;
+    bool fStrictProviders;
     std::mutex fMutex;
     std::vector<std::unique_ptr<CIMClient>> fIdle;
 };

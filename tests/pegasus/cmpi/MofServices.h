@@ -34,10 +34,13 @@ class MofServices : public BrokerServices
     Array<CIMObjectPath> enumerateInstanceNames(const CIMNamespaceName& nameSpace, const CIMName& className) override;
     CIMValue invokeMethod(const CIMNamespaceName& nameSpace, const CIMObjectPath& path, const CIMName& method,
                           const Array<CIMParamValue>& in, Array<CIMParamValue>& out) override;
+    bool strictProviders() const override { return strict; }
     void log(Severity severity, const std::string& text) noexcept override;
 
     std::vector<std::string> logged() const;
     unsigned classCount() const;
+
+    bool strict = false;
 
   private:
     void requireNameSpace(const CIMNamespaceName& nameSpace) const;

@@ -279,6 +279,35 @@ TEST_F(Module, UnknownPropertyIsLoggedOnce)
     EXPECT_EQ(std::count(lines.begin(), lines.end(), "setProperty: class TST_Everything has no property Nope"), 1);
 }
 
+// The checks do what OpenPegasus refuses: the log says so once for each kind, and strict providers are refused too.
+TEST_F(Module, ReportsWhatFailsOnOpenPegasus)
+{
+    const std::pair<const char*, const char*> rows[] = {
+        {"arrays of text", "a CMPI_chars element in an array of CMPI_string is refused"},
+        {"elements are checked", "setElementAt without a value is refused"},
+        {"nulls are typed", "a null value of type CMPI_null is refused"},
+        {"other forms of text", "text that is not UTF-8 is sent as it is"},
+    };
+    load();
+    const auto run = [&](const char* check) {
+        String failed;
+        invoke("Run", "Name", CIMValue(String(check))).get(failed);
+        return text(failed);
+    };
+    for (const auto& [check, habit] : rows) {
+        const std::string line = std::string("provider Conformance: works here, fails on OpenPegasus 2.14: ") + habit;
+        for (const bool strict : {false, true, false}) {
+            services.strict = strict;
+            EXPECT_EQ(run(check).empty(), !strict) << check;
+        }
+        const std::vector<std::string> lines = services.logged();
+        EXPECT_EQ(std::count_if(lines.begin(), lines.end(), [&](const auto& at) { return at.rfind(line, 0) == 0; }), 1)
+            << check;
+    }
+    services.strict = true;
+    EXPECT_THAT(errorOf([&] { setMode("no done"); }), HasSubstr("1: a method that ends without returnDone"));
+}
+
 TEST_F(Module, AsksForAClassOnce)
 {
     load();

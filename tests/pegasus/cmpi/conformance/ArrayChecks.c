@@ -121,10 +121,10 @@ static const char* argumentsAreNamed(const Env* env)
     return NULL;
 }
 
-const CheckRow kArrayChecks[] = {{"arrays start null", arraysStartNull},
-                                 {"elements are checked", elementsAreChecked},
-                                 {"arrays of text", arraysOfText},
-                                 {"stored arrays are copies", storedArraysAreCopies},
-                                 {"every array type", everyArrayType},
-                                 {"arguments are named", argumentsAreNamed},
-                                 {NULL, NULL}};
+const CheckRow kArrayChecks[] = {{"arrays start null", arraysStartNull, kOursOnly},
+                                 {"elements are checked", elementsAreChecked, kOursOnly},
+                                 {"arrays of text", arraysOfText, kOursOnly},
+                                 {"stored arrays are copies", storedArraysAreCopies, kOursOnly},
+                                 {"every array type", everyArrayType, kStandard},
+                                 {"arguments are named", argumentsAreNamed, kOursOnly},
+                                 {NULL, NULL, kOursOnly}};

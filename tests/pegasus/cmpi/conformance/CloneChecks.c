@@ -118,9 +118,9 @@ static const char* memoryBelongsToTheFrame(const Env* env)
     return NULL;
 }
 
-const CheckRow kCloneChecks[] = {{"clones are apart", clonesAreApart},
-                                 {"clones end on other threads", clonesEndOnOtherThreads},
-                                 {"releases keep memory flat", releasesKeepMemoryFlat},
-                                 {"arguments may be released", argumentsMayBeReleased},
-                                 {"memory belongs to the frame", memoryBelongsToTheFrame},
-                                 {NULL, NULL}};
+const CheckRow kCloneChecks[] = {{"clones are apart", clonesAreApart, kStandard},
+                                 {"clones end on other threads", clonesEndOnOtherThreads, kOursOnly},
+                                 {"releases keep memory flat", releasesKeepMemoryFlat, kOursOnly},
+                                 {"arguments may be released", argumentsMayBeReleased, kOursOnly},
+                                 {"memory belongs to the frame", memoryBelongsToTheFrame, kOursOnly},
+                                 {NULL, NULL, kOursOnly}};

@@ -16,10 +16,17 @@ typedef struct Env
 /* Returns: the condition that failed, or NULL. */
 typedef const char* (*Check)(const Env* env);
 
+typedef enum Scope
+{
+    kOursOnly, /* OpenPegasus 2.14 answers in another way, or was not asked */
+    kStandard  /* holds on OpenPegasus 2.14 too */
+} Scope;
+
 typedef struct CheckRow
 {
     const char* name;
     Check check;
+    Scope scope;
 } CheckRow;
 
 extern const CheckRow kTableChecks[];

@@ -114,11 +114,11 @@ static const char* filtersAreAccepted(const Env* env)
     return NULL;
 }
 
-const CheckRow kInstanceChecks[] = {{"paths are copied into instances", pathsAreCopied},
-                                    {"paths are completed from properties", pathsAreCompleted},
-                                    {"unknown and mistyped properties", unknownAndMistyped},
-                                    {"declared properties are there", declaredPropertiesAreThere},
-                                    {"unknown classes take everything", unknownClassesTakeEverything},
-                                    {"paths can be replaced", pathsCanBeReplaced},
-                                    {"filters are accepted", filtersAreAccepted},
-                                    {NULL, NULL}};
+const CheckRow kInstanceChecks[] = {{"paths are copied into instances", pathsAreCopied, kOursOnly},
+                                    {"paths are completed from properties", pathsAreCompleted, kStandard},
+                                    {"unknown and mistyped properties", unknownAndMistyped, kOursOnly},
+                                    {"declared properties are there", declaredPropertiesAreThere, kStandard},
+                                    {"unknown classes take everything", unknownClassesTakeEverything, kStandard},
+                                    {"paths can be replaced", pathsCanBeReplaced, kStandard},
+                                    {"filters are accepted", filtersAreAccepted, kOursOnly},
+                                    {NULL, NULL, kOursOnly}};

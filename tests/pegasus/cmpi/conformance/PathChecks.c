@@ -134,10 +134,10 @@ static const char* classesAreRelated(const Env* env)
     return NULL;
 }
 
-const CheckRow kPathChecks[] = {{"paths are always made", pathsAreAlwaysMade},
-                                {"parts of paths can be set", partsCanBeSet},
-                                {"keys are wide", keysAreWide},
-                                {"types of keys", keyTypes},
-                                {"missing keys", missingKeys},
-                                {"classes are related", classesAreRelated},
-                                {NULL, NULL}};
+const CheckRow kPathChecks[] = {{"paths are always made", pathsAreAlwaysMade, kStandard},
+                                {"parts of paths can be set", partsCanBeSet, kOursOnly},
+                                {"keys are wide", keysAreWide, kStandard},
+                                {"types of keys", keyTypes, kStandard},
+                                {"missing keys", missingKeys, kOursOnly},
+                                {"classes are related", classesAreRelated, kOursOnly},
+                                {NULL, NULL, kOursOnly}};

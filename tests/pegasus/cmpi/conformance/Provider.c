@@ -209,22 +209,34 @@ enum
     kTableCount = sizeof kTables / sizeof *kTables
 };
 
-static CMPIStatus listChecks(const CMPIResult* result, CMPIArgs* out)
+/* Adds the names of all checks, or of those that hold everywhere, as an output. */
+static void addNames(CMPIArgs* out, const char* name, int standardOnly)
 {
     CMPICount count = 0;
-    for (int t = 0; t < kTableCount; ++t) {
-        for (const CheckRow* row = kTables[t]; row->name != NULL; ++row) {
-            ++count;
+    for (int fills = 0; fills < 2; ++fills) {
+        CMPIValue names = {.array = fills ? gBroker->eft->newArray(gBroker, count, CMPI_chars, NULL) : NULL};
+        count = 0;
+        for (int t = 0; t < kTableCount; ++t) {
+            for (const CheckRow* row = kTables[t]; row->name != NULL; ++row) {
+                if (standardOnly && row->scope != kStandard) {
+                    continue;
+                }
+                if (fills) {
+                    names.array->ft->setElementAt(names.array, count, (const CMPIValue*)row->name, CMPI_chars);
+                }
+                ++count;
+            }
+        }
+        if (fills) {
+            out->ft->addArg(out, name, &names, CMPI_charsA);
         }
     }
-    CMPIValue names = {.array = gBroker->eft->newArray(gBroker, count, CMPI_chars, NULL)};
-    count = 0;
-    for (int t = 0; t < kTableCount; ++t) {
-        for (const CheckRow* row = kTables[t]; row->name != NULL; ++row) {
-            names.array->ft->setElementAt(names.array, count++, (const CMPIValue*)row->name, CMPI_chars);
-        }
-    }
-    out->ft->addArg(out, "Names", &names, CMPI_charsA);
+}
+
+static CMPIStatus listChecks(const CMPIResult* result, CMPIArgs* out)
+{
+    addNames(out, "Names", 0);
+    addNames(out, "Standard", 1);
     const CMPIValue zero = {.uint32 = 0};
     return result->ft->returnData(result, &zero, CMPI_uint32);
 }

@@ -111,8 +111,11 @@ static const char* messagesTakeArguments(const Env* env)
     return NULL;
 }
 
-const CheckRow kStringChecks[] = {
-    {"strings keep their text", stringsKeepTheirText},     {"null text is refused", nullTextIsRefused},
-    {"bad handles are refused", badHandlesAreRefused},     {"datetimes round trip", datetimesRoundTrip},
-    {"bad datetimes are refused", badDatetimesAreRefused}, {"a new datetime is now", newDatetimeIsNow},
-    {"messages take arguments", messagesTakeArguments},    {NULL, NULL}};
+const CheckRow kStringChecks[] = {{"strings keep their text", stringsKeepTheirText, kStandard},
+                                  {"null text is refused", nullTextIsRefused, kStandard},
+                                  {"bad handles are refused", badHandlesAreRefused, kOursOnly},
+                                  {"datetimes round trip", datetimesRoundTrip, kStandard},
+                                  {"bad datetimes are refused", badDatetimesAreRefused, kOursOnly},
+                                  {"a new datetime is now", newDatetimeIsNow, kStandard},
+                                  {"messages take arguments", messagesTakeArguments, kStandard},
+                                  {NULL, NULL, kOursOnly}};

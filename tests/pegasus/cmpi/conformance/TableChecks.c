@@ -104,8 +104,8 @@ static const char* unsupportedSlotsAnswer(const Env* env)
     return NULL;
 }
 
-const CheckRow kTableChecks[] = {{"broker tables have no hole", brokerTables},
-                                 {"object tables have no hole", objectTables},
-                                 {"kinds of objects are named", kindsAreNamed},
-                                 {"unsupported slots answer", unsupportedSlotsAnswer},
-                                 {NULL, NULL}};
+const CheckRow kTableChecks[] = {{"broker tables have no hole", brokerTables, kOursOnly},
+                                 {"object tables have no hole", objectTables, kOursOnly},
+                                 {"kinds of objects are named", kindsAreNamed, kOursOnly},
+                                 {"unsupported slots answer", unsupportedSlotsAnswer, kOursOnly},
+                                 {NULL, NULL, kOursOnly}};

@@ -176,8 +176,8 @@ static const char* ownThreadsMayCall(const Env* env)
     return NULL;
 }
 
-const CheckRow kThreadChecks[] = {{"threads share a mutex", threadsShareAMutex},
-                                  {"conditions wake", conditionsWake},
-                                  {"keys and once", keysAndOnce},
-                                  {"a provider's own threads may call", ownThreadsMayCall},
-                                  {NULL, NULL}};
+const CheckRow kThreadChecks[] = {{"threads share a mutex", threadsShareAMutex, kOursOnly},
+                                  {"conditions wake", conditionsWake, kOursOnly},
+                                  {"keys and once", keysAndOnce, kOursOnly},
+                                  {"a provider's own threads may call", ownThreadsMayCall, kOursOnly},
+                                  {NULL, NULL, kOursOnly}};

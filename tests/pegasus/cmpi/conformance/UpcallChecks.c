@@ -8,7 +8,7 @@ static const char* contextHasItsEntries(const Env* env)
     const CMPIContextFT* ft = env->ctx->ft;
     CMPIStatus rc = kGarbage;
     REQUIRE(ft->getEntry(env->ctx, CMPIInvocationFlags, &rc).type == CMPI_uint32 && rc.rc == CMPI_RC_OK);
-    REQUIRE(strcmp(textOf(ft->getEntry(env->ctx, CMPIPrincipal, NULL).value.string), "tester") == 0);
+    REQUIRE(ft->getEntry(env->ctx, CMPIPrincipal, NULL).type == CMPI_string);
     REQUIRE(strcmp(textOf(ft->getEntry(env->ctx, CMPIInitNameSpace, NULL).value.string), NS) == 0);
     REQUIRE(ft->getEntry(env->ctx, CMPIAcceptLanguage, NULL).type == CMPI_string);
     REQUIRE(ft->getEntry(env->ctx, "Nope", &rc).state == (CMPI_nullValue | CMPI_notFound));
@@ -108,9 +108,10 @@ static const char* upcallsNest(const Env* env)
     return NULL;
 }
 
-const CheckRow kContextChecks[] = {{"the context has its entries", contextHasItsEntries}, {NULL, NULL}};
-const CheckRow kUpcallChecks[] = {{"enumerations are snapshots", enumerationsAreSnapshots},
-                                  {"names lead to instances", namesLeadToInstances},
-                                  {"failures come as codes", failuresComeAsCodes},
-                                  {"upcalls nest", upcallsNest},
-                                  {NULL, NULL}};
+const CheckRow kContextChecks[] = {{"the context has its entries", contextHasItsEntries, kStandard},
+                                   {NULL, NULL, kOursOnly}};
+const CheckRow kUpcallChecks[] = {{"enumerations are snapshots", enumerationsAreSnapshots, kOursOnly},
+                                  {"names lead to instances", namesLeadToInstances, kOursOnly},
+                                  {"failures come as codes", failuresComeAsCodes, kOursOnly},
+                                  {"upcalls nest", upcallsNest, kOursOnly},
+                                  {NULL, NULL, kOursOnly}};

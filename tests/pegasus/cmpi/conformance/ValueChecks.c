@@ -144,7 +144,9 @@ static const char* objectsComeBack(const Env* env)
     return NULL;
 }
 
-const CheckRow kValueChecks[] = {
-    {"scalars come back", scalarsComeBack},    {"text is the pointer itself", textIsThePointerItself},
-    {"other forms of text", otherFormsOfText}, {"nulls are typed", nullsAreTyped},
-    {"objects come back", objectsComeBack},    {NULL, NULL}};
+const CheckRow kValueChecks[] = {{"scalars come back", scalarsComeBack, kStandard},
+                                 {"text is the pointer itself", textIsThePointerItself, kStandard},
+                                 {"other forms of text", otherFormsOfText, kOursOnly},
+                                 {"nulls are typed", nullsAreTyped, kOursOnly},
+                                 {"objects come back", objectsComeBack, kStandard},
+                                 {NULL, NULL, kOursOnly}};
