@@ -308,27 +308,28 @@ TEST_F(ThreadedRegistrationTest, OnlyTheExactSettingStartsThreadsOnWhichVisitors
         std::mutex mutex;
         std::condition_variable arrival;
         int foreignThreads = 0;
-        fRig.fWorld.fRun = [&, self = std::this_thread::get_id()](const TSpawnCall&, std::string&) {
+        // Waits until as many threads are here; so they run at the same time, and a race of theirs shows.
+        const auto meet = [&, self = std::this_thread::get_id()](int count) {
             std::unique_lock<std::mutex> lock(mutex);
             foreignThreads += std::this_thread::get_id() != self;
             arrival.notify_all();
-            const auto allAreHere = [&] { return foreignThreads == 4; };
+            const auto allAreHere = [&] { return foreignThreads == count; };
             EXPECT_TRUE(!row.fThreaded || arrival.wait_for(lock, kDeadline, allAreHere)) << "not at the same time";
         };
+        fRig.fWorld.fRun = [&](const TSpawnCall&, std::string&) { meet(4); };
         ns->FindProviders();
         EXPECT_EQ(row.fThreaded ? 4 : 0, foreignThreads);
         EXPECT_EQ(4U, fRig.fLog.LinesWith("3|Entering TPEGASUSNamespace::regProvider: ").size());
-        int visitsElsewhere = 0;
         std::vector<boost::shared_ptr<IProvider>> collected;
         ns->EnumerateProviders(
-            [&, self = std::this_thread::get_id()](const boost::shared_ptr<IProvider>& provider) {
+            [&](const boost::shared_ptr<IProvider>& provider) {
+                meet(8);
                 const std::lock_guard<std::mutex> lock(mutex);
-                visitsElsewhere += std::this_thread::get_id() != self;
                 collected.push_back(provider);
                 return collected.size() != 2;
             },
             {});
-        EXPECT_EQ(row.fThreaded ? 4 : 0, visitsElsewhere);
+        EXPECT_EQ(row.fThreaded ? 8 : 0, foreignThreads);
         // The classes and instances of what was collected are asked for on this one thread.
         std::vector<std::string> served;
         for (const auto& provider : collected) {
