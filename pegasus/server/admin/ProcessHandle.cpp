@@ -9,6 +9,15 @@
 
 namespace Pegasus::server {
 
+namespace {
+
+std::string programOf(pid_t pid)
+{
+    return "/proc/" + std::to_string(pid) + "/exe";
+}
+
+} // namespace
+
 ProcessHandle::ProcessHandle(pid_t pid) : fPid(pid)
 {
     if (pid > 0) {
@@ -20,11 +29,16 @@ bool ProcessHandle::runsThisProgram() const
 {
     struct stat theirs = {};
     struct stat ours = {};
-    const std::string program = "/proc/" + std::to_string(fPid) + "/exe";
     // The process is asked for after its program, so that the number was still its own then.
-    return fHandle && ::stat(program.c_str(), &theirs) == 0 && ::stat("/proc/self/exe", &ours) == 0 &&
+    return fHandle && ::stat(programOf(fPid).c_str(), &theirs) == 0 && ::stat("/proc/self/exe", &ours) == 0 &&
            theirs.st_dev == ours.st_dev && theirs.st_ino == ours.st_ino &&
            !waitForEnd(std::chrono::milliseconds::zero());
+}
+
+bool ProcessHandle::hasProgram() const
+{
+    struct stat info = {};
+    return ::stat(programOf(fPid).c_str(), &info) == 0;
 }
 
 bool ProcessHandle::waitForEnd(std::chrono::milliseconds timeout) const

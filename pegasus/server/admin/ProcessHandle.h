@@ -19,6 +19,8 @@ class ProcessHandle
 
     // Returns: whether the process runs this program's file.
     bool runsThisProgram() const;
+    // Returns: false for a process that is being taken down, and for one whose program this user may not see.
+    bool hasProgram() const;
     // Returns: false if it still runs at the time-out.
     bool waitForEnd(std::chrono::milliseconds timeout) const;
     // Sends SIGTERM, and SIGKILL when the process still runs after `grace`.

@@ -42,6 +42,16 @@ pid_t endLeftOverServer(const std::string& home)
     return pid;
 }
 
+// A killed server holds its lock until the kernel has taken down its last thread; its program is gone before that.
+// Returns: whether the tree may be free now.
+bool waitForDyingHolder(const std::string& home)
+{
+    const base::TreeLockStatus status = base::readTreeLock(home);
+    const ProcessHandle process(status.record.pid);
+    return status.state != base::TreeLockState::kHeld ||
+           (!process.hasProgram() && process.waitForEnd(kOrderlyEndTimeout));
+}
+
 void require(const std::string& path)
 {
     const std::string fault = base::ownershipFault(path);
@@ -92,6 +102,9 @@ TreeClaim::~TreeClaim()
 void TreeClaim::lock(const std::string& home)
 {
     for (int i = 0; !fLock.acquire(home); ++i) {
+        if (i < kMaxReplacements && waitForDyingHolder(home)) {
+            continue;
+        }
         const pid_t ended = i < kMaxReplacements ? endLeftOverServer(home) : 0;
         if (ended == 0) {
             throw StartError("Unable to start CIMServer. CIMServer is already running.");
