@@ -102,14 +102,14 @@ TreeClaim::~TreeClaim()
 void TreeClaim::lock(const std::string& home)
 {
     for (int i = 0; !fLock.acquire(home); ++i) {
-        if (i < kMaxReplacements && waitForDyingHolder(home)) {
+        const bool mayTry = i < kMaxReplacements;
+        if (mayTry && waitForDyingHolder(home)) {
             continue;
         }
-        const pid_t ended = i < kMaxReplacements ? endLeftOverServer(home) : 0;
-        if (ended == 0) {
+        fReplaced = mayTry ? endLeftOverServer(home) : 0;
+        if (fReplaced == 0) {
             throw StartError("Unable to start CIMServer. CIMServer is already running.");
         }
-        fReplaced = ended;
     }
 }
 

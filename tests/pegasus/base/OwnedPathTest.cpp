@@ -1,10 +1,11 @@
 // Whose files may run: fixtures with modes and owners, and what is said about them.
 #include "pegasus/base/OwnedPath.h"
 
+#include "tests/support/TemporaryDirectory.h"
+
 #include <gtest/gtest.h>
 
 #include <filesystem>
-#include <fstream>
 
 #include <sys/stat.h>
 #include <unistd.h>
@@ -19,16 +20,10 @@ constexpr unsigned kOther = 65534; // "nobody"
 class OwnedPathTest : public testing::Test
 {
   protected:
-    OwnedPathTest()
-    {
-        std::string path = (fs::temp_directory_path() / "owned-path-XXXXXX").string();
-        fRoot = ::mkdtemp(path.data());
-        fs::create_directories(fRoot + "/above/folder");
-        std::ofstream(fRoot + "/above/folder/file") << "x";
-    }
-    ~OwnedPathTest() override { fs::remove_all(fRoot); }
+    OwnedPathTest() { fDirectory.write("above/folder/file", "x"); }
 
-    std::string fRoot;
+    const test::TemporaryDirectory fDirectory;
+    const std::string fRoot = fDirectory.path();
 };
 
 struct Row

@@ -1,6 +1,6 @@
 #include "pegasus/repository/Repository.h"
-#include "tests/pegasus/mof/TemporaryDirectory.h"
 #include "tests/support/PrivateServer.h"
+#include "tests/support/TemporaryDirectory.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -13,9 +13,9 @@
 #include <sys/inotify.h>
 #include <unistd.h>
 
-using mof_test::TemporaryDirectory;
 using test::PrivateServer;
 using test::ProgramResult;
+using test::TemporaryDirectory;
 
 namespace {
 

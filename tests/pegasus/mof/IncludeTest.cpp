@@ -1,7 +1,7 @@
 #include "pegasus/mof/Compiler.h"
 #include "pegasus/mof/MemoryHandler.h"
 #include "tests/pegasus/mof/Describe.h"
-#include "tests/pegasus/mof/TemporaryDirectory.h"
+#include "tests/support/TemporaryDirectory.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -9,7 +9,7 @@
 #include <sys/stat.h>
 
 using namespace Pegasus::mof;
-using mof_test::TemporaryDirectory;
+using test::TemporaryDirectory;
 
 namespace {
 

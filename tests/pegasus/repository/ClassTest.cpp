@@ -1,6 +1,6 @@
 #include "tests/pegasus/mof/Describe.h"
-#include "tests/pegasus/mof/TemporaryDirectory.h"
 #include "tests/pegasus/repository/RepositoryHandler.h"
+#include "tests/support/TemporaryDirectory.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -47,7 +47,7 @@ class ClassTest : public testing::Test
         return describe(repository.getClass(kNamespace, CIMName(name), options));
     }
 
-    mof_test::TemporaryDirectory directory;
+    test::TemporaryDirectory directory;
     Repository repository{directory.path() + "/a/b"};
 };
 
@@ -257,7 +257,7 @@ TEST_F(ClassTest, KeepsNamespacesApart)
 
 TEST(LimitsOfARepository, AreNamedWhereTheyAreExceeded)
 {
-    const mof_test::TemporaryDirectory directory;
+    const test::TemporaryDirectory directory;
     RepositoryLimits tight;
     tight.objectBytes = 2000;
     tight.inheritanceDepth = 3;

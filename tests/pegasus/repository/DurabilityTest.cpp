@@ -1,6 +1,6 @@
 #include "tests/pegasus/mof/Describe.h"
-#include "tests/pegasus/mof/TemporaryDirectory.h"
 #include "tests/pegasus/repository/RepositoryHandler.h"
+#include "tests/support/TemporaryDirectory.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -15,9 +15,9 @@
 using namespace Pegasus;
 using namespace Pegasus::repository;
 using mof_test::describe;
-using mof_test::TemporaryDirectory;
 using mof_test::utf8;
 using repository_test::compileText;
+using test::TemporaryDirectory;
 
 namespace {
 

@@ -1,6 +1,6 @@
 #include "tests/pegasus/mof/Describe.h"
-#include "tests/pegasus/mof/TemporaryDirectory.h"
 #include "tests/pegasus/repository/RepositoryHandler.h"
+#include "tests/support/TemporaryDirectory.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -42,7 +42,7 @@ class InstanceTest : public testing::Test
         return text;
     }
 
-    mof_test::TemporaryDirectory directory;
+    test::TemporaryDirectory directory;
     Repository repository{directory.path()};
 };
 

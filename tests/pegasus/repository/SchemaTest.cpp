@@ -1,7 +1,7 @@
 #include "pegasus/mof/MemoryHandler.h"
 #include "tests/pegasus/mof/Describe.h"
-#include "tests/pegasus/mof/TemporaryDirectory.h"
 #include "tests/pegasus/repository/RepositoryHandler.h"
+#include "tests/support/TemporaryDirectory.h"
 #include "tools/mofcompare/ClassComparison.h"
 
 #include <gmock/gmock.h>
@@ -13,9 +13,9 @@
 
 using namespace Pegasus;
 using namespace Pegasus::repository;
-using mof_test::TemporaryDirectory;
 using mof_test::utf8;
 using repository_test::compileFile;
+using test::TemporaryDirectory;
 
 namespace {
 

@@ -6,7 +6,7 @@
 #include <stdexcept>
 #include <string>
 
-namespace mof_test {
+namespace test {
 
 // A directory for one test, removed with its content.
 class TemporaryDirectory
@@ -14,7 +14,7 @@ class TemporaryDirectory
   public:
     TemporaryDirectory()
     {
-        std::string pattern = (std::filesystem::temp_directory_path() / "vrx-mof-XXXXXX").string();
+        std::string pattern = (std::filesystem::temp_directory_path() / "vrx-test-XXXXXX").string();
         if (!::mkdtemp(pattern.data())) {
             throw std::runtime_error("mkdtemp " + pattern);
         }
@@ -43,4 +43,4 @@ class TemporaryDirectory
     std::string fPath;
 };
 
-} // namespace mof_test
+} // namespace test
