@@ -1,5 +1,4 @@
 // What a registration must be, and what is found by it.
-#include "pegasus/repository/Repository.h"
 #include "pegasus/server/operations/ProviderRegistry.h"
 #include "pegasus/server/operations/RegistrationChecks.h"
 #include "tests/support/TemporaryDirectory.h"
