@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The private server as its users meet it: whole programs, an agent and the client library over the loopback interface.
 // bareExpat is the reference loop: a bare expat pass over the same bytes in the same run.
 #include "tests/pegasus/server/HttpExchange.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The client library against a peer in this process that serves a prepared answer from memory.
 //
 //   client_bench [--quick | --calls]

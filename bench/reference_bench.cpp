@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The reference loop of every comparison: a bare expat pass with empty handlers over a fixed text of about 8 MB. Prints
 // the processor time of the best of nine passes, in seconds.
 #include <expat.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The time to compile a schema, and the rate at which its classes are read back.
 //   schema_bench TOP.mof [ROUNDS]
 // Prints one line a measure: the median of the rounds, the minimum and the maximum. Each round starts a server in a

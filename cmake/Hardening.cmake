@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT
 # Flags that make a fault of the programs hard to exploit, for the targets of the current folder and of those that are
 # added after this. tools/check hardening looks for them in the compile commands and in the files of a staged tree.
 # The release preset switches them on. The builds with sanitizers keep to the sanitizers' own checks.

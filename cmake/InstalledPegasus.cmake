@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT
 # pegasus::client from an installed OpenPegasus under PEGASUS_ROOT: the same target that the embedded stack defines.
 find_path(PEGASUS_INCLUDE_DIR Pegasus/Client/CIMClient.h
   HINTS ${PEGASUS_ROOT}/include ${PEGASUS_ROOT}/src ${PEGASUS_ROOT} NO_DEFAULT_PATH REQUIRED)

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT
 # vrx_layer(<target> <folder> [PRIVATE]): <target>, and what links it unless PRIVATE, may include the folder's headers as
 # "<folder>/X.h".
 # Each folder gets an include root of its own under the build folder: a link to the folder, and links to the .clang-tidy

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT
 # The mark of a deployed tree.
 set(VRX_TREE_SERVER embedded)
 if(PEGASUS_ROOT)

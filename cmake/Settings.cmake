@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT
 # Compiler settings that all targets share, and the folders of the staged tree.
 include(GNUInstallDirs)
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "display/PlainText.h"
 
 #include <algorithm>

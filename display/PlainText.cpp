@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "display/PlainText.h"
 
 namespace NKOLVRX20 {

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The human-readable text of a value whose declaration lacks one.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A property's value as human-readable text, made from the qualifiers of the property's declaration (DSP0004, 5.6.3).
 #pragma once
 

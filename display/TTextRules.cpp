@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "display/TTextRules.h"
 
 #include "display/PlainText.h"

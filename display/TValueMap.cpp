@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "display/TValueMap.h"
 
 #include <algorithm>

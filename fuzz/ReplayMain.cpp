@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Replaces the fuzzing engine in builds that lack it: feeds each file that the command line names, or that lies in a
 // named folder, to the target once. ctest replays the seeds and old crashes with it.
 #include <cstdint>

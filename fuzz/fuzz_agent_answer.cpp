@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // An agent's answer, as the server reads it: an agent that runs a broken vendor's library may send anything. The
 // elements reach the sink in the order in which they came, and a failure is one of the named ones.
 #include "pegasus/server/agent/AgentChannel.h"

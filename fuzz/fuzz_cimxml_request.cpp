@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // CIM messages in requests: the first two lines are the CIMMethod and CIMObject headers, the rest is the body. A
 // decoded request's parameters are read in every form.
 #include "pegasus/server/net/RequestDecoder.h"

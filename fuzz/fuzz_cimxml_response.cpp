@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The CIM-XML of an answer, cut at a place that the input chooses: the objects are the same however it arrives, and
 // what was decoded can be encoded and decoded again.
 #include "pegasus/client/ResponseReader.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A vendor's class list: entries come out in order, oddities cost lines of severity 0 that name a line of the file, and
 // an entry's parts are parts of its text.
 #include "src/namespace/TPEGASUSNamespace.h"

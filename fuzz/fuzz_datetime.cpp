@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // CIMDateTime's text form: whatever is accepted prints as text that means the same.
 #include <Pegasus/Common/CIMDateTime.h>
 #include <Pegasus/Common/Exception.h>

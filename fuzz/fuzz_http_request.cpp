@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Requests as a client might send them, in two pieces: the parser takes the same from both, or refuses both alike, and
 // the bytes that it leaves unparsed stay within a limit.
 #include "pegasus/server/net/HttpRequestReader.h"

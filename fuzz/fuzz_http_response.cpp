@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A whole HTTP answer, cut at a place that the input chooses: it is read the same way however it arrives.
 #include "pegasus/wire/HttpAnswerReader.h"
 

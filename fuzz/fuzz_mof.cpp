@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The MOF compiler: any text yields definitions, or an error whose place is within the text. A second run must yield
 // the same.
 #include "pegasus/mof/Compiler.h"

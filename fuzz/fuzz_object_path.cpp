@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // CIMObjectPath's text form: whatever is accepted prints as text that is the same path, with the same hash.
 #include <Pegasus/Common/CIMObjectPath.h>
 #include <Pegasus/Common/Exception.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The repository's round trip. An input is an element of any name whose children are QUALIFIER.DECLARATION, CLASS and
 // INSTANCE elements; each is stored if the repository takes it. What is read at once, from memory, equals what is read
 // after the repository was closed and opened, from the file; an instance has the values that it was given.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Whole requests through the server's reader, decoder, dispatcher and repository. An input is a sequence of requests,
 // separated by lines of "====". The first two lines of each are the CIMMethod and CIMObject headers. The rest is a
 // whole message if it begins with "<", else the parameters, one IPARAMVALUE each, after a line of their own that is

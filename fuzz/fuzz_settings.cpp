@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The host's settings file: it is read as a whole or refused as a whole, and every value that it sets can be set again.
 #include <host/TConfig.h>
 #include <host/TVRXException.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The files of a server's tree: the first byte of an input selects configuration, lock or start file. What was read is
 // written and read again unchanged; a start file that names another process stays.
 #include "pegasus/base/TreeLockFile.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "bench/soak/Inventory.h"
 
 #include "host/cli/model/ErrorReport.h"

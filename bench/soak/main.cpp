@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // One long-lived host that opens, uses and clears the namespace of a staged tree again and again while processes of the
 // tree are killed and stopped. Prints a table of counts; the exit status is 0 when every answer was right and nothing
 // leaked. tools/soak stages the tree and runs it.

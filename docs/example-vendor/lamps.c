@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* The smallest useful provider: two lamps. Links nothing; the broker hands over every function that it calls. */
 #include <cmpi/cmpi.h>
 

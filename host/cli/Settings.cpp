@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/cli/Settings.h"
 
 #include "host/cli/Options.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/cli/TOwnerCheck.h"
 
 #include "host/cli/TDeployedTree.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/cli/TPrivateRoot.h"
 
 #include "host/cli/TOwnerCheck.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/cli/TRun.h"
 
 #include "host/cli/collect/TCollector.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/cli/TSession.h"
 
 #include "host/cli/model/ErrorReport.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/cli/TStopSignals.h"
 
 #include "host/cli/Options.h"

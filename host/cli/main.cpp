@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // vrxhost: a command-line host for a namespace-provider plug-in.
 #include "host/cli/Options.h"
 #include "host/cli/Settings.h"

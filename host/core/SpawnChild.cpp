@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/core/SpawnChild.h"
 
 #include <cerrno>

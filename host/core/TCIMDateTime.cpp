@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include <host/TCIMDateTime.h>
 #include <host/TVRXException.h>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include <host/ICIMInstance.h>
 #include <host/ICIMNamespace.h>
 #include <host/TCIMReference.h>

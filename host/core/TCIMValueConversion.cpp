@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // TCIMValue's conversion operators.
 #include "host/core/TCIMValueRep.h"
 

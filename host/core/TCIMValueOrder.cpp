@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // TCIMValue's equality and order, from one comparison, so that they always agree.
 #include "host/core/TCIMValueRep.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The text forms of TCIMValue and TCIMChar16. Both directions ignore the locale.
 #include "host/core/TCIMValueRep.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include <host/TConfig.h>
 #include <host/TVRXException.h>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #define SPDLOG_PREVENT_CHILD_FD // makes spdlog open the file close-on-exec
 #include "host/core/TCoreLogger.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/core/TNamespaceProviderManager.h"
 
 #include <host/INamespaceProvider.h>

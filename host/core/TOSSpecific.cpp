@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/core/TChildProcess.h"
 #include "host/core/TProcessControl.h"
 #include "host/core/TProcessLog.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/core/TProcessControl.h"
 
 #include <sys/eventfd.h>

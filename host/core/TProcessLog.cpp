@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/core/TProcessLog.h"
 
 #include <host/TRootObject.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/core/TCoreLogger.h"
 #include "host/core/TNamespaceProviderManager.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include <host/TVRXException.h>
 
 namespace NKOLVRX20 {

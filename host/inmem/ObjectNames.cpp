@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/inmem/ObjectNames.h"
 
 #include "display/PlainText.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The names of objects in memory, as keys of maps and as text.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/inmem/TInmemProperty.h"
 
 #include "display/PropertyText.h"

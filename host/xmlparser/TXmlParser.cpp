@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/xmlparser/TXmlParserState.h"
 
 namespace NKOLVRX20 {

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The contract between a system-inventory host and its namespace-provider plug-ins: the rules that hold for every
 // header of this folder, and the names that the headers share.
 //

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The symbols by which a host finds a namespace-provider plug-in's entry points after dlopen with RTLD_NOW |
 // RTLD_LOCAL. Both functions take nothing and return nothing: void (*)().
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/LocalSocket.h"
 
 #include <algorithm>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/SocketDiag.h"
 
 #include <algorithm>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/TreeLockFile.h"
 
 #include <cerrno>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include <Pegasus/Client/CIMClientException.h>
 
 #include <string>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/client/CIMClientRep.h"
 
 #include "pegasus/base/AsciiCase.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/client/Request.h"
 
 #include "pegasus/base/PercentCoding.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/client/ResponseReader.h"
 
 #include "pegasus/base/AsciiCase.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/client/ServerConnection.h"
 
 #include "pegasus/base/LocalSocket.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/client/TreeRoute.h"
 
 #include "pegasus/base/TcpOwner.h"

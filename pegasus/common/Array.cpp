@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The code of every element type that the public interface has.
 #include "pegasus/common/ArrayImpl.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/common/CivilTime.h"
 #include "pegasus/common/RepPointerImpl.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Flavors and scopes: two sets of flags that are written as words.
 #include <Pegasus/Common/CIMFlavor.h>
 #include <Pegasus/Common/CIMScope.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/common/ObjectReps.h"
 
 namespace Pegasus {

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/NumberText.h"
 #include "pegasus/base/Text.h"
 #include "pegasus/common/RepPointerImpl.h"

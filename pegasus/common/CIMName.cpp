@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/common/NameAccess.h"
 #include "pegasus/common/StringRep.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/common/RepPointerImpl.h"
 
 #include <Pegasus/Common/CIMParamValue.h>

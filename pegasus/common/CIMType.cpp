@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include <Pegasus/Common/CIMStatusCode.h>
 #include <Pegasus/Common/CIMType.h>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/common/ArrayImpl.h"
 
 #include <Pegasus/Common/CIMInstance.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/common/ObjectPathParser.h"
 
 #include "pegasus/base/AsciiCase.h"

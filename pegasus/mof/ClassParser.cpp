@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/ClassParser.h"
 
 #include "pegasus/base/Text.h"

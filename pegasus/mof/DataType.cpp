@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/DataType.h"
 
 #include <charconv>

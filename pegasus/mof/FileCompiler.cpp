@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/FileCompiler.h"
 
 #include "pegasus/base/Text.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/Includes.h"
 
 #include <algorithm>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/InstanceParser.h"
 
 #include "pegasus/base/Text.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/InstanceQueue.h"
 
 #include <Pegasus/Common/Exception.h>

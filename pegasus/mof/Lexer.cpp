@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/Lexer.h"
 
 #include "pegasus/base/AsciiCase.h"

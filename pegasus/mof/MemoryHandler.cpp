@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/MemoryHandler.h"
 
 #include "pegasus/base/AsciiCase.h"

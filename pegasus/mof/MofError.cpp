@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/MofError.h"
 
 #include "pegasus/mof/ShownText.h"

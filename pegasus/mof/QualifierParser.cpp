@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/QualifierParser.h"
 
 #include "pegasus/base/Text.h"

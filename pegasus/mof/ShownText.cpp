@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/ShownText.h"
 
 #include "pegasus/base/Utf8.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/SkippedDefinitions.h"
 
 #include <algorithm>

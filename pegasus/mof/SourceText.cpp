@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/SourceText.h"
 
 #include "pegasus/base/Descriptor.h"

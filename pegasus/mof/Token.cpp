@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/Token.h"
 
 #include "pegasus/base/AsciiCase.h"

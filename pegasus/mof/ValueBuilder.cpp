@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/ValueBuilder.h"
 
 #include "pegasus/base/Text.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/programs/CimmofHandler.h"
 
 #include "pegasus/base/Text.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/programs/CimmofOptions.h"
 
 namespace Pegasus::cimmof {

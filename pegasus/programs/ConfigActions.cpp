@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/Text.h"
 #include "pegasus/programs/ConfigCommand.h"
 #include "pegasus/server/admin/Config.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/programs/ConfigCommand.h"
 
 #include <optional>

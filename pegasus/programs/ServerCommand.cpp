@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/programs/ServerCommand.h"
 
 namespace Pegasus::programs {

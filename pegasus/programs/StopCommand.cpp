@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/Text.h"
 #include "pegasus/base/TreeLockFile.h"
 #include "pegasus/programs/ServerCommand.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Shows and changes the private server's configuration.
 #include "pegasus/base/Text.h"
 #include "pegasus/programs/ConfigCommand.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/Text.h"
 #include "pegasus/mof/Compiler.h"
 #include "pegasus/mof/MemoryHandler.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The private CIM server: starts, stops and asks after it. As "cimprovagt --agent" it is a provider agent.
 #include "pegasus/base/Text.h"
 #include "pegasus/programs/ServerCommand.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
 #include "pegasus/repository/ClassRules.h"

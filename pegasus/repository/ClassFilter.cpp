@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/repository/ClassRules.h"
 
 namespace Pegasus::repository {

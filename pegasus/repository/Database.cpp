@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/repository/Database.h"
 
 #include <Pegasus/Common/Exception.h>

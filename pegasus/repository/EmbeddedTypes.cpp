@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/common/EmbeddedKind.h"
 #include "pegasus/common/ObjectReps.h"
 #include "pegasus/repository/ClassRules.h"

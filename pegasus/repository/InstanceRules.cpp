@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/repository/InstanceRules.h"
 
 #include "pegasus/base/Text.h"

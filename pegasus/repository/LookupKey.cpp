@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/repository/LookupKey.h"
 
 #include "pegasus/base/Text.h"

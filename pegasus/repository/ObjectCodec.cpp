@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/repository/ObjectCodec.h"
 
 #include "pegasus/base/Text.h"

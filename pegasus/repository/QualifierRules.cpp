@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/repository/QualifierRules.h"
 
 #include "pegasus/base/Text.h"

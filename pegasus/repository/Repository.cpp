@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/repository/Repository.h"
 
 #include "pegasus/base/Text.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/repository/Storage.h"
 
 namespace Pegasus::repository {

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/Server.h"
 
 #include "pegasus/base/LocalSocket.h"

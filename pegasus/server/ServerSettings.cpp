@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/ServerSettings.h"
 
 namespace Pegasus::server {

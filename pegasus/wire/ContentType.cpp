@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/wire/ContentType.h"
 
 #include "pegasus/base/AsciiCase.h"

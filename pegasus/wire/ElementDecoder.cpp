@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/wire/ElementDecoder.h"
 
 #include "pegasus/base/AsciiCase.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/wire/ElementEncoder.h"
 
 #include "pegasus/wire/ElementAttributes.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/Text.h"
 #include "pegasus/wire/ElementAttributes.h"
 #include "pegasus/wire/ElementEncoder.h"

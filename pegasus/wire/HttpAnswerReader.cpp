@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/wire/HttpAnswerReader.h"
 
 #include "pegasus/base/AsciiCase.h"

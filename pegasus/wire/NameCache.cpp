@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/wire/NameCache.h"
 
 #include "pegasus/base/Text.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The one member of the CIM objects that writes XML. It is above them, with the encoder, and part of libpegcommon
 // alone.
 #include "pegasus/base/Text.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/wire/RequestEnvelope.h"
 
 #include "pegasus/wire/ElementEncoder.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/wire/XmlDocument.h"
 
 #include "pegasus/wire/XmlScanner.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/wire/XmlError.h"
 
 #include "pegasus/base/Text.h"

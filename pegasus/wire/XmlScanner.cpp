@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/wire/XmlScanner.h"
 
 #include <algorithm>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/wire/XmlSlicer.h"
 
 #include "pegasus/wire/XmlText.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/wire/XmlText.h"
 
 #include "pegasus/base/AsciiCase.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "providers/linux/Classes.h"
 
 #include <array>

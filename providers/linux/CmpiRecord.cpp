@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "providers/linux/CmpiRecord.h"
 
 #include <type_traits>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "providers/linux/Parse.h"
 
 #include <charconv>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "providers/linux/SystemTree.h"
 
 #include "providers/linux/Parse.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/common/ClientConnection.h"
 
 #include "src/common/CoreLog.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Texts that several concerns of the plug-in share.
 #pragma once
 

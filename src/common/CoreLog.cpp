@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/common/CoreLog.h"
 
 #include <Pegasus/Common/Exception.h>

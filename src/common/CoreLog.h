@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Entries of the host's core log, put together with a string stream in the "C" locale.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The two directories that everything hangs off. They may differ and are kept apart.
 #pragma once
 

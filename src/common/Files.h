@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // What the plug-in asks the file system; failures are return values.
 #pragma once
 

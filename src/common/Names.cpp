@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/common/Names.h"
 
 #include "src/common/CoreLog.h"

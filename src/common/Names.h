@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // CIM names, and the keys under which the plug-in keeps what is named.
 #pragma once
 

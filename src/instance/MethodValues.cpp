@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/instance/MethodValues.h"
 
 #include "src/common/CoreLog.h"

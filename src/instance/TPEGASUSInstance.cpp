@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/instance/TPEGASUSInstance.h"
 
 #include "src/common/ClientConnection.h"

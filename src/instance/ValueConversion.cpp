@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/instance/ValueConversion.h"
 
 #include "src/common/CoreLog.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Values between the CIM client library and the host: the only place where the two meet.
 //
 // Failures leave these functions as exceptions, unlogged, with the output as it was: Pegasus::TypeMismatchException

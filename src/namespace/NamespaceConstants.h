@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Texts and numbers that several concerns of the namespace share.
 #pragma once
 

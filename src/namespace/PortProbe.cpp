@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/namespace/PortProbe.h"
 
 #include "src/common/CoreLog.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/namespace/ProviderThreads.h"
 
 #include "src/common/CoreLog.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/namespace/Removal.h"
 
 #include <algorithm>

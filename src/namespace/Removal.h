@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Removing files through a shell, and which names may stand in such a command. The commands end in "-rf" and hold the
 // names to the letter: a blank or a star could delete something else.
 #pragma once

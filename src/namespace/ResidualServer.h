@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // How a server that an earlier run left running is found: its start file names a process, and the process listing shows
 // whether that process still is a server.
 #pragma once

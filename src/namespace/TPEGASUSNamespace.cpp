@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/namespace/TPEGASUSNamespace.h"
 
 #include "src/common/CoreLog.h"

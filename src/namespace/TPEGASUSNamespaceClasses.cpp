@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The classes of this namespace: served from the cache, fetched from the server on first use.
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Which providers are installed: one for each requested-class file in a vendor's directory.
 #include "src/common/CoreLog.h"
 #include "src/common/Directories.h"

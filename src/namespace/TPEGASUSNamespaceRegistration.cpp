@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Compiling MOF files, making the providers known to the server, fetching their classes, and listing them to the host.
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The definitions of this namespace, classes and qualifier declarations: making them and entering them.
 #include "src/common/CoreLog.h"
 #include "src/common/Names.h"

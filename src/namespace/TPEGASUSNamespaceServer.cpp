@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The private server as a process: port, configuration, start, stop, what an earlier run left, clean-up.
 #include "src/common/CoreLog.h"
 #include "src/namespace/NamespaceConstants.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Start-up: from a constructed namespace to a connected one with the base schema and the vendors' files in place.
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"

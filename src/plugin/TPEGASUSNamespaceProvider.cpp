@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/plugin/TPEGASUSNamespaceProvider.h"
 
 #include "src/common/Constants.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/provider/TPEGASUSProvider.h"
 
 #include "src/common/Constants.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/provider/TPEGASUSRequestedClassParser.h"
 
 #include "src/common/CoreLog.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/schema/DeclarationAttributes.h"
 
 #include <map>

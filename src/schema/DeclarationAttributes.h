@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The attributes of a declaration: its type, and the flavors and scopes of qualifiers.
 #pragma once
 

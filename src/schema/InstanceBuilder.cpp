@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/schema/InstanceBuilder.h"
 
 #include "src/common/Constants.h"

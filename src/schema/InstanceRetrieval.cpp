@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/schema/InstanceRetrieval.h"
 
 #include "src/common/CoreLog.h"

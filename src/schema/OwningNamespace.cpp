@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/schema/OwningNamespace.h"
 
 // Upwards, on purpose: a class holds its namespace by the namespace's own type. This is the one source of the

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The properties and methods that a class declares, and the rules for adding one.
 #include "src/common/CoreLog.h"
 #include "src/schema/TPEGASUSClass.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A class among its superclasses, subclasses and associations.
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // How a new class gets its settings and its declarations from the server.
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"

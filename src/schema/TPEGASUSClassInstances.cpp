@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // What a class does with instances, fetched from the server at every call, and the methods called on one.
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/schema/TPEGASUSMethodDecl.h"
 
 #include "src/schema/TPEGASUSClass.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/schema/TPEGASUSParameterDecl.h"
 
 #include "src/schema/TPEGASUSMethodDecl.h"

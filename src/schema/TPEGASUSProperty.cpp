@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "src/schema/TPEGASUSProperty.h"
 
 #include "display/PropertyText.h"

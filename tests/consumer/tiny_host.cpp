@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The least that a host does: loads the plug-in, prints "class count" for every class that it serves, unloads it.
 // Usage: tiny_host CONSUMER, with the deployed tree as working directory
 #include <host/ICIMClass.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // One table of declarations and values for the properties of classes and for those of instances, so that both show a
 // value alike.
 #include "src/schema/TPEGASUSProperty.h"

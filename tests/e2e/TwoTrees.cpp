@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A host that loads the plug-in of one tree after the other's.
 //
 //   two_trees (ROOT CONSUMER)...

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT
 """The commands of README.md: each line of its sh blocks is run as it stands, in this tree, or skipped with a reason.
 
 Usage: documents.py BUILD_DIRECTORY

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT
 """Hosts that die, that start at the same moment, and that meet hostile neighbours: each next inventory is complete.
 
 Usage: hosts.py BUILD_DIRECTORY [CLASS[.TEST]...]

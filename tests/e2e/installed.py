@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT
 """A tree for an installed OpenPegasus: what staging lays down, and what vrxhost knows about it.
 
 Usage: installed.py BUILD_DIRECTORY

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT
 """The main job on a real tree: what a user sees when all is well, and when something is broken.
 
 Usage: main_job.py BUILD_DIRECTORY [CLASS[.TEST]...]

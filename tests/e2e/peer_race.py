@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT
 """The race for a peer's name: another user's request must not be carried out because root's next connection has its port.
 
 An attacker (user nobody) sends a request and resets its connection; root connects again and again. With few ports the

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT
 """A deployed tree of one test's own: laid down, run, and searched for what a run must not leave behind."""
 import json
 import os

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/providers/FixtureTree.h"
 
 #include <fstream>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/pegasus/cmpi/MofServices.h"
 
 #include <Pegasus/Common/CIMProperty.h>

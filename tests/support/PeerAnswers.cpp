@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/support/PeerAnswers.h"
 
 #include "pegasus/wire/ElementEncoder.h"

@@ -1,9 +1,10 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT
 """What neither clang-format nor the compiler decides about how a file looks.
 
 Usage: dialect.py < NAMES-OF-FILES     (run in the repository's root; prints one finding a line)
 
-Headers have #pragma once. C++ has // comments, "typename" in template heads, "using" in place of typedef, and
+The first line is the licence's. Headers have #pragma once. C++ has // comments, "typename" in template heads, "using" in place of typedef, and
 enumerators kX. The C files, and C's headers, follow C and the CMPI standard; public headers keep OpenPegasus's names.
 A function has 60 lines at most, a folder 40 files. At most 30 files of the product have 25 lines or less; standard error
 has the count.
@@ -19,6 +20,7 @@ MAX_FUNCTION_LINES = 60
 MAX_FILES_IN_FOLDER = 40
 SMALL_FILE_LINES = 25
 MAX_SMALL_FILES = 30
+LICENCE = "// SPDX-License-Identifier: MIT\n"
 C_HEADERS = ("pegasus/cmpi/include/", "tests/pegasus/cmpi/conformance/")
 FOREIGN_NAMES = ("pegasus/include/", "pegasus/cmpi/include/")
 # One header for each of the host's interfaces and of OpenPegasus's public classes, however small.
@@ -71,6 +73,8 @@ def function_findings(source):
 
 def findings_in(file):
     source = Source(file)
+    if not source.text.startswith(LICENCE):
+        yield 1, f"the first line is not {LICENCE.strip()}"
     if file.endswith(".h") and "#pragma once" not in source.text:
         yield 1, "#pragma once is missing"
     yield from function_findings(source)

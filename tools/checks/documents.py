@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT
 """Compares what the documents mention with the tree.
 
 Usage: documents.py < NAMES-OF-FILES     (run in the repository's root; prints one finding a line)

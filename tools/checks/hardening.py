@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT
 """Checks how the programs and libraries of a tree were built.
 
 Usage: hardening.py TREE [COMPILE-COMMANDS]

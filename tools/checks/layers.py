@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT
 """Compares every #include of the repository's C and C++ files with the table of layers (layers.table).
 
 Usage: layers.py [--table FILE] < NAMES-OF-FILES     (run in the repository's root; prints one finding a line)

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT
 """Plants faults in a copy of the tree and runs tools/check there: each fault must be reported.
 
 Usage: selftest.py     (run in the repository's root, where the release preset is configured)
@@ -31,6 +32,7 @@ FAULTS = [
     ("layers", "src/common/P{n}.cpp", '#include "../plugin/P.h"\n', ":1: \"../plugin/P.h\" is not the path"),
     ("layers", "src/common/P{n}.cpp", "#include <src/common/CoreLog.h>\n", ":1: <src/common/CoreLog.h> is not public"),
     ("format", "src/common/P{n}.cpp", "int  misplaced;\n", ":1: clang-format"),
+    ("format", "src/common/P{n}.cpp", "int unlicensed;\n", ":1: the first line is not"),
     ("format", "src/common/P{n}.h", "int unguarded;\n", ":1: #pragma once"),
     ("format", "src/common/P{n}.cpp", "int a; /* of C */\n", ":1: /* comment"),
     ("format", "src/common/P{n}.cpp", "int a; /// of a generator\n", ":1: /// comment"),

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT
 """Takes C and C++ texts apart into code and comments, for the checks beside this file."""
 import re
 

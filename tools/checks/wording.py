@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT
 """Looks for the words of words.table in all texts, and counts the comments that describe by negation.
 
 Usage: wording.py < NAMES-OF-FILES     (run in the repository's root; prints one finding a line)

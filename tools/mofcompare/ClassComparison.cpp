@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tools/mofcompare/ClassComparison.h"
 
 #include "pegasus/base/Text.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/cli/collect/ClassReader.h"
 
 #include "display/PropertyText.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // From the contract's objects to records, and from what a user types to values.
 #pragma once
 

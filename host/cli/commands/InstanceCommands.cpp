@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Commands that show instances of one class.
 #include "host/cli/collect/ClassReader.h"
 #include "host/cli/collect/TCollector.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Calls a method of an instance or of a class.
 #include "host/cli/collect/ClassReader.h"
 #include "host/cli/collect/TCollector.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Commands that list whatever the providers serve, and the declaration of one class.
 #include "host/cli/collect/TCollector.h"
 #include "host/cli/commands/ICommand.h"

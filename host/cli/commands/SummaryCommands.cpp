@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // This machine in a few lines, and the state of the vendors.
 #include "display/PlainText.h"
 #include "host/cli/collect/TCollector.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Parts that the formats on JSON share.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Formats that write each instance as it comes, so that memory does not grow with their number.
 #include "host/cli/formats/JsonValues.h"
 #include "host/cli/formats/TextLayout.h"

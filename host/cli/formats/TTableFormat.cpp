@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Text for people.
 #include "host/cli/formats/TextLayout.h"
 #include "host/cli/formats/ValueText.h"

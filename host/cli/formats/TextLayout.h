@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Pieces of text for a terminal.
 #pragma once
 

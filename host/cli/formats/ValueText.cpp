@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/cli/formats/ValueText.h"
 
 #include "display/PlainText.h"

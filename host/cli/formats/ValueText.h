@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // How properties and instances are shown to people.
 #pragma once
 

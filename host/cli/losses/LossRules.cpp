@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/cli/losses/LossRules.h"
 
 #include <host/TVRXStatusCode.h>

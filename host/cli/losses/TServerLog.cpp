@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/cli/losses/TServerLog.h"
 
 #include <filesystem>

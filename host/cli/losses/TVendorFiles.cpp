@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/cli/losses/TVendorFiles.h"
 
 #include <host/TXmlParser.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/cli/model/Document.h"
 
 #include <algorithm>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // What vrxhost shows: plain data, free of the plug-in's objects, so that it outlives the plug-in.
 #pragma once
 

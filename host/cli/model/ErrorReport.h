@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // What went wrong, as text: what an exception says, what an unknown name may have meant, and how the user hears of it.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Which known name an unknown one may have meant.
 #include "host/cli/model/ErrorReport.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/Text.h"
 #include "pegasus/cmpi/broker/BrokerTables.h"

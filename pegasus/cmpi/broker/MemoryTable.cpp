@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/broker/BrokerTables.h"
 #include "pegasus/cmpi/objects/ArgsObject.h"
 #include "pegasus/cmpi/objects/ArrayObject.h"

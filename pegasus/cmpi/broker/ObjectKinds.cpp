@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/broker/ObjectKinds.h"
 
 #include "pegasus/base/Text.h"

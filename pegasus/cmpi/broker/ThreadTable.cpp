@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/broker/BrokerTables.h"
 
 #include <cerrno>

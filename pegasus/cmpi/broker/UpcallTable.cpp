@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/Text.h"
 #include "pegasus/cmpi/broker/BrokerTables.h"
 #include "pegasus/cmpi/objects/ArgsObject.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/objects/ArgsObject.h"
 
 namespace Pegasus::cmpi {

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/objects/ArrayObject.h"
 
 #include "pegasus/cmpi/objects/DateTimeObject.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/objects/Broker.h"
 
 #include "pegasus/cmpi/objects/TableFunction.h"

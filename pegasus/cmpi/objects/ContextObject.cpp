@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/objects/ContextObject.h"
 
 #include "pegasus/base/Text.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/objects/EnumerationObject.h"
 
 #include "pegasus/cmpi/objects/ArrayObject.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/objects/ErrorObject.h"
 
 #include "pegasus/cmpi/objects/StringObject.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/objects/Frame.h"
 
 namespace Pegasus::cmpi {

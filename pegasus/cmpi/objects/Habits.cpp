@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/objects/Habits.h"
 
 #include "pegasus/cmpi/objects/Broker.h"

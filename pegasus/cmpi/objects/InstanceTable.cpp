@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/objects/InstanceObject.h"
 
 // The functions through which providers use a CMPIInstance.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/objects/KeyCodec.h"
 
 #include "pegasus/cmpi/objects/ValueCodec.h"

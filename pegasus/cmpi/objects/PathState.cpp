@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/objects/PathState.h"
 
 #include "pegasus/base/AsciiCase.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/objects/StringObject.h"
 
 #include "pegasus/cmpi/objects/Habits.h"

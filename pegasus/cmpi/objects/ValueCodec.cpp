@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/objects/ValueCodec.h"
 
 #include "pegasus/base/Text.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/services/PropertyFilter.h"
 
 #include "pegasus/base/Text.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/services/SchemaCache.h"
 
 #include "pegasus/base/AsciiCase.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/admin/ConfigFile.h"
 
 #include "pegasus/server/admin/PrivateFile.h"

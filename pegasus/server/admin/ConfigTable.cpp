@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/admin/ConfigTable.h"
 
 #include "pegasus/server/admin/Capabilities.h"

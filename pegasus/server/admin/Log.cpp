@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/admin/Log.h"
 
 #include "pegasus/base/Descriptor.h"

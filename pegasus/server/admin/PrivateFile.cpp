@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/admin/PrivateFile.h"
 
 #include "pegasus/base/Descriptor.h"

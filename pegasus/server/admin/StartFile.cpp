@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/admin/StartFile.h"
 
 #include "pegasus/server/admin/PrivateFile.h"

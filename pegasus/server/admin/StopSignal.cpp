@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/admin/StopSignal.h"
 
 #include <cerrno>

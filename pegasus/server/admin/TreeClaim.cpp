@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/admin/TreeClaim.h"
 
 #include "pegasus/base/OwnedPath.h"

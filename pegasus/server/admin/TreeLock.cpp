@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/admin/TreeLock.h"
 
 #include <cerrno>

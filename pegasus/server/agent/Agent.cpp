@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/agent/Agent.h"
 
 #include "pegasus/server/admin/ConfigFile.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/Deadline.h"
 #include "pegasus/base/Descriptor.h"
 #include "pegasus/server/agent/AgentConfinement.h"

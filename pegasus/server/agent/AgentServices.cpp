@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/agent/AgentServices.h"
 
 #include "pegasus/server/admin/Log.h"

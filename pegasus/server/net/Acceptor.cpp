@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/net/Acceptor.h"
 
 #include "pegasus/base/TcpOwner.h"

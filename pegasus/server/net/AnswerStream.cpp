@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/net/AnswerStream.h"
 
 #include "pegasus/base/PercentCoding.h"

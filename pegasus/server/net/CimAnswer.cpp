@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/net/CimAnswer.h"
 
 #include "pegasus/base/Text.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/net/CimRequest.h"
 
 #include "pegasus/base/AsciiCase.h"

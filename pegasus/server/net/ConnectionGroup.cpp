@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/net/ConnectionGroup.h"
 
 #include "pegasus/server/admin/Log.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/net/HttpRequest.h"
 
 #include "pegasus/base/AsciiCase.h"

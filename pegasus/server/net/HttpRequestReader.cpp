@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/net/HttpRequestReader.h"
 
 #include "pegasus/wire/HttpAnswerReader.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/net/Listener.h"
 
 #include "pegasus/base/LocalSocket.h"

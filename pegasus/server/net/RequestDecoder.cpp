@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/net/RequestDecoder.h"
 
 #include "pegasus/base/AsciiCase.h"

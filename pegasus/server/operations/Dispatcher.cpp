@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/operations/Dispatcher.h"
 
 #include "pegasus/base/AsciiCase.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The operations that change instances: of classes with a provider through its agent, of registrations through the
 // registry, of the others in the repository.
 #include "pegasus/server/agent/AgentMessages.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/agent/AgentMessages.h"
 #include "pegasus/server/operations/InstanceSources.h"
 #include "pegasus/server/operations/Operations.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/base/PercentCoding.h"
 #include "pegasus/server/operations/ConfigService.h"
 #include "pegasus/server/operations/Operations.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // One property of an instance: GetProperty and SetProperty, by means of the whole instance.
 #include "pegasus/server/agent/AgentMessages.h"
 #include "pegasus/server/operations/Operations.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/operations/ProviderRegistry.h"
 
 #include "pegasus/base/AsciiCase.h"

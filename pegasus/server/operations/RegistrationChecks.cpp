@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/operations/RegistrationChecks.h"
 
 #include "pegasus/base/Text.h"

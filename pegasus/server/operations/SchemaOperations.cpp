@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/operations/Operations.h"
 #include "pegasus/wire/ElementEncoder.h"
 

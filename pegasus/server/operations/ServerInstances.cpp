@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/operations/ServerInstances.h"
 
 #include "pegasus/server/operations/ConfigService.h"

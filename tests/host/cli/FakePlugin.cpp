@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A plug-in for the tests of vrxhost. It behaves well by default; the host setting "fake.fault" names a fault to show,
 // and what can only be wrong in the library itself is a macro:
 //   FAKE_WITHOUT_ENTRY_POINTS   the entry points are missing

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Parts of vrxhost, each tested apart from any plug-in.
 #include "host/cli/TPrivateServer.h"
 #include "host/cli/losses/LossRules.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A root of the user's own, for a tree that is read-only or must stay unchanged.
 #include "tests/host/cli/VrxhostProgram.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Which directories vrxhost works in, and that it leaves all others as they are.
 #include "tests/host/cli/VrxhostProgram.h"
 

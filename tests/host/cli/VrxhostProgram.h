@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // vrxhost as a program, run in a small deployed tree of each test's own.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // vrxhost as a program, with a plug-in that misbehaves on demand: what it prints, what it says and how it exits.
 #include "host/core/TUniqueFd.h"
 #include "tests/host/cli/VrxhostProgram.h"

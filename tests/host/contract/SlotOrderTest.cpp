@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The binary order of every host interface. A plug-in and a host that were built apart meet in the slots of the virtual
 // tables, so the tables here are written out by hand; a declaration that moves in a header fails its row.
 #include <host/ICIMClass.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The child of the process tests: argv[1] says what it does. Every mode ends with its reader, or after 30 seconds.
 #include <csignal>
 #include <cstdio>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Settings, logger, the namespace-provider manager, and the switch that cancels programs.
 #include "host/core/TChildProcess.h"
 #include "host/core/TCoreLogger.h"

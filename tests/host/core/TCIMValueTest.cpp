@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include <host/TCIMValue.h>
 #include <host/TVRXException.h>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The small types beside the variant: datetime, char16, reference, status code and exception.
 #include <host/TCIMReference.h>
 #include <host/TCIMValue.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "host/inmem/TInmemNamespace.h"
 #include "tests/host/support/FakeModel.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/host/support/FakeModel.h"
 
 #include <algorithm>

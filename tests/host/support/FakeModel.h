@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A small object model for the host's tests: declarations with settable qualifiers, and a class that holds them and
 // serves instances. Operations that the host leaves unused throw TVRXException 31.
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include <host/TXmlParser.h>
 
 #include <gmock/gmock.h>

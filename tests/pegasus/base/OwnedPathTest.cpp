@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Whose files may run: fixtures with modes and owners, and what is said about them.
 #include "pegasus/base/OwnedPath.h"
 

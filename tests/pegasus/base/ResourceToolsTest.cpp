@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Owners of descriptors, and deadlines.
 #include "pegasus/base/Deadline.h"
 #include "pegasus/base/Descriptor.h"

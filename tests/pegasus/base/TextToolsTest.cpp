@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Case, UTF-8, percent-coding and the texts of CIM objects: tables of bytes.
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/NumberText.h"

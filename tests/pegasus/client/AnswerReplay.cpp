@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/pegasus/client/AnswerReplay.h"
 
 #include "pegasus/client/ResponseReader.h"

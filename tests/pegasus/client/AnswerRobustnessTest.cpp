@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Each answer split at every byte, cut at every length, and with every byte changed: it is read the same way, or
 // refused, and never taken for another success.
 #include "tests/pegasus/client/AnswerReplay.h"

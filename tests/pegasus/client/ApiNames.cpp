@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Every public name and member, used as a user's program would use it, through one public header and with the one macro
 // that it asks for. That it compiles and links is the whole test; what the members do is tested elsewhere.
 #include <Pegasus/Client/CIMClient.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The public classes as a user's program sees them: what is derived from what, values of every type, handles that are
 // shared. ApiNames.cpp has every name.
 #include <Pegasus/Client/CIMClient.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A client and a peer that plays good and bad answers: the exceptions, the deadline, and that the next call works.
 #include "tests/support/PeerAnswers.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Connects to a port of this machine and prints "connected" or the exception's message.
 #include <Pegasus/Client/CIMClient.h>
 

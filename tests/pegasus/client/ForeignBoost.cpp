@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A host with a Boost of its own: the test program exports a function that the client library's Boost has too, the
 // reader of every answer. The client library must keep to its own: a call of this one ends the test program.
 #include <cstdlib>

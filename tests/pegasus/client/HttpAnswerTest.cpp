@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The HTTP parts that client and server share: the reader of answers, and the check of a Content-Type.
 #include "pegasus/wire/ContentType.h"
 #include "pegasus/wire/HttpAnswerReader.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The private socket, in a folder whose path is longer than a socket address.
 #include "pegasus/base/LocalSocket.h"
 

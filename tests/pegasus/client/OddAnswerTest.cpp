@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // What other servers write: odd pieces of an answer that cost no object, and those that must never become a value.
 #include "tests/pegasus/client/AnswerReplay.h"
 

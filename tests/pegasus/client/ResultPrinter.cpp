@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/pegasus/client/ResultPrinter.h"
 
 #include <cstdlib>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Which server the client library of a staged tree talks to when it is asked for a port of this machine.
 #include "pegasus/client/TreeRoute.h"
 

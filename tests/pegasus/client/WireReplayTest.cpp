@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Every recorded exchange once more: the recorded answer to the same call gives what the real client made of it, and
 // our request is the one that it sent.
 #include "tests/pegasus/client/WireCases.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* The codes that providers compiled elsewhere use. Compiling this file is the test. */
 #include <cmpi/cmpi.h>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /*
   The layout that providers compiled elsewhere rely on: each row is a structure's size and alignment, or a member's
   offset and size, on x86-64 Linux. Compiling this file is the test.

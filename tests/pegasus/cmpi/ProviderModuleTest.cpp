@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/module/ProviderLibrary.h"
 #include "tests/pegasus/cmpi/MofServices.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Which properties hold embedded objects.
 #include "pegasus/common/EmbeddedKind.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The recorded answers of the real library: names, paths, values, date-times, objects, exceptions and their texts.
 #include "tests/pegasus/common/VectorTable.h"
 #include "tests/support/VectorsFolder.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/pegasus/common/VectorTable.h"
 
 #include <Pegasus/Client/CIMClient.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/pegasus/mof/Describe.h"
 
 using namespace Pegasus;

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/Compiler.h"
 #include "pegasus/mof/MemoryHandler.h"
 

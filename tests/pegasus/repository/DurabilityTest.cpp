@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/pegasus/mof/Describe.h"
 #include "tests/pegasus/repository/RepositoryHandler.h"
 #include "tests/support/TemporaryDirectory.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/pegasus/repository/RepositoryHandler.h"
 
 #include "pegasus/mof/MemoryHandler.h"

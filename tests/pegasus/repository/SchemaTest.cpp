@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/mof/MemoryHandler.h"
 #include "tests/pegasus/mof/Describe.h"
 #include "tests/pegasus/repository/RepositoryHandler.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "pegasus/server/agent/AgentOutput.h"
 
 #include <gtest/gtest.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Vendor code under the server: what it delivers, and what becomes of everything else when it fails.
 #include "pegasus/server/admin/Capabilities.h"
 #include "tests/pegasus/server/HttpExchange.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/pegasus/server/HttpExchange.h"
 
 #include "pegasus/base/PercentCoding.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The HTTP layer by itself: bytes in, bytes out; what bounds them; what ends a connection.
 #include "pegasus/base/PercentCoding.h"
 #include "pegasus/server/agent/AgentChannel.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // What becomes of a method's parameters between a client and the provider.
 #include "tests/pegasus/server/HttpExchange.h"
 #include "tests/pegasus/server/ServerTree.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Who may talk to the server: whose process is at the other end of a connection, and what the kernel says when that
 // changes while it is asked.
 #include "pegasus/base/TcpOwner.h"

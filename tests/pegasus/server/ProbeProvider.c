@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* A provider that does what a test asks for: many instances, endless instances, errors, crashes.
  * Probe_Bulk delivers as many instances as SetCount said (1000 at first); Probe_Endless delivers for ever;
  * Probe_FailAfter delivers one instance, then fails. */

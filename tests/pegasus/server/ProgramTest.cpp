@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // cimserver and cimconfig as people and other programs call them: texts, exit statuses, files.
 #include "pegasus/base/TreeLockFile.h"
 #include "tests/pegasus/server/HttpExchange.h"

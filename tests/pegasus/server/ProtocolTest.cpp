@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The server as any HTTP client sees it: rows of request bytes, and what comes back.
 #include "tests/pegasus/server/HttpExchange.h"
 #include "tests/pegasus/server/ServerTree.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Recorded requests that a provider answered, against our server and a CMPI
 // provider that has the recorded provider's data: it reads the files that this
 // test writes from the recordings.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/pegasus/server/RecordedExchange.h"
 
 #include "pegasus/base/PercentCoding.h"

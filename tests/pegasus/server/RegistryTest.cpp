@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // What a registration must be, and what is found by it.
 #include "pegasus/server/operations/ProviderRegistry.h"
 #include "pegasus/server/operations/RegistrationChecks.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/pegasus/server/ReplayFixture.h"
 
 #include "pegasus/base/AsciiCase.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Recorded requests against our server: the answer must be canonically equal to
 // the recorded one, but for the rows that say why ours is better. The
 // recordings lie outside the project: VRX_VECTORS_DIR names their folder.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/pegasus/server/ServerTree.h"
 
 #include "pegasus/base/TreeLockFile.h"

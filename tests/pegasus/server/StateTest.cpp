@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // What the server keeps and checks: configuration, log, lock and start file.
 #include "pegasus/server/admin/Config.h"
 #include "pegasus/server/admin/Log.h"

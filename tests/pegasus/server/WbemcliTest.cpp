@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A foreign client, Debian's wbemcli, against our server: every verb that it has. It lacks verbs for qualifier
 // declarations (GetQualifier, EnumerateQualifiers, SetQualifier) and for CreateClass.
 #include "tests/pegasus/server/ServerTree.h"

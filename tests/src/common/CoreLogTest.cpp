@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The plug-in lives in the host's process, whose locale it neither sets nor follows.
 #include "src/common/CoreLog.h"
 

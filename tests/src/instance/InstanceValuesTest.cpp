@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The values of an instance: names, the two special properties, references.
 #include "tests/src/instance/RetrievalFixture.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Methods called through an instance and through a class.
 #include "src/instance/TPEGASUSInstance.h"
 #include "tests/src/schema/ServedNamespace.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // What a server, a property or a visitor that fails costs a retrieval.
 #include "tests/src/instance/RetrievalFixture.h"
 

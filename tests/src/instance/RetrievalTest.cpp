@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Instances fetched from the server: who is asked, for what, with which timeout, and which instance matches.
 #include "tests/src/instance/RetrievalFixture.h"
 

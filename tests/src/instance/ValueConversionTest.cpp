@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Values from the server to the host and back, over every type.
 #include "src/instance/ValueConversion.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Tries and attempts against a server that refuses first.
 #include "src/provider/TPEGASUSProvider.h"
 #include "tests/src/support/NamespaceRig.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // What the namespace hands to the host's own namespaces, and how it finds them in the context.
 #include "tests/src/support/NamespaceRig.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // MOF files beside a path, and the providers that lie on disk.
 #include "src/provider/TPEGASUSProvider.h"
 #include "src/provider/TPEGASUSRequestedClassParser.h"

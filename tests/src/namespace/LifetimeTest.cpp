@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A host that drops the namespace at an awkward moment: with its objects in hand, or from inside a visitor.
 #include "src/plugin/TPEGASUSNamespaceProvider.h"
 #include "src/provider/TPEGASUSProvider.h"

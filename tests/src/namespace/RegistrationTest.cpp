@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // From a provider on disk to one that the host is offered: compilation, collection, connection, enumeration.
 #include "src/provider/TPEGASUSProvider.h"
 #include "src/schema/TPEGASUSClass.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Names, and the classes that the namespace mirrors from its server.
 #include "src/schema/TPEGASUSClass.h"
 #include "src/schema/TPEGASUSQualifierDecl.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The server as a process: the port it gets, what is run with which arguments, what is killed and what is removed.
 #include "tests/src/support/NamespaceRig.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Start-up with the server absent: context, refusals, attempts, vendor preparation, and the whole life's traces.
 #include "src/plugin/TPEGASUSNamespaceProvider.h"
 #include "tests/src/support/NamespaceRig.h"

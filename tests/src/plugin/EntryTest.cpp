@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The entry object: the singleton, the module path, and the namespaces that it makes and drops.
 #include "src/plugin/TPEGASUSNamespaceProvider.h"
 #include "tests/src/support/NamespaceRig.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The library as a host loads it: what it exports, and that unloading removes all of it.
 #include "tests/src/support/CapturedLog.h"
 #include "tests/src/support/FakeCimServer.h"

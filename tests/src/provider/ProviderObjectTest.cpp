@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // What a provider says of itself, and which operations it refuses or ignores.
 #include "src/provider/TPEGASUSProvider.h"
 #include "tests/src/support/StatusOf.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // What is read of a requested-class file, and the exact line that each oddity costs.
 #include "src/provider/TPEGASUSRequestedClassParser.h"
 #include "tests/src/support/CapturedLog.h"

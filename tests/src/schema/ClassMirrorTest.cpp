@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // What a new class takes over from the server, what it asks for, and what it leaves out.
 #include "src/schema/DeclarationAttributes.h"
 #include "src/schema/TPEGASUSQualifierDecl.h"

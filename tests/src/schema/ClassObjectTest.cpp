@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The class object's own rules: adding declarations, the hierarchy, its instances.
 #include "src/schema/TPEGASUSQualifierDecl.h"
 #include "tests/src/schema/ServedNamespace.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The declaration elements and their qualifiers, and the texts of a property.
 #include "src/schema/TPEGASUSProperty.h"
 #include "src/schema/TPEGASUSQualifierDecl.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/src/schema/ServedNamespace.h"
 
 #include "src/common/Constants.h"

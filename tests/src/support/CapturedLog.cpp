@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/src/support/CapturedLog.h"
 
 #include <host/TRootObject.h>

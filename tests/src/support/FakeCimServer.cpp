@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/src/support/FakeCimServer.h"
 
 #include "tests/support/PeerAnswers.h"

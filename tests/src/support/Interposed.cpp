@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // The functions that the test program puts in front of libc and of the host's process service. Each asks the current
 // TOutsideWorld about the plug-in's calls; all others, and all while that object is absent, go to the next definition.
 #include "tests/src/support/OutsideWorld.h"

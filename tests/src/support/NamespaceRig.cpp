@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/src/support/NamespaceRig.h"
 
 #include "src/plugin/TPEGASUSNamespaceProvider.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/src/support/OutsideWorld.h"
 
 #include <atomic>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/src/support/TempTree.h"
 
 #include <cstdlib>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /*
   The broker as a provider sees it: one object with four function tables.
 

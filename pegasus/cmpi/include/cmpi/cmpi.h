@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* Everything that the source of a CMPI provider needs. */
 #pragma once
 

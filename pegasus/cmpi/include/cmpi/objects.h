@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /*
   The encapsulated objects: what a provider holds of a broker's strings, paths, instances and so on.
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /*
   The tables that a provider fills, one for each kind of interface ("MI") that it implements.
 

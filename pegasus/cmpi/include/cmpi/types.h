@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /*
   The scalar types, codes and small structures that a CMPI provider and its broker exchange.
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #pragma once
 
 // Platform check, linkage macros and the basic types that every public header builds on.

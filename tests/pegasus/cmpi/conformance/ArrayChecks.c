@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* Arrays and arguments. */
 #include "tests/pegasus/cmpi/conformance/Conformance.h"
 

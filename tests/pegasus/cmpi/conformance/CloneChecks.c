@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* Clones and releases. */
 #include "tests/pegasus/cmpi/conformance/Conformance.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* Checks of a broker on its providers' side. Every check is a row: a name and a function. */
 #pragma once
 

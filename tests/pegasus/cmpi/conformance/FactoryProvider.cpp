@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // Providers in C++ that work in their factory. "Exact" makes a hundred rounds of broker calls and throws at the first
 // unexpected answer; "Throwing" always throws; "Late" throws at its first request.
 #include <cmpi/cmpi.h>

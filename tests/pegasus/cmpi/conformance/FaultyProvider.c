@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* Libraries with one peculiarity each; FAULT_... says which. */
 #include <cmpi/cmpi.h>
 

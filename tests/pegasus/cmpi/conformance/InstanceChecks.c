@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* Instances: their properties, and how path and properties meet. */
 #include "tests/pegasus/cmpi/conformance/Conformance.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* Object paths. */
 #include "tests/pegasus/cmpi/conformance/Conformance.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /*
   The provider that the broker's tests drive: TST_Check has methods that run the checks, TST_Item has instances that are
   returned in as many ways as providers do it, right and wrong.

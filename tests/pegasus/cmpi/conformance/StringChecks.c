@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* Strings, datetimes and messages. */
 #include "tests/pegasus/cmpi/conformance/Conformance.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* The tables themselves: versions; every slot has a function. */
 #include "tests/pegasus/cmpi/conformance/Conformance.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* Threads, locks and keys of the broker, and the provider's own threads. */
 #include "tests/pegasus/cmpi/conformance/Conformance.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* The context, and upcalls made with it. The server answers upcalls by this provider itself. */
 #include "tests/pegasus/cmpi/conformance/Conformance.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 /* Every type of value; the broker reads exactly its bytes. */
 #include "tests/pegasus/cmpi/conformance/Conformance.h"
 

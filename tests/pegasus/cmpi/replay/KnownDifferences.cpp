@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/pegasus/cmpi/replay/KnownDifferences.h"
 
 namespace servertest {

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A recorded vendor and recorded probes of the broker, compiled from the folder of recordings and run in our server.
 // The answers must be those of the recorded server, but for the rows of the tables, which say why ours differ.
 #include "pegasus/base/PercentCoding.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 #include "tests/pegasus/server/lab/CmpiBuilder.h"
 
 #include <Pegasus/Common/CIMObject.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT
 // A provider that plays what the files beside its library say, so that one library can stand for any vendor's:
 //   <Class>.xml     its instances: a CIM-XML message with VALUE.NAMEDINSTANCE elements anywhere in it
 //   <name>.status   "CODE TEXT": class or method fails with that, a class behind its instances; "throw": a C++ int
