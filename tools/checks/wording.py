@@ -36,8 +36,10 @@ class Words:
 
 
 def negations(source):
-    """Yields for each comment line whether it holds a negation."""
+    """Yields for each comment line but the licence's whether it holds a negation."""
     for _, comment in source.comments:
+        if "SPDX-License-Identifier" in comment:
+            continue
         for text in comment.split("\n"):
             yield bool(NEGATION.search(re.sub(r"NOLINT\S*|\"[^\"]*\"|`[^`]*`", "", text)))
 
