@@ -53,7 +53,8 @@ set(CMAKE_BUILD_WITH_INSTALL_RPATH OFF)
 install(CODE [[
   foreach(folder "" include include/host lib lib/cmake lib/cmake/pegasus-nsp pegasus pegasus/bin pegasus/lib
                  pegasus/pegSchema pegasus/pegSchema/PG_InterOp pegasus/pegSchema/PG_Internal
-                 pegasus/provider pegasus/provider/linux)
+                 pegasus/provider pegasus/provider/linux
+                 share share/examples share/examples/fleet share/examples/fleet/bin)
     set(path "$ENV{DESTDIR}${CMAKE_INSTALL_PREFIX}/${folder}")
     if(NOT EXISTS "${path}" OR folder MATCHES "^pegasus")
       file(MAKE_DIRECTORY "${path}")

@@ -106,6 +106,9 @@ TJson JsonDeclarations(const TClassRecord& each)
         if (property.fIsCounter) {
             json["counter"] = true;
         }
+        if (property.fIsVolatile) {
+            json["volatile"] = true;
+        }
         if (!property.fUnits.empty()) {
             json["units"] = property.fUnits;
         }

@@ -83,12 +83,14 @@ class TNdjsonFormat : public TStreamFormat
     }
 
   private:
-    TJson Record(const char* kind) const
+    TJson Record(const char* kind)
     {
+        ++fRecordCount;
         TJson json = {{"record", kind}, {"format", kFormatVersion}};
         json["host"] = fHead.fHost.fMachineId.empty() ? fHead.fHost.fName : fHead.fHost.fMachineId;
         if (!fOptions.fStable) {
             json["run"] = fHead.fRunId;
+            json["seq"] = fRecordCount;
             json["time"] = TimeNow();
         }
         if (!fProvider.empty()) {
@@ -96,6 +98,8 @@ class TNdjsonFormat : public TStreamFormat
         }
         return json;
     }
+
+    std::size_t fRecordCount = 0;
 };
 
 // One property a line, since classes differ in their columns (RFC 4180, lines end with a line feed).

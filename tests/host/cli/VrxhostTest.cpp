@@ -311,10 +311,12 @@ TEST_F(VrxhostProgram, NdjsonRecordsStandOnTheirOwnAndTheLastOneCountsThem)
     std::istringstream lines(Run({"inventory", "--format", "ndjson", "--set", "fake.count=3"}).fOutput);
     std::map<std::string, int> counts;
     nlohmann::json last;
+    int number = 0;
     for (std::string line; std::getline(lines, line);) {
         last = nlohmann::json::parse(line);
         ++counts[last["record"]];
         EXPECT_EQ(last["run"].get<std::string>().size(), 36u);
+        EXPECT_EQ(last["seq"], ++number);
     }
     EXPECT_EQ(counts, (std::map<std::string, int>{{"class", 3}, {"instance", 4}, {"end", 1}}));
     EXPECT_EQ(last["instances"], 4);
