@@ -189,6 +189,19 @@ bool IsHarmless(const std::string& errorLine)
                        [&errorLine](const char* message) { return EndsWith(errorLine, message); });
 }
 
+std::optional<TLoss> NoteOfServerLine(const TServerLogLine& line)
+{
+    static const std::string kTrap = "works here, fails on OpenPegasus 2.14: ";
+    const std::size_t begin = line.fText.find(kTrap);
+    if (begin == std::string::npos) {
+        return std::nullopt;
+    }
+    TLoss note = LossOf("provider module " + line.fModule +
+                        " does what fails on OpenPegasus 2.14: " + line.fText.substr(begin + kTrap.size()));
+    note.fIsNote = true;
+    return note;
+}
+
 std::optional<TLoss> LossOfServerLine(const TServerLogLine& line)
 {
     static const std::regex kRefused("setProperty: (?:class (\\S+) has no property (\\S+)"

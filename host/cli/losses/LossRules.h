@@ -20,6 +20,9 @@ bool IsHarmless(const std::string& errorLine);
 // Returns: the loss that the server's log reports: a value that a provider set and the class refused.
 std::optional<TLoss> LossOfServerLine(const TServerLogLine& line);
 
+// Returns: the note for a provider that would fail on another server, whose vendor is the caller's to fill in.
+std::optional<TLoss> NoteOfServerLine(const TServerLogLine& line);
+
 // Returns: the loss that a failed program means; empty when its failure is harmless.
 // root: see TLossLog.
 std::optional<TLoss> LossOfProgram(const NKOLVRX20::TFailedProgram& program, const std::string& root);

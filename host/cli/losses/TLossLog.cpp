@@ -147,6 +147,9 @@ void TLossLog::AddServerLog(const std::vector<TServerLogLine>& lines, const std:
         const auto vendor = vendors.find(line.fModule);
         if (auto loss = LossOfServerLine(line)) {
             Enter(*loss);
+        } else if (auto note = NoteOfServerLine(line)) {
+            note->fVendor = vendor == vendors.end() ? "" : vendor->second;
+            Enter(*note);
         } else if (vendor != vendors.end()) {
             fServerLines[vendor->second].push_back(line.fText);
         }

@@ -165,9 +165,11 @@ TEST(TLossLog, LossesAreFoldedUnderTheirCause)
     }
     log.Log(NKOLVRX20::ILogger::kInfo, "TPEGASUSClass::EnumerateInstances FAN_C");
     log.Log(NKOLVRX20::ILogger::kInfo, "4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: rpm");
-    log.AddServerLog(
-        {{"fans", "warning: a"}, {"fans", "warning: setProperty: class FAN_A has no property Rpm"}, {"x", "b"}},
-        {{"fans", "fan"}});
+    log.AddServerLog({{"fans", "warning: a"},
+                      {"fans", "warning: setProperty: class FAN_A has no property Rpm"},
+                      {"fans", "warning: provider Fan: works here, fails on OpenPegasus 2.14: convert it"},
+                      {"x", "b"}},
+                     {{"fans", "fan"}});
     const std::string fan = "vendor fan, " + (vendors / "fan/x.classes.xml").string() + ": ";
     EXPECT_EQ(SentencesOf(log),
               (std::vector<std::string>{"MOF file; missing as a consequence: PSU_A, PSU_C",
@@ -175,7 +177,10 @@ TEST(TLossLog, LossesAreFoldedUnderTheirCause)
                                         fan + "property rpm of class FAN_C could not be converted and is missing from "
                                               "its instance",
                                         fan + "property Rpm of class FAN_A is not declared, so that the value which "
-                                              "provider module fans sets is lost"}));
+                                              "provider module fans sets is lost",
+                                        "vendor fan: provider module fans does what fails on OpenPegasus 2.14: "
+                                        "convert it"}));
+    EXPECT_TRUE(log.GetLosses()[4].fIsNote);
     EXPECT_EQ(log.GetLosses()[1].fLog, std::vector<std::string>{"warning: a"});
     EXPECT_TRUE(log.GetLosses()[0].fLog.empty());
     fs::remove_all(vendors);

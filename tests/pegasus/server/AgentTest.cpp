@@ -11,6 +11,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <fstream>
+#include <map>
 #include <memory>
 
 #include <signal.h>
@@ -238,6 +239,59 @@ TEST_F(AgentTest, aLibraryThatOthersCanChangeIsNotLoaded)
             ASSERT_EQ(::chmod(path.c_str(), closed), 0);
         }
         EXPECT_EQ(load(), "no error");
+    }
+}
+
+// What works here and fails on OpenPegasus: each kind is carried out and reported once; strict providers are refused.
+TEST_F(AgentTest, whatFailsOnOpenPegasusIsReportedOnceOrRefused)
+{
+    const std::map<std::string, std::string> traps{
+        {"chars in string array", "a CMPI_chars element in an array of CMPI_string"},
+        {"string in chars array", "a CMPI_string element in an array of CMPI_chars"},
+        {"element released early", "an array keeps the string or datetime"},
+        {"null element", "setElementAt without a value"},
+        {"null datetime element", "a null datetime in an array"},
+        {"untyped null", "a null value of type CMPI_null"},
+        {"key of other type", "a key of another type"},
+        {"null key", "addKey with a null value"},
+        {"", "keys that are set on the path alone"}, // in an enumeration
+        {"embedded as text", "text for an embedded instance"},
+        {"text not UTF-8", "text that is not UTF-8"},
+        {"real not normal", "a real that is not a number"},
+        {"half surrogate", "half of a surrogate pair"},
+        {"no returnDone", "a method that ends without returnDone"},
+        {"no attach", "an upcall of a thread without attachThread"},
+    };
+    for (const bool strict : {false, true}) {
+        SCOPED_TRACE(strict ? "strict" : "kind");
+        ServerTree tree;
+        tree.start();
+        tree.installProbe(); // its MOF does not compile on OpenPegasus either
+        ASSERT_EQ(tree.run("cimconfig", {"-s", strict ? "strictProviders=true" : "strictProviders=false"}).exitStatus,
+                  0);
+        CIMClient client;
+        client.connect("127.0.0.1", tree.port(), String(), String());
+        const auto spring = [&](const std::string& kind) {
+            Array<CIMParamValue> in;
+            in.append(CIMParamValue("Kind", CIMValue(String(kind.c_str()))));
+            return errorOf([&] {
+                kind.empty() ? client.enumerateInstances(kNamespace, "Probe_Trap").size()
+                             : call(client, "Probe_Trap", "Trap", in);
+            });
+        };
+        for (const auto& [kind, reported] : traps) {
+            EXPECT_EQ(spring(kind) == "no error", !strict) << kind;
+            EXPECT_EQ(spring(kind) == "no error", !strict) << kind;
+        }
+        const std::string log = tree.log();
+        for (const auto& [kind, reported] : traps) {
+            const std::string who = kind == "no attach" ? "" : "provider Probe: "; // such a thread has no provider
+            const std::string line =
+                "provider module \"ProbeModule\": " + who + "works here, fails on OpenPegasus 2.14: " + reported;
+            const std::size_t first = log.find(line);
+            EXPECT_NE(first, std::string::npos) << line;
+            EXPECT_EQ(log.find(line, first + 1), std::string::npos) << "twice: " << line;
+        }
     }
 }
 

@@ -2,6 +2,8 @@
 /* A provider that does what a test asks for: many instances, endless instances, errors, crashes.
  * Probe_Bulk delivers as many instances as SetCount said (1000 at first); Probe_Endless delivers for ever;
  * Probe_FailAfter delivers one instance, then fails. */
+#include "tests/pegasus/server/ProbeTraps.h"
+
 #include <cmpi/cmpi.h>
 
 #include <errno.h>
@@ -86,6 +88,14 @@ static CMPIStatus deliver(const CMPIResult* result, const CMPIObjectPath* of, CM
     return status;
 }
 
+/* One instance of Probe_Trap, with its key on the path alone. */
+static CMPIStatus deliverPathKey(const CMPIResult* result, const CMPIObjectPath* of)
+{
+    const CMPIInstance* instance = gBroker->eft->newInstance(gBroker, makePath(of, 0), NULL);
+    const CMPIStatus status = result->ft->returnInstance(result, instance);
+    return status.rc == CMPI_RC_OK ? result->ft->returnDone(result) : status;
+}
+
 static CMPIStatus enumerateInstances(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                                      const CMPIObjectPath* path, const char** properties)
 {
@@ -95,6 +105,9 @@ static CMPIStatus enumerateInstances(CMPIInstanceMI* mi, const CMPIContext* cont
     if (strcasecmp(name, "Probe_FailAfter") == 0) {
         deliver(result, path, 0);
         return failure(CMPI_RC_ERR_ACCESS_DENIED, "the probe says no: \xc3\xa9");
+    }
+    if (strcasecmp(name, "Probe_Trap") == 0) {
+        return deliverPathKey(result, path);
     }
     const int endless = strcasecmp(name, "Probe_Endless") == 0;
     for (CMPIUint32 i = 0; status.rc == CMPI_RC_OK && (endless || i < gCount); ++i) {
@@ -240,6 +253,19 @@ static CMPIStatus describeArguments(const CMPIResult* result, const CMPIArgs* in
     }
     result->ft->returnData(result, (const CMPIValue*)text, CMPI_chars);
     return result->ft->returnDone(result);
+}
+
+static CMPIStatus trap(const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path,
+                       const CMPIArgs* in)
+{
+    const char* kind = textOf(in->ft->getArg(in, "Kind", NULL).value.string);
+    const CMPIStatus status = doTrap(gBroker, context, path, kind);
+    const CMPIValue zero = {.uint32 = 0};
+    if (status.rc != CMPI_RC_OK) {
+        return status;
+    }
+    result->ft->returnData(result, &zero, CMPI_uint32);
+    return strcmp(kind, "no returnDone") == 0 ? kOk : result->ft->returnDone(result);
 }
 
 /* Calls back into the server: how many instances of Probe_Bulk does it say there are? */
@@ -418,6 +444,9 @@ static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, con
     }
     if (strcasecmp(method, "ChangeByUpcall") == 0) {
         return changeByUpcall(context, result, path);
+    }
+    if (strcasecmp(method, "Trap") == 0) {
+        return trap(context, result, path, in);
     }
     if (strcasecmp(method, "ProcessId") == 0) {
         return returnNumber(result, (CMPIUint32)getpid());

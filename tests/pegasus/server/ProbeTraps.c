@@ -1,0 +1,157 @@
+// SPDX-License-Identifier: MIT
+#include "tests/pegasus/server/ProbeTraps.h"
+
+#include <math.h>
+#include <string.h>
+
+typedef struct Trap
+{
+    const CMPIBroker* mb;
+    const CMPIContext* context;
+    const CMPIObjectPath* path;
+    CMPIObjectPath* own; /* of Probe_Trap, without keys */
+    CMPIInstance* instance;
+} Trap;
+
+static CMPIStatus setText(const Trap* trap, const char* name, const char* text)
+{
+    return trap->instance->ft->setProperty(trap->instance, name, (const CMPIValue*)text, CMPI_chars);
+}
+
+static CMPIArray* newArray(const Trap* trap, CMPIType type)
+{
+    return trap->mb->eft->newArray(trap->mb, 1, type, NULL);
+}
+
+static CMPIStatus charsInStringArray(const Trap* trap)
+{
+    const CMPIArray* array = newArray(trap, CMPI_string);
+    return array->ft->setElementAt(array, 0, (const CMPIValue*)"x", CMPI_chars);
+}
+
+static CMPIStatus stringInCharsArray(const Trap* trap)
+{
+    const CMPIArray* array = newArray(trap, CMPI_chars);
+    const CMPIValue text = {.string = trap->mb->eft->newString(trap->mb, "x", NULL)};
+    return array->ft->setElementAt(array, 0, &text, CMPI_string);
+}
+
+static CMPIStatus elementReleasedEarly(const Trap* trap)
+{
+    const CMPIValue words = {.array = newArray(trap, CMPI_string)};
+    const CMPIValue text = {.string = trap->mb->eft->newString(trap->mb, "x", NULL)};
+    words.array->ft->setElementAt(words.array, 0, &text, CMPI_string);
+    const CMPIStatus released = text.string->ft->release(text.string);
+    return released.rc != CMPI_RC_OK ? released
+                                     : trap->instance->ft->setProperty(trap->instance, "Words", &words, CMPI_stringA);
+}
+
+static CMPIStatus nullElement(const Trap* trap)
+{
+    const CMPIArray* array = newArray(trap, CMPI_uint8);
+    return array->ft->setElementAt(array, 0, NULL, CMPI_uint8);
+}
+
+static CMPIStatus nullDateTimeElement(const Trap* trap)
+{
+    const CMPIValue when = {.array = newArray(trap, CMPI_dateTime)};
+    return trap->instance->ft->setProperty(trap->instance, "When", &when, CMPI_dateTimeA);
+}
+
+static CMPIStatus untypedNull(const Trap* trap)
+{
+    return trap->instance->ft->setProperty(trap->instance, "T1", NULL, CMPI_null);
+}
+
+static CMPIStatus keyOfOtherType(const Trap* trap)
+{
+    const CMPIValue number = {.uint32 = 1};
+    return trap->own->ft->addKey(trap->own, "Id", &number, CMPI_uint32);
+}
+
+static CMPIStatus nullKey(const Trap* trap)
+{
+    return trap->own->ft->addKey(trap->own, "Id", NULL, CMPI_string);
+}
+
+static CMPIStatus embeddedAsText(const Trap* trap)
+{
+    return setText(trap, "Inner", "instance of Probe_Stored { };");
+}
+
+static CMPIStatus textNotUtf8(const Trap* trap)
+{
+    return setText(trap, "T1", "a\xFFz");
+}
+
+static CMPIStatus realNotNormal(const Trap* trap)
+{
+    const CMPIValue part = {.real32 = INFINITY};
+    return trap->instance->ft->setProperty(trap->instance, "Part", &part, CMPI_real32);
+}
+
+static CMPIStatus halfSurrogate(const Trap* trap)
+{
+    const CMPIValue unit = {.char16 = 0xD801};
+    return trap->instance->ft->setProperty(trap->instance, "Unit", &unit, CMPI_char16);
+}
+
+/* The caller leaves returnDone out. */
+static CMPIStatus noReturnDone(const Trap* trap)
+{
+    (void)trap;
+    const CMPIStatus ok = {CMPI_RC_OK, NULL};
+    return ok;
+}
+
+static CMPIThreadReturn visit(void* parameter)
+{
+    static CMPIStatus status;
+    const Trap* trap = parameter;
+    trap->mb->bft->enumerateInstanceNames(trap->mb, trap->context, trap->path, &status);
+    status.msg = NULL; /* ends with the thread */
+    return &status;
+}
+
+static CMPIStatus noAttach(const Trap* trap)
+{
+    CMPIThreadReturn returned = NULL;
+    Trap copy = *trap;
+    trap->mb->xft->joinThread(trap->mb->xft->newThread(visit, &copy, 0), &returned);
+    return *(CMPIStatus*)returned;
+}
+
+static const struct
+{
+    const char* kind;
+    CMPIStatus (*spring)(const Trap* trap);
+} kTraps[] = {
+    {"chars in string array", charsInStringArray},
+    {"string in chars array", stringInCharsArray},
+    {"element released early", elementReleasedEarly},
+    {"null element", nullElement},
+    {"null datetime element", nullDateTimeElement},
+    {"untyped null", untypedNull},
+    {"key of other type", keyOfOtherType},
+    {"null key", nullKey},
+    {"embedded as text", embeddedAsText},
+    {"text not UTF-8", textNotUtf8},
+    {"real not normal", realNotNormal},
+    {"half surrogate", halfSurrogate},
+    {"no returnDone", noReturnDone},
+    {"no attach", noAttach},
+};
+
+CMPIStatus doTrap(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* path, const char* kind)
+{
+    const char* nameSpace = (const char*)path->ft->getNameSpace(path, NULL)->hdl;
+    Trap trap = {broker, context, path, broker->eft->newObjectPath(broker, nameSpace, "Probe_Trap", NULL), NULL};
+    trap.instance = broker->eft->newInstance(broker, trap.own, NULL);
+    for (size_t i = 0; i < sizeof kTraps / sizeof kTraps[0]; ++i) {
+        if (strcmp(kTraps[i].kind, kind) == 0) {
+            return kTraps[i].spring(&trap);
+        }
+    }
+    const CMPIStatus unknown = {CMPI_RC_ERR_NOT_FOUND, NULL};
+    return unknown;
+}
