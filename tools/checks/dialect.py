@@ -21,7 +21,7 @@ MAX_FILES_IN_FOLDER = 40
 SMALL_FILE_LINES = 25
 MAX_SMALL_FILES = 30
 LICENCE = "// SPDX-License-Identifier: MIT\n"
-C_HEADERS = ("pegasus/cmpi/include/", "tests/pegasus/cmpi/conformance/")
+C_HEADERS = ("pegasus/cmpi/include/", "providers/conformance/")
 FOREIGN_NAMES = ("pegasus/include/", "pegasus/cmpi/include/")
 # One header for each of the host's interfaces and of OpenPegasus's public classes, however small.
 ONE_A_CLASS = ("include/host/", "pegasus/include/")

@@ -439,11 +439,9 @@ static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, con
     if (strcasecmp(method, "Describe") == 0 || strcasecmp(method, "Undeclared") == 0) {
         return describeArguments(result, in);
     }
-    if (strcasecmp(method, "CountByUpcall") == 0) {
-        return countByUpcall(context, result, path);
-    }
-    if (strcasecmp(method, "ChangeByUpcall") == 0) {
-        return changeByUpcall(context, result, path);
+    if (strcasecmp(method, "CountByUpcall") == 0 || strcasecmp(method, "ChangeByUpcall") == 0) {
+        return strcasecmp(method, "CountByUpcall") == 0 ? countByUpcall(context, result, path)
+                                                        : changeByUpcall(context, result, path);
     }
     if (strcasecmp(method, "Trap") == 0) {
         return trap(context, result, path, in);

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-/* Checks of a broker on its providers' side. Every check is a row: a name and a function. */
+/* Checks of a broker on its providers' side. Every check is a row: a name, a function and its scope. */
 #pragma once
 
 #include <cmpi/cmpi.h>

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 /* Every type of value; the broker reads exactly its bytes. */
-#include "tests/pegasus/cmpi/conformance/Conformance.h"
+#include "providers/conformance/Conformance.h"
 
 #include <float.h>
 #include <limits.h>
@@ -89,7 +89,13 @@ static const char* otherFormsOfText(const Env* env)
     REQUIRE(instance->ft->setProperty(instance, "S", &value, CMPI_string).rc == CMPI_RC_OK);
     value.string->ft->release(value.string);
     REQUIRE(strcmp(textOf(instance->ft->getProperty(instance, "S", NULL).value.string), "object") == 0);
-    /* invalid UTF-8 bytes are replaced; the rest of the text stays */
+    return NULL;
+}
+
+/* Invalid UTF-8 bytes are replaced; the rest of the text stays. */
+static const char* textIsRepaired(const Env* env)
+{
+    const CMPIInstance* instance = newInst(env, "TST_Everything");
     REQUIRE(instance->ft->setProperty(instance, "S", (const CMPIValue*)"a\xFFz", CMPI_chars).rc == CMPI_RC_OK);
     REQUIRE(strcmp(textOf(instance->ft->getProperty(instance, "S", NULL).value.string), "a\xEF\xBF\xBDz") == 0);
     return NULL;
@@ -107,17 +113,26 @@ static const char* nullsAreTyped(const Env* env)
         CMPIType passed;
         CMPIType expected;
     } rows[] = {
-        {"S", NULL, CMPI_chars, CMPI_string},        {"S", NULL, CMPI_string, CMPI_string},
-        {"S", &empty, CMPI_string, CMPI_string},     {"S", &empty, CMPI_charsptr, CMPI_string},
-        {"S", NULL, CMPI_null, CMPI_string},         {"U32", NULL, CMPI_uint32, CMPI_uint32},
-        {"D", &empty, CMPI_dateTime, CMPI_dateTime}, {"U16A", &empty, CMPI_uint16A, CMPI_uint16A},
-        {"SA", NULL, CMPI_stringA, CMPI_stringA},
+        {"S", NULL, CMPI_chars, CMPI_string},         {"S", NULL, CMPI_string, CMPI_string},
+        {"S", &empty, CMPI_string, CMPI_string},      {"S", &empty, CMPI_charsptr, CMPI_string},
+        {"U32", NULL, CMPI_uint32, CMPI_uint32},      {"D", &empty, CMPI_dateTime, CMPI_dateTime},
+        {"U16A", &empty, CMPI_uint16A, CMPI_uint16A}, {"SA", NULL, CMPI_stringA, CMPI_stringA},
     };
     for (size_t i = 0; i < sizeof rows / sizeof *rows; ++i) {
         REQUIRE(instance->ft->setProperty(instance, rows[i].property, rows[i].value, rows[i].passed).rc == CMPI_RC_OK);
         const CMPIData data = instance->ft->getProperty(instance, rows[i].property, NULL);
         REQUIRE(data.type == rows[i].expected && data.state == CMPI_nullValue && data.value.uint64 == 0);
     }
+    return NULL;
+}
+
+static const char* untypedNullsAreTaken(const Env* env)
+{
+    const CMPIInstance* instance = newInst(env, "TST_Everything");
+    REQUIRE(instance->ft->setProperty(instance, "S", (const CMPIValue*)"x", CMPI_chars).rc == CMPI_RC_OK);
+    REQUIRE(instance->ft->setProperty(instance, "S", NULL, CMPI_null).rc == CMPI_RC_OK);
+    const CMPIData data = instance->ft->getProperty(instance, "S", NULL);
+    REQUIRE(data.type == CMPI_string && data.state == CMPI_nullValue);
     return NULL;
 }
 
@@ -147,7 +162,9 @@ static const char* objectsComeBack(const Env* env)
 
 const CheckRow kValueChecks[] = {{"scalars come back", scalarsComeBack, kStandard},
                                  {"text is the pointer itself", textIsThePointerItself, kStandard},
-                                 {"other forms of text", otherFormsOfText, kOursOnly},
-                                 {"nulls are typed", nullsAreTyped, kOursOnly},
+                                 {"other forms of text", otherFormsOfText, kStandard},
+                                 {"text is repaired", textIsRepaired, kOursOnly},
+                                 {"nulls are typed", nullsAreTyped, kStandard},
+                                 {"untyped nulls are taken", untypedNullsAreTaken, kOursOnly},
                                  {"objects come back", objectsComeBack, kStandard},
                                  {NULL, NULL, kOursOnly}};

@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: MIT
 /* The tables themselves: versions; every slot has a function. */
-#include "tests/pegasus/cmpi/conformance/Conformance.h"
+#include "providers/conformance/Conformance.h"
 
+#include <stddef.h>
 #include <string.h>
 
 static int hasNoHole(const void* table, size_t from, size_t size)
@@ -24,6 +25,16 @@ static const char* brokerTables(const Env* env)
     REQUIRE(mb->bft->brokerName != NULL && mb->bft->brokerName[0] != '\0');
     REQUIRE(mb->eft->ftVersion >= mb->bft->brokerVersion);
     REQUIRE(mb->xft->ftVersion >= mb->bft->brokerVersion);
+    REQUIRE(hasNoHole(mb->bft, 8, offsetof(CMPIBrokerFT, enumerateInstancesFiltered)));
+    REQUIRE(hasNoHole(mb->eft, 8, offsetof(CMPIBrokerEncFT, newPropertyList)));
+    REQUIRE(hasNoHole(mb->xft, 8, offsetof(CMPIBrokerExtFT, destroyMutex2)));
+    return NULL;
+}
+
+/* Those of CMPI 2.1 too, and the table for memory. */
+static const char* laterSlotsAreFilled(const Env* env)
+{
+    const CMPIBroker* mb = env->mb;
     REQUIRE(hasNoHole(mb->bft, 8, sizeof *mb->bft));
     REQUIRE(hasNoHole(mb->eft, 8, sizeof *mb->eft));
     REQUIRE(hasNoHole(mb->xft, 8, sizeof *mb->xft));
@@ -37,6 +48,26 @@ static const char* brokerTables(const Env* env)
         REQUIRE((object)->ft->ftVersion >= env->mb->bft->brokerVersion);                                               \
         REQUIRE(hasNoHole((object)->ft, 8, sizeof *(object)->ft));                                                     \
     } while (0)
+
+/* The functions that providers of CMPI 2.0 call. */
+static const char* objectTablesOfEveryServer(const Env* env)
+{
+    const CMPIBrokerEncFT* eft = env->mb->eft;
+    const CMPIInstance* instance = newInst(env, "TST_Everything");
+    const CMPIString* string = eft->newString(env->mb, "x", NULL);
+    const CMPIArray* array = eft->newArray(env->mb, 1, CMPI_uint8, NULL);
+    const CMPIDateTime* when = eft->newDateTime(env->mb, NULL);
+    REQUIRE(instance->hdl != NULL && hasNoHole(instance->ft, 8, sizeof *instance->ft));
+    REQUIRE(string->hdl != NULL && hasNoHole(string->ft, 8, offsetof(CMPIStringFT, newCharsCP)));
+    REQUIRE(array->hdl != NULL && hasNoHole(array->ft, 8, sizeof *array->ft));
+    REQUIRE(when->hdl != NULL && hasNoHole(when->ft, 8, sizeof *when->ft));
+    REQUIRE(env->in->hdl != NULL && hasNoHole(env->in->ft, 8, sizeof *env->in->ft));
+    REQUIRE(env->ctx->hdl != NULL && hasNoHole(env->ctx->ft, offsetof(CMPIContextFT, getEntry), sizeof *env->ctx->ft));
+    REQUIRE(env->op->hdl != NULL && hasNoHole(env->op->ft, 8, offsetof(CMPIObjectPathFT, getClassQualifier)));
+    REQUIRE(env->op->ft->toString != NULL);
+    REQUIRE(hasNoHole(env->result->ft, offsetof(CMPIResultFT, returnData), sizeof *env->result->ft));
+    return NULL;
+}
 
 static const char* objectTables(const Env* env)
 {
@@ -80,8 +111,13 @@ static const char* kindsAreNamed(const Env* env)
         REQUIRE(!eft->isOfType(env->mb, rows[i].object, "CMPIBroker", NULL));
         REQUIRE(eft->toString(env->mb, rows[i].object, NULL) != NULL);
     }
+    return NULL;
+}
+
+static const char* nullHasNoKind(const Env* env)
+{
     CMPIStatus rc = kGarbage;
-    REQUIRE(eft->getType(env->mb, NULL, &rc) == NULL && rc.rc == CMPI_RC_ERR_INVALID_HANDLE);
+    REQUIRE(env->mb->eft->getType(env->mb, NULL, &rc) == NULL && rc.rc == CMPI_RC_ERR_INVALID_HANDLE);
     return NULL;
 }
 
@@ -105,8 +141,11 @@ static const char* unsupportedSlotsAnswer(const Env* env)
     return NULL;
 }
 
-const CheckRow kTableChecks[] = {{"broker tables have no hole", brokerTables, kOursOnly},
+const CheckRow kTableChecks[] = {{"broker tables have no hole", brokerTables, kStandard},
+                                 {"later slots are filled", laterSlotsAreFilled, kOursOnly},
+                                 {"objects have the functions of CMPI 2.0", objectTablesOfEveryServer, kStandard},
                                  {"object tables have no hole", objectTables, kOursOnly},
                                  {"kinds of objects are named", kindsAreNamed, kOursOnly},
+                                 {"null has no kind", nullHasNoKind, kOursOnly},
                                  {"unsupported slots answer", unsupportedSlotsAnswer, kOursOnly},
                                  {NULL, NULL, kOursOnly}};
