@@ -51,7 +51,7 @@ set(CMAKE_BUILD_WITH_INSTALL_RPATH OFF)
 # vrxhost and the server refuse a tree that others may write, and everybody may read one, so the modes must not depend on
 # the umask of who stages it. Files get theirs (644, 755) from install(); a folder would be subject to the umask.
 install(CODE [[
-  foreach(folder "" include include/host lib lib/cmake lib/cmake/pegasus-nsp pegasus pegasus/bin pegasus/lib
+  foreach(folder "" include include/cmpi include/host lib lib/cmake lib/cmake/pegasus-nsp pegasus pegasus/bin pegasus/lib
                  pegasus/pegSchema pegasus/pegSchema/PG_InterOp pegasus/pegSchema/PG_Internal
                  pegasus/provider pegasus/provider/linux
                  share share/examples share/examples/fleet share/examples/fleet/bin

@@ -235,6 +235,7 @@ bool ParseOptions(int argc, const char* const* argv, TOptions& options)
     options.fFormatOptions.fColor = IsColorWanted();
     app.footer(kFooter);
     app.allow_extras();
+    app.require_subcommand(0, 1); // what follows a command is its argument, "help get" among them
     app.set_version_flag("--version", std::string("vrxhost ") + VRX_VERSION, "Print the version and exit");
     AddFormatOptions(app, options);
     AddOptions(app, options, settings);

@@ -17,6 +17,7 @@ constexpr char kServerKey[] = "server = ";
 constexpr char kEmbedded[] = "embedded";
 constexpr char kInstalled[] = "installed OpenPegasus";
 constexpr char kConsumerKey[] = "consumer = ";
+constexpr char kStateKey[] = "state = ";
 constexpr char kFormatLine[] = "format = 1";
 
 [[noreturn]] void Refuse(const std::string& root, const std::string& reason)
@@ -29,6 +30,7 @@ struct TMark
 {
     EServerKind fKind;
     std::string fConsumer;
+    std::string fState;
 };
 
 TMark ReadMark(const std::string& root)
@@ -40,6 +42,7 @@ TMark ReadMark(const std::string& root)
     bool hasFormat = false;
     std::string server;
     std::string consumer;
+    std::string state;
     for (std::string line; std::getline(mark, line);) {
         if (line == kFormatLine) {
             hasFormat = true;
@@ -47,13 +50,15 @@ TMark ReadMark(const std::string& root)
             server = line.substr(sizeof kServerKey - 1);
         } else if (line.rfind(kConsumerKey, 0) == 0) {
             consumer = line.substr(sizeof kConsumerKey - 1);
+        } else if (line.rfind(kStateKey, 0) == 0) {
+            state = line.substr(sizeof kStateKey - 1);
         }
     }
     const bool isKnown = server == kEmbedded || (server == kInstalled && !consumer.empty());
     if (!hasFormat || !isKnown) {
         Refuse(root, std::string("this program does not know the kind of tree that ") + kMark + " names");
     }
-    return {server == kEmbedded ? EServerKind::kEmbedded : EServerKind::kInstalled, consumer};
+    return {server == kEmbedded ? EServerKind::kEmbedded : EServerKind::kInstalled, consumer, state};
 }
 
 // FNV-1a: the same in every build, because a later one must find the server that an earlier one left running.
@@ -83,6 +88,7 @@ TDeployedTree::TDeployedTree(const std::string& root) : fRoot(Resolved(root))
     const TMark mark = ReadMark(fRoot);
     fKind = mark.fKind;
     fBuiltConsumer = mark.fConsumer;
+    fState = mark.fState;
     std::error_code ignored;
     if (!fs::is_regular_file(fs::path(fRoot) / "pegasus/bin/cimserver", ignored)) {
         Refuse(fRoot, "it has no program pegasus/bin/cimserver");

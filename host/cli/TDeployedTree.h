@@ -31,6 +31,9 @@ class TDeployedTree
 
     const std::string& GetRoot() const { return fRoot; } // absolute, links resolved
     std::string GetId() const;                           // made of the root: letters and digits
+    // Returns: where a run writes when it may write there, as the mark of an installed package says, whose own folders
+    // are read-only; empty for the tree itself.
+    const std::string& GetState() const { return fState; }
 
     // Returns: the consumer that keeps this tree's server apart from other trees': the wanted one or, when that is
     // empty, one made of the root's path. An installed OpenPegasus was built for one consumer, which the mark names.
@@ -43,6 +46,7 @@ class TDeployedTree
     std::string fRoot;
     EServerKind fKind;
     std::string fBuiltConsumer; // of an installed OpenPegasus
+    std::string fState;
 };
 
 } // namespace vrxhost

@@ -54,6 +54,9 @@ std::vector<fs::path> DefaultDirectories(const TDeployedTree& tree)
         const fs::path parent = state.is_absolute() ? state : home / ".local/state";
         directories.insert(directories.begin(), parent / "vrxhost" / tree.GetId());
     }
+    if (!tree.GetState().empty()) {
+        directories.insert(directories.begin(), tree.GetState());
+    }
     return directories;
 }
 
@@ -143,7 +146,7 @@ void CopyPlannedConfiguration(const fs::path& from, const fs::path& to)
 TPrivateRoot::TPrivateRoot(const TDeployedTree& tree, const std::string& directory)
     : fTree(tree.GetRoot()), fPath(fTree)
 {
-    if (directory.empty() && MayWrite(fTree) && MayWrite(fTree + "/pegasus")) {
+    if (directory.empty() && tree.GetState().empty() && MayWrite(fTree) && MayWrite(fTree + "/pegasus")) {
         return;
     }
     std::string tried;

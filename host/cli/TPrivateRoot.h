@@ -13,7 +13,8 @@ namespace vrxhost {
 class TPrivateRoot
 {
   public:
-    // directory: the user's choice; when it is empty, a tree that can be written is its own root.
+    // directory: the user's choice; when it is empty, a tree that can be written is its own root, unless its mark
+    // names a place for what runs write.
     // Throws: TTreeError when there is no place to write in.
     TPrivateRoot(const TDeployedTree& tree, const std::string& directory);
 

@@ -84,6 +84,17 @@ TEST_F(PrivateRoot, IsNeverAFolderOfSomethingElse)
     EXPECT_TRUE(Snapshot(fFolder) == before);
 }
 
+// An installed package's tree is read-only for root too.
+TEST_F(PrivateRoot, IsWhereTheTreesMarkSaysWhenThatCanBeWritten)
+{
+    const fs::path state = fFolder / "var";
+    std::ofstream(fRoot / "pegasus/tree.conf", std::ios::app) << "state = " << state.string() << "\n";
+    const auto before = Snapshot(fRoot);
+    ASSERT_TRUE(HasStatus(Start({VRXHOST, "--root", fRoot, "instances", "Fake_Many"}), 0));
+    EXPECT_TRUE(fs::exists(state / "vrxhost.log"));
+    EXPECT_TRUE(Snapshot(fRoot) == before);
+}
+
 TEST_F(PrivateRoot, PlaceThatCannotBeUsedIsOneSentence)
 {
     const auto outcome = Start({VRXHOST, "--root", fRoot, "--state", "/proc/none", "providers"});

@@ -249,6 +249,7 @@ TEST_F(VrxhostProgram, UsageErrorIsOneSentenceAndADocument)
         ASSERT_TRUE(json.is_object());
         EXPECT_EQ(json["losses"].size(), 1u);
     }
+    EXPECT_THAT(Run({"help", "instances"}).fOutput, HasSubstr("--where"));
     for (const auto& arguments : std::vector<std::vector<std::string>>{{"--help"}, {"inventory", "--help"}}) {
         const auto help = Run(arguments);
         EXPECT_TRUE(HasStatus(help, 0));
