@@ -234,7 +234,7 @@ class Interrupted(unittest.TestCase):
         tree = Tree(BUILD)
         try:
             if hangs:
-                tree.lay_lamps("returnLamps(results, of, 0)", "(pause(), status(CMPI_RC_OK))")
+                tree.lay_lamps("returnLamp(results, of, &lamps[i])", "pause()")
             process = tree.start("inventory", "--format", "json")
             try:
                 process.wait(seconds)

@@ -151,6 +151,39 @@ TEST_F(AgentTest, enumeratesNamesGetsAndInvokes)
     EXPECT_EQ(errorOf([&] { countOf("Nope"); }), "CIM_ERR_INVALID_CLASS: Nope");
 }
 
+// The macros of <cmpi/cmpimacs.h> make entry points and tables that work, from C and from C++.
+TEST_F(AgentTest, theExampleVendorServesInstancesAndItsMethod)
+{
+    const CIMNamespaceName nameSpace("root/cimv2");
+    for (const char* library : {LAMPS_C, LAMPS_CPP}) {
+        SCOPED_TRACE(library);
+        ServerTree tree;
+        tree.start();
+        tree.compileBase();
+        ASSERT_EQ(tree.run("cimconfig", {"-s", std::string("providerDir=") + LAMPS_DIRECTORY + ":"}).exitStatus, 0);
+        tree.compile("root/cimv2", LAMPS_SOURCES "/lamps.properties.mof");
+        std::ifstream file(LAMPS_SOURCES "/lamps.registration.mof");
+        std::string registration{std::istreambuf_iterator<char>(file), {}};
+        registration.replace(registration.find("\"lamps\""), 7, '"' + std::string(library) + '"');
+        std::ofstream(tree.home() + "/registration.mof") << registration;
+        tree.compile("root/PG_InterOp", tree.home() + "/registration.mof");
+        CIMClient client;
+        client.connect("127.0.0.1", tree.port(), String(), String());
+        EXPECT_EQ(client.enumerateInstanceNames(nameSpace, "LAMP_Lamp").size(), 2u);
+        const CIMObjectPath disk("LAMP_Lamp.Name=\"disk\"");
+        Array<CIMParamValue> in;
+        Array<CIMParamValue> out;
+        in.append(CIMParamValue("Frequency", CIMValue(Uint32(9))));
+        EXPECT_EQ(client.invokeMethod(nameSpace, disk, "Blink", in, out).toString(), String("0"));
+        ASSERT_EQ(out.size(), 1u);
+        EXPECT_EQ(out[0].getValue().toString(), String("5"));
+        const CIMInstance lamp = client.getInstance(nameSpace, disk, false);
+        EXPECT_EQ(lamp.getProperty(lamp.findProperty("Frequency")).getValue().toString(), String("9"));
+        EXPECT_EQ(errorOf([&] { client.getInstance(nameSpace, CIMObjectPath("LAMP_Lamp.Name=\"x\"")); }),
+                  "CIM_ERR_NOT_FOUND: there is no such lamp");
+    }
+}
+
 TEST_F(AgentTest, changesReachTheProviderThatHasThem)
 {
     start();

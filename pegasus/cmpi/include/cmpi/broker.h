@@ -6,20 +6,13 @@
  */
 #pragma once
 
+#include "cmpios.h"
 #include "objects.h"
 
 #ifdef __cplusplus
 extern "C" {
 #endif
 
-typedef void* CMPIThread;
-typedef void* CMPIThreadReturn;
-typedef unsigned int CMPIThreadKey;
-typedef void* CMPIMutex;
-typedef void* CMPICondition;
-typedef CMPIThreadReturn (*CMPIThreadFunc)(void* parm);
-typedef void (*CMPIThreadOnceFunc)(void);
-typedef void (*CMPIThreadKeyCleanupFunc)(void* value);
 struct timespec;
 
 struct CMPIBroker

@@ -1,8 +1,7 @@
 // SPDX-License-Identifier: MIT
-/* Everything that the source of a CMPI provider needs. */
+/* Everything that the source of a CMPI provider needs but the macros of cmpimacs.h. */
 #pragma once
 
-#include "broker.h"
-#include "objects.h"
-#include "provider.h"
-#include "types.h"
+#include "cmpidt.h"
+#include "cmpift.h"
+#include "cmpios.h"

@@ -90,6 +90,20 @@ typedef void CMPIGcStat;
 #define CMPI_dateTimeA (CMPI_ARRAY | CMPI_dateTime)
 #define CMPI_charsptrA (CMPI_ARRAY | CMPI_charsptr)
 
+/* Older names of the same codes. */
+#define CMPI_Byte CMPI_sint8
+#define CMPI_Short CMPI_sint16
+#define CMPI_Int CMPI_sint32
+#define CMPI_Long CMPI_sint64
+#define CMPI_Float CMPI_real32
+#define CMPI_Double CMPI_real64
+#define CMPI_ByteA CMPI_sint8A
+#define CMPI_ShortA CMPI_sint16A
+#define CMPI_IntA CMPI_sint32A
+#define CMPI_LongA CMPI_sint64A
+#define CMPI_FloatA CMPI_real32A
+#define CMPI_DoubleA CMPI_real64A
+
 /* The four forms in which a key is handed back. */
 #define CMPI_keyInteger CMPI_sint64
 #define CMPI_keyString CMPI_string
