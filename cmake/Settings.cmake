@@ -54,7 +54,7 @@ install(CODE [[
   foreach(folder "" include include/cmpi include/host lib lib/cmake lib/cmake/pegasus-nsp pegasus pegasus/bin pegasus/lib
                  pegasus/pegSchema pegasus/pegSchema/PG_InterOp pegasus/pegSchema/PG_Internal
                  pegasus/provider pegasus/provider/linux
-                 share share/examples share/examples/fleet share/examples/fleet/bin
+                 share share/examples share/examples/conformance share/examples/example-vendor share/examples/fleet share/examples/fleet/bin
                  share/examples/fleet/postgresql share/examples/fleet/rsyslog share/examples/fleet/systemd)
     set(path "$ENV{DESTDIR}${CMAKE_INSTALL_PREFIX}/${folder}")
     if(NOT EXISTS "${path}" OR folder MATCHES "^pegasus")

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 /* Arrays and arguments. */
-#include "providers/conformance/Conformance.h"
+#include "Conformance.h"
 
 #include <string.h>
 

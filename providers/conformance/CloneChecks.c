@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 /* Clones and releases. */
-#include "providers/conformance/Conformance.h"
+#include "Conformance.h"
 
 #include <malloc.h>
 #include <pthread.h>

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 /* Instances: their properties, and how path and properties meet. */
-#include "providers/conformance/Conformance.h"
+#include "Conformance.h"
 
 #include <string.h>
 

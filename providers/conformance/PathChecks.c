@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 /* Object paths. */
-#include "providers/conformance/Conformance.h"
+#include "Conformance.h"
 
 #include <string.h>
 

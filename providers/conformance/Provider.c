@@ -3,7 +3,7 @@
   The provider that the broker's tests drive: TST_Check has methods that run the checks, TST_Item has instances that are
   returned in as many ways as providers do it, right and wrong.
 */
-#include "providers/conformance/Conformance.h"
+#include "Conformance.h"
 
 #include <stdatomic.h>
 #include <stdio.h>

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 /* Strings, datetimes and messages. */
-#include "providers/conformance/Conformance.h"
+#include "Conformance.h"
 
 #include <stdlib.h>
 #include <string.h>

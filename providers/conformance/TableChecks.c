@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 /* The tables themselves: versions; every slot has a function. */
-#include "providers/conformance/Conformance.h"
+#include "Conformance.h"
 
 #include <stddef.h>
 #include <string.h>

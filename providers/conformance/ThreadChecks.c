@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 /* Threads, locks and keys of the broker, and the provider's own threads. */
-#include "providers/conformance/Conformance.h"
+#include "Conformance.h"
 
 #include <errno.h>
 #include <stdlib.h>

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 /* The context, and upcalls made with it. The server answers upcalls by this provider itself. */
-#include "providers/conformance/Conformance.h"
+#include "Conformance.h"
 
 #include <string.h>
 

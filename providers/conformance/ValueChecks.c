@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 /* Every type of value; the broker reads exactly its bytes. */
-#include "providers/conformance/Conformance.h"
+#include "Conformance.h"
 
 #include <float.h>
 #include <limits.h>
