@@ -120,6 +120,16 @@ class Call
     ResultObject& fResult;
 };
 
+// The list that a provider gets when the client gave none.
+CIMPropertyList propertiesOf(const CIMInstance& instance)
+{
+    Array<CIMName> names;
+    for (Uint32 i = 0; i < instance.getPropertyCount(); ++i) {
+        names.append(instance.getProperty(i).getName());
+    }
+    return {names};
+}
+
 CIMObjectPath classPath(const CIMName& className)
 {
     return {String::EMPTY, CIMNamespaceName(), className};
@@ -213,7 +223,7 @@ CIMObjectPath ProviderModule::createInstance(const ProviderRequest& request, con
 void ProviderModule::modifyInstance(const ProviderRequest& request, const CIMInstance& modified,
                                     const CIMPropertyList& properties)
 {
-    PropertyFilter filter(properties);
+    PropertyFilter filter(properties.isNull() ? propertiesOf(modified) : properties);
     ResultObject result(filter, nullptr, nullptr, nullptr);
     const Call call(fImpl->broker, fImpl->interfaces, request, modified.getPath(), result);
     InstanceObject argument(fImpl->broker, modified, request.nameSpace);

@@ -59,7 +59,7 @@ class ProviderModule
     // Returns: the path that the provider returns.
     // Throws: CIM_ERR_FAILED also when it returns none.
     CIMObjectPath createInstance(const ProviderRequest& request, const CIMInstance& instance);
-    // `modified` has its path; a null list stands for all properties that it has.
+    // `modified` has its path. A null list stands for all properties that it has: the provider gets their names.
     void modifyInstance(const ProviderRequest& request, const CIMInstance& modified, const CIMPropertyList& properties);
     void deleteInstance(const ProviderRequest& request, const CIMObjectPath& path);
 
