@@ -170,7 +170,7 @@ void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
     std::string refused;
     const std::string error = ErrorOf([&] {
         TCollector collector(ns, fLosses, [this] { return fStop.IsStopped(); });
-        collector.SetSink(fReport.BeginStream());
+        collector.SetSink(fReport.BeginStream(), fOptions.fCommand->NeedsInstances());
         try {
             fOptions.fCommand->Fill(collector, document);
         } catch (const TRequestError& e) {

@@ -79,16 +79,18 @@ NKOLVRX20::TUniqueFd EnterRoot(const std::string& root)
     return directory;
 }
 
-// Before there is a run: the reason, and for a program that reads JSON a document with an empty list of providers.
+// Before there is a run: the reason, and in the formats that have room for it a document with an empty list of
+// providers.
 EExitStatus Refuse(const TOptions& options, const std::string& reason, EExitStatus status)
 {
     ReportError(reason);
-    if (options.fFormat == "json" || options.fFormat == "ndjson") {
+    if (options.fFormat == "json" || options.fFormat == "ndjson" || options.fFormat == "html") {
         TDocument document;
         document.fHead = MakeHead(options.fCommandName);
         document.fComplete = false;
         document.fLosses.push_back(LossOf(reason));
-        const auto format = MakeFormat(options.fFormat, options.fFormatOptions, nullptr);
+        const auto write = [](const std::string& text) { std::cout << text; };
+        const auto format = MakeFormat(options.fFormat, options.fFormatOptions, write);
         format->BeginStream(document.fHead);
         std::cout << format->Finish(document) << std::flush;
     }

@@ -144,7 +144,8 @@ void TCollector::ReadInstances(ICIMClass& each, TClassRecord& record, const TFil
                 }
                 if (fSink) {
                     fSink->Add(record, found);
-                } else {
+                }
+                if (fKeeps) {
                     record.fInstances.push_back(std::move(found));
                 }
             });

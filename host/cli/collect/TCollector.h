@@ -21,8 +21,12 @@ class TCollector
     // isStopped: asked between elements; once true, collecting ends early. The references outlive the object.
     TCollector(NKOLVRX20::ICIMNamespace& ns, TLossLog& losses, std::function<bool()> isStopped);
 
-    // sink: takes the instances; null for the records.
-    void SetSink(IInstanceSink* sink) { fSink = sink; }
+    // sink: takes the instances; null for none. keeps: whether the records get them too; without a sink they do.
+    void SetSink(IInstanceSink* sink, bool keeps)
+    {
+        fSink = sink;
+        fKeeps = keeps || !sink;
+    }
 
     std::vector<TProviderRecord> ReadProviders(EDetail detail);
 
@@ -49,6 +53,7 @@ class TCollector
     TLossLog& fLosses;
     std::function<bool()> fIsStopped;
     IInstanceSink* fSink = nullptr;
+    bool fKeeps = true;
     std::string fProviderName; // of the class being read
 };
 

@@ -27,6 +27,9 @@ class ICommand
     // Declares the command's own arguments and options, which are read into this object.
     virtual void AddArguments(CLI::App& command);
 
+    // Returns: whether Fill looks at the instances itself; they are kept for it then, whatever takes them besides.
+    virtual bool NeedsInstances() const { return false; }
+
     // Collects what the command shows.
     // Throws: TRequestError for something that does not exist; nothing is shown then.
     // Blocks: as long as the vendors.

@@ -130,6 +130,7 @@ class TSummaryCommand : public ICommand
   public:
     const char* GetName() const override { return "summary"; }
     const char* GetPurpose() const override { return "Show this machine in about twenty lines"; }
+    bool NeedsInstances() const override { return true; }
     void Fill(TCollector& from, TDocument& into) const override
     {
         const THostFacts host = ReadHostFacts();

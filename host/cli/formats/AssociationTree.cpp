@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: MIT
+#include "host/cli/formats/AssociationTree.h"
+
 #include "host/cli/formats/ValueText.h"
 
 #include <algorithm>
@@ -7,6 +9,8 @@
 
 namespace vrxhost {
 namespace {
+
+constexpr int kMaxDepth = 64; // a vendor's chain of links must not exhaust the stack
 
 bool IsUpperEnd(const std::string& name)
 {
@@ -42,33 +46,30 @@ class TTree
         fBelow.insert(below);
     }
 
-    std::string Text(const std::string& indent) const
+    std::vector<TLinkedObject> Objects() const
     {
-        std::string text;
+        std::vector<TLinkedObject> objects;
         std::set<std::string> shown;
         for (const std::string& root : fOrder) {
             if (fBelow.count(root) == 0) {
-                text += indent + PathLabel(root) + "\n" + Branches(root, indent, shown);
+                objects.push_back(Object(root, 0, shown));
             }
         }
-        return text;
+        return objects;
     }
 
   private:
     // shown: the objects whose branches have been shown, which keeps circles finite.
-    std::string Branches(const std::string& above, const std::string& indent, std::set<std::string>& shown) const
+    TLinkedObject Object(const std::string& path, int depth, std::set<std::string>& shown) const
     {
-        const auto children = fChildren.find(above);
-        std::string text;
-        if (children == fChildren.end() || !shown.insert(above).second) {
-            return text;
+        TLinkedObject object{path, {}};
+        const auto children = fChildren.find(path);
+        if (children != fChildren.end() && depth < kMaxDepth && shown.insert(path).second) {
+            for (const std::string& child : children->second) {
+                object.fParts.push_back(Object(child, depth + 1, shown));
+            }
         }
-        for (const std::string& child : children->second) {
-            const bool isLast = &child == &children->second.back();
-            text += indent + (isLast ? "`-- " : "|-- ") + PathLabel(child) + "\n" +
-                    Branches(child, indent + (isLast ? "    " : "|   "), shown);
-        }
-        return text;
+        return object;
     }
 
     std::vector<std::string> fOrder;
@@ -76,9 +77,20 @@ class TTree
     std::set<std::string> fBelow;
 };
 
+std::string Branches(const std::vector<TLinkedObject>& parts, const std::string& indent)
+{
+    std::string text;
+    for (const TLinkedObject& part : parts) {
+        const bool isLast = &part == &parts.back();
+        text += indent + (isLast ? "`-- " : "|-- ") + PathLabel(part.fPath) + "\n" +
+                Branches(part.fParts, indent + (isLast ? "    " : "|   "));
+    }
+    return text;
+}
+
 } // namespace
 
-std::string AssociationTree(const std::vector<const TClassRecord*>& associations, const std::string& indent)
+std::vector<TLinkedObject> LinkedObjects(const std::vector<const TClassRecord*>& associations)
 {
     TTree tree;
     for (const TClassRecord* association : associations) {
@@ -86,7 +98,16 @@ std::string AssociationTree(const std::vector<const TClassRecord*>& associations
             tree.Add(link, *association);
         }
     }
-    return tree.Text(indent);
+    return tree.Objects();
+}
+
+std::string AssociationTree(const std::vector<const TClassRecord*>& associations, const std::string& indent)
+{
+    std::string text;
+    for (const TLinkedObject& object : LinkedObjects(associations)) {
+        text += indent + PathLabel(object.fPath) + "\n" + Branches(object.fParts, indent);
+    }
+    return text;
 }
 
 } // namespace vrxhost

@@ -42,6 +42,7 @@ std::unique_ptr<IFormat> MakeTreeFormat(const TFormatOptions& options);
 std::unique_ptr<IFormat> MakeJsonFormat(const TFormatOptions& options);
 std::unique_ptr<IFormat> MakeNdjsonFormat(const TFormatOptions& options, TDocumentWriter write);
 std::unique_ptr<IFormat> MakeCsvFormat(const TFormatOptions& options, TDocumentWriter write);
+std::unique_ptr<IFormat> MakeHtmlFormat(const TFormatOptions& options, TDocumentWriter write);
 
 // Returns: the names of the formats, for the command line.
 std::vector<std::string> FormatNames();

@@ -171,7 +171,7 @@ std::unique_ptr<IFormat> MakeCsvFormat(const TFormatOptions& options, TDocumentW
 
 std::vector<std::string> FormatNames()
 {
-    return {"table", "tree", "json", "ndjson", "csv"};
+    return {"table", "tree", "json", "ndjson", "csv", "html"};
 }
 
 std::unique_ptr<IFormat> MakeFormat(const std::string& name, const TFormatOptions& options, TDocumentWriter write)
@@ -184,6 +184,9 @@ std::unique_ptr<IFormat> MakeFormat(const std::string& name, const TFormatOption
     }
     if (name == "ndjson") {
         return MakeNdjsonFormat(options, std::move(write));
+    }
+    if (name == "html") {
+        return MakeHtmlFormat(options, std::move(write));
     }
     return name == "csv" ? MakeCsvFormat(options, std::move(write)) : MakeTableFormat(options);
 }

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 // Text for people.
+#include "host/cli/formats/AssociationTree.h"
 #include "host/cli/formats/TextLayout.h"
 #include "host/cli/formats/ValueText.h"
 
@@ -82,19 +83,6 @@ std::string ClassTree(const std::vector<TProviderRecord>& providers)
         above = names;
     }
     return text;
-}
-
-// "2 Unknown, 3 Other": a text for each value.
-std::string ValueList(const TPropertyDeclRecord& property)
-{
-    std::string list;
-    for (std::size_t i = 0; i < property.fValues.size(); ++i) {
-        const std::string value = property.fValueMap.empty()      ? std::to_string(i)
-                                  : i < property.fValueMap.size() ? property.fValueMap[i]
-                                                                  : "";
-        list += (list.empty() ? "" : ", ") + value + (value.empty() ? "" : " ") + property.fValues[i];
-    }
-    return list;
 }
 
 std::string LossLines(const std::vector<TLoss>& losses, std::size_t width)
@@ -196,23 +184,9 @@ std::string TTableFormat::InstanceLines(const TClassRecord& each, const TInstanc
     return LabelledLines(rows, indent, fOptions.fWidth);
 }
 
-// The first column is the one that tells instances apart: a key that is shown, where there is one.
 std::string TTableFormat::InstanceTable(const TClassRecord& each, const std::string& indent) const
 {
-    std::vector<std::string> headings;
-    for (const auto& instance : each.fInstances) {
-        for (const auto& property : instance.fProperties) {
-            if (IsShown(each, property, fOptions) &&
-                std::find(headings.begin(), headings.end(), property.fName) == headings.end())
-            {
-                headings.push_back(property.fName);
-            }
-        }
-    }
-    std::stable_partition(headings.begin(), headings.end(), [&each](const std::string& name) {
-        const TPropertyDeclRecord* const declaration = each.Find(name);
-        return declaration && declaration->fIsKey;
-    });
+    const std::vector<std::string> headings = ShownColumns(each, fOptions);
     std::vector<std::vector<std::string>> rows;
     for (const auto& instance : each.fInstances) {
         std::vector<std::string> row;

@@ -4,7 +4,7 @@
 #include "display/PlainText.h"
 #include "host/cli/formats/TextLayout.h"
 
-#include <strings.h>
+#include <algorithm>
 
 namespace vrxhost {
 namespace {
@@ -43,6 +43,11 @@ bool IsNumeric(const TCIMValue& value)
 std::string PlainNumber(const TCIMValue& number, const std::string& unit)
 {
     return number.ToString(kDecimal) + (unit.empty() ? "" : " " + unit);
+}
+
+std::string UnitOf(const TPropertyDeclRecord* declaration)
+{
+    return !declaration ? "" : declaration->fUnits.empty() ? declaration->fPUnit : declaration->fUnits;
 }
 
 struct TKeyText
@@ -85,9 +90,7 @@ std::string ValueText(const TPropertyRecord& property, const TPropertyDeclRecord
     if (options.fRaw || property.fText.empty()) {
         return Printable(property.fText);
     }
-    const std::string unit = !declaration                  ? ""
-                             : declaration->fUnits.empty() ? declaration->fPUnit
-                                                           : declaration->fUnits;
+    const std::string unit = UnitOf(declaration);
     const TCIMValue& value = property.fValue;
     if (!value.IsArray()) {
         return Printable(IsNumeric(value) && property.fText == PlainNumber(value, unit) ? NumberText(value, unit)
@@ -105,6 +108,14 @@ std::string ValueText(const TPropertyRecord& property, const TPropertyDeclRecord
     return Printable(plain == property.fText ? joined : property.fText);
 }
 
+std::string ShownNumber(const TPropertyRecord& property, const TPropertyDeclRecord* declaration)
+{
+    const TCIMValue& value = property.fValue;
+    const bool isShown =
+        !value.IsArray() && IsNumeric(value) && property.fText == PlainNumber(value, UnitOf(declaration));
+    return isShown ? value.ToString(kDecimal) : "";
+}
+
 bool IsKept(const TClassRecord& each, const TPropertyRecord& property, const TFormatOptions& options)
 {
     const TPropertyDeclRecord* const declaration = each.Find(property.fName);
@@ -116,6 +127,37 @@ bool IsShown(const TClassRecord& each, const TPropertyRecord& property, const TF
     const TPropertyDeclRecord* const declaration = each.Find(property.fName);
     const bool isRepeated = declaration && declaration->fIsKey && RepeatsName(property.fName);
     return !property.fValue.IsNull() && (options.fAll || !isRepeated) && IsKept(each, property, options);
+}
+
+std::vector<std::string> ShownColumns(const TClassRecord& each, const TFormatOptions& options)
+{
+    std::vector<std::string> names;
+    for (const TInstanceRecord& instance : each.fInstances) {
+        for (const TPropertyRecord& property : instance.fProperties) {
+            if (IsShown(each, property, options) &&
+                std::find(names.begin(), names.end(), property.fName) == names.end())
+            {
+                names.push_back(property.fName);
+            }
+        }
+    }
+    std::stable_partition(names.begin(), names.end(), [&each](const std::string& name) {
+        const TPropertyDeclRecord* const declaration = each.Find(name);
+        return declaration && declaration->fIsKey;
+    });
+    return names;
+}
+
+std::string ValueList(const TPropertyDeclRecord& property)
+{
+    std::string list;
+    for (std::size_t i = 0; i < property.fValues.size(); ++i) {
+        const std::string value = property.fValueMap.empty()      ? std::to_string(i)
+                                  : i < property.fValueMap.size() ? property.fValueMap[i]
+                                                                  : "";
+        list += (list.empty() ? "" : ", ") + value + (value.empty() ? "" : " ") + property.fValues[i];
+    }
+    return list;
 }
 
 std::string LocalPath(const std::string& path)

@@ -24,9 +24,15 @@ std::string PathLabel(const std::string& path);
 // Returns: the path as an instance of the same object has it, without host and namespace.
 std::string LocalPath(const std::string& path);
 
-// Returns: the objects that the associations of the classes link, each below the object that it is a part of or depends
-// on: the end whose name begins with "Group", "Ante" or "Parent" is above the other, else the first end. An object that
-// is below several is shown below each, with its own branches once. indent goes before each line.
-std::string AssociationTree(const std::vector<const TClassRecord*>& associations, const std::string& indent);
+// Returns: the names of the properties that at least one of the class's instances shows, keys first, since they tell
+// instances apart.
+std::vector<std::string> ShownColumns(const TClassRecord& each, const TFormatOptions& options);
+
+// Returns: what the class says about the values of a property, "2 Unknown, 3 Other"; empty when it says nothing.
+std::string ValueList(const TPropertyDeclRecord& property);
+
+// Returns: the number whose text people see, as it was delivered; empty for null, an array, whatever is not a number,
+// and a number that has a name.
+std::string ShownNumber(const TPropertyRecord& property, const TPropertyDeclRecord* declaration);
 
 } // namespace vrxhost

@@ -94,16 +94,18 @@ boost::shared_ptr<TFakeClass> EveryTypeClass(const boost::shared_ptr<ICIMNamespa
     return each;
 }
 
-// As many instances as the setting "count" says; each with a text that fills pipes quickly.
+// As many instances as the setting "fake.count" says; each with the text of "fake.text", or one that fills pipes
+// quickly.
 boost::shared_ptr<TFakeClass> ManyClass()
 {
     const auto many = boost::make_shared<TFakeClass>("Fake_Many");
     many->Declare("Number", TType::kSint32);
     const int count = std::atoi(TConfig::GetInstance()->getValue("fake.count").c_str());
+    const std::string text = TConfig::GetInstance()->getValue("fake.text");
     for (int i = 0; i < count; ++i) {
         const auto instance = boost::make_shared<TInmemInstance>(many, TCIMContext());
         Put(*instance, "Number", i);
-        Put(*instance, "Text", std::string(100, 'x'));
+        Put(*instance, "Text", text.empty() ? std::string(100, 'x') : text);
         many->AddInstance(instance);
     }
     return many;

@@ -1,0 +1,161 @@
+// SPDX-License-Identifier: MIT
+// Forms of the document, made of records and of what a class delivers.
+#include "host/cli/collect/TCollector.h"
+#include "host/cli/formats/HtmlText.h"
+#include "host/cli/formats/IFormat.h"
+#include "host/inmem/TInmemNamespace.h"
+#include "tests/host/support/FakeModel.h"
+
+#include <host/TInmemInstance.h>
+
+#include <gmock/gmock.h>
+
+#include <algorithm>
+
+#include <malloc.h>
+
+namespace vrxhost {
+namespace {
+
+using namespace NKOLVRX20;
+using testing::HasSubstr;
+
+TEST(HtmlText, LeavesNoMarkupAndNothingHidden)
+{
+    const std::vector<std::pair<std::string, std::string>> rows = {
+        {"eth0 \xc3\xa9 \xe2\x82\xac \xf0\x9f\x92\xbe \xd7\xa9",
+         "eth0 \xc3\xa9 \xe2\x82\xac \xf0\x9f\x92\xbe \xd7\xa9"},
+        {"</script><b a='1' c=\"2\">&lt;", "&lt;/script&gt;&lt;b a=&#39;1&#39; c=&quot;2&quot;&gt;&amp;lt;"},
+        {std::string("\0\x1b[31m\n\t\x7f", 8), "\\x00\\x1b[31m\\n\\t\\x7f"},
+        {"\xe2\x80\xa8\xe2\x80\xae\xe2\x81\xa6\xd8\x9c\xef\xbb\xbf\xc2\x85\xf3\xa0\x81\x81",
+         "\\u{2028}\\u{202e}\\u{2066}\\u{61c}\\u{feff}\\u{85}\\u{e0041}"},
+        {"\xff\xc0\xbc\xed\xa0\x80\xe2\x82",
+         "\\xff\\xc0\\xbc\\xed\\xa0\\x80\\xe2\\x82"}, // overlong "<", surrogate, cut off
+    };
+    for (const auto& [text, html] : rows) {
+        EXPECT_EQ(HtmlText(text), html);
+    }
+    EXPECT_EQ(HtmlAttribute("id", "\" onclick=\""), " id=\"&quot; onclick=&quot;\"");
+}
+
+TPropertyRecord Text(const std::string& name, const std::string& text)
+{
+    return {name, TCIMValue(text), text};
+}
+
+TClassRecord Association(const std::vector<std::pair<std::string, std::string>>& links)
+{
+    TClassRecord association;
+    association.fName = "X_Link";
+    association.fIsAssociation = true;
+    for (const char* end : {"GroupComponent", "PartComponent"}) {
+        TPropertyDeclRecord declaration;
+        declaration.fName = end;
+        declaration.fType = "reference";
+        association.fProperties.push_back(declaration);
+    }
+    for (const auto& [above, below] : links) {
+        association.fInstances.push_back({"", {Text("GroupComponent", above), Text("PartComponent", below)}});
+    }
+    return association;
+}
+
+TEST(HtmlFormat, DevicesAreListsInListsAndLossesNameTheirCause)
+{
+    TDocument document;
+    document.fHead.fHost = {"host<1>", "", "Maker & Co", ""};
+    document.fProviders = {
+        {"p", "libp", "", {Association({{"A.ID=\"1\"", "B.ID=\"2\""}, {"B.ID=\"2\"", "C.ID=\"<i>\""}})}}};
+    TLoss loss = LossOf("class C & D");
+    loss.fVendor = "fan";
+    loss.fFile = "/v/fan/x.classes.xml";
+    loss.fLog = {"<server>"};
+    document.fLosses = {loss};
+    document.fComplete = false;
+    const std::string page = MakeHtmlFormat({}, nullptr)->Finish(document);
+    EXPECT_THAT(
+        page, HasSubstr("<ul id=\"devices\">\n<li>A 1\n<ul>\n<li>B 2\n<ul>\n<li>C &lt;i&gt;</li>\n</ul>\n</li>\n</ul>\n"
+                        "</li>\n</ul>\n"));
+    EXPECT_THAT(page, HasSubstr("<h1>host&lt;1&gt;</h1>"));
+    EXPECT_THAT(page, HasSubstr("<p class=\"partial\">"));
+    EXPECT_THAT(page, HasSubstr("class C &amp; D<br><small>vendor fan, file /v/fan/x.classes.xml</small><br>"
+                                "<code>&lt;server&gt;</code></li>"));
+}
+
+TEST(HtmlFormat, PropertiesThatTheFirstRowsLackHaveAColumn)
+{
+    std::string page;
+    const auto format = MakeHtmlFormat({}, [&page](const std::string& text) { page += text; });
+    IInstanceSink* const sink = format->BeginStream({});
+    TClassRecord each;
+    each.fName = "X_Many";
+    sink->BeginClass("p", each);
+    for (int i = 0; i < 1000; ++i) {
+        sink->Add(each, {"", {Text("Name", "n")}});
+    }
+    sink->Add(each, {"", {Text("Late", "<late>"), Text("Name", "last")}});
+    page += format->Finish({});
+    EXPECT_THAT(page, HasSubstr("<th scope=\"col\">Name</th><th scope=\"col\">Other properties</th>"));
+    EXPECT_THAT(page, HasSubstr("<tr><th scope=\"row\">last</th><td>Late: &lt;late&gt;</td></tr>"));
+}
+
+// Delivers instances that exist no longer than their visit.
+class TPassingClass : public TFakeClass
+{
+  public:
+    static constexpr int kCount = 100000;
+
+    TPassingClass() : TFakeClass("X_Passing")
+    {
+        fEnumerate = [this](TInstanceVisitor visitor) {
+            for (int i = 0; i < kCount; ++i) {
+                const auto instance = boost::make_shared<TInmemInstance>(shared_from_this(), TCIMContext());
+                instance->SetPropertyValue("Number", TCIMValue(i), TCIMContext());
+                instance->SetPropertyValue("Text", TCIMValue(std::string(200, 'x')), TCIMContext());
+                fLast.lock() ? ++fKept : 0;
+                fLast = instance;
+                visitor(instance);
+                Measure(i);
+            }
+        };
+    }
+
+    int fKept = 0; // instances that outlived their visit
+    std::size_t fGrowth = 0;
+
+  private:
+    void Measure(int i)
+    {
+        if (i % 10000 != 9999) {
+            return;
+        }
+        const std::size_t used = ::mallinfo2().uordblks;
+        fGrowth = std::max(fGrowth, used - std::min(used, fUsed));
+        fUsed = fUsed == 0 ? used : fUsed;
+    }
+
+    boost::weak_ptr<ICIMInstance> fLast;
+    std::size_t fUsed = 0; // after the first 10,000, when buffers have their size
+};
+
+// 90,000 instances of 200 bytes and more would take 18 MB at least.
+TEST(StreamedFormats, MemoryDoesNotGrowWithTheNumberOfInstances)
+{
+    constexpr std::size_t kMaxGrowth = 4 * 1024 * 1024;
+    for (const std::string name : {"ndjson", "csv", "html"}) {
+        std::size_t written = 0;
+        const auto format = MakeFormat(name, {}, [&written](const std::string& text) { written += text.size(); });
+        TInmemNamespace ns;
+        TLossLog losses("/");
+        TCollector collector(ns, losses, [] { return false; });
+        collector.SetSink(format->BeginStream({}), false);
+        const auto passing = boost::make_shared<TPassingClass>();
+        EXPECT_EQ(collector.ReadClass(*passing, EDetail::kInstances).fInstanceCount, 100000u);
+        EXPECT_EQ(passing->fKept, 0) << name;
+        EXPECT_LE(passing->fGrowth, kMaxGrowth) << name;
+        EXPECT_GT(written, 20000000u) << name;
+    }
+}
+
+} // namespace
+} // namespace vrxhost
