@@ -19,6 +19,8 @@ namespace {
 
 namespace fs = std::filesystem;
 
+constexpr int kMaxDeadlineSeconds = 24 * 60 * 60;
+
 constexpr char kFooter[] =
     "Everything runs in the root directory, a deployed tree: the program's own folder unless --root names another.\n"
     "Standard output carries the document alone; standard error reports what was lost.\n"
@@ -98,6 +100,10 @@ void AddOptions(CLI::App& app, TOptions& options, std::vector<std::string>& sett
         "A private root, with links to the root's files, for what a run writes (default: the root when it can be "
         "written, else $XDG_STATE_HOME/vrxhost, ~/.local/state/vrxhost or a folder in /tmp)");
     app.add_flag("-v,--verbose", options.fVerbose, "Show the log on standard error too");
+    app.add_flag("-q,--quiet", options.fQuiet, "Show no status line on a terminal");
+    app.add_option("--deadline", options.fDeadlineSeconds,
+                   "Give a provider up after so many seconds, and show what it delivered until then")
+        ->check(CLI::Range(1, kMaxDeadlineSeconds));
 }
 
 constexpr char kHelpCommand[] = "help";

@@ -46,6 +46,8 @@ struct TOptions
     std::string fLogFile;
     std::vector<std::pair<std::string, std::string>> fSettings;
     bool fVerbose = false;
+    bool fQuiet = false;      // without the status line
+    int fDeadlineSeconds = 0; // of each provider; 0 for none
 };
 
 constexpr char kPluginFile[] = "libpegasus.nsp.so";

@@ -38,6 +38,11 @@ TDocumentOutput::~TDocumentOutput()
     ::dup2(fFd.Get(), STDOUT_FILENO);
 }
 
+bool TDocumentOutput::IsTerminal() const
+{
+    return ::isatty(fFd.Get()) == 1;
+}
+
 int TDocumentOutput::Write(const std::string& text, int stopFd)
 {
     using TClock = std::chrono::steady_clock;

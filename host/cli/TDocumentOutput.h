@@ -16,6 +16,8 @@ class TDocumentOutput
     TDocumentOutput();
     ~TDocumentOutput();
 
+    bool IsTerminal() const;
+
     // Writes all of it. Once stopFd is readable, the reader has half a second left to take the rest.
     // Returns: an errno (EPIPE when the reader has gone, ECANCELED when it was too slow after a stop), 0 for success.
     int Write(const std::string& text, int stopFd);

@@ -5,6 +5,8 @@
 #include <climits>
 #include <csignal>
 #include <cstdlib>
+#include <filesystem>
+#include <fstream>
 #include <vector>
 
 #include <fcntl.h>
@@ -92,6 +94,42 @@ void TPrivateServer::End() const
     ::pidfd_send_signal(process.Get(), SIGTERM, nullptr, 0);
     if (!HasExited(process, kOrderlyEndMs)) {
         ::pidfd_send_signal(process.Get(), SIGKILL, nullptr, 0);
+    }
+}
+
+// An agent is called cimprovagt, runs a program of the tree, and has the module among its arguments.
+bool TPrivateServer::IsAgentOf(const std::string& process, const std::set<std::string>& modules) const
+{
+    std::string name;
+    std::getline(std::ifstream(process + "/comm"), name);
+    const std::string program = RealPath(process + "/exe");
+    const std::string programs = RealPath(fRoot + "/pegasus/bin") + "/";
+    const bool isOurs = program == RealPath(fRoot + "/pegasus/bin/cimserver") || program.rfind(programs, 0) == 0;
+    if (name != "cimprovagt" || program.empty() || !isOurs) {
+        return false;
+    }
+    std::ifstream arguments(process + "/cmdline");
+    for (std::string argument; std::getline(arguments, argument, '\0');) {
+        if (modules.count(argument) > 0) {
+            return true;
+        }
+    }
+    return false;
+}
+
+void TPrivateServer::EndAgents(const std::set<std::string>& modules) const
+{
+    std::error_code error;
+    for (const auto& entry : std::filesystem::directory_iterator("/proc", error)) {
+        const std::string name = entry.path().filename();
+        if (name.find_first_not_of("0123456789") != std::string::npos) {
+            continue;
+        }
+        // The descriptor first, as in End.
+        const TUniqueFd process(::pidfd_open(std::atoi(name.c_str()), 0));
+        if (process && IsAgentOf(entry.path(), modules)) {
+            ::pidfd_send_signal(process.Get(), SIGKILL, nullptr, 0);
+        }
     }
 }
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <set>
 #include <string>
 
 namespace vrxhost {
@@ -21,7 +22,14 @@ class TPrivateServer
     // Thread: safe.
     void End() const;
 
+    // Kills the processes of this root's server that hold a provider module's library; the server reports the loss to
+    // whoever waits for an answer, and starts others on demand.
+    // Thread: safe.
+    void EndAgents(const std::set<std::string>& modules) const;
+
   private:
+    bool IsAgentOf(const std::string& process, const std::set<std::string>& modules) const;
+
     std::string fRoot;
     std::string fConsumer;
 };

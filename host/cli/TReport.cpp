@@ -9,8 +9,8 @@
 
 namespace vrxhost {
 
-TReport::TReport(const TOptions& options, const TStopSignals& stop, TLossLog& losses)
-    : fStop(stop), fLosses(losses), fHead(MakeHead(options.fCommandName)),
+TReport::TReport(const TOptions& options, const TStopSignals& stop, TLossLog& losses, TStatusLine& line)
+    : fStop(stop), fLosses(losses), fLine(line), fHead(MakeHead(options.fCommandName)),
       fFormat(MakeFormat(options.fFormat, options.fFormatOptions, [this](const std::string& text) { Write(text); }))
 {
 }
@@ -37,9 +37,18 @@ void TReport::Show(TDocument document)
     Write(fFormat->Finish(document));
 }
 
+int TReport::WriteAll(const std::string& text)
+{
+    if (!fOutput.IsTerminal()) {
+        return fOutput.Write(text, fStop.GetFd());
+    }
+    const TStatusLine::TGap gap(fLine);
+    return fOutput.Write(text, fStop.GetFd());
+}
+
 void TReport::Write(const std::string& text)
 {
-    const int error = fOutput.Write(text, fStop.GetFd());
+    const int error = WriteAll(text);
     if (error == ECANCELED) {
         fInterrupted = true;
     } else if (error != 0) {

@@ -3,6 +3,7 @@
 
 #include "host/cli/Options.h"
 #include "host/cli/TDocumentOutput.h"
+#include "host/cli/TStatusLine.h"
 #include "host/cli/TStopSignals.h"
 #include "host/cli/losses/TLossLog.h"
 #include "host/cli/model/Document.h"
@@ -20,8 +21,8 @@ namespace vrxhost {
 class TReport
 {
   public:
-    // stop and losses outlive the object.
-    TReport(const TOptions& options, const TStopSignals& stop, TLossLog& losses);
+    // stop, losses and line outlive the object. line: removed while the document is written to a terminal.
+    TReport(const TOptions& options, const TStopSignals& stop, TLossLog& losses, TStatusLine& line);
 
     // Returns: what takes the instances while they are collected; null for a format that needs the whole document.
     IInstanceSink* BeginStream();
@@ -40,10 +41,12 @@ class TReport
 
   private:
     void Write(const std::string& text);
+    int WriteAll(const std::string& text);
     void ReportLosses(const std::vector<TLoss>& losses);
 
     const TStopSignals& fStop;
     TLossLog& fLosses;
+    TStatusLine& fLine;
     TDocumentOutput fOutput;
     TDocumentHead fHead;
     const std::unique_ptr<IFormat> fFormat;

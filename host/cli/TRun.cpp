@@ -2,7 +2,6 @@
 #include "host/cli/TRun.h"
 
 #include "host/cli/collect/TCollector.h"
-#include "host/cli/losses/TRegistrationCheck.h"
 #include "host/cli/model/ErrorReport.h"
 #include "host/core/TProcessControl.h"
 
@@ -10,6 +9,7 @@
 
 #include <chrono>
 #include <csignal>
+#include <iostream>
 #include <random>
 
 namespace vrxhost {
@@ -45,8 +45,18 @@ using NKOLVRX20::TRootObject;
 TRun::TRun(const TOptions& options)
     : fOptions(options), fConsumer(options.fTreeConsumer), fServer(options.fRoot, fConsumer), fServerLog(options.fRoot),
       fVendors(ProviderDirectory(options.fPlugin)), fThread(::pthread_self()), fLosses(options.fRoot),
-      fStop([this] { Interrupt(); }), fReport(options, fStop, fLosses)
+      fLine(!options.fQuiet && !options.fVerbose), fStepLog(fLine, fLosses),
+      fStop(fLine.GetErasure(), [this] { Interrupt(); }),
+      fWatch(fLine, fVendors, options.fDeadlineSeconds, [this](const std::string& name) { GiveUp(name); }),
+      fReport(options, fStop, fLosses, fLine)
 {
+    RouteReports([this](const std::string& line) {
+        const TStatusLine::TGap gap(fLine);
+        std::cerr << line << std::flush;
+    });
+    TProcessControl::Instance().SetObserver([this](const std::vector<std::string>& arguments, int timeoutSeconds) {
+        fLine.Show(StepOfProgram(arguments, timeoutSeconds));
+    });
     fLosses.SetVendors(fVendors);
     MakePausesCuttable();
 }
@@ -54,6 +64,8 @@ TRun::TRun(const TOptions& options)
 TRun::~TRun()
 {
     TRootObject::SetCoreLogger(nullptr);
+    TProcessControl::Instance().SetObserver(nullptr);
+    RouteReports(nullptr);
 }
 
 EExitStatus TRun::Execute()
@@ -74,6 +86,7 @@ EExitStatus TRun::Execute()
 // during an attempt the server is ended only when the way out takes too long.
 void TRun::Interrupt()
 {
+    fLine.Show({"stopping"});
     fLosses.Freeze();
     TProcessControl::Instance().Cancel();
     HurryAttempt();
@@ -150,7 +163,7 @@ bool TRun::PauseBefore(int attempt) const
 
 void TRun::UsePlugin()
 {
-    TRootObject::SetCoreLogger(&fLosses);
+    TRootObject::SetCoreLogger(&fStepLog);
     TSession session(fOptions.fPlugin, fConsumer);
     OpenNamespace(session);
     if (fLosses.HasNoServer()) {
@@ -168,9 +181,15 @@ void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
 {
     TDocument document;
     std::string refused;
+    TRegistrationCheck check(ns, fVendors, fLosses);
+    if (fOptions.fDeadlineSeconds > 0) {
+        check.ReadModules();
+        LearnModules(check);
+    }
     const std::string error = ErrorOf([&] {
         TCollector collector(ns, fLosses, [this] { return fStop.IsStopped(); });
         collector.SetSink(fReport.BeginStream(), fOptions.fCommand->NeedsInstances());
+        collector.SetWatch(&fWatch);
         try {
             fOptions.fCommand->Fill(collector, document);
         } catch (const TRequestError& e) {
@@ -181,7 +200,7 @@ void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
         fLosses.Add("the inventory is incomplete: " + error);
     }
     if (!fStop.IsStopped()) {
-        FindSilentLosses(ns, document);
+        FindSilentLosses(check, document);
     }
     if (!refused.empty()) {
         fReport.Fail(refused);
@@ -190,9 +209,27 @@ void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
     }
 }
 
-void TRun::FindSilentLosses(NKOLVRX20::ICIMNamespace& ns, const TDocument& document)
+// For the thread that gives providers up, which must leave the namespace alone.
+void TRun::LearnModules(const TRegistrationCheck& check)
 {
-    TRegistrationCheck check(ns, fVendors, fLosses);
+    for (const auto& [module, vendor] : check.GetModuleVendors()) {
+        fModules[vendor].insert(module);
+    }
+}
+
+// On the watch's thread, while the other one waits for the answer: the end of the agent ends the wait.
+void TRun::GiveUp(const std::string& className) const
+{
+    const TClassList* const list = fVendors.FindClass(className);
+    const auto modules = list ? fModules.find(list->fVendor) : fModules.end();
+    if (modules != fModules.end()) {
+        fServer.EndAgents(modules->second);
+    }
+}
+
+void TRun::FindSilentLosses(TRegistrationCheck& check, const TDocument& document)
+{
+    fLine.Show({"looking for what is missing"});
     if (document.fDetail == EDetail::kInstances) {
         check.Run(document.fProviders);
     }

@@ -2,18 +2,23 @@
 #pragma once
 
 #include "host/cli/Options.h"
+#include "host/cli/Steps.h"
 #include "host/cli/TPrivateServer.h"
+#include "host/cli/TProviderWatch.h"
 #include "host/cli/TReport.h"
 #include "host/cli/TSession.h"
 #include "host/cli/TStopSignals.h"
 #include "host/cli/losses/TLossLog.h"
+#include "host/cli/losses/TRegistrationCheck.h"
 #include "host/cli/losses/TServerLog.h"
 #include "host/cli/losses/TVendorFiles.h"
 
 #include <host/ICIMNamespace.h>
 
 #include <condition_variable>
+#include <map>
 #include <mutex>
+#include <set>
 #include <string>
 
 #include <pthread.h>
@@ -49,7 +54,9 @@ class TRun
     void OpenNamespace(TSession& session);
     bool PauseBefore(int attempt) const;
     void Show(NKOLVRX20::ICIMNamespace& ns);
-    void FindSilentLosses(NKOLVRX20::ICIMNamespace& ns, const TDocument& document);
+    void FindSilentLosses(TRegistrationCheck& check, const TDocument& document);
+    void LearnModules(const TRegistrationCheck& check);
+    void GiveUp(const std::string& className) const;
 
     const TOptions& fOptions;
     const std::string fConsumer;
@@ -58,10 +65,14 @@ class TRun
     const TVendorFiles fVendors;
     const pthread_t fThread; // the one that calls the plug-in
     TLossLog fLosses;
+    std::map<std::string, std::set<std::string>> fModules; // of each vendor; complete before the first deadline
+    TStatusLine fLine;
+    TStepLog fStepLog;
     std::mutex fPhaseMutex;
     std::condition_variable fPhaseChanged;
     EPhase fPhase = EPhase::kBefore;
     TStopSignals fStop; // after what its thread uses
+    TProviderWatch fWatch;
     TReport fReport;
 };
 

@@ -11,22 +11,9 @@
 
 namespace vrxhost {
 
-namespace {
-
-// Bypasses the streams, whose lock a blocked write of another thread may hold: the second signal must be heard.
-void Announce()
-{
-    constexpr char kSentence[] = "vrxhost: stopping ...\n";
-    pollfd error = {STDERR_FILENO, POLLOUT, 0};
-    if (::poll(&error, 1, 0) == 1) {
-        static_cast<void>(!::write(STDERR_FILENO, kSentence, sizeof kSentence - 1));
-    }
-}
-
-} // namespace
-
-TStopSignals::TStopSignals(std::function<void()> onFirst)
-    : fOnFirst(std::move(onFirst)), fEvent(::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK))
+TStopSignals::TStopSignals(const char* erasure, std::function<void()> onFirst)
+    : fSentence(std::string(erasure) + "vrxhost: stopping ...\n"), fOnFirst(std::move(onFirst)),
+      fEvent(::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK))
 {
     sigemptyset(&fSignals);
     for (const int number : {SIGINT, SIGTERM, SIGHUP}) {
@@ -51,6 +38,15 @@ bool TStopSignals::AwaitStop(int timeoutMs) const
     pollfd event = {fEvent.Get(), POLLIN, 0};
     ::poll(&event, 1, timeoutMs);
     return fStopped;
+}
+
+// Bypasses the streams, whose lock a blocked write of another thread may hold: the second signal must be heard.
+void TStopSignals::Announce() const
+{
+    pollfd error = {STDERR_FILENO, POLLOUT, 0};
+    if (::poll(&error, 1, 0) == 1) {
+        static_cast<void>(!::write(STDERR_FILENO, fSentence.data(), fSentence.size()));
+    }
 }
 
 void TStopSignals::AwaitSignals()

@@ -5,6 +5,7 @@
 
 #include <atomic>
 #include <functional>
+#include <string>
 #include <thread>
 
 #include <signal.h>
@@ -17,7 +18,8 @@ namespace vrxhost {
 class TStopSignals
 {
   public:
-    explicit TStopSignals(std::function<void()> onFirst);
+    // erasure: goes before the announcement, to remove what a line on the terminal shows; outlives the object.
+    TStopSignals(const char* erasure, std::function<void()> onFirst);
     // Ends the threads; the signals stay blocked.
     ~TStopSignals();
 
@@ -34,10 +36,12 @@ class TStopSignals
     bool AwaitStop(int timeoutMs) const;
 
   private:
+    void Announce() const;
     void AwaitSignals();
     void AwaitFirst();
 
     sigset_t fSignals{};
+    const std::string fSentence;
     std::function<void()> fOnFirst;
     std::atomic<bool> fStopped{false};
     std::atomic<bool> fEnding{false};

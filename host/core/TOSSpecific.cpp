@@ -26,6 +26,7 @@ std::vector<std::string> SplitAtBlanks(const std::string& line)
 
 void RunAndReport(const TProcessRequest& request, std::string& output, int timeoutSeconds)
 {
+    TProcessControl::Instance().NotifyStart(request.fArguments, timeoutSeconds);
     // A program is logged before the call throws, so that the reason is known when the caller handles the exception.
     TProcessOutcome outcome = TChildProcess(request).Run(std::chrono::seconds(std::max(timeoutSeconds, 1)));
     TProcessLog::Instance().Add(request, outcome);

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "host/core/TProcessControl.h"
 
+#include <utility>
+
 #include <sys/eventfd.h>
 
 namespace NKOLVRX20 {
@@ -37,6 +39,20 @@ void TProcessControl::Resume()
     fCancelled = false;
     eventfd_t ignored = 0; // waiters only poll; this read alone resets the descriptor
     ::eventfd_read(fWake.Get(), &ignored);
+}
+
+void TProcessControl::SetObserver(TObserver observer)
+{
+    const std::lock_guard<std::mutex> lock(fObserverMutex);
+    fObserver = std::move(observer);
+}
+
+void TProcessControl::NotifyStart(const std::vector<std::string>& arguments, int timeoutSeconds)
+{
+    const std::lock_guard<std::mutex> lock(fObserverMutex);
+    if (fObserver) {
+        fObserver(arguments, timeoutSeconds);
+    }
 }
 
 } // namespace NKOLVRX20

@@ -5,7 +5,10 @@
 
 #include <atomic>
 #include <exception>
+#include <functional>
 #include <mutex>
+#include <string>
+#include <vector>
 
 namespace NKOLVRX20 {
 
@@ -31,6 +34,12 @@ class TProcessControl
     void Resume();
     bool IsCancelled() const { return fCancelled; }
 
+    using TObserver = std::function<void(const std::vector<std::string>& arguments, int timeoutSeconds)>;
+
+    // Has each start of a program reported, on the thread that starts it; null for nobody.
+    void SetObserver(TObserver observer);
+    void NotifyStart(const std::vector<std::string>& arguments, int timeoutSeconds);
+
     // Readable while cancelled, for poll().
     int GetWakeFd() const { return fWake.Get(); }
 
@@ -38,6 +47,8 @@ class TProcessControl
     TProcessControl();
 
     std::mutex fMutex; // orders Cancel and Resume
+    std::mutex fObserverMutex;
+    TObserver fObserver;
     bool fResumed = false;
     std::atomic<bool> fCancelled{false};
     TUniqueFd fWake;

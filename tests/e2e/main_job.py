@@ -396,6 +396,22 @@ class VendorExample(TreeTest):
         self.assert_nothing_left()
 
 
+class Deadline(TreeTest):
+    """A vendor that hangs is given up; the others are whole."""
+
+    def test_hanging_vendor(self):
+        self.tree.lay_lamps("returnLamps(results, of, 0)", "(pause(), status(CMPI_RC_OK))")
+        began = time.monotonic()
+        status, document, err = self.tree.inventory("--deadline", "3")
+        self.assertEqual(status, PARTIAL, err)
+        self.assertLess(time.monotonic() - began, 40)
+        self.assertRegex(err, "provider .* took longer than 3 s and was given up")
+        self.assertEqual([provider["module"] for provider in document["providers"] if "partial" in provider], ["liblamps"])
+        self.assertEqual(len(instances(document, "LNX_NetworkPort")), len(interfaces()))
+        jsonschema.Draft7Validator(HealthyTree.schema("document")).validate(document)
+        self.assert_nothing_left()
+
+
 class Consumer(TreeTest):
     """A host of its own project, built against the installed headers, runs the main job."""
 

@@ -108,26 +108,68 @@ TProviderRecord TCollector::ReadProvider(IProvider& provider, EDetail detail)
         record.fDescription = provider.GetDescription(kNoContext);
     });
     fProviderName = record.fName;
+    std::vector<std::string> partial;
+    BeginWatch();
     for (const TClassPtr& each : ListClasses(provider, record.fName)) {
         if (!fIsStopped()) {
-            record.fClasses.push_back(ReadClass(*each, detail));
+            record.fClasses.push_back(ReadWatchedClass(*each, detail, nullptr));
+            if (record.fClasses.back().fIsPartial) {
+                partial.push_back(record.fClasses.back().fName);
+            }
         }
     }
+    EndWatch(partial);
+    record.fIsPartial = !partial.empty();
     return record;
+}
+
+void TCollector::BeginWatch()
+{
+    if (fWatch) {
+        fWatch->BeginProvider(fProviderName);
+    }
+}
+
+void TCollector::EndWatch(const std::vector<std::string>& partial)
+{
+    if (!fWatch) {
+        return;
+    }
+    fWatch->EndProvider();
+    if (!partial.empty() && !fIsStopped()) {
+        TLoss loss =
+            LossOf("provider " + fProviderName + " took longer than " + std::to_string(fWatch->GetDeadlineSeconds()) +
+                   " s and was given up; missing or incomplete: " + JoinNames(partial));
+        loss.fClasses = partial;
+        fLosses.Add(loss);
+    }
 }
 
 TClassRecord TCollector::ReadClass(ICIMClass& each, EDetail detail, const TFilter& filter)
 {
+    BeginWatch();
+    TClassRecord record = ReadWatchedClass(each, detail, filter);
+    EndWatch(record.fIsPartial ? std::vector<std::string>{record.fName} : std::vector<std::string>());
+    return record;
+}
+
+TClassRecord TCollector::ReadWatchedClass(ICIMClass& each, EDetail detail, const TFilter& filter)
+{
     TClassRecord record;
+    record.fIsPartial = IsGivenUp();
     Ask("a class could not be named", [&] { record.fName = each.GetName(kNoContext); });
+    if (fWatch) {
+        fWatch->BeginClass(record.fName);
+    }
     if (detail != EDetail::kNames) {
         Ask("class " + record.fName + " could not be described", [&] { ReadDeclarations(each, record); });
     }
     if (fSink && detail != EDetail::kNames) {
         fSink->BeginClass(fProviderName, record);
     }
-    if (detail == EDetail::kInstances) {
+    if (detail == EDetail::kInstances && !record.fIsPartial) {
         Ask("instances of " + record.fName + " could not be fetched", [&] { ReadInstances(each, record, filter); });
+        record.fIsPartial = IsGivenUp();
     }
     return record;
 }
@@ -149,7 +191,7 @@ void TCollector::ReadInstances(ICIMClass& each, TClassRecord& record, const TFil
                     record.fInstances.push_back(std::move(found));
                 }
             });
-            return !fIsStopped();
+            return !fIsStopped() && !IsGivenUp();
         },
         false, kNoContext);
 }

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "host/cli/collect/IProviderWatch.h"
 #include "host/cli/losses/TLossLog.h"
 #include "host/cli/model/Document.h"
 
@@ -28,6 +29,9 @@ class TCollector
         fKeeps = keeps || !sink;
     }
 
+    // watch: null for none.
+    void SetWatch(IProviderWatch* watch) { fWatch = watch; }
+
     std::vector<TProviderRecord> ReadProviders(EDetail detail);
 
     // Returns: the class, letter case ignored; first among those that providers serve.
@@ -44,6 +48,12 @@ class TCollector
     std::vector<TProviderPtr> ListProviders();
     std::vector<TClassPtr> ListClasses(NKOLVRX20::IProvider& provider, const std::string& name);
     TProviderRecord ReadProvider(NKOLVRX20::IProvider& provider, EDetail detail);
+    // Requires: the watch knows the provider.
+    TClassRecord ReadWatchedClass(NKOLVRX20::ICIMClass& each, EDetail detail, const TFilter& filter);
+    void BeginWatch();
+    // partial: the classes that the provider has not delivered in time, which become a loss.
+    void EndWatch(const std::vector<std::string>& partial);
+    bool IsGivenUp() const { return fWatch && fWatch->IsGivenUp(); }
     void ReadInstances(NKOLVRX20::ICIMClass& each, TClassRecord& record, const TFilter& filter);
 
     // Runs a question; what it throws becomes the loss "<what> could not be <done>: <cause>".
@@ -54,6 +64,7 @@ class TCollector
     std::function<bool()> fIsStopped;
     IInstanceSink* fSink = nullptr;
     bool fKeeps = true;
+    IProviderWatch* fWatch = nullptr;
     std::string fProviderName; // of the class being read
 };
 

@@ -26,6 +26,14 @@ TJson JsonDeclarations(const TClassRecord& each);
 
 TJson JsonHost(const THostFacts& host);
 
+// Adds "partial" to a provider or a class that was given up.
+template <typename Record> void MarkPartial(TJson& json, const Record& record)
+{
+    if (record.fIsPartial) {
+        json["partial"] = true;
+    }
+}
+
 // Adds "complete", "losses" and "notes".
 void AddLosses(TJson& json, const TDocument& document);
 

@@ -47,6 +47,7 @@ class TNdjsonFormat : public TStreamFormat
         ++fClassCount;
         TJson json = Record("class");
         json["class"] = each.fName;
+        MarkPartial(json, each);
         json["superclass"] = each.fAncestors.empty() ? TJson() : TJson(each.fAncestors.front());
         json["properties"] = JsonDeclarations(each);
         Write(JsonText(json, -1));
@@ -79,6 +80,13 @@ class TNdjsonFormat : public TStreamFormat
         json["classes"] = fClassCount;
         json["instances"] = fInstanceCount;
         AddLosses(json, document);
+        for (const TProviderRecord& provider : document.fProviders) {
+            for (const TClassRecord& each : provider.fClasses) {
+                if (each.fIsPartial) {
+                    json["partial"].push_back({{"provider", provider.fName}, {"class", each.fName}});
+                }
+            }
+        }
         return JsonText(json, -1);
     }
 
@@ -134,7 +142,19 @@ class TCsvFormat : public TStreamFormat
         Write(lines);
     }
 
-    std::string Finish(const TDocument&) override { return ""; }
+    // A class that was given up is a line without path.
+    std::string Finish(const TDocument& document) override
+    {
+        std::string lines;
+        for (const TProviderRecord& provider : document.fProviders) {
+            for (const TClassRecord& each : provider.fClasses) {
+                lines += each.fIsPartial
+                             ? Quoted(provider.fName) + "," + Quoted(each.fName) + ",,partial,boolean,true,\n"
+                             : "";
+            }
+        }
+        return lines;
+    }
 
   private:
     // Control bytes as escapes, so that a record stays one line.

@@ -6,6 +6,7 @@
 #include "host/cli/formats/ValueText.h"
 
 #include <algorithm>
+#include <set>
 #include <utility>
 
 namespace vrxhost {
@@ -88,7 +89,9 @@ class THtmlFormat : public IFormat, public IInstanceSink
     void EndClass()
     {
         if (!fClass.fName.empty()) {
-            fCount > 0 || !fClass.fInstances.empty() ? fWrite(Rows(true)) : void();
+            if (fCount > 0 || !fClass.fInstances.empty()) {
+                fWrite(Rows(true));
+            }
             fContents.push_back({fProvider, fClass.fName, fCount});
         }
         fClass = TClassRecord();
@@ -194,12 +197,23 @@ class THtmlFormat : public IFormat, public IInstanceSink
     {
         std::string rows;
         std::size_t number = 0;
+        std::set<std::pair<std::string, std::string>> partial;
+        for (const TProviderRecord& provider : document.fProviders) {
+            for (const TClassRecord& each : provider.fClasses) {
+                if (each.fIsPartial) {
+                    partial.emplace(provider.fName, each.fName);
+                }
+            }
+        }
         for (const auto& [provider, name, count] : fContents) {
             const std::string id = "c" + std::to_string(++number);
             const std::string link =
                 count == 0 ? HtmlText(name) : HtmlElement("a" + HtmlAttribute("href", "#" + id), name);
             rows += "<tr><th scope=\"row\">" + link + "</th>" + HtmlElement("td", provider) +
-                    HtmlElement("td", document.fDetail == EDetail::kInstances ? std::to_string(count) : "") + "</tr>\n";
+                    HtmlElement(
+                        "td", (document.fDetail == EDetail::kInstances ? std::to_string(count) : "") +
+                                  (partial.count({provider, name}) > 0 ? ", partial: the provider was given up" : "")) +
+                    "</tr>\n";
         }
         if (document.fDetail == EDetail::kNames) {
             for (const TProviderRecord& provider : document.fProviders) {

@@ -79,6 +79,7 @@ class TJsonFormat : public IFormat
     TJson Provider(const TProviderRecord& provider, EDetail detail) const
     {
         TJson json = {{"name", provider.fName}, {"module", provider.fModule}, {"description", provider.fDescription}};
+        MarkPartial(json, provider);
         json["classes"] = TJson::array();
         for (const auto& each : provider.fClasses) {
             json["classes"].push_back(Class(each, detail));
@@ -89,6 +90,7 @@ class TJsonFormat : public IFormat
     TJson Class(const TClassRecord& each, EDetail detail) const
     {
         TJson json = {{"name", each.fName}};
+        MarkPartial(json, each);
         if (detail == EDetail::kNames) {
             return json;
         }

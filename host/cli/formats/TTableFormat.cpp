@@ -157,7 +157,8 @@ std::string TTableFormat::Class(const TClassRecord& each, EDetail detail, const 
 
 std::string TTableFormat::Instances(const TClassRecord& each, const std::string& indent) const
 {
-    std::string out = indent + Heading(each.fName) + ": " + Counted(each.fInstances.size(), "instance") + "\n";
+    std::string out = indent + Heading(each.fName) + ": " + Counted(each.fInstances.size(), "instance") +
+                      (each.fIsPartial ? ", partial: the provider was given up" : "") + "\n";
     const std::string tree = each.fIsAssociation && !fOptions.fRaw ? AssociationTree({&each}, indent + "  ") : "";
     if (!tree.empty()) {
         return out + tree;
@@ -254,7 +255,7 @@ class TTreeFormat : public IFormat
                 }
             }
         }
-        const std::string tree = AssociationTree(associations, "");
+        const std::string tree = AssociationTree(associations, "") + Partial(document);
         for (const TProviderRecord& provider : document.fProviders) {
             for (const TClassRecord& each : provider.fClasses) {
                 rest += each.fIsAssociation ? "" : Unlinked(each, tree);
@@ -264,6 +265,15 @@ class TTreeFormat : public IFormat
     }
 
   private:
+    static std::string Partial(const TDocument& document)
+    {
+        std::string lines;
+        for (const TProviderRecord& provider : document.fProviders) {
+            lines += provider.fIsPartial ? "partial: provider " + Printable(provider.fName) + " was given up\n" : "";
+        }
+        return lines;
+    }
+
     static std::string Unlinked(const TClassRecord& each, const std::string& tree)
     {
         std::string lines;

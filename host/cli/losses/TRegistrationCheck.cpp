@@ -71,7 +71,9 @@ void TRegistrationCheck::Run(const std::vector<TProviderRecord>& providers)
 {
     CheckFolders();
     const std::string error = ErrorOf([&] {
-        ReadRegistrations();
+        if (!fIsKnown) {
+            ReadRegistrations();
+        }
         if (fIsKnown) {
             CheckClasses(providers);
         }
@@ -108,6 +110,11 @@ void TRegistrationCheck::CheckFolders()
         loss.fIsNote = !hasMof;
         fLosses.Add(loss);
     }
+}
+
+void TRegistrationCheck::ReadModules()
+{
+    static_cast<void>(ErrorOf([this] { ReadRegistrations(); }));
 }
 
 void TRegistrationCheck::ReadRegistrations()

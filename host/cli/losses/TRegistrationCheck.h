@@ -25,6 +25,9 @@ class TRegistrationCheck
     // Enters the losses. providers: with the instances that were collected; classes that were not asked are left out.
     void Run(const std::vector<TProviderRecord>& providers);
 
+    // Reads the registrations before the instances are asked for. What fails is reported by Run.
+    void ReadModules();
+
     // Returns: the vendor of each provider module.
     const std::map<std::string, std::string>& GetModuleVendors() const { return fModuleVendors; }
 

@@ -5,6 +5,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 
@@ -32,11 +33,17 @@ class TClassListParser : public NKOLVRX20::TXmlParser
     {
         if (IsSame(name, "nsp")) {
             fList.fNamespace = attributes["name"];
+        } else if (IsSame(name, "timeout")) {
+            fList.fTimeoutSeconds = std::atoi(attributes["value"].c_str());
         } else if (IsSame(name, "module")) {
             fList.fModule = attributes["name"];
         } else if (IsSame(name, "class") && attributes["name"].find(kHiddenTag) == std::string::npos) {
             const std::string& entry = attributes["name"];
             fList.fClasses.push_back(entry.substr(0, std::min(entry.find('['), entry.find("%^"))));
+            const std::size_t bracket = entry.find('[');
+            if (bracket != std::string::npos) {
+                fList.fClassTimeouts[fList.fClasses.back()] = std::atoi(entry.c_str() + bracket + 1);
+            }
         }
     }
     void EndElement(const char*) override {}
@@ -51,7 +58,9 @@ class TClassListParser : public NKOLVRX20::TXmlParser
 
 TClassList ReadClassList(const std::string& vendor, const std::string& path)
 {
-    TClassList list{vendor, path, "", "", {}};
+    TClassList list;
+    list.fVendor = vendor;
+    list.fPath = path;
     std::string text(TVendorFiles::kMaxClassListBytes, '\0');
     std::ifstream file(path, std::ios::binary);
     file.read(text.data(), static_cast<std::streamsize>(text.size()));
@@ -76,6 +85,23 @@ bool IsCimName(const std::string& name)
 }
 
 } // namespace
+
+// The plug-in's own rules: two kinds of classes have timeouts of their own, whatever their vendors say.
+int TClassList::TimeoutOf(const std::string& name) const
+{
+    constexpr int kDiagnosticServiceSeconds = 199;
+    constexpr int kSoftwareIdentitySeconds = 301;
+    constexpr int kDefaultSeconds = 60;
+    if (name.find("AvailableDiagnosticService") != std::string::npos) {
+        return kDiagnosticServiceSeconds;
+    }
+    if (name.find("SoftwareIdentity") != std::string::npos) {
+        return kSoftwareIdentitySeconds;
+    }
+    const auto own = fClassTimeouts.find(name);
+    const int seconds = own == fClassTimeouts.end() ? fTimeoutSeconds : own->second;
+    return seconds > 0 ? seconds : kDefaultSeconds;
+}
 
 TVendorFiles::TVendorFiles(const std::string& providerDirectory)
 {

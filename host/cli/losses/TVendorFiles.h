@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <map>
 #include <string>
 #include <vector>
 
@@ -14,6 +15,11 @@ struct TClassList
     std::string fModule;
     std::string fNamespace;
     std::vector<std::string> fClasses; // names alone, without those that are tagged as hidden from hosts
+    int fTimeoutSeconds = 0;           // of classes without a timeout of their own; 0: the plug-in's default
+    std::map<std::string, int> fClassTimeouts;
+
+    // Returns: seconds that the plug-in waits for the instances of the class.
+    int TimeoutOf(const std::string& name) const;
 };
 
 // One folder below the provider directory.

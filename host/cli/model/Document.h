@@ -84,6 +84,7 @@ struct TClassRecord
     std::vector<TMethodRecord> fMethods;
     std::vector<TInstanceRecord> fInstances;
     std::size_t fInstanceCount = 0; // as delivered; a command may show fewer
+    bool fIsPartial = false;        // the provider was given up before it had delivered all
 
     // Returns: the declaration, letter case ignored; null when the class lacks it.
     const TPropertyDeclRecord* Find(const std::string& name) const;
@@ -97,6 +98,7 @@ struct TProviderRecord
     std::string fModule;
     std::string fDescription;
     std::vector<TClassRecord> fClasses;
+    bool fIsPartial = false; // at least one class is
 };
 
 // A line of a command that shows more than classes, as "Memory  23.5 GiB".

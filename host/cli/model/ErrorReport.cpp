@@ -7,11 +7,18 @@
 #include <exception>
 #include <iostream>
 #include <memory>
+#include <utility>
 
 #include <cxxabi.h>
 
 namespace vrxhost {
 namespace {
+
+std::function<void(const std::string&)>& Route()
+{
+    static std::function<void(const std::string&)> route;
+    return route;
+}
 
 std::string CurrentTypeName()
 {
@@ -28,7 +35,17 @@ std::string CurrentTypeName()
 
 void ReportError(const std::string& sentence)
 {
-    std::cerr << "vrxhost: " << sentence << std::endl;
+    const std::string line = "vrxhost: " + sentence + "\n";
+    if (Route()) {
+        Route()(line);
+    } else {
+        std::cerr << line << std::flush;
+    }
+}
+
+void RouteReports(std::function<void(const std::string&)> write)
+{
+    Route() = std::move(write);
 }
 
 std::string DescribeCurrentException()

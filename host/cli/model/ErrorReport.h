@@ -2,6 +2,7 @@
 // What went wrong, as text: what an exception says, what an unknown name may have meant, and how the user hears of it.
 #pragma once
 
+#include <functional>
 #include <stdexcept>
 #include <string>
 #include <vector>
@@ -17,6 +18,10 @@ class TRequestError : public std::runtime_error
 
 // Writes a sentence of the host's own to standard error, after "vrxhost: ".
 void ReportError(const std::string& sentence);
+
+// Has something else write the lines of ReportError from now on; null for standard error alone.
+// Thread: one at a time, while nothing is reported.
+void RouteReports(std::function<void(const std::string& line)> write);
 
 // Returns: the text of the exception being handled: a status code with its text, a standard exception's text, or the
 // type's name. Requires: called inside a catch block.

@@ -24,6 +24,7 @@
 #include <stdexcept>
 #include <thread>
 
+#include <poll.h>
 #include <unistd.h>
 
 #ifndef FAKE_WITHOUT_ENTRY_POINTS
@@ -122,6 +123,16 @@ boost::shared_ptr<TFakeClass> BrokenClass()
             ::kill(::getpid(), SIGINT);
             while (visitor(boost::make_shared<TInmemInstance>(broken->shared_from_this(), TCIMContext()))) {
                 continue;
+            }
+        };
+    }
+    // Delivers until there is a file "go", or the visitor has had enough.
+    if (HasFault("slow-class")) {
+        broken->fEnumerate = [broken = broken.get()](TInstanceVisitor visitor) {
+            while (::access("go", F_OK) != 0 &&
+                   visitor(boost::make_shared<TInmemInstance>(broken->shared_from_this(), TCIMContext())))
+            {
+                ::poll(nullptr, 0, 10);
             }
         };
     }

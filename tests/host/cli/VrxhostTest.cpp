@@ -443,6 +443,28 @@ TEST_F(VrxhostProgram, InterruptionEndsWaitingProgramsAndEnumerations)
     EXPECT_TRUE(fs::exists(fRoot / "shut-down-program-ran"));
 }
 
+// What was delivered before the deadline is shown, and every format says that it is not all.
+TEST_F(VrxhostProgram, ProviderThatTakesLongerThanTheDeadlineIsGivenUp)
+{
+    const std::map<std::string, std::string> marks = {
+        {"json", R"("partial": true)"},
+        {"ndjson", R"("partial":[{"provider":"fake","class":"Fake_Broken"},{"provider":"fake","class":"Fake_Many"}])"},
+        {"csv", "fake,Fake_Many,,partial,boolean,true,\n"},
+        {"table", "Fake_Many: 0 instances, partial: the provider was given up\n"},
+        {"tree", "partial: provider fake was given up\n"},
+        {"html", "<td>0, partial: the provider was given up</td>"}};
+    for (const auto& [format, mark] : marks) {
+        const auto outcome = Run({"inventory", "--deadline", "1", "--format", format}, "slow-class");
+        EXPECT_TRUE(HasStatus(outcome, 3));
+        EXPECT_THAT(outcome.fOutput, HasSubstr(mark));
+        EXPECT_THAT(outcome.fOutput, HasSubstr("Fake_Broken")) << format;
+        EXPECT_EQ(outcome.fErrorOutput, "vrxhost: provider fake took longer than 1 s and was given up; missing or "
+                                        "incomplete: Fake_Broken, Fake_Many\n");
+    }
+    EXPECT_TRUE(HasStatus(Run({"instances", "Fake_Broken", "--deadline", "1"}, "slow-class"), 3));
+    EXPECT_TRUE(HasStatus(Run({"inventory", "--deadline", "60"}), 0));
+}
+
 TEST_F(VrxhostProgram, SecondInterruptionEndsAtOnce)
 {
     EXPECT_TRUE(HasStatus(Run({"inventory"}, "interrupt-twice"), 130));
