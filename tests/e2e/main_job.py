@@ -400,7 +400,7 @@ class Deadline(TreeTest):
     """A vendor that hangs is given up; the others are whole."""
 
     def test_hanging_vendor(self):
-        self.tree.lay_lamps("returnLamps(results, of, 0)", "(pause(), status(CMPI_RC_OK))")
+        self.tree.lay_lamps("returnLamp(results, of, &lamps[i])", "pause()")
         began = time.monotonic()
         status, document, err = self.tree.inventory("--deadline", "3")
         self.assertEqual(status, PARTIAL, err)
