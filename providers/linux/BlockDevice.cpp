@@ -64,6 +64,12 @@ Record blockDevice(const SystemTree& tree, const std::string& name, std::uint64_
     record.set("DeviceNumber", tree.word(directory + "dev"));
     record.set("Model", tree.word(directory + "device/model"));
     record.set("Vendor", tree.word(directory + "device/vendor"));
+    record.set("SerialNumber",
+               tree.word(directory + "device/serial")); // NVMe; of others only a command to the device tells
+    const auto revision = tree.word(directory + "device/firmware_rev");
+    record.set("FirmwareRevision", revision ? revision : tree.word(directory + "device/rev"));
+    const auto worldWide = tree.word(directory + "wwid");
+    record.set("WorldWideID", worldWide ? worldWide : tree.word(directory + "device/wwid"));
     record.set("Removable", tree.flag(directory + "removable"));
     record.set("Rotational", tree.flag(directory + "queue/rotational"));
     record.set("Scheduler", activeScheduler(tree.word(directory + "queue/scheduler")));

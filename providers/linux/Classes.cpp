@@ -12,7 +12,7 @@ constexpr std::array kClasses{
     ClassEntry{"LNX_ComputerSystem", computerSystems}, ClassEntry{"LNX_OperatingSystem", operatingSystems},
     ClassEntry{"LNX_Processor", processors},           ClassEntry{"LNX_Memory", memories},
     ClassEntry{"LNX_NetworkPort", networkPorts},       ClassEntry{"LNX_BlockDevice", blockDevices},
-    ClassEntry{"LNX_SystemDevice", systemDevices},
+    ClassEntry{"LNX_PciDevice", pciDevices},           ClassEntry{"LNX_SystemDevice", systemDevices},
 };
 
 } // namespace

@@ -33,7 +33,9 @@ std::vector<Record> memories(const SystemTree& tree);
 std::vector<Record> networkPorts(const SystemTree& tree);
 // LNX_BlockDevice: one for each device of /sys/block that has a size. Partitions are part of their device.
 std::vector<Record> blockDevices(const SystemTree& tree);
-// LNX_SystemDevice: one for each device of the four collectors above that are devices, linking it with the system.
+// LNX_PciDevice: one for each function of /sys/bus/pci/devices. Names are null without the file pci.ids.
+std::vector<Record> pciDevices(const SystemTree& tree);
+// LNX_SystemDevice: one for each device of the five collectors above that are devices, linking it with the system.
 std::vector<Record> systemDevices(const SystemTree& tree);
 
 struct ClassEntry

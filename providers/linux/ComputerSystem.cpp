@@ -27,6 +27,14 @@ std::vector<Record> computerSystems(const SystemTree& tree)
     record.set("Model", tree.word(dmi + "product_name"));
     record.set("SerialNumber", tree.word(dmi + "product_serial"));
     record.set("FirmwareVersion", tree.word(dmi + "bios_version"));
+    record.set("FirmwareVendor", tree.word(dmi + "bios_vendor"));
+    record.set("FirmwareDate", tree.word(dmi + "bios_date"));
+    record.set("UUID", tree.word(dmi + "product_uuid"));
+    record.set("SKU", tree.word(dmi + "product_sku"));
+    record.set("AssetTag", tree.word(dmi + "chassis_asset_tag"));
+    record.set("BoardManufacturer", tree.word(dmi + "board_vendor"));
+    record.set("BoardModel", tree.word(dmi + "board_name"));
+    record.set("BoardSerialNumber", tree.word(dmi + "board_serial"));
     record.set("ChassisType", narrowed<std::uint16_t>(tree.natural(dmi + "chassis_type")));
     return {record};
 }
@@ -35,7 +43,7 @@ std::vector<Record> systemDevices(const SystemTree& tree)
 {
     const Reference system = computerSystems(tree).front().reference();
     std::vector<Record> links;
-    for (const auto collect : {processors, memories, networkPorts, blockDevices}) {
+    for (const auto collect : {processors, memories, networkPorts, blockDevices, pciDevices}) {
         for (const Record& part : collect(tree)) {
             Record link("LNX_SystemDevice");
             link.key("GroupComponent", system);

@@ -86,6 +86,9 @@ void describeAddress(const SystemTree& tree, const std::string& name, Record& re
     if (const auto permanent = tree.permanentAddress(name); !permanent.empty()) {
         record.set("PermanentAddress", compact(permanent));
     }
+    if (auto addresses = tree.ipAddresses(name); !addresses.empty()) {
+        record.set("IPAddresses", std::move(addresses));
+    }
 }
 
 void describeLink(const SystemTree& tree, const std::string& directory, Record& record)

@@ -5,12 +5,15 @@
 
 #include <algorithm>
 #include <array>
+#include <bitset>
 #include <cerrno>
 #include <cstring>
 #include <memory>
 
+#include <arpa/inet.h>
 #include <dirent.h>
 #include <fcntl.h>
+#include <ifaddrs.h>
 #include <linux/ethtool.h>
 #include <linux/sockios.h>
 #include <net/if.h>
@@ -57,6 +60,27 @@ struct DirectoryCloser
     void operator()(DIR* directory) const { ::closedir(directory); }
 };
 
+// Returns: "address/length"; empty for families other than IP.
+std::string addressText(const sockaddr& address, const sockaddr* mask)
+{
+    const bool isV4 = address.sa_family == AF_INET;
+    if (!isV4 && address.sa_family != AF_INET6) {
+        return {};
+    }
+    const auto bytesOf = [&](const sockaddr& of) -> const unsigned char* {
+        return isV4 ? reinterpret_cast<const unsigned char*>(&reinterpret_cast<const sockaddr_in&>(of).sin_addr)
+                    : reinterpret_cast<const sockaddr_in6&>(of).sin6_addr.s6_addr;
+    };
+    char text[INET6_ADDRSTRLEN] = "";
+    ::inet_ntop(address.sa_family, bytesOf(address), text, sizeof text);
+    unsigned length = 0;
+    const std::size_t size = isV4 ? sizeof(in_addr) : sizeof(in6_addr);
+    for (std::size_t i = 0; mask != nullptr && i < size; ++i) {
+        length += static_cast<unsigned>(std::bitset<8>(bytesOf(*mask)[i]).count());
+    }
+    return text + ("/" + std::to_string(length));
+}
+
 constexpr std::size_t kAddressBytes = 32; // MAX_ADDR_LEN: the kernel's longest, more than InfiniBand's 20
 
 } // namespace
@@ -82,6 +106,25 @@ std::vector<std::uint8_t> permanentAddressOf(const std::string& interface)
     const auto* end = begin + std::min<std::size_t>(fixedPart.size, kAddressBytes);
     const bool isSet = std::any_of(begin, end, [](std::uint8_t octet) { return octet != 0; });
     return isSet ? std::vector<std::uint8_t>(begin, end) : std::vector<std::uint8_t>();
+}
+
+std::vector<std::string> ipAddressesOf(const std::string& interface)
+{
+    ifaddrs* list = nullptr;
+    if (::getifaddrs(&list) != 0) {
+        return {};
+    }
+    const std::unique_ptr<ifaddrs, void (*)(ifaddrs*)> owner(list, ::freeifaddrs);
+    std::vector<std::string> found;
+    for (const ifaddrs* each = list; each != nullptr; each = each->ifa_next) {
+        if (each->ifa_addr == nullptr || interface != each->ifa_name) {
+            continue;
+        }
+        if (std::string text = addressText(*each->ifa_addr, each->ifa_netmask); !text.empty()) {
+            found.push_back(std::move(text));
+        }
+    }
+    return found;
 }
 
 std::optional<std::string> SystemTree::text(const std::string& path) const

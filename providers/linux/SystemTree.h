@@ -14,8 +14,12 @@ namespace lnx {
 // Returns: its octets; an empty vector for an interface that lacks one: loopback, bridges, most virtual ones.
 std::vector<std::uint8_t> permanentAddressOf(const std::string& interface);
 
+// Returns: the addresses of the interface in the process's network namespace, each with the length of its prefix
+// ("192.0.2.1/24", "fe80::1/64"); empty when the kernel tells none.
+std::vector<std::string> ipAddressesOf(const std::string& interface);
+
 // What the collectors see of a machine: the files of /proc, /sys and /etc below a root ("/" for this machine), and the
-// one fact of it that the kernel keeps in no file.
+// facts of it that the kernel keeps in no file.
 //
 // A file that is missing, unreadable or odd is an absent value.
 // Throws: std::bad_alloc.
@@ -29,8 +33,11 @@ class SystemTree
 
     using AddressLookup = std::function<std::vector<std::uint8_t>(const std::string& interface)>;
 
-    explicit SystemTree(std::string root = "/", AddressLookup permanentAddress = permanentAddressOf)
-        : fRoot(std::move(root)), fPermanentAddress(std::move(permanentAddress))
+    using IpLookup = std::function<std::vector<std::string>(const std::string& interface)>;
+
+    explicit SystemTree(std::string root = "/", AddressLookup permanentAddress = permanentAddressOf,
+                        IpLookup ipAddresses = ipAddressesOf)
+        : fRoot(std::move(root)), fPermanentAddress(std::move(permanentAddress)), fIpAddresses(std::move(ipAddresses))
     {
     }
 
@@ -55,10 +62,13 @@ class SystemTree
     {
         return fPermanentAddress(interface);
     }
+    // Returns: as ipAddressesOf.
+    std::vector<std::string> ipAddresses(const std::string& interface) const { return fIpAddresses(interface); }
 
   private:
     std::string fRoot;
     AddressLookup fPermanentAddress;
+    IpLookup fIpAddresses;
 };
 
 } // namespace lnx

@@ -24,7 +24,7 @@ BUILD = sys.argv[1] if len(sys.argv) > 1 else None
 SOURCE = os.path.dirname(os.path.dirname(os.path.dirname(os.path.abspath(__file__))))
 COMPLETE, FAILED, USAGE, PARTIAL, INTERRUPTED = 0, 1, 2, 3, 130
 CLASSES = [f"LNX_{name}" for name in ("ComputerSystem", "OperatingSystem", "Processor", "Memory", "NetworkPort",
-                                      "BlockDevice", "SystemDevice")]
+                                      "BlockDevice", "PciDevice", "SystemDevice")]
 
 
 def instances(document, class_name):

@@ -43,12 +43,21 @@ FixtureTree& FixtureTree::permanentAddress(const std::string& interface, const s
     return *this;
 }
 
+FixtureTree& FixtureTree::ipAddresses(const std::string& interface, const std::vector<std::string>& addresses)
+{
+    fIpAddresses[interface] = addresses;
+    return *this;
+}
+
 SystemTree FixtureTree::tree() const
 {
-    return SystemTree(fRoot.string(), [this](const std::string& interface) {
-        const auto found = fPermanentAddresses.find(interface);
-        return found == fPermanentAddresses.end() ? std::vector<std::uint8_t>() : found->second;
-    });
+    const auto lookUp = [](const auto& map) {
+        return [&map](const std::string& interface) {
+            const auto found = map.find(interface);
+            return found == map.end() ? decltype(found->second)() : found->second;
+        };
+    };
+    return SystemTree(fRoot.string(), lookUp(fPermanentAddresses), lookUp(fIpAddresses));
 }
 
 } // namespace lnx

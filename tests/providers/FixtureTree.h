@@ -24,6 +24,8 @@ class FixtureTree
     FixtureTree& directory(const std::string& path);
     FixtureTree& permanentAddress(const std::string& interface, const std::vector<std::uint8_t>& octets);
 
+    FixtureTree& ipAddresses(const std::string& interface, const std::vector<std::string>& addresses);
+
     // The tree reads the fixture, which must outlive it.
     SystemTree tree() const;
     const std::filesystem::path& root() const { return fRoot; }
@@ -31,6 +33,7 @@ class FixtureTree
   private:
     std::filesystem::path fRoot;
     std::map<std::string, std::vector<std::uint8_t>> fPermanentAddresses;
+    std::map<std::string, std::vector<std::string>> fIpAddresses;
 };
 
 } // namespace lnx

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "providers/linux/Classes.h"
 #include "providers/linux/Parse.h"
+#include "providers/linux/PciNames.h"
 #include "tests/providers/FixtureTree.h"
 
 #include <gtest/gtest.h>
@@ -88,19 +89,59 @@ TEST(NetworkPorts, ReadWhatTheKernelShows)
              "ifindex=4|statistics/rx_bytes=18446744073709551615|statistics/tx_errors=7");
     addFiles(fixture, "/sys/class/net/lo",
              "address=00:00:00:00:00:00|mtu=65536|operstate=unknown|type=772|flags=0x8|speed=-1");
-    fixture.file("/sys/class/net/bonding_masters", "bond0\n").permanentAddress("eth0", {2, 252, 0, 10, 11, 255});
+    fixture.file("/sys/class/net/bonding_masters", "bond0\n")
+        .permanentAddress("eth0", {2, 252, 0, 10, 11, 255})
+        .ipAddresses("eth0", {"192.0.2.1/24", "fe80::1/64"});
 
     const std::vector<Record> ports = networkPorts(fixture.tree());
     ASSERT_EQ(ports.size(), 2U);
     expectProperties(
         ports[0],
         "DeviceID=eth0|MACAddress=02:fc:00:aa:bb:01|MACOctets=2,252,0,170,187,1|PermanentAddress=02FC000A0BFF|"
-        "NetworkAddresses=02FC00AABB01|ActiveMaximumTransmissionUnit=1400|LinkState=6|LinkTechnology=2|CarrierDetected="
+        "NetworkAddresses=02FC00AABB01|IPAddresses=192.0.2.1/24,fe80::1/"
+        "64|ActiveMaximumTransmissionUnit=1400|LinkState=6|LinkTechnology=2|CarrierDetected="
         "true|EnabledState=2|NegotiatedSpeed=10000|Speed=10000000000|FullDuplex=true|InterfaceFlags=4099|BytesReceived="
         "18446744073709551615|TransmitErrors=7|BytesTransmitted=<null>");
     expectProperties(ports[1], "DeviceID=lo|OtherLinkTechnology=loopback|LinkState=0|CarrierDetected=<null>|"
                                "EnabledState=3|NegotiatedSpeed=<null>|Speed=<null>|PermanentAddress=<null>|"
-                               "NetworkAddresses=<null>");
+                               "NetworkAddresses=<null>|IPAddresses=<null>");
+}
+
+TEST(PciDevices, AreNamedByTheFileOfNames)
+{
+    const std::string folder = "/sys/bus/pci/devices/0000:00:1f.6";
+    for (const bool isNamed : {true, false}) {
+        FixtureTree fixture;
+        addFiles(fixture, folder,
+                 "vendor=0x8086|device=0x15b7|subsystem_vendor=0xffff|subsystem_device=0x0001|class=0x020000|"
+                 "revision=0x31|numa_node=-1");
+        fixture.file(folder + "/uevent", "DRIVER=e1000e\nPCI_CLASS=20000\n");
+        fixture.directory("/sys/bus/pci/devices/0000:00:00.0"); // the kernel tells nothing
+        if (isNamed) {
+            fixture.file("/usr/share/misc/pci.ids", "# names\n1234  Other\n\t15b7  Wrong\n8086  Some Corporation\n"
+                                                    "\t15b7  Ethernet (2)\n\t\tffff 0001  Card\nC 02  Network\n");
+        }
+        const std::vector<Record> all = pciDevices(fixture.tree());
+        ASSERT_EQ(all.size(), 2U);
+        expectProperties(all[0], "DeviceID=0000:00:00.0|VendorNumber=<null>|VendorName=<null>|Driver=<null>");
+        expectProperties(all[1],
+                         "VendorNumber=32902|DeviceNumber=5559|SubsystemVendorNumber=65535|SubsystemNumber=1|"
+                         "ClassCode=131072|Revision=49|Driver=e1000e|NumaNode=<null>|SubsystemVendorName=<null>");
+        expectProperties(all[1], isNamed ? "VendorName=Some Corporation|DeviceName=Ethernet (2)"
+                                         : "VendorName=<null>|DeviceName=<null>");
+    }
+}
+
+TEST(PciNames, OddLinesAreLeftOut)
+{
+    const std::string tooLong(PciNames::kMaxNameBytes + 1, 'x');
+    for (const std::string& text : {std::string(), std::string("8086"), std::string("8086 "), "8086  " + tooLong,
+                                    std::string("8086  A\n0001  B\n\t15b7  C"), std::string("8086  A\n\t15b7")})
+    {
+        EXPECT_EQ(PciNames(text).device(0x8086, 0x15b7), std::nullopt) << text.substr(0, 20);
+    }
+    EXPECT_EQ(PciNames("8086  " + tooLong).vendor(0x8086), std::nullopt);
+    EXPECT_EQ(PciNames("8086").vendor(std::nullopt), std::nullopt);
 }
 
 TEST(NetworkPorts, OddAddressesStayText)
@@ -177,7 +218,7 @@ TEST(BlockDevices, ThoseWithASize)
     addFiles(fixture, "/sys/block/nvme0n1",
              "size=2000|dev=259:0|ro=1|removable=0|queue/logical_block_size=4096|queue/physical_block_size=4096|queue/"
              "rotational=0|queue/scheduler=[none] mq-deadline kyber|stat=  10 0 200 5 30 0 400 5 0 1 "
-             "2|device/model=Some Disk                ");
+             "2|device/model=Some Disk                |device/serial=S1 |device/firmware_rev=2.0|wwid=eui.01");
     addFiles(fixture, "/sys/block/loop0", "size=0");
     fixture.directory("/sys/block/broken");
 
@@ -187,7 +228,9 @@ TEST(BlockDevices, ThoseWithASize)
         all[0],
         "DeviceID=nvme0n1|Name=/dev/"
         "nvme0n1|TotalBytes=1024000|BlockSize=4096|NumberOfBlocks=250|PhysicalBlockSize=4096|Access=1|Removable=false|"
-        "Rotational=false|Scheduler=none|Model=Some Disk|Vendor=<null>|ReadsCompleted=10|SectorsWritten=400");
+        "Rotational=false|Scheduler=none|Model=Some "
+        "Disk|SerialNumber=S1|FirmwareRevision=2.0|WorldWideID=eui.01|Vendor=<null>|ReadsCompleted=10|SectorsWritten="
+        "400");
 }
 
 FixtureTree& addProcess(FixtureTree& fixture, const std::string& id, const std::string& command, char state)

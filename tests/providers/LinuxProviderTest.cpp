@@ -18,8 +18,8 @@ namespace {
 
 constexpr const char* kProvider = "LinuxInventory";
 
-const char* const kClasses[] = {"LNX_ComputerSystem", "LNX_OperatingSystem", "LNX_Processor",   "LNX_Memory",
-                                "LNX_NetworkPort",    "LNX_BlockDevice",     "LNX_SystemDevice"};
+const char* const kClasses[] = {"LNX_ComputerSystem", "LNX_OperatingSystem", "LNX_Processor", "LNX_Memory",
+                                "LNX_NetworkPort",    "LNX_BlockDevice",     "LNX_PciDevice", "LNX_SystemDevice"};
 
 // The vendor's library in the broker, with the vendor's own MOF as schema.
 class LinuxProvider : public testing::Test
@@ -93,7 +93,7 @@ TEST_F(LinuxProvider, EveryInstanceIsFoundByItsPath)
             const CIMInstance found = module->getInstance(MofServices::request(kProvider), path, CIMPropertyList());
             EXPECT_EQ(text(found.getPath().toString()), text(path.toString()));
         }
-        EXPECT_FALSE(paths.empty()) << name;
+        EXPECT_TRUE(!paths.empty() || name == std::string("LNX_PciDevice")) << name; // a machine may have none
 
         std::set<std::string> names;
         module->enumerateInstanceNames(MofServices::request(kProvider), CIMName(name),
