@@ -1,6 +1,7 @@
 -- SPDX-License-Identifier: MIT
 -- Loading: fleet.load(line, source) takes one line of vrxhost's ndjson. Lines may come again; a run that is whole takes
--- no more of them. Everything of a run becomes visible at once, when its end record arrives.
+-- no more of them. They may come in another order; what there is of a run becomes visible when its end record arrives,
+-- and once more when the last of its records does.
 
 -- Returns: the line as jsonb. jsonb cannot hold \u0000, which some firmware pads its texts with: it becomes \ufffd, with
 -- a trace in the rejects. Raises what jsonb finds wrong with anything else.
@@ -76,8 +77,8 @@ END $$;
 
 -- Brings the host's present instances to what the run delivered. A run that is not complete adds and changes; only a
 -- complete one makes an instance that it lacks a thing of the past.
-CREATE OR REPLACE FUNCTION fleet.apply(of_host text, of_run text, run_at timestamptz, is_complete boolean) RETURNS void
-LANGUAGE plpgsql SET search_path = pg_catalog AS $$
+CREATE OR REPLACE FUNCTION fleet.apply(of_host text, of_run text, run_at timestamptz, is_whole boolean, is_complete boolean)
+RETURNS void LANGUAGE plpgsql SET search_path = pg_catalog AS $$
 DECLARE
     declarations jsonb; -- {"provider": {"class": id}}
     seen record;
@@ -96,15 +97,19 @@ BEGIN
                coalesce((SELECT jsonb_object_agg(name, i.record -> 'properties' -> name) FROM unnest(c.volatile) AS name
                          WHERE i.record -> 'properties' ? name), '{}') AS volatile
         FROM fleet.inbox AS i
-        LEFT JOIN fleet.classes AS c
-            ON c.class_id = (declarations -> (i.record ->> 'provider') ->> (i.record ->> 'class'))::integer
+        LEFT JOIN fleet.classes AS c -- the run's own declaration; the last known one where that is missing
+            ON c.class_id = coalesce((declarations -> (i.record ->> 'provider') ->> (i.record ->> 'class'))::integer,
+                (SELECT max(class_id) FROM fleet.classes
+                 WHERE provider = i.record ->> 'provider' AND class = i.record ->> 'class'))
         WHERE i.host = of_host AND i.run = of_run AND i.record ->> 'record' = 'instance' ORDER BY i.seq
     LOOP
         IF seen.class_id IS NULL OR seen.occurrence > 1 THEN
-            INSERT INTO fleet.rejects (verdict, source, reason, line) VALUES (
-                CASE WHEN seen.class_id IS NULL THEN 'refused' ELSE 'duplicate' END, seen.source,
-                CASE WHEN seen.class_id IS NULL THEN 'the run has no record of the class'
-                     ELSE 'an earlier instance of the run has the same path' END, seen.record::text);
+            IF is_whole THEN
+                INSERT INTO fleet.rejects (verdict, source, reason, line) VALUES (
+                    CASE WHEN seen.class_id IS NULL THEN 'refused' ELSE 'duplicate' END, seen.source,
+                    CASE WHEN seen.class_id IS NULL THEN 'the run has no record of the class'
+                         ELSE 'an earlier instance of the run has the same path' END, seen.record::text);
+            END IF;
             CONTINUE;
         END IF;
         idents := idents || seen.ident;
@@ -126,7 +131,18 @@ BEGIN
     END IF;
 END $$;
 
--- Closes a run: counts what arrived, applies it unless a newer run was here first, and empties the inbox of it.
+-- Drops from the inbox what is left of a host's runs up to a time; of those that lack records a trace stays.
+CREATE OR REPLACE FUNCTION fleet.clear_inbox(of_host text, run_at timestamptz) RETURNS void LANGUAGE sql
+SET search_path = pg_catalog AS $$
+    INSERT INTO fleet.rejects (verdict, reason, line)
+        SELECT 'expired', format('%s of %s records of host %s, run %s never arrived', expected - arrived, expected, host, run), ''
+        FROM fleet.runs WHERE host = of_host AND at < run_at AND NOT is_whole
+        AND EXISTS (SELECT FROM fleet.inbox AS i WHERE i.host = of_host AND i.run = runs.run);
+    DELETE FROM fleet.inbox AS i USING fleet.runs AS r
+        WHERE i.host = of_host AND r.host = of_host AND r.run = i.run AND (r.is_whole OR r.at < run_at);
+$$;
+
+-- Closes a run: counts what arrived and applies it, unless a newer run was here first.
 CREATE OR REPLACE FUNCTION fleet.finish(document jsonb) RETURNS void LANGUAGE plpgsql SET search_path = pg_catalog AS $$
 DECLARE
     of_host text := document ->> 'host';
@@ -144,12 +160,12 @@ BEGIN
     SELECT coalesce(sum(records), 0), coalesce(jsonb_object_agg(provider, instances), '{}') INTO arrived, counts FROM (
         SELECT record ->> 'provider' AS provider, count(*) AS records,
                count(*) FILTER (WHERE record ->> 'record' = 'instance') AS instances
-        FROM fleet.inbox WHERE host = of_host AND run = of_run GROUP BY 1) AS each;
+        FROM fleet.inbox WHERE host = of_host AND run = of_run AND record ->> 'record' <> 'end' GROUP BY 1) AS each;
     run_state := CASE WHEN newest > run_at THEN 'late'
                       WHEN arrived = expected AND (document ->> 'complete')::boolean THEN 'complete'
                       ELSE 'partial' END;
     IF run_state <> 'late' THEN
-        PERFORM fleet.apply(of_host, of_run, run_at, run_state = 'complete');
+        PERFORM fleet.apply(of_host, of_run, run_at, arrived = expected, run_state = 'complete');
         UPDATE fleet.hosts SET name = document -> 'hostFacts' ->> 'name', product = document -> 'hostFacts' ->> 'product',
             serial = document -> 'hostFacts' ->> 'serial', last_seen = run_at, last_state = run_state,
             last_complete = CASE run_state WHEN 'complete' THEN run_at ELSE last_complete END
@@ -160,28 +176,46 @@ BEGIN
             document -> 'losses', document -> 'notes')
     ON CONFLICT (host, run) DO UPDATE SET at = EXCLUDED.at, state = EXCLUDED.state, is_whole = EXCLUDED.is_whole,
         arrived = EXCLUDED.arrived, instances = EXCLUDED.instances, loaded_at = EXCLUDED.loaded_at;
-    DELETE FROM fleet.inbox WHERE host = of_host AND run = of_run;
+    PERFORM fleet.clear_inbox(of_host, run_at);
+END $$;
+
+-- Puts a record into the inbox, and closes its run when it is the end, or the last one that the end was waiting for.
+CREATE OR REPLACE FUNCTION fleet.take(document jsonb, source text) RETURNS void LANGUAGE plpgsql SET search_path = pg_catalog AS $$
+DECLARE
+    of_host text := document ->> 'host';
+    of_run text := document ->> 'run';
+    closed fleet.runs;
+BEGIN
+    SELECT * INTO closed FROM fleet.runs WHERE host = of_host AND run = of_run;
+    IF closed.is_whole THEN
+        RETURN; -- it came again
+    END IF;
+    INSERT INTO fleet.inbox (host, run, seq, record, source)
+    VALUES (of_host, of_run, (document ->> 'seq')::integer, document, source)
+    ON CONFLICT (host, run, seq) DO UPDATE SET record = EXCLUDED.record;
+    IF document ->> 'record' = 'end' THEN
+        PERFORM fleet.finish(document);
+    ELSIF closed.run IS NOT NULL THEN
+        IF closed.expected < (SELECT count(*) FROM fleet.inbox WHERE host = of_host AND run = of_run) THEN
+            PERFORM fleet.finish(record) FROM fleet.inbox WHERE host = of_host AND run = of_run AND record ->> 'record' = 'end';
+        END IF;
+    END IF;
 END $$;
 
 -- Loads one line. What is wrong with the line itself goes to the rejects; a failure of the database (its disk, a lock,
 -- its shutdown) is raised, so that the shipper keeps the line and tries again.
-CREATE OR REPLACE FUNCTION fleet.load(line text, source text) RETURNS void
+-- bytes: the line's length before the shipper left out NUL, which no text of PostgreSQL holds.
+CREATE OR REPLACE FUNCTION fleet.load(line text, source text, bytes text DEFAULT NULL) RETURNS void
 LANGUAGE plpgsql SECURITY DEFINER SET search_path = pg_catalog AS $$
 DECLARE
     document jsonb;
 BEGIN
+    IF bytes::integer <> octet_length(line) THEN
+        RAISE invalid_parameter_value USING MESSAGE = format('the line held %s bytes NUL', bytes::integer - octet_length(line));
+    END IF;
     document := fleet.parse(line, source);
     PERFORM fleet.check_record(document);
-    IF EXISTS (SELECT FROM fleet.runs WHERE host = document ->> 'host' AND run = document ->> 'run' AND is_whole) THEN
-        RETURN; -- it came again
-    END IF;
-    IF document ->> 'record' = 'end' THEN
-        PERFORM fleet.finish(document);
-    ELSE
-        INSERT INTO fleet.inbox (host, run, seq, record, source)
-        VALUES (document ->> 'host', document ->> 'run', (document ->> 'seq')::integer, document, source)
-        ON CONFLICT (host, run, seq) DO UPDATE SET record = EXCLUDED.record;
-    END IF;
+    PERFORM fleet.take(document, source);
 EXCEPTION WHEN OTHERS THEN
     -- data, a constraint, a feature, a limit of the program; see PostgreSQL's list of error codes
     IF left(SQLSTATE, 2) NOT IN ('22', '23', '0A', '54') THEN
@@ -212,4 +246,4 @@ CREATE OR REPLACE FUNCTION fleet.forget(of_host text) RETURNS void LANGUAGE sql 
 $$;
 
 REVOKE ALL ON ALL FUNCTIONS IN SCHEMA fleet FROM PUBLIC;
-GRANT EXECUTE ON FUNCTION fleet.load(text, text) TO fleet_load;
+GRANT EXECUTE ON FUNCTION fleet.load(text, text, text) TO fleet_load;

@@ -69,7 +69,8 @@ CREATE OR REPLACE VIEW fleet.silent_hosts AS
     SELECT host, name, last_seen FROM fleet.hosts WHERE last_seen < now() - interval '2 days';
 CREATE OR REPLACE VIEW fleet.unfinished_runs AS
     SELECT host, run, count(*) AS records, min(arrived) AS first_arrived, min(source) AS source
-    FROM fleet.inbox GROUP BY host, run HAVING max(arrived) < now() - interval '1 hour';
+    FROM fleet.inbox AS i WHERE NOT EXISTS (SELECT FROM fleet.runs AS r WHERE r.host = i.host AND r.run = i.run)
+    GROUP BY host, run HAVING max(arrived) < now() - interval '1 hour';
 CREATE OR REPLACE VIEW fleet.last_losses AS
     SELECT h.host, h.name, r.at, r.expected - r.arrived AS missing_records, loss ->> 'vendor' AS vendor, loss ->> 'text' AS text
     FROM fleet.hosts AS h JOIN fleet.runs AS r ON r.host = h.host AND r.at = h.last_seen

@@ -33,7 +33,7 @@ class Cluster:
             shutil.chown(folder, "postgres")
         os.chmod(folder, 0o755)
         self.postmaster = None
-        self.connection = f"host={folder} user=postgres dbname=fleet"
+        self.connection = f"postgresql:///fleet?host={folder}&user=postgres"
         try:
             subprocess.run([os.path.join(self.programs, "initdb"), "-D", self.data, "-U", "postgres", "-A", "trust", "-N", "-E", "UTF8",
                             "--locale=C.UTF-8"], check=True, capture_output=True, cwd="/", **self.user)
@@ -41,11 +41,11 @@ class Cluster:
             print(f"skipped: initdb: {getattr(error, 'stderr', error)}", file=sys.stderr)
             sys.exit(SKIPPED)
 
-    def start(self):
+    def start(self, *settings):
         with open(os.path.join(self.folder, "postgres.log"), "ab") as log:
-            self.postmaster = subprocess.Popen(
-                [os.path.join(self.programs, "postgres"), "-D", self.data, "-k", self.folder, "-c", "listen_addresses=", "-c",
-                 "fsync=off", "-c", "shared_buffers=32MB"], stdout=log, stderr=log, cwd="/", **self.user)
+            options = [f"--{each}" for each in ("listen_addresses=", *(settings or ("fsync=off", "shared_buffers=32MB")))]
+            self.postmaster = subprocess.Popen([os.path.join(self.programs, "postgres"), "-D", self.data, "-k", self.folder, *options],
+                                               stdout=log, stderr=log, cwd="/", **self.user)
         wait_until(lambda: subprocess.run([os.path.join(self.programs, "pg_isready"), "-q", "-h", self.folder],
                                           check=False).returncode == 0, "PostgreSQL answers")
 

@@ -95,17 +95,20 @@ class Database(unittest.TestCase):
         self.load(yesterday, today[:3] + today[8:])  # five records did not arrive: nothing appears removed
         self.assertEqual(DATABASE.rows(present), [["complete", True, 0], ["partial", False, 5]])
         self.assert_rows(count, [instances])
-        self.load(today, random.Random(1).sample(today, len(today)), yesterday)  # and again, and again
-        self.assertEqual(DATABASE.rows(present), [["complete", True, 0], ["complete", True, 0]])
-        self.assert_rows(count, [instances])
+        self.load(today[3:7], today[7:8])  # now they do
+        self.assertEqual(DATABASE.rows(present), [["complete", True, 0]] * 2)
+        self.load(today, yesterday)  # again
         self.load(run(machine, 0.5, gone=[LINUX]))  # was on its way for longer than the run after it
-        self.assertEqual(DATABASE.rows(present)[1], ["late", True, 0])
+        self.assertEqual(DATABASE.rows(present), [["complete", True, 0], ["late", True, 0], ["complete", True, 0]])
         self.assert_rows(count, [instances])
+        shuffled = run(host(2))
+        self.load(random.Random(1).sample(shuffled, len(shuffled)), run(host(3), 1)[1:], run(host(3)))
+        self.assert_rows("SELECT state FROM fleet.runs JOIN fleet.hosts USING (host) WHERE name = 'host-00002'", ["complete"])
         self.load(run(host(1))[:-1])
-        self.assert_rows(count, [instances])
         self.assert_rows("SELECT count(*) FROM fleet.inbox", [len(today) - 1])
-        self.assert_rows("SELECT verdict, reason FROM fleet.rejects",  # of the two processors, by the run that lacked records
-                         *[("refused", "the run has no record of the class")] * 2)
+        reason = f"1 of 28 records of host {host(3).id}, run {run(host(3), 1)[0]['run']} never arrived"
+        self.assert_rows("SELECT verdict, reason FROM fleet.rejects", ["expired", reason])
+        self.assert_rows(count, [3 * instances])
 
     def test_hostile_lines_go_through_or_into_the_rejects(self):
         machine = host(0)

@@ -17,7 +17,7 @@ sys.path.insert(0, FLEET)
 import generate  # pylint: disable=wrong-import-position
 
 SKIPPED = 77
-DEADLINE_SECONDS = 60
+DEADLINE_SECONDS = int(os.environ.get("VRX_DEADLINE", "60"))
 TODAY = datetime.datetime.now(datetime.timezone.utc).replace(tzinfo=None, microsecond=0) - datetime.timedelta(minutes=5)
 
 with open(os.path.join(FLEET, "sample.ndjson"), encoding="utf-8") as sample_file:
