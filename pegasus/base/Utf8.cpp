@@ -152,6 +152,12 @@ Utf8DecodeResult decodeUtf8(const char* from, std::size_t size, Char16* to) noex
         to += copied;
         // A block with other bytes, or the last few bytes: decode them, one sequence at a time.
         for (std::size_t i = 0; i < kBlock && at < size; ++i) {
+            const auto byte = static_cast<unsigned char>(from[at]);
+            if (byte < 0x80) {
+                *to++ = Char16(byte);
+                ++at;
+                continue;
+            }
             const Sequence next = readSequence(reinterpret_cast<const unsigned char*>(from + at), size - at);
             if (next.length == 0) {
                 return {to, from + at};

@@ -7,7 +7,6 @@
 #include "pegasus/base/Utf8.h"
 
 #include <algorithm>
-#include <array>
 #include <cstdint>
 #include <optional>
 
@@ -25,16 +24,6 @@ struct Entity
     char character;
 };
 constexpr Entity kEntities[] = {{"lt", '<'}, {"gt", '>'}, {"amp", '&'}, {"quot", '"'}, {"apos", '\''}};
-
-// Per byte: 1 when it means itself in a message.
-constexpr std::array<unsigned char, 256> kPlain = [] {
-    std::array<unsigned char, 256> plain{};
-    for (std::size_t i = 0; i < plain.size(); ++i) {
-        const char c = static_cast<char>(i);
-        plain[i] = c != '&' && c != '\r' ? 1 : 0;
-    }
-    return plain;
-}();
 
 // `digits` of "#65" or "#x41".
 bool appendCharacter(std::string_view digits, std::string& out)
@@ -151,12 +140,7 @@ bool isPadding(std::string_view text)
 
 bool needsResolving(std::string_view text)
 {
-    for (const char c : text) {
-        if (kPlain[static_cast<unsigned char>(c)] == 0) {
-            return true;
-        }
-    }
-    return false;
+    return text.find('&') != std::string_view::npos || text.find('\r') != std::string_view::npos;
 }
 
 std::string resolveReferences(std::string_view text, std::string& out)
