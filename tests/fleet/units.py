@@ -6,7 +6,7 @@ import unittest
 
 from support import FLEET, FolderTest, need
 
-EXAMPLES = "/opt/pegasus-nsp/share/examples/fleet"
+EXAMPLES = "/usr/lib/pegasus-nsp/share/examples/fleet"
 # The exposure that docs/fleet.md names, times ten: a unit must not get weaker without somebody saying so.
 EXPOSURE = {"vrx-fleet.service": 44, "vrx-fleet-ship@.service": 18, "vrx-fleet-load.service": 13}
 
