@@ -17,7 +17,7 @@ import unittest
 from fake_tree import FakeTree
 
 SKIPPED = 77
-SECONDS = 60
+SECONDS = 240  # all questions together, on a machine that does much else
 ROWS = 10000
 HOSTILE = ("</script><script>window.taken = 1</script><img src=x onerror='window.taken = 2'><b id=\"taken\">\" onclick='x'"
            "</td></table><!-- \x01\x7f\x85\u2028\u202e\u2066 &lt;i&gt; ${1} ")
