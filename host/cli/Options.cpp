@@ -24,7 +24,8 @@ constexpr int kMaxDeadlineSeconds = 24 * 60 * 60;
 constexpr char kFooter[] =
     "Everything runs in the root directory, a deployed tree: the program's own folder unless --root names another.\n"
     "Standard output carries the document alone; standard error reports what was lost.\n"
-    "Exit status: 0 complete, 1 failed, 2 wrong usage, 3 partial (something was lost), 130 interrupted.";
+    "Exit status: 0 complete, 1 failed, 2 wrong usage, 3 partial (something was lost), 4 (diff)\n"
+    "something differs, 130 interrupted.";
 
 // Never the working directory, which may be anybody's.
 // Throws: std::filesystem::filesystem_error.
@@ -94,6 +95,8 @@ void AddOptions(CLI::App& app, TOptions& options, std::vector<std::string>& sett
         });
     app.add_option("--log", options.fLogFile, "The host's log, truncated by each run (default ROOT/vrxhost.log)");
     app.add_option("--plugin", options.fPlugin, "The plug-in (default ROOT/libpegasus.nsp.so)");
+    app.add_option("--replay", options.fReplay,
+                   "A record (see the command record) in place of this machine: no root, no server");
     app.add_option("--root", options.fRoot, "The root directory")->check(CLI::ExistingDirectory);
     app.add_option(
         "--state", options.fState,
@@ -202,12 +205,30 @@ void FillDefaults(TOptions& options, const std::vector<std::string>& settings)
         SplitSetting(setting, options);
     }
     for (std::string* path :
-         {&options.fConfigFile, &options.fLogFile, &options.fPlugin, &options.fRoot, &options.fState})
+         {&options.fConfigFile, &options.fLogFile, &options.fPlugin, &options.fReplay, &options.fRoot, &options.fState})
     {
         MakeAbsolute(*path);
     }
     if (options.fRoot.empty()) {
         options.fRoot = ProgramDirectory();
+    }
+}
+
+// Throws: TUsageError when the format cannot hold what the command shows, two records are named, or the command needs
+// the machine.
+void CheckCommand(TOptions& options)
+{
+    if (!options.fCommand->IsShownAs(options.fFormat)) {
+        throw TUsageError(options.fCommandName + " cannot be shown as " + options.fFormat);
+    }
+    const std::string replay = options.fCommand->GetReplay();
+    if (!replay.empty() && !options.fReplay.empty()) {
+        throw TUsageError(options.fCommandName + " names a record of its own: leave --replay out");
+    }
+    options.fReplay += replay;
+    const char* const reason = options.fCommand->WhyNotReplayed();
+    if (reason && !options.fReplay.empty()) {
+        throw TUsageError(options.fCommandName + " needs the machine itself: " + reason);
     }
 }
 
@@ -263,6 +284,7 @@ bool ParseOptions(int argc, const char* const* argv, TOptions& options)
         return false;
     }
     options.fCommandName = options.fCommand->GetName();
+    CheckCommand(options);
     FillDefaults(options, settings);
     return true;
 }

@@ -26,7 +26,8 @@ enum EExitStatus : int
     kComplete = 0,
     kFailed = 1, // there is no inventory
     kUsage = 2,
-    kPartial = 3, // something was lost and is named on standard error
+    kPartial = 3,   // something was lost and is named on standard error
+    kDifferent = 4, // what diff compares is not the same
     kInterrupted = 130
 };
 
@@ -44,6 +45,7 @@ struct TOptions
     bool fPlansConsumer = true; // the server has to know it
     std::string fConfigFile;    // empty: none
     std::string fLogFile;
+    std::string fReplay; // the record in place of the machine; empty for none
     std::vector<std::pair<std::string, std::string>> fSettings;
     bool fVerbose = false;
     bool fQuiet = false;      // without the status line

@@ -3,6 +3,7 @@
 
 #include "host/cli/model/ErrorReport.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstring>
 #include <utility>
@@ -10,9 +11,16 @@
 namespace vrxhost {
 
 TReport::TReport(const TOptions& options, const TStopSignals& stop, TLossLog& losses, TStatusLine& line)
-    : fStop(stop), fLosses(losses), fLine(line), fHead(MakeHead(options.fCommandName)),
+    : fOptions(options), fStop(stop), fLosses(losses), fLine(line), fHead(MakeHead(options.fCommandName)),
       fFormat(MakeFormat(options.fFormat, options.fFormatOptions, [this](const std::string& text) { Write(text); }))
 {
+}
+
+void TReport::SetRecordedHead(const TDocumentHead& head)
+{
+    const std::string command = fHead.fCommand;
+    fHead = head;
+    fHead.fCommand = command;
 }
 
 IInstanceSink* TReport::BeginStream()
@@ -29,12 +37,33 @@ void TReport::Show(TDocument document)
     if (fInterrupted) {
         fLosses.Add("interrupted");
     }
+    if (fHead.fEnded.empty()) {
+        fHead.fEnded = TimeNow();
+    }
+    document.fHead = fHead;
+    document.fRoot = fOptions.fReplay.empty() ? fOptions.fRoot : "";
+    document.fLogFile = fOptions.fLogFile;
     document.fLosses = fLosses.GetLosses();
+    RunFinish(document);
     ReportLosses(document.fLosses);
     document.fComplete = !fPartial;
-    fHead.fEnded = TimeNow();
-    document.fHead = fHead;
+    fDiffers = document.fComparison && document.fComparison->HasDifferences();
     Write(fFormat->Finish(document));
+}
+
+void TReport::RunFinish(TDocument& document)
+{
+    document.fComplete =
+        std::all_of(document.fLosses.begin(), document.fLosses.end(), [](const TLoss& loss) { return loss.fIsNote; });
+    try {
+        if (document.fFinish) {
+            document.fFinish(document);
+        }
+        fOptions.fCommand->Complete(document);
+    } catch (const std::runtime_error& e) {
+        fFailed = true;
+        document.fLosses.push_back(LossOf(e.what()));
+    }
 }
 
 int TReport::WriteAll(const std::string& text)
@@ -81,6 +110,9 @@ EExitStatus TReport::Finish()
     }
     if (fFailed) {
         return kFailed;
+    }
+    if (fDiffers) {
+        return kDifferent;
     }
     return fPartial ? kPartial : kComplete;
 }

@@ -21,8 +21,12 @@ namespace vrxhost {
 class TReport
 {
   public:
-    // stop, losses and line outlive the object. line: removed while the document is written to a terminal.
+    // The arguments outlive the object. line: removed while the document is written to a terminal.
     TReport(const TOptions& options, const TStopSignals& stop, TLossLog& losses, TStatusLine& line);
+
+    // The head of the document: this run's, unless the document is about another's record.
+    const TDocumentHead& GetHead() const { return fHead; }
+    void SetRecordedHead(const TDocumentHead& head);
 
     // Returns: what takes the instances while they are collected; null for a format that needs the whole document.
     IInstanceSink* BeginStream();
@@ -40,10 +44,12 @@ class TReport
     EExitStatus Finish();
 
   private:
+    void RunFinish(TDocument& document);
     void Write(const std::string& text);
     int WriteAll(const std::string& text);
     void ReportLosses(const std::vector<TLoss>& losses);
 
+    const TOptions& fOptions;
     const TStopSignals& fStop;
     TLossLog& fLosses;
     TStatusLine& fLine;
@@ -54,6 +60,7 @@ class TReport
     bool fInterrupted = false; // before the document was written whole
     bool fFailed = false;
     bool fPartial = false;
+    bool fDiffers = false;
     std::set<std::string> fReported; // the sentences on standard error
 };
 

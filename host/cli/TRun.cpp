@@ -2,6 +2,7 @@
 #include "host/cli/TRun.h"
 
 #include "host/cli/collect/TCollector.h"
+#include "host/cli/losses/LibraryCheck.h"
 #include "host/cli/model/ErrorReport.h"
 #include "host/core/TProcessControl.h"
 
@@ -164,6 +165,9 @@ bool TRun::PauseBefore(int attempt) const
 void TRun::UsePlugin()
 {
     TRootObject::SetCoreLogger(&fStepLog);
+    if (fOptions.fCommand->LooksAtTree()) {
+        CheckLibraries(fVendors, fOptions.fRoot, fLosses);
+    }
     TSession session(fOptions.fPlugin, fConsumer);
     OpenNamespace(session);
     if (fLosses.HasNoServer()) {
@@ -180,6 +184,7 @@ void TRun::UsePlugin()
 void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
 {
     TDocument document;
+    document.fHead = fReport.GetHead();
     std::string refused;
     TRegistrationCheck check(ns, fVendors, fLosses);
     if (fOptions.fDeadlineSeconds > 0) {

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 // vrxhost: a command-line host for a namespace-provider plug-in.
 #include "host/cli/Options.h"
+#include "host/cli/Replay.h"
 #include "host/cli/Settings.h"
 #include "host/cli/TDeployedTree.h"
 #include "host/cli/TOwnerCheck.h"
@@ -84,11 +85,16 @@ NKOLVRX20::TUniqueFd EnterRoot(const std::string& root)
 EExitStatus Refuse(const TOptions& options, const std::string& reason, EExitStatus status)
 {
     ReportError(reason);
-    if (options.fFormat == "json" || options.fFormat == "ndjson" || options.fFormat == "html") {
-        TDocument document;
-        document.fHead = MakeHead(options.fCommandName);
-        document.fComplete = false;
-        document.fLosses.push_back(LossOf(reason));
+    TDocument document;
+    document.fHead = MakeHead(options.fCommandName);
+    document.fComplete = false;
+    document.fLosses.push_back(LossOf(reason));
+    if (options.fCommand) {
+        options.fCommand->Complete(document);
+    }
+    if (options.fFormat == "json" || options.fFormat == "ndjson" || options.fFormat == "html" ||
+        !document.fChecks.empty())
+    {
         const auto write = [](const std::string& text) { std::cout << text; };
         const auto format = MakeFormat(options.fFormat, options.fFormatOptions, write);
         format->BeginStream(document.fHead);
@@ -99,6 +105,10 @@ EExitStatus Refuse(const TOptions& options, const std::string& reason, EExitStat
 
 EExitStatus Run(TOptions& options)
 {
+    std::signal(SIGPIPE, SIG_IGN); // a reader that has gone is a write error here
+    if (!options.fReplay.empty()) {
+        return Replay(options);
+    }
     const TPrivateRoot root(TDeployedTree(options.fRoot), options.fState);
     TOwnerCheck owners;
     owners.CheckFile(root.GetPath());
@@ -108,7 +118,6 @@ EExitStatus Run(TOptions& options)
     CheckOwners(options, owners);
     LoadSettings(options.fConfigFile, options.fSettings);
     std::signal(SIGCHLD, SIG_DFL); // inherited as ignored, it would hide how programs ended
-    std::signal(SIGPIPE, SIG_IGN); // a reader that has gone is a write error here
     OpenLog(options);
     TRun run(options);
     const EExitStatus result = run.Execute();

@@ -52,22 +52,12 @@ TCIMValue KeyValue(const ICIMProperty& property)
     }
 }
 
-// The contract gives a property the name of its declaration; a property of this library also has its own.
-std::string NameOf(const ICIMProperty& property)
-{
-    if (const auto* own = dynamic_cast<const TInmemProperty*>(&property)) {
-        return own->GetName();
-    }
-    const auto declaration = property.GetDeclaration(TCIMContext());
-    return declaration ? declaration->GetName(TCIMContext()) : std::string();
-}
-
 std::map<std::string, TCIMValue> ValuesOf(const ICIMInstance& instance)
 {
     std::map<std::string, TCIMValue> values;
     instance.EnumerateProperties(
         [&values](boost::shared_ptr<ICIMProperty> property) {
-            values[NormalizedName(NameOf(*property))] = property->GetValue(TCIMContext());
+            values[NormalizedName(TInmemProperty::NameOf(*property))] = property->GetValue(TCIMContext());
             return true;
         },
         TCIMContext());

@@ -6,6 +6,7 @@
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>
 #include <host/INamespaceProvider.h>
+#include <host/IProvider.h>
 #include <host/TVRXException.h>
 
 namespace NKOLVRX20 {
@@ -34,6 +35,13 @@ template <typename Objects, typename Visitor> void VisitEach(const Objects objec
 }
 
 } // namespace
+
+TInmemNamespace::~TInmemNamespace()
+{
+    for (const auto& each : fClasses) {
+        each.second->ClearInstances();
+    }
+}
 
 void TInmemNamespace::AddClass(const boost::shared_ptr<ICIMClass>& newClass)
 {
@@ -83,7 +91,15 @@ void TInmemNamespace::EnumerateRootClasses(TClassVisitor visitor, TCIMContext co
     });
 }
 
-void TInmemNamespace::EnumerateProviders(TProviderVisitor, TCIMContext) {}
+void TInmemNamespace::EnumerateProviders(TProviderVisitor visitor, TCIMContext)
+{
+    const auto providers = fProviders; // the visitor may change the namespace
+    for (const auto& provider : providers) {
+        if (!visitor(provider)) {
+            return;
+        }
+    }
+}
 
 boost::shared_ptr<ICIMQualifierDecl> TInmemNamespace::AllocateQualifierDecl(const std::string&, TCIMValue,
                                                                             ICIMQualifierDecl::EScope,

@@ -21,6 +21,15 @@ std::string TInmemProperty::GetName() const
     return fName;
 }
 
+std::string TInmemProperty::NameOf(const ICIMProperty& property)
+{
+    if (const auto* own = dynamic_cast<const TInmemProperty*>(&property)) {
+        return own->GetName();
+    }
+    const auto declaration = property.GetDeclaration(TCIMContext());
+    return declaration ? declaration->GetName(TCIMContext()) : std::string();
+}
+
 TCIMValue::TCIMType TInmemProperty::GetType(TCIMContext context) const
 {
     // A value knows its element's code; the property's type is the array's.

@@ -18,6 +18,9 @@ class TInmemProperty : public ICIMProperty
     // Returns: the declaration's name, or the name that the instance was given where the class lacks the property.
     std::string GetName() const;
 
+    // Returns: the name of any property: the contract names it by its declaration, and one of this class knows its own.
+    static std::string NameOf(const ICIMProperty& property);
+
     // Returns: the value's type; for a null of unknown type the declaration's.
     TCIMValue::TCIMType GetType(TCIMContext context) const override;
     bool IsArray(TCIMContext context) const override;

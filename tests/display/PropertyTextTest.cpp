@@ -2,7 +2,6 @@
 // One table of declarations and values for the properties of classes and for those of instances, so that both show a
 // value alike.
 #include "src/schema/TPEGASUSProperty.h"
-#include "tests/host/support/FakeModel.h"
 
 #include <host/ICIMProperty.h>
 #include <host/TInmemInstance.h>
@@ -180,7 +179,7 @@ TEST(PropertyText, ClassAndInstanceShowAValueAlike)
 {
     for (const TRow& row : kRows) {
         SCOPED_TRACE(row.fName);
-        const auto owner = boost::make_shared<TFakeClass>("CIM_A");
+        const auto owner = boost::make_shared<TInmemClass>("CIM_A");
         const auto declaration = owner->Declare("X", row.fValue.GetType());
         for (const auto& [name, value] : row.fQualifiers) {
             declaration->SetQualifier(name, value);

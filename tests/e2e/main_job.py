@@ -119,7 +119,10 @@ class HealthyTree(TreeTest):
 
     def test_documents_match_their_schemas(self):
         schema = self.schema("document")
-        for arguments in (["inventory"], ["summary"], ["class", "LNX_OperatingSystem"],
+        record = self.tree.path("record")
+        self.assertEqual(self.tree.run("record", record)[0], COMPLETE)
+        for arguments in (["inventory", "--replay", record], ["summary", "--replay", record], ["diff", record, record],
+                          ["class", "LNX_OperatingSystem", "--replay", record], ["doctor"],
                           ["invoke", "LNX_OperatingSystem", "CountProcesses", "name=no-such-command"], ["inventry"]):
             _, out, _ = self.tree.run(*arguments, "--format", "json")
             jsonschema.Draft7Validator(schema).validate(json.loads(out))
@@ -136,8 +139,12 @@ class HealthyTree(TreeTest):
         return schema
 
     def test_stable_documents_are_equal(self):
-        first, second = (self.tree.run("inventory", "--format", "json", "--stable")[1] for _ in range(2))
-        self.assertEqual(first, second)
+        """Of this machine and of a record of it."""
+        record = self.tree.path("record")
+        self.tree.run("record", record)
+        shown = ["inventory", "--format", "json", "--stable"]
+        self.assertEqual(self.tree.run(*shown)[1], self.tree.run(*shown, "--replay", record)[1])
+        self.assertEqual(self.tree.run("diff", record)[:2], (COMPLETE, "no difference\n"))
 
     def test_summary_fits_on_a_screen(self):
         status, out, _ = self.tree.run("summary")
@@ -345,6 +352,25 @@ class BrokenTree(TreeTest):
         self.expect_golden("vendor linux, FILE: property FreeBytes of class LNX_Memory is not declared, so that the "
                            "value which provider module linuxinventory sets is lost", classes=["LNX_Memory"],
                            property="FreeBytes")
+
+    def test_doctor_says_what_to_do_about_each_fault(self):
+        self.tree.lay_lamps()
+        replace_in(self.tree.path("pegasus", "provider", "lamps", "lamps.properties.mof"), "uint32 Freq", "string Freq")
+        replace_in(self.tree.vendor("linux.registration.mof"), 'ClassName = "LNX_Processor"', 'ClassName = "LNX_Other"')
+        replace_in(self.tree.vendor("linux.properties.mof"), "uint64 FreeBytes;", "uint64 IdleBytes;")
+        replace_in(self.tree.vendor("linux.classes.xml"), '<class name="LNX_Processor"/>',
+                   '<class name="LNX_Procesor"/><class name="LNX_Processor"/>')
+        status, out, _ = self.tree.run("doctor", "--format", "json")
+        self.assertEqual(status, PARTIAL)
+        answers = [(check["subject"], check["text"], check["advice"])
+                   for check in json.loads(out)["checks"] if not check["ok"] and "advice" in check]
+        for subject, text, advice in (
+                ("vendor lamps", "Frequency of class LAMP_Lamp is declared with another type", "use the same type"),
+                ("vendor linux", "class LNX_Processor: no provider", "add an instance of PG_ProviderCapabilities"),
+                ("vendor linux", "FreeBytes of class LNX_Memory is not declared", "declare the property"),
+                ("vendor linux", "class LNX_Procesor could not be fetched", "correct its name in the class list")):
+            self.assertTrue([1 for found in answers if found[0] == subject and text in found[1] and advice in found[2]],
+                            (text, answers))
 
     def test_invalid_class_name(self):
         replace_in(self.tree.vendor("linux.classes.xml"), '"LNX_Processor"', '"LNX-Processor"')

@@ -28,17 +28,6 @@ std::string TypeText(TCIMValue::TCIMType type)
     return std::string(type.GetName()) + (type.IsArray() ? "[]" : "");
 }
 
-// The contract's property is named by its declaration; where that is absent, the host's own kind knows its name.
-std::string NameOf(const ICIMProperty& property)
-{
-    const auto declaration = property.GetDeclaration(kNoContext);
-    if (declaration) {
-        return declaration->GetName(kNoContext);
-    }
-    const auto* own = dynamic_cast<const TInmemProperty*>(&property);
-    return own ? own->GetName() : std::string();
-}
-
 // A reference, a null one too, points weakly at objects of the plug-in, and even a weak pointer runs the code of the
 // library that made it, which is unloaded before the document goes.
 TCIMValue Detached(const TCIMValue& value)
@@ -183,7 +172,7 @@ TInstanceRecord ReadInstance(const ICIMInstance& instance)
     instance.EnumerateProperties(
         [&](boost::shared_ptr<ICIMProperty> property) {
             record.fProperties.push_back(
-                {NameOf(*property), Detached(property->GetValue(kNoContext)), property->ToString()});
+                {TInmemProperty::NameOf(*property), Detached(property->GetValue(kNoContext)), property->ToString()});
             return true;
         },
         kNoContext);

@@ -6,6 +6,7 @@
 
 #include <host/IProvider.h>
 
+#include <chrono>
 #include <mutex>
 
 #include <strings.h>
@@ -110,6 +111,9 @@ TProviderRecord TCollector::ReadProvider(IProvider& provider, EDetail detail)
     fProviderName = record.fName;
     std::vector<std::string> partial;
     BeginWatch();
+    if (fObserver) {
+        fObserver->BeginProvider(record);
+    }
     for (const TClassPtr& each : ListClasses(provider, record.fName)) {
         if (!fIsStopped()) {
             record.fClasses.push_back(ReadWatchedClass(*each, detail, nullptr));
@@ -164,12 +168,21 @@ TClassRecord TCollector::ReadWatchedClass(ICIMClass& each, EDetail detail, const
     if (detail != EDetail::kNames) {
         Ask("class " + record.fName + " could not be described", [&] { ReadDeclarations(each, record); });
     }
-    if (fSink && detail != EDetail::kNames) {
+    if (fSink && !fObserver && detail != EDetail::kNames) {
         fSink->BeginClass(fProviderName, record);
     }
+    if (fObserver) {
+        Ask("class " + record.fName + " could not be recorded", [&] { fObserver->BeginClass(each, record); });
+    }
     if (detail == EDetail::kInstances && !record.fIsPartial) {
+        const auto begin = std::chrono::steady_clock::now();
         Ask("instances of " + record.fName + " could not be fetched", [&] { ReadInstances(each, record, filter); });
+        const auto took = std::chrono::steady_clock::now() - begin;
+        record.fMilliseconds = std::chrono::duration_cast<std::chrono::milliseconds>(took).count();
         record.fIsPartial = IsGivenUp();
+    }
+    if (fObserver) {
+        fObserver->EndClass(record);
     }
     return record;
 }
@@ -179,6 +192,11 @@ void TCollector::ReadInstances(ICIMClass& each, TClassRecord& record, const TFil
     each.EnumerateInstances(
         [&](boost::shared_ptr<ICIMInstance> instance) {
             Ask("an instance of " + record.fName + " could not be read", [&] {
+                if (fObserver) {
+                    fObserver->Add(*instance);
+                    ++record.fInstanceCount;
+                    return;
+                }
                 TInstanceRecord found = ReadInstance(*instance);
                 ++record.fInstanceCount;
                 if (filter && !filter(found)) {

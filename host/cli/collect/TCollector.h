@@ -4,6 +4,7 @@
 #include "host/cli/collect/IProviderWatch.h"
 #include "host/cli/losses/TLossLog.h"
 #include "host/cli/model/Document.h"
+#include "host/cli/model/IModelObserver.h"
 
 #include <host/ICIMNamespace.h>
 
@@ -31,6 +32,9 @@ class TCollector
 
     // watch: null for none.
     void SetWatch(IProviderWatch* watch) { fWatch = watch; }
+
+    // observer: sees the contract's objects; null for nobody. Instances then go to neither sink nor records.
+    void SetObserver(IModelObserver* observer) { fObserver = observer; }
 
     std::vector<TProviderRecord> ReadProviders(EDetail detail);
 
@@ -65,6 +69,7 @@ class TCollector
     IInstanceSink* fSink = nullptr;
     bool fKeeps = true;
     IProviderWatch* fWatch = nullptr;
+    IModelObserver* fObserver = nullptr;
     std::string fProviderName; // of the class being read
 };
 

@@ -30,10 +30,26 @@ class ICommand
     // Returns: whether Fill looks at the instances itself; they are kept for it then, whatever takes them besides.
     virtual bool NeedsInstances() const { return false; }
 
+    // Returns: the record that the command itself names as its machine, in place of --replay; empty for none.
+    virtual std::string GetReplay() const { return ""; }
+
+    // Returns: whether the format can hold what the command shows.
+    virtual bool IsShownAs(const std::string& format) const;
+
+    // Returns: why the command needs the machine itself, as a sentence; null when a record serves as well.
+    virtual const char* WhyNotReplayed() const { return nullptr; }
+
     // Collects what the command shows.
     // Throws: TRequestError for something that does not exist; nothing is shown then.
     // Blocks: as long as the vendors.
     virtual void Fill(TCollector& from, TDocument& into) const = 0;
+
+    // Returns: whether what the tree consists of is to be looked at before anything is started.
+    virtual bool LooksAtTree() const { return false; }
+
+    // Adds what follows from the losses. Called once before anything is shown, also when there is nothing else to show
+    // because the root was refused or the server did not start.
+    virtual void Complete(TDocument& document) const;
 };
 
 using TCommands = std::vector<std::shared_ptr<ICommand>>;
@@ -42,8 +58,14 @@ using TCommands = std::vector<std::shared_ptr<ICommand>>;
 void AddListCommands(TCommands& commands);
 void AddInstanceCommands(TCommands& commands);
 void AddInvokeCommand(TCommands& commands);
+void AddDoctorCommand(TCommands& commands);
+void AddRecordCommand(TCommands& commands);
+void AddDiffCommand(TCommands& commands);
 void AddSummaryCommands(TCommands& commands);
 
 TCommands MakeCommands();
+
+// Returns: "Vendor NAME  7 classes, 23 instances".
+TFact DescribeVendor(const TProviderRecord& provider);
 
 } // namespace vrxhost

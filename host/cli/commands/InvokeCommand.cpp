@@ -78,6 +78,7 @@ class TInvokeCommand : public ICommand
         command.add_option("NAME=VALUE", fArguments, "Input parameters; elements of an array separated by commas");
     }
 
+    const char* WhyNotReplayed() const override { return "a record answers no calls of methods"; }
     void Fill(TCollector& from, TDocument& into) const override
     {
         into.fDetail = EDetail::kNames;

@@ -78,6 +78,13 @@ class TClassCommand : public ICommand
 
 void ICommand::AddArguments(CLI::App&) {}
 
+void ICommand::Complete(TDocument&) const {}
+
+bool ICommand::IsShownAs(const std::string&) const
+{
+    return true;
+}
+
 void AddListCommands(TCommands& commands)
 {
     commands.push_back(std::make_shared<TInventoryCommand>());
@@ -93,6 +100,8 @@ TCommands MakeCommands()
     AddListCommands(commands);
     AddInstanceCommands(commands);
     AddInvokeCommand(commands);
+    AddRecordCommand(commands);
+    AddDiffCommand(commands);
     return commands;
 }
 

@@ -115,16 +115,6 @@ std::string CountText(std::size_t count, const std::string& noun, const std::str
     return std::to_string(count) + " " + (count == 1 ? noun : plural);
 }
 
-TFact DescribeVendor(const TProviderRecord& provider)
-{
-    std::size_t instances = 0;
-    for (const TClassRecord& each : provider.fClasses) {
-        instances += each.fInstanceCount;
-    }
-    return {"Vendor " + provider.fName, CountText(provider.fClasses.size(), "class", "classes") + ", " +
-                                            CountText(instances, "instance", "instances")};
-}
-
 class TSummaryCommand : public ICommand
 {
   public:
@@ -133,7 +123,7 @@ class TSummaryCommand : public ICommand
     bool NeedsInstances() const override { return true; }
     void Fill(TCollector& from, TDocument& into) const override
     {
-        const THostFacts host = ReadHostFacts();
+        const THostFacts& host = into.fHead.fHost;
         into.fDetail = EDetail::kInstances;
         into.fFacts = {{"Machine", Joined({host.fName, host.fProduct})}};
         TSummary summary;
@@ -152,32 +142,22 @@ class TSummaryCommand : public ICommand
     }
 };
 
-// What a vendor's engineer looks at first: every class with what it costs and how much it delivers.
-class TDoctorCommand : public ICommand
-{
-  public:
-    const char* GetName() const override { return "doctor"; }
-    const char* GetPurpose() const override { return "Check every vendor: what is delivered, what is missing and why"; }
-    void Fill(TCollector& from, TDocument& into) const override
-    {
-        into.fDetail = EDetail::kInstances;
-        into.fProviders = from.ReadProviders(into.fDetail);
-        for (const TProviderRecord& provider : into.fProviders) {
-            into.fFacts.push_back(DescribeVendor(provider));
-            for (const TClassRecord& each : provider.fClasses) {
-                into.fFacts.push_back({"  " + each.fName, CountText(each.fInstanceCount, "instance", "instances")});
-            }
-        }
-        into.fListsLosses = true;
-    }
-};
-
 } // namespace
+
+TFact DescribeVendor(const TProviderRecord& provider)
+{
+    std::size_t instances = 0;
+    for (const TClassRecord& each : provider.fClasses) {
+        instances += each.fInstanceCount;
+    }
+    return {"Vendor " + provider.fName, CountText(provider.fClasses.size(), "class", "classes") + ", " +
+                                            CountText(instances, "instance", "instances")};
+}
 
 void AddSummaryCommands(TCommands& commands)
 {
     commands.push_back(std::make_shared<TSummaryCommand>());
-    commands.push_back(std::make_shared<TDoctorCommand>());
+    AddDoctorCommand(commands);
 }
 
 } // namespace vrxhost

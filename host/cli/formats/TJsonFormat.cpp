@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include "host/cli/formats/Differences.h"
 #include "host/cli/formats/JsonValues.h"
 
 namespace vrxhost {
@@ -24,6 +25,18 @@ TJson Invocation(const TInvocation& invocation)
         outputs[output.fName] = value(output);
     }
     return {{"method", invocation.fMethod}, {"returned", value(invocation.fReturned)}, {"outputs", std::move(outputs)}};
+}
+
+TJson Check(const TCheck& check)
+{
+    TJson json = {{"subject", check.fSubject}, {"ok", check.fIsOk}, {"text", check.fText}};
+    if (!check.fAdvice.empty()) {
+        json["advice"] = check.fAdvice;
+    }
+    if (!check.fLog.empty()) {
+        json["log"] = check.fLog;
+    }
+    return json;
 }
 
 class TJsonFormat : public IFormat
@@ -57,6 +70,13 @@ class TJsonFormat : public IFormat
     {
         for (const TInvocation& invocation : document.fInvocations) {
             json["invocation"] = Invocation(invocation);
+        }
+        for (const TCheck& check : document.fChecks) {
+            json["checks"].push_back(Check(check));
+        }
+        if (document.fComparison) {
+            json["compared"] = JsonComparison(*document.fComparison);
+            return;
         }
         if (!document.fFacts.empty()) {
             json["facts"] = TJson::array();

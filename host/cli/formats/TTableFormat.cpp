@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 // Text for people.
 #include "host/cli/formats/AssociationTree.h"
+#include "host/cli/formats/Differences.h"
 #include "host/cli/formats/TextLayout.h"
 #include "host/cli/formats/ValueText.h"
 
@@ -85,27 +86,36 @@ std::string ClassTree(const std::vector<TProviderRecord>& providers)
     return text;
 }
 
-std::string LossLines(const std::vector<TLoss>& losses, std::size_t width)
+// A line for each part that is well; of the others what is wrong, what to do and what the server's log says.
+std::string CheckLines(const std::vector<TCheck>& checks, std::size_t width)
 {
     std::vector<TLabelled> rows;
-    for (const TLoss& loss : losses) {
-        rows.push_back({loss.fIsNote ? "note" : "missing", Printable(loss.GetText())});
+    for (const TCheck& check : checks) {
+        rows.push_back({check.fSubject, (check.fIsOk ? "ok: " : "FAILED: ") + Printable(check.fText)});
+        if (!check.fAdvice.empty()) {
+            rows.push_back({"  to do", Printable(check.fAdvice)});
+        }
+        for (const std::string& line : check.fLog) {
+            rows.push_back({"  server log", Printable(line)});
+        }
     }
-    if (rows.empty()) {
-        rows.push_back({"ok", "nothing is missing"});
-    }
-    return "\n" + LabelledLines(rows, "", width);
+    return LabelledLines(rows, "", width);
 }
 
 std::string TTableFormat::Finish(const TDocument& document)
 {
+    if (!document.fChecks.empty()) {
+        return CheckLines(document.fChecks, fOptions.fWidth);
+    }
+    if (document.fComparison) {
+        return DifferenceLines(*document.fComparison, fOptions);
+    }
     if (!document.fFacts.empty()) {
         std::vector<TLabelled> rows;
         for (const TFact& fact : document.fFacts) {
             rows.push_back({fact.fLabel, Printable(fact.fText)});
         }
-        return LabelledLines(rows, "", fOptions.fWidth) +
-               (document.fListsLosses ? LossLines(document.fLosses, fOptions.fWidth) : "");
+        return LabelledLines(rows, "", fOptions.fWidth);
     }
     if (!document.fInvocations.empty()) {
         return Invocation(document.fInvocations.front());

@@ -116,12 +116,19 @@ TVendorFiles::TVendorFiles(const std::string& providerDirectory)
             const auto has = [&name](const char* part) { return name.find(part) != std::string::npos; };
             found.fHasDefinitions |= has(".properties.mof");
             found.fHasRegistration |= has(".registration.mof");
-            found.fHasLibrary |= name.rfind("lib", 0) == 0 && has(".so");
+            if (has(".registration.mof")) {
+                found.fRegistrations.push_back(file.path());
+            }
+            if (name.rfind("lib", 0) == 0 && has(".so")) {
+                found.fHasLibrary = true;
+                found.fLibraries.push_back(file.path());
+            }
             if (has(".classes.xml") && file.is_regular_file(error)) {
                 found.fHasClassList = true;
                 fClassLists.push_back(ReadClassList(found.fName, file.path()));
             }
         }
+        std::sort(found.fLibraries.begin(), found.fLibraries.end());
         fFolders.push_back(found);
     }
     SortByName(fFolders, &TVendorFolder::fName);

@@ -31,6 +31,8 @@ struct TVendorFolder
     bool fHasDefinitions = false;  // *.properties.mof
     bool fHasRegistration = false; // *.registration.mof
     bool fHasLibrary = false;
+    std::vector<std::string> fLibraries = {};     // paths of lib*.so*
+    std::vector<std::string> fRegistrations = {}; // paths of *.registration.mof
 };
 
 // What the vendors' folders hold, read from the disk as the plug-in reads it (docs/vendors.md). What cannot be read is

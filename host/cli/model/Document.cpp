@@ -52,7 +52,7 @@ bool TClassRecord::IsA(const std::string& className) const
 
 TDocumentHead MakeHead(const std::string& command)
 {
-    TDocumentHead head{command, ReadHostFacts(), "", TimeNow(), TimeNow()};
+    TDocumentHead head{command, ReadHostFacts(), "", TimeNow(), ""};
     std::ifstream id("/proc/sys/kernel/random/uuid");
     std::getline(id, head.fRunId);
     return head;

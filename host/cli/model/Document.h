@@ -7,6 +7,8 @@
 #include <host/TCIMValue.h>
 
 #include <cstddef>
+#include <functional>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -85,6 +87,7 @@ struct TClassRecord
     std::vector<TInstanceRecord> fInstances;
     std::size_t fInstanceCount = 0; // as delivered; a command may show fewer
     bool fIsPartial = false;        // the provider was given up before it had delivered all
+    long fMilliseconds = 0;         // of the enumeration
 
     // Returns: the declaration, letter case ignored; null when the class lacks it.
     const TPropertyDeclRecord* Find(const std::string& name) const;
@@ -114,6 +117,46 @@ struct TInvocation
     std::string fMethod;
     TPropertyRecord fReturned;
     std::vector<TPropertyRecord> fOutputs;
+};
+
+// What a doctor found out about a part: the tree, the server, a vendor.
+struct TCheck
+{
+    std::string fSubject;
+    bool fIsOk = false;
+    std::string fText;
+    std::string fAdvice;           // what to do
+    std::vector<std::string> fLog; // the server's lines about it
+};
+
+enum class EDifference
+{
+    kAdded,
+    kRemoved,
+    kChanged,
+    kUnknown // one side was not complete there
+};
+
+// What differs between two machines, or between two times of one.
+struct TDifference
+{
+    EDifference fKind;
+    std::string fClass;
+    std::string fPath;                // empty for a class
+    TPropertyDeclRecord fDeclaration; // of a changed property: name, type, units
+    TPropertyRecord fFrom;
+    TPropertyRecord fTo;
+    std::string fReason; // of an unknown one, "NAME was not complete in B"
+};
+
+struct TComparison
+{
+    std::string fFrom; // what the two sides are called
+    std::string fTo;
+    std::vector<TDifference> fDifferences; // class by class
+
+    // Returns: whether something is certain to differ.
+    bool HasDifferences() const;
 };
 
 // Which machine a document is about. What cannot be read (a serial number is root's) is empty.
@@ -146,15 +189,22 @@ TDocumentHead MakeHead(const std::string& command);
 struct TDocument
 {
     TDocumentHead fHead;
+    std::string fRoot;    // of the tree; empty for none, as fLogFile
+    std::string fLogFile; // of the run
     EDetail fDetail = EDetail::kInstances;
-    bool fIsOneClass = false;  // a provider without a name holds the one class
-    bool fIsTree = false;      // classes below their superclasses
-    bool fListsLosses = false; // in the text too, which else leaves them to standard error
+    bool fIsOneClass = false; // a provider without a name holds the one class
+    bool fIsTree = false;     // classes below their superclasses
     std::vector<TProviderRecord> fProviders;
     std::vector<TFact> fFacts;
     std::vector<TInvocation> fInvocations; // at most one
-    std::vector<TLoss> fLosses;            // and notes
+    std::vector<TCheck> fChecks;           // of the doctor
+    std::optional<TComparison> fComparison;
+    std::vector<TLoss> fLosses; // and notes
     bool fComplete = true;
+
+    // Run once, when losses, head and fComplete are known and before anything is shown; null for most commands.
+    // Throws: std::runtime_error, a sentence; the run has failed then.
+    std::function<void(TDocument&)> fFinish;
 };
 
 // Takes instances one by one in place of the document.

@@ -4,8 +4,9 @@
 //   FAKE_WITHOUT_ENTRY_POINTS   the entry points are missing
 // A namespace that is cleared leaves a file "cleared" in the working directory, so that a test sees that the host did
 // shut down.
+#include "host/inmem/TInmemClass.h"
 #include "host/inmem/TInmemNamespace.h"
-#include "tests/host/support/FakeModel.h"
+#include "host/inmem/TInmemProvider.h"
 
 #include <host/INamespaceProvider.h>
 #include <host/INamespaceProviderManager.h>
@@ -56,23 +57,44 @@ TCIMReference ReferenceTo(const std::string& path, const boost::shared_ptr<ICIMN
     return reference;
 }
 
+// Echoes calls, and runs fEnumerate when that is set.
+class TFakeClass : public TInmemClass
+{
+  public:
+    using TInmemClass::InvokeMethod;
+    using TInmemClass::TInmemClass;
+    using TInmemClass::operator=;
+
+    std::function<void(TInstanceVisitor)> fEnumerate;
+
+    void EnumerateInstances(TInstanceVisitor visitor, bool deep, TCIMContext context) override
+    {
+        return fEnumerate ? fEnumerate(visitor) : TInmemClass::EnumerateInstances(visitor, deep, context);
+    }
+    // Returns its first input; the outputs are the path, and the inputs again.
+    TCIMValue InvokeMethod(const TCIMReference& target, const std::string& name, const TCIMContext& inputs,
+                           TCIMContext& outputs, TCIMContext) override
+    {
+        outputs = inputs;
+        outputs["Target"] = TCIMValue(target.GetPath() + " " + name);
+        return inputs.empty() ? TCIMValue() : inputs.begin()->second;
+    }
+};
+
 // A class in which every type occurs, nulls and arrays too.
 boost::shared_ptr<TFakeClass> EveryTypeClass(const boost::shared_ptr<ICIMNamespace>& ns)
 {
     const auto each = boost::make_shared<TFakeClass>("Fake_EveryType", boost::make_shared<TFakeClass>("CIM_Thing"));
-    each->fNamespace = ns;
+    each->SetNamespace(ns);
     each->Declare("ID", TType::kString, true);
     each->Declare("Speed", TType::kUint64)->SetQualifier("Units", TCIMValue("Bits per second"));
     each->Declare("MixedCase", TType::kSint8)->SetQualifier("Counter", TCIMValue(true));
     each->Declare("Names", TType::kStringArray);
-    const auto reset =
-        boost::make_shared<TFakeMethodDecl>("Reset", TType::kUint32,
-                                            std::vector<boost::shared_ptr<ICIMParameterDecl>>{
-                                                boost::make_shared<TFakeParameterDecl>("Force", TType::kBoolean),
-                                                boost::make_shared<TFakeParameterDecl>("Ports", TType::kUint16Array)});
+    const auto reset = each->DeclareMethod("Reset", TType::kUint32);
+    reset->Declare("Force", TType::kBoolean);
+    reset->Declare("Ports", TType::kUint16Array);
     reset->SetQualifier("ValueMap", TCIMValue(TType::kString, 0, {TCIMValue("true")}));
     reset->SetQualifier("Values", TCIMValue(TType::kString, 0, {TCIMValue("Done")}));
-    each->DeclareMethod(reset);
 
     const auto instance = boost::make_shared<TInmemInstance>(each, TCIMContext());
     Put(*instance, "id", "one \"two\"\x1b[31m");
@@ -139,28 +161,6 @@ boost::shared_ptr<TFakeClass> BrokenClass()
     return broken;
 }
 
-class TFakeProvider : public IProvider
-{
-  public:
-    explicit TFakeProvider(std::vector<boost::shared_ptr<ICIMClass>> classes) : fClasses(std::move(classes)) {}
-    std::string GetName(TCIMContext) const override { return "fake"; }
-    std::string GetModuleName(TCIMContext) const override { return "libfake"; }
-    std::string GetDescription(TCIMContext) const override { return "a fake"; }
-    boost::shared_ptr<ICIMNamespace> GetNamespace(TCIMContext) const override { ThrowUnused(); }
-    void EnumerateClassesProvided(TClassVisitor visitor, TCIMContext) override
-    {
-        for (const auto& each : fClasses) {
-            if (!visitor(each)) {
-                return;
-            }
-        }
-    }
-    IProvider& operator=(const IProvider&) override { ThrowUnused(); }
-
-  private:
-    std::vector<boost::shared_ptr<ICIMClass>> fClasses;
-};
-
 class TFakeNamespace : public TInmemNamespace
 {
   public:
@@ -181,7 +181,11 @@ class TFakeNamespace : public TInmemNamespace
     void Fill(const boost::shared_ptr<ICIMNamespace>& self)
     {
         fClasses = {EveryTypeClass(self), BrokenClass(), ManyClass()};
-        fProviders.push_back(boost::make_shared<TFakeProvider>(fClasses));
+        const auto provider = boost::make_shared<TInmemProvider>("fake", "libfake", "a fake");
+        for (const auto& each : fClasses) {
+            provider->AddClass(each);
+        }
+        fProviders.push_back(provider);
         if (HasFault("threads")) {
             fProviders.insert(fProviders.end(), 7, fProviders.front());
         }

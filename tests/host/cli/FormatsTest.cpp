@@ -3,8 +3,8 @@
 #include "host/cli/collect/TCollector.h"
 #include "host/cli/formats/HtmlText.h"
 #include "host/cli/formats/IFormat.h"
+#include "host/inmem/TInmemClass.h"
 #include "host/inmem/TInmemNamespace.h"
-#include "tests/host/support/FakeModel.h"
 
 #include <host/TInmemInstance.h>
 
@@ -102,22 +102,23 @@ TEST(HtmlFormat, PropertiesThatTheFirstRowsLackHaveAColumn)
 constexpr int kInstances = 100000;
 
 // Delivers instances that exist no longer than their visit, and watches the heap meanwhile.
-class TPassingInstances
+class TPassingInstances : public TInmemClass
 {
   public:
-    explicit TPassingInstances(TFakeClass& owner)
+    using TInmemClass::TInmemClass;
+    using TInmemClass::operator=;
+
+    void EnumerateInstances(TInstanceVisitor visitor, bool, TCIMContext) override
     {
-        owner.fEnumerate = [this, &owner](TInstanceVisitor visitor) {
-            for (int i = 0; i < kInstances; ++i) {
-                const auto instance = boost::make_shared<TInmemInstance>(owner.shared_from_this(), TCIMContext());
-                instance->SetPropertyValue("Number", TCIMValue(i), TCIMContext());
-                instance->SetPropertyValue("Text", TCIMValue(std::string(200, 'x')), TCIMContext());
-                fKept += fLast.lock() ? 1 : 0;
-                fLast = instance;
-                visitor(instance);
-                Measure(i);
-            }
-        };
+        for (int i = 0; i < kInstances; ++i) {
+            const auto instance = boost::make_shared<TInmemInstance>(shared_from_this(), TCIMContext());
+            instance->SetPropertyValue("Number", TCIMValue(i), TCIMContext());
+            instance->SetPropertyValue("Text", TCIMValue(std::string(200, 'x')), TCIMContext());
+            fKept += fLast.lock() ? 1 : 0;
+            fLast = instance;
+            visitor(instance);
+            Measure(i);
+        }
     }
 
     int fKept = 0; // instances that outlived their visit
@@ -149,11 +150,10 @@ TEST(StreamedFormats, MemoryDoesNotGrowWithTheNumberOfInstances)
         TLossLog losses("/");
         TCollector collector(ns, losses, [] { return false; });
         collector.SetSink(format->BeginStream({}), false);
-        const auto owner = boost::make_shared<TFakeClass>("X_Passing");
-        const TPassingInstances passing(*owner);
+        const auto owner = boost::make_shared<TPassingInstances>("X_Passing");
         EXPECT_EQ(collector.ReadClass(*owner, EDetail::kInstances).fInstanceCount, 100000u);
-        EXPECT_EQ(passing.fKept, 0) << name;
-        EXPECT_LE(passing.fGrowth, kMaxGrowth) << name;
+        EXPECT_EQ(owner->fKept, 0) << name;
+        EXPECT_LE(owner->fGrowth, kMaxGrowth) << name;
         EXPECT_GT(written, 20000000u) << name;
     }
 }

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
+#include "host/inmem/TInmemClass.h"
 #include "host/inmem/TInmemNamespace.h"
-#include "tests/host/support/FakeModel.h"
 
 #include <host/ICIMProperty.h>
 #include <host/TInmemInstance.h>
@@ -16,9 +16,9 @@ namespace {
 using TType = TCIMValue::TCIMType;
 using testing::ElementsAre;
 
-boost::shared_ptr<TFakeClass> FanClass()
+boost::shared_ptr<TInmemClass> FanClass()
 {
-    const auto fan = boost::make_shared<TFakeClass>("CIM_Fan");
+    const auto fan = boost::make_shared<TInmemClass>("CIM_Fan");
     fan->Declare("SystemName", TType::kString, true);
     fan->Declare("DeviceID", TType::kUint16, true);
     fan->Declare("Speed", TType::kUint32);
@@ -64,7 +64,7 @@ TEST(TInmemInstance, PathHoldsTheKeysInTheOrderOfTheClass)
 {
     const auto fanClass = FanClass();
     const auto ns = boost::make_shared<TInmemNamespace>();
-    fanClass->fNamespace = ns;
+    fanClass->SetNamespace(ns);
     const TCIMReference reference = Fan(fanClass, 7)->BuildPath(TCIMContext());
     EXPECT_EQ(reference.GetPath(), "CIM_Fan.SystemName=\"a\\\"b\\\\c\",DeviceID=7");
     EXPECT_EQ(reference.GetNamespace(), ns);
@@ -104,7 +104,7 @@ TEST(TInmemInstance, PathHoldsEachKeyInItsDeclaredType)
 {
     for (const TKeyRow& row : kKeys) {
         SCOPED_TRACE(row.fName);
-        const auto keyed = boost::make_shared<TFakeClass>("CIM_A");
+        const auto keyed = boost::make_shared<TInmemClass>("CIM_A");
         keyed->Declare("K", row.fDeclared, true);
         const auto instance = boost::make_shared<TInmemInstance>(keyed, TCIMContext());
         instance->SetPropertyValue("k", row.fValue, TCIMContext());
@@ -117,9 +117,15 @@ TEST(TInmemInstance, EntersAndLeavesItsClass)
     const auto fanClass = FanClass();
     const auto fan = Fan(fanClass, 1);
     fan->AddToNamespace(TCIMContext());
-    EXPECT_THAT(fanClass->fInstances, ElementsAre(fan));
+    const auto served = [&fanClass] {
+        std::vector<boost::shared_ptr<ICIMInstance>> instances;
+        fanClass->EnumerateInstances(
+            [&](boost::shared_ptr<ICIMInstance> each) { return instances.push_back(each), true; }, false, {});
+        return instances;
+    };
+    EXPECT_THAT(served(), ElementsAre(fan));
     fan->Delete(TCIMContext());
-    EXPECT_THAT(fanClass->fInstances, ElementsAre());
+    EXPECT_THAT(served(), ElementsAre());
 }
 
 TEST(TInmemInstance, ComparesAndCopiesByClassAndValues)
@@ -140,7 +146,7 @@ TEST(TInmemProperty, OutlivesItsClassWithPlainText)
 {
     boost::shared_ptr<ICIMProperty> property;
     {
-        const auto fan = boost::make_shared<TFakeClass>("CIM_Fan");
+        const auto fan = boost::make_shared<TInmemClass>("CIM_Fan");
         fan->Declare("X", TType::kSint32)->SetQualifier("Units", TCIMValue("Bytes"));
         const auto instance = boost::make_shared<TInmemInstance>(fan, TCIMContext());
         instance->SetPropertyValue("X", TCIMValue(1), TCIMContext());
@@ -153,7 +159,7 @@ TEST(TInmemProperty, OutlivesItsClassWithPlainText)
 
 TEST(TInmemProperty, RemembersThePreviousValueAndTheDefault)
 {
-    const auto fan = boost::make_shared<TFakeClass>("CIM_Fan");
+    const auto fan = boost::make_shared<TInmemClass>("CIM_Fan");
     fan->Declare("X", TType::kSint32)->SetDefaultValue(TCIMValue(1), TCIMContext());
     const auto instance = boost::make_shared<TInmemInstance>(fan, TCIMContext());
     instance->SetPropertyValue("X", TCIMValue(1), TCIMContext());

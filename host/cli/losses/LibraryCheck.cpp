@@ -1,0 +1,122 @@
+// SPDX-License-Identifier: MIT
+#include "host/cli/losses/LibraryCheck.h"
+
+#include "host/core/TChildProcess.h"
+
+#include <algorithm>
+#include <chrono>
+#include <filesystem>
+#include <fstream>
+#include <regex>
+#include <sstream>
+
+namespace vrxhost {
+namespace {
+
+namespace fs = std::filesystem;
+
+constexpr char kLoader[] = "/lib64/ld-linux-x86-64.so.2"; // the platform's, by its ABI
+constexpr int kLoaderTimeoutSeconds = 10;
+constexpr std::size_t kMaxRegistrationBytes = 1024 * 1024;
+
+std::string SearchPath(const TVendorFiles& files, const std::string& root)
+{
+    std::string path = root + "/pegasus/lib:" + root;
+    for (const TVendorFolder& folder : files.GetFolders()) {
+        path += ":" + folder.fPath;
+    }
+    return path;
+}
+
+// What ldd -r does: the loader lists what it would load and bind.
+NKOLVRX20::TProcessOutcome AskLoader(const std::string& library, const std::string& searchPath)
+{
+    NKOLVRX20::TProcessRequest request;
+    request.fProgram = kLoader;
+    request.fArguments = {kLoader, library};
+    request.fEnvironment = {"LD_TRACE_LOADED_OBJECTS=1", "LD_WARN=yes", "LD_BIND_NOW=yes",
+                            "LD_LIBRARY_PATH=" + searchPath};
+    return NKOLVRX20::TChildProcess(request).Run(std::chrono::seconds(kLoaderTimeoutSeconds));
+}
+
+void AddMissing(std::vector<std::string>& missing, const std::string& text)
+{
+    constexpr std::size_t kShown = 5;
+    if (missing.size() < kShown && std::find(missing.begin(), missing.end(), text) == missing.end()) {
+        missing.push_back(text);
+    }
+}
+
+// Returns: what is missing, as text; empty for a library that loads. What a missing library would define is left out.
+std::string DescribeMissing(const NKOLVRX20::TProcessOutcome& outcome)
+{
+    static const std::regex kLibrary("\\s*(\\S+) => not found");
+    static const std::regex kSymbol("undefined symbol: ([^\\s,]+).*");
+    static const std::regex kOther(".*error while loading shared libraries: (.*)");
+    std::vector<std::string> libraries;
+    std::vector<std::string> symbols;
+    std::istringstream lines(outcome.fOutput + "\n" + outcome.fErrorOutput);
+    for (std::string line; std::getline(lines, line);) {
+        std::smatch parts;
+        if (std::regex_match(line, parts, kLibrary)) {
+            AddMissing(libraries, "the library " + parts[1].str() + " is missing");
+        } else if (std::regex_match(line, parts, kSymbol)) {
+            AddMissing(symbols, "the symbol " + parts[1].str() + " is missing");
+        } else if (std::regex_match(line, parts, kOther)) {
+            AddMissing(libraries, parts[1]);
+        }
+    }
+    return JoinNames(libraries.empty() ? symbols : libraries);
+}
+
+bool Exists(const std::string& name, const TVendorFiles& files, const std::string& root)
+{
+    const auto isIn = [&name](const std::string& folder) { return fs::exists(fs::path(folder) / name); };
+    return isIn(root + "/pegasus/lib") ||
+           std::any_of(files.GetFolders().begin(), files.GetFolders().end(),
+                       [&isIn](const TVendorFolder& folder) { return isIn(folder.fPath); });
+}
+
+void Enter(TLossLog& losses, const TVendorFolder& folder, const std::string& file, const std::string& sentence)
+{
+    TLoss loss;
+    loss.fVendor = folder.fName;
+    loss.fFile = file;
+    loss.fBegin = sentence;
+    losses.Add(loss);
+}
+
+void CheckLocations(const TVendorFolder& folder, const TVendorFiles& files, const std::string& root, TLossLog& losses)
+{
+    static const std::regex kLocation("Location\\s*=\\s*\"([^\"]+)\"", std::regex::icase);
+    for (const std::string& path : folder.fRegistrations) {
+        std::string text(kMaxRegistrationBytes, '\0');
+        std::ifstream file(path, std::ios::binary);
+        file.read(text.data(), static_cast<std::streamsize>(text.size()));
+        text.resize(static_cast<std::size_t>(file.gcount()));
+        for (std::sregex_iterator found(text.begin(), text.end(), kLocation), end; found != end; ++found) {
+            const std::string name = "lib" + (*found)[1].str() + ".so";
+            if (!Exists(name, files, root)) {
+                Enter(losses, folder, path, "the library " + name + " (Location) is in no vendor's folder");
+            }
+        }
+    }
+}
+
+} // namespace
+
+void CheckLibraries(const TVendorFiles& files, const std::string& root, TLossLog& losses)
+{
+    const std::string searchPath = SearchPath(files, root);
+    for (const TVendorFolder& folder : files.GetFolders()) {
+        CheckLocations(folder, files, root, losses);
+        for (const std::string& library : folder.fLibraries) {
+            const std::string missing = DescribeMissing(AskLoader(library, searchPath));
+            if (!missing.empty()) {
+                Enter(losses, folder, library, "the library cannot be loaded: " + missing);
+            }
+        }
+    }
+}
+
+} // namespace vrxhost
