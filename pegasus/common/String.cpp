@@ -9,6 +9,7 @@
 #include <cstdio>
 #include <cstring>
 #include <functional>
+#include <memory>
 #include <new>
 #include <ostream>
 #include <vector>
@@ -241,11 +242,22 @@ const Char16* String::getChar16Data() const
 
 CString String::getCString() const
 {
-    const std::string utf8 = base::utf8(*this);
     // An embedded zero stays: the bytes are the whole text.
-    auto* bytes = new char[utf8.size() + 1];
-    std::memcpy(bytes, utf8.c_str(), utf8.size() + 1);
-    return CString(bytes);
+    const Char16* units = getChar16Data();
+    const Uint32 count = size();
+    std::unique_ptr<char[]> bytes(new char[count + 1UL]);
+    Uint32 ascii = 0;
+    for (; ascii < count && Uint16(units[ascii]) < 0x80; ++ascii) {
+        bytes[ascii] = static_cast<char>(Uint16(units[ascii]));
+    }
+    if (ascii < count) {
+        const std::string utf8 = base::utf8(*this);
+        bytes.reset(new char[utf8.size() + 1]);
+        std::memcpy(bytes.get(), utf8.c_str(), utf8.size() + 1);
+    } else {
+        bytes[count] = '\0';
+    }
+    return CString(bytes.release());
 }
 
 Char16& String::operator[](Uint32 index)

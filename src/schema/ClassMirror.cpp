@@ -68,11 +68,12 @@ template <typename TSource> void TClassMirror::MirrorQualifiers(const TSource& s
 
 void TClassMirror::MirrorQualifier(const Pegasus::CIMConstQualifier& source, ICIMNamedElement& element)
 {
-    const auto declaration = DeclarationOf(source.getName());
+    const std::string name = NameOf(source);
+    const auto declaration = DeclarationOf(source.getName(), name);
     if (!declaration) {
         return;
     }
-    const auto qualifier = element.AllocateQualifier(declaration, ValueOf(source, NameOf(source)),
+    const auto qualifier = element.AllocateQualifier(declaration, ValueOf(source, name),
                                                      FlavorFromText(ToStdString(source.getFlavor().toString())), {});
     boost::static_pointer_cast<TPEGASUSQualifier>(qualifier)->SetPropagated(source.getPropagated() != 0);
     element.AddQualifier(qualifier, {});
@@ -87,9 +88,9 @@ template <typename TSource> TCIMValue TClassMirror::ValueOf(const TSource& sourc
     return value;
 }
 
-boost::shared_ptr<ICIMQualifierDecl> TClassMirror::DeclarationOf(const Pegasus::CIMName& qualifier)
+boost::shared_ptr<ICIMQualifierDecl> TClassMirror::DeclarationOf(const Pegasus::CIMName& qualifier,
+                                                                 const std::string& name)
 {
-    const std::string name = ToStdString(qualifier.getString());
     if (const auto known = fNamespace.FindQualifierDecl(name)) {
         return known;
     }

@@ -43,7 +43,7 @@ class TClassMirror
     void MirrorParameter(const Pegasus::CIMConstParameter& source, TPEGASUSMethodDecl& method);
     TCIMValue::TCIMType PropertyType(const Pegasus::CIMConstProperty& source, const std::string& name) const;
     template <typename TSource> TCIMValue ValueOf(const TSource& source, const std::string& name) const;
-    boost::shared_ptr<ICIMQualifierDecl> DeclarationOf(const Pegasus::CIMName& qualifier);
+    boost::shared_ptr<ICIMQualifierDecl> DeclarationOf(const Pegasus::CIMName& qualifier, const std::string& name);
     boost::shared_ptr<ICIMQualifierDecl> FetchDeclaration(const Pegasus::CIMName& qualifier, const std::string& name);
 
     TPEGASUSClass& fTarget;

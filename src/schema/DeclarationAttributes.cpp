@@ -1,24 +1,49 @@
 // SPDX-License-Identifier: MIT
 #include "src/schema/DeclarationAttributes.h"
 
-#include <map>
-#include <sstream>
+#include <algorithm>
+#include <cstddef>
+#include <iterator>
+#include <string_view>
 
 namespace NKOLVRX20 {
 
 namespace {
 
-// The words arrive in upper case from CIMFlavor and CIMScope, whatever the MOF had. A word that the host lacks a bit
-// for is skipped, so that a server of a later version can still be read.
-template <typename TBits> TBits BitsFromText(const std::string& text, const std::map<std::string, TBits>& words)
+using TDecl = ICIMQualifierDecl;
+
+template <typename TBits> struct TWord
+{
+    std::string_view fText;
+    TBits fBit;
+};
+
+// In upper case, as they arrive from CIMFlavor and CIMScope, whatever the MOF had.
+constexpr TWord<TDecl::EFlavor> kFlavorWords[] = {
+    {"OVERRIDABLE", TDecl::kFlavorOverridable},         {"TOSUBCLASS", TDecl::kFlavorToSubclass},
+    {"TOINSTANCE", TDecl::kFlavorToInstance},           {"TRANSLATABLE", TDecl::kFlavorTranslatable},
+    {"DISABLEOVERRIDE", TDecl::kFlavorDisableOverride}, {"RESTRICTED", TDecl::kFlavorRestricted},
+};
+constexpr TWord<TDecl::EScope> kScopeWords[] = {
+    {"CLASS", TDecl::kScopeClass},           {"ASSOCIATION", TDecl::kScopeAssociation},
+    {"INDICATION", TDecl::kScopeIndication}, {"PROPERTY", TDecl::kScopeProperty},
+    {"REFERENCE", TDecl::kScopeReference},   {"METHOD", TDecl::kScopeMethod},
+    {"PARAMETER", TDecl::kScopeParameter},
+};
+
+// A word that the host lacks a bit for is skipped, so that a server of a later version can still be read.
+template <typename TBits, std::size_t kCount>
+TBits BitsFromText(std::string_view text, const TWord<TBits> (&words)[kCount])
 {
     TBits bits = TBits(0);
-    std::istringstream stream(text);
-    for (std::string word; stream >> word;) {
-        const auto known = words.find(word);
-        if (known != words.end()) {
-            bits = WithBits(bits, known->second);
+    while (!text.empty()) {
+        const std::string_view word = text.substr(0, text.find(' '));
+        const auto known = std::find_if(std::begin(words), std::end(words),
+                                        [word](const TWord<TBits>& each) { return each.fText == word; });
+        if (known != std::end(words)) {
+            bits = WithBits(bits, known->fBit);
         }
+        text.remove_prefix(std::min(word.size() + 1, text.size()));
     }
     return bits;
 }
@@ -27,25 +52,12 @@ template <typename TBits> TBits BitsFromText(const std::string& text, const std:
 
 ICIMQualifierDecl::EFlavor FlavorFromText(const std::string& text)
 {
-    using TDecl = ICIMQualifierDecl;
-    return BitsFromText<TDecl::EFlavor>(text, {{"OVERRIDABLE", TDecl::kFlavorOverridable},
-                                               {"TOSUBCLASS", TDecl::kFlavorToSubclass},
-                                               {"TOINSTANCE", TDecl::kFlavorToInstance},
-                                               {"TRANSLATABLE", TDecl::kFlavorTranslatable},
-                                               {"DISABLEOVERRIDE", TDecl::kFlavorDisableOverride},
-                                               {"RESTRICTED", TDecl::kFlavorRestricted}});
+    return BitsFromText(text, kFlavorWords);
 }
 
 ICIMQualifierDecl::EScope ScopeFromText(const std::string& text)
 {
-    using TDecl = ICIMQualifierDecl;
-    return BitsFromText<TDecl::EScope>(text, {{"CLASS", TDecl::kScopeClass},
-                                              {"ASSOCIATION", TDecl::kScopeAssociation},
-                                              {"INDICATION", TDecl::kScopeIndication},
-                                              {"PROPERTY", TDecl::kScopeProperty},
-                                              {"REFERENCE", TDecl::kScopeReference},
-                                              {"METHOD", TDecl::kScopeMethod},
-                                              {"PARAMETER", TDecl::kScopeParameter}});
+    return BitsFromText(text, kScopeWords);
 }
 
 } // namespace NKOLVRX20

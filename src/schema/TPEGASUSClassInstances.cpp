@@ -54,7 +54,7 @@ void TPEGASUSClass::EnumerateInstances(TInstanceVisitor visitor, bool deep, TCIM
     const TInstanceRetrieval retrieval(*this, "EnumerateInstances");
     LogProgress("TPEGASUSClass::EnumerateInstances ", fName);
     retrieval.LogCallingNamespace();
-    const auto answer = retrieval.AskProvider(deep, EnumerationTimeoutMs(*this));
+    auto answer = retrieval.AskProvider(deep, EnumerationTimeoutMs(*this));
     if (!answer) {
         return;
     }
@@ -62,6 +62,7 @@ void TPEGASUSClass::EnumerateInstances(TInstanceVisitor visitor, bool deep, TCIM
     bool goesOn = true;
     for (Pegasus::Uint32 i = 0; i < answer->size() && goesOn; ++i) {
         const auto built = retrieval.Build(*answer, i);
+        (*answer)[i] = Pegasus::CIMInstance(); // a host that keeps the instances holds each of them once
         if (!built) {
             continue;
         }
