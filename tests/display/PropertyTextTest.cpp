@@ -1,9 +1,11 @@
 // SPDX-License-Identifier: MIT
 // One table of declarations and values for the properties of classes and for those of instances, so that both show a
 // value alike.
+#include "host/inmem/TInmemClass.h"
 #include "src/schema/TPEGASUSProperty.h"
 
 #include <host/ICIMProperty.h>
+#include <host/ICIMPropertyDecl.h>
 #include <host/TInmemInstance.h>
 
 #include <boost/make_shared.hpp>
