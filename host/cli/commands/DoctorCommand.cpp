@@ -111,8 +111,8 @@ TCheck CheckOf(const TProviderRecord& provider, const TDocument& document)
         }
     }
     if (slowest) {
-        check.fText += ", in " + std::to_string(total) + " ms (" + slowest->fName + " " +
-                       std::to_string(slowest->fMilliseconds) + " ms)";
+        check.fTook =
+            std::to_string(total) + " ms (" + slowest->fName + " " + std::to_string(slowest->fMilliseconds) + " ms)";
     }
     return check;
 }
@@ -142,7 +142,7 @@ class TDoctorCommand : public ICommand
             }
         }
         if (document.fChecks.empty()) {
-            document.fChecks.push_back({"tree", true, "there is no vendor", "", {}});
+            document.fChecks.push_back({"tree", true, "there is no vendor", "", {}, ""});
         }
     }
 };

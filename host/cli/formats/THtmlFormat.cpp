@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 // One page that needs nothing else: tables of instances, written while these arrive, then what is known at the end.
+#include "host/cli/formats/Differences.h"
 #include "host/cli/formats/HtmlParts.h"
 #include "host/cli/formats/HtmlText.h"
 #include "host/cli/formats/IFormat.h"
@@ -182,7 +183,13 @@ class THtmlFormat : public IFormat, public IInstanceSink
                 facts.emplace_back(output.fName.c_str(), ResultText(output));
             }
         }
+        for (const TCheck& check : document.fChecks) {
+            const std::string took = check.fTook.empty() || fOptions.fStable ? "" : ", in " + check.fTook;
+            facts.emplace_back(check.fSubject, (check.fIsOk ? "ok: " : "FAILED: ") + check.fText + took);
+            facts.emplace_back("To do", check.fAdvice);
+        }
         text += facts.empty() ? "" : HtmlFacts(facts);
+        text += document.fComparison ? HtmlElement("pre", DifferenceLines(*document.fComparison, fOptions)) + "\n" : "";
         text += HtmlLosses(document.fLosses) + Contents(document);
         return text + HtmlDevices(fLinks) + "</section>\n";
     }

@@ -27,7 +27,7 @@ TJson Invocation(const TInvocation& invocation)
     return {{"method", invocation.fMethod}, {"returned", value(invocation.fReturned)}, {"outputs", std::move(outputs)}};
 }
 
-TJson Check(const TCheck& check)
+TJson Check(const TCheck& check, bool isStable)
 {
     TJson json = {{"subject", check.fSubject}, {"ok", check.fIsOk}, {"text", check.fText}};
     if (!check.fAdvice.empty()) {
@@ -35,6 +35,9 @@ TJson Check(const TCheck& check)
     }
     if (!check.fLog.empty()) {
         json["log"] = check.fLog;
+    }
+    if (!check.fTook.empty() && !isStable) {
+        json["took"] = check.fTook;
     }
     return json;
 }
@@ -72,7 +75,7 @@ class TJsonFormat : public IFormat
             json["invocation"] = Invocation(invocation);
         }
         for (const TCheck& check : document.fChecks) {
-            json["checks"].push_back(Check(check));
+            json["checks"].push_back(Check(check, fOptions.fStable));
         }
         if (document.fComparison) {
             json["compared"] = JsonComparison(*document.fComparison);

@@ -87,11 +87,12 @@ std::string ClassTree(const std::vector<TProviderRecord>& providers)
 }
 
 // A line for each part that is well; of the others what is wrong, what to do and what the server's log says.
-std::string CheckLines(const std::vector<TCheck>& checks, std::size_t width)
+std::string CheckLines(const std::vector<TCheck>& checks, const TFormatOptions& options)
 {
     std::vector<TLabelled> rows;
     for (const TCheck& check : checks) {
-        rows.push_back({check.fSubject, (check.fIsOk ? "ok: " : "FAILED: ") + Printable(check.fText)});
+        const std::string took = check.fTook.empty() || options.fStable ? "" : ", in " + check.fTook;
+        rows.push_back({check.fSubject, (check.fIsOk ? "ok: " : "FAILED: ") + Printable(check.fText + took)});
         if (!check.fAdvice.empty()) {
             rows.push_back({"  to do", Printable(check.fAdvice)});
         }
@@ -99,13 +100,13 @@ std::string CheckLines(const std::vector<TCheck>& checks, std::size_t width)
             rows.push_back({"  server log", Printable(line)});
         }
     }
-    return LabelledLines(rows, "", width);
+    return LabelledLines(rows, "", options.fWidth);
 }
 
 std::string TTableFormat::Finish(const TDocument& document)
 {
     if (!document.fChecks.empty()) {
-        return CheckLines(document.fChecks, fOptions.fWidth);
+        return CheckLines(document.fChecks, fOptions);
     }
     if (document.fComparison) {
         return DifferenceLines(*document.fComparison, fOptions);

@@ -127,6 +127,7 @@ struct TCheck
     std::string fText;
     std::string fAdvice;           // what to do
     std::vector<std::string> fLog; // the server's lines about it
+    std::string fTook;             // the time of the enumerations; differs from run to run
 };
 
 enum class EDifference
