@@ -5,7 +5,7 @@
 
 namespace vrxhost {
 
-// Is told by the collector whom it asks, and decides when a provider has taken too long.
+// Hears from the collector whom it asks, and decides when a provider has taken too long.
 class IProviderWatch
 {
   public:

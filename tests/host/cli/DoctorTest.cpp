@@ -98,7 +98,7 @@ const TTreeRow kTrees[] = {
     {"a server that does not start", [](const fs::path&) {}, "throws-status", 1, "server",
      "the namespace could not be opened: The connection to the CIM server failed (status 42)",
      std::string("read the server's log from its end, or run pegasus/bin/cimserver by hand") + kLogs},
-    {"a library that is none",
+    {"a text in place of a library",
      [](const fs::path& root) { Write(root / "pegasus/provider/acme/libacme.so", "no library"); }, "", 3, "vendor acme",
      "vendor acme, ROOT/pegasus/provider/acme/libacme.so: the library cannot be loaded: "
      "ROOT/pegasus/provider/acme/libacme.so: file too short",
