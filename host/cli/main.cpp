@@ -87,6 +87,7 @@ EExitStatus Refuse(const TOptions& options, const std::string& reason, EExitStat
     ReportError(reason);
     TDocument document;
     document.fHead = MakeHead(options.fCommandName);
+    document.fHead.fEnded = TimeNow();
     document.fComplete = false;
     document.fLosses.push_back(LossOf(reason));
     if (options.fCommand) {
