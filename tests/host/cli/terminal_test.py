@@ -83,7 +83,7 @@ class StatusLine(unittest.TestCase):
             self.read_until(None)
             os.unlink(os.path.join(self.tree.root, "go"))
             self.assertLessEqual(max(map(len, self.lines())), widest)
-            self.assertIn("vrxhost", self.lines()[0])
+            self.assertTrue(self.lines()[0].startswith("vrx"), "cut at its beginning")
 
     def test_interrupted(self):
         self.start("--format", "json")
