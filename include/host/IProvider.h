@@ -28,6 +28,8 @@ class IProvider
     // Here: in the order of the file, those that the server knew when the namespace was allocated; classes that the
     // file tags "CDM" and those whose qualifier DONTCOLLECT is true are left out. What the visitor returns is ignored.
     // A TVRXException of the visitor is a line in the log and costs that class only; other exceptions leave.
+    // Threads: one thread of a namespace at a time; a visitor of EnumerateProviders that runs on threads only collects
+    // the providers (ICIMNamespace).
     virtual void EnumerateClassesProvided(TClassVisitor visitor, TCIMContext context) = 0;
     // Here: leaves this provider as it is.
     virtual IProvider& operator=(const IProvider& other) = 0;
