@@ -184,8 +184,7 @@ class THtmlFormat : public IFormat, public IInstanceSink
             }
         }
         for (const TCheck& check : document.fChecks) {
-            const std::string took = check.fTook.empty() || fOptions.fStable ? "" : ", in " + check.fTook;
-            facts.emplace_back(check.fSubject, (check.fIsOk ? "ok: " : "FAILED: ") + check.fText + took);
+            facts.emplace_back(check.fSubject, CheckText(check, fOptions));
             facts.emplace_back("To do", check.fAdvice);
         }
         text += facts.empty() ? "" : HtmlFacts(facts);

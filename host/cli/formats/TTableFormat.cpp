@@ -91,8 +91,7 @@ std::string CheckLines(const std::vector<TCheck>& checks, const TFormatOptions& 
 {
     std::vector<TLabelled> rows;
     for (const TCheck& check : checks) {
-        const std::string took = check.fTook.empty() || options.fStable ? "" : ", in " + check.fTook;
-        rows.push_back({check.fSubject, (check.fIsOk ? "ok: " : "FAILED: ") + Printable(check.fText + took)});
+        rows.push_back({check.fSubject, Printable(CheckText(check, options))});
         if (!check.fAdvice.empty()) {
             rows.push_back({"  to do", Printable(check.fAdvice)});
         }

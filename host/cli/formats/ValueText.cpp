@@ -183,4 +183,10 @@ std::string PathLabel(const std::string& path)
     return Printable(label);
 }
 
+std::string CheckText(const TCheck& check, const TFormatOptions& options)
+{
+    const std::string took = check.fTook.empty() || options.fStable ? "" : ", in " + check.fTook;
+    return (check.fIsOk ? "ok: " : "FAILED: ") + check.fText + took;
+}
+
 } // namespace vrxhost

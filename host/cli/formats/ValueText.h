@@ -35,4 +35,7 @@ std::string ValueList(const TPropertyDeclRecord& property);
 // and a number that has a name.
 std::string ShownNumber(const TPropertyRecord& property, const TPropertyDeclRecord* declaration);
 
+// Returns: the outcome of a check, with the time that it took unless the document is stable.
+std::string CheckText(const TCheck& check, const TFormatOptions& options);
+
 } // namespace vrxhost
