@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/base/Text.h"
+#include "pegasus/common/NameIndex.h"
 #include "pegasus/repository/CimError.h"
 #include "pegasus/repository/ClassRules.h"
 
@@ -31,38 +32,20 @@ bool isKind(const CIMConstClass& newClass, const CIMConstClass& superClass, cons
     return isTrue(newClass, qualifier) || (!superClass.isUninitialized() && isTrue(superClass, qualifier));
 }
 
-// Checks one class, part by part.
-class Checker
+template <typename Handle> const Array<CIMQualifier>& qualifiersOf(const Handle& handle)
 {
-  public:
-    Checker(const CIMConstClass& superClass, const QualifierLookup& lookup) : fSuperClass(superClass), fLookup(lookup)
-    {
-    }
-
-    template <typename To, typename From> void checkQualifiers(To& to, const From& from, const CIMScope& scope) const
-    {
-        for (Uint32 i = 0; i < from.getQualifierCount(); ++i) {
-            to.addQualifier(checkedQualifier(from.getQualifier(i), scope, fLookup));
-        }
-    }
-
-    CIMProperty checkProperty(const CIMConstProperty& property, bool isAssociation) const;
-    CIMMethod checkMethod(const CIMConstMethod& method) const;
-
-  private:
-    CIMParameter checkParameter(const CIMConstParameter& parameter) const;
-
-    const CIMConstClass& fSuperClass;
-    const QualifierLookup& fLookup;
-};
+    return ObjectAccess::rep(handle).fQualifiers;
+}
 
 template <typename Element> void checkOverrides(const Element& element, const Element& inherited)
 {
+    const Array<CIMQualifier>& above = qualifiersOf(inherited);
+    const NameIndex<CIMQualifier> index(above);
     for (Uint32 i = 0; i < element.getQualifierCount(); ++i) {
         const CIMConstQualifier use = element.getQualifier(i);
-        const Uint32 index = inherited.findQualifier(use.getName());
-        if (index != PEG_NOT_FOUND) {
-            checkOverride(use, inherited.getQualifier(index));
+        const Uint32 overridden = index.find(use.getName());
+        if (overridden != PEG_NOT_FOUND) {
+            checkOverride(use, above[overridden]);
         }
     }
 }
@@ -79,33 +62,55 @@ bool isSameKind(const CIMConstProperty& property, const CIMConstProperty& inheri
     return isSameType && property.isArray() == inherited.isArray();
 }
 
-void checkOverriddenProperty(const CIMConstProperty& property, const CIMConstClass& superClass)
+void checkOverriddenProperty(const CIMProperty& property, const CIMProperty& inherited)
 {
-    const Uint32 index = superClass.findProperty(property.getName());
-    if (index == PEG_NOT_FOUND) {
-        return;
-    }
-    const CIMConstProperty inherited = superClass.getProperty(index);
     if (!isSameKind(property, inherited)) {
         fail(CIM_ERR_FAILED, "type mismatch");
     }
     checkOverrides(property, inherited);
 }
 
-void checkOverriddenMethod(const CIMConstMethod& method, const CIMConstClass& superClass)
+void checkOverriddenMethod(const CIMMethod& method, const CIMMethod& inherited)
 {
-    const Uint32 index = superClass.findMethod(method.getName());
-    if (index == PEG_NOT_FOUND) {
-        return;
-    }
-    const CIMConstMethod inherited = superClass.getMethod(index);
     if (method.getType() != inherited.getType()) {
         fail(CIM_ERR_FAILED, "type mismatch");
     }
     checkOverrides(method, inherited);
 }
 
-CIMProperty Checker::checkProperty(const CIMConstProperty& property, bool isAssociation) const
+// Checks one class, part by part. Checked parts are appended without a search for an equal name: the class came from a
+// decoder or a builder that keeps its names distinct.
+class Checker
+{
+  public:
+    Checker(const CIMClassRep& superClass, const QualifierLookup& lookup)
+        : fSuperClass(superClass), fProperties(superClass.fProperties), fMethods(superClass.fMethods), fLookup(lookup)
+    {
+    }
+
+    Array<CIMQualifier> checkQualifiers(const Array<CIMQualifier>& uses, const CIMScope& scope) const;
+    CIMProperty checkProperty(const CIMProperty& property, bool isAssociation) const;
+    CIMMethod checkMethod(const CIMMethod& method) const;
+
+  private:
+    CIMParameter checkParameter(const CIMParameter& parameter) const;
+
+    const CIMClassRep& fSuperClass;
+    const NameIndex<CIMProperty> fProperties; // of the superclass
+    const NameIndex<CIMMethod> fMethods;
+    const QualifierLookup& fLookup;
+};
+
+Array<CIMQualifier> Checker::checkQualifiers(const Array<CIMQualifier>& uses, const CIMScope& scope) const
+{
+    Array<CIMQualifier> checked;
+    for (Uint32 i = 0; i < uses.size(); ++i) {
+        checked.append(checkedQualifier(uses[i], scope, fLookup));
+    }
+    return checked;
+}
+
+CIMProperty Checker::checkProperty(const CIMProperty& property, bool isAssociation) const
 {
     const bool isReference = property.getType() == CIMTYPE_REFERENCE;
     if (isReference && !isAssociation) {
@@ -116,31 +121,36 @@ CIMProperty Checker::checkProperty(const CIMConstProperty& property, bool isAsso
     }
     CIMProperty checked(property.getName(), embeddedValue(property), property.getArraySize(),
                         property.getReferenceClassName());
-    checkQualifiers(checked, property, isReference ? CIMScope::REFERENCE : CIMScope::PROPERTY);
-    if (!fSuperClass.isUninitialized()) {
-        checkOverriddenProperty(property, fSuperClass);
+    ObjectAccess::rep(checked).fQualifiers =
+        checkQualifiers(qualifiersOf(property), isReference ? CIMScope::REFERENCE : CIMScope::PROPERTY);
+    const Uint32 index = fProperties.find(property.getName());
+    if (index != PEG_NOT_FOUND) {
+        checkOverriddenProperty(property, fSuperClass.fProperties[index]);
     }
     return checked;
 }
 
-CIMMethod Checker::checkMethod(const CIMConstMethod& method) const
+CIMMethod Checker::checkMethod(const CIMMethod& method) const
 {
     CIMMethod checked(method.getName(), method.getType());
-    checkQualifiers(checked, method, CIMScope::METHOD);
-    for (Uint32 i = 0; i < method.getParameterCount(); ++i) {
-        checked.addParameter(checkParameter(method.getParameter(i)));
+    CIMMethodRep& to = ObjectAccess::rep(checked);
+    to.fQualifiers = checkQualifiers(qualifiersOf(method), CIMScope::METHOD);
+    const Array<CIMParameter>& parameters = ObjectAccess::rep(method).fParameters;
+    for (Uint32 i = 0; i < parameters.size(); ++i) {
+        to.fParameters.append(checkParameter(parameters[i]));
     }
-    if (!fSuperClass.isUninitialized()) {
-        checkOverriddenMethod(method, fSuperClass);
+    const Uint32 index = fMethods.find(method.getName());
+    if (index != PEG_NOT_FOUND) {
+        checkOverriddenMethod(method, fSuperClass.fMethods[index]);
     }
     return checked;
 }
 
-CIMParameter Checker::checkParameter(const CIMConstParameter& parameter) const
+CIMParameter Checker::checkParameter(const CIMParameter& parameter) const
 {
     CIMParameter checked(parameter.getName(), parameter.getType(), parameter.isArray(), parameter.getArraySize(),
                          parameter.getReferenceClassName());
-    checkQualifiers(checked, parameter, CIMScope::PARAMETER);
+    ObjectAccess::rep(checked).fQualifiers = checkQualifiers(qualifiersOf(parameter), CIMScope::PARAMETER);
     return checked;
 }
 
@@ -158,17 +168,20 @@ CIMClass checkClass(const CIMConstClass& newClass, const CIMConstClass& superCla
 {
     const bool isAssociation = isKind(newClass, superClass, kAssociation);
     const bool isIndication = isKind(newClass, superClass, kIndication);
-    const Checker checker(superClass, lookup);
+    const CIMClassRep nothing;
+    const CIMClassRep& from = ObjectAccess::rep(newClass);
+    const Checker checker(superClass.isUninitialized() ? nothing : ObjectAccess::rep(superClass), lookup);
     CIMClass checked(newClass.getClassName(), newClass.getSuperClassName());
-    checker.checkQualifiers(checked, newClass, scopeOf(isAssociation, isIndication));
+    CIMClassRep& to = ObjectAccess::rep(checked);
+    to.fQualifiers = checker.checkQualifiers(from.fQualifiers, scopeOf(isAssociation, isIndication));
     if (!superClass.isUninitialized()) {
         checkOverrides(newClass, superClass);
     }
-    for (Uint32 i = 0; i < newClass.getPropertyCount(); ++i) {
-        checked.addProperty(checker.checkProperty(newClass.getProperty(i), isAssociation));
+    for (Uint32 i = 0; i < from.fProperties.size(); ++i) {
+        to.fProperties.append(checker.checkProperty(from.fProperties[i], isAssociation));
     }
-    for (Uint32 i = 0; i < newClass.getMethodCount(); ++i) {
-        checked.addMethod(checker.checkMethod(newClass.getMethod(i)));
+    for (Uint32 i = 0; i < from.fMethods.size(); ++i) {
+        to.fMethods.append(checker.checkMethod(from.fMethods[i]));
     }
     return checked;
 }

@@ -1,71 +1,72 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/repository/ClassRules.h"
+#include "pegasus/repository/ListedNames.h"
 
 namespace Pegasus::repository {
 
 namespace {
 
-template <typename To, typename From> void copyQualifiers(To& to, From& from, const ClassOptions& options)
+Array<CIMQualifier> filterQualifiers(const Array<CIMQualifier>& from, const ClassOptions& options)
 {
-    if (!options.includeQualifiers) {
-        return;
-    }
-    for (Uint32 i = 0; i < from.getQualifierCount(); ++i) {
-        const CIMQualifier qualifier = from.getQualifier(i);
-        if (!options.localOnly || !qualifier.getPropagated()) {
-            to.addQualifier(qualifier);
+    Array<CIMQualifier> kept;
+    for (Uint32 i = 0; options.includeQualifiers && i < from.size(); ++i) {
+        if (!options.localOnly || !from[i].getPropagated()) {
+            kept.append(from[i]);
         }
     }
+    return kept;
 }
 
-CIMProperty filterProperty(CIMProperty from, const ClassOptions& options)
+// Returns: a handle to a copy of `from` that shares its parts, apart from the qualifiers.
+template <typename Rep, typename Handle> Handle filterElement(const Handle& from, const ClassOptions& options)
 {
-    CIMProperty property(from.getName(), from.getValue(), from.getArraySize(), from.getReferenceClassName(),
-                         options.includeClassOrigin ? from.getClassOrigin() : CIMName(), from.getPropagated());
-    copyQualifiers(property, from, options);
-    return property;
+    auto* copy = new Rep(ObjectAccess::rep(from));
+    Handle element = ObjectAccess::wrap<Handle>(copy);
+    copy->fQualifiers = filterQualifiers(copy->fQualifiers, options);
+    return element;
 }
 
-CIMParameter filterParameter(CIMParameter from, const ClassOptions& options)
+// For properties and methods.
+template <typename Rep, typename Handle> Handle filterMember(const Handle& from, const ClassOptions& options)
 {
-    CIMParameter parameter(from.getName(), from.getType(), from.isArray(), from.getArraySize(),
-                           from.getReferenceClassName());
-    copyQualifiers(parameter, from, options);
-    return parameter;
-}
-
-CIMMethod filterMethod(CIMMethod from, const ClassOptions& options)
-{
-    CIMMethod method(from.getName(), from.getType(), options.includeClassOrigin ? from.getClassOrigin() : CIMName(),
-                     from.getPropagated());
-    copyQualifiers(method, from, options);
-    for (Uint32 i = 0; i < from.getParameterCount(); ++i) {
-        method.addParameter(filterParameter(from.getParameter(i), options));
+    Handle member = filterElement<Rep>(from, options);
+    if (!options.includeClassOrigin) {
+        ObjectAccess::rep(member).fClassOrigin.clear();
     }
+    return member;
+}
+
+CIMMethod filterMethod(const CIMMethod& from, const ClassOptions& options)
+{
+    CIMMethod method = filterMember<CIMMethodRep>(from, options);
+    const Array<CIMParameter>& parameters = ObjectAccess::rep(from).fParameters;
+    Array<CIMParameter> filtered;
+    for (Uint32 i = 0; i < parameters.size(); ++i) {
+        filtered.append(filterElement<CIMParameterRep>(parameters[i], options));
+    }
+    ObjectAccess::rep(method).fParameters = filtered;
     return method;
 }
 
 } // namespace
 
-bool isListed(const CIMPropertyList& list, const CIMName& name)
-{
-    return list.isNull() || list.contains(name);
-}
-
 CIMClass filterClass(CIMClass resolved, const ClassOptions& options)
 {
+    const CIMClassRep& from = ObjectAccess::rep(resolved);
+    const ListedNames listed(options.propertyList);
     CIMClass filtered(resolved.getClassName(), resolved.getSuperClassName());
-    copyQualifiers(filtered, resolved, options);
-    for (Uint32 i = 0; i < resolved.getPropertyCount(); ++i) {
-        const CIMProperty property = resolved.getProperty(i);
-        if (!(options.localOnly && property.getPropagated()) && isListed(options.propertyList, property.getName())) {
-            filtered.addProperty(filterProperty(property, options));
+    CIMClassRep& to = ObjectAccess::rep(filtered);
+    to.fQualifiers = filterQualifiers(from.fQualifiers, options);
+    for (Uint32 i = 0; i < from.fProperties.size(); ++i) {
+        const CIMProperty& property = from.fProperties[i];
+        if (!(options.localOnly && property.getPropagated()) && listed.has(property.getName())) {
+            to.fProperties.append(filterMember<CIMPropertyRep>(property, options));
         }
     }
-    for (Uint32 i = 0; i < resolved.getMethodCount(); ++i) {
-        const CIMMethod method = resolved.getMethod(i);
+    for (Uint32 i = 0; i < from.fMethods.size(); ++i) {
+        const CIMMethod& method = from.fMethods[i];
         if (!(options.localOnly && method.getPropagated())) {
-            filtered.addMethod(filterMethod(method, options));
+            to.fMethods.append(filterMethod(method, options));
         }
     }
     return filtered;

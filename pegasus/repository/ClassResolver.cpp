@@ -1,123 +1,120 @@
 // SPDX-License-Identifier: MIT
+#include "pegasus/common/NameIndex.h"
 #include "pegasus/repository/ClassRules.h"
 
 namespace Pegasus::repository {
 
 namespace {
 
-// The source arguments are non-const handles because only those return parts that can be shared. The functions change
-// `to` alone.
+// Lists are filled by append(), which leaves out addProperty()'s search for an equal name: the names of one class
+// differ, and an inherited member is taken only if the class has none of its name.
 
-template <typename To, typename From> void shareQualifiers(To& to, From& from)
+template <typename Handle> const Array<CIMQualifier>& qualifiersOf(const Handle& handle)
 {
-    for (Uint32 i = 0; i < from.getQualifierCount(); ++i) {
-        to.addQualifier(from.getQualifier(i));
-    }
+    return ObjectAccess::rep(handle).fQualifiers;
 }
 
 // In reverse order, as OpenPegasus answers.
-template <typename To, typename From, typename Local> void inheritQualifiers(To& to, From& from, Local& local)
+void inheritQualifiers(Array<CIMQualifier>& to, const Array<CIMQualifier>& from, const Array<CIMQualifier>& local)
 {
-    for (Uint32 i = from.getQualifierCount(); i-- > 0;) {
-        const CIMQualifier inherited = from.getQualifier(i);
-        if (inherited.getFlavor().hasFlavor(CIMFlavor::TOSUBCLASS) &&
-            local.findQualifier(inherited.getName()) == PEG_NOT_FOUND)
-        {
-            to.addQualifier(CIMQualifier(inherited.getName(), inherited.getValue(), inherited.getFlavor(), true));
+    const NameIndex<CIMQualifier> own(local);
+    for (Uint32 i = from.size(); i-- > 0;) {
+        const CIMQualifier& inherited = from[i];
+        if (inherited.getFlavor().hasFlavor(CIMFlavor::TOSUBCLASS) && !own.has(inherited.getName())) {
+            to.append(CIMQualifier(inherited.getName(), inherited.getValue(), inherited.getFlavor(), true));
         }
     }
 }
 
-CIMProperty copyProperty(CIMProperty from, const CIMName& origin, bool isPropagated)
+// Returns: a handle to a copy of `from` that shares its parts.
+template <typename Rep, typename Handle> Handle shallowCopy(const Handle& from)
 {
-    return CIMProperty(from.getName(), from.getValue(), from.getArraySize(), from.getReferenceClassName(), origin,
-                       isPropagated);
+    return ObjectAccess::wrap<Handle>(new Rep(ObjectAccess::rep(from)));
 }
 
-CIMProperty inheritedProperty(CIMProperty from)
+// Returns: the qualifiers of an element that overrides `inherited`.
+template <typename Handle> Array<CIMQualifier> overridingQualifiers(const Handle& local, const Handle& inherited)
 {
-    CIMProperty property = copyProperty(from, from.getClassOrigin(), true);
-    shareQualifiers(property, from);
-    return property;
+    Array<CIMQualifier> qualifiers;
+    inheritQualifiers(qualifiers, qualifiersOf(inherited), qualifiersOf(local));
+    qualifiers.appendArray(qualifiersOf(local));
+    return qualifiers;
 }
 
-CIMProperty ownProperty(CIMProperty local, const CIMName& owner, CIMClass& superClass)
+// For properties and methods.
+template <typename Rep, typename Handle> Handle inheritedMember(const Handle& from)
 {
-    const Uint32 index = superClass.isUninitialized() ? PEG_NOT_FOUND : superClass.findProperty(local.getName());
-    if (index == PEG_NOT_FOUND) {
-        CIMProperty property = copyProperty(local, owner, false);
-        shareQualifiers(property, local);
-        return property;
+    Handle member = shallowCopy<Rep>(from);
+    ObjectAccess::rep(member).fPropagated = true;
+    return member;
+}
+
+// Returns: a copy of a property or method of the class `owner`, which may override that of `index` in `inherited`.
+template <typename Rep, typename Handle>
+Handle ownMember(const Handle& local, const CIMName& owner, const Array<Handle>& inherited, Uint32 index)
+{
+    Handle member = shallowCopy<Rep>(local);
+    Rep& rep = ObjectAccess::rep(member);
+    rep.fPropagated = false;
+    rep.fClassOrigin = owner;
+    if (index != PEG_NOT_FOUND) {
+        rep.fClassOrigin = inherited[index].getClassOrigin();
+        rep.fQualifiers = overridingQualifiers(local, inherited[index]);
     }
-    CIMProperty overridden = superClass.getProperty(index);
-    CIMProperty property = copyProperty(local, overridden.getClassOrigin(), false);
-    inheritQualifiers(property, overridden, local);
-    shareQualifiers(property, local);
-    return property;
+    return member;
 }
 
-void shareParameters(CIMMethod& to, CIMMethod& from)
+CIMParameter overridingParameter(const CIMParameter& local, const CIMParameter& inherited)
 {
-    for (Uint32 i = 0; i < from.getParameterCount(); ++i) {
-        to.addParameter(from.getParameter(i));
-    }
-}
-
-CIMMethod inheritedMethod(CIMMethod from)
-{
-    CIMMethod method(from.getName(), from.getType(), from.getClassOrigin(), true);
-    shareQualifiers(method, from);
-    shareParameters(method, from);
-    return method;
-}
-
-CIMParameter overridingParameter(CIMParameter local, CIMMethod& overridden)
-{
-    const Uint32 index = overridden.findParameter(local.getName());
-    if (index == PEG_NOT_FOUND) {
-        return local;
-    }
-    CIMParameter inherited = overridden.getParameter(index);
-    CIMParameter parameter(local.getName(), local.getType(), local.isArray(), local.getArraySize(),
-                           local.getReferenceClassName());
-    inheritQualifiers(parameter, inherited, local);
-    shareQualifiers(parameter, local);
+    CIMParameter parameter = shallowCopy<CIMParameterRep>(local);
+    ObjectAccess::rep(parameter).fQualifiers = overridingQualifiers(local, inherited);
     return parameter;
 }
 
-CIMMethod ownMethod(CIMMethod local, const CIMName& owner, CIMClass& superClass)
+Array<CIMParameter> overridingParameters(const Array<CIMParameter>& local, const Array<CIMParameter>& inherited)
 {
-    const Uint32 index = superClass.isUninitialized() ? PEG_NOT_FOUND : superClass.findMethod(local.getName());
-    if (index == PEG_NOT_FOUND) {
-        CIMMethod method(local.getName(), local.getType(), owner, false);
-        shareQualifiers(method, local);
-        shareParameters(method, local);
-        return method;
+    const NameIndex<CIMParameter> above(inherited);
+    Array<CIMParameter> parameters;
+    for (Uint32 i = 0; i < local.size(); ++i) {
+        const Uint32 index = above.find(local[i].getName());
+        parameters.append(index == PEG_NOT_FOUND ? local[i] : overridingParameter(local[i], inherited[index]));
     }
-    CIMMethod overridden = superClass.getMethod(index);
-    CIMMethod method(local.getName(), local.getType(), overridden.getClassOrigin(), false);
-    inheritQualifiers(method, overridden, local);
-    shareQualifiers(method, local);
-    for (Uint32 i = 0; i < local.getParameterCount(); ++i) {
-        method.addParameter(overridingParameter(local.getParameter(i), overridden));
-    }
-    return method;
+    return parameters;
 }
 
-void addInherited(CIMClass& resolved, CIMClass& local, CIMClass& superClass)
+template <typename Rep, typename Handle>
+void addInherited(Array<Handle>& to, const Array<Handle>& local, const Array<Handle>& inherited)
 {
-    inheritQualifiers(resolved, superClass, local);
-    for (Uint32 i = 0; i < superClass.getPropertyCount(); ++i) {
-        const CIMProperty property = superClass.getProperty(i);
-        if (local.findProperty(property.getName()) == PEG_NOT_FOUND) {
-            resolved.addProperty(inheritedProperty(property));
+    const NameIndex<Handle> own(local);
+    for (Uint32 i = 0; i < inherited.size(); ++i) {
+        if (!own.has(inherited[i].getName())) {
+            to.append(inheritedMember<Rep>(inherited[i]));
         }
     }
-    for (Uint32 i = 0; i < superClass.getMethodCount(); ++i) {
-        const CIMMethod method = superClass.getMethod(i);
-        if (local.findMethod(method.getName()) == PEG_NOT_FOUND) {
-            resolved.addMethod(inheritedMethod(method));
+}
+
+void addOwnProperties(CIMClassRep& to, const CIMClassRep& local, const CIMClassRep& superClass)
+{
+    const NameIndex<CIMProperty> above(superClass.fProperties);
+    for (Uint32 i = 0; i < local.fProperties.size(); ++i) {
+        const CIMProperty& property = local.fProperties[i];
+        to.fProperties.append(ownMember<CIMPropertyRep>(property, local.fPath.getClassName(), superClass.fProperties,
+                                                        above.find(property.getName())));
+    }
+}
+
+void addOwnMethods(CIMClassRep& to, const CIMClassRep& local, const CIMClassRep& superClass)
+{
+    const NameIndex<CIMMethod> above(superClass.fMethods);
+    for (Uint32 i = 0; i < local.fMethods.size(); ++i) {
+        const Uint32 index = above.find(local.fMethods[i].getName());
+        CIMMethod method =
+            ownMember<CIMMethodRep>(local.fMethods[i], local.fPath.getClassName(), superClass.fMethods, index);
+        if (index != PEG_NOT_FOUND) {
+            Array<CIMParameter>& parameters = ObjectAccess::rep(method).fParameters;
+            parameters = overridingParameters(parameters, ObjectAccess::rep(superClass.fMethods[index]).fParameters);
         }
+        to.fMethods.append(method);
     }
 }
 
@@ -125,18 +122,17 @@ void addInherited(CIMClass& resolved, CIMClass& local, CIMClass& superClass)
 
 CIMClass resolveClass(CIMClass local, CIMClass superClass)
 {
-    const CIMName name = local.getClassName();
-    CIMClass resolved(name, local.getSuperClassName());
-    if (!superClass.isUninitialized()) {
-        addInherited(resolved, local, superClass);
-    }
-    shareQualifiers(resolved, local);
-    for (Uint32 i = 0; i < local.getPropertyCount(); ++i) {
-        resolved.addProperty(ownProperty(local.getProperty(i), name, superClass));
-    }
-    for (Uint32 i = 0; i < local.getMethodCount(); ++i) {
-        resolved.addMethod(ownMethod(local.getMethod(i), name, superClass));
-    }
+    const CIMClassRep& from = ObjectAccess::rep(local);
+    const CIMClassRep nothing;
+    const CIMClassRep& above = superClass.isUninitialized() ? nothing : ObjectAccess::rep(superClass);
+    CIMClass resolved(local.getClassName(), local.getSuperClassName());
+    CIMClassRep& to = ObjectAccess::rep(resolved);
+    inheritQualifiers(to.fQualifiers, above.fQualifiers, from.fQualifiers);
+    to.fQualifiers.appendArray(from.fQualifiers);
+    addInherited<CIMPropertyRep>(to.fProperties, from.fProperties, above.fProperties);
+    addInherited<CIMMethodRep>(to.fMethods, from.fMethods, above.fMethods);
+    addOwnProperties(to, from, above);
+    addOwnMethods(to, from, above);
     return resolved;
 }
 

@@ -8,27 +8,34 @@
 
 namespace Pegasus::repository {
 
-ClassStore::ClassStore(Storage& storage, ObjectCodec& codec, const RepositoryLimits& limits)
-    : fStorage(storage), fCodec(codec), fLimits(limits), fCache(limits.cachedClassCount)
+ClassStore::ClassStore(std::mutex& mutex, Storage& storage, const ObjectEncoder& encoder,
+                       const RepositoryLimits& limits)
+    : fMutex(mutex), fStorage(storage), fEncoder(encoder), fLimits(limits), fCache(limits.cachedClassCount)
 {
 }
 
 // Resolves from the root class down, and keeps every class on the way. The recursion is bounded: superClassFor() limits
-// the depth.
+// the depth. Two threads may resolve the same class at once; the cache keeps the first result, and both are equal,
+// since a stored class stays as it is.
 CIMClass ClassStore::resolved(NamespaceId nameSpace, const CIMName& name)
 {
     const std::string key = nameKey(name);
-    CIMClass cached = fCache.find(nameSpace, key);
-    if (!cached.isUninitialized()) {
-        return cached;
+    std::optional<std::string> text;
+    {
+        const Lock lock(fMutex);
+        CIMClass cached = fCache.find(nameSpace, key);
+        if (!cached.isUninitialized()) {
+            return cached;
+        }
+        text = fStorage.findClass(nameSpace, key);
     }
-    const std::optional<std::string> text = fStorage.findClass(nameSpace, key);
     if (!text) {
         return CIMClass();
     }
-    const CIMClass local = withEmbeddedTypes(fCodec.decodeClass(*text));
+    const CIMClass local = withEmbeddedTypes(ObjectDecoder(fEncoder).decodeClass(std::move(*text)));
     const CIMName& superName = local.getSuperClassName();
     CIMClass whole = resolveClass(local, superName.isNull() ? CIMClass() : resolved(nameSpace, superName));
+    const Lock lock(fMutex);
     fCache.insert(nameSpace, key, whole);
     return whole;
 }
@@ -45,17 +52,20 @@ CIMClass ClassStore::existing(NamespaceId nameSpace, const CIMName& name)
 std::shared_ptr<const std::string> ClassStore::findText(NamespaceId nameSpace, const CIMName& name,
                                                         const ClassOptions& options)
 {
+    const Lock lock(fMutex);
     return fCache.findText(nameSpace, nameKey(name), options);
 }
 
 void ClassStore::keepText(NamespaceId nameSpace, const CIMName& name, const ClassOptions& options,
                           const std::shared_ptr<const std::string>& text)
 {
+    const Lock lock(fMutex);
     fCache.keepText(nameSpace, nameKey(name), options, text);
 }
 
 bool ClassStore::has(NamespaceId nameSpace, const CIMName& name)
 {
+    const Lock lock(fMutex);
     return fStorage.findSuperClass(nameSpace, base::utf8(name)).has_value();
 }
 
@@ -65,22 +75,20 @@ std::vector<CIMName> ClassStore::listNames(NamespaceId nameSpace, const CIMName&
         fail(CIM_ERR_INVALID_CLASS, base::utf8(name));
     }
     std::vector<CIMName> names;
+    const Lock lock(fMutex);
     for (const std::string& text : fStorage.listSubclasses(nameSpace, base::utf8(name), isDeep)) {
         names.emplace_back(text.c_str());
     }
     return names;
 }
 
-void ClassStore::requireAbsent(NamespaceId nameSpace, const CIMName& name)
-{
-    if (has(nameSpace, name)) {
-        fail(CIM_ERR_ALREADY_EXISTS, base::utf8(name));
-    }
-}
-
+// Returns: the resolved superclass of a class that can be created; uninitialised for a root class.
+// Throws: CIM_ERR_ALREADY_EXISTS, CIM_ERR_INVALID_SUPERCLASS.
 CIMClass ClassStore::superClassFor(NamespaceId nameSpace, const CIMConstClass& newClass)
 {
-    requireAbsent(nameSpace, newClass.getClassName());
+    if (has(nameSpace, newClass.getClassName())) {
+        fail(CIM_ERR_ALREADY_EXISTS, base::utf8(newClass.getClassName()));
+    }
     checkDepth(nameSpace, newClass);
     const CIMName& superName = newClass.getSuperClassName();
     if (superName.isNull()) {
@@ -93,17 +101,25 @@ CIMClass ClassStore::superClassFor(NamespaceId nameSpace, const CIMConstClass& n
     return superClass;
 }
 
-void ClassStore::insert(NamespaceId nameSpace, const CIMConstClass& local, const std::string& text,
-                        const CIMClass& whole)
+void ClassStore::create(NamespaceId nameSpace, const CIMConstClass& newClass, const QualifierLookup& lookup)
 {
-    requireAbsent(nameSpace, local.getClassName());
-    fStorage.insertClass(nameSpace, base::utf8(local.getClassName()), base::utf8(local.getSuperClassName()), text);
+    const CIMClass superClass = superClassFor(nameSpace, newClass);
+    const CIMClass local = checkClass(newClass, superClass, lookup);
+    const std::string text = fEncoder.encodeClass(local);
+    const CIMClass whole = resolveClass(local, superClass);
+    const std::string name = base::utf8(local.getClassName());
+    const Lock lock(fMutex);
+    if (fStorage.findSuperClass(nameSpace, name)) { // another thread was faster
+        fail(CIM_ERR_ALREADY_EXISTS, name);
+    }
+    fStorage.insertClass(nameSpace, name, base::utf8(local.getSuperClassName()), text);
     // Into the cache at once: a compiler creates subclasses of it next.
     fCache.insert(nameSpace, nameKey(local.getClassName()), whole);
 }
 
 void ClassStore::checkDepth(NamespaceId nameSpace, const CIMConstClass& newClass)
 {
+    const Lock lock(fMutex);
     std::size_t depth = 1;
     std::string above = base::utf8(newClass.getSuperClassName());
     while (!above.empty()) {

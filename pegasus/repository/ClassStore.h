@@ -2,20 +2,24 @@
 #pragma once
 
 #include "pegasus/repository/ObjectCodec.h"
+#include "pegasus/repository/QualifierRules.h"
 #include "pegasus/repository/ResolvedClassCache.h"
+
+#include <mutex>
 
 namespace Pegasus::repository {
 
 // Classes: stored as they were created, returned with what they inherit. Errors and limits: see Repository.
 //
-// A large class takes long to check and to encode. The repository does both without its lock, between a call of this
-// store that fetches what they need and one that keeps the result.
-// Requires: what the constructor takes outlives the store.
-// Thread: one thread at a time.
+// A large class takes long to decode, to check and to encode. The lock is held to read and write rows and the cache
+// alone.
+// Requires: what the constructor takes outlives the store. The caller does not hold `mutex`.
+// Thread: any.
 class ClassStore
 {
   public:
-    ClassStore(Storage& storage, ObjectCodec& codec, const RepositoryLimits& limits);
+    // `mutex`: the lock of `storage`.
+    ClassStore(std::mutex& mutex, Storage& storage, const ObjectEncoder& encoder, const RepositoryLimits& limits);
 
     // Returns: the class with everything that it inherits; uninitialised when absent.
     CIMClass resolved(NamespaceId nameSpace, const CIMName& name);
@@ -29,19 +33,16 @@ class ClassStore
     bool has(NamespaceId nameSpace, const CIMName& name);
     std::vector<CIMName> listNames(NamespaceId nameSpace, const CIMName& name, bool isDeep);
 
-    // Returns: the resolved superclass of a class that can be created; uninitialised for a root class.
-    // Throws: CIM_ERR_ALREADY_EXISTS, CIM_ERR_INVALID_SUPERCLASS.
-    CIMClass superClassFor(NamespaceId nameSpace, const CIMConstClass& newClass);
-    // Stores a class that was checked against superClassFor(). `text` is its encoded, `whole` its resolved form.
-    // Throws: CIM_ERR_ALREADY_EXISTS when another thread was faster.
-    void insert(NamespaceId nameSpace, const CIMConstClass& local, const std::string& text, const CIMClass& whole);
+    // Throws: what Repository::createClass throws.
+    void create(NamespaceId nameSpace, const CIMConstClass& newClass, const QualifierLookup& lookup);
 
   private:
-    void requireAbsent(NamespaceId nameSpace, const CIMName& name);
+    CIMClass superClassFor(NamespaceId nameSpace, const CIMConstClass& newClass);
     void checkDepth(NamespaceId nameSpace, const CIMConstClass& newClass);
 
+    std::mutex& fMutex;
     Storage& fStorage;
-    ObjectCodec& fCodec;
+    const ObjectEncoder& fEncoder;
     const RepositoryLimits& fLimits;
     ResolvedClassCache fCache;
 };

@@ -4,19 +4,25 @@
 #include "pegasus/base/Text.h"
 #include "pegasus/common/EmbeddedKind.h"
 #include "pegasus/repository/CimError.h"
-#include "pegasus/repository/ClassRules.h"
+
+#include <algorithm>
+#include <utility>
 
 namespace Pegasus::repository {
 
 namespace {
 
-CIMConstProperty declaredProperty(const CIMConstClass& itsClass, const CIMName& name)
+// Instances are filled by append(), which leaves out addProperty()'s search for an equal name: each name is a name of
+// the class, and is taken once.
+
+template <typename Handle> const Array<CIMProperty>& propertiesOf(const Handle& handle)
 {
-    const Uint32 index = itsClass.findProperty(name);
-    if (index == PEG_NOT_FOUND) {
-        fail(CIM_ERR_FAILED, "no such property: " + base::utf8(name));
-    }
-    return itsClass.getProperty(index);
+    return ObjectAccess::rep(handle).fProperties;
+}
+
+Array<CIMProperty>& listOf(CIMInstance& made)
+{
+    return ObjectAccess::rep(made).fProperties;
 }
 
 CIMProperty propertyOf(const CIMConstProperty& declared, const CIMValue& value, bool isPropagated)
@@ -44,9 +50,14 @@ bool isStorableAs(const CIMConstProperty& given, const CIMConstProperty& declare
     return holdsEmbedded && (isEmbedded(given.getType()) || given.getValue().isNull());
 }
 
-CIMProperty givenProperty(const CIMConstProperty& given, const CIMConstClass& itsClass)
+CIMProperty givenProperty(const CIMProperty& given, const Array<CIMProperty>& ofClass,
+                          const NameIndex<CIMProperty>& byName)
 {
-    const CIMConstProperty declared = declaredProperty(itsClass, given.getName());
+    const Uint32 index = byName.find(given.getName());
+    if (index == PEG_NOT_FOUND) {
+        fail(CIM_ERR_FAILED, "no such property: " + base::utf8(given.getName()));
+    }
+    const CIMProperty& declared = ofClass[index];
     if (!isStorableAs(given, declared)) {
         fail(CIM_ERR_FAILED, "type mismatch");
     }
@@ -75,15 +86,19 @@ CIMInstance completeInstance(const CIMConstInstance& given, const CIMConstClass&
     if (itsClass.isAbstract()) {
         fail(CIM_ERR_NOT_SUPPORTED, "abstract class cannot have instances: " + base::utf8(itsClass.getClassName()));
     }
+    const Array<CIMProperty>& ofClass = propertiesOf(itsClass);
+    const Array<CIMProperty>& ofGiven = propertiesOf(given);
+    const NameIndex<CIMProperty> declared(ofClass);
+    const NameIndex<CIMProperty> present(ofGiven);
     CIMInstance completed(itsClass.getClassName());
-    for (Uint32 i = 0; i < itsClass.getPropertyCount(); ++i) {
-        const CIMConstProperty declared = itsClass.getProperty(i);
-        if (given.findProperty(declared.getName()) == PEG_NOT_FOUND) {
-            completed.addProperty(propertyOf(declared, declared.getValue(), true));
+    Array<CIMProperty>& list = listOf(completed);
+    for (Uint32 i = 0; i < ofClass.size(); ++i) {
+        if (!present.has(ofClass[i].getName())) {
+            list.append(propertyOf(ofClass[i], ofClass[i].getValue(), true));
         }
     }
-    for (Uint32 i = 0; i < given.getPropertyCount(); ++i) {
-        completed.addProperty(givenProperty(given.getProperty(i), itsClass));
+    for (Uint32 i = 0; i < ofGiven.size(); ++i) {
+        list.append(givenProperty(ofGiven[i], ofClass, declared));
     }
     return completed;
 }
@@ -95,48 +110,70 @@ CIMObjectPath instancePath(const CIMConstInstance& completed, const CIMConstClas
     if (keyNames.size() == 0) {
         fail(CIM_ERR_FAILED, "class has no keys: " + base::utf8(itsClass.getClassName()));
     }
+    const NameIndex<CIMName> isKey(keyNames);
+    const Array<CIMProperty>& properties = propertiesOf(completed);
     Array<CIMKeyBinding> keys;
-    for (Uint32 i = 0; i < keyNames.size(); ++i) {
-        keys.append(keyBinding(completed.getProperty(completed.findProperty(keyNames[i]))));
+    for (Uint32 i = 0; i < properties.size() && keys.size() < keyNames.size(); ++i) {
+        if (isKey.has(properties[i].getName())) {
+            keys.append(keyBinding(properties[i]));
+        }
+    }
+    if (keys.size() != keyNames.size()) {
+        fail(CIM_ERR_FAILED, "stored instance lacks a key: " + base::utf8(itsClass.getClassName()));
     }
     return CIMObjectPath(String(), CIMNamespaceName(), itsClass.getClassName(), keys);
 }
 
 CIMInstance mergedInstance(const CIMInstance& stored, const CIMConstInstance& modified, const CIMConstClass& itsClass,
-                           const CIMPropertyList& list)
+                           const ListedNames& listed)
 {
-    CIMInstance changes(itsClass.getClassName());
-    for (Uint32 i = 0; i < modified.getPropertyCount(); ++i) {
-        const CIMConstProperty property = modified.getProperty(i);
-        if (isListed(list, property.getName())) {
-            changes.addProperty(givenProperty(property, itsClass));
+    const Array<CIMProperty>& ofClass = propertiesOf(itsClass);
+    const Array<CIMProperty>& given = propertiesOf(modified);
+    const NameIndex<CIMProperty> declared(ofClass);
+    Array<CIMProperty> changes;
+    for (Uint32 i = 0; i < given.size(); ++i) {
+        if (listed.has(given[i].getName())) {
+            changes.append(givenProperty(given[i], ofClass, declared));
         }
     }
+    const NameIndex<CIMProperty> changed(changes);
+    const Array<CIMProperty>& kept = propertiesOf(stored);
     CIMInstance merged(itsClass.getClassName());
-    for (Uint32 i = 0; i < stored.getPropertyCount(); ++i) {
-        const CIMConstProperty kept = stored.getProperty(i);
-        const Uint32 changed = changes.findProperty(kept.getName());
-        merged.addProperty(changed == PEG_NOT_FOUND ? kept.clone() : changes.getProperty(changed));
+    Array<CIMProperty>& list = listOf(merged);
+    for (Uint32 i = 0; i < kept.size(); ++i) {
+        const Uint32 index = changed.find(kept[i].getName());
+        list.append(index == PEG_NOT_FOUND ? kept[i] : std::as_const(changes)[index]);
     }
     return merged;
 }
 
-CIMInstance filteredInstance(CIMInstance stored, const CIMConstClass& shape, const InstanceOptions& options)
+CIMInstance filteredInstance(CIMInstance stored, const CIMConstClass& shape, const ListedNames& listed,
+                             bool includeClassOrigin)
 {
+    const Array<CIMProperty>& all = propertiesOf(stored);
     CIMInstance filtered(stored.getClassName());
     filtered.setPath(stored.getPath());
-    const bool isWhole = shape.isUninitialized();
-    const Uint32 count = isWhole ? stored.getPropertyCount() : shape.getPropertyCount();
-    for (Uint32 i = 0; i < count; ++i) {
-        const Uint32 index = isWhole ? i : stored.findProperty(shape.getProperty(i).getName());
-        if (index == PEG_NOT_FOUND || !isListed(options.propertyList, stored.getProperty(index).getName())) {
-            continue;
+    Array<CIMProperty>& list = listOf(filtered);
+    const auto pick = [&](CIMProperty property) {
+        if (!listed.has(property.getName())) {
+            return;
         }
-        CIMProperty property = stored.getProperty(index);
-        if (!options.includeClassOrigin) {
+        if (!includeClassOrigin) {
             property.setClassOrigin(CIMName());
         }
-        filtered.addProperty(property);
+        list.append(property);
+    };
+    if (shape.isUninitialized()) {
+        std::for_each(all.getData(), all.getData() + all.size(), pick);
+        return filtered;
+    }
+    const NameIndex<CIMProperty> byName(all);
+    const Array<CIMProperty>& ofShape = propertiesOf(shape);
+    for (Uint32 i = 0; i < ofShape.size(); ++i) {
+        const Uint32 index = byName.find(ofShape[i].getName());
+        if (index != PEG_NOT_FOUND) {
+            pick(all[index]);
+        }
     }
     return filtered;
 }

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "pegasus/repository/ListedNames.h"
 #include "pegasus/repository/Repository.h"
 
 namespace Pegasus::repository {
@@ -19,12 +20,12 @@ CIMObjectPath instancePath(const CIMConstInstance& completed, const CIMConstClas
 // Requires: `stored` is complete. The caller checks that its path stays the same.
 // Throws: CIM_ERR_FAILED ("no such property: X", "type mismatch").
 CIMInstance mergedInstance(const CIMInstance& stored, const CIMConstInstance& modified, const CIMConstClass& itsClass,
-                           const CIMPropertyList& list);
+                           const ListedNames& listed);
 
-// Returns: the part of a stored instance that the options ask for, with its path. Like OpenPegasus, what is picked
-// comes
-//     in the class's order, a whole instance in the order of storage.
+// Returns: the listed part of a stored instance, with its path. Like OpenPegasus, what is picked comes in the class's
+//     order, a whole instance in the order of storage.
 // `stored`: spent afterwards. `shape`: the class whose properties are picked; uninitialised for the whole instance.
-CIMInstance filteredInstance(CIMInstance stored, const CIMConstClass& shape, const InstanceOptions& options);
+CIMInstance filteredInstance(CIMInstance stored, const CIMConstClass& shape, const ListedNames& listed,
+                             bool includeClassOrigin);
 
 } // namespace Pegasus::repository

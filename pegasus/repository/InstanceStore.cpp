@@ -4,13 +4,15 @@
 #include "pegasus/base/Text.h"
 #include "pegasus/repository/CimError.h"
 #include "pegasus/repository/InstanceRules.h"
+#include "pegasus/repository/ListedNames.h"
 #include "pegasus/repository/LookupKey.h"
 
 namespace Pegasus::repository {
 
 namespace {
 
-// A batch spreads the cost of a query over many instances; both bounds keep its memory small.
+// A batch spreads the cost of a query over many instances; both bounds keep its memory small, and short the time for
+// which the lock is held.
 constexpr std::size_t kBatchSize = 64;
 constexpr std::size_t kBatchBytes = 1u << 20;
 
@@ -23,59 +25,6 @@ CIMObjectPath withoutNamespace(CIMObjectPath path)
 
 } // namespace
 
-void InstanceStore::insert(NamespaceId nameSpace, const CIMObjectPath& path, const std::string& text)
-{
-    const std::string key = pathKey(path);
-    if (fStorage.findInstance(nameSpace, key)) {
-        fail(CIM_ERR_ALREADY_EXISTS, base::utf8(path.toString()));
-    }
-    fStorage.insertInstance(nameSpace, base::utf8(path.getClassName()), key, text);
-}
-
-CIMInstance InstanceStore::get(NamespaceId nameSpace, const CIMObjectPath& path, const InstanceOptions& options)
-{
-    const CIMInstance instance = withPath(nameSpace, find(nameSpace, path).body);
-    const bool isWhole = options.propertyList.isNull();
-    return filteredInstance(instance, isWhole ? CIMClass() : classOf(nameSpace, path.getClassName()), options);
-}
-
-void InstanceStore::modify(NamespaceId nameSpace, const CIMConstInstance& modified, const CIMPropertyList& list)
-{
-    const InstanceRow row = find(nameSpace, modified.getPath());
-    const CIMClass itsClass = classOf(nameSpace, modified.getPath().getClassName());
-    const CIMInstance merged = mergedInstance(fCodec.decodeInstance(row.body), modified, itsClass, list);
-    if (pathKey(instancePath(merged, itsClass)) != pathKey(modified.getPath())) {
-        fail(CIM_ERR_INVALID_PARAMETER, "a key property cannot change");
-    }
-    fStorage.updateInstance(row.sequence, fCodec.encodeInstance(merged));
-}
-
-void InstanceStore::remove(NamespaceId nameSpace, const CIMObjectPath& path)
-{
-    fStorage.deleteInstance(find(nameSpace, path).sequence);
-}
-
-std::vector<CIMInstance> InstanceStore::nextBatch(NamespaceId nameSpace, const CIMName& className,
-                                                  const InstanceOptions& options, std::int64_t& after)
-{
-    const CIMClass itsClass = classOf(nameSpace, className);
-    std::vector<CIMInstance> batch;
-    for (const InstanceRow& row :
-         fStorage.listInstances(nameSpace, base::utf8(className), after, kBatchSize, kBatchBytes))
-    {
-        after = row.sequence;
-        const CIMInstance instance = withPath(nameSpace, row.body);
-        CIMClass shape;
-        if (!options.deepInheritance) {
-            shape = itsClass;
-        } else if (!options.propertyList.isNull()) {
-            shape = classOf(nameSpace, instance.getClassName());
-        }
-        batch.push_back(filteredInstance(instance, shape, options));
-    }
-    return batch;
-}
-
 CIMClass InstanceStore::classOf(NamespaceId nameSpace, const CIMName& name)
 {
     CIMClass itsClass = fClasses.resolved(nameSpace, name);
@@ -87,7 +36,13 @@ CIMClass InstanceStore::classOf(NamespaceId nameSpace, const CIMName& name)
 
 InstanceRow InstanceStore::find(NamespaceId nameSpace, const CIMObjectPath& path)
 {
-    classOf(nameSpace, path.getClassName());
+    const Lock lock(fMutex);
+    return lockedFind(nameSpace, path);
+}
+
+// Requires: the caller holds the lock.
+InstanceRow InstanceStore::lockedFind(NamespaceId nameSpace, const CIMObjectPath& path)
+{
     const std::optional<InstanceRow> row = fStorage.findInstance(nameSpace, pathKey(path));
     if (!row) {
         fail(CIM_ERR_NOT_FOUND, base::utf8(withoutNamespace(path).toString()));
@@ -95,11 +50,80 @@ InstanceRow InstanceStore::find(NamespaceId nameSpace, const CIMObjectPath& path
     return *row;
 }
 
-CIMInstance InstanceStore::withPath(NamespaceId nameSpace, const std::string& body)
+CIMObjectPath InstanceStore::create(NamespaceId nameSpace, const CIMConstInstance& given)
 {
-    CIMInstance instance = fCodec.decodeInstance(body);
-    instance.setPath(instancePath(instance, classOf(nameSpace, instance.getClassName())));
-    return instance;
+    const CIMClass itsClass = classOf(nameSpace, given.getClassName());
+    const CIMInstance completed = completeInstance(given, itsClass);
+    const CIMObjectPath path = instancePath(completed, itsClass);
+    const std::string text = fEncoder.encodeInstance(completed);
+    const std::string key = pathKey(path);
+    const Lock lock(fMutex);
+    if (fStorage.findInstance(nameSpace, key)) {
+        fail(CIM_ERR_ALREADY_EXISTS, base::utf8(path.toString()));
+    }
+    fStorage.insertInstance(nameSpace, base::utf8(path.getClassName()), key, text);
+    return path;
+}
+
+CIMInstance InstanceStore::get(NamespaceId nameSpace, const CIMObjectPath& path, const InstanceOptions& options)
+{
+    const CIMClass itsClass = classOf(nameSpace, path.getClassName());
+    CIMInstance instance = ObjectDecoder(fEncoder).decodeInstance(find(nameSpace, path).body);
+    instance.setPath(instancePath(instance, itsClass));
+    const ListedNames listed(options.propertyList);
+    return filteredInstance(instance, listed.areAll() ? CIMClass() : itsClass, listed, options.includeClassOrigin);
+}
+
+// The row is read, worked on while the lock is free, and written if it is still the same; else once more, so that two
+// modifications of one instance both count. Each further round means that another modification has succeeded.
+void InstanceStore::modify(NamespaceId nameSpace, const CIMConstInstance& modified, const CIMPropertyList& list)
+{
+    const CIMClass itsClass = classOf(nameSpace, modified.getPath().getClassName());
+    const ListedNames listed(list);
+    for (bool isWritten = false; !isWritten;) {
+        const InstanceRow row = find(nameSpace, modified.getPath());
+        const CIMInstance stored = ObjectDecoder(fEncoder).decodeInstance(row.body);
+        const CIMInstance merged = mergedInstance(stored, modified, itsClass, listed);
+        if (pathKey(instancePath(merged, itsClass)) != pathKey(modified.getPath())) {
+            fail(CIM_ERR_INVALID_PARAMETER, "a key property cannot change");
+        }
+        const std::string text = fEncoder.encodeInstance(merged);
+        const Lock lock(fMutex);
+        isWritten = fStorage.replaceInstance(row, text);
+    }
+}
+
+void InstanceStore::remove(NamespaceId nameSpace, const CIMObjectPath& path)
+{
+    classOf(nameSpace, path.getClassName());
+    const Lock lock(fMutex);
+    fStorage.deleteInstance(lockedFind(nameSpace, path).sequence);
+}
+
+void InstanceStore::visit(NamespaceId nameSpace, const CIMName& className, const InstanceOptions& options,
+                          const InstanceVisitor& visitor)
+{
+    const CIMClass named = classOf(nameSpace, className);
+    const ListedNames listed(options.propertyList);
+    ObjectDecoder decoder(fEncoder);
+    std::int64_t after = 0;
+    const auto nextBatch = [&] {
+        const Lock lock(fMutex);
+        return fStorage.listInstances(nameSpace, base::utf8(className), after, kBatchSize, kBatchBytes);
+    };
+    for (auto batch = nextBatch(); !batch.empty(); batch = nextBatch()) {
+        for (const InstanceRow& row : batch) {
+            after = row.sequence;
+            CIMInstance instance = decoder.decodeInstance(row.body);
+            const CIMClass itsClass = classOf(nameSpace, instance.getClassName());
+            instance.setPath(instancePath(instance, itsClass));
+            const CIMClass whole = listed.areAll() ? CIMClass() : itsClass;
+            const CIMClass& shape = options.deepInheritance ? whole : named;
+            if (!visitor(filteredInstance(instance, shape, listed, options.includeClassOrigin))) {
+                return;
+            }
+        }
+    }
 }
 
 } // namespace Pegasus::repository

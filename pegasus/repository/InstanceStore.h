@@ -6,35 +6,34 @@
 namespace Pegasus::repository {
 
 // Instances of stored classes. Errors and limits: see Repository.
-// Requires: what the constructor takes outlives the store.
-// Thread: one thread at a time.
+//
+// A large instance takes long to decode, to check and to encode. The lock is held to read and write rows alone.
+// Requires: what the constructor takes outlives the store. The caller does not hold `mutex`.
+// Thread: any.
 class InstanceStore
 {
   public:
-    InstanceStore(Storage& storage, ObjectCodec& codec, ClassStore& classes)
-        : fStorage(storage), fCodec(codec), fClasses(classes)
+    // `mutex`: the lock of `storage`.
+    InstanceStore(std::mutex& mutex, Storage& storage, const ObjectEncoder& encoder, ClassStore& classes)
+        : fMutex(mutex), fStorage(storage), fEncoder(encoder), fClasses(classes)
     {
     }
 
-    // Stores an instance that was completed and encoded for its class. Throws: CIM_ERR_ALREADY_EXISTS.
-    void insert(NamespaceId nameSpace, const CIMObjectPath& path, const std::string& text);
+    CIMObjectPath create(NamespaceId nameSpace, const CIMConstInstance& given);
     CIMInstance get(NamespaceId nameSpace, const CIMObjectPath& path, const InstanceOptions& options);
     void modify(NamespaceId nameSpace, const CIMConstInstance& modified, const CIMPropertyList& list);
     void remove(NamespaceId nameSpace, const CIMObjectPath& path);
-    // Reads the instances that follow `after` (0 at first) until the batch is full, and moves `after` to the last one.
-    // Returns: the batch; empty at the end.
-    std::vector<CIMInstance> nextBatch(NamespaceId nameSpace, const CIMName& className, const InstanceOptions& options,
-                                       std::int64_t& after);
-
-    // Returns: the resolved class. Throws: CIM_ERR_INVALID_CLASS.
-    CIMClass classOf(NamespaceId nameSpace, const CIMName& name);
+    void visit(NamespaceId nameSpace, const CIMName& className, const InstanceOptions& options,
+               const InstanceVisitor& visitor);
 
   private:
+    CIMClass classOf(NamespaceId nameSpace, const CIMName& name);
     InstanceRow find(NamespaceId nameSpace, const CIMObjectPath& path);
-    CIMInstance withPath(NamespaceId nameSpace, const std::string& body);
+    InstanceRow lockedFind(NamespaceId nameSpace, const CIMObjectPath& path);
 
+    std::mutex& fMutex;
     Storage& fStorage;
-    ObjectCodec& fCodec;
+    const ObjectEncoder& fEncoder;
     ClassStore& fClasses;
 };
 

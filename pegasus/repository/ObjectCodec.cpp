@@ -21,12 +21,7 @@ wire::XmlLimits storageLimits(std::size_t maxBytes)
 
 } // namespace
 
-ObjectCodec::ObjectCodec(std::size_t maxBytes)
-    : fMaxBytes(maxBytes), fDocument(storageLimits(maxBytes)), fDecoder(storageLimits(maxBytes))
-{
-}
-
-std::string ObjectCodec::checked(std::string text) const
+std::string ObjectEncoder::checked(std::string text) const
 {
     if (text.size() > fMaxBytes) {
         fail(CIM_ERR_SERVER_LIMITS_EXCEEDED,
@@ -35,29 +30,34 @@ std::string ObjectCodec::checked(std::string text) const
     return text;
 }
 
-std::string ObjectCodec::encodeClass(const CIMConstClass& object) const
+std::string ObjectEncoder::encodeClass(const CIMConstClass& object) const
 {
     std::string text;
     wire::appendClass(text, object);
     return checked(std::move(text));
 }
 
-std::string ObjectCodec::encodeInstance(const CIMConstInstance& object) const
+std::string ObjectEncoder::encodeInstance(const CIMConstInstance& object) const
 {
     std::string text;
     wire::appendInstance(text, object);
     return checked(std::move(text));
 }
 
-std::string ObjectCodec::encodeQualifier(const CIMConstQualifierDecl& object) const
+std::string ObjectEncoder::encodeQualifier(const CIMConstQualifierDecl& object) const
 {
     std::string text;
     wire::appendQualifierDeclaration(text, object);
     return checked(std::move(text));
 }
 
+ObjectDecoder::ObjectDecoder(const ObjectEncoder& encoder)
+    : fDocument(storageLimits(encoder.maxBytes())), fDecoder(storageLimits(encoder.maxBytes()))
+{
+}
+
 template <typename Object>
-Object ObjectCodec::decode(std::string& text, Object (wire::ElementDecoder::*function)(const wire::XmlElement&))
+Object ObjectDecoder::decode(std::string& text, Object (wire::ElementDecoder::*function)(const wire::XmlElement&))
 {
     try {
         return (fDecoder.*function)(fDocument.parseElement(text.data(), text.size(), {}));
@@ -66,17 +66,17 @@ Object ObjectCodec::decode(std::string& text, Object (wire::ElementDecoder::*fun
     }
 }
 
-CIMClass ObjectCodec::decodeClass(std::string text)
+CIMClass ObjectDecoder::decodeClass(std::string text)
 {
     return decode<CIMClass>(text, &wire::ElementDecoder::decodeClass);
 }
 
-CIMInstance ObjectCodec::decodeInstance(std::string text)
+CIMInstance ObjectDecoder::decodeInstance(std::string text)
 {
     return decode<CIMInstance>(text, &wire::ElementDecoder::decodeInstance);
 }
 
-CIMQualifierDecl ObjectCodec::decodeQualifier(std::string text)
+CIMQualifierDecl ObjectDecoder::decodeQualifier(std::string text)
 {
     return decode<CIMQualifierDecl>(text, &wire::ElementDecoder::decodeQualifierDeclaration);
 }

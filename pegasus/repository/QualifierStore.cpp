@@ -23,31 +23,49 @@ std::string keyOf(NamespaceId nameSpace, const CIMName& name)
 CIMQualifierDecl QualifierStore::find(NamespaceId nameSpace, const CIMName& name)
 {
     const std::string key = keyOf(nameSpace, name);
-    const auto known = fKnown.find(key);
-    if (known != fKnown.end()) {
-        return known->second;
+    std::optional<std::string> text;
+    std::uint64_t setCount = 0;
+    {
+        const Lock lock(fMutex);
+        const auto known = fKnown.find(key);
+        if (known != fKnown.end()) {
+            return known->second;
+        }
+        text = fStorage.findQualifier(nameSpace, base::utf8(name));
+        setCount = fSetCount;
     }
-    const std::optional<std::string> text = fStorage.findQualifier(nameSpace, base::utf8(name));
     if (!text) {
         return CIMQualifierDecl();
     }
+    CIMQualifierDecl found = ObjectDecoder(fEncoder).decodeQualifier(std::move(*text));
+    const Lock lock(fMutex);
     if (fKnown.size() >= kMaxKnown) {
         fKnown.clear();
     }
-    return fKnown[key] = fCodec.decodeQualifier(*text);
+    if (setCount == fSetCount) {
+        fKnown[key] = found;
+    }
+    return found;
 }
 
 std::vector<CIMQualifierDecl> QualifierStore::list(NamespaceId nameSpace)
 {
+    std::vector<std::string> texts;
+    {
+        const Lock lock(fMutex);
+        texts = fStorage.listQualifiers(nameSpace);
+    }
+    ObjectDecoder decoder(fEncoder);
     std::vector<CIMQualifierDecl> all;
-    for (const std::string& text : fStorage.listQualifiers(nameSpace)) {
-        all.push_back(fCodec.decodeQualifier(text));
+    for (std::string& text : texts) {
+        all.push_back(decoder.decodeQualifier(std::move(text)));
     }
     return all;
 }
 
 void QualifierStore::set(NamespaceId nameSpace, const CIMConstQualifierDecl& declaration)
 {
+    const std::lock_guard<std::mutex> alone(fSetting);
     const CIMName& name = declaration.getName();
     const CIMQualifierDecl existing = find(nameSpace, name);
     if (!existing.isUninitialized() &&
@@ -55,8 +73,11 @@ void QualifierStore::set(NamespaceId nameSpace, const CIMConstQualifierDecl& dec
     {
         return;
     }
-    fStorage.putQualifier(nameSpace, base::utf8(name), fCodec.encodeQualifier(declaration));
+    const std::string text = fEncoder.encodeQualifier(declaration);
+    const Lock lock(fMutex);
+    fStorage.putQualifier(nameSpace, base::utf8(name), text);
     fKnown.erase(keyOf(nameSpace, name));
+    ++fSetCount;
 }
 
 } // namespace Pegasus::repository

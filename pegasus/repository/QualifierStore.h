@@ -4,6 +4,8 @@
 #include "pegasus/repository/ObjectCodec.h"
 #include "pegasus/repository/Storage.h"
 
+#include <cstdint>
+#include <mutex>
 #include <string>
 #include <unordered_map>
 #include <vector>
@@ -12,12 +14,16 @@ namespace Pegasus::repository {
 
 // Qualifier declarations, each decoded once: every qualifier of every new class is checked against its declaration.
 // Errors and limits: see Repository.
-// Requires: what the constructor takes outlives the store.
-// Thread: one thread at a time.
+// Requires: what the constructor takes outlives the store. The caller does not hold `mutex`.
+// Thread: any.
 class QualifierStore
 {
   public:
-    QualifierStore(Storage& storage, ObjectCodec& codec) : fStorage(storage), fCodec(codec) {}
+    // `mutex`: the lock of `storage`.
+    QualifierStore(std::mutex& mutex, Storage& storage, const ObjectEncoder& encoder)
+        : fMutex(mutex), fStorage(storage), fEncoder(encoder)
+    {
+    }
 
     // Returns: the declaration; uninitialised when absent.
     CIMQualifierDecl find(NamespaceId nameSpace, const CIMName& name);
@@ -25,8 +31,11 @@ class QualifierStore
     void set(NamespaceId nameSpace, const CIMConstQualifierDecl& declaration);
 
   private:
+    std::mutex fSetting; // taken before fMutex: one set() at a time, which may take long without blocking find()
+    std::mutex& fMutex;
     Storage& fStorage;
-    ObjectCodec& fCodec;
+    const ObjectEncoder& fEncoder;
+    std::uint64_t fSetCount = 0; // of finished set(): tells find() that what it decoded may be out of date
     std::unordered_map<std::string, CIMQualifierDecl> fKnown; // by namespace and name key
 };
 

@@ -48,8 +48,8 @@ using InstanceVisitor = std::function<bool(const CIMInstance&)>;
 
 // The private server's store of namespaces, qualifier declarations, classes and instances.
 //
-// Four levels: this class serialises operations and finds the namespace; one store a kind of object (NamespaceTable,
-// QualifierStore, ClassStore, InstanceStore) applies CIM's rules and keeps caches; Storage maps names and encoded
+// Four levels: this class finds the namespace; one store a kind of object (NamespaceTable, QualifierStore, ClassStore,
+// InstanceStore) applies CIM's rules, keeps caches and takes the one lock; Storage maps names and encoded
 // objects to tables; Database and Statement are SQLite.
 //
 // Classes are stored as they were created and resolved with what they inherit when they are read. A write that has
@@ -62,10 +62,10 @@ using InstanceVisitor = std::function<bool(const CIMInstance&)>;
 //     symbolic code is left out. CIM_ERR_INVALID_NAMESPACE (message: the namespace) when the namespace is missing;
 //     CIM_ERR_FAILED when the storage fails.
 // Thread: all operations may be called on any thread at any time. Their accesses to the storage run one after the
-// other;
-//     new classes and instances are checked and encoded, and classes encoded for an answer, at the same time.
+//     other; objects are decoded, resolved, checked and encoded at the same time.
 // Ownership: returned classes share their parts with the cache; clone() makes one that may be changed.
-// Blocks: for file accesses of one operation, and while another thread accesses the storage.
+// Blocks: for file accesses of one operation, and while another thread accesses the storage; however large the object
+//     that another thread works on.
 class Repository
 {
   public:

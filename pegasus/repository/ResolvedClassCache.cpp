@@ -36,7 +36,11 @@ CIMClass ResolvedClassCache::find(NamespaceId nameSpace, const std::string& name
 
 void ResolvedClassCache::insert(NamespaceId nameSpace, const std::string& nameKey, const CIMClass& resolved)
 {
-    fEntries.push_front(Entry{keyOf(nameSpace, nameKey), resolved, {}});
+    std::string key = keyOf(nameSpace, nameKey);
+    if (fByKey.count(key) != 0) {
+        return;
+    }
+    fEntries.push_front(Entry{std::move(key), resolved, {}});
     fByKey[fEntries.front().key] = fEntries.begin();
     if (fEntries.size() > fCapacity) {
         fByKey.erase(fEntries.back().key);

@@ -22,7 +22,7 @@ class ResolvedClassCache
 
     // Returns: the class; uninitialised when absent.
     CIMClass find(NamespaceId nameSpace, const std::string& nameKey);
-    // Requires: the class is absent from the cache.
+    // Keeps the class, unless the cache has it.
     void insert(NamespaceId nameSpace, const std::string& nameKey, const CIMClass& resolved);
     // Returns: the class as a CLASS element, if keepText() got it; null else.
     // Requires: the options have no property list.

@@ -69,7 +69,7 @@ struct Storage::Statements
           insertClass(db, "INSERT INTO classes(namespace, name, super, body) VALUES(?, ?, ?, ?)"),
           findInstance(db, "SELECT sequence, body FROM instances WHERE namespace = ? AND path = ?"),
           insertInstance(db, "INSERT INTO instances(namespace, class, path, body) VALUES(?, ?, ?, ?)"),
-          updateInstance(db, "UPDATE instances SET body = ?2 WHERE sequence = ?1"),
+          replaceInstance(db, "UPDATE instances SET body = ?3 WHERE sequence = ?1 AND body = ?2 RETURNING sequence"),
           deleteInstance(db, "DELETE FROM instances WHERE sequence = ?"), listInstances(db, kListInstances)
     {
     }
@@ -77,7 +77,7 @@ struct Storage::Statements
     Statement listNamespaces, insertNamespace;
     Statement findQualifier, listQualifiers, putQualifier;
     Statement findClass, findSuperClass, listSubclasses, listDeepSubclasses, insertClass;
-    Statement findInstance, insertInstance, updateInstance, deleteInstance, listInstances;
+    Statement findInstance, insertInstance, replaceInstance, deleteInstance, listInstances;
 };
 
 Storage::Storage(const std::string& path) : fDatabase(path)
@@ -160,9 +160,13 @@ void Storage::insertInstance(NamespaceId id, const std::string& className, const
                                         std::string_view(body));
 }
 
-void Storage::updateInstance(std::int64_t sequence, const std::string& body)
+bool Storage::replaceInstance(const InstanceRow& row, const std::string& body)
 {
-    fStatements->updateInstance.execute(sequence, std::string_view(body));
+    Rows rows = fStatements->replaceInstance.run(row.sequence, std::string_view(row.body), std::string_view(body));
+    const bool isReplaced = rows.next();
+    while (rows.next()) { // the change is committed when the statement has run to its end
+    }
+    return isReplaced;
 }
 
 void Storage::deleteInstance(std::int64_t sequence)

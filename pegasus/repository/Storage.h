@@ -5,6 +5,7 @@
 
 #include <cstdint>
 #include <memory>
+#include <mutex>
 #include <optional>
 #include <string>
 #include <utility>
@@ -13,6 +14,7 @@
 namespace Pegasus::repository {
 
 using NamespaceId = std::int64_t;
+using Lock = std::lock_guard<std::mutex>;
 
 // A stored instance: its place in the order of creation, and its text.
 struct InstanceRow
@@ -51,7 +53,8 @@ class Storage
     // `path`: as pathKey() forms it.
     std::optional<InstanceRow> findInstance(NamespaceId id, const std::string& path);
     void insertInstance(NamespaceId id, const std::string& className, const std::string& path, const std::string& body);
-    void updateInstance(std::int64_t sequence, const std::string& body);
+    // Replaces the body of a row. Returns: false when the row is gone or has another body than `row`.
+    bool replaceInstance(const InstanceRow& row, const std::string& body);
     void deleteInstance(std::int64_t sequence);
     // Returns: instances of the class and of all below it with a sequence beyond `after`: at most `limit` of them, and
     //     the one that reaches `maxBytes` is the last.

@@ -6,6 +6,12 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <atomic>
+#include <chrono>
+#include <functional>
+#include <thread>
+
 using namespace Pegasus;
 using namespace Pegasus::repository;
 using mof_test::describe;
@@ -54,6 +60,61 @@ CIMInstance instanceOf(const char* className, const std::vector<std::pair<const 
         instance.addProperty(CIMProperty(CIMName(name), value));
     }
     return instance;
+}
+
+// Names in capitals for even numbers: look-ups ignore the letter case.
+CIMName memberName(int number, bool isCapital)
+{
+    return CIMName(((isCapital ? "MEMBER" : "Member") + std::to_string(number)).c_str());
+}
+
+CIMInstance instanceWith(int memberCount, Uint32 value)
+{
+    CIMInstance instance{CIMName("Wide")};
+    for (int i = 0; i < memberCount; ++i) {
+        instance.addProperty(CIMProperty(memberName(i, i % 2 == 0), CIMValue(value)));
+    }
+    instance.setPath(CIMObjectPath("Wide.Id=\"a\""));
+    return instance;
+}
+
+// Declares a class of so many members below a base that has every second one, and creates an instance.
+void createWide(Repository& repository, int memberCount)
+{
+    CIMClass above{CIMName("Above"), CIMName("Base")};
+    CIMClass wide{CIMName("Wide"), CIMName("Above")};
+    for (int i = 0; i < memberCount; ++i) {
+        if (i % 2 == 0) {
+            above.addProperty(CIMProperty(memberName(i, false), CIMValue(Uint32(1))));
+        }
+        wide.addProperty(CIMProperty(memberName(i, false), CIMValue(Uint32(2))));
+    }
+    repository.createClass(kNamespace, above);
+    repository.createClass(kNamespace, wide);
+    CIMInstance instance = instanceOf("Wide", {{"Id", CIMValue(String("a"))}});
+    repository.createInstance(kNamespace, instance);
+}
+
+using Clock = std::chrono::steady_clock;
+
+// Runs `work` on a thread of its own. Returns: whether calls of `other` were answered all along: each took less than
+// half of the time of `work`.
+bool areAnsweredDuring(const std::function<void()>& work, const std::function<void()>& other)
+{
+    std::atomic<bool> isDone{false};
+    const auto start = Clock::now();
+    std::thread worker([&] {
+        work();
+        isDone = true;
+    });
+    auto longest = Clock::duration::zero();
+    while (!isDone) {
+        const auto before = Clock::now();
+        other();
+        longest = std::max(longest, Clock::now() - before);
+    }
+    worker.join();
+    return longest < (Clock::now() - start) / 2;
 }
 
 } // namespace
@@ -192,4 +253,95 @@ TEST_F(InstanceTest, ModifiesListedPropertiesButNoKey)
     keyChange.setPath(CIMObjectPath("Leaf.Id=\"a\""));
     EXPECT_EQ(failureOf([&] { repository.modifyInstance(kNamespace, keyChange, CIMPropertyList()); }),
               "4 a key property cannot change");
+}
+
+// Few members are looked up one by one, many by an index.
+TEST_F(InstanceTest, FindsFewAndManyMembersByTheirNames)
+{
+    for (const int count : {4, 300}) {
+        const test::TemporaryDirectory folder;
+        Repository wide(folder.path());
+        compileText(wide, "root/test", kSchema);
+        createWide(wide, count);
+        const CIMConstClass whole = wide.getClass(kNamespace, CIMName("Wide"), {false, true, true, {}});
+        ASSERT_EQ(whole.getPropertyCount(), Uint32(count) + 2);
+        for (int i = 0; i < count; ++i) {
+            const CIMConstProperty property = whole.getProperty(whole.findProperty(memberName(i, true)));
+            EXPECT_EQ(utf8(property.getClassOrigin().getString()), i % 2 == 0 ? "Above" : "Wide") << i;
+        }
+        Array<CIMName> names;
+        for (int i = 1; i < count; ++i) {
+            names.append(memberName(i, i % 3 == 0));
+        }
+        wide.modifyInstance(kNamespace, instanceWith(count, 7), CIMPropertyList(names));
+        names.prepend(memberName(0, false));
+        const CIMInstance found =
+            wide.getInstance(kNamespace, CIMObjectPath("Wide.Id=\"a\""), {true, false, CIMPropertyList(names)});
+        ASSERT_EQ(found.getPropertyCount(), Uint32(count));
+        for (int i = 0; i < count; ++i) {
+            EXPECT_EQ(found.getProperty(Uint32(i)).getValue(), CIMValue(Uint32(i == 0 ? 2 : 7))) << i;
+        }
+        EXPECT_EQ(failureOf([&] { wide.modifyInstance(kNamespace, instanceWith(count + 1, 8), {}); }),
+                  "1 no such property: MEMBER" + std::to_string(count));
+    }
+}
+
+// What takes long with a large object is done while the lock is free.
+TEST_F(InstanceTest, LargeObjectsKeepNoOtherRequestWaiting)
+{
+    constexpr int kMembers = 8000;
+    RepositoryLimits limits;
+    limits.cachedClassCount = 3; // so that reading the others drops Wide
+    Repository wide(directory.path() + "/wide", limits);
+    compileText(wide, "root/test", kSchema);
+    createWide(wide, kMembers);
+    const CIMInstance changed = instanceWith(kMembers, 7);
+    const ClassOptions whole{false, true, true, {}};
+    struct Row
+    {
+        const char* name;
+        std::function<void()> work;
+    };
+    const Row rows[] = {
+        {"modifyInstance", [&] { wide.modifyInstance(kNamespace, changed, {}); }},
+        {"getInstance", [&] { wide.getInstance(kNamespace, changed.getPath(), {}); }},
+        {"enumerateInstances", [&] { wide.enumerateInstanceNames(kNamespace, CIMName("Base")); }},
+        {"getClass", [&] { wide.getClass(kNamespace, CIMName("Wide"), whole); }},
+    };
+    for (const Row& row : rows) {
+        // The scheduler may starve the other request in a round, but not in each.
+        const auto deadline = Clock::now() + std::chrono::seconds(30);
+        bool isAnswered = false;
+        while (!isAnswered && Clock::now() < deadline) {
+            for (const char* name : {"Keys", "Keyless", "Leaf"}) {
+                wide.getClass(kNamespace, CIMName(name), whole);
+            }
+            isAnswered = areAnsweredDuring(row.work, [&] { wide.hasClass(kNamespace, CIMName("Keys")); });
+        }
+        EXPECT_TRUE(isAnswered) << row.name;
+    }
+}
+
+// Each reads, changes and writes the whole instance: a change that another thread overwrote would be lost.
+TEST_F(InstanceTest, ModificationsAtTheSameTimeAllCount)
+{
+    constexpr int kThreads = 4;
+    createWide(repository, kThreads);
+    std::vector<std::thread> threads;
+    for (int thread = 0; thread < kThreads; ++thread) {
+        threads.emplace_back([&, thread] {
+            Array<CIMName> mine;
+            mine.append(memberName(thread, false));
+            for (Uint32 value = 10; value < 110; ++value) {
+                const CIMInstance changed = instanceWith(kThreads, value);
+                repository.modifyInstance(kNamespace, changed, CIMPropertyList(mine));
+                const CIMInstance found =
+                    repository.getInstance(kNamespace, changed.getPath(), {true, false, CIMPropertyList(mine)});
+                EXPECT_EQ(found.getProperty(0).getValue(), CIMValue(value));
+            }
+        });
+    }
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
 }
