@@ -37,6 +37,29 @@ std::size_t copyAsciiBlocks(const char* from, std::size_t size, Char16* to) noex
     return done;
 }
 
+bool isAsciiBlock(const Char16* from) noexcept
+{
+    std::uint64_t blocks[2] = {};
+    static_assert(sizeof blocks == kBlock * sizeof(Char16));
+    std::memcpy(blocks, static_cast<const void*>(from), sizeof blocks);
+    return ((blocks[0] | blocks[1]) & 0xFF80FF80FF80FF80u) == 0;
+}
+
+// Copies ASCII up to the first other unit. Returns: how many units.
+std::size_t copyAscii(const Char16* from, std::size_t count, char* to) noexcept
+{
+    std::size_t done = 0;
+    for (; count - done >= kBlock && isAsciiBlock(from + done); done += kBlock) {
+        for (std::size_t i = 0; i < kBlock; ++i) {
+            to[done + i] = static_cast<char>(Uint16(from[done + i]));
+        }
+    }
+    for (; done < count && Uint16(from[done]) < 0x80; ++done) {
+        to[done] = static_cast<char>(Uint16(from[done]));
+    }
+    return done;
+}
+
 struct Sequence
 {
     std::uint32_t code;
@@ -191,8 +214,11 @@ void appendUtf8(std::string& out, std::uint32_t code)
 
 void appendUtf8(std::string& out, const Char16* units, std::size_t count)
 {
-    out.reserve(out.size() + count);
-    for (std::size_t i = 0; i < count; ++i) {
+    const std::size_t start = out.size();
+    out.resize(start + count);
+    const std::size_t ascii = copyAscii(units, count, out.data() + start);
+    out.resize(start + ascii);
+    for (std::size_t i = ascii; i < count; ++i) {
         std::uint32_t code = Uint16(units[i]);
         if (isHighSurrogate(code) && i + 1 < count && isLowSurrogate(Uint16(units[i + 1]))) {
             code = 0x10000 + ((code - 0xD800) << 10) + (Uint16(units[i + 1]) - 0xDC00u);

@@ -84,14 +84,6 @@ void appendScope(std::string& out, const CIMScope& scope)
 
 // ---- properties, methods
 
-// Two blanks follow the name, as OpenPegasus writes them.
-void appendPropertyStart(std::string& out, const char* element, const CIMConstProperty& property)
-{
-    out.append("<").append(element);
-    appendAttribute(out, "NAME", property.getName().getString());
-    out += ' ';
-}
-
 void appendOriginAndPropagated(std::string& out, const CIMConstProperty& property)
 {
     appendNameIfAny(out, "CLASSORIGIN", property.getClassOrigin());
@@ -168,11 +160,16 @@ void appendClass(std::string& out, const CIMConstClass& cimClass)
     out += "</CLASS>\n";
 }
 
-void appendInstance(std::string& out, const CIMConstInstance& instance, Blanks blanks)
+void appendInstanceStart(std::string& out, const CIMName& className)
 {
     out += "<INSTANCE";
-    appendAttribute(out, "CLASSNAME", instance.getClassName().getString());
+    appendAttribute(out, "CLASSNAME", className.getString());
     out += " >\n";
+}
+
+void appendInstance(std::string& out, const CIMConstInstance& instance, Blanks blanks)
+{
+    appendInstanceStart(out, instance.getClassName());
     appendQualifiers(out, instance);
     for (Uint32 i = 0; i < instance.getPropertyCount(); ++i) {
         appendProperty(out, instance.getProperty(i), blanks);
@@ -202,11 +199,13 @@ void appendQualifierDeclaration(std::string& out, const CIMConstQualifierDecl& d
     out += "</QUALIFIER.DECLARATION>\n";
 }
 
-void appendProperty(std::string& out, const CIMConstProperty& property, Blanks blanks)
+// Two blanks follow the name, as OpenPegasus writes them.
+void appendPropertyStart(std::string& out, const CIMConstProperty& property)
 {
-    const char* element = propertyElement(property);
     const CIMType type = property.getType();
-    appendPropertyStart(out, element, property);
+    out.append("<").append(propertyElement(property));
+    appendAttribute(out, "NAME", property.getName().getString());
+    out += ' ';
     if (type == CIMTYPE_REFERENCE) {
         appendNameIfAny(out, "REFERENCECLASS", property.getReferenceClassName());
         appendOriginAndPropagated(out, property);
@@ -221,9 +220,14 @@ void appendProperty(std::string& out, const CIMConstProperty& property, Blanks b
         appendEmbeddedMark(out, type);
     }
     out += ">\n";
+}
+
+void appendProperty(std::string& out, const CIMConstProperty& property, Blanks blanks)
+{
+    appendPropertyStart(out, property);
     appendQualifiers(out, property);
     appendValue(out, property.getValue(), blanks);
-    out.append("</").append(element).append(">\n");
+    out.append("</").append(propertyElement(property)).append(">\n");
 }
 
 } // namespace Pegasus::wire

@@ -22,10 +22,14 @@ void appendClass(std::string& out, const CIMConstClass& cimClass);
 void appendInstance(std::string& out, const CIMConstInstance& instance, Blanks blanks = Blanks::kReferences);
 // VALUE.NAMEDINSTANCE, from the instance's path and the instance
 void appendNamedInstance(std::string& out, const CIMConstInstance& instance, Blanks blanks = Blanks::kReferences);
+// The start tag of INSTANCE
+void appendInstanceStart(std::string& out, const CIMName& className);
 // QUALIFIER.DECLARATION
 void appendQualifierDeclaration(std::string& out, const CIMConstQualifierDecl& declaration);
 // PROPERTY, PROPERTY.ARRAY or PROPERTY.REFERENCE
 void appendProperty(std::string& out, const CIMConstProperty& property, Blanks blanks = Blanks::kReferences);
+// Its start tag
+void appendPropertyStart(std::string& out, const CIMConstProperty& property);
 
 // CLASSNAME
 void appendClassName(std::string& out, const CIMName& className);

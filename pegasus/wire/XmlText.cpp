@@ -7,7 +7,9 @@
 #include "pegasus/base/Utf8.h"
 
 #include <algorithm>
+#include <array>
 #include <cstdint>
+#include <cstring>
 #include <optional>
 
 namespace Pegasus::wire {
@@ -86,7 +88,7 @@ std::optional<std::string_view> pseudoAttribute(std::string_view declaration, st
 }
 
 // What a character becomes in XML text; null when it stays as it is.
-const char* entityOf(char c)
+constexpr const char* entityOf(char c)
 {
     switch (c) {
     case '&':
@@ -104,9 +106,79 @@ const char* entityOf(char c)
     }
 }
 
-bool isControl(char c)
+constexpr bool isControl(char c)
 {
     return static_cast<unsigned char>(c) < 0x20 || c == 0x7F;
+}
+
+// The characters that stay as they are wherever they stand; a blank does so in most places.
+constexpr std::array<bool, 256> plainCharacters()
+{
+    std::array<bool, 256> plain{};
+    for (int c = 0; c < 256; ++c) {
+        const char character = static_cast<char>(c);
+        plain[static_cast<std::size_t>(c)] =
+            entityOf(character) == nullptr && !isControl(character) && character != ' ';
+    }
+    return plain;
+}
+constexpr std::array<bool, 256> kPlain = plainCharacters();
+
+using Block [[gnu::vector_size(16)]] = unsigned char;
+
+Block load(const char* from)
+{
+    Block block;
+    std::memcpy(&block, from, sizeof block);
+    return block;
+}
+
+// Returns: how many characters of a block stay as they are, up to the first other one.
+// Requires, but for kRaw: a character before the block and one after it.
+std::size_t keptIn(const char* from, Blanks blanks)
+{
+    const Block c = load(from);
+    auto changes = (c < 0x20) | (c == 0x7F) | (c == '"') | (c == '&') | (c == '\'') | (c == '<') | (c == '>');
+    if (blanks == Blanks::kReferences) {
+        changes |= (c == ' ') & (load(from - 1) == ' ');
+    }
+    std::uint64_t halves[2];
+    std::memcpy(halves, &changes, sizeof halves);
+    if (halves[0] != 0) {
+        return static_cast<std::size_t>(__builtin_ctzll(halves[0])) / 8;
+    }
+    return halves[1] != 0 ? 8 + static_cast<std::size_t>(__builtin_ctzll(halves[1])) / 8 : sizeof(Block);
+}
+
+bool isKept(std::string_view text, std::size_t at, Blanks blanks)
+{
+    if (text[at] != ' ' || blanks == Blanks::kRaw) {
+        return kPlain[static_cast<unsigned char>(text[at])] || text[at] == ' ';
+    }
+    return at > 0 && at + 1 < text.size() && text[at - 1] != ' ';
+}
+
+// Returns: the next character from `at` on that changes; the text's size when the rest stays as it is.
+std::size_t findEscaped(std::string_view text, std::size_t at, Blanks blanks)
+{
+    while (at < text.size()) {
+        const std::size_t end = std::min(at + sizeof(Block), text.size());
+        const bool isWithin = blanks == Blanks::kRaw ? end - at == sizeof(Block) : at > 0 && end < text.size();
+        if (isWithin) {
+            const std::size_t kept = keptIn(text.data() + at, blanks);
+            at += kept;
+            if (kept < sizeof(Block)) {
+                return at;
+            }
+            continue;
+        }
+        for (; at < end; ++at) {
+            if (!isKept(text, at, blanks)) {
+                return at;
+            }
+        }
+    }
+    return at;
 }
 
 void appendCharacterReference(std::string& out, char c)
@@ -200,23 +272,29 @@ void checkXmlDeclaration(std::string_view declaration, XmlPlace place)
 
 void appendEscaped(std::string& out, std::string_view text, Blanks blanks)
 {
-    const bool isRaw = blanks == Blanks::kRaw;
-    for (std::size_t i = 0; i < text.size(); ++i) {
-        const char c = text[i];
-        const bool isEdge = i == 0 || i + 1 == text.size();
-        if (const char* entity = entityOf(c)) {
+    std::size_t done = 0;
+    for (std::size_t at = 0; (at = findEscaped(text, at, blanks)) < text.size(); done = ++at) {
+        out.append(text, done, at - done);
+        if (const char* entity = entityOf(text[at])) {
             out += entity;
-        } else if (isControl(c) || (c == ' ' && !isRaw && (isEdge || text[i - 1] == ' '))) {
-            appendCharacterReference(out, c);
         } else {
-            out += c;
+            appendCharacterReference(out, text[at]);
         }
     }
+    out.append(text, done);
 }
 
+// Most texts need no escape: they are written in place.
 void appendEscaped(std::string& out, const String& text, Blanks blanks)
 {
-    appendEscaped(out, base::utf8(text), blanks);
+    const std::size_t start = out.size();
+    base::appendUtf8(out, text);
+    const std::string_view written = std::string_view(out).substr(start);
+    if (findEscaped(written, 0, blanks) < written.size()) {
+        const std::string raw(written);
+        out.resize(start);
+        appendEscaped(out, std::string_view(raw), blanks);
+    }
 }
 
 } // namespace Pegasus::wire

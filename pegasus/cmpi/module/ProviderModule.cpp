@@ -154,6 +154,20 @@ void ProviderModule::enumerateInstances(const ProviderRequest& request, const CI
 {
     PropertyFilter filter(properties);
     ResultObject result(filter, sink, nullptr, nullptr);
+    enumerate(request, className, filter, result);
+}
+
+void ProviderModule::writeInstances(const ProviderRequest& request, const CIMName& className,
+                                    const CIMPropertyList& properties, const InstanceTextSink& sink)
+{
+    PropertyFilter filter(properties);
+    ResultObject result(filter, sink);
+    enumerate(request, className, filter, result);
+}
+
+void ProviderModule::enumerate(const ProviderRequest& request, const CIMName& className, PropertyFilter& filter,
+                               ResultObject& result)
+{
     const Call call(fImpl->broker, fImpl->interfaces, request, classPath(className), result);
     CMPIInstanceMI& mi = fImpl->interfaces.instance(request.provider);
     if (mi.ft->enumerateInstances == nullptr) {

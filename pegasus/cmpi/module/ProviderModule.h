@@ -9,6 +9,9 @@
 
 namespace Pegasus::cmpi {
 
+class PropertyFilter;
+class ResultObject;
+
 // One vendor library and the providers in it, driven through CMPI.
 //
 // The constructor loads the library. A provider's instance or method interface is made at its first request and kept.
@@ -50,6 +53,9 @@ class ProviderModule
     // The provider sees one class. For a superclass's properties of subclass instances, the caller passes them as list.
     void enumerateInstances(const ProviderRequest& request, const CIMName& className, const CIMPropertyList& properties,
                             const InstanceSink& sink);
+    // The same, with every instance written as VALUE.NAMEDINSTANCE, and no objects made in between.
+    void writeInstances(const ProviderRequest& request, const CIMName& className, const CIMPropertyList& properties,
+                        const InstanceTextSink& sink);
     void enumerateInstanceNames(const ProviderRequest& request, const CIMName& className, const PathSink& sink);
 
     // Throws: CIM_ERR_NOT_FOUND also when the provider returns nothing.
@@ -72,6 +78,8 @@ class ProviderModule
     Cleanup cleanupWhenIdle();
 
   private:
+    void enumerate(const ProviderRequest& request, const CIMName& className, PropertyFilter& filter,
+                   ResultObject& result);
     void missedReturnDone(const ProviderRequest& request);
 
     class Impl;

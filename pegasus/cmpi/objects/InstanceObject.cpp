@@ -9,6 +9,7 @@
 #include "pegasus/cmpi/objects/NamedValues.h"
 #include "pegasus/cmpi/services/PropertyFilter.h"
 #include "pegasus/common/ObjectReps.h"
+#include "pegasus/wire/ElementEncoder.h"
 
 #include <Pegasus/Common/CIMObject.h>
 #include <Pegasus/Common/CIMProperty.h>
@@ -76,6 +77,19 @@ CIMProperty propertyOf(const PropertySchema& declared, const CIMValue& value)
     const CIMValue typed = asDeclared(declared, value);
     return {declared.name,       typed, sizeOf(typed), isReference ? declared.referenceClass : CIMName(), CIMName(),
             declared.isInherited};
+}
+
+constexpr wire::Blanks kBlanks = wire::Blanks::kRaw; // how OpenPegasus passes a provider's texts on
+
+void appendDeclared(std::string& out, const PropertySchema& declared, const CIMValue& value)
+{
+    if (declared.start.empty()) {
+        wire::appendProperty(out, propertyOf(declared, value), kBlanks);
+        return;
+    }
+    out += declared.start;
+    wire::appendValue(out, value, kBlanks);
+    out += "</PROPERTY>\n";
 }
 
 // The bit in fPathKeys of a key property; none for other properties, and for keys beyond the 32nd.
@@ -284,14 +298,38 @@ CIMInstance InstanceObject::filtered(const PropertyFilter& filter) const
     return result;
 }
 
-CIMInstance InstanceObject::delivered(const PropertyFilter& filter) const
+CIMObjectPath InstanceObject::deliveredPath() const
 {
     if (fPathKeys != 0) {
         tolerate(Habit::kKeysOnPathOnly);
     }
+    return completePath().delivered();
+}
+
+CIMInstance InstanceObject::delivered(const PropertyFilter& filter) const
+{
     CIMInstance result = filtered(filter);
-    result.setPath(completePath().delivered());
+    result.setPath(deliveredPath());
     return result;
+}
+
+void InstanceObject::appendDelivered(std::string& out, const PropertyFilter& filter) const
+{
+    out += "<VALUE.NAMEDINSTANCE>\n";
+    wire::appendInstanceName(out, deliveredPath(), kBlanks);
+    wire::appendInstanceStart(out, fPath.className);
+    if (fPath.schema != nullptr) {
+        const auto& declared = fPath.schema->properties();
+        for (const std::size_t i : filter.passing(*fPath.schema)) {
+            appendDeclared(out, declared[i], valueAt(i));
+        }
+    }
+    for (const NamedValue& extra : fExtra) {
+        if (filter.passes(extra.name)) {
+            wire::appendProperty(out, CIMProperty(extra.name, extra.value), kBlanks);
+        }
+    }
+    out += "</INSTANCE>\n</VALUE.NAMEDINSTANCE>\n";
 }
 
 CIMInstance InstanceObject::value() const

@@ -6,6 +6,7 @@
 #include <Pegasus/Common/CIMInstance.h>
 
 #include <cstdint>
+#include <string>
 #include <vector>
 
 namespace Pegasus::cmpi {
@@ -41,6 +42,8 @@ class InstanceObject final : public Owned, public CMPIInstance
 
     // Returns: the instance for the wire: its path is local, keys and properties are in the class's order.
     CIMInstance delivered(const PropertyFilter& filter) const;
+    // Appends the same instance as VALUE.NAMEDINSTANCE, without making the objects in between.
+    void appendDelivered(std::string& out, const PropertyFilter& filter) const;
     // Returns: the instance with all properties, for embedding and upcalls.
     CIMInstance value() const;
 
@@ -54,6 +57,7 @@ class InstanceObject final : public Owned, public CMPIInstance
     void takeKeys();
     void takeProperties(const CIMInstance& instance);
     CMPIData encode(std::size_t index) const;
+    CIMObjectPath deliveredPath() const;
     CIMInstance filtered(const PropertyFilter& filter) const;
 
     PathState fPath;

@@ -61,6 +61,12 @@ ResultObject::ResultObject(const PropertyFilter& filter, InstanceSink instances,
     hdl = this;
 }
 
+ResultObject::ResultObject(const PropertyFilter& filter, InstanceTextSink instances)
+    : ResultObject(filter, nullptr, nullptr, nullptr)
+{
+    fTexts = std::move(instances);
+}
+
 template <typename Sink, typename Make> void ResultObject::deliver(const Sink& sink, Make&& make)
 {
     if (!sink) {
@@ -82,7 +88,14 @@ template <typename Sink, typename Make> void ResultObject::deliver(const Sink& s
 
 void ResultObject::returnInstance(const CMPIInstance* instance)
 {
-    deliver(fInstances, [&] { return objectOf<InstanceObject>(instance).delivered(fFilter); });
+    if (!fTexts) {
+        return deliver(fInstances, [&] { return objectOf<InstanceObject>(instance).delivered(fFilter); });
+    }
+    deliver(fTexts, [&] {
+        fText.clear();
+        objectOf<InstanceObject>(instance).appendDelivered(fText, fFilter);
+        return std::string_view(fText);
+    });
 }
 
 void ResultObject::returnPath(const CMPIObjectPath* path)

@@ -10,6 +10,7 @@
 #include <Pegasus/Common/CIMValue.h>
 
 #include <exception>
+#include <string>
 
 namespace Pegasus::cmpi {
 
@@ -21,6 +22,9 @@ class ResultObject final : public Owned, public CMPIResult
     // Null sinks refuse.
     // Requires: `filter` and what the sinks refer to outlive the object.
     ResultObject(const PropertyFilter& filter, InstanceSink instances, PathSink paths, ReturnValueSink data);
+
+    // Writes instances, and refuses other kinds.
+    ResultObject(const PropertyFilter& filter, InstanceTextSink instances);
 
     void returnInstance(const CMPIInstance* instance);
     void returnPath(const CMPIObjectPath* path);
@@ -39,6 +43,8 @@ class ResultObject final : public Owned, public CMPIResult
 
     const PropertyFilter& fFilter;
     InstanceSink fInstances;
+    InstanceTextSink fTexts;
+    std::string fText; // the last one; its memory serves the next
     PathSink fPaths;
     ReturnValueSink fData;
     bool fDone = false;

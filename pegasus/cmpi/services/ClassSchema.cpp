@@ -3,6 +3,7 @@
 
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/Text.h"
+#include "pegasus/wire/ElementEncoder.h"
 
 #include <Pegasus/Common/CIMProperty.h>
 #include <Pegasus/Common/CIMQualifier.h>
@@ -59,6 +60,12 @@ void ClassSchema::addProperty(const CIMConstProperty& property)
     added.embedded = embeddedKind(property);
     added.referenceClass = property.getReferenceClassName();
     added.initial = property.getValue();
+    const bool isPlain = !added.isArray && added.type != CIMTYPE_REFERENCE && added.embedded == EmbeddedKind::kNone;
+    if (isPlain) {
+        CIMProperty bare(added.name, CIMValue(added.type, false));
+        bare.setPropagated(added.isInherited);
+        wire::appendPropertyStart(added.start, bare);
+    }
     if (added.isKey) {
         fKeys.push_back(fProperties.size());
     }

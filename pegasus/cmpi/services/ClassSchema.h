@@ -16,7 +16,8 @@
 
 namespace Pegasus::cmpi {
 
-// One declared property, with its name in both encodings: converting it per instance would cost more than the value.
+// One declared property, with its name in both encodings and its tag: making them per instance would cost more than the
+// value.
 struct PropertySchema
 {
     CIMName name;
@@ -27,7 +28,8 @@ struct PropertySchema
     bool isInherited = false;
     EmbeddedKind embedded = EmbeddedKind::kNone;
     CIMName referenceClass;
-    CIMValue initial; // null of the declared type, or the class's default
+    CIMValue initial;  // null of the declared type, or the class's default
+    std::string start; // the start tag of PROPERTY; empty where it depends on the value
 };
 
 // A class as the broker needs it for every property of every instance: found by name fast, types at hand.

@@ -9,6 +9,7 @@
 
 #include <functional>
 #include <string>
+#include <string_view>
 
 namespace Pegasus::cmpi {
 
@@ -25,6 +26,7 @@ struct ProviderRequest
 
 // Where a provider's results go: each one is passed on as soon as the provider returns it.
 using InstanceSink = std::function<void(const CIMInstance&)>;
+using InstanceTextSink = std::function<void(std::string_view element)>; // an instance, written as VALUE.NAMEDINSTANCE
 using PathSink = std::function<void(const CIMObjectPath&)>;
 using ReturnValueSink = std::function<void(const CIMValue&)>;
 

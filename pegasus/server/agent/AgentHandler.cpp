@@ -96,13 +96,9 @@ void AgentHandler::unload(const HttpRequest&, const CimRequest&, CimAnswer&)
 
 void AgentHandler::enumerateInstances(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)
 {
-    std::string text;
-    module(http).enumerateInstances(providerRequest(http, request), request.parameters.className("ClassName"),
-                                    request.parameters.propertyList(), [&](const CIMInstance& instance) {
-                                        text.clear();
-                                        wire::appendNamedInstance(text, instance, wire::Blanks::kRaw);
-                                        answer.write(text);
-                                    });
+    module(http).writeInstances(providerRequest(http, request), request.parameters.className("ClassName"),
+                                request.parameters.propertyList(),
+                                [&](std::string_view element) { answer.write(element); });
 }
 
 void AgentHandler::enumerateInstanceNames(const HttpRequest& http, const CimRequest& request, CimAnswer& answer)

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 // What other servers write: odd pieces of an answer that cost no object, and those that must never become a value.
+#include "pegasus/wire/XmlText.h"
 #include "tests/pegasus/client/AnswerReplay.h"
 
 #include <gtest/gtest.h>
@@ -80,4 +81,34 @@ TEST(OddAnswer, IsReadAsItWasMeantOrRefused)
             EXPECT_NO_THROW(Pegasus::wire::XmlDocument().parseMessage(body.data(), body.size())) << row.name;
         }
     }
+}
+
+// Texts are looked through in blocks: each escape at each place of a text that ends within, at and after a block.
+TEST(EscapedText, EveryPlaceInABlock)
+{
+    using Pegasus::wire::appendEscaped;
+    using Pegasus::wire::Blanks;
+    const std::vector<std::pair<std::string, std::string>> rows = {
+        {"&", "&amp;"},  {"<", "&lt;"},     {">", "&gt;"},      {"\"", "&quot;"}, {"'", "&apos;"},
+        {"\n", "&#10;"}, {"\x1f", "&#31;"}, {"\x7f", "&#127;"}, {"  ", " &#32;"}, {"\xc3\xa9", "\xc3\xa9"},
+    };
+    for (const auto& [text, written] : rows) {
+        for (std::size_t at = 1; at < 40; ++at) {
+            for (const std::size_t after : {1U, 14U, 15U, 16U, 17U}) {
+                const std::string whole = std::string(at, 'a') + text + std::string(after, 'b');
+                const std::string asIs =
+                    std::string(at, 'a') + (text == "  " ? text : written) + std::string(after, 'b');
+                std::string out, raw, unicode;
+                appendEscaped(out, std::string_view(whole));
+                appendEscaped(raw, std::string_view(whole), Blanks::kRaw);
+                appendEscaped(unicode, Pegasus::String(whole.c_str()));
+                EXPECT_EQ(out, std::string(at, 'a') + written + std::string(after, 'b'));
+                EXPECT_EQ(raw, asIs);
+                EXPECT_EQ(unicode, out);
+            }
+        }
+    }
+    std::string edges;
+    appendEscaped(edges, std::string_view(" a "));
+    EXPECT_EQ(edges, "&#32;a&#32;");
 }

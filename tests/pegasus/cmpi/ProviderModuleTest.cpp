@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/cmpi/module/ProviderLibrary.h"
+#include "pegasus/wire/ElementEncoder.h"
 #include "tests/pegasus/cmpi/MofServices.h"
 
 #include <Pegasus/Common/CIMProperty.h>
@@ -194,6 +195,26 @@ TEST_F(Module, GetInstanceWantsExactlyOne)
     setMode("two");
     EXPECT_EQ(errorOf([&] { module->getInstance(request(), path, CIMPropertyList()); }),
               "1: getInstance returns one instance");
+}
+
+// Objects and elements are made by different code; a client must not see which one served it.
+TEST_F(Module, WrittenInstancesAreThoseDelivered)
+{
+    load();
+    Array<CIMName> names;
+    names.append(CIMName("Number"));
+    names.append(CIMName("Missing"));
+    for (const CIMPropertyList& properties : {CIMPropertyList(), CIMPropertyList(names)}) {
+        std::string delivered;
+        for (const CIMInstance& item : items(properties)) {
+            wire::appendNamedInstance(delivered, item, wire::Blanks::kRaw);
+        }
+        std::string written;
+        module->writeInstances(request(), CIMName("TST_Item"), properties,
+                               [&](std::string_view element) { written += element; });
+        EXPECT_NE(delivered, "");
+        EXPECT_EQ(written, delivered);
+    }
 }
 
 TEST_F(Module, SinkMayEndTheEnumeration)
