@@ -25,12 +25,16 @@ class Root : public VrxhostProgram
         fs::create_directories(fRoot / "pegasus/repository");
         std::ofstream(fRoot / "pegasus/repository/precious") << "somebody's work";
         fs::create_directories(fRoot / "pegasus/provider/acme");
-        std::ofstream(fRoot / "pegasus/provider/acme/libacme.so") << "a library";
-        std::ofstream(fRoot / "libany.so") << "a library";
-        for (const char* path : {"pegasus/provider", "pegasus/provider/acme", "pegasus/provider/acme/libacme.so"}) {
+        fs::create_directories(fRoot / "pegasus/lib");
+        for (const char* path : {"pegasus/provider", "pegasus/provider/acme", "pegasus/lib"}) {
             SetMode(path, 0755);
         }
-        SetMode("libany.so", 0644);
+        for (const char* path :
+             {"pegasus/provider/acme/libacme.so", "pegasus/lib/libpeg.so", "pegasus/pegSchema/base.mof", "libany.so"})
+        {
+            std::ofstream(fRoot / path) << "run or compiled";
+            SetMode(path, 0644);
+        }
     }
 
     void ExpectRefusal(const std::vector<std::string>& command, const std::string& sentence) const
@@ -102,6 +106,10 @@ const TOwnerRow kOwners[] = {
     {"another group that only reads", "pegasus/bin", 0, kForeignUser, 0755, false},
     {"program of another user", "pegasus/bin/cimconfig", kForeignUser, 0, 0755, true},
     {"library of the host", "libany.so", 0, 0, 0646, true},
+    {"server's libraries", "pegasus/lib", 0, 0, 0757, true},
+    {"server's library", "pegasus/lib/libpeg.so", kForeignUser, 0, 0644, true},
+    {"base schemas", "pegasus/pegSchema", 0, kForeignUser, 0775, true},
+    {"base schema", "pegasus/pegSchema/base.mof", 0, 0, 0666, true},
     {"vendors' folder", "pegasus/provider", kForeignUser, 0, 0755, true},
     {"vendor's folder", "pegasus/provider/acme", 0, 0, 0777, true},
     {"vendor's library", "pegasus/provider/acme/libacme.so", kForeignUser, 0, 0644, true},

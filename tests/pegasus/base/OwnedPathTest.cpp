@@ -6,10 +6,75 @@
 
 #include <gtest/gtest.h>
 
+#include <cerrno>
 #include <filesystem>
 
+#include <grp.h>
+#include <pwd.h>
 #include <sys/stat.h>
 #include <unistd.h>
+
+namespace {
+
+constexpr uid_t kSecondUser = 4711;
+
+// The users root and "second", and a group named root, whatever the machine has.
+struct Accounts
+{
+    const char* member = nullptr; // of the group, besides root
+    gid_t rootsPrimary = 0;
+    gid_t secondsPrimary = kSecondUser;
+    int listed = 0; // entries that getpwent_r() returned
+};
+Accounts gAccounts;
+
+void fill(passwd& entry, uid_t user)
+{
+    static char gNames[2][8] = {"root", "second"};
+    entry = {};
+    entry.pw_uid = user;
+    entry.pw_name = gNames[user == 0 ? 0 : 1];
+    entry.pw_gid = user == 0 ? gAccounts.rootsPrimary : gAccounts.secondsPrimary;
+}
+
+} // namespace
+
+// In place of libc's.
+extern "C" int getpwuid_r(uid_t user, passwd* entry, char*, size_t, passwd** found)
+{
+    fill(*entry, user);
+    *found = user == 0 ? entry : nullptr;
+    return 0;
+}
+
+extern "C" void setpwent()
+{
+    gAccounts.listed = 0;
+}
+
+extern "C" int getpwent_r(passwd* entry, char*, size_t, passwd** found)
+{
+    if (gAccounts.listed == 2) {
+        return ENOENT;
+    }
+    fill(*entry, gAccounts.listed++ == 0 ? 0 : kSecondUser);
+    *found = entry;
+    return 0;
+}
+
+extern "C" int getgrgid_r(gid_t group, struct group* entry, char*, size_t, struct group** found)
+{
+    static char gName[] = "root";
+    static char* gMembers[3] = {};
+    gMembers[0] = gName;
+    gMembers[1] = const_cast<char*>(gAccounts.member);
+    *entry = {};
+    entry->gr_gid = group;
+    entry->gr_name = gName;
+    entry->gr_mem = gMembers;
+    *found = entry;
+    return 0;
+}
 
 namespace Pegasus::base {
 namespace {
@@ -91,27 +156,50 @@ TEST_F(OwnedPathTest, theSentenceNamesPathOwnerAndMode)
               fRoot + "/above (owner 4711, mode 0751) can be changed by users other than root");
 }
 
-// Both the way to a link and the way that it leads count.
-TEST_F(OwnedPathTest, linksAreFollowed)
+// Each folder on the way counts: of the path as written, of each link, and of the end.
+TEST_F(OwnedPathTest, linksAreFollowedOneByOne)
 {
-    fs::create_directories(fRoot + "/links");
-    fs::create_symlink(fRoot + "/above/folder", fRoot + "/links/folder");
-    EXPECT_EQ(ownershipFault(fRoot + "/links/folder/file"), "");
-    ASSERT_EQ(::chmod((fRoot + "/above").c_str(), 0777), 0);
-    EXPECT_NE(ownershipFault(fRoot + "/links/folder/file"), "");
-    ASSERT_EQ(::chmod((fRoot + "/above").c_str(), 0755), 0);
-    ASSERT_EQ(::chmod((fRoot + "/links").c_str(), 0777), 0);
-    EXPECT_NE(ownershipFault(fRoot + "/links/folder/file"), "");
+    for (const char* folder : {"/first", "/middle", "/round"}) {
+        fs::create_directories(fRoot + folder);
+    }
+    fs::create_symlink(fRoot + "/middle/folder", fRoot + "/first/folder");
+    fs::create_symlink("../above/folder", fRoot + "/middle/folder");
+    fs::create_symlink("round", fRoot + "/round/round");
+    const std::string path = fRoot + "/first/./folder/../folder/file";
+    EXPECT_EQ(ownershipFault(path), "");
+    for (const char* open : {"/first", "/middle", "/above", "/above/folder"}) {
+        ASSERT_EQ(::chmod((fRoot + open).c_str(), 0777), 0);
+        EXPECT_EQ(ownershipFault(path).rfind(fRoot + open + " (owner ", 0), 0u) << ownershipFault(path);
+        ASSERT_EQ(::chmod((fRoot + open).c_str(), 0755), 0);
+    }
     EXPECT_EQ(ownershipFault(fRoot + "/nothing"), "") << "what is not there cannot run";
+    EXPECT_EQ(ownershipFault(fRoot + "/round/round"), "") << "nor what leads nowhere";
 }
 
-TEST_F(OwnedPathTest, aPrivateGroupCountsAsItsUser)
+// The name of a group says nothing about who is in it.
+TEST_F(OwnedPathTest, aGroupOfOneUserCountsAsThatUser)
 {
     if (::geteuid() != 0) {
         GTEST_SKIP() << "needs root, whose group is its own";
     }
+    struct GroupRow
+    {
+        const char* name;
+        Accounts accounts;
+        bool owned;
+    };
+    const GroupRow rows[] = {
+        {"of root alone", {nullptr, 0, kSecondUser}, true},
+        {"another member", {"second", 0, kSecondUser}, false},
+        {"primary group of another user too", {nullptr, 0, 0}, false},
+        {"of root's name, but another one is root's", {nullptr, 1, kSecondUser}, false},
+    };
     ASSERT_EQ(::chmod((fRoot + "/above").c_str(), 0770), 0);
-    EXPECT_EQ(ownershipFault(fRoot + "/above"), "");
+    for (const GroupRow& row : rows) {
+        gAccounts = row.accounts;
+        EXPECT_EQ(ownershipFault(fRoot + "/above").empty(), row.owned) << row.name;
+    }
+    gAccounts = Accounts();
 }
 
 } // namespace
