@@ -77,6 +77,16 @@ void CIMClient::setTimeout(Uint32 timeoutMilliseconds)
     fRep->setTimeoutMs(timeoutMilliseconds);
 }
 
+Uint64 CIMClient::getMaxDecodedBytes() const
+{
+    return fRep->maxDecodedBytes();
+}
+
+void CIMClient::setMaxDecodedBytes(Uint64 bytes)
+{
+    fRep->setMaxDecodedBytes(bytes);
+}
+
 void CIMClient::connect(const String& host, const Uint32 portNumber, const String&, const String&)
 {
     if (host.size() == 0 && portNumber == 0) {

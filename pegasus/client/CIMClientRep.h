@@ -39,6 +39,12 @@ class CIMClientRep
 
     Uint32 timeoutMs() const { return fTimeoutMs; }
     void setTimeoutMs(Uint32 timeoutMs) { fTimeoutMs = timeoutMs; }
+    std::size_t maxDecodedBytes() const { return fLimits.xml.maxDecodedBytes; }
+    void setMaxDecodedBytes(std::size_t bytes)
+    {
+        fLimits.xml.maxDecodedBytes = bytes;
+        fDecoder = wire::ElementDecoder(fLimits.xml);
+    }
 
     // Throws: AlreadyConnectedException, and as Connection::open.
     void connect(const client::ServerAddress& address);

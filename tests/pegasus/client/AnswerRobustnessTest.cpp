@@ -141,9 +141,9 @@ const LimitCase kLimits[] = {
     {"properties", [](auto& l) { l.xml.maxMembers = 2; }, "class", "more than 2 members of one owner"},
     {"qualifiers", [](auto& l) { l.xml.maxMembers = 0; }, "class", "more than 0 members of one owner"},
     {"decoded bytes", [](auto& l) { l.xml.maxDecodedBytes = 3000; }, "instances",
-     "objects of more than 3000 bytes in one answer"},
+     "objects of more than 3000 bytes in one answer (maxDecodedBytes)"},
     {"decoded bytes of one object", [](auto& l) { l.xml.maxDecodedBytes = 300; }, "class",
-     "objects of more than 300 bytes in one answer"},
+     "objects of more than 300 bytes in one answer (maxDecodedBytes)"},
     {"key bindings", [](auto& l) { l.xml.maxKeyBindings = 1; }, "instances", "more than 1 key bindings"},
     {"embedded objects", [](auto& l) { l.xml.maxEmbedding = 0; }, "instances", "embedded more than 0 deep"},
 };

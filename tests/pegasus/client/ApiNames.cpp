@@ -355,6 +355,7 @@ void useOperations(CIMClient& client, const CIMPropertyList& list)
     client.connect("localhost", 5988, String::EMPTY, String::EMPTY);
     client.connectLocal();
     client.setTimeout(client.getTimeout());
+    client.setMaxDecodedBytes(client.getMaxDecodedBytes());
     const CIMClass cimClass = client.getClass("root/cimv2", "CIM_X");
     client.getClass("root/cimv2", "CIM_X", false, true, false, list);
     const CIMInstance instance = client.getInstance("root/cimv2", CIMObjectPath("CIM_X.K=1"));

@@ -188,6 +188,28 @@ TEST(ClientExchange, EachFaultHasItsExceptionAndTheNextCallWorks)
     }
 }
 
+// A limit holds from the next call on, for one answer at a time.
+TEST(ClientExchange, MemoryOfAnAnswerHasALimitThatCanBeSet)
+{
+    test::ServedModel model;
+    model.addClass(kNameSpace, fanClass()).addInstance(kNameSpace, fan("a", 1)).addInstance(kNameSpace, fan("b", 2));
+    test::ScriptedPeer peer(model.handler());
+    CIMClient client;
+    connect(client, peer);
+    const auto enumerate = [&] { return outcome([&] { client.enumerateInstances(kNameSpace, "T_Fan", false); }); };
+    EXPECT_EQ(client.getMaxDecodedBytes(), 256u << 20);
+    EXPECT_EQ(enumerate(), "ok");
+    client.setMaxDecodedBytes(600);
+    const std::string refused = enumerate();
+    EXPECT_EQ(refused.rfind("Pegasus::CIMClientXmlException: ", 0), 0u) << refused;
+    EXPECT_NE(refused.find("objects of more than 600 bytes in one answer (maxDecodedBytes)"), std::string::npos)
+        << refused;
+    client.setMaxDecodedBytes(6000);
+    for (int i = 0; i < 20; ++i) {
+        ASSERT_EQ(enumerate(), "ok") << i;
+    }
+}
+
 TEST(ClientExchange, ComplaintsAboutXmlNameOperationPlaceAndCause)
 {
     test::ScriptedPeer peer([](const PeerRequest& r) { return test::withReplaced(good(r), "uint64", "uint46"); });

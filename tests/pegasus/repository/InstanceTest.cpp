@@ -289,7 +289,7 @@ TEST_F(InstanceTest, FindsFewAndManyMembersByTheirNames)
 // What takes long with a large object is done while the lock is free.
 TEST_F(InstanceTest, LargeObjectsKeepNoOtherRequestWaiting)
 {
-    constexpr int kMembers = 8000;
+    constexpr int kMembers = 4000;
     RepositoryLimits limits;
     limits.cachedClassCount = 3; // so that reading the others drops Wide
     Repository wide(directory.path() + "/wide", limits);

@@ -44,6 +44,12 @@ class PEGASUS_CLIENT_LINKAGE CIMClient
     // From the next call on. With 0 every operation ends at once with ConnectionTimeoutException.
     void setTimeout(Uint32 timeoutMilliseconds);
 
+    // Bytes in memory of the objects of one answer, such as all instances of an enumeration; at first 256 MiB. An
+    // extension of this library: a program that is to compile against OpenPegasus too does without these two.
+    Uint64 getMaxDecodedBytes() const;
+    // From the next call on. Beyond it an operation throws CIMClientXmlException, which names maxDecodedBytes.
+    void setMaxDecodedBytes(Uint64 bytes);
+
     // Opens a TCP connection; user and password are only remembered. An empty host is the local machine, an empty host
     // with port 0 the local socket.
     // Throws: AlreadyConnectedException, CannotConnectException, InvalidLocatorException.
