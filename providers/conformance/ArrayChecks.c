@@ -20,10 +20,13 @@ static const char* arraysStartNull(const Env* env)
     return NULL;
 }
 
-static const char* simpleTypesAreSimple(const Env* env)
+static const char* typesAreAsNamed(const Env* env)
 {
-    const CMPIArray* array = env->mb->eft->newArray(env->mb, 1, CMPI_uint16A, NULL);
-    REQUIRE(array->ft->getSimpleType(array, NULL) == CMPI_uint16);
+    const CMPIType types[] = {CMPI_uint16, CMPI_uint16A};
+    for (size_t i = 0; i < sizeof types / sizeof *types; ++i) {
+        const CMPIArray* array = env->mb->eft->newArray(env->mb, 1, types[i], NULL);
+        REQUIRE(array->ft->getSimpleType(array, NULL) == types[i]);
+    }
     return NULL;
 }
 
@@ -100,8 +103,33 @@ static const char* storedArraysAreCopies(const Env* env)
     REQUIRE(data.value.array->ft->getSize(data.value.array, NULL) == 2);
     REQUIRE(data.value.array->ft->getElementAt(data.value.array, 0, NULL).value.uint16 == 5);
 
-    CMPIValue wrong = {.array = env->mb->eft->newArray(env->mb, 1, CMPI_uint8, NULL)};
-    REQUIRE(instance->ft->setProperty(instance, "U16A", &wrong, CMPI_uint16A).rc == CMPI_RC_OK);
+    return NULL;
+}
+
+/* An array of another integer type is taken where its values fit. */
+static const char* arraysAreConverted(const Env* env)
+{
+    const CMPIInstance* instance = newInst(env, "TST_Everything");
+    CMPIValue array = {.array = env->mb->eft->newArray(env->mb, 2, CMPI_uint8, NULL)};
+    const CMPIValue small = {.uint8 = 200};
+    array.array->ft->setElementAt(array.array, 1, &small, CMPI_uint8);
+    REQUIRE(instance->ft->setProperty(instance, "U16A", &array, CMPI_uint16A).rc == CMPI_RC_OK);
+    const CMPIArray* stored = instance->ft->getProperty(instance, "U16A", NULL).value.array;
+    REQUIRE(stored->ft->getSize(stored, NULL) == 2 && stored->ft->getElementAt(stored, 0, NULL).value.uint16 == 0);
+    const CMPIData element = stored->ft->getElementAt(stored, 1, NULL);
+    REQUIRE(element.type == CMPI_uint16 && element.value.uint16 == 200);
+    return NULL;
+}
+
+static const char* convertedValuesFit(const Env* env)
+{
+    const CMPIInstance* instance = newInst(env, "TST_Everything");
+    CMPIValue array = {.array = env->mb->eft->newArray(env->mb, 1, CMPI_uint16, NULL)};
+    const CMPIValue large = {.uint16 = 300};
+    array.array->ft->setElementAt(array.array, 0, &large, CMPI_uint16);
+    REQUIRE(instance->ft->setProperty(instance, "U8A", &array, CMPI_uint8A).rc == CMPI_RC_ERR_INVALID_DATA_TYPE);
+    REQUIRE(instance->ft->getProperty(instance, "U8A", NULL).state == CMPI_nullValue);
+    REQUIRE(instance->ft->setProperty(instance, "SA", &array, CMPI_stringA).rc == CMPI_RC_ERR_INVALID_DATA_TYPE);
     return NULL;
 }
 
@@ -173,13 +201,15 @@ static const char* argumentsEnd(const Env* env)
 }
 
 const CheckRow kArrayChecks[] = {{"arrays start null", arraysStartNull, kStandard},
-                                 {"simple types are simple", simpleTypesAreSimple, kOursOnly},
+                                 {"array types are as named", typesAreAsNamed, kStandard},
                                  {"odd arrays are refused", oddArraysAreRefused, kOursOnly},
                                  {"elements are checked", elementsAreChecked, kStandard},
                                  {"elements without value are null", elementsWithoutValueAreNull, kOursOnly},
                                  {"arrays of text", arraysOfText, kStandard},
                                  {"arrays of strings take chars", stringsTakeChars, kOursOnly},
                                  {"stored arrays are copies", storedArraysAreCopies, kStandard},
+                                 {"arrays of other integers are converted", arraysAreConverted, kStandard},
+                                 {"converted values fit", convertedValuesFit, kOursOnly},
                                  {"arrays for scalars are refused", arraysAreNoScalars, kOursOnly},
                                  {"every array type", everyArrayType, kStandard},
                                  {"arguments are named", argumentsAreNamed, kStandard},

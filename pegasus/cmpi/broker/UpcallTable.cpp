@@ -233,7 +233,7 @@ template <typename Result> Result noOperation(CMPIStatus* rc, const char* name)
 CMPIEnumeration* execQuery(const CMPIBroker*, const CMPIContext*, const CMPIObjectPath*, const char*, const char*,
                            CMPIStatus* rc)
 {
-    return noOperation<CMPIEnumeration*>(rc, "ExecQuery");
+    return noOperation<CMPIEnumeration*>(rc, "CIM_ERR_NOT_SUPPORTED");
 }
 
 CMPIEnumeration* associators(const CMPIBroker*, const CMPIContext*, const CMPIObjectPath*, const char*, const char*,

@@ -26,7 +26,7 @@ CMPICount getSize(const CMPIArray* self, CMPIStatus* rc)
 
 CMPIType getSimpleType(const CMPIArray* self, CMPIStatus* rc)
 {
-    return answer(rc, CMPIType{CMPI_null}, [&] { return objectOf<ArrayObject>(self).elementType(); });
+    return answer(rc, CMPIType{CMPI_null}, [&] { return objectOf<ArrayObject>(self).namedType(); });
 }
 
 CMPIData getElementAt(const CMPIArray* self, CMPICount index, CMPIStatus* rc)
@@ -134,8 +134,7 @@ ArrayObject::ArrayObject(Broker& broker, CMPICount size, CMPIType type) : ArrayO
 }
 
 ArrayObject::ArrayObject(Broker& broker, CMPIType type, std::vector<CIMValue> elements)
-    : CMPIArray{nullptr, &kArrayTable}, fBroker(broker), fType(static_cast<CMPIType>(type & ~CMPI_ARRAY)),
-      fElements(std::move(elements))
+    : CMPIArray{nullptr, &kArrayTable}, fBroker(broker), fType(type), fElements(std::move(elements))
 {
     hdl = this;
 }
@@ -144,8 +143,8 @@ CMPIData ArrayObject::at(CMPICount index) const
 {
     requireIndex(index);
     CMPIData data = encodeValue(fBroker, fElements[index]);
-    data.type = fType;
-    if (fType == CMPI_chars && data.state == CMPI_goodValue) {
+    data.type = elementType();
+    if (data.type == CMPI_chars && data.state == CMPI_goodValue) {
         data.value.chars = static_cast<char*>(data.value.string->hdl);
     }
     return data;
@@ -159,12 +158,15 @@ void ArrayObject::set(CMPICount index, const CMPIValue* value, CMPIType type)
     }
     if (type == CMPI_null) {
         value = nullptr;
-        type = fType;
+        type = elementType();
     } else if (cimTypeOf(type) != cimTypeOf(fType) || (type & CMPI_ARRAY) != 0) {
         throw CmpiError{CMPI_RC_ERR_TYPE_MISMATCH, {}};
     }
-    if (value != nullptr && type != fType) {
-        tolerate(fType == CMPI_string ? Habit::kCharsInStringArray : Habit::kStringInCharsArray);
+    if (value != nullptr && type != elementType()) {
+        if (elementType() != CMPI_string) {
+            throw CmpiError{CMPI_RC_ERR_TYPE_MISMATCH, {}};
+        }
+        tolerate(Habit::kCharsInStringArray);
     }
     fElements[index] = decodeValue(value, type);
     if (value != nullptr && (type == CMPI_string || type == CMPI_dateTime)) {

@@ -12,14 +12,16 @@ namespace Pegasus::cmpi {
 class ArrayObject final : public Owned, public CMPIArray
 {
   public:
-    // The array bit of `type` is ignored.
+    // `type` may have the array bit.
     // Throws: CMPI_RC_ERR_INVALID_DATA_TYPE; CMPI_RC_ERR_INVALID_PARAMETER for more elements than kMaxElements.
     ArrayObject(Broker& broker, CMPICount size, CMPIType type);
     ArrayObject(Broker& broker, CMPIType type, std::vector<CIMValue> elements);
     ArrayObject(const ArrayObject& other) : ArrayObject(other.fBroker, other.fType, other.fElements) {}
     ~ArrayObject() override;
 
-    CMPIType elementType() const { return fType; }
+    CMPIType elementType() const { return static_cast<CMPIType>(fType & ~CMPI_ARRAY); }
+    // As the provider named it, which may be with the array bit; OpenPegasus shows it like that.
+    CMPIType namedType() const { return fType; }
     const std::vector<CIMValue>& elements() const { return fElements; }
 
     // Throws: CMPI_RC_ERR_NO_SUCH_PROPERTY beyond the size.
@@ -36,7 +38,7 @@ class ArrayObject final : public Owned, public CMPIArray
     void keepHandle(const CMPIValue& value, CMPIType type);
 
     Broker& fBroker;
-    CMPIType fType; // of one element, as the provider named it
+    CMPIType fType; // as the provider named it
     std::vector<CIMValue> fElements;
     std::shared_ptr<bool> fUnused; // shared with the strings and datetimes that it was given
 };

@@ -15,9 +15,12 @@ CIMObjectPath placed(CIMObjectPath path, const CIMName& className, const CIMName
     return path;
 }
 
+// Past the end the data has the elements' type, as on OpenPegasus.
 CMPIData getNext(const CMPIEnumeration* self, CMPIStatus* rc)
 {
-    return answer(rc, kNull, [&] { return objectOf<EnumerationObject>(self).next(); });
+    CMPIData end = kNull;
+    end.type = answer(nullptr, CMPIType{CMPI_null}, [&] { return objectOf<EnumerationObject>(self).type(); });
+    return answer(rc, end, [&] { return objectOf<EnumerationObject>(self).next(); });
 }
 
 CMPIBoolean hasNext(const CMPIEnumeration* self, CMPIStatus* rc)

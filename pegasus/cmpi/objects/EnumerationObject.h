@@ -19,6 +19,7 @@ class EnumerationObject final : public Owned, public CMPIEnumeration
     EnumerationObject(Broker& owner, const Array<CIMObjectPath>& paths, const CIMNamespaceName& nameSpace);
     EnumerationObject(const EnumerationObject& other);
 
+    CMPIType type() const { return fType; }
     bool hasNext() const { return fNext < fElements.size(); }
     // Throws: CMPI_RC_NO_MORE_ELEMENTS.
     CMPIData next();

@@ -14,20 +14,19 @@ class Broker;
 enum class Habit
 {
     kCharsInStringArray,
-    kStringInCharsArray,
     kElementReleasedEarly,
     kNullElement,
     kNullDateTimeElement,
     kUntypedNull,
-    kKeyOfOtherType,
-    kNullKey,
     kKeysOnPathOnly,
     kEmbeddedAsText,
+    kEmbeddedArray,
     kTextNotUtf8,
     kRealNotNormal,
     kHalfSurrogate,
     kNoReturnDone,
-    kNoAttach
+    kNoAttach,
+    kNestedUpcalls
 };
 
 // Logs the habit once per provider: "provider P: works here, fails on OpenPegasus 2.14: ...". The provider and its

@@ -186,10 +186,12 @@ CMPICount InstanceObject::propertyCount() const
     return static_cast<CMPICount>(fPath.schema ? fPlaces.size() : fExtra.size());
 }
 
+// An empty array reads as null, as it does on OpenPegasus; clients get it as it is.
 CMPIData InstanceObject::encode(std::size_t index) const
 {
     const CIMValue& value = fPath.schema ? valueAt(index) : fExtra[index].value;
-    return encodeValue(broker, value);
+    const bool isEmpty = value.isArray() && !value.isNull() && value.getArraySize() == 0;
+    return encodeValue(broker, isEmpty ? CIMValue(value.getType(), true) : value);
 }
 
 CMPIData InstanceObject::property(const char* name) const
@@ -237,6 +239,8 @@ void InstanceObject::setProperty(const char* name, const CMPIValue* value, CMPIT
         tolerate(Habit::kUntypedNull);
     } else if (declared.embedded != EmbeddedKind::kNone && value != nullptr && cimTypeOf(type) == CIMTYPE_STRING) {
         tolerate(Habit::kEmbeddedAsText);
+    } else if (type == (CMPI_instance | CMPI_ARRAY) && value != nullptr) {
+        tolerate(Habit::kEmbeddedArray);
     }
     CIMValue decoded = type == CMPI_null ? CIMValue(declared.type, declared.isArray) : decodeValue(value, type);
     if (!accepts(declared, decoded)) {
@@ -278,6 +282,21 @@ void InstanceObject::setPath(const PathState& path)
     takeKeys();
 }
 
+std::vector<const NamedValue*> InstanceObject::undeclared(const PropertyFilter& filter) const
+{
+    std::vector<const NamedValue*> result;
+    if (filter.passesAll()) {
+        for (auto extra = fExtra.rbegin(); extra != fExtra.rend(); ++extra) {
+            result.push_back(&*extra);
+        }
+    } else if (!fExtra.empty()) {
+        broker.warnOnce("class " + base::utf8(fPath.className) + " is not declared in namespace " +
+                        base::utf8(fPath.nameSpace.getString()) +
+                        ": a list of properties leaves its instances without any");
+    }
+    return result;
+}
+
 CIMInstance InstanceObject::filtered(const PropertyFilter& filter) const
 {
     CIMInstance result(fPath.className);
@@ -290,10 +309,8 @@ CIMInstance InstanceObject::filtered(const PropertyFilter& filter) const
             properties.append(propertyOf(declared[i], valueAt(i)));
         }
     }
-    for (const NamedValue& extra : fExtra) {
-        if (filter.passes(extra.name)) {
-            properties.append(CIMProperty(extra.name, extra.value));
-        }
+    for (const NamedValue* extra : undeclared(filter)) {
+        properties.append(CIMProperty(extra->name, extra->value));
     }
     return result;
 }
@@ -324,10 +341,8 @@ void InstanceObject::appendDelivered(std::string& out, const PropertyFilter& fil
             appendDeclared(out, declared[i], valueAt(i));
         }
     }
-    for (const NamedValue& extra : fExtra) {
-        if (filter.passes(extra.name)) {
-            wire::appendProperty(out, CIMProperty(extra.name, extra.value), kBlanks);
-        }
+    for (const NamedValue* extra : undeclared(filter)) {
+        wire::appendProperty(out, CIMProperty(extra->name, extra->value), kBlanks);
     }
     out += "</INSTANCE>\n</VALUE.NAMEDINSTANCE>\n";
 }

@@ -40,7 +40,9 @@ class InstanceObject final : public Owned, public CMPIInstance
     // Throws: CMPI_RC_ERR_FAILED when the class differs.
     void setPath(const PathState& path);
 
-    // Returns: the instance for the wire: its path is local, keys and properties are in the class's order.
+    // Returns: the instance for the wire: its path is local, keys and properties are in the class's order. An instance
+    //     of an unknown class has the properties that were set, the last one first, and none where the client gave a
+    //     list: as on OpenPegasus. The log names the class then.
     CIMInstance delivered(const PropertyFilter& filter) const;
     // Appends the same instance as VALUE.NAMEDINSTANCE, without making the objects in between.
     void appendDelivered(std::string& out, const PropertyFilter& filter) const;
@@ -59,6 +61,8 @@ class InstanceObject final : public Owned, public CMPIInstance
     CMPIData encode(std::size_t index) const;
     CIMObjectPath deliveredPath() const;
     CIMInstance filtered(const PropertyFilter& filter) const;
+    // Returns: what an instance of an unknown class delivers.
+    std::vector<const NamedValue*> undeclared(const PropertyFilter& filter) const;
 
     PathState fPath;
     std::vector<std::uint16_t> fPlaces; // by declared property: 0 when not set, else its index in fSet, plus 1

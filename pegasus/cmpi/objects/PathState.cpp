@@ -4,7 +4,6 @@
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/Text.h"
 #include "pegasus/cmpi/objects/Broker.h"
-#include "pegasus/cmpi/objects/Habits.h"
 #include "pegasus/cmpi/objects/KeyCodec.h"
 #include "pegasus/cmpi/objects/TableFunction.h"
 #include "pegasus/common/CIMObjectPathRep.h"
@@ -148,7 +147,11 @@ CIMName PathState::keyNameOf(const char* name, CMPIType type) const
     }
     const PropertySchema& declared = schema->properties()[at];
     if (!isSameKeyKind(declared.type, cimTypeOf(type))) {
-        tolerate(Habit::kKeyOfOtherType);
+        const std::string text = "key " + declared.text + " of " + schema->text() + " has another type";
+        if (Broker* broker = Frame::current().origin().broker) {
+            broker->warnOnce("addKey: " + text); // many a provider ignores the status
+        }
+        throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, text};
     }
     return declared.name;
 }
@@ -161,16 +164,14 @@ void PathState::addKey(const char* name, const CMPIValue* value, CMPIType type)
     CIMName keyName = keyNameOf(name, type);
     CIMValue decoded = decodeValue(value, type);
     if (decoded.isNull()) {
-        tolerate(Habit::kNullKey);
+        throw CmpiError{CMPI_RC_ERR_FAILED, "addKey: the value is null"};
     }
     const auto held =
         std::find_if(keys.begin(), keys.end(), [&](const NamedValue& key) { return key.name.equal(keyName); });
     if (held != keys.end()) {
         keys.erase(held);
     }
-    if (!decoded.isNull()) {
-        keys.push_back({std::move(keyName), std::move(decoded)});
-    }
+    keys.push_back({std::move(keyName), std::move(decoded)});
 }
 
 const NamedValue* PathState::findKey(std::string_view name) const

@@ -224,7 +224,8 @@ CMPIData encodeScalar(Broker& broker, const CIMValue& value)
 CMPIData encodeArray(Broker& broker, const CIMValue& value)
 {
     const CMPIType type = cmpiTypeOf(value.getType(), true);
-    auto* array = Frame::current().make<ArrayObject>(broker, type, elementsOf(value));
+    const CMPIType element = cmpiTypeOf(value.getType(), false);
+    auto* array = Frame::current().make<ArrayObject>(broker, element, elementsOf(value));
     return plainData<CMPIArray*>(type, array);
 }
 

@@ -13,18 +13,12 @@ PropertyFilter::PropertyFilter(const CIMPropertyList& list) : fAll(list.isNull()
         return;
     }
     for (Uint32 i = 0; i < list.size(); ++i) {
-        fList.push_back(list[i]);
         fTexts.push_back(base::utf8(list[i]));
     }
     for (const std::string& text : fTexts) {
         fNames.push_back(text.c_str());
     }
     fNames.push_back(nullptr);
-}
-
-bool PropertyFilter::passes(const CIMName& name) const
-{
-    return fAll || std::any_of(fList.begin(), fList.end(), [&](const CIMName& listed) { return listed.equal(name); });
 }
 
 const std::vector<std::size_t>& PropertyFilter::passing(const ClassSchema& schema) const

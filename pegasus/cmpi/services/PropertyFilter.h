@@ -19,7 +19,7 @@ class PropertyFilter
     PropertyFilter() = default;
     explicit PropertyFilter(const CIMPropertyList& list);
 
-    bool passes(const CIMName& name) const;
+    bool passesAll() const { return fAll; }
     // Returns: the indices of the properties that pass: all in the class's order, or the listed ones in the list's
     // order. The answer for one class is kept: results come class by class.
     const std::vector<std::size_t>& passing(const ClassSchema& schema) const;
@@ -30,7 +30,6 @@ class PropertyFilter
 
   private:
     bool fAll = true;
-    std::vector<CIMName> fList;
     std::vector<std::string> fTexts; // fNames point into these
     mutable std::vector<const char*> fNames;
     mutable const ClassSchema* fSchema = nullptr;
