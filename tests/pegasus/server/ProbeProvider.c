@@ -1,21 +1,15 @@
 // SPDX-License-Identifier: MIT
-/* A provider that does what a test asks for: many instances, endless instances, errors, crashes.
+/* A provider that does what a test asks for: many instances, endless instances, errors, upcalls, crashes.
  * Probe_Bulk delivers as many instances as SetCount said (1000 at first); Probe_Endless delivers for ever;
  * Probe_FailAfter delivers one instance, then fails. */
+#include "tests/pegasus/server/ProbeProcess.h"
 #include "tests/pegasus/server/ProbeTraps.h"
 
 #include <cmpi/cmpi.h>
 
-#include <errno.h>
-#include <signal.h>
 #include <stdio.h>
-#include <stdlib.h>
 #include <string.h>
 #include <strings.h>
-#include <sys/mman.h>
-#include <sys/resource.h>
-#include <sys/wait.h>
-#include <unistd.h>
 
 /* Each factory sets it, maybe while the other one's interface works. */
 static const CMPIBroker* _Atomic gBroker;
@@ -310,122 +304,6 @@ static CMPIStatus changeByUpcall(const CMPIContext* context, const CMPIResult* r
     return returnNumber(result, steps);
 }
 
-/* Takes memory until it is exhausted. */
-static CMPIStatus grow(void)
-{
-    enum
-    {
-        kBlock = 1 << 20
-    };
-    for (void** last = NULL;;) {
-        void** block = malloc(kBlock);
-        if (block == NULL) {
-            while (last != NULL) {
-                block = *last;
-                free(last);
-                last = block;
-            }
-            return failure(CMPI_RC_ERR_FAILED, "no more memory");
-        }
-        memset(block, 1, kBlock);
-        *block = last;
-        last = block;
-    }
-}
-
-/* Takes 64 GB of addresses and none of memory. */
-static CMPIUint32 reserve(void)
-{
-    return mmap(NULL, 64ull << 30, PROT_NONE, MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE, -1, 0) != MAP_FAILED;
-}
-
-/* Returns: the error of the write. */
-static CMPIUint32 writeToClosedPipe(void)
-{
-    int ends[2];
-    if (pipe(ends) != 0) {
-        return 0;
-    }
-    close(ends[0]);
-    const CMPIUint32 error = write(ends[1], "x", 1) < 0 ? (CMPIUint32)errno : 0;
-    close(ends[1]);
-    return error;
-}
-
-/* Prints more than any log should hold. */
-static CMPIUint32 flood(void)
-{
-    CMPIUint32 i = 0;
-    for (; i < 60000; ++i) {
-        printf("%07u the probe has something to say, again and again and again and again and again\n", (unsigned)i);
-    }
-    return i;
-}
-
-/* Starts a process that leaves group, session and parent. Returns: its id. */
-static CMPIUint32 leaveChild(void)
-{
-    int ends[2];
-    int pid = 0;
-    if (pipe(ends) != 0) {
-        return 0;
-    }
-    const pid_t child = fork();
-    if (child == 0) {
-        setsid();
-        if (fork() == 0) {
-            pid = getpid();
-            if (write(ends[1], &pid, sizeof pid) > 0) {
-                sleep(60);
-            }
-        }
-        _exit(0);
-    }
-    waitpid(child, NULL, 0);
-    if (read(ends[0], &pid, sizeof pid) < 0) {
-        pid = 0;
-    }
-    return (CMPIUint32)pid;
-}
-
-/* What the agent may do: the lines of /proc/self/status that say so, then limits by name. */
-static CMPIStatus describeConfinement(const CMPIResult* result)
-{
-    static const struct
-    {
-        const char* name;
-        int resource;
-    } kLimits[] = {{"data", RLIMIT_DATA}, {"file", RLIMIT_FSIZE}, {"core", RLIMIT_CORE}, {"address", RLIMIT_AS}};
-    char text[1024] = "";
-    char line[256];
-    FILE* status = fopen("/proc/self/status", "r");
-    while (status != NULL && fgets(line, sizeof line, status) != NULL) {
-        if (strncmp(line, "NoNewPrivs", 10) == 0 || strncmp(line, "Cap", 3) == 0) {
-            strncat(text, line, sizeof text - strlen(text) - 1);
-        }
-    }
-    if (status != NULL) {
-        fclose(status);
-    }
-    for (size_t i = 0; i < sizeof kLimits / sizeof kLimits[0]; ++i) {
-        struct rlimit limit;
-        getrlimit((unsigned)kLimits[i].resource, &limit);
-        snprintf(line, sizeof line, "%s=%lld\n", kLimits[i].name, (long long)limit.rlim_max);
-        strncat(text, line, sizeof text - strlen(text) - 1);
-    }
-    result->ft->returnData(result, (const CMPIValue*)text, CMPI_chars);
-    return result->ft->returnDone(result);
-}
-
-/* A library's teardown that its other threads make unsafe. */
-static int gExits;
-__attribute__((destructor)) static void tearDown(void)
-{
-    if (gExits) {
-        abort();
-    }
-}
-
 static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, const CMPIResult* result,
                                const CMPIObjectPath* path, const char* method, const CMPIArgs* in, CMPIArgs* out)
 {
@@ -446,49 +324,8 @@ static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, con
     if (strcasecmp(method, "Trap") == 0) {
         return trap(context, result, path, in);
     }
-    if (strcasecmp(method, "ProcessId") == 0) {
-        return returnNumber(result, (CMPIUint32)getpid());
-    }
-    if (strcasecmp(method, "Grow") == 0) {
-        return grow();
-    }
-    if (strcasecmp(method, "Reserve") == 0) {
-        return returnNumber(result, reserve());
-    }
-    if (strcasecmp(method, "WriteToClosedPipe") == 0) {
-        return returnNumber(result, writeToClosedPipe());
-    }
-    if (strcasecmp(method, "Flood") == 0) {
-        return returnNumber(result, flood());
-    }
-    if (strcasecmp(method, "LeaveChild") == 0) {
-        return returnNumber(result, leaveChild());
-    }
-    if (strcasecmp(method, "Confinement") == 0) {
-        return describeConfinement(result);
-    }
-    if (strcasecmp(method, "Crash") == 0) {
-        printf("lane 3 is dark\n");
-        fprintf(stderr, "\033[2Jgiving up");
-        raise(SIGSEGV);
-    }
-    if (strcasecmp(method, "ForkAndCrash") == 0) { /* the children keep the agent's descriptors */
-        if (fork() == 0 || (fork() == 0 && setsid() > 0)) {
-            sleep(20);
-            _exit(0);
-        }
-        raise(SIGSEGV);
-    }
-    if (strcasecmp(method, "Exit") == 0) {
-        gExits = 1;
-        exit(3);
-    }
-    if (strcasecmp(method, "Hang") == 0) {
-        for (;;) {
-            pause();
-        }
-    }
-    return failure(CMPI_RC_ERR_METHOD_NOT_AVAILABLE, method);
+    const CMPIStatus status = doInProcess(gBroker, result, method);
+    return status.rc == CMPI_RC_ERR_METHOD_NOT_FOUND ? failure(CMPI_RC_ERR_METHOD_NOT_AVAILABLE, method) : status;
 }
 
 static CMPIStatus cleanupMethods(CMPIMethodMI* mi, const CMPIContext* context, CMPIBoolean terminating)

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "tests/pegasus/server/ProbeTraps.h"
 
+#include <float.h>
 #include <math.h>
 #include <string.h>
 
@@ -27,13 +28,6 @@ static CMPIStatus charsInStringArray(const Trap* trap)
 {
     const CMPIArray* array = newArray(trap, CMPI_string);
     return array->ft->setElementAt(array, 0, (const CMPIValue*)"x", CMPI_chars);
-}
-
-static CMPIStatus stringInCharsArray(const Trap* trap)
-{
-    const CMPIArray* array = newArray(trap, CMPI_chars);
-    const CMPIValue text = {.string = trap->mb->eft->newString(trap->mb, "x", NULL)};
-    return array->ft->setElementAt(array, 0, &text, CMPI_string);
 }
 
 static CMPIStatus elementReleasedEarly(const Trap* trap)
@@ -63,20 +57,17 @@ static CMPIStatus untypedNull(const Trap* trap)
     return trap->instance->ft->setProperty(trap->instance, "T1", NULL, CMPI_null);
 }
 
-static CMPIStatus keyOfOtherType(const Trap* trap)
-{
-    const CMPIValue number = {.uint32 = 1};
-    return trap->own->ft->addKey(trap->own, "Id", &number, CMPI_uint32);
-}
-
-static CMPIStatus nullKey(const Trap* trap)
-{
-    return trap->own->ft->addKey(trap->own, "Id", NULL, CMPI_string);
-}
-
 static CMPIStatus embeddedAsText(const Trap* trap)
 {
     return setText(trap, "Inner", "instance of Probe_Stored { };");
+}
+
+static CMPIStatus embeddedArray(const Trap* trap)
+{
+    const CMPIValue inners = {.array = newArray(trap, CMPI_instance)};
+    const CMPIValue inner = {.inst = trap->instance};
+    inners.array->ft->setElementAt(inners.array, 0, &inner, CMPI_instance);
+    return trap->instance->ft->setProperty(trap->instance, "Inners", &inners, CMPI_instanceA);
 }
 
 static CMPIStatus textNotUtf8(const Trap* trap)
@@ -84,10 +75,25 @@ static CMPIStatus textNotUtf8(const Trap* trap)
     return setText(trap, "T1", "a\xFFz");
 }
 
-static CMPIStatus realNotNormal(const Trap* trap)
+static CMPIStatus setReal(const Trap* trap, float real)
 {
-    const CMPIValue part = {.real32 = INFINITY};
+    const CMPIValue part = {.real32 = real};
     return trap->instance->ft->setProperty(trap->instance, "Part", &part, CMPI_real32);
+}
+
+static CMPIStatus infiniteReal(const Trap* trap)
+{
+    return setReal(trap, -INFINITY);
+}
+
+static CMPIStatus realNotANumber(const Trap* trap)
+{
+    return setReal(trap, NAN);
+}
+
+static CMPIStatus denormalReal(const Trap* trap)
+{
+    return setReal(trap, FLT_MIN / 2);
 }
 
 static CMPIStatus halfSurrogate(const Trap* trap)
@@ -127,16 +133,16 @@ static const struct
     CMPIStatus (*spring)(const Trap* trap);
 } kTraps[] = {
     {"chars in string array", charsInStringArray},
-    {"string in chars array", stringInCharsArray},
     {"element released early", elementReleasedEarly},
     {"null element", nullElement},
     {"null datetime element", nullDateTimeElement},
     {"untyped null", untypedNull},
-    {"key of other type", keyOfOtherType},
-    {"null key", nullKey},
     {"embedded as text", embeddedAsText},
+    {"embedded array", embeddedArray},
     {"text not UTF-8", textNotUtf8},
-    {"real not normal", realNotNormal},
+    {"infinite real", infiniteReal},
+    {"real not a number", realNotANumber},
+    {"denormal real", denormalReal},
     {"half surrogate", halfSurrogate},
     {"no returnDone", noReturnDone},
     {"no attach", noAttach},
