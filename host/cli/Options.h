@@ -6,7 +6,6 @@
 #include "host/cli/formats/IFormat.h"
 
 #include <memory>
-#include <stdexcept>
 #include <string>
 #include <utility>
 #include <vector>
@@ -14,10 +13,10 @@
 namespace vrxhost {
 
 // What is wrong with the command line, as a sentence.
-class TUsageError : public std::runtime_error
+class TUsageError : public TFailure
 {
   public:
-    using std::runtime_error::runtime_error;
+    using TFailure::TFailure;
 };
 
 // What vrxhost ends with; docs and tests name these.

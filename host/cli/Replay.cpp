@@ -10,8 +10,25 @@
 #include "host/cli/record/TRecordReader.h"
 
 #include <iostream>
+#include <map>
+#include <string>
+#include <vector>
 
 namespace vrxhost {
+namespace {
+
+// The times of the machine; what was measured here is the reading of the record.
+void SetTimes(std::vector<TProviderRecord>& providers, const std::map<std::string, long>& milliseconds)
+{
+    for (TProviderRecord& provider : providers) {
+        for (TClassRecord& each : provider.fClasses) {
+            const auto recorded = milliseconds.find(each.fName);
+            each.fMilliseconds = recorded == milliseconds.end() ? 0 : recorded->second;
+        }
+    }
+}
+
+} // namespace
 
 EExitStatus Replay(const TOptions& options)
 {
@@ -35,9 +52,10 @@ EExitStatus Replay(const TOptions& options)
     collector.SetSink(report.BeginStream(), options.fCommand->NeedsInstances());
     try {
         options.fCommand->Fill(collector, document);
+        SetTimes(document.fProviders, record.fMilliseconds);
         report.Show(std::move(document));
     } catch (const TRequestError& e) {
-        report.Fail(e.what());
+        report.Fail(e);
     }
     return report.Finish();
 }

@@ -52,10 +52,11 @@ void Check(const std::string& where, const std::string& name, const std::string&
     const auto key =
         std::find_if(Keys().begin(), Keys().end(), [&name](const TKey& each) { return name == each.fName; });
     if (key == Keys().end()) {
-        throw TUsageError(where + "there is no setting " + name + Suggestion(name, KeyNames()));
+        throw TUsageError(ELossKind::kSettings, where + "there is no setting " + name + Suggestion(name, KeyNames()));
     }
     if (std::find(key->fValues.begin(), key->fValues.end(), value) == key->fValues.end()) {
-        throw TUsageError(where + name + " is \"" + value + "\"; it can be: " + JoinNames(key->fValues));
+        throw TUsageError(ELossKind::kSettings,
+                          where + name + " is \"" + value + "\"; it can be: " + JoinNames(key->fValues));
     }
 }
 
@@ -72,7 +73,7 @@ void CheckFile(const std::string& path)
         const std::string where = path + ":" + std::to_string(number) + ": ";
         const std::size_t equals = line.find('=');
         if (equals == std::string::npos) {
-            throw TUsageError(where + "\"key = value\" is expected");
+            throw TUsageError(ELossKind::kSettings, where + "\"key = value\" is expected");
         }
         Check(where, Trimmed(line.substr(0, equals)), Trimmed(line.substr(equals + 1)));
     }
@@ -89,7 +90,7 @@ void LoadSettings(const std::string& file, const std::vector<std::pair<std::stri
         CheckFile(file);
         const std::string error = ErrorOf([&] { TConfig::GetInstance()->Load(file); });
         if (!error.empty()) {
-            throw TUsageError("the settings file " + file + " could not be read: " + error);
+            throw TUsageError(ELossKind::kSettings, "the settings file " + file + " could not be read: " + error);
         }
     }
     for (const auto& [name, value] : fromCommandLine) {

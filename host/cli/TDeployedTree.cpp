@@ -22,7 +22,7 @@ constexpr char kFormatLine[] = "format = 1";
 
 [[noreturn]] void Refuse(const std::string& root, const std::string& reason)
 {
-    throw TTreeError("the root directory " + root + " is not a deployed tree: " + reason);
+    throw TTreeError(ELossKind::kNotDeployed, "the root directory " + root + " is not a deployed tree: " + reason);
 }
 
 // What the mark says.
@@ -76,7 +76,7 @@ std::string Resolved(const std::string& root)
     std::error_code error;
     const fs::path resolved = fs::canonical(root, error);
     if (error) {
-        throw TTreeError("the root directory " + root + " could not be entered: " + error.message());
+        throw TTreeError(ELossKind::kRoot, "the root directory " + root + " could not be entered: " + error.message());
     }
     return resolved;
 }

@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <stdexcept>
+#include "host/cli/model/Loss.h"
+
 #include <string>
 
 namespace vrxhost {
@@ -14,10 +15,10 @@ enum class EServerKind
 };
 
 // Why a directory is refused as root, as a sentence. Thrown before anything is changed or run.
-class TTreeError : public std::runtime_error
+class TTreeError : public TFailure
 {
   public:
-    using std::runtime_error::runtime_error;
+    using TFailure::TFailure;
 };
 
 // A root that was staged for vrxhost. The server's repository below it is deleted by each run, so a folder that merely

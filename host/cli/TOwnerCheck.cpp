@@ -91,9 +91,10 @@ void CheckStatus(const std::string& path, const struct stat& status, bool others
     char mode[8];
     std::snprintf(mode, sizeof mode, "%04o", status.st_mode & kModeBits);
     const std::string user = UserName(::geteuid());
-    throw TTreeError(path + " (owner " + UserName(status.st_uid) + ", mode " + mode +
-                     ") could be changed by another user; what runs as " + user + " must belong to " +
-                     (user == "root" ? "root" : "root or " + user) + ", and nobody else may write it");
+    throw TTreeError(ELossKind::kForeignWriter, path + " (owner " + UserName(status.st_uid) + ", mode " + mode +
+                                                    ") could be changed by another user; what runs as " + user +
+                                                    " must belong to " + (user == "root" ? "root" : "root or " + user) +
+                                                    ", and nobody else may write it");
 }
 
 // Returns: where the link leads; empty for anything else than a link.

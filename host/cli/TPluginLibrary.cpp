@@ -51,10 +51,10 @@ TPluginLibrary::TPluginLibrary(const std::string& path) : fPath(path), fThreadCo
 {
     const std::string error = ErrorOf([this] { fHandle = ::dlopen(fPath.c_str(), RTLD_NOW | RTLD_LOCAL); });
     if (!error.empty()) {
-        throw TPluginError("the plug-in " + fPath + " could not be loaded: " + error);
+        throw TPluginError(ELossKind::kPluginLoad, "the plug-in " + fPath + " could not be loaded: " + error);
     }
     if (!fHandle) {
-        throw TPluginError(std::string("the plug-in could not be loaded: ") + ::dlerror());
+        throw TPluginError(ELossKind::kPluginLoad, std::string("the plug-in could not be loaded: ") + ::dlerror());
     }
     try {
         Register();
@@ -80,7 +80,8 @@ TPluginLibrary::TEntryPoint TPluginLibrary::Symbol(const char* name) const
 {
     void* const symbol = ::dlsym(fHandle, name);
     if (!symbol) {
-        throw TPluginError(fPath + " is not a namespace-provider plug-in: it lacks the symbol " + name);
+        throw TPluginError(ELossKind::kPluginKind,
+                           fPath + " is not a namespace-provider plug-in: it lacks the symbol " + name);
     }
     return reinterpret_cast<TEntryPoint>(symbol);
 }
@@ -91,15 +92,16 @@ void TPluginLibrary::Register()
     fClearNamespace = Symbol(NKOLVRX20::kClearNamespaceSymbol);
     std::string error = ErrorOf([&] { initialize(); });
     if (!error.empty()) {
-        throw TPluginError("the plug-in " + fPath + " could not be initialised: " + error);
+        throw TPluginError(ELossKind::kPlugin, "the plug-in " + fPath + " could not be initialised: " + error);
     }
     error =
         ErrorOf([&] { fProvider = TRootObject::GetNamespaceProviderManager()->GetNamespaceProvider(kProviderName); });
     if (!error.empty()) {
-        throw TPluginError("the plug-in " + fPath + " could not be asked for its name: " + error);
+        throw TPluginError(ELossKind::kPlugin, "the plug-in " + fPath + " could not be asked for its name: " + error);
     }
     if (!fProvider) {
-        throw TPluginError("the plug-in " + fPath + " registered no provider named \"" + kProviderName + "\"");
+        throw TPluginError(ELossKind::kPluginKind,
+                           "the plug-in " + fPath + " registered no provider named \"" + kProviderName + "\"");
     }
 }
 

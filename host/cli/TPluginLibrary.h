@@ -1,21 +1,22 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "host/cli/model/Loss.h"
+
 #include <host/INamespaceProvider.h>
 
 #include <boost/shared_ptr.hpp>
 
 #include <cstddef>
-#include <stdexcept>
 #include <string>
 
 namespace vrxhost {
 
 // Why a plug-in is unusable, as a sentence.
-class TPluginError : public std::runtime_error
+class TPluginError : public TFailure
 {
   public:
-    using std::runtime_error::runtime_error;
+    using TFailure::TFailure;
 };
 
 // A loaded plug-in: its library, its entry points, and its provider in the host's manager.

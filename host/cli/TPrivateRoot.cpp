@@ -129,7 +129,8 @@ void Mirror(const fs::path& from, const fs::path& to, int depth)
 void RefuseForeignContent(const fs::path& root)
 {
     if (fs::exists(root / "pegasus") && !fs::is_empty(root / "pegasus") && !fs::is_symlink(root / kMark)) {
-        throw TTreeError("the state directory " + root.string() + " holds a folder pegasus that vrxhost did not make");
+        throw TTreeError(ELossKind::kState,
+                         "the state directory " + root.string() + " holds a folder pegasus that vrxhost did not make");
     }
 }
 
@@ -157,7 +158,8 @@ TPrivateRoot::TPrivateRoot(const TDeployedTree& tree, const std::string& directo
         }
         tried += (tried.empty() ? "" : " nor ") + candidate.string();
     }
-    throw TTreeError(directory.empty() ? "neither the tree " + fTree + " nor " + tried +
+    throw TTreeError(directory.empty() ? ELossKind::kNoState : ELossKind::kState,
+                     directory.empty() ? "neither the tree " + fTree + " nor " + tried +
                                              " can be written; --state names a directory that can"
                                        : "the state directory " + directory +
                                              " cannot be made or written, or others may write it or a folder above");
@@ -188,7 +190,7 @@ void TPrivateRoot::Lay() const
         }
         CopyPlannedConfiguration(fs::path(fTree) / kPlannedConfiguration, root / kPlannedConfiguration);
     } catch (const fs::filesystem_error& e) {
-        throw TTreeError(std::string("the private root could not be laid: ") + e.what());
+        throw TTreeError(ELossKind::kState, std::string("the private root could not be laid: ") + e.what());
     }
 }
 

@@ -62,7 +62,7 @@ void TReport::RunFinish(TDocument& document)
         fOptions.fCommand->Complete(document);
     } catch (const std::runtime_error& e) {
         fFailed = true;
-        document.fLosses.push_back(LossOf(e.what()));
+        document.fLosses.push_back(LossOf(e));
     }
 }
 
@@ -88,12 +88,12 @@ void TReport::Write(const std::string& text)
     }
 }
 
-void TReport::Fail(const std::string& reason)
+void TReport::Fail(const std::exception& reason)
 {
     if (!fStop.IsStopped()) {
         fFailed = true;
         fLosses.AddHeldBack();
-        fLosses.Add(reason);
+        fLosses.Add(LossOf(reason));
     }
     Show(TDocument());
 }

@@ -37,7 +37,7 @@ class TReport
 
     // For a run that failed before its inventory: enters the reason as a loss and shows a document with an empty list
     // of providers.
-    void Fail(const std::string& reason);
+    void Fail(const std::exception& reason);
 
     // Reports the losses since the document. Requires: the plug-in's work is over.
     // Returns: the document's status when it was written whole, also if an interruption came later.

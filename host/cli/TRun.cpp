@@ -11,6 +11,7 @@
 #include <chrono>
 #include <csignal>
 #include <iostream>
+#include <optional>
 #include <random>
 
 namespace vrxhost {
@@ -77,7 +78,7 @@ EExitStatus TRun::Execute()
             UsePlugin();
         }
     } catch (const TPluginError& e) {
-        fReport.Fail(e.what());
+        fReport.Fail(e);
     }
     return fReport.Finish();
 }
@@ -127,7 +128,8 @@ void TRun::SetConsumer() const
     }
     const std::string error = fServer.SetConsumer();
     if (!error.empty() && !fOptions.fConsumer.empty()) {
-        throw TPluginError("the consumer " + fOptions.fConsumer + " could not be set, cimconfig: " + error);
+        throw TPluginError(ELossKind::kServerProgram,
+                           "the consumer " + fOptions.fConsumer + " could not be set, cimconfig: " + error);
     }
 }
 
@@ -136,14 +138,18 @@ void TRun::OpenNamespace(TSession& session)
 {
     for (int attempt = 1;; ++attempt) {
         Enter(EPhase::kOpening);
-        const std::string error = ErrorOf([&] { session.Open(); });
-        Enter(error.empty() ? EPhase::kOpen : EPhase::kEnding);
+        std::optional<TPluginError> failure;
+        try {
+            session.Open();
+        } catch (const TPluginError& e) {
+            failure = e;
+        }
+        Enter(failure ? EPhase::kEnding : EPhase::kOpen);
         if (fLosses.HasForeignServer() && attempt < kAttempts && PauseBefore(attempt + 1)) {
             session.Clear();
             fLosses.StartOver();
-        } else if (!error.empty()) {
-            const std::string name = fVendors.DescribeInvalidName();
-            throw TPluginError(error + (name.empty() ? "" : ": " + name));
+        } else if (failure) {
+            throw TPluginError(*failure);
         } else {
             return;
         }
@@ -171,13 +177,13 @@ void TRun::UsePlugin()
     TSession session(fOptions.fPlugin, fConsumer);
     OpenNamespace(session);
     if (fLosses.HasNoServer()) {
-        throw TPluginError("the namespace has no server of its own");
+        throw TPluginError(ELossKind::kServer, "the namespace has no server of its own");
     }
     Show(session.GetNamespace());
     Enter(EPhase::kEnding);
     const std::string problem = session.Close();
     if (!problem.empty()) {
-        fLosses.Add(problem);
+        fLosses.Add(LossOf(ELossKind::kPlugin, problem));
     }
 }
 
@@ -185,7 +191,7 @@ void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
 {
     TDocument document;
     document.fHead = fReport.GetHead();
-    std::string refused;
+    std::optional<TRequestError> refused;
     TRegistrationCheck check(ns, fVendors, fLosses);
     if (fOptions.fDeadlineSeconds > 0) {
         check.ReadModules();
@@ -198,7 +204,7 @@ void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
         try {
             fOptions.fCommand->Fill(collector, document);
         } catch (const TRequestError& e) {
-            refused = e.what();
+            refused = e;
         }
     });
     if (!error.empty()) {
@@ -207,8 +213,8 @@ void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
     if (!fStop.IsStopped()) {
         FindSilentLosses(check, document);
     }
-    if (!refused.empty()) {
-        fReport.Fail(refused);
+    if (refused) {
+        fReport.Fail(*refused);
     } else {
         fReport.Show(std::move(document));
     }

@@ -6,10 +6,12 @@
 #include "host/inmem/TInmemNamespace.h"
 
 #include <host/TCIMValue.h>
+#include <host/TVRXException.h>
 #include <host/TVRXStatusCode.h>
 
 #include <boost/make_shared.hpp>
 
+#include <cstdint>
 #include <cstdlib>
 
 namespace vrxhost {
@@ -48,6 +50,21 @@ class TExitReport
     static inline bool fgActive = false;
 };
 
+// What a failed allocation is about.
+ELossKind KindOfStatus(std::uint32_t status)
+{
+    switch (status) {
+    case TVRXStatusCode::kServerConnectionFailed:
+        return ELossKind::kServer;
+    case TVRXStatusCode::kDirectoryNotOpened:
+        return ELossKind::kNotDeployed;
+    case TVRXStatusCode::kInvalidName:
+        return ELossKind::kClassName;
+    default:
+        return ELossKind::kPlugin;
+    }
+}
+
 } // namespace
 
 std::string ProviderDirectory(const std::string& pluginPath)
@@ -68,14 +85,22 @@ TSession::~TSession()
 
 void TSession::Open()
 {
-    std::string error = ErrorOf([this] { Allocate(); });
-    if (error.find(TVRXStatusCode(TVRXStatusCode::kDirectoryNotOpened).TranslateStatusCode()) == 0) {
+    std::uint32_t status = 0;
+    std::string error = ErrorOf([this, &status] {
+        try {
+            Allocate();
+        } catch (const TVRXException& e) {
+            status = e.GetStatusCode();
+            throw;
+        }
+    });
+    if (status == TVRXStatusCode::kDirectoryNotOpened) {
         error += ": " + ProviderDirectory(fPluginPath) + " or a folder in it";
     } else if (error.empty() && !fNamespace) {
         error = "the plug-in returned none";
     }
     if (!error.empty()) {
-        throw TPluginError("the namespace could not be opened: " + error);
+        throw TPluginError(KindOfStatus(status), "the namespace could not be opened: " + error);
     }
 }
 

@@ -65,26 +65,27 @@ void CheckOwners(const TOptions& options, TOwnerCheck& owners)
 
 // Enters the root and keeps every other vrxhost out of it: two hosts would stop each other's server.
 // Returns: the lock.
-// Throws: std::runtime_error with the reason as a sentence.
+// Throws: TFailure.
 NKOLVRX20::TUniqueFd EnterRoot(const std::string& root)
 {
     NKOLVRX20::TUniqueFd directory(::open(root.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
     if (!directory || ::fchdir(directory.Get()) != 0) {
-        throw std::runtime_error("the root directory " + root + " could not be entered: " + std::strerror(errno));
+        throw TFailure(ELossKind::kRoot,
+                       "the root directory " + root + " could not be entered: " + std::strerror(errno));
     }
     if (::flock(directory.Get(), LOCK_EX | LOCK_NB) != 0) {
-        throw std::runtime_error(errno == EWOULDBLOCK
-                                     ? "another vrxhost is at work in " + root
-                                     : "the root directory " + root + " could not be locked: " + std::strerror(errno));
+        throw errno == EWOULDBLOCK ? TFailure(ELossKind::kBusyRoot, "another vrxhost is at work in " + root)
+                                   : TFailure(ELossKind::kRoot, "the root directory " + root +
+                                                                    " could not be locked: " + std::strerror(errno));
     }
     return directory;
 }
 
 // Before there is a run: the reason, and in the formats that have room for it a document with an empty list of
 // providers.
-EExitStatus Refuse(const TOptions& options, const std::string& reason, EExitStatus status)
+EExitStatus Refuse(const TOptions& options, const std::exception& reason, EExitStatus status)
 {
-    ReportError(reason);
+    ReportError(reason.what());
     TDocument document;
     document.fHead = MakeHead(options.fCommandName);
     document.fHead.fEnded = TimeNow();
@@ -134,11 +135,11 @@ int Main(int argc, const char* const* argv)
     try {
         return ParseOptions(argc, argv, options) ? Run(options) : kComplete;
     } catch (const TUsageError& e) {
-        return Refuse(options, e.what(), kUsage);
+        return Refuse(options, e, kUsage);
     } catch (const TTreeError& e) {
-        return Refuse(options, e.what(), kUsage);
+        return Refuse(options, e, kUsage);
     } catch (const std::runtime_error& e) {
-        return Refuse(options, e.what(), kFailed);
+        return Refuse(options, e, kFailed);
     }
 }
 

@@ -3,6 +3,7 @@
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/common/Files.h"
+#include "src/common/Names.h"
 #include "src/namespace/NamespaceConstants.h"
 #include "src/namespace/ProviderThreads.h"
 #include "src/namespace/TPEGASUSNamespace.h"
@@ -135,6 +136,10 @@ boost::shared_ptr<ICIMClass> TPEGASUSNamespace::CollectClass(const std::string& 
 {
     std::map<std::string, std::string> tags = {{kTimeOutTag, provider->GetDefaultTimeoutVal()}};
     const std::string name = filterTag4classes(entry, tags);
+    if (isConnected() && name != kRootClassName && !IsCimName(name)) { // GetClass throws, and its line lacks the file
+        LogFailure("TPEGASUSNamespace::CollectClass failed: the class name \"", name, "\" in ", provider->GetPath(),
+                   " is invalid");
+    }
     // Both the file and the entry may leave the timeout out, and 0 seconds would make every call fail.
     const std::string timeout = tags[kTimeOutTag].empty() ? strTimeout : tags[kTimeOutTag];
     if (!IsPlainTimeout(timeout)) {

@@ -365,10 +365,10 @@ class BrokenTree(TreeTest):
         answers = [(check["subject"], check["text"], check["advice"])
                    for check in json.loads(out)["checks"] if not check["ok"] and "advice" in check]
         for subject, text, advice in (
-                ("vendor lamps", "Frequency of class LAMP_Lamp is declared with another type", "use the same type"),
-                ("vendor linux", "class LNX_Processor: no provider", "add an instance of PG_ProviderCapabilities"),
-                ("vendor linux", "FreeBytes of class LNX_Memory is not declared", "declare the property"),
-                ("vendor linux", "class LNX_Procesor could not be fetched", "correct its name in the class list")):
+                ("class LAMP_Lamp", "Frequency of class LAMP_Lamp is declared with another type", "use the same type"),
+                ("class LNX_Processor", "class LNX_Processor: no provider", "add an instance of PG_ProviderCapabilities"),
+                ("class LNX_Memory", "FreeBytes of class LNX_Memory is not declared", "declare the property"),
+                ("class LNX_Procesor", "class LNX_Procesor could not be fetched", "correct its name in the class list")):
             self.assertTrue([1 for found in answers if found[0] == subject and text in found[1] and advice in found[2]],
                             (text, answers))
 

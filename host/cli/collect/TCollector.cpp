@@ -21,6 +21,15 @@ namespace {
 const TCIMContext kNoContext;
 constexpr signed char kPluginType = 7;
 
+// "BEGIN NAME END: CAUSE"
+TLoss LossOfClass(ELossKind kind, const std::string& begin, const std::string& name, const std::string& end)
+{
+    TLoss loss = LossOf(kind, begin);
+    loss.fObjects = loss.fClasses = {name};
+    loss.fEnd = end;
+    return loss;
+}
+
 } // namespace
 
 TCollector::TCollector(ICIMNamespace& ns, TLossLog& losses, std::function<bool()> isStopped)
@@ -39,11 +48,12 @@ std::vector<TProviderRecord> TCollector::ReadProviders(EDetail detail)
     return records;
 }
 
-void TCollector::Ask(const std::string& what, const std::function<void()>& question)
+void TCollector::Ask(TLoss loss, const std::function<void()>& question)
 {
     const std::string error = ErrorOf(question);
     if (!error.empty() && !fIsStopped()) {
-        fLosses.Add(what + ": " + error);
+        loss.fEnd += ": " + error;
+        fLosses.Add(loss);
     }
 }
 
@@ -54,7 +64,7 @@ std::vector<TCollector::TProviderPtr> TCollector::ListProviders()
     std::vector<TProviderPtr> providers;
     TCIMContext context;
     context["pluginType"] = TCIMValue(kPluginType);
-    Ask("the providers could not be listed", [&] {
+    Ask(LossOf(ELossKind::kPlugin, "the providers could not be listed"), [&] {
         fNamespace.EnumerateProviders(
             [&](TProviderPtr provider) {
                 const std::lock_guard<std::mutex> lock(mutex);
@@ -69,7 +79,7 @@ std::vector<TCollector::TProviderPtr> TCollector::ListProviders()
 std::vector<TCollector::TClassPtr> TCollector::ListClasses(IProvider& provider, const std::string& name)
 {
     std::vector<TClassPtr> classes;
-    Ask("the classes of provider " + name + " could not be listed", [&] {
+    Ask(LossOf(ELossKind::kPlugin, "the classes of provider " + name + " could not be listed"), [&] {
         provider.EnumerateClassesProvided(
             [&](TClassPtr each) {
                 classes.push_back(std::move(each));
@@ -103,7 +113,7 @@ TCollector::TClassPtr TCollector::FindClass(const std::string& name)
 TProviderRecord TCollector::ReadProvider(IProvider& provider, EDetail detail)
 {
     TProviderRecord record;
-    Ask("a provider could not be described", [&] {
+    Ask(LossOf(ELossKind::kPlugin, "a provider could not be described"), [&] {
         record.fName = provider.GetName(kNoContext);
         record.fModule = provider.GetModuleName(kNoContext);
         record.fDescription = provider.GetDescription(kNoContext);
@@ -142,8 +152,9 @@ void TCollector::EndWatch(const std::vector<std::string>& partial)
     fWatch->EndProvider();
     if (!partial.empty() && !fIsStopped()) {
         TLoss loss =
-            LossOf("provider " + fProviderName + " took longer than " + std::to_string(fWatch->GetDeadlineSeconds()) +
-                   " s and was given up; missing or incomplete: " + JoinNames(partial));
+            LossOf(ELossKind::kDeadline, "provider " + fProviderName + " took longer than " +
+                                             std::to_string(fWatch->GetDeadlineSeconds()) +
+                                             " s and was given up; missing or incomplete: " + JoinNames(partial));
         loss.fClasses = partial;
         fLosses.Add(loss);
     }
@@ -161,22 +172,25 @@ TClassRecord TCollector::ReadWatchedClass(ICIMClass& each, EDetail detail, const
 {
     TClassRecord record;
     record.fIsPartial = IsGivenUp();
-    Ask("a class could not be named", [&] { record.fName = each.GetName(kNoContext); });
+    Ask(LossOf(ELossKind::kPlugin, "a class could not be named"), [&] { record.fName = each.GetName(kNoContext); });
     if (fWatch) {
         fWatch->BeginClass(record.fName);
     }
     if (detail != EDetail::kNames) {
-        Ask("class " + record.fName + " could not be described", [&] { ReadDeclarations(each, record); });
+        Ask(LossOfClass(ELossKind::kClass, "class ", record.fName, " could not be described"),
+            [&] { ReadDeclarations(each, record); });
     }
     if (fSink && !fObserver && detail != EDetail::kNames) {
         fSink->BeginClass(fProviderName, record);
     }
     if (fObserver) {
-        Ask("class " + record.fName + " could not be recorded", [&] { fObserver->BeginClass(each, record); });
+        Ask(LossOfClass(ELossKind::kClass, "class ", record.fName, " could not be recorded"),
+            [&] { fObserver->BeginClass(each, record); });
     }
     if (detail == EDetail::kInstances && !record.fIsPartial) {
         const auto begin = std::chrono::steady_clock::now();
-        Ask("instances of " + record.fName + " could not be fetched", [&] { ReadInstances(each, record, filter); });
+        Ask(LossOfClass(ELossKind::kInstances, "instances of ", record.fName, " could not be fetched"),
+            [&] { ReadInstances(each, record, filter); });
         const auto took = std::chrono::steady_clock::now() - begin;
         record.fMilliseconds = std::chrono::duration_cast<std::chrono::milliseconds>(took).count();
         record.fIsPartial = IsGivenUp();
@@ -191,7 +205,7 @@ void TCollector::ReadInstances(ICIMClass& each, TClassRecord& record, const TFil
 {
     each.EnumerateInstances(
         [&](boost::shared_ptr<ICIMInstance> instance) {
-            Ask("an instance of " + record.fName + " could not be read", [&] {
+            Ask(LossOfClass(ELossKind::kInstances, "an instance of ", record.fName, " could not be read"), [&] {
                 if (fObserver) {
                     fObserver->Add(*instance);
                     ++record.fInstanceCount;

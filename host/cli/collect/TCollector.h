@@ -60,8 +60,8 @@ class TCollector
     bool IsGivenUp() const { return fWatch && fWatch->IsGivenUp(); }
     void ReadInstances(NKOLVRX20::ICIMClass& each, TClassRecord& record, const TFilter& filter);
 
-    // Runs a question; what it throws becomes the loss "<what> could not be <done>: <cause>".
-    void Ask(const std::string& what, const std::function<void()>& question);
+    // Runs a question; what it throws ends the loss's sentence.
+    void Ask(TLoss loss, const std::function<void()>& question);
 
     NKOLVRX20::ICIMNamespace& fNamespace;
     TLossLog& fLosses;

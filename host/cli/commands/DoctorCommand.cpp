@@ -8,66 +8,66 @@
 namespace vrxhost {
 namespace {
 
-// The first row whose text a sentence contains decides what the sentence is about, where it names no vendor, and what
-// to do.
+// What a loss is about when it names neither class nor vendor, and what to do.
 struct TAdviceRow
 {
-    const char* fText;
+    ELossKind fKind;
     const char* fSubject;
     const char* fAdvice;
 };
 
-const TAdviceRow kAdvice[] = {
-    {"is not a deployed tree", "tree",
-     "stage the tree again (cmake --install BUILD --prefix ROOT, or install the package again), or name another "
-     "with --root"},
-    {"could be changed by another user", "tree",
+constexpr char kStageAgain[] =
+    "stage the tree again (cmake --install BUILD --prefix ROOT, or install the package again), or name "
+    "another with --root";
+constexpr char kReadServerLog[] = "read the server's log from its end, or run pegasus/bin/cimserver by hand";
+constexpr char kCorrectSetting[] = "correct the line, or the option --set";
+
+constexpr TAdviceRow kAdvice[] = {
+    {ELossKind::kOther, "run", ""},
+    {ELossKind::kNotDeployed, "tree", kStageAgain},
+    {ELossKind::kRoot, "tree", "name a deployed tree with --root"},
+    {ELossKind::kBusyRoot, "tree", "wait until it has ended, or work in another root (--root, --state)"},
+    {ELossKind::kForeignWriter, "tree",
      "give it to root or to yourself (chown), and take the right to write from all others (chmod go-w)"},
-    {"another vrxhost is at work", "tree", "wait until it has ended, or work in another root (--root, --state)"},
-    {"can be written", "tree", "name a directory that you may write with --state"},
-    {"state directory", "tree", "name a directory of your own, or one that is empty, with --state"},
-    {"root directory", "tree", "name a deployed tree with --root"},
-    {"there is no setting", "settings", "correct the line, or the option --set"},
-    {"it can be:", "settings", "correct the line, or the option --set"},
-    {"plug-in could not be loaded", "plug-in",
+    {ELossKind::kNoState, "tree", "name a directory that you may write with --state"},
+    {ELossKind::kState, "tree", "name a directory of your own, or one that is empty, with --state"},
+    {ELossKind::kSettings, "settings", kCorrectSetting},
+    {ELossKind::kPluginLoad, "plug-in",
      "install what the loader misses, or stage the tree again; --plugin names another file"},
-    {"is not a namespace-provider plug-in", "plug-in", "stage the tree again; --plugin names another file"},
-    {"the plug-in", "plug-in", "read the host's log from its end"},
-    {"the server did not start", "server", "read the server's log from its end, or run pegasus/bin/cimserver by hand"},
-    {"has no server of its own", "server", "read the server's log from its end, or run pegasus/bin/cimserver by hand"},
-    {"connection to the CIM server failed", "server",
-     "read the server's log from its end, or run pegasus/bin/cimserver by hand"},
-    {"could not be set, cimconfig", "server", "stage the tree again: pegasus/bin/cimconfig does not work"},
-    {"did not compile", "schema", "correct the file at that line and column; docs/mof.md describes the language"},
-    {"is invalid", "vendors", "correct the name in the class list: letters, digits and underscores"},
-    {"cannot be loaded", "vendors", "install what is missing, or build the library again"},
-    {"is in no vendor's folder", "vendors", "put the library there, or correct Location in the registration file"},
-    {"no registration file", "vendors",
+    {ELossKind::kPluginKind, "plug-in", "stage the tree again; --plugin names another file"},
+    {ELossKind::kPlugin, "plug-in", "read the host's log from its end"},
+    {ELossKind::kServer, "server", kReadServerLog},
+    {ELossKind::kServerProgram, "server", "stage the tree again: one of the programs in pegasus/bin does not work"},
+    {ELossKind::kSchema, "schema", "correct the file at that line and column; docs/mof.md describes the language"},
+    {ELossKind::kClassName, "vendors", "correct the name in the class list: letters, digits and underscores"},
+    {ELossKind::kClassList, "vendors", "correct the class list at that line"},
+    {ELossKind::kTimeout, "vendors", "write whole seconds, 4294967 at most, in <timeout> or in CLASS[SECONDS]"},
+    {ELossKind::kNoClassList, "vendors", "add NAME.classes.xml; remove the folder when it is not used"},
+    {ELossKind::kNoRegistration, "vendors",
      "add NAME.registration.mof with PG_ProviderModule, PG_Provider and PG_ProviderCapabilities; docs/vendors.md has "
      "an example"},
-    {"no PG_ProviderCapabilities instance", "vendors",
+    {ELossKind::kNoCapabilities, "vendors",
      "add an instance of PG_ProviderCapabilities with this ClassName to the registration file"},
-    {"asked for in namespace", "vendors",
+    {ELossKind::kOtherNamespace, "vendors",
      "make <nsp> of the class list and Namespaces of the registration file the same"},
-    {"has no class list", "vendors", "add NAME.classes.xml; remove the folder when it is not used"},
-    {"is not declared, so that", "vendors", "declare the property in the class's MOF, or leave it unset"},
-    {"declared with another type", "vendors", "use the same type in the class's MOF and in the provider"},
-    {"class list", "vendors", "correct the class list at that line"},
-    {"could not be fetched", "vendors",
-     "declare the class in a *.properties.mof of the folder, correct its name in the class list, or see why the "
-     "provider failed"},
-    {"instance", "vendors", "see in the server's log why the provider failed"},
+    {ELossKind::kProviderName, "vendors",
+     "use the same name in PG_Provider, in PG_ProviderCapabilities and in the library's entry points"},
+    {ELossKind::kLibrary, "vendors", "install what is missing, or build the library again"},
+    {ELossKind::kLocation, "vendors", "put the library there, or correct Location in the registration file"},
+    {ELossKind::kClass, "vendors",
+     "declare the class in a *.properties.mof of the folder, or correct its name in the class list"},
+    {ELossKind::kInstances, "vendors", "see in the server's log why the provider failed"},
+    {ELossKind::kInstancesLate, "vendors",
+     "see in the server's log what the provider waits for, or give the class a longer timeout: CLASS[SECONDS]"},
+    {ELossKind::kDeadline, "vendors", "see in the server's log what the provider waits for, or raise --deadline"},
+    {ELossKind::kEmbeddedObject, "vendors",
+     "nothing, when the text is enough; else declare properties of simple types"},
+    {ELossKind::kUndeclaredProperty, "vendors", "declare the property in the class's MOF, or leave it unset"},
+    {ELossKind::kPropertyType, "vendors", "use the same type in the class's MOF and in the provider"},
+    {ELossKind::kMofPortability, "schema", "change the text as docs/mof.md says under Portability"},
+    {ELossKind::kProviderPortability, "vendors", "change the provider's call as docs/vendors.md says"},
 };
-
-constexpr TAdviceRow kNoAdvice = {"", "run", ""};
-
-const TAdviceRow& AdviceOn(const std::string& sentence)
-{
-    const auto found = std::find_if(std::begin(kAdvice), std::end(kAdvice), [&sentence](const TAdviceRow& row) {
-        return sentence.find(row.fText) != std::string::npos;
-    });
-    return found == std::end(kAdvice) ? kNoAdvice : *found;
-}
+static_assert(IsTableOfKinds(kAdvice));
 
 std::string LogFiles(const TDocument& document)
 {
@@ -77,18 +77,48 @@ std::string LogFiles(const TDocument& document)
 
 TCheck CheckOf(const TLoss& loss, const TDocument& document)
 {
-    const std::string sentence = loss.GetText();
-    const TAdviceRow& row = AdviceOn(sentence);
+    const TAdviceRow& row = kAdvice[static_cast<std::size_t>(loss.fKind)];
     TCheck check;
     check.fSubject = loss.fVendor.empty() ? row.fSubject : "vendor " + loss.fVendor;
-    check.fText = sentence;
+    check.fIsOk = check.fIsNote = loss.fIsNote;
+    check.fText = loss.GetText();
     check.fAdvice = row.fAdvice;
     check.fLog = loss.fLog;
-    const std::string logs = LogFiles(document);
+    const std::string logs = loss.fIsNote ? "" : LogFiles(document);
     if (!logs.empty()) {
         check.fAdvice += (check.fAdvice.empty() ? "read " : "; logs: ") + logs;
     }
     return check;
+}
+
+void AddClassChecks(const TLoss& loss, TDocument& document)
+{
+    for (std::size_t i = 0; i < loss.fClasses.size(); ++i) {
+        TLoss single = loss;
+        if (loss.fClasses.size() > 1) {
+            single.fObjects = {loss.fObjects[i]};
+        }
+        document.fChecks.push_back(CheckOf(single, document));
+        document.fChecks.back().fSubject = "class " + loss.fClasses[i];
+    }
+}
+
+// A class that fails has a line of its own, also when several fail of one cause.
+void AddChecks(const TLoss& loss, TDocument& document)
+{
+    const bool isOfEachClass = loss.fClasses.size() == 1 || loss.fObjects.size() == loss.fClasses.size();
+    if (loss.fIsNote || loss.fIsCause || loss.fClasses.empty() || !isOfEachClass) {
+        document.fChecks.push_back(CheckOf(loss, document));
+    } else {
+        AddClassChecks(loss, document);
+    }
+    for (std::size_t i = 0; loss.fIsCause && i < loss.fClasses.size(); ++i) {
+        TCheck check;
+        check.fSubject = "class " + loss.fClasses[i];
+        check.fText = "missing as a consequence of " + loss.fFile;
+        check.fAdvice = "correct that file first";
+        document.fChecks.push_back(std::move(check));
+    }
 }
 
 // A line for each provider: what it delivers, and how long its slowest class took.
@@ -137,12 +167,10 @@ class TDoctorCommand : public ICommand
             document.fChecks.push_back(CheckOf(provider, document));
         }
         for (const TLoss& loss : document.fLosses) {
-            if (!loss.fIsNote) {
-                document.fChecks.push_back(CheckOf(loss, document));
-            }
+            AddChecks(loss, document);
         }
         if (document.fChecks.empty()) {
-            document.fChecks.push_back({"tree", true, "there is no vendor", "", {}, ""});
+            document.fChecks.push_back({"tree", true, false, "there is no vendor", "", {}, ""});
         }
     }
 };

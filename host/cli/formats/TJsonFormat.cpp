@@ -30,6 +30,9 @@ TJson Invocation(const TInvocation& invocation)
 TJson Check(const TCheck& check, bool isStable)
 {
     TJson json = {{"subject", check.fSubject}, {"ok", check.fIsOk}, {"text", check.fText}};
+    if (check.fIsNote) {
+        json["note"] = true;
+    }
     if (!check.fAdvice.empty()) {
         json["advice"] = check.fAdvice;
     }

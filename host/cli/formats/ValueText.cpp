@@ -186,7 +186,7 @@ std::string PathLabel(const std::string& path)
 std::string CheckText(const TCheck& check, const TFormatOptions& options)
 {
     const std::string took = check.fTook.empty() || options.fStable ? "" : ", in " + check.fTook;
-    return (check.fIsOk ? "ok: " : "FAILED: ") + check.fText + took;
+    return (check.fIsNote ? "note: " : check.fIsOk ? "ok: " : "FAILED: ") + check.fText + took;
 }
 
 } // namespace vrxhost

@@ -77,12 +77,12 @@ bool Exists(const std::string& name, const TVendorFiles& files, const std::strin
                        [&isIn](const TVendorFolder& folder) { return isIn(folder.fPath); });
 }
 
-void Enter(TLossLog& losses, const TVendorFolder& folder, const std::string& file, const std::string& sentence)
+void Enter(TLossLog& losses, const TVendorFolder& folder, const std::string& file, ELossKind kind,
+           const std::string& sentence)
 {
-    TLoss loss;
+    TLoss loss = LossOf(kind, sentence);
     loss.fVendor = folder.fName;
     loss.fFile = file;
-    loss.fBegin = sentence;
     losses.Add(loss);
 }
 
@@ -97,7 +97,8 @@ void CheckLocations(const TVendorFolder& folder, const TVendorFiles& files, cons
         for (std::sregex_iterator found(text.begin(), text.end(), kLocation), end; found != end; ++found) {
             const std::string name = "lib" + (*found)[1].str() + ".so";
             if (!Exists(name, files, root)) {
-                Enter(losses, folder, path, "the library " + name + " (Location) is in no vendor's folder");
+                Enter(losses, folder, path, ELossKind::kLocation,
+                      "the library " + name + " (Location) is in no vendor's folder");
             }
         }
     }
@@ -113,7 +114,7 @@ void CheckLibraries(const TVendorFiles& files, const std::string& root, TLossLog
         for (const std::string& library : folder.fLibraries) {
             const std::string missing = DescribeMissing(AskLoader(library, searchPath));
             if (!missing.empty()) {
-                Enter(losses, folder, library, "the library cannot be loaded: " + missing);
+                Enter(losses, folder, library, ELossKind::kLibrary, "the library cannot be loaded: " + missing);
             }
         }
     }

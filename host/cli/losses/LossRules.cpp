@@ -23,6 +23,7 @@ enum class EClass
 // A line of the plug-in: fBegin, an object, fMiddle, a cause. The sentence is fSubject, the object, fVerb, the cause.
 struct TRule
 {
+    ELossKind fKind;
     const char* fBegin;
     const char* fMiddle;
     const char* fSubject;
@@ -31,41 +32,47 @@ struct TRule
     bool fIsConsequence; // of a file that did not compile, possibly
 };
 
+using EKind = ELossKind;
 constexpr EClass kNone = EClass::kNone;
 constexpr EClass kFirst = EClass::kFirstWord;
 constexpr EClass kLast = EClass::kLastWord;
 
 constexpr TRule kRules[] = {
-    {"TPEGASUSNamespace::GetClass from Pegasus for: ", " returned exception: ", "class ",
+    {EKind::kClass, "TPEGASUSNamespace::GetClass from Pegasus for: ", " returned exception: ", "class ",
      " could not be fetched: ", kFirst, true},
-    {"Catching exeption: AllocateClass  --- ", "\twith reason: ", "class ", " could not be built: ", kFirst, true},
-    {"Get Instances for: ", " returned ConnectionTimeoutException: ", "instances of ",
+    {EKind::kClass, "Catching exeption: AllocateClass  --- ", "\twith reason: ", "class ",
+     " could not be built: ", kFirst, true},
+    {EKind::kInstancesLate, "Get Instances for: ", " returned ConnectionTimeoutException: ", "instances of ",
      " could not be fetched in time: ", kFirst, false},
-    {"DEBUG1:TPEGASUSClass::EnumerateInstances from Pegasus for: ", " returned exception: ", "instances of ",
-     " could not be fetched: ", kFirst, true},
-    {"TPEGASUSClass::EnumerateInstances from Pegasus for: ", " returned exception: ", "instances of ",
-     " could not be fetched: ", kFirst, false},
-    {"TPEGASUSClass:EnumerateInstances. NSP :", "with pegasus exeption: ", "instances could not be fetched, ", ": ",
-     kLast, true},
-    {"DEBUG3:TPEGASUSClass::EI Error from Pegasus for: ", " returned exception: ", "an instance could not be built, ",
-     ": ", kFirst, false},
-    {"DEBUG2:TPEGASUSClass::EI VRX Error for: ", "", "an instance could not be built, ", "", kFirst, false},
-    {"TPEGASUSClass::Initialize - Unable to retrieve qualifier: ", "\tdetail: ", "qualifier ",
-     " could not be fetched: ", kNone, false},
-    {"- error when Adding Qualifiers for class: ", "\tdetail: ", "qualifiers of class ",
-     " could not be added: ", kFirst, false},
-    {" - error when Adding Qualifiers for property: ", "\tdetail: ", "qualifiers of property ",
-     " could not be added: ", kNone, false},
-    {" - error when Adding Qualifiers for method: ", "\tdetail: ", "qualifiers of method ",
-     " could not be added: ", kNone, false},
-    {"TPEGASUSProvider::EnumerateClassesProvided catch exection : ", "", "a class could not be listed: ", "", kNone,
+    {EKind::kInstances, "DEBUG1:TPEGASUSClass::EnumerateInstances from Pegasus for: ", " returned exception: ",
+     "instances of ", " could not be fetched: ", kFirst, true},
+    {EKind::kInstances, "TPEGASUSClass::EnumerateInstances from Pegasus for: ", " returned exception: ",
+     "instances of ", " could not be fetched: ", kFirst, false},
+    {EKind::kInstances, "TPEGASUSClass:EnumerateInstances. NSP :", "with pegasus exeption: ",
+     "instances could not be fetched, ", ": ", kLast, true},
+    {EKind::kInstances, "DEBUG3:TPEGASUSClass::EI Error from Pegasus for: ", " returned exception: ",
+     "an instance could not be built, ", ": ", kFirst, false},
+    {EKind::kInstances, "DEBUG2:TPEGASUSClass::EI VRX Error for: ", "", "an instance could not be built, ", "", kFirst,
      false},
+    {EKind::kClass, "TPEGASUSClass::Initialize - Unable to retrieve qualifier: ", "\tdetail: ", "qualifier ",
+     " could not be fetched: ", kNone, false},
+    {EKind::kClass, "- error when Adding Qualifiers for class: ", "\tdetail: ", "qualifiers of class ",
+     " could not be added: ", kFirst, false},
+    {EKind::kClass, " - error when Adding Qualifiers for property: ", "\tdetail: ", "qualifiers of property ",
+     " could not be added: ", kNone, false},
+    {EKind::kClass, " - error when Adding Qualifiers for method: ", "\tdetail: ", "qualifiers of method ",
+     " could not be added: ", kNone, false},
+    {EKind::kClass, "TPEGASUSProvider::EnumerateClassesProvided catch exection : ", "",
+     "a class could not be listed: ", "", kNone, false},
 };
 
 // Lines of every healthy start: the class list's reader knows neither its root element nor the closing tags, and the
 // adapter tool exists on machines with the adapter alone.
 constexpr char kDescription[] = "Performance Data RDD Parser line ";
 const char* const kHealthyMessages[] = {":Unrecognized identifier:vrx", ":Unrecognized identifier"};
+
+// What the server's log and the MOF compiler say of a text or a call that another server refuses.
+constexpr char kTrap[] = "works here, fails on OpenPegasus 2.14: ";
 
 bool BeginsWith(const std::string& text, const std::string& begin)
 {
@@ -134,8 +141,7 @@ std::optional<TLoss> Apply(const TRule& rule, const std::string& line)
     const std::string object = OneLine(line.substr(begin, split - begin));
     const std::string className = ClassIn(object, rule.fClass);
     const std::string cause = split < line.size() ? OneLine(line.substr(split + middle.size())) : "";
-    TLoss loss;
-    loss.fBegin = rule.fSubject;
+    TLoss loss = LossOf(rule.fKind, rule.fSubject);
     loss.fObjects = {object};
     loss.fEnd = rule.fVerb + WithoutName(cause, className);
     if (!className.empty()) {
@@ -152,16 +158,56 @@ std::string Cause(const NKOLVRX20::TFailedProgram& program)
 }
 
 // ".../provider/linux/x.properties.mof" belongs to the vendor "linux".
+std::string VendorOfFile(const std::filesystem::path& file)
+{
+    const bool isOfVendor = file.parent_path().parent_path().filename() == "provider";
+    return isOfVendor ? file.parent_path().filename().string() : "";
+}
+
 TLoss LossOfCompilation(const NKOLVRX20::TFailedProgram& program)
 {
     const std::filesystem::path file = program.fArguments.empty() ? "" : program.fArguments.back();
-    const std::string folder = file.parent_path().parent_path().filename();
-    const std::string vendor = folder == "provider" ? file.parent_path().filename().string() : "";
-    TLoss loss = LossOf("MOF file " + file.string() + (vendor.empty() ? "" : " of vendor " + vendor) +
-                        " did not compile, cimmof: " + Cause(program));
+    const std::string vendor = VendorOfFile(file);
+    TLoss loss = LossOf(EKind::kSchema, "MOF file " + file.string() + (vendor.empty() ? "" : " of vendor " + vendor) +
+                                            " did not compile, cimmof: " + Cause(program));
     loss.fVendor = vendor;
     loss.fFile = file;
     loss.fIsCause = !vendor.empty();
+    return loss;
+}
+
+// What the plug-in finds in class lists and in the classes that they name.
+std::optional<TLoss> LossOfListedClass(const std::string& line)
+{
+    static const std::regex kName("TPEGASUSNamespace::CollectClass failed: the class name \"(.*)\" in (.*) is invalid");
+    static const std::regex kTimeout(
+        "TPEGASUSNamespace::CollectClass: the timeout of class (.*) in (.*) is not a number "
+        "of seconds up to ([0-9]+): \"(.*)\" becomes ([0-9]+ ms)");
+    static const std::regex kEmbedded("Not supported type of property (\\S+) in class (\\S+): [0-9]+, default to "
+                                      "string\\.");
+    std::smatch found;
+    TLoss loss;
+    if (std::regex_match(line, found, kName)) {
+        loss = LossOf(EKind::kClassName, "the class name \"" + found[1].str() + "\" is invalid");
+        loss.fFile = found[2];
+        loss.fVendor = VendorOfFile(loss.fFile);
+        loss.fClasses = {found[1]};
+    } else if (std::regex_match(line, found, kTimeout)) {
+        loss = LossOf(EKind::kTimeout, "the timeout of class " + found[1].str() + " is \"" + found[4].str() +
+                                           "\", which is not a number of seconds up to " + found[3].str() +
+                                           ", and becomes " + found[5].str());
+        loss.fFile = found[2];
+        loss.fVendor = VendorOfFile(loss.fFile);
+        loss.fClasses = {found[1]};
+        loss.fIsNote = true;
+    } else if (std::regex_match(line, found, kEmbedded)) {
+        loss = LossOf(EKind::kEmbeddedObject, "an embedded object is shown as text: ");
+        loss.fObjects = {found[2].str() + "." + found[1].str()};
+        loss.fClasses = {found[2]};
+        loss.fIsNote = true;
+    } else {
+        return std::nullopt;
+    }
     return loss;
 }
 
@@ -169,6 +215,9 @@ TLoss LossOfCompilation(const NKOLVRX20::TFailedProgram& program)
 
 std::optional<TLoss> LossOfLine(const std::string& line)
 {
+    if (auto loss = LossOfListedClass(line)) {
+        return loss;
+    }
     for (const TRule& rule : kRules) {
         if (auto loss = Apply(rule, line)) {
             return loss;
@@ -189,15 +238,34 @@ bool IsHarmless(const std::string& errorLine)
                        [&errorLine](const char* message) { return EndsWith(errorLine, message); });
 }
 
+std::vector<TLoss> NotesOfCompiler(const std::string& text)
+{
+    static const std::regex kWarning("(?:.*: )?(/[^:]*):([0-9]+):([0-9]+): warning: " + std::string(kTrap) + "(.*)");
+    std::vector<TLoss> notes;
+    std::istringstream lines(text.find(kTrap) == std::string::npos ? "" : text);
+    for (std::string line; std::getline(lines, line);) {
+        std::smatch found;
+        if (std::regex_match(line, found, kWarning)) {
+            TLoss note = LossOf(EKind::kMofPortability, "line " + found[2].str() + ", column " + found[3].str() +
+                                                            ": fails on OpenPegasus 2.14: " + found[4].str());
+            note.fFile = found[1];
+            note.fVendor = VendorOfFile(note.fFile);
+            note.fIsNote = true;
+            notes.push_back(std::move(note));
+        }
+    }
+    return notes;
+}
+
 std::optional<TLoss> NoteOfServerLine(const TServerLogLine& line)
 {
-    static const std::string kTrap = "works here, fails on OpenPegasus 2.14: ";
     const std::size_t begin = line.fText.find(kTrap);
     if (begin == std::string::npos) {
         return std::nullopt;
     }
-    TLoss note = LossOf("provider module " + line.fModule +
-                        " does what fails on OpenPegasus 2.14: " + line.fText.substr(begin + kTrap.size()));
+    TLoss note = LossOf(EKind::kProviderPortability,
+                        "provider module " + line.fModule +
+                            " does what fails on OpenPegasus 2.14: " + line.fText.substr(begin + sizeof kTrap - 1));
     note.fIsNote = true;
     return note;
 }
@@ -212,6 +280,7 @@ std::optional<TLoss> LossOfServerLine(const TServerLogLine& line)
     }
     const bool isUnknown = found[1].matched;
     TLoss loss;
+    loss.fKind = isUnknown ? EKind::kUndeclaredProperty : EKind::kPropertyType;
     loss.fClasses = {isUnknown ? found[1] : found[4]};
     loss.fProperty = isUnknown ? found[2] : found[3];
     loss.fBegin = "property " + loss.fProperty + " of class " + loss.fClasses.front();
@@ -231,7 +300,7 @@ std::optional<TLoss> LossOfProgram(const NKOLVRX20::TFailedProgram& program, con
         return LossOfCompilation(program);
     }
     if (IsServerStart(program)) {
-        return LossOf("the server did not start, cimserver: " + Cause(program));
+        return LossOf(EKind::kServer, "the server did not start, cimserver: " + Cause(program));
     }
     if (program.fName == "cimserver") // a server that does not run cannot be stopped
     {
@@ -244,14 +313,15 @@ std::optional<TLoss> LossOfProgram(const NKOLVRX20::TFailedProgram& program, con
     // An adapter tool that only machines with the adapter have.
     if (program.fName == "bcu") {
         return std::filesystem::exists(root + "/pegasus/provider/brocade")
-                   ? std::optional(LossOf("provider brocade is disabled, bcu: " + Cause(program)))
+                   ? std::optional(
+                         LossOf(EKind::kServerProgram, "provider brocade is disabled, bcu: " + Cause(program)))
                    : std::nullopt;
     }
     std::string command = program.fName;
     for (const std::string& argument : program.fArguments) {
         command += " " + argument;
     }
-    return LossOf(command + " failed: " + Cause(program));
+    return LossOf(EKind::kServerProgram, command + " failed: " + Cause(program));
 }
 
 } // namespace vrxhost

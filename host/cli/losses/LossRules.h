@@ -7,6 +7,7 @@
 
 #include <optional>
 #include <string>
+#include <vector>
 
 namespace vrxhost {
 
@@ -19,6 +20,10 @@ bool IsHarmless(const std::string& errorLine);
 
 // Returns: the loss that the server's log reports: a value that a provider set and the class refused.
 std::optional<TLoss> LossOfServerLine(const TServerLogLine& line);
+
+// Returns: a note for each warning of the MOF compiler about a text that another server refuses.
+// text: a line of the plug-in's log, which holds what the compiler printed, line feeds included.
+std::vector<TLoss> NotesOfCompiler(const std::string& text);
 
 // Returns: the note for a provider that would fail on another server, whose vendor is the caller's to fill in.
 std::optional<TLoss> NoteOfServerLine(const TServerLogLine& line);

@@ -17,6 +17,7 @@ constexpr char kEnumerating[] = "TPEGASUSClass::EnumerateInstances ";
 constexpr char kLostProperty[] = "4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: ";
 // Every message about a class list begins thus.
 constexpr char kDescription[] = "Performance Data RDD Parser line ";
+constexpr char kInvalidName[] = "PEGASUS: CIM name '";
 constexpr char kUnknownName[] = ":Unrecognized ";
 constexpr std::size_t kMaxServerLines = 3; // the last ones, of each loss
 
@@ -66,10 +67,15 @@ void TLossLog::Learn(EVRXLogSeverity severity, const std::string& text)
     if (LearnFromAttempt(text) || LearnFromProperty(text)) {
         return;
     }
+    for (const TLoss& note : NotesOfCompiler(text)) {
+        Enter(note);
+    }
     if (BeginsWith(text, kLoading)) {
         fLoadedFile = text.substr(sizeof kLoading - 1);
     } else if (const auto loss = LossOfLine(text)) {
-        Enter(*loss);
+        LearnFromRule(*loss);
+    } else if (BeginsWith(text, kInvalidName) && fHasInvalidName) {
+        return; // the line of the class list has said so
     } else if (severity != kError || IsHarmless(text)) {
         return;
     } else if (!BeginsWith(text, kDescription)) {
@@ -79,11 +85,21 @@ void TLossLog::Learn(EVRXLogSeverity severity, const std::string& text)
     }
 }
 
+// A superclass's embedded objects are the vendor's as soon as a class of a list has them.
+void TLossLog::LearnFromRule(const TLoss& loss)
+{
+    if (loss.fKind == ELossKind::kEmbeddedObject && !fVendors.FindClass(loss.fClasses.front())) {
+        return;
+    }
+    fHasInvalidName |= loss.fKind == ELossKind::kClassName;
+    Enter(loss);
+}
+
 // Names that the class list's reader does not know may be for readers of a later version.
 void TLossLog::LearnFromDescription(const std::string& text)
 {
-    TLoss loss;
-    loss.fBegin = "class list " + fLoadedFile + ", line " + text.substr(sizeof kDescription - 1);
+    TLoss loss =
+        LossOf(ELossKind::kClassList, "class list " + fLoadedFile + ", line " + text.substr(sizeof kDescription - 1));
     loss.fIsNote = text.find(kUnknownName) != std::string::npos;
     Enter(loss);
 }
@@ -100,6 +116,7 @@ bool TLossLog::LearnFromProperty(const std::string& text)
         return false;
     }
     TLoss loss;
+    loss.fKind = ELossKind::kInstances;
     loss.fProperty = text.substr(sizeof kLostProperty - 1);
     loss.fBegin = "property " + loss.fProperty;
     if (!fEnumeratedClass.empty()) {
@@ -178,7 +195,7 @@ void TLossLog::StartOver()
 {
     const std::lock_guard<std::mutex> lock(fMutex);
     fHeldBack.reset();
-    fStartFailed = fNoServer = fForeignServer = false;
+    fStartFailed = fNoServer = fForeignServer = fHasInvalidName = false;
     fLosses.clear();
     fKnown.clear();
 }

@@ -62,6 +62,7 @@ class TLossLog : public NKOLVRX20::ILogger
     void Enter(const std::string& sentence);
     void Enter(const TLoss& loss);
     void Learn(EVRXLogSeverity severity, const std::string& text);
+    void LearnFromRule(const TLoss& loss);
     void LearnFromPrograms();
     bool LearnFromAttempt(const std::string& text);
     void LearnFromDescription(const std::string& text);
@@ -79,7 +80,8 @@ class TLossLog : public NKOLVRX20::ILogger
     bool fNoServer = false;
     bool fForeignServer = false;
     bool fFrozen = false;
-    std::vector<TLoss> fLosses; // as they came
+    bool fHasInvalidName = false; // of a class list, which ends the start
+    std::vector<TLoss> fLosses;   // as they came
     std::set<std::string> fKnown;
 };
 

@@ -103,10 +103,10 @@ void TRegistrationCheck::CheckFolders()
         if (folder.fHasClassList || !(hasMof || folder.fHasLibrary)) {
             continue;
         }
-        TLoss loss;
+        TLoss loss = LossOf(ELossKind::kNoClassList,
+                            "the folder has no class list (*.classes.xml), so that nothing of it is shown");
         loss.fVendor = folder.fName;
         loss.fFile = folder.fPath;
-        loss.fBegin = "the folder has no class list (*.classes.xml), so that nothing of it is shown";
         loss.fIsNote = !hasMof;
         fLosses.Add(loss);
     }
@@ -154,15 +154,15 @@ void TRegistrationCheck::CheckClass(const TClassList& list, const std::string& n
     }
     const TVendorFolder* const folder = fFiles.FindFolder(list.fVendor);
     if (!elsewhere.empty()) {
-        EnterLoss(list, name,
+        EnterLoss(list, name, ELossKind::kOtherNamespace,
                   ": asked for in namespace " + list.fNamespace + " (<nsp>), but a provider is registered for it in " +
-                      elsewhere,
-                  false);
+                      elsewhere);
     } else if (folder && !folder->fHasRegistration) {
-        EnterLoss(list, name, ": no provider, because the folder has no registration file (*.registration.mof)", false);
+        EnterLoss(list, name, ELossKind::kNoRegistration,
+                  ": no provider, because the folder has no registration file (*.registration.mof)");
     } else {
-        EnterLoss(list, name,
-                  ": no provider, because no PG_ProviderCapabilities instance of a registration file names it", true);
+        EnterLoss(list, name, ELossKind::kNoCapabilities,
+                  ": no provider, because no PG_ProviderCapabilities instance of a registration file names it");
     }
 }
 
@@ -186,17 +186,18 @@ bool TRegistrationCheck::IsRegisteredForSubclass(const TClassList& list, const s
     return false;
 }
 
-void TRegistrationCheck::EnterLoss(const TClassList& list, const std::string& name, const std::string& end,
-                                   bool isConsequence)
+void TRegistrationCheck::EnterLoss(const TClassList& list, const std::string& name, ELossKind kind,
+                                   const std::string& end)
 {
     TLoss loss;
+    loss.fKind = kind;
     loss.fVendor = list.fVendor;
     loss.fFile = list.fPath;
     loss.fBegin = "class ";
     loss.fObjects = {name};
     loss.fEnd = end;
     loss.fClasses = {name};
-    loss.fIsConsequence = isConsequence;
+    loss.fIsConsequence = kind == ELossKind::kNoCapabilities; // possibly, of a file that did not compile
     fLosses.Add(loss);
 }
 

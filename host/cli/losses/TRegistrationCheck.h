@@ -44,7 +44,7 @@ class TRegistrationCheck
     void CheckClasses(const std::vector<TProviderRecord>& providers);
     void CheckClass(const TClassList& list, const std::string& name);
     bool IsRegisteredForSubclass(const TClassList& list, const std::string& name);
-    void EnterLoss(const TClassList& list, const std::string& name, const std::string& end, bool isConsequence);
+    void EnterLoss(const TClassList& list, const std::string& name, ELossKind kind, const std::string& end);
 
     NKOLVRX20::ICIMNamespace& fNamespace;
     const TVendorFiles& fFiles;

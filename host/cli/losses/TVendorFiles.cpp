@@ -77,13 +77,6 @@ template <typename Entry> void SortByName(std::vector<Entry>& entries, std::stri
               [name](const Entry& left, const Entry& right) { return left.*name < right.*name; });
 }
 
-bool IsCimName(const std::string& name)
-{
-    const auto isPart = [](unsigned char c) { return c == '_' || std::isalnum(c) != 0; };
-    return std::all_of(name.begin(), name.end(), isPart) &&
-           (name.empty() || std::isdigit(static_cast<unsigned char>(name.front())) == 0);
-}
-
 } // namespace
 
 // The plug-in's own rules: two kinds of classes have timeouts of their own, whatever their vendors say.
@@ -152,18 +145,6 @@ const TVendorFolder* TVendorFiles::FindFolder(const std::string& name) const
     const auto found = std::find_if(fFolders.begin(), fFolders.end(),
                                     [&name](const TVendorFolder& folder) { return folder.fName == name; });
     return found == fFolders.end() ? nullptr : &*found;
-}
-
-std::string TVendorFiles::DescribeInvalidName() const
-{
-    for (const TClassList& list : fClassLists) {
-        for (const std::string& name : list.fClasses) {
-            if (!IsCimName(name)) {
-                return "vendor " + list.fVendor + ", " + list.fPath + ": the class name \"" + name + "\" is invalid";
-            }
-        }
-    }
-    return "";
 }
 
 } // namespace vrxhost

@@ -52,9 +52,6 @@ class TVendorFiles
     const TClassList* FindClass(const std::string& name) const;
     const TVendorFolder* FindFolder(const std::string& name) const;
 
-    // Returns: the first name of a list that is an invalid CIM name, as a sentence; empty when all are valid.
-    std::string DescribeInvalidName() const;
-
   private:
     std::vector<TVendorFolder> fFolders; // in the order of their names
     std::vector<TClassList> fClassLists;

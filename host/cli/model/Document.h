@@ -119,11 +119,12 @@ struct TInvocation
     std::vector<TPropertyRecord> fOutputs;
 };
 
-// What a doctor found out about a part: the tree, the server, a vendor.
+// What a doctor found out about a part: the tree, the server, a vendor, a class.
 struct TCheck
 {
     std::string fSubject;
     bool fIsOk = false;
+    bool fIsNote = false; // well, and worth a look
     std::string fText;
     std::string fAdvice;           // what to do
     std::vector<std::string> fLog; // the server's lines about it

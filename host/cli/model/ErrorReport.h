@@ -2,18 +2,19 @@
 // What went wrong, as text: what an exception says, what an unknown name may have meant, and how the user hears of it.
 #pragma once
 
+#include "host/cli/model/Loss.h"
+
 #include <functional>
-#include <stdexcept>
 #include <string>
 #include <vector>
 
 namespace vrxhost {
 
 // What a command asks for does not exist: a sentence.
-class TRequestError : public std::runtime_error
+class TRequestError : public TFailure
 {
   public:
-    using std::runtime_error::runtime_error;
+    using TFailure::TFailure;
 };
 
 // Writes a sentence of the host's own to standard error, after "vrxhost: ".

@@ -12,11 +12,23 @@ std::string JoinNames(const std::vector<std::string>& names)
     return joined;
 }
 
-TLoss LossOf(const std::string& sentence)
+TLoss LossOf(ELossKind kind, const std::string& sentence)
 {
     TLoss loss;
+    loss.fKind = kind;
     loss.fBegin = sentence;
     return loss;
+}
+
+TLoss LossOf(const std::string& sentence)
+{
+    return LossOf(ELossKind::kOther, sentence);
+}
+
+TLoss LossOf(const std::exception& failure)
+{
+    const auto* const known = dynamic_cast<const TFailure*>(&failure);
+    return LossOf(known ? known->GetKind() : ELossKind::kOther, failure.what());
 }
 
 std::string TLoss::GetText() const

@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "host/cli/model/LossKind.h"
+
+#include <stdexcept>
 #include <string>
 #include <vector>
 
@@ -9,6 +12,8 @@ namespace vrxhost {
 // Something that is missing from the document, or a note about something that may be: a sentence and what it is about.
 struct TLoss
 {
+    ELossKind fKind = ELossKind::kOther;
+
     // The sentence is fBegin, the objects, fEnd. Losses that differ in the objects alone have one cause.
     std::string fBegin;
     std::vector<std::string> fObjects;
@@ -28,8 +33,23 @@ struct TLoss
     std::string GetText() const;
 };
 
+// Why something cannot be done, as a sentence.
+class TFailure : public std::runtime_error
+{
+  public:
+    TFailure(ELossKind kind, const std::string& sentence) : std::runtime_error(sentence), fKind(kind) {}
+    explicit TFailure(const std::string& sentence) : TFailure(ELossKind::kOther, sentence) {}
+
+    ELossKind GetKind() const { return fKind; }
+
+  private:
+    ELossKind fKind;
+};
+
 // Returns: a loss that is a sentence alone.
+TLoss LossOf(ELossKind kind, const std::string& sentence);
 TLoss LossOf(const std::string& sentence);
+TLoss LossOf(const std::exception& failure);
 
 // Returns: the names, separated by commas.
 std::string JoinNames(const std::vector<std::string>& names);

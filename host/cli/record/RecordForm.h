@@ -15,7 +15,7 @@
 //       instance     PATH
 //         value      NAME VALUE
 //     served         COUNT MILLISECONDS
-//   loss             FLAGS BEGIN END VENDOR FILE PROPERTY
+//   loss             FLAGS BEGIN END VENDOR FILE PROPERTY  flags: note, cause, consequence, kind:WORD, each and a blank
 //     about          object|class|log TEXT
 //   log              LINE                                 of the host's log
 //   sum              SUM                                  of all bytes before, at intervals
@@ -42,6 +42,7 @@ namespace vrxhost {
 
 constexpr char kRecordTitle[] = "vrxhost record";
 constexpr int kRecordVersion = 1;
+constexpr char kKindFlag[] = "kind:"; // goes before the word of a loss's kind
 
 constexpr std::size_t kMaxRecordBytes = 256u << 20;
 constexpr std::size_t kMaxRecordLineBytes = 16u << 20;

@@ -234,6 +234,11 @@ void TRecordParser::AddLoss(TRecordFields& fields)
 {
     TLoss loss;
     const std::string flags = fields.Next();
+    const std::size_t kind = flags.find(kKindFlag);
+    if (kind != std::string::npos) {
+        const std::size_t word = kind + sizeof kKindFlag - 1;
+        loss.fKind = KindOf(flags.substr(word, flags.find(' ', word) - word));
+    }
     loss.fIsNote = flags.find("note ") != std::string::npos;
     loss.fIsCause = flags.find("cause ") != std::string::npos;
     loss.fIsConsequence = flags.find("consequence ") != std::string::npos;

@@ -8,17 +8,16 @@
 
 #include <istream>
 #include <map>
-#include <stdexcept>
 #include <string>
 #include <vector>
 
 namespace vrxhost {
 
 // Why a record is refused, as a sentence that begins with "FILE:LINE: " where a line is at fault.
-class TRecordError : public std::runtime_error
+class TRecordError : public TFailure
 {
   public:
-    using std::runtime_error::runtime_error;
+    using TFailure::TFailure;
 };
 
 // A machine as it was recorded. A record answers no calls of methods.

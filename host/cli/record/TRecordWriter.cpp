@@ -207,7 +207,7 @@ void TRecordWriter::Finish(const TDocument& document)
 void TRecordWriter::WriteLoss(const TLoss& loss)
 {
     const std::string flags = std::string(loss.fIsNote ? "note " : "") + (loss.fIsCause ? "cause " : "") +
-                              (loss.fIsConsequence ? "consequence " : "");
+                              (loss.fIsConsequence ? "consequence " : "") + kKindFlag + WordOf(loss.fKind) + " ";
     Write(Line("loss", flags, loss.fBegin, loss.fEnd, loss.fVendor, loss.fFile, loss.fProperty));
     const std::pair<const char*, const std::vector<std::string>&> lists[] = {
         {"object", loss.fObjects}, {"class", loss.fClasses}, {"log", loss.fLog}};

@@ -318,6 +318,10 @@ boost::shared_ptr<ICIMNamespace> TPEGASUSNamespaceProvider::AllocateNamespace(TC
     if (HasFault("losses")) {
         LogLosses();
     }
+    const std::string fault = TConfig::GetInstance()->getValue("fake.fault");
+    if (fault.rfind("log:", 0) == 0) {
+        Log(ILogger::kInfo, fault.substr(4));
+    }
     if (HasFault("interrupt-program") || HasFault("program-at-shutdown")) {
         ::kill(::getpid(), SIGTERM);
         TOSSpecific::SpawnProcess("tail -f /dev/null", 300);

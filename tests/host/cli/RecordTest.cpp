@@ -190,6 +190,10 @@ TEST_F(Record, LossesAndInterruptionsAreRecorded)
     EXPECT_TRUE(HasStatus(replayed, 3));
     EXPECT_EQ(replayed.fErrorOutput, live.fErrorOutput);
     EXPECT_EQ(replayed.fOutput, live.fOutput);
+    Change(lossy, "served\t1\t", "served\t1\t7654");
+    const auto doctor = Start(Replay(lossy, {"doctor"}));
+    EXPECT_THAT(doctor.fOutput, HasSubstr(" ms (Fake_EveryType 7654")) << "the time of the machine";
+    EXPECT_THAT(doctor.fOutput, HasSubstr("correct the file at that line and column")) << "the kind of the loss";
     const auto stopped = Start(Replay(Make("stopped", "interrupt-enumeration"), {"providers"}));
     EXPECT_TRUE(HasStatus(stopped, 3));
     EXPECT_EQ(stopped.fErrorOutput, "vrxhost: interrupted\n");

@@ -205,6 +205,9 @@ TEST_F(RegistrationTest, ABadRequestedNameEndsTheRegistrationOfAllThatFollow)
     AddProvider("beta", {"BETA_One"});
     const auto ns = fRig.MakeConnectedNamespace(fServer);
     EXPECT_EQ(25U, StatusOf([&] { ns->FindProviders(); }));
+    EXPECT_THAT(fRig.fLog.LinesWith("0|TPEGASUSNamespace::CollectClass"),
+                ElementsAre("0|TPEGASUSNamespace::CollectClass failed: the class name \"1 bad\" in " +
+                            ns->GetProvidersContainer().front()->GetPath() + " is invalid"));
     EXPECT_THAT(ns->GetProvidersContainer(), ::testing::SizeIs(2));
     EXPECT_EQ(nullptr, ns->GetProvidersContainer().back()->getPegClient());
     EXPECT_EQ(0, fServer.Count("GetClass BETA_One"));
