@@ -71,6 +71,9 @@ static const char* arraysOfText(const Env* env)
     CMPIData data = chars->ft->getElementAt(chars, 0, NULL);
     REQUIRE(data.type == CMPI_chars && strcmp(data.value.chars, "x") == 0);
 
+    const CMPIValue string = {.string = env->mb->eft->newString(env->mb, "y", NULL)};
+    REQUIRE(chars->ft->setElementAt(chars, 0, &string, CMPI_string).rc == CMPI_RC_ERR_TYPE_MISMATCH);
+
     const CMPIArray* strings = env->mb->eft->newArray(env->mb, 1, CMPI_string, NULL);
     const CMPIValue text = {.string = env->mb->eft->newString(env->mb, "y", NULL)};
     REQUIRE(strings->ft->setElementAt(strings, 0, &text, CMPI_string).rc == CMPI_RC_OK);

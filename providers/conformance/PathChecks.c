@@ -113,6 +113,20 @@ static const char* missingKeys(const Env* env)
     return NULL;
 }
 
+static const char* keysHaveTypesAndValues(const Env* env)
+{
+    const CMPIObjectPath* path = newPath(env, "TST_Everything");
+    const CMPIValue wide = {.uint64 = 7};
+    const CMPIValue other = {.sint32 = -9};
+    REQUIRE(path->ft->addKey(path, "Number", &wide, CMPI_uint64).rc == CMPI_RC_OK);
+    REQUIRE(path->ft->addKey(path, "Number", &other, CMPI_sint32).rc == CMPI_RC_ERR_INVALID_DATA_TYPE);
+    REQUIRE(path->ft->addKey(path, "Number", (const CMPIValue*)"8", CMPI_chars).rc == CMPI_RC_ERR_INVALID_DATA_TYPE);
+    REQUIRE(path->ft->addKey(path, "Id", &other, CMPI_sint32).rc == CMPI_RC_ERR_INVALID_DATA_TYPE);
+    REQUIRE(path->ft->addKey(path, "Id", NULL, CMPI_string).rc == CMPI_RC_ERR_FAILED);
+    REQUIRE(path->ft->getKeyCount(path, NULL) == 1 && path->ft->getKey(path, "Number", NULL).value.uint64 == 7);
+    return NULL;
+}
+
 static const char* keysHaveNames(const Env* env)
 {
     const CMPIObjectPath* path = newPath(env, "TST_Root");
@@ -157,6 +171,7 @@ const CheckRow kPathChecks[] = {{"paths are always made", pathsAreAlwaysMade, kS
                                 {"keys are wide", keysAreWide, kStandard},
                                 {"types of keys", keyTypes, kStandard},
                                 {"missing keys", missingKeys, kStandard},
+                                {"keys have types and values", keysHaveTypesAndValues, kStandard},
                                 {"keys have names", keysHaveNames, kOursOnly},
                                 {"classes are related", classesAreRelated, kStandard},
                                 {"classes have names", classesHaveNames, kOursOnly},

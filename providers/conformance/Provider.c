@@ -106,6 +106,18 @@ static CMPIStatus returnAfterDone(const CMPIResult* result)
     return kOk;
 }
 
+/* Returns an instance of a class that the MOF has, or lacks. */
+static CMPIStatus returnOther(const CMPIResult* result, const char* className)
+{
+    const CMPIObjectPath* path = gBroker->eft->newObjectPath(gBroker, NS, className, NULL);
+    path->ft->addKey(path, "Id", (const CMPIValue*)"other", CMPI_chars);
+    const CMPIInstance* instance = gBroker->eft->newInstance(gBroker, path, NULL);
+    instance->ft->setProperty(instance, "Id", (const CMPIValue*)"other", CMPI_chars);
+    instance->ft->setProperty(instance, "Text", (const CMPIValue*)"of another class", CMPI_chars);
+    instance->ft->setProperty(instance, "OfLeaf", (const CMPIValue*)"of the leaf", CMPI_chars);
+    return result->ft->returnInstance(result, instance);
+}
+
 /* The message names the properties that were asked for. */
 static CMPIStatus nameProperties(const char** properties)
 {
@@ -123,6 +135,10 @@ static CMPIStatus nameProperties(const char** properties)
 static CMPIStatus enumerate(const CMPIResult* result, const char** properties)
 {
     int number = 0;
+    char className[32];
+    if (sscanf(gMode, "class %31s", className) == 1) {
+        return returnOther(result, className);
+    }
     if (sscanf(gMode, "count %d", &number) == 1) {
         return returnItems(result, number);
     }
@@ -168,7 +184,7 @@ static CMPIStatus tstEnumInstanceNames(CMPIInstanceMI* mi, const CMPIContext* ct
         const CMPIInstance* instance = makeItem(i);
         status = result->ft->returnObjectPath(result, instance->ft->getObjectPath(instance, NULL));
     }
-    return status;
+    return status.rc == CMPI_RC_OK ? result->ft->returnDone(result) : status;
 }
 
 static CMPIStatus tstGetInstance(CMPIInstanceMI* mi, const CMPIContext* ctx, const CMPIResult* result,
@@ -183,7 +199,7 @@ static CMPIStatus tstGetInstance(CMPIInstanceMI* mi, const CMPIContext* ctx, con
     if (strcmp(gMode, "two") == 0) {
         status = returnItem(result, 1);
     }
-    return status;
+    return status.rc == CMPI_RC_OK ? result->ft->returnDone(result) : status;
 }
 
 static CMPIStatus logCleanup(const char* kind, CMPIBoolean terminating)

@@ -167,6 +167,37 @@ TEST_F(Module, PropertyListReachesProviderAndResult)
     }
 }
 
+// A shallow enumeration passes the properties of the class that was asked for: what a provider delivers of a subclass
+// is cut to them, and of a class that nobody declared nothing is left.
+TEST_F(Module, InstancesOfOtherClassesAreCutToTheList)
+{
+    struct Case
+    {
+        const char* mode;
+        bool isListed;
+        std::vector<const char*> properties;
+    };
+    const std::vector<Case> cases{{"class TST_Leaf", false, {"OfLeaf", "Id", "Text", "WithDefault"}},
+                                  {"class TST_Leaf", true, {"Text", "Id"}},
+                                  {"class TST_Unknown", false, {"OfLeaf", "Text", "Id"}},
+                                  {"class TST_Unknown", true, {}}};
+    Array<CIMName> names;
+    names.append(CIMName("Text"));
+    names.append(CIMName("Number"));
+    names.append(CIMName("Id"));
+    load();
+    for (const Case& row : cases) {
+        setMode(row.mode);
+        const CIMInstance item = items(row.isListed ? CIMPropertyList(names) : CIMPropertyList()).at(0);
+        EXPECT_EQ(text(item.getPath().toString()), std::string(row.mode + 6) + ".Id=\"other\"");
+        ASSERT_EQ(item.getPropertyCount(), row.properties.size()) << row.mode;
+        for (Uint32 i = 0; i < item.getPropertyCount(); ++i) {
+            EXPECT_EQ(text(item.getProperty(i).getName().getString()), row.properties[i]) << row.mode;
+        }
+    }
+    EXPECT_THAT(services.logged(), testing::Contains(HasSubstr("class TST_Unknown is not declared in namespace")));
+}
+
 TEST_F(Module, StatusDecidesAndKeepsItsCode)
 {
     load();
@@ -297,14 +328,23 @@ TEST_F(Module, MethodWithoutReturnValueSucceeds)
     EXPECT_EQ(errorOf([&] { invoke("Nope", "X", CIMValue(Uint8{1})); }), "17: Nope");
 }
 
-TEST_F(Module, UnknownPropertyIsLoggedOnce)
+// What a provider passes and the class lacks is logged once.
+TEST_F(Module, NamesThatTheClassLacksAreLoggedOnce)
 {
+    const std::pair<const char*, const char*> rows[] = {
+        {"unknown and mistyped properties", "setProperty: class TST_Everything has no property Nope"},
+        {"missing keys", "addKey: Text is not a key of class TST_Root"},
+        {"missing keys", "addKey: Nope is not a key of class TST_Root"},
+        {"keys have types and values", "addKey: key Number of TST_Everything has another type"},
+    };
     load();
-    for (int i = 0; i < 2; ++i) {
-        invoke("Run", "Name", CIMValue(String("unknown and mistyped properties")));
+    for (const auto& [check, line] : rows) {
+        for (int i = 0; i < 2; ++i) {
+            invoke("Run", "Name", CIMValue(String(check)));
+        }
+        const std::vector<std::string> lines = services.logged();
+        EXPECT_EQ(std::count(lines.begin(), lines.end(), line), 1) << line;
     }
-    const std::vector<std::string> lines = services.logged();
-    EXPECT_EQ(std::count(lines.begin(), lines.end(), "setProperty: class TST_Everything has no property Nope"), 1);
 }
 
 // The checks do what OpenPegasus refuses: the log says so once for each kind, and strict providers are refused too.

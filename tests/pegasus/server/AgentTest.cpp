@@ -129,14 +129,16 @@ TEST_F(AgentTest, changesReachTheProviderThatHasThem)
     Array<CIMName> t1;
     t1.append("T1");
     fClient.modifyInstance(kNamespace, instance, false, CIMPropertyList(t1));
-    const auto valueOf = [&] {
-        const std::string names =
-            "<IPARAMVALUE NAME=\"InstanceName\"><INSTANCENAME CLASSNAME=\"Probe_Bulk\"><KEYBINDING "
-            "NAME=\"Id\"><KEYVALUE>bulk-0000002</KEYVALUE></KEYBINDING></INSTANCENAME></IPARAMVALUE>"
-            "<IPARAMVALUE NAME=\"PropertyName\"><VALUE>T1</VALUE></IPARAMVALUE>";
-        return exchange(fTree.port(), intrinsicRequest("GetProperty", "root/probe", names)).body;
+    const std::string names = "<IPARAMVALUE NAME=\"InstanceName\"><INSTANCENAME CLASSNAME=\"Probe_Bulk\"><KEYBINDING "
+                              "NAME=\"Id\"><KEYVALUE>bulk-0000002</KEYVALUE></KEYBINDING></INSTANCENAME></IPARAMVALUE>"
+                              "<IPARAMVALUE NAME=\"PropertyName\"><VALUE>T1</VALUE></IPARAMVALUE>";
+    const auto ask = [&](const char* method, const std::string& more) {
+        return exchange(fTree.port(), intrinsicRequest(method, "root/probe", names + more)).body;
     };
-    EXPECT_NE(valueOf().find("<IRETURNVALUE>\n<VALUE>changed</VALUE>"), std::string::npos) << valueOf();
+    EXPECT_NE(ask("GetProperty", "").find("<IRETURNVALUE>\n<VALUE>changed</VALUE>"), std::string::npos);
+    const std::string set = ask("SetProperty", "<IPARAMVALUE NAME=\"NewValue\"><VALUE>set</VALUE></IPARAMVALUE>");
+    EXPECT_EQ(set.find("<ERROR"), std::string::npos) << set;
+    EXPECT_NE(ask("GetProperty", "").find("<VALUE>set</VALUE>"), std::string::npos);
     EXPECT_EQ(errorOf([&] { fClient.deleteInstance(kNamespace, path); }),
               "Unrecognized CIM status code \"99\": not this one");
 }
@@ -159,6 +161,7 @@ TEST_F(AgentTest, anUpcallIsServedWhileTheRequestWaits)
     EXPECT_EQ(call(fClient, "Probe_Bulk", "CountByUpcall"), 5u) << "into the agent that makes the call";
     EXPECT_EQ(call(fClient, "Probe_Other", "CountByUpcall"), 5u);
     EXPECT_EQ(call(fClient, "Probe_Bulk", "ChangeByUpcall"), 7u) << "every step";
+    EXPECT_EQ(call(fClient, "Probe_Bulk", "ChangeProvidedByUpcall"), 6u) << "every step, in another module";
 }
 
 TEST_F(AgentTest, anErrorLeavesNothingDelivered)

@@ -279,6 +279,34 @@ static CMPIStatus countByUpcall(const CMPIContext* context, const CMPIResult* re
     return returnNumber(result, count);
 }
 
+/* Creates and changes an instance of a class of another module, which refuses to delete it. The number is that of the
+ * steps that went as expected. */
+static CMPIStatus changeProvidedByUpcall(const CMPIContext* context, const CMPIResult* result,
+                                         const CMPIObjectPath* path)
+{
+    CMPIStatus status = kOk;
+    CMPIUint32 steps = 0;
+    const char* const list[] = {"T1", NULL};
+    CMPIObjectPath* other =
+        gBroker->eft->newObjectPath(gBroker, textOf(path->ft->getNameSpace(path, NULL)), "Probe_Other", NULL);
+    CMPIInstance* instance = gBroker->eft->newInstance(gBroker, other, NULL);
+    setText(instance, "T1", "modified");
+    CMPIObjectPath* made = gBroker->bft->createInstance(gBroker, context, other, instance, &status);
+    if (made == NULL) {
+        return status;
+    }
+    steps += strcmp(textOf(made->ft->getKey(made, "Id", NULL).value.string), "bulk-0001000") == 0;
+    steps += gBroker->bft->modifyInstance(gBroker, context, made, instance, (const char**)list).rc == CMPI_RC_OK;
+    CMPIData data = gBroker->bft->getProperty(gBroker, context, made, "T1", &status);
+    steps += data.type == CMPI_string && strcmp(textOf(data.value.string), "modified") == 0;
+    steps +=
+        gBroker->bft->setProperty(gBroker, context, made, "T1", (const CMPIValue*)"set", CMPI_chars).rc == CMPI_RC_OK;
+    data = gBroker->bft->getProperty(gBroker, context, made, "T1", &status);
+    steps += data.type == CMPI_string && strcmp(textOf(data.value.string), "set") == 0;
+    steps += gBroker->bft->deleteInstance(gBroker, context, made).rc == (CMPIrc)99;
+    return returnNumber(result, steps);
+}
+
 /* Creates, changes and deletes a stored instance. The number is that of the steps that succeeded. */
 static CMPIStatus changeByUpcall(const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path)
 {
@@ -317,9 +345,14 @@ static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, con
     if (strcasecmp(method, "Describe") == 0 || strcasecmp(method, "Undeclared") == 0) {
         return describeArguments(result, in);
     }
-    if (strcasecmp(method, "CountByUpcall") == 0 || strcasecmp(method, "ChangeByUpcall") == 0) {
-        return strcasecmp(method, "CountByUpcall") == 0 ? countByUpcall(context, result, path)
-                                                        : changeByUpcall(context, result, path);
+    if (strcasecmp(method, "CountByUpcall") == 0) {
+        return countByUpcall(context, result, path);
+    }
+    if (strcasecmp(method, "ChangeByUpcall") == 0) {
+        return changeByUpcall(context, result, path);
+    }
+    if (strcasecmp(method, "ChangeProvidedByUpcall") == 0) {
+        return changeProvidedByUpcall(context, result, path);
     }
     if (strcasecmp(method, "Trap") == 0) {
         return trap(context, result, path, in);
