@@ -9,6 +9,9 @@
 
 namespace Pegasus::mof {
 
+// What such a warning begins with.
+inline constexpr char kPortabilityMark[] = "works here, fails on OpenPegasus 2.14: ";
+
 // Reports texts that this compiler accepts and OpenPegasus 2.14's refuses, so that a vendor who develops here learns of
 // them: a warning once per kind and compilation, an error when the check is strict.
 class Portability
@@ -24,7 +27,7 @@ class Portability
             cursor.failAt(offset, "fails on OpenPegasus 2.14: " + kind);
         }
         if (fReported.insert(kind).second) {
-            cursor.warn(offset, "works here, fails on OpenPegasus 2.14: " + kind);
+            cursor.warn(offset, kPortabilityMark + kind);
         }
     }
 

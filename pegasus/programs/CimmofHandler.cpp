@@ -2,6 +2,8 @@
 #include "pegasus/programs/CimmofHandler.h"
 
 #include "pegasus/base/Text.h"
+#include "pegasus/mof/Portability.h"
+#include "pegasus/server/admin/Log.h"
 
 #include <iostream>
 
@@ -118,8 +120,12 @@ bool ServerHandler::createInstance(const CIMInstance& newInstance)
 
 void ServerHandler::warn(const std::string& place, const std::string& text)
 {
-    if (!fHideWarnings) {
-        std::cerr << place << ": warning: " << text << "\n";
+    if (fHideWarnings) {
+        return;
+    }
+    std::cerr << place << ": warning: " << text << "\n";
+    if (text.rfind(mof::kPortabilityMark, 0) == 0) {
+        server::Log::write(server::LogLevel::kWarning, place + ": " + text);
     }
 }
 

@@ -26,7 +26,8 @@ class ServerHandler : public mof::DefinitionHandler
     void declareQualifier(const CIMQualifierDecl& declaration) override;
     bool createClass(const CIMClass& newClass) override;
     bool createInstance(const CIMInstance& newInstance) override;
-    // To standard error.
+    // To standard error. What fails on OpenPegasus 2.14 also goes to the open log: a host that runs the compiler shows
+    // the log, and drops what a compiler prints that succeeds.
     void warn(const std::string& place, const std::string& text) override;
 
   private:

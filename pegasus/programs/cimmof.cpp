@@ -7,6 +7,7 @@
 #include "pegasus/programs/CimmofOptions.h"
 #include "pegasus/server/admin/ConfigFile.h"
 #include "pegasus/server/admin/Daemon.h"
+#include "pegasus/server/admin/Log.h"
 
 #include <functional>
 #include <iostream>
@@ -78,6 +79,7 @@ Status compileIntoServer(const Options& options, const mof::CompileOptions& comp
         std::cerr << "Cannot connect to CIM Server. The CIM Server may not be running.\n";
         return kNoServer;
     }
+    server::Log::open(server::defaultHome(), false);
     ServerHandler handler(client, options.hideWarnings);
     return compileAll(options, compileOptions, handler);
 }

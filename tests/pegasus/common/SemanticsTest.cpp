@@ -202,7 +202,10 @@ TEST(Semantics, EveryRecordedAnswerIsGivenHereToo)
     for (const std::string& each : unknown) {
         std::printf("no evaluator for %s\n", each.c_str());
     }
-    EXPECT_LT(unknown.size() * 2, vectors.size()) << "most operations have no evaluator";
+    // Another folder may ask for operations that have no evaluator yet: those are named above, and the rest is judged.
+    const bool isConfigured = folder == VRX_VECTORS_DIR;
+    EXPECT_EQ(isConfigured ? unknown.size() : 0, 0U) << "of the configured folder every answer is evaluated";
+    EXPECT_GT(passed, 0U) << "nothing could be evaluated";
 }
 
 } // namespace test

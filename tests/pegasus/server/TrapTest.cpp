@@ -2,7 +2,9 @@
 // What works on this server and fails on OpenPegasus 2.14.
 #include "tests/pegasus/server/AgentFixture.h"
 
+#include <fstream>
 #include <map>
+#include <utility>
 
 namespace servertest {
 namespace {
@@ -62,6 +64,43 @@ TEST_F(AgentTest, whatFailsOnOpenPegasusIsReportedOnceOrRefused)
             EXPECT_NE(first, std::string::npos) << line;
             EXPECT_EQ(log.find(line, first + 1), std::string::npos) << "twice: " << line;
         }
+    }
+}
+
+// The compiler's warnings of this kind reach the log with their places, each kind once for a file.
+TEST_F(AgentTest, mofThatFailsOnOpenPegasusIsReported)
+{
+    fTree.start();
+    fTree.compileBase();
+    const std::string first = fTree.home() + "/first.mof";
+    const std::string second = fTree.home() + "/second.mof";
+    std::ofstream(first) << "\xEF\xBB\xBFQualifier EmbeddedInstance : string = null, Scope(property);\n"
+                            "Qualifier Association : boolean = false, Scope(association), Flavor(DisableOverride); "
+                            "Qualifier Key : boolean = false, Scope(property);\n"
+                            "[Association] class L { No ref a; No2 ref b; };\n"
+                            "class X { [EmbeddedInstance(\"No\")] string a; uint32 m(string Ref); };\n"
+                            "#pragma include (\""
+                         << second << "\")\n";
+    std::ofstream(second) << "Class I {};\nclass J { [Key] string k; [EmbeddedInstance(\"I\")] string a; };\n"
+                             "instance of J { k = \"k\"; a = \"instance of I {};\"; };\n";
+    EXPECT_EQ(fTree.run("cimmof", {"-n", "root/portable", "-w", first}).err, "");
+    EXPECT_EQ(fTree.log().find("works here"), std::string::npos) << "warnings are hidden";
+    EXPECT_EQ(fTree.run("cimmof", {"-n", "root/traps", first}).exitStatus, 0);
+    const std::string log = fTree.log();
+    const std::pair<std::string, const char*> rows[] = {
+        {first + ":1:1", "a byte-order mark"},
+        {first + ":3:25", "a reference to a class that is not declared yet"},
+        {first + ":4:36", "EmbeddedInstance of a class that is not declared yet"},
+        {first + ":4:62", "a parameter named Ref"},
+        {first + ":5:18", "an absolute include path"},
+        {second + ":1:1", "the word \"class\" in other letters than small ones"},
+        {second + ":3:30", "an instance with a value of an embedded property"},
+    };
+    for (const auto& [place, kind] : rows) {
+        EXPECT_NE(log.find(" warning: " + place + ": works here, fails on OpenPegasus 2.14: " + kind + "\n"),
+                  std::string::npos)
+            << place << "\n"
+            << log;
     }
 }
 
