@@ -171,7 +171,8 @@ void ResponseReader::readContent(const XmlElement& element)
     fOnContent(element, fDecoder);
     const std::size_t limit = fDecoder.limits().maxDecodedBytes;
     if (fDecoder.decodedBytes() - fBytesBefore > limit) {
-        element.fail(Kind::kTooLarge, "objects of more than " + std::to_string(limit) + " bytes in one answer (maxDecodedBytes)");
+        element.fail(Kind::kTooLarge,
+                     "objects of more than " + std::to_string(limit) + " bytes in one answer (maxDecodedBytes)");
     }
 }
 

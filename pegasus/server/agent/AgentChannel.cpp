@@ -13,12 +13,7 @@ namespace Pegasus::server {
 namespace {
 
 constexpr std::size_t kReadBytes = 128u << 10;
-constexpr std::uint32_t kMaxAnswerHeadBytes = 1u << 20; // the trailer carries the provider's error text
 constexpr unsigned kOk = 200;
-
-// Instances may be of any number: only what surrounds them is bounded.
-constexpr wire::HttpAnswerLimits kAnswerLimits = {kMaxAnswerHeadBytes, kMaxAnswerHeadBytes,
-                                                  std::numeric_limits<std::uint64_t>::max()};
 
 std::string encoded(const std::string& text)
 {
@@ -83,9 +78,11 @@ std::string_view AgentChannel::readMore(std::chrono::milliseconds timeout)
 CimStatus AgentChannel::receive(ElementSink& sink, std::chrono::milliseconds timeout)
 {
     fBuffer.resize(kReadBytes);
+    // Instances may be of any number: only what surrounds them is bounded.
+    const wire::HttpAnswerLimits limits = {fMaxHeadBytes, fMaxHeadBytes, std::numeric_limits<std::uint64_t>::max()};
     // The sink gets the bytes of each chunk as they lie in the buffer: nothing is copied on the way to the client.
     wire::HttpAnswerReader reader(
-        kAnswerLimits, [](const wire::HttpAnswerFields&) {}, [&](std::string_view bytes) { sink.write(bytes); });
+        limits, [](const wire::HttpAnswerFields&) {}, [&](std::string_view bytes) { sink.write(bytes); });
     while (!reader.isComplete()) {
         const std::string_view bytes = readMore(timeout);
         try {

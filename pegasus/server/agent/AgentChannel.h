@@ -4,6 +4,7 @@
 #include "pegasus/server/net/AnswerStream.h"
 #include "pegasus/server/net/CimAnswer.h"
 
+#include <cstdint>
 #include <vector>
 
 namespace Pegasus::server {
@@ -49,7 +50,14 @@ struct AgentRequest
 class AgentChannel
 {
   public:
-    explicit AgentChannel(base::Descriptor socket) : fStream(std::move(socket)) {}
+    // Of the head of an answer, of a chunk's extensions, and of the trailer, which carries the provider's error text.
+    static constexpr std::uint32_t kMaxAnswerHeadBytes = 1u << 20;
+
+    // `maxHeadBytes`: for tests that have little input.
+    explicit AgentChannel(base::Descriptor socket, std::uint32_t maxHeadBytes = kMaxAnswerHeadBytes)
+        : fStream(std::move(socket)), fMaxHeadBytes(maxHeadBytes)
+    {
+    }
 
     // Passes the answer's elements to the sink as they come. Returns: the operation's status.
     // Throws: AgentLost, AgentGone; AgentSilent after silence for `timeout` (0: any time); what the sink throws.
@@ -66,6 +74,7 @@ class AgentChannel
     CimStatus receive(ElementSink& sink, std::chrono::milliseconds timeout);
 
     SocketStream fStream;
+    const std::uint32_t fMaxHeadBytes;
     std::vector<char> fBuffer; // for what is read of the answer
 };
 
