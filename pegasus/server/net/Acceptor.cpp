@@ -41,9 +41,8 @@ void RefusedConnections::expire()
     }
 }
 
-void RefusalLog::note(std::optional<uid_t> user)
+void RefusalLog::note(std::optional<uid_t> user, Clock::time_point now)
 {
-    const auto now = base::Deadline::Clock::now();
     if (now < fNext) {
         ++fUnreported;
         return;

@@ -40,10 +40,12 @@ class RefusedConnections
 class RefusalLog
 {
   public:
-    void note(std::optional<uid_t> user);
+    using Clock = base::Deadline::Clock;
+
+    void note(std::optional<uid_t> user, Clock::time_point now = Clock::now());
 
   private:
-    base::Deadline::Clock::time_point fNext{};
+    Clock::time_point fNext{};
     unsigned fUnreported = 0;
 };
 

@@ -3,17 +3,22 @@
 // changes while it is asked.
 #include "pegasus/base/TcpOwner.h"
 #include "pegasus/server/net/Listener.h"
+#include "tests/support/TemporaryDirectory.h"
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <filesystem>
 #include <fstream>
 #include <functional>
+#include <vector>
 
 #include <arpa/inet.h>
 #include <dlfcn.h>
 #include <netinet/in.h>
+#include <poll.h>
 #include <sys/socket.h>
+#include <sys/un.h>
 #include <unistd.h>
 
 namespace {
@@ -76,6 +81,14 @@ base::Descriptor connectMapped(std::uint16_t port)
         socket.reset();
     }
     return socket;
+}
+
+// Returns: whether the connection stands, or does so within a moment: on the loopback interface the kernel may finish
+// it on another processor.
+bool isConnected(const base::Descriptor& socket)
+{
+    pollfd wait = {socket.get(), POLLOUT, 0};
+    return ::poll(&wait, 1, 500) == 1 && (wait.revents & (POLLERR | POLLHUP)) == 0;
 }
 
 void resetConnection(base::Descriptor& socket)
@@ -178,6 +191,32 @@ TEST_F(PeerTest, aPortThatChangesHandsDuringTheLookUpIsNobodys)
         EXPECT_FALSE(look(fLookup, server.get()));
         ASSERT_TRUE(successor) << "the port did not change hands";
         EXPECT_EQ(fLookup.userOf(accept().get()), ::geteuid()) << "the successor's own connection is served";
+    }
+}
+
+// While the server is busy with others, connections wait: a full queue costs root's client a second and more.
+TEST_F(PeerTest, manyConnectionsWaitToBeAccepted)
+{
+    std::size_t allowed = 0;
+    std::ifstream("/proc/sys/net/core/somaxconn") >> allowed;
+    const std::size_t expected = std::min<std::size_t>(allowed, 600); // descriptors of one process: 1024
+    const test::TemporaryDirectory home;
+    const base::Descriptor local = listenLocally(home.path());
+    sockaddr_un byName = {AF_UNIX, {}};
+    (home.path() + "/cimxml.socket").copy(byName.sun_path, sizeof byName.sun_path - 1);
+    const sockaddr_in byPort = loopback(fPort);
+    const std::pair<const void*, socklen_t> addresses[] = {{&byPort, sizeof byPort}, {&byName, sizeof byName}};
+    for (const auto& [bytes, size] : addresses) {
+        const auto* const address = static_cast<const sockaddr*>(bytes);
+        std::vector<base::Descriptor> clients;
+        while (clients.size() < expected) {
+            clients.emplace_back(::socket(address->sa_family, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0));
+            if (::connect(clients.back().get(), address, size) != 0 && !isConnected(clients.back())) {
+                break;
+            }
+        }
+        EXPECT_EQ(clients.size(), expected) << "family " << address->sa_family;
+        EXPECT_TRUE(clients.empty() || isConnected(clients.back()));
     }
 }
 
