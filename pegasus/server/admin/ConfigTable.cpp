@@ -37,7 +37,7 @@ const std::vector<ConfigProperty>& configTable()
         {"strictOwners", "true", Kind::kBoolean, false,
          "refuse a tree, program or provider library that users other than root and this one can change"},
         {"strictHosts", "true", Kind::kBoolean, true,
-         "refuse requests whose Host or Origin header names another machine: a web page's"},
+         "refuse requests whose Host or Origin header is neither localhost nor a loopback address: a web page's"},
         {"logLevel", "INFORMATION", Kind::kLogLevel, true, "least severity that is logged"},
         {"shutdownTimeout", "3", Kind::kCount, true, "seconds that running requests get at the end"},
         {"idleConnectionTimeout", "0", Kind::kCountOrZero, true,

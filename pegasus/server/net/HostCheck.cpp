@@ -2,11 +2,9 @@
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/server/net/HttpRequest.h"
 
-#include <array>
 #include <cstring>
 
 #include <arpa/inet.h>
-#include <unistd.h>
 
 namespace Pegasus::server {
 
@@ -27,19 +25,12 @@ bool isLoopbackAddress(const std::string& text)
     return IN6_IS_ADDR_LOOPBACK(&six) || (IN6_IS_ADDR_V4MAPPED(&six) && six.s6_addr[12] == kLoopbackNet);
 }
 
-std::string ownHostName()
-{
-    std::array<char, 256> name = {};
-    return ::gethostname(name.data(), name.size() - 1) == 0 ? name.data() : "";
-}
-
-bool isOwnName(std::string_view name)
+bool isLoopbackName(std::string_view name)
 {
     static constexpr std::string_view kBelow = ".localhost"; // reserved: no name server answers for it
     const bool isBelow =
         name.size() > kBelow.size() && base::equalNoCase(name.substr(name.size() - kBelow.size()), kBelow);
-    return isBelow || base::equalNoCase(name, "localhost") || base::equalNoCase(name, "localhost.localdomain") ||
-           base::equalNoCase(name, ownHostName());
+    return isBelow || base::equalNoCase(name, "localhost") || base::equalNoCase(name, "localhost.localdomain");
 }
 
 // Returns: "host" of "host:port" and of "[host]:port"; empty if it is malformed.
@@ -57,16 +48,16 @@ std::string hostOf(std::string_view authority)
     return std::string(authority.substr(isBracketed ? 1 : 0, end - (isBracketed ? 1 : 0)));
 }
 
-bool namesThisMachine(std::string_view authority)
+bool namesLoopback(std::string_view authority)
 {
     const std::string host = hostOf(authority);
-    return !host.empty() && (isLoopbackAddress(host) || isOwnName(host));
+    return !host.empty() && (isLoopbackAddress(host) || isLoopbackName(host));
 }
 
 [[noreturn]] void refuse(const char* header, const std::string& value)
 {
     throw HttpError(403, HttpError::After::kClose, "",
-                    std::string("The ") + header + " header names another machine: " + value);
+                    std::string("The ") + header + " header must be localhost or a loopback address: " + value);
 }
 
 } // namespace
@@ -74,13 +65,13 @@ bool namesThisMachine(std::string_view authority)
 void requireLocalHost(const HttpRequest& http)
 {
     const std::string* host = http.header("Host");
-    if (host != nullptr && !host->empty() && !namesThisMachine(*host)) {
+    if (host != nullptr && !host->empty() && !namesLoopback(*host)) {
         refuse("Host", *host);
     }
     const std::string* origin = http.header("Origin"); // "scheme://host:port" or "null"
     const std::size_t authority = origin != nullptr ? origin->find("://") : std::string::npos;
     if (origin != nullptr &&
-        (authority == std::string::npos || !namesThisMachine(std::string_view(*origin).substr(authority + 3))))
+        (authority == std::string::npos || !namesLoopback(std::string_view(*origin).substr(authority + 3))))
     {
         refuse("Origin", *origin);
     }

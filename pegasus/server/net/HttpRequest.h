@@ -62,9 +62,10 @@ class HttpError : public std::runtime_error
 // Refuses requests that a web page has a browser send: a page can have its own host name resolve to 127.0.0.1, and the
 // browser's connections pass the check of the peer when root or the server's user sits before it.
 //
-// A Host header must name this machine: localhost, localhost.localdomain, a name below .localhost, the machine's host
-// name, or a loopback address (127.0.0.0/8, [::1], [::ffff:127.0.0.0]/104); a port may follow, and an empty one counts
-// as absent. An Origin header, which browsers add, must name such a host too.
+// A Host header must name the loopback interface: localhost, localhost.localdomain, a name below .localhost, or an
+// address (127.0.0.0/8, [::1], [::ffff:127.0.0.0]/104); a port may follow, and an empty one counts as absent. The
+// machine's own name is refused like any other: name servers answer for it. An Origin header, which browsers add, must
+// name such a host too.
 // Throws: HttpError 403. Thread: any.
 void requireLocalHost(const HttpRequest& http);
 

@@ -17,7 +17,7 @@ struct ConnectionSettings
     std::chrono::milliseconds writeTimeout = std::chrono::seconds(20);
     std::size_t maxXmlDepth = 64;
     std::size_t maxBufferedAnswerBytes = 256u << 20;
-    bool strictHosts = false; // whether Host and Origin must name this machine
+    bool strictHosts = false; // whether Host and Origin must name the loopback interface
 };
 
 // Carries out operations.
