@@ -16,11 +16,11 @@ namespace Pegasus::cmpi {
 namespace {
 
 // The object of an upcall: namespace and local path. The namespace defaults to that of the request that the provider
-// serves, which the context carries.
+// serves, which the context carries. The upcall counts as waiting as long as its target lives.
 struct Target
 {
     // Throws: with strict providers also for a thread that was not attached.
-    Target(Broker& owner, const CMPIContext* context, const CMPIObjectPath* target)
+    Target(Broker& owner, const CMPIContext* context, const CMPIObjectPath* target) : nesting(owner.nesting())
     {
         if (Frame::current().origin().broker == nullptr) {
             tolerate(Habit::kNoAttach, owner, std::string());
@@ -37,12 +37,18 @@ struct Target
             }
         }
         path = state.withoutNameSpace();
+        waiting = nesting.begin(nameSpace, className(), Frame::current().origin().depth);
     }
+    ~Target() { nesting.end(waiting); }
+    Target(const Target&) = delete;
+    Target& operator=(const Target&) = delete;
 
     const CIMName& className() const { return path.getClassName(); }
 
     CIMNamespaceName nameSpace;
     CIMObjectPath path;
+    UpcallNesting& nesting;
+    UpcallNesting::Place waiting;
 };
 
 CIMPropertyList listOf(const char** properties)

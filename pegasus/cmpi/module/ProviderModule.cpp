@@ -50,6 +50,14 @@ const String& machineName()
     return kName;
 }
 
+// Reports the habit. Throws: CIMException with strict providers.
+void requireTolerance(Habit habit, Broker& broker, const ProviderRequest& request)
+try {
+    tolerate(habit, broker, request.provider);
+} catch (const CmpiError& error) {
+    throw CIMException(CIM_ERR_FAILED, base::fromUtf8Repaired(error.text));
+}
+
 template <typename Object> Object& asArgument(Object& object)
 {
     object.lifetime = Lifetime::kArgument;
@@ -81,12 +89,17 @@ class Call
   public:
     Call(Broker& owner, ProviderInterfaces& interfaces, const ProviderRequest& request, const CIMObjectPath& target,
          ResultObject& resultObject)
-        : fUse(interfaces), fContext(owner, request), fFrame(fContext.origin),
-          fPath(owner, placed(target, request.nameSpace)), fResult(resultObject)
+
+        : fUse(interfaces),
+          fContext(owner, request, owner.nesting().depthOf(owner.classes(), request.nameSpace, target.getClassName())),
+          fFrame(fContext.origin), fPath(owner, placed(target, request.nameSpace)), fResult(resultObject)
     {
         owner.classes().beginRequest();
         asArgument(fContext);
         asArgument(fPath);
+        if (fContext.origin->depth >= UpcallNesting::kHangs) {
+            requireTolerance(Habit::kNestedUpcalls, owner, request);
+        }
     }
 
     const CMPIContext* context() const { return &fContext; }
@@ -282,17 +295,10 @@ CIMValue ProviderModule::invokeMethod(const ProviderRequest& request, const CIMO
     call.run(mi.ft->invokeMethod, &mi, call.context(), call.result(), call.path(), name.c_str(),
              static_cast<const CMPIArgs*>(&input), static_cast<CMPIArgs*>(&output));
     if (!result.isDone()) {
-        missedReturnDone(request);
+        requireTolerance(Habit::kNoReturnDone, fImpl->broker, request);
     }
     out = output.parameters();
     return returned;
-}
-
-void ProviderModule::missedReturnDone(const ProviderRequest& request)
-try {
-    tolerate(Habit::kNoReturnDone, fImpl->broker, request.provider);
-} catch (const CmpiError& error) {
-    throw CIMException(CIM_ERR_FAILED, base::fromUtf8Repaired(error.text));
 }
 
 ProviderModule::Cleanup ProviderModule::cleanupWhenIdle()

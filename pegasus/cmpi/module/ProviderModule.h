@@ -80,7 +80,6 @@ class ProviderModule
   private:
     void enumerate(const ProviderRequest& request, const CIMName& className, PropertyFilter& filter,
                    ResultObject& result);
-    void missedReturnDone(const ProviderRequest& request);
 
     class Impl;
     std::unique_ptr<Impl> fImpl;

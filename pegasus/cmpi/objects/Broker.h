@@ -3,6 +3,7 @@
 
 #include "pegasus/cmpi/services/BrokerServices.h"
 #include "pegasus/cmpi/services/SchemaCache.h"
+#include "pegasus/cmpi/services/UpcallNesting.h"
 
 #include <cmpi/cmpi.h>
 
@@ -34,6 +35,7 @@ class Broker final : public CMPIBroker
 
     BrokerServices& services() const { return fServices; }
     SchemaCache& classes() { return fClasses; }
+    UpcallNesting& nesting() { return fNesting; }
 
     // Logs a provider's mistake the first time only, since providers repeat theirs for every instance. The number of
     // remembered warnings is bounded; beyond it, new mistakes stay unlogged.
@@ -47,6 +49,7 @@ class Broker final : public CMPIBroker
   private:
     BrokerServices& fServices;
     SchemaCache fClasses;
+    UpcallNesting fNesting;
     std::mutex fMutex; // guards fWarnings
     std::unordered_set<std::string> fWarnings;
 };

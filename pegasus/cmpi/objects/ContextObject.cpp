@@ -48,7 +48,7 @@ ContextObject::ContextObject(Broker& owner) : CMPIContext{nullptr, &kContextTabl
     hdl = this;
 }
 
-ContextObject::ContextObject(Broker& owner, const ProviderRequest& request) : ContextObject(owner)
+ContextObject::ContextObject(Broker& owner, const ProviderRequest& request, unsigned depth) : ContextObject(owner)
 {
     const Uint32 flags = (request.includeQualifiers ? CMPI_FLAG_IncludeQualifiers : 0U) |
                          (request.includeClassOrigin ? CMPI_FLAG_IncludeClassOrigin : 0U);
@@ -57,7 +57,7 @@ ContextObject::ContextObject(Broker& owner, const ProviderRequest& request) : Co
     values.append(CIMName(CMPIAcceptLanguage), CIMValue(request.acceptLanguages));
     values.append(CIMName(CMPIInitNameSpace), CIMValue(request.nameSpace.getString()));
     values.append(CIMName(CMPIRole), CIMValue(String())); // this server has no roles
-    origin = std::make_shared<const CallOrigin>(CallOrigin{&owner, request.provider, request.nameSpace});
+    origin = std::make_shared<const CallOrigin>(CallOrigin{&owner, request.provider, request.nameSpace, depth});
 }
 
 std::string ContextObject::text(const char* name) const

@@ -15,7 +15,8 @@ class ContextObject final : public Owned, public CMPIContext
   public:
     // An empty context, for factories and cleanup functions.
     explicit ContextObject(Broker& owner);
-    ContextObject(Broker& owner, const ProviderRequest& request);
+    // `depth`: of the call, as UpcallNesting counts.
+    ContextObject(Broker& owner, const ProviderRequest& request, unsigned depth);
     ContextObject(const ContextObject& other) : ContextObject(other.broker)
     {
         values = other.values;

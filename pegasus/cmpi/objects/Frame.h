@@ -29,6 +29,7 @@ struct CallOrigin
     Broker* broker = nullptr; // null: outside of a request
     std::string provider;
     CIMNamespaceName nameSpace;
+    unsigned depth = 0; // in upcalls of the module's own
 };
 
 // Base of everything that a frame can free.

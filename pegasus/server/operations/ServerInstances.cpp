@@ -63,8 +63,8 @@ CIMInstance ServerInstances::get(const CIMObjectPath& path, const CIMPropertyLis
 void requireChangeable(ServerCore& core, const CIMNamespaceName& nameSpace, const CIMName& className)
 {
     if (ProviderRegistry::isRegistration(nameSpace, className)) {
-        throw CIMException(CIM_ERR_NOT_SUPPORTED, className.getString() +
-                                                      String(": a registration is created and deleted, not changed"));
+        throw CIMException(CIM_ERR_NOT_SUPPORTED,
+                           className.getString() + String(": a registration is created and deleted, not changed"));
     }
     if (ServerInstances::find(core, nameSpace, className)) {
         throw CIMException(CIM_ERR_NOT_SUPPORTED, className.getString());

@@ -355,6 +355,7 @@ TEST_F(Module, ReportsWhatFailsOnOpenPegasus)
         {"elements without value are null", "setElementAt without a value is refused"},
         {"untyped nulls are taken", "a null value of type CMPI_null is refused"},
         {"text is repaired", "text that is not UTF-8 is sent as it is"},
+        {"upcalls nest", "upcalls into the own module, nested three deep"},
     };
     load();
     const auto run = [&](const char* check) {

@@ -127,6 +127,21 @@ static CMPIStatus noAttach(const Trap* trap)
     return *(CMPIStatus*)returned;
 }
 
+/* Calls itself through the server as often as the digit says. */
+static CMPIStatus nested(const Trap* trap, char digit)
+{
+    char kind[] = "nested 0";
+    CMPIStatus status = {CMPI_RC_OK, NULL};
+    if (digit == '0') {
+        return status;
+    }
+    kind[sizeof kind - 2] = (char)(digit - 1);
+    CMPIArgs* in = trap->mb->eft->newArgs(trap->mb, NULL);
+    in->ft->addArg(in, "Kind", (const CMPIValue*)kind, CMPI_chars);
+    trap->mb->bft->invokeMethod(trap->mb, trap->context, trap->path, "Trap", in, NULL, &status);
+    return status;
+}
+
 static const struct
 {
     const char* kind;
@@ -153,6 +168,9 @@ CMPIStatus doTrap(const CMPIBroker* broker, const CMPIContext* context, const CM
     const char* nameSpace = (const char*)path->ft->getNameSpace(path, NULL)->hdl;
     Trap trap = {broker, context, path, broker->eft->newObjectPath(broker, nameSpace, "Probe_Trap", NULL), NULL};
     trap.instance = broker->eft->newInstance(broker, trap.own, NULL);
+    if (strncmp(kind, "nested ", 7) == 0) {
+        return nested(&trap, kind[7]);
+    }
     for (size_t i = 0; i < sizeof kTraps / sizeof kTraps[0]; ++i) {
         if (strcmp(kTraps[i].kind, kind) == 0) {
             return kTraps[i].spring(&trap);

@@ -30,6 +30,7 @@ TEST_F(AgentTest, whatFailsOnOpenPegasusIsReportedOnceOrRefused)
         {"half surrogate", "half of a surrogate pair"},
         {"no returnDone", "a method that ends without returnDone"},
         {"no attach", "an upcall of a thread without attachThread"},
+        {"nested 3", "upcalls into the own module, nested three deep"},
     };
     for (const bool strict : {false, true}) {
         SCOPED_TRACE(strict ? "strict" : "kind");
@@ -55,6 +56,7 @@ TEST_F(AgentTest, whatFailsOnOpenPegasusIsReportedOnceOrRefused)
             EXPECT_EQ(first.find(reported) != std::string::npos, strict && kind != "no attach")
                 << kind << ": " << first;
         }
+        EXPECT_EQ(spring("nested 2"), "no error");
         const std::string log = tree.log();
         for (const auto& [kind, reported] : traps) {
             const std::string who = kind == "no attach" ? "" : "provider Probe: "; // such a thread has no provider

@@ -2,6 +2,7 @@
 #include "tests/pegasus/cmpi/replay/KnownDifferences.h"
 
 #include <algorithm>
+#include <optional>
 #include <string_view>
 
 namespace servertest {

@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <map>
-#include <optional>
 #include <string>
 #include <vector>
 

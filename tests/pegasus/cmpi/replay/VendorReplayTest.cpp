@@ -16,6 +16,7 @@
 #include <iostream>
 #include <iterator>
 #include <map>
+#include <optional>
 #include <regex>
 
 #include <unistd.h>
