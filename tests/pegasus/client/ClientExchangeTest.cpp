@@ -122,6 +122,13 @@ const Fault kFaults[] = {
      "Pegasus::CIMClientXmlException: Validation error: on line "},
     {"an unknown type", [](const PeerRequest& r) { return test::withReplaced(good(r), "uint64", "uint46"); },
      "Pegasus::CIMClientXmlException: Semantic error: on line "},
+    {"a null among embedded objects",
+     [](const PeerRequest& r) {
+         return test::httpAnswer(test::intrinsicBody(
+             r, "<CLASS NAME=\"T_Fan\"><PROPERTY.ARRAY NAME=\"E\" TYPE=\"string\" EmbeddedObject=\"object\">"
+                "<VALUE.ARRAY><VALUE.NULL/></VALUE.ARRAY></PROPERTY.ARRAY></CLASS>"));
+     },
+     "Pegasus::CIMClientXmlException: Validation error: on line "},
     {"another message's id", [](const PeerRequest& r) { return test::withReplaced(good(r), "ID=\"1", "ID=\"9"); },
      "Pegasus::CIMClientResponseException: Mismatched response message ID:  Got \"9"},
     {"another operation's answer",

@@ -48,6 +48,8 @@ const OddRow kRows[] = {
     {"ISO-8859-1", "utf-8", "ISO-8859-1", kWhole},
     {"an error's code with a zero", "<IRETURNVALUE>",
      "<ERROR CODE=\"06\"/></IMETHODRESPONSE></SIMPLERSP></MESSAGE></CIM><!--", "error 6"},
+    {"a raw line end and tab in an attribute", "<IRETURNVALUE>",
+     "<ERROR CODE=\"6\" DESCRIPTION=\"a\n\tb\"/></IMETHODRESPONSE></SIMPLERSP></MESSAGE></CIM><!--", "error 6 a\n\tb"},
     {"char16 0", kScalar, "TYPE=\"char16\"><VALUE>&#0;</VALUE>", "<VALUE>&#0;</VALUE>"},
     {"char16 0 in an array", kArray, "TYPE=\"char16\"><VALUE.ARRAY><VALUE>&#x00;</VALUE>", "<VALUE>&#0;</VALUE>"},
 

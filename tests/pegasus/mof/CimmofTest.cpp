@@ -82,6 +82,7 @@ TEST_F(Cimmof, AnswersTheCommandLineAsOpenPegasusDoes)
     const std::string bad = directory.write("bad.mof", "class {};");
     const std::string capital = directory.write("capital.mof", "Class Good {};");
     const std::string outside = directory.write("below/outside.mof", "#pragma include (\"../good.mof\")");
+    const std::string including = directory.write("m.mof", "#pragma include (\"nofile.mof\")\nclass Later {};");
     struct Row
     {
         const char* name;
@@ -100,6 +101,12 @@ TEST_F(Cimmof, AnswersTheCommandLineAsOpenPegasusDoes)
         {"checkOnlyBad", {"-E", bad}, 250, "", "bad.mof:1:7: error: expected a class name instead of '{'\n"},
         {"strict", {"-E", "--strict", capital}, 250, "", ":1:1: error: fails on OpenPegasus 2.14: the word"},
         {"anyInclude", {"-E", "--any-include", outside}, 0, "", ""},
+        {"noInclude",
+         {"-n", "root/cl", including},
+         0,
+         "",
+         "m.mof:1:18: warning: Could not open include file nofile.mof"},
+        {"afterNoInclude", {"-n", "root/cl", including}, 0, "", "m.mof:2:7: warning: Class Later already exists"},
         {"noFile", {"-n", "root/cl", "missing.mof"}, 249, "", "Can't open file missing.mof\n"},
         {"directory", {"-n", "root/cl", "/"}, 2, "", "it is a directory"},
         {"badNamespace",

@@ -164,6 +164,31 @@ TEST_F(AgentTest, anUpcallIsServedWhileTheRequestWaits)
     EXPECT_EQ(call(fClient, "Probe_Bulk", "ChangeProvidedByUpcall"), 6u) << "every step, in another module";
 }
 
+// A provider goes by the bits: a claim that does not hold fails at the customer's.
+TEST_F(AgentTest, theBrokerClaimsWhatItServes)
+{
+    start();
+    const Uint32 claimed = call(fClient, "Probe_Bulk", "ClaimedCapabilities");
+    const Uint32 served = call(fClient, "Probe_Bulk", "ServedCapabilities");
+    const std::pair<Uint32, const char*> bits[] = {{0x1, "reads"},
+                                                   {0x2, "sets properties"},
+                                                   {0x4, "creates, modifies and deletes instances"},
+                                                   {0x8, "associations"},
+                                                   {0x10, "queries"},
+                                                   {0x20, "normal forms of queries"},
+                                                   {0x40, "qualifiers"},
+                                                   {0x80, "indications"},
+                                                   {0x100, "threads and mutexes"},
+                                                   {0x4000, "marks memory"},
+                                                   {0x8000, "errors as objects"}};
+    Uint32 named = 0;
+    for (const auto& [bit, what] : bits) {
+        EXPECT_EQ((claimed & bit) != 0, (served & bit) != 0) << what;
+        named |= bit;
+    }
+    EXPECT_EQ(claimed & ~named, 0u) << "bits of CMPI 2.1 from a broker of 2.0";
+}
+
 TEST_F(AgentTest, anErrorLeavesNothingDelivered)
 {
     start();

@@ -332,6 +332,42 @@ static CMPIStatus changeByUpcall(const CMPIContext* context, const CMPIResult* r
     return returnNumber(result, steps);
 }
 
+/* The bits of brokerCapabilities in CMPI 2.0 whose functions work. */
+static CMPIUint32 servedCapabilities(const CMPIContext* context, const CMPIObjectPath* path)
+{
+    const CMPIBrokerFT* bft = gBroker->bft;
+    const CMPIBrokerEncFT* eft = gBroker->eft;
+    const char* const kText = "served";
+    CMPIStatus status = kOk;
+    CMPIObjectPath* stored =
+        eft->newObjectPath(gBroker, textOf(path->ft->getNameSpace(path, NULL)), "Probe_Stored", NULL);
+    stored->ft->addKey(stored, "Id", (const CMPIValue*)kText, CMPI_chars);
+    CMPIInstance* instance = eft->newInstance(gBroker, stored, NULL);
+    setText(instance, "Id", kText);
+    CMPIUint32 served = bft->enumerateInstances(gBroker, context, stored, NULL, NULL) != NULL ? 0x1 : 0;
+    const int isMade = bft->createInstance(gBroker, context, stored, instance, NULL) != NULL;
+    const CMPIrc set = bft->setProperty(gBroker, context, stored, "T1", (const CMPIValue*)kText, CMPI_chars).rc;
+    served |= set == CMPI_RC_OK ? 0x2 : 0;
+    const CMPIrc modified = bft->modifyInstance(gBroker, context, stored, instance, NULL).rc;
+    const CMPIrc deleted = bft->deleteInstance(gBroker, context, stored).rc;
+    served |= isMade && modified == CMPI_RC_OK && deleted == CMPI_RC_OK ? 0x4 : 0;
+    served |= bft->associatorNames(gBroker, context, stored, NULL, NULL, NULL, NULL, NULL) != NULL ? 0x8 : 0;
+    served |= bft->execQuery(gBroker, context, stored, "SELECT * FROM Probe_Stored", "WQL", NULL) != NULL ? 0x10 : 0;
+    /* Both normal forms of queries and the filters of indications are made of select expressions. */
+    served |= eft->newSelectExp(gBroker, "SELECT * FROM X", "WQL", NULL, NULL) != NULL ? 0x20 | 0x80 : 0;
+    stored->ft->getClassQualifier(stored, "Description", &status);
+    served |= status.rc != CMPI_RC_ERR_NOT_SUPPORTED ? 0x40 : 0;
+    CMPIMutex mutex = gBroker->xft->newMutex(0);
+    served |= mutex != NULL ? 0x100 : 0;
+    gBroker->xft->destroyMutex(mutex);
+    const CMPIGcStat* mark = gBroker->mft->mark(gBroker, NULL);
+    served |= mark != NULL && gBroker->mft->release(gBroker, mark).rc == CMPI_RC_OK ? 0x4000 : 0;
+    const CMPIError* error =
+        eft->newCMPIError(gBroker, "o", "i", kText, ErrorSevLow, ErrorProbCauseOther, CMPI_RC_ERR_FAILED, NULL);
+    served |= error != NULL && strcmp(textOf(error->ft->getMessage(error, NULL)), kText) == 0 ? 0x8000 : 0;
+    return served;
+}
+
 static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, const CMPIResult* result,
                                const CMPIObjectPath* path, const char* method, const CMPIArgs* in, CMPIArgs* out)
 {
@@ -347,6 +383,12 @@ static CMPIStatus invokeMethod(CMPIMethodMI* mi, const CMPIContext* context, con
     }
     if (strcasecmp(method, "CountByUpcall") == 0) {
         return countByUpcall(context, result, path);
+    }
+    if (strcasecmp(method, "ClaimedCapabilities") == 0) {
+        return returnNumber(result, gBroker->bft->brokerCapabilities);
+    }
+    if (strcasecmp(method, "ServedCapabilities") == 0) {
+        return returnNumber(result, servedCapabilities(context, path));
     }
     if (strcasecmp(method, "ChangeByUpcall") == 0) {
         return changeByUpcall(context, result, path);

@@ -247,6 +247,44 @@ TEST_F(ProtocolTest, servesEveryFormThatClientsUse)
     }
 }
 
+TEST_F(ProtocolTest, keepsALineEndAndATabInAnAttribute)
+{
+    std::string body = getClassBody();
+    body.replace(body.find("ID=\"7\""), 6, "ID=\"a\n\tb\"");
+    const HttpAnswer answer = exchange(fgTree->port(), post(kCim, body));
+    EXPECT_NE(answer.body.find("<MESSAGE ID=\"a&#10;&#9;b\""), std::string::npos) << answer.body;
+}
+
+// As paths relative to the namespace asked, and as the instances that the DMTF's clients look for.
+TEST_F(ProtocolTest, namespacesAreListedBothWays)
+{
+    fgTree->compileBase();
+    const std::tuple<const char*, const char*, std::vector<std::string>> rows[] = {
+        {"__Namespace", "root", {"PG_InterOp", "PG_Internal"}},
+        {"__Namespace", "root/PG_InterOp", {}},
+        {"CIM_Namespace", "root/PG_InterOp", {"root", "root/PG_InterOp", "root/PG_Internal"}},
+    };
+    for (const auto& [className, nameSpace, names] : rows) {
+        for (const std::string method : {"EnumerateInstances", "EnumerateInstanceNames"}) {
+            SCOPED_TRACE(className + (" in " + std::string(nameSpace) + " by " + method));
+            const HttpAnswer answer =
+                exchange(fgTree->port(), intrinsicRequest(method, nameSpace, classNameParameter(className)));
+            EXPECT_EQ(answer.status, 200);
+            EXPECT_EQ(answer.trailers.count("cimstatuscode"), 0u);
+            std::size_t found = 0;
+            for (std::size_t at = 0; (at = answer.body.find("<INSTANCENAME ", at)) != std::string::npos; ++at) {
+                ++found;
+            }
+            EXPECT_GE(found, names.size());
+            EXPECT_EQ(found == 0, names.empty()) << answer.body;
+            for (const std::string& name : names) {
+                const std::string key = "<KEYBINDING NAME=\"Name\">\n<KEYVALUE VALUETYPE=\"string\">" + name + "<";
+                EXPECT_NE(answer.body.find(key), std::string::npos) << name << "\n" << answer.body;
+            }
+        }
+    }
+}
+
 TEST_F(ProtocolTest, keepsAliveAndServesPipelinedRequestsInOrder)
 {
     RawConnection connection(fgTree->port());
