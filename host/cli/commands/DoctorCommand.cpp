@@ -64,6 +64,7 @@ constexpr TAdviceRow kAdvice[] = {
      "nothing, when the text is enough; else declare properties of simple types"},
     {ELossKind::kUndeclaredProperty, "vendors", "declare the property in the class's MOF, or leave it unset"},
     {ELossKind::kPropertyType, "vendors", "use the same type in the class's MOF and in the provider"},
+    {ELossKind::kUndeclaredKey, "vendors", "give the property the qualifier Key in the class's MOF"},
     {ELossKind::kMofPortability, "schema", "change the text as docs/mof.md says under Portability"},
     {ELossKind::kProviderPortability, "vendors", "change the provider's call as docs/vendors.md says"},
 };

@@ -259,6 +259,15 @@ std::vector<TLoss> NotesOfCompiler(const std::string& text)
 
 std::optional<TLoss> NoteOfServerLine(const TServerLogLine& line)
 {
+    static const std::regex kKey("addKey: (\\S+) is not a key of class (\\S+)");
+    std::smatch found;
+    if (std::regex_search(line.fText, found, kKey)) {
+        TLoss key =
+            LossOf(EKind::kUndeclaredKey, "provider module " + line.fModule + " uses " + found[1].str() +
+                                              " as a key of class " + found[2].str() + ", which declares it as none");
+        key.fIsNote = true;
+        return key;
+    }
     const std::size_t begin = line.fText.find(kTrap);
     if (begin == std::string::npos) {
         return std::nullopt;
@@ -272,8 +281,8 @@ std::optional<TLoss> NoteOfServerLine(const TServerLogLine& line)
 
 std::optional<TLoss> LossOfServerLine(const TServerLogLine& line)
 {
-    static const std::regex kRefused("setProperty: (?:class (\\S+) has no property (\\S+)"
-                                     "|property (\\S+) of (\\S+) has another type.*)");
+    static const std::regex kRefused("(?:setProperty|addKey): (?:class (\\S+) has no property (\\S+)"
+                                     "|(?:property|key) (\\S+) of (\\S+) has another type.*)");
     std::smatch found;
     if (!std::regex_search(line.fText, found, kRefused)) {
         return std::nullopt;

@@ -45,6 +45,7 @@ constexpr TWordRow kWords[] = {
     {ELossKind::kEmbeddedObject, "embedded-object"},
     {ELossKind::kUndeclaredProperty, "undeclared-property"},
     {ELossKind::kPropertyType, "property-type"},
+    {ELossKind::kUndeclaredKey, "undeclared-key"},
     {ELossKind::kMofPortability, "mof-portability"},
     {ELossKind::kProviderPortability, "provider-portability"},
 };

@@ -45,6 +45,7 @@ enum class ELossKind
     kEmbeddedObject,
     kUndeclaredProperty,
     kPropertyType,
+    kUndeclaredKey, // a provider uses as a key what the class does not declare as one
 
     kMofPortability, // works here, fails on OpenPegasus
     kProviderPortability

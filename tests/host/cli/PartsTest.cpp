@@ -168,6 +168,8 @@ TEST(TLossLog, LossesAreFoldedUnderTheirCause)
     log.AddServerLog({{"fans", "warning: a"},
                       {"fans", "warning: setProperty: class FAN_A has no property Rpm"},
                       {"fans", "warning: provider Fan: works here, fails on OpenPegasus 2.14: convert it"},
+                      {"fans", "warning: addKey: Bay is not a key of class FAN_A"},
+                      {"fans", "warning: addKey: key Slot of FAN_C has another type"},
                       {"x", "b"}},
                      {{"fans", "fan"}});
     const std::string fan = "vendor fan, " + (vendors / "fan/x.classes.xml").string() + ": ";
@@ -179,7 +181,11 @@ TEST(TLossLog, LossesAreFoldedUnderTheirCause)
                                         fan + "property Rpm of class FAN_A is not declared, so that the value which "
                                               "provider module fans sets is lost",
                                         "vendor fan: provider module fans does what fails on OpenPegasus 2.14: "
-                                        "convert it"}));
+                                        "convert it",
+                                        "vendor fan: provider module fans uses Bay as a key of class FAN_A, which "
+                                        "declares it as none",
+                                        fan + "property Slot of class FAN_C is declared with another type, so that the "
+                                              "value which provider module fans sets is lost"}));
     EXPECT_TRUE(log.GetLosses()[4].fIsNote);
     EXPECT_EQ(log.GetLosses()[1].fLog, std::vector<std::string>{"warning: a"});
     EXPECT_TRUE(log.GetLosses()[0].fLog.empty());
