@@ -9,10 +9,13 @@
 #include <benchmark/benchmark.h>
 #include <expat.h>
 
+#include <algorithm>
+#include <chrono>
 #include <filesystem>
 #include <fstream>
 #include <memory>
 #include <sstream>
+#include <vector>
 
 using namespace Pegasus;
 
@@ -121,6 +124,49 @@ void getClass(benchmark::State& state)
     state.SetItemsProcessed(state.iterations());
 }
 
+// Runs operations and shows their median: an operation whose threads wait for a busy processor takes many times as
+// long.
+template <typename Operation> void runWithMedian(benchmark::State& state, const Operation& operation)
+{
+    using Clock = std::chrono::steady_clock;
+    std::vector<Clock::duration> times;
+    for (auto _ : state) {
+        const Clock::time_point start = Clock::now();
+        operation();
+        times.push_back(Clock::now() - start);
+    }
+    const auto middle = times.begin() + static_cast<std::ptrdiff_t>(times.size() / 2);
+    std::nth_element(times.begin(), middle, times.end());
+    state.counters["median_us"] = std::chrono::duration<double, std::micro>(*middle).count();
+    state.SetItemsProcessed(state.iterations());
+}
+
+// One operation on a connection of its own: both sides ask the kernel who the other one is.
+void getClassOnNewConnections(benchmark::State& state)
+{
+    const TProbeServer& server = TProbeServer::get();
+    runWithMedian(state, [&] {
+        CIMClient client;
+        client.connect("127.0.0.1", server.tree().port(), String(), String());
+        benchmark::DoNotOptimize(client.getClass(kNamespace, "Probe_Bulk", false));
+    });
+}
+
+// The same without this library's client, which leaves the server's question alone.
+void requestsOnNewConnections(benchmark::State& state)
+{
+    const TProbeServer& server = TProbeServer::get();
+    const std::string request =
+        servertest::intrinsicRequest("GetClass", "root/probe",
+                                     servertest::classNameParameter("Probe_Bulk") +
+                                         "<IPARAMVALUE NAME=\"LocalOnly\"><VALUE>FALSE</VALUE></IPARAMVALUE>");
+    runWithMedian(state, [&] {
+        if (servertest::exchange(server.tree().port(), request).status != 200) {
+            state.SkipWithError("no answer");
+        }
+    });
+}
+
 void invokeMethod(benchmark::State& state)
 {
     TProbeServer& server = TProbeServer::get();
@@ -153,6 +199,8 @@ void launch(benchmark::State& state)
 BENCHMARK(enumerateInstances)->Arg(1'000)->Arg(10'000)->Arg(50'000)->Unit(benchmark::kMillisecond)->UseRealTime();
 BENCHMARK(bareExpat)->Arg(1'000)->Arg(10'000)->Arg(50'000)->Unit(benchmark::kMillisecond)->UseRealTime();
 BENCHMARK(getClass)->UseRealTime();
+BENCHMARK(getClassOnNewConnections)->UseRealTime();
+BENCHMARK(requestsOnNewConnections)->UseRealTime();
 BENCHMARK(invokeMethod)->UseRealTime();
 BENCHMARK(launch)
     ->Unit(benchmark::kMillisecond)
