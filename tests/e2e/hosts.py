@@ -28,6 +28,8 @@ RUN_SECONDS = 180
 class TinyTree(Tree):
     """A tree with the host of tests/consumer in place of vrxhost. It never tells the server its consumer."""
 
+    errors = ""  # of the latest host
+
     def __init__(self, build):
         super().__init__(build)
         folder = self.path("tiny-host")
@@ -44,7 +46,8 @@ class TinyTree(Tree):
         return int(dict(line.rsplit(" ", 1) for line in out.splitlines()).get("LNX_NetworkPort", 0))
 
     def attempts(self):
-        return 1
+        """Its log's errors are on standard error."""
+        return 1 + self.errors.count("try to restart cimserver")
 
 
 class HostTree(Tree):
@@ -71,6 +74,7 @@ class DefaultTree(HostTree):
 def problems(tree, host):
     """Returns what is wrong with a host's whole inventory."""
     out, err = host.communicate(timeout=RUN_SECONDS)
+    tree.errors = err
     if host.returncode != COMPLETE:
         return [f"status {host.returncode}: {err}"]
     ports = tree.ports_in(out)
@@ -249,6 +253,7 @@ except OSError:
         tree.replace_first_server(f'{sys.executable} {forger} "${{1#httpPort=}}" {heard} 3>{tree.folder}/ready &\n'
                                   f'    until [ -s {tree.folder}/ready ]; do :; done\n')
         self.assertEqual(problems(tree, tree.start()), [])
+        self.assertEqual(tree.attempts(), 2)
         with open(heard, encoding="latin1") as file:
             self.assertEqual(file.read(), "")
         self.assertTrue(os.path.exists(tree.path("taken")))

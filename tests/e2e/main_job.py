@@ -4,11 +4,13 @@
 Usage: main_job.py BUILD_DIRECTORY [CLASS[.TEST]...]
 """
 import concurrent.futures
+import filecmp
 import glob
 import json
 import os
 import re
 import resource
+import select
 import shutil
 import signal
 import subprocess
@@ -73,20 +75,23 @@ class Staging(TreeTest):
 
 
 class TwoTrees(TreeTest):
-    """One host process uses a tree and then another, as two builds: each brings its own libraries and takes them away."""
+    """One host process uses a tree, another build's, and the first again: each brings its own libraries and takes them away."""
 
     def test_each_has_its_own_client_library_and_leaves_none(self):
         other = Tree(BUILD)
         self.addCleanup(other.remove)
+        shutil.copy(os.path.join(BUILD, "tests", "e2e", "libother_plugin.so"), other.path("libpegasus.nsp.so"))
+        self.assertFalse(filecmp.cmp(self.tree.path("libpegasus.nsp.so"), other.path("libpegasus.nsp.so"), shallow=False))
         command = [os.path.join(BUILD, "tests", "e2e", "two_trees")]
-        for tree in (self.tree, other):
+        used = (self.tree, other, self.tree)
+        for tree in used:
             subprocess.run([tree.path("pegasus", "bin", "cimconfig"), "-s", f"consumer={tree.consumer}", "-p"], check=True,
                            stdout=subprocess.DEVNULL)
             command += [tree.root, tree.consumer]
         done = subprocess.run(command, stdout=subprocess.PIPE, stderr=subprocess.PIPE, text=True, timeout=300, check=False)
         self.assertEqual(done.returncode, 0, done.stdout + done.stderr)  # the log goes to standard error
         counts, libraries = zip(*(line.split() for line in done.stdout.splitlines()))
-        self.assertEqual(list(libraries), [tree.path("pegasus", "lib", "libpegclient.so.1") for tree in (self.tree, other)])
+        self.assertEqual(list(libraries), [tree.path("pegasus", "lib", "libpegclient.so.1") for tree in used])
         self.assertGreater(min(map(int, counts)), 0)
         self.assertEqual(self.tree.leftovers() + other.leftovers(), [])
 
@@ -107,6 +112,16 @@ class HealthyTree(TreeTest):
     def assert_types(self, system):
         self.assertIsInstance(system["NumberOfProcesses"], int)
         self.assertRegex(system["LastBootUpTime"], r"^\d{14}\.\d{6}[+-]\d{3}$")
+
+    def test_clone_that_is_the_working_directory_stays_clean(self):
+        clone = os.path.join(self.tree.folder, "clone")
+        subprocess.run(["git", "clone", "--quiet", SOURCE, clone], check=True)
+        self.tree.elsewhere = clone
+        status, _, err = self.tree.run("classes")
+        self.assertEqual((status, err), (COMPLETE, ""))
+        changed = subprocess.run(["git", "-C", clone, "status", "--porcelain", "--ignored"], stdout=subprocess.PIPE, text=True,
+                                 check=True)
+        self.assertEqual(changed.stdout, "")
 
     def test_table_into_a_pipe(self):
         command = f'./vrxhost inventory --consumer {self.tree.consumer} | cat'
@@ -235,6 +250,12 @@ class Interrupted(unittest.TestCase):
     STEP_SECONDS = 0.25
     WHOLE_RUN_SECONDS = 10
     END_SECONDS = 6.5
+    ANNOUNCED_SECONDS = 1.5
+
+    def first_error(self, process):
+        """Returns the beginning of standard error as soon as there is one; empty when the process ends without."""
+        readable, _, _ = select.select([process.stderr], [], [], self.WHOLE_RUN_SECONDS)
+        return os.read(process.stderr.fileno(), 4096).decode() if readable else ""
 
     def interrupt_after(self, seconds, hangs=False):
         """Returns what is wrong."""
@@ -248,10 +269,15 @@ class Interrupted(unittest.TestCase):
             except subprocess.TimeoutExpired:
                 process.send_signal(signal.SIGINT)
             sent = time.monotonic()
+            announced = self.first_error(process)
+            announced_after = time.monotonic() - sent
             out, err = process.communicate(timeout=60)
+            err = announced + err
             took = time.monotonic() - sent
             document = json.loads(out)
             wrong = [f"{took:.1f} s"] if took > self.END_SECONDS else []
+            if process.returncode == INTERRUPTED and announced_after > self.ANNOUNCED_SECONDS:
+                wrong.append(f"announced after {announced_after:.1f} s")
             if process.returncode != (COMPLETE if document["complete"] else INTERRUPTED):
                 wrong.append(f"status {process.returncode}")
             if process.returncode == INTERRUPTED and err != "vrxhost: stopping ...\nvrxhost: interrupted\n":

@@ -51,7 +51,7 @@ constexpr TAdviceRow kAdvice[] = {
     {ELossKind::kOtherNamespace, "vendors",
      "make <nsp> of the class list and Namespaces of the registration file the same"},
     {ELossKind::kProviderName, "vendors",
-     "use the same name in PG_Provider, in PG_ProviderCapabilities and in the library's entry points"},
+     "write the same names in PG_ProviderModule, PG_Provider and PG_ProviderCapabilities"},
     {ELossKind::kLibrary, "vendors", "install what is missing, or build the library again"},
     {ELossKind::kLocation, "vendors", "put the library there, or correct Location in the registration file"},
     {ELossKind::kClass, "vendors",

@@ -6,7 +6,6 @@
 #include <algorithm>
 #include <chrono>
 #include <filesystem>
-#include <fstream>
 #include <regex>
 #include <sstream>
 
@@ -17,7 +16,6 @@ namespace fs = std::filesystem;
 
 constexpr char kLoader[] = "/lib64/ld-linux-x86-64.so.2"; // the platform's, by its ABI
 constexpr int kLoaderTimeoutSeconds = 10;
-constexpr std::size_t kMaxRegistrationBytes = 1024 * 1024;
 
 std::string SearchPath(const TVendorFiles& files, const std::string& root)
 {
@@ -90,10 +88,7 @@ void CheckLocations(const TVendorFolder& folder, const TVendorFiles& files, cons
 {
     static const std::regex kLocation("Location\\s*=\\s*\"([^\"]+)\"", std::regex::icase);
     for (const std::string& path : folder.fRegistrations) {
-        std::string text(kMaxRegistrationBytes, '\0');
-        std::ifstream file(path, std::ios::binary);
-        file.read(text.data(), static_cast<std::streamsize>(text.size()));
-        text.resize(static_cast<std::size_t>(file.gcount()));
+        const std::string text = ReadBeginning(path);
         for (std::sregex_iterator found(text.begin(), text.end(), kLocation), end; found != end; ++found) {
             const std::string name = "lib" + (*found)[1].str() + ".so";
             if (!Exists(name, files, root)) {

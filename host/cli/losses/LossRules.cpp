@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "host/cli/losses/LossRules.h"
 
+#include "host/cli/losses/RegistrationText.h"
+
 #include <host/TVRXStatusCode.h>
 
 #include <algorithm>
@@ -168,8 +170,12 @@ TLoss LossOfCompilation(const NKOLVRX20::TFailedProgram& program)
 {
     const std::filesystem::path file = program.fArguments.empty() ? "" : program.fArguments.back();
     const std::string vendor = VendorOfFile(file);
-    TLoss loss = LossOf(EKind::kSchema, "MOF file " + file.string() + (vendor.empty() ? "" : " of vendor " + vendor) +
-                                            " did not compile, cimmof: " + Cause(program));
+    const std::string cause = Cause(program);
+    const bool isUnknown = cause.find("needs to be registered before register") != std::string::npos;
+    const std::string names = isUnknown ? DescribeUnknownNames(file) : "";
+    TLoss loss = LossOf(names.empty() ? EKind::kSchema : EKind::kProviderName,
+                        "MOF file " + file.string() + (vendor.empty() ? "" : " of vendor " + vendor) +
+                            " did not compile, cimmof: " + cause + names);
     loss.fVendor = vendor;
     loss.fFile = file;
     loss.fIsCause = !vendor.empty();

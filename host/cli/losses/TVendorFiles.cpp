@@ -61,10 +61,8 @@ TClassList ReadClassList(const std::string& vendor, const std::string& path)
     TClassList list;
     list.fVendor = vendor;
     list.fPath = path;
-    std::string text(TVendorFiles::kMaxClassListBytes, '\0');
-    std::ifstream file(path, std::ios::binary);
-    file.read(text.data(), static_cast<std::streamsize>(text.size()));
-    TClassListParser(list).Parse(text.data(), static_cast<std::size_t>(file.gcount()));
+    std::string text = ReadBeginning(path);
+    TClassListParser(list).Parse(text.data(), text.size());
     if (list.fNamespace.empty()) {
         list.fNamespace = kDefaultNamespace;
     }
@@ -78,6 +76,15 @@ template <typename Entry> void SortByName(std::vector<Entry>& entries, std::stri
 }
 
 } // namespace
+
+std::string ReadBeginning(const std::string& path)
+{
+    std::string text(kMaxVendorFileBytes, '\0');
+    std::ifstream file(path, std::ios::binary);
+    file.read(text.data(), static_cast<std::streamsize>(text.size()));
+    text.resize(static_cast<std::size_t>(file.gcount()));
+    return text;
+}
 
 // The plug-in's own rules: two kinds of classes have timeouts of their own, whatever their vendors say.
 int TClassList::TimeoutOf(const std::string& name) const

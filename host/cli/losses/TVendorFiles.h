@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <cstddef>
 #include <map>
 #include <string>
 #include <vector>
@@ -35,13 +36,16 @@ struct TVendorFolder
     std::vector<std::string> fRegistrations = {}; // paths of *.registration.mof
 };
 
+// Returns: a file's text, cut after kMaxVendorFileBytes; empty for one that cannot be read.
+std::string ReadBeginning(const std::string& path);
+
+constexpr std::size_t kMaxVendorFileBytes = 1024 * 1024;
+
 // What the vendors' folders hold, read from the disk as the plug-in reads it (docs/vendors.md). What cannot be read is
 // left out: the plug-in reports it.
 class TVendorFiles
 {
   public:
-    static constexpr std::size_t kMaxClassListBytes = 1024 * 1024;
-
     TVendorFiles() = default;
     explicit TVendorFiles(const std::string& providerDirectory);
 

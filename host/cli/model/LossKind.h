@@ -34,7 +34,7 @@ enum class ELossKind
     kNoRegistration,
     kNoCapabilities,
     kOtherNamespace, // registered in another namespace than the class list has
-    kProviderName,   // registered under a name that the library has no entry point for
+    kProviderName,   // a registration names a provider or module without an instance
     kLibrary,
     kLocation, // of a library that is in no vendor's folder
 

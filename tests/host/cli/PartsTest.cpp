@@ -2,6 +2,7 @@
 // Parts of vrxhost, each tested apart from any plug-in.
 #include "host/cli/TPrivateServer.h"
 #include "host/cli/losses/LossRules.h"
+#include "host/cli/losses/RegistrationText.h"
 #include "host/cli/losses/TLossLog.h"
 
 #include <host/TOSSpecific.h>
@@ -97,6 +98,51 @@ TEST(LossRules, Programs)
         EXPECT_EQ(TextOf(LossOfProgram(row.fProgram, "/nonexistent")), row.fSentence ? row.fSentence : "none")
             << row.fName;
     }
+}
+
+struct TNamesRow
+{
+    const char* fName;
+    const char* fModuleOfProvider;
+    const char* fProviderName;
+    const char* fEnd;
+};
+
+// The server refuses these registrations and names nothing.
+TEST(LossRules, UnknownNamesInARegistrationAreNamed)
+{
+    const TNamesRow rows[] = {
+        {"agree", "Mod", "Fan", ""},
+        {"provider", "Mod", "Fann",
+         "; PG_ProviderCapabilities names provider \"Fann\" of module \"Mod\", and the file registers provider \"Fan\" "
+         "of module \"Mod\""},
+        {"module", "mod", "Fan", "; PG_Provider names module \"mod\", and the file registers module \"Mod\""},
+    };
+    const fs::path file = testing::TempDir() + "/names-" + std::to_string(::getpid()) + ".registration.mof";
+    for (const TNamesRow& row : rows) {
+        SCOPED_TRACE(row.fName);
+        std::ofstream(file)
+            << "instance of PG_ProviderModule { Name = \"Mod\"; };\n/* instance of PG_Provider { Name = "
+               "\"Fann\"; }; */\nINSTANCE OF PG_Provider\n{ Name=\"Fan\"; // \"\n ProviderModuleName = \""
+            << row.fModuleOfProvider
+            << "\"; };\ninstance of PG_ProviderCapabilities { ProviderModuleName = \"Mod\"; Namespaces = "
+               "{\"a\", \"b\"}; ProviderName = \""
+            << row.fProviderName << "\"; };\n";
+        const TFailedProgram program = {"cimmof", {file}, TProcessOutcome::kExited,
+                                        250,      "",     "PG_X class needs to be registered before register Y"};
+        const auto loss = LossOfProgram(program, "/");
+        ASSERT_TRUE(loss);
+        EXPECT_EQ(loss->GetText(), "MOF file " + file.string() +
+                                       " did not compile, cimmof: exit status 250: PG_X class needs to be registered "
+                                       "before register Y" +
+                                       row.fEnd);
+        EXPECT_EQ(loss->fKind, *row.fEnd ? ELossKind::kProviderName : ELossKind::kSchema);
+    }
+    for (const char* odd : {"", "\"", "/*", "instance of", "instance of PG_Provider { Name = \"x", "a = \"b\""}) {
+        std::ofstream(file) << odd;
+        EXPECT_EQ(DescribeUnknownNames(file).find("Fan"), std::string::npos) << odd;
+    }
+    fs::remove(file);
 }
 
 std::vector<std::string> SentencesOf(const TLossLog& log)

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 // A root of the user's own, for a tree that is read-only or must stay unchanged.
+#include "host/cli/TDeployedTree.h"
 #include "tests/host/cli/VrxhostProgram.h"
 
 #include <gmock/gmock.h>
@@ -93,6 +94,49 @@ TEST_F(PrivateRoot, IsWhereTheTreesMarkSaysWhenThatCanBeWritten)
     ASSERT_TRUE(HasStatus(Start({VRXHOST, "--root", fRoot, "instances", "Fake_Many"}), 0));
     EXPECT_TRUE(fs::exists(state / "vrxhost.log"));
     EXPECT_TRUE(Snapshot(fRoot) == before);
+}
+
+// Somebody who may not write the tree gets a place of their own; the first of these that is named.
+TEST_F(PrivateRoot, OfAnOrdinaryUserIsInTheStateFolderTheHomeOrTmp)
+{
+    constexpr uid_t kNobody = 65534;
+    if (::geteuid() != 0) {
+        GTEST_SKIP() << "needs root, to become an ordinary user";
+    }
+    const fs::path mine = fFolder / "mine";
+    fs::create_directory(mine);
+    ASSERT_EQ(::chown(mine.c_str(), kNobody, kNobody), 0);
+    const std::string id = TDeployedTree(fRoot).GetId();
+    const fs::path inTmp = "/tmp/vrxhost-" + std::to_string(kNobody);
+    const bool wasThere = fs::exists(inTmp);
+    const struct
+    {
+        std::vector<std::string> fEnvironment;
+        fs::path fExpected;
+    } rows[] = {
+        {{"XDG_STATE_HOME=" + mine.string(), "HOME=/nonexistent"}, mine / "vrxhost" / id},
+        {{"HOME=" + mine.string()}, mine / ".local/state/vrxhost" / id},
+        {{"XDG_STATE_HOME=relative"}, inTmp / id},
+        {{"HOME=/nonexistent"}, inTmp / id},
+    };
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.fExpected);
+        std::vector<std::string> command = {"/usr/bin/setpriv", "--reuid=65534", "--regid=65534",
+                                            "--clear-groups",   "/usr/bin/env",  "-i"};
+        command.insert(command.end(), row.fEnvironment.begin(), row.fEnvironment.end());
+        for (const std::string& word :
+             {std::string(VRXHOST), std::string("--root"), fRoot.string(), std::string("providers")})
+        {
+            command.push_back(word);
+        }
+        EXPECT_TRUE(HasStatus(Start(command), 0));
+        EXPECT_TRUE(fs::exists(row.fExpected / "vrxhost.log"));
+        EXPECT_EQ(fs::status(row.fExpected).permissions(), fs::perms(0700));
+        fs::remove_all(row.fExpected);
+    }
+    if (!wasThere) {
+        fs::remove(inTmp); // unless another run has begun to use it
+    }
 }
 
 TEST_F(PrivateRoot, PlaceThatCannotBeUsedIsOneSentence)

@@ -479,7 +479,11 @@ TEST_F(VrxhostProgram, SecondHostInOneRootIsRefused)
     ASSERT_EQ(::flock(root.Get(), LOCK_EX | LOCK_NB), 0);
     const auto outcome = Run({"inventory"});
     EXPECT_TRUE(HasStatus(outcome, 1));
-    EXPECT_EQ(outcome.fErrorOutput, "vrxhost: another vrxhost is at work in " + fRoot.string() + "\n");
+    const std::string sentence = "another vrxhost is at work in " + fRoot.string();
+    EXPECT_EQ(outcome.fErrorOutput, "vrxhost: " + sentence + "\n");
+    const auto json = nlohmann::json::parse(Run({"inventory", "--format", "json"}).fOutput);
+    EXPECT_EQ(json["complete"], false);
+    EXPECT_EQ(json["losses"].dump(), nlohmann::json({{{"text", sentence}}}).dump());
     EXPECT_EQ(ReadFile(fRoot / "vrxhost.log"), "of the first");
 }
 

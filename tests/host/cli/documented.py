@@ -57,6 +57,16 @@ class Documented(unittest.TestCase):
         self.assertEqual(re.findall(r"^\.TP\n(?:\.B[RI]?)? *(\w+)", text, re.MULTILINE), commands())
 
 
+class SettingsPage(unittest.TestCase):
+    def test_page_has_the_keys_and_values_of_the_program(self):
+        with open(os.path.join(SOURCE, "host", "cli", "Settings.cpp"), encoding="utf-8") as file:
+            known = {key: re.findall(r'"(\w+)"', values) for key, values in re.findall(r'\{"(\w+)", \{([^}]*)\}\}', file.read())}
+        with open(os.path.join(SOURCE, "docs", "settings.md"), encoding="utf-8") as file:
+            rows = re.findall(r"^\| `(\w+)` \| ([^|]*) \|", file.read(), re.MULTILINE)
+        self.assertTrue(known)
+        self.assertEqual({key: re.findall(r"`(\w+)`", values) for key, values in rows}, known)
+
+
 class Completion(unittest.TestCase):
     def setUp(self):
         self.root = tempfile.mkdtemp()
