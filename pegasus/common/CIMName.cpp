@@ -51,20 +51,6 @@ Uint32 leadingSlash(const String& name)
     return name.size() > 0 && name[0] == '/' ? 1 : 0;
 }
 
-// From the end: the names in one class begin alike more often than they end alike.
-bool sameNoCase(const StringRep& x, const StringRep& y)
-{
-    if (x.fSize != y.fSize) {
-        return false;
-    }
-    for (Uint32 i = x.fSize; i > 0; --i) {
-        if (base::lowerAscii(x.units()[i - 1]) != base::lowerAscii(y.units()[i - 1])) {
-            return false;
-        }
-    }
-    return true;
-}
-
 String checkedName(const String& name)
 {
     if (!CIMName::legal(name)) {
@@ -94,12 +80,7 @@ CIMName& CIMName::operator=(const String& name)
 
 Boolean CIMName::equal(const CIMName& name) const
 {
-    const StringRep* x = StringAccess::rep(fName);
-    const StringRep* y = StringAccess::rep(name.fName);
-    if (x == y) {
-        return true; // equal names of one message share their text
-    }
-    return x && y ? sameNoCase(*x, *y) : isNull() && name.isNull();
+    return sameName(*this, name);
 }
 
 Boolean CIMName::legal(const String& name)

@@ -98,7 +98,7 @@ struct ObjectAccess
     {
         const Item* data = items.getData();
         for (Uint32 i = 0; i < items.size(); ++i) {
-            if (data[i].getName().equal(name)) {
+            if (sameName(rep(data[i]).fName, name)) {
                 return i;
             }
         }
