@@ -35,7 +35,7 @@ void checkInstance(const CIMInstance& instance)
     wire::appendInstance(text, instance);
     wire::XmlDocument document;
     wire::ElementDecoder decoder;
-    const CIMInstance again = decoder.decodeInstance(document.parseFragment(text.data(), text.size()));
+    const CIMInstance again = decoder.decodeInstance(document.parseFragment(text));
     fuzz::require(again.getPropertyCount() == instance.getPropertyCount());
 }
 

@@ -109,7 +109,7 @@ void storeAll(Repository& repository, std::string& text)
     wire::XmlDocument document;
     wire::ElementDecoder decoder;
     try {
-        const wire::XmlElement root = document.parseFragment(text.data(), text.size());
+        const wire::XmlElement root = document.parseFragment(text);
         for (wire::XmlElement child = root.firstChild(); child; child = child.nextSibling()) {
             try {
                 store(repository, child, decoder);

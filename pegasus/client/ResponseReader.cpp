@@ -95,14 +95,11 @@ void ResponseReader::openEnvelope(const XmlElement& tag)
         openMessage(tag);
     } else if (fDepth == kResponseLevel) {
         openMethodResponse(tag);
-    } else {
-        tag.ignoreAttributes();
-        if (tag.is("IRETURNVALUE")) {
-            if (!fExpected.isIntrinsic || fHasReturnValue || fError) {
-                tag.fail(Kind::kInvalid, "unexpected IRETURNVALUE element");
-            }
-            fHasReturnValue = true;
+    } else if (tag.is("IRETURNVALUE")) {
+        if (!fExpected.isIntrinsic || fHasReturnValue || fError) {
+            tag.fail(Kind::kInvalid, "unexpected IRETURNVALUE element");
         }
+        fHasReturnValue = true;
     }
     ++fDepth;
 }

@@ -60,7 +60,7 @@ template <typename Object>
 Object ObjectDecoder::decode(std::string& text, Object (wire::ElementDecoder::*function)(const wire::XmlElement&))
 {
     try {
-        return (fDecoder.*function)(fDocument.parseElement(text.data(), text.size(), {}));
+        return (fDecoder.*function)(fDocument.parseFragment(text));
     } catch (const wire::XmlError& error) {
         fail(CIM_ERR_FAILED, "cannot read the repository: " + base::utf8(error.getMessage()));
     }

@@ -90,8 +90,11 @@ const CIMName& ElementDecoder::nameAttribute(const XmlElement& element, std::str
         failMissing(element, attribute);
     }
     fDecodedBytes += value->size();
+    if (const CIMName* known = fNames.find(*value)) {
+        return *known;
+    }
     try {
-        return fNames.name(element.resolved(*value, fScratch));
+        return fNames.add(element.resolved(*value, fScratch));
     } catch (const XmlError&) {
         throw;
     } catch (const Exception&) {
@@ -386,7 +389,6 @@ CIMInstance ElementDecoder::decodeInstance(const XmlElement& element)
 CIMInstance ElementDecoder::decodeNamedInstance(const XmlElement& element)
 {
     element.expectName("VALUE.NAMEDINSTANCE");
-    element.ignoreAttributes();
     const XmlElement name = element.firstChild();
     if (!name) {
         element.fail(Kind::kInvalid, "expected INSTANCENAME element");

@@ -115,7 +115,6 @@ CIMObjectPath ElementDecoder::decodeNameIn(const XmlElement& element, const Stri
 CIMNamespaceName ElementDecoder::decodeLocalNamespacePath(const XmlElement& element)
 {
     element.expectName("LOCALNAMESPACEPATH");
-    element.ignoreAttributes();
     std::string text;
     XmlElement child = childOf(element, "NAMESPACE");
     for (; child; child = child.nextSibling()) {
@@ -134,7 +133,6 @@ CIMObjectPath ElementDecoder::decodeObjectPath(const XmlElement& element)
     if (element.is("INSTANCENAME") || element.is("CLASSNAME")) {
         return decodeNameIn(element, String(), CIMNamespaceName());
     }
-    element.ignoreAttributes();
     if (element.is("LOCALINSTANCEPATH") || element.is("LOCALCLASSPATH")) {
         const XmlElement nameSpace = childOf(element, "LOCALNAMESPACEPATH");
         return decodeNameIn(lastAfter(nameSpace), String(), decodeLocalNamespacePath(nameSpace));
@@ -156,7 +154,6 @@ CIMObjectPath ElementDecoder::decodeObjectPath(const XmlElement& element)
 CIMObjectPath ElementDecoder::decodeReference(const XmlElement& element)
 {
     element.expectName("VALUE.REFERENCE");
-    element.ignoreAttributes();
     return decodeObjectPath(element.onlyChild());
 }
 

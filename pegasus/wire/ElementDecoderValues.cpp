@@ -146,11 +146,11 @@ CIMObject ElementDecoder::decodeEmbedded(const XmlElement& element, std::string_
     if (fEmbeddingDepth > fLimits.maxEmbedding) {
         element.fail(Kind::kTooLarge, "objects embedded more than " + std::to_string(fLimits.maxEmbedding) + " deep");
     }
-    // A copy: decoding the object uses the scratch text that `text` may be in, and changes what it reads.
-    std::string xml(text);
+    // A copy: decoding the object uses the scratch text that `text` may be in.
+    const std::string xml(text);
     XmlDocument document(fLimits);
     try {
-        const XmlElement root = document.parseFragment(xml.data(), xml.size());
+        const XmlElement root = document.parseFragment(xml);
         return root.is("CLASS") ? CIMObject(decodeClass(root)) : CIMObject(decodeInstance(root));
     } catch (const XmlError& error) {
         element.fail(error.kind(), "in an embedded object: " + base::utf8(error.getMessage()));
@@ -216,7 +216,6 @@ template <typename T> CIMValue ElementDecoder::decodeArray(const XmlElement& ele
             if (!child.is("VALUE")) {
                 child.failIn(element);
             }
-            child.ignoreAttributes();
             array.append(parseElement<T>(child));
         }
     }
@@ -226,7 +225,6 @@ template <typename T> CIMValue ElementDecoder::decodeArray(const XmlElement& ele
 
 CIMValue ElementDecoder::decodeValue(const XmlElement& element, CIMType type)
 {
-    element.ignoreAttributes();
     if (element.is("VALUE.REFERENCE")) {
         return CIMValue(decodeReference(element));
     }

@@ -5,11 +5,41 @@
 #include "pegasus/wire/XmlLimits.h"
 
 #include <cstddef>
+#include <cstdint>
+#include <string>
 #include <string_view>
+#include <vector>
 
 namespace Pegasus::wire {
 
-// One piece of markup or text at the beginning of some bytes.
+// Text that is being read, and the place in the message where it begins.
+struct XmlSource
+{
+    std::string_view text;
+    XmlPlace start{1, 1};
+
+    XmlPlace placeAt(std::size_t offset) const;
+    [[noreturn]] void fail(XmlError::Kind kind, std::size_t offset, const std::string& cause) const;
+    // Throws: XmlError when there is a zero byte before `end`.
+    void expectNoZero(std::size_t end) const;
+};
+
+// A part of a text. Offsets stay valid when the text moves in memory, as it does while more of it arrives.
+struct XmlSpan
+{
+    std::uint32_t begin = 0;
+    std::uint32_t size = 0;
+
+    std::string_view in(std::string_view text) const { return {text.data() + begin, size}; }
+};
+
+struct XmlAttributeSpan
+{
+    XmlSpan name;
+    XmlSpan value; // without its quotes
+};
+
+// One piece of markup or text.
 struct XmlToken
 {
     enum class Type
@@ -27,26 +57,42 @@ struct XmlToken
 
     Type type = Type::kIncomplete;
     std::size_t size = 0;
+    XmlSpan name{}; // of a tag
 };
 
-// Finds where tokens end. Names, attributes and nesting are the parser's to check.
-// Throws: XmlError (a DOCTYPE or another declaration, a token over its limit).
+// Reads one token after the other, by this grammar:
+//
+//   token        = text | start-tag | empty-tag | end-tag | cdata | comment | instruction
+//   text         = one or more bytes other than "<"
+//   start-tag    = "<" name (blanks attribute)* blanks? ">"
+//   empty-tag    = "<" name (blanks attribute)* blanks? "/>"
+//   end-tag      = "</" name blanks? ">"
+//   attribute    = name blanks? "=" blanks? ('"' [^"<]* '"' | "'" [^'<]* "'")
+//   cdata        = "<![CDATA[" ... "]]>"
+//   comment      = "<!--" ... "-->"
+//   instruction  = "<?" ... "?>"
+//   name         = [A-Za-z_:] or a byte from 0x80, then these and [0-9.-]
+//
+// Of XML 1.0 it refuses document types, and with them entities of the sender's own: CIM-XML needs neither, and both are
+// ways to make a small message large. It is more lenient in what has no effect on the meaning: "]]>" in text, "--" in a
+// comment and any content of an instruction pass.
+// Throws: XmlError (another declaration, a malformed tag, a token or a number of attributes over its limit).
 class XmlScanner
 {
   public:
     explicit XmlScanner(const XmlLimits& limits) : fLimits(limits) {}
 
-    // Requires: at least one byte. `place` is where they begin.
-    XmlToken next(std::string_view bytes, XmlPlace place) const;
-
-    // Returns: the name in a tag, which begins with "<" or "</".
-    static std::string_view tagName(std::string_view tag);
+    // Reads the token that begins at `from`, and appends a tag's attributes to `attributes`. All spans are of the
+    // source's text. Requires: from < source.text.size(); the text is smaller than 4 GB.
+    XmlToken next(const XmlSource& source, std::size_t from, std::vector<XmlAttributeSpan>& attributes) const;
 
   private:
-    XmlToken markup(std::string_view bytes, XmlPlace place) const;
-    XmlToken tag(std::string_view bytes, XmlPlace place) const;
-    XmlToken upTo(XmlToken::Type type, std::string_view bytes, std::size_t from, std::string_view end,
-                  std::size_t limit, XmlPlace place) const;
+    XmlToken markup(const XmlSource& source, std::size_t from, std::vector<XmlAttributeSpan>& attributes) const;
+    XmlToken startTag(const XmlSource& source, std::size_t from, std::vector<XmlAttributeSpan>& attributes) const;
+    XmlToken endTag(const XmlSource& source, std::size_t from) const;
+    XmlToken upTo(XmlToken::Type type, const XmlSource& source, std::size_t from, std::size_t contentAt,
+                  std::string_view end, std::size_t limit) const;
+    XmlToken checkedTag(const XmlToken& token, const XmlSource& source, std::size_t from) const;
 
     const XmlLimits& fLimits;
 };

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include "pegasus/wire/XmlDocument.h"
-#include "pegasus/wire/XmlScanner.h"
+#include "pegasus/wire/XmlElement.h"
+#include "pegasus/wire/XmlNodes.h"
 
 #include <string>
 #include <string_view>
@@ -22,55 +22,46 @@ class XmlSliceHandler
     virtual void slice(const XmlElement& element) = 0;
 };
 
-// Cuts a message that arrives in pieces. It delivers the outer elements (the envelope) tag by tag, and each element
-// inside them when all of it has come; then it forgets them.
+// Reads a message that arrives in pieces. It delivers the outer elements (the envelope) tag by tag, and each element
+// inside them as soon as its end has come; then it forgets them.
 // Throws: XmlError, and what the handler throws. After an exception it may only be destroyed.
 class XmlSlicer
 {
   public:
-    // `envelope` names the elements that are opened rather than taken whole. Both references must outlive the slicer.
+    // `envelope` names the elements that are opened rather than taken whole. The handler must outlive the slicer.
     XmlSlicer(std::vector<std::string_view> envelope, XmlSliceHandler& handler, const XmlLimits& limits);
 
     void feed(std::string_view bytes);
     // The message has ended. Throws: XmlError when its XML is incomplete.
     void finish();
 
-    // Returns: the place up to which the message was read.
+    // Returns: the place up to which the message was delivered.
     XmlPlace place() const { return fPlace; }
 
   private:
-    void run();
+    void feedPiece(std::string_view bytes);
     bool step();
-    void take(const XmlToken& token);
-    void takeInSlice(const XmlToken& token);
+    bool stepInSlice();
+    bool stepInEnvelope();
+    void takeDeclaration(const XmlToken& token);
     void takeInEnvelope(const XmlToken& token);
-    void open(const XmlToken& token);
+    void begin(const XmlToken& token);
     void close(std::string_view name);
-    void beginSlice(const XmlToken& token);
-    void endSlice();
-    void flush();
+    void deliver();
     void consume(std::size_t size);
-    XmlPlace here() const;
-    XmlToken nextToken() const;
     void checkElementSize(std::size_t size) const;
     bool isEnvelope(std::string_view name) const;
-    std::string_view rest() const;
+    std::string_view rest() const { return std::string_view(fBuffer).substr(fStart); }
 
     const std::vector<std::string_view> fEnvelope;
     XmlSliceHandler& fHandler;
-    const XmlLimits fLimits;
-    const XmlScanner fScanner;
-    XmlDocument fDocument;
+    XmlNodes fNodes;
 
-    std::vector<char> fBuffer;
-    std::size_t fStart = 0;   // in the buffer: where what was not delivered yet begins
-    std::size_t fScanned = 0; // in the buffer: how far tokens were found
-    XmlPlace fPlace{1, 1};    // of fStart
-    std::vector<std::string> fOpen;
-    std::size_t fSliceDepth = 0; // elements open in the element that begins at fSliceStart; 0 outside
-    std::size_t fSliceStart = 0;
-    std::size_t fSlicesEnd = 0; // end of the whole elements that begin at fStart and were not delivered yet
-    bool fHasSlices = false;    // are there any?
+    std::string fBuffer;
+    std::size_t fStart = 0;         // in the buffer: where what was not delivered yet begins
+    std::size_t fRead = 0;          // from fStart: how far the element that begins there was read
+    XmlPlace fPlace{1, 1};          // of fStart
+    std::vector<std::string> fOpen; // names of the envelope's open elements
     bool fHasDeclaration = false;
     bool fHasRoot = false;
 };

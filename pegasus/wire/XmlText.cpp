@@ -2,6 +2,7 @@
 #include "pegasus/wire/XmlText.h"
 
 #include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/ByteBlock.h"
 #include "pegasus/base/NumberText.h"
 #include "pegasus/base/Text.h"
 #include "pegasus/base/Utf8.h"
@@ -9,7 +10,6 @@
 #include <algorithm>
 #include <array>
 #include <cstdint>
-#include <cstring>
 #include <optional>
 
 namespace Pegasus::wire {
@@ -124,30 +124,18 @@ constexpr std::array<bool, 256> plainCharacters()
 }
 constexpr std::array<bool, 256> kPlain = plainCharacters();
 
-using Block [[gnu::vector_size(16)]] = unsigned char;
-
-Block load(const char* from)
-{
-    Block block;
-    std::memcpy(&block, from, sizeof block);
-    return block;
-}
+using Block = base::ByteBlock;
 
 // Returns: how many characters of a block stay as they are, up to the first other one.
 // Requires, but for kRaw: a character before the block and one after it.
 std::size_t keptIn(const char* from, Blanks blanks)
 {
-    const Block c = load(from);
+    const Block c = base::loadBlock(from);
     auto changes = (c < 0x20) | (c == 0x7F) | (c == '"') | (c == '&') | (c == '\'') | (c == '<') | (c == '>');
     if (blanks == Blanks::kReferences) {
-        changes |= (c == ' ') & (load(from - 1) == ' ');
+        changes |= (c == ' ') & (base::loadBlock(from - 1) == ' ');
     }
-    std::uint64_t halves[2];
-    std::memcpy(halves, &changes, sizeof halves);
-    if (halves[0] != 0) {
-        return static_cast<std::size_t>(__builtin_ctzll(halves[0])) / 8;
-    }
-    return halves[1] != 0 ? 8 + static_cast<std::size_t>(__builtin_ctzll(halves[1])) / 8 : sizeof(Block);
+    return base::firstMarked(changes);
 }
 
 bool isKept(std::string_view text, std::size_t at, Blanks blanks)
@@ -192,27 +180,30 @@ void appendCharacterReference(std::string& out, char c)
 
 std::string_view trimBlanks(std::string_view text)
 {
-    const std::size_t first = text.find_first_not_of(kBlanks);
-    if (first == std::string_view::npos) {
-        return std::string_view();
+    const char* first = text.data();
+    const char* last = first + text.size();
+    while (first < last && isBlank(*first)) {
+        ++first;
     }
-    return text.substr(first, text.find_last_not_of(kBlanks) - first + 1);
+    while (first < last && isBlank(last[-1])) {
+        --last;
+    }
+    return {first, static_cast<std::size_t>(last - first)};
 }
 
 bool isBlank(std::string_view text)
 {
-    return text.find_first_not_of(kBlanks) == std::string_view::npos;
+    return std::all_of(text.begin(), text.end(), [](char c) { return isBlank(c); });
 }
 
 bool isPadding(std::string_view text)
 {
-    return std::all_of(text.begin(), text.end(),
-                       [](char c) { return c == '\0' || kBlanks.find(c) != std::string_view::npos; });
+    return std::all_of(text.begin(), text.end(), [](char c) { return c == '\0' || isBlank(c); });
 }
 
 bool needsResolving(std::string_view text)
 {
-    return text.find('&') != std::string_view::npos || text.find('\r') != std::string_view::npos;
+    return base::findEither(text, 0, '&', '\r') < text.size();
 }
 
 std::string resolveReferences(std::string_view text, std::string& out)

@@ -14,6 +14,11 @@ namespace Pegasus::wire {
 
 constexpr std::string_view kBlanks = " \t\r\n";
 
+constexpr bool isBlank(char c)
+{
+    return c == ' ' || c == '\t' || c == '\r' || c == '\n';
+}
+
 std::string_view trimBlanks(std::string_view text);
 bool isBlank(std::string_view text);
 // Whether this may follow a message: blanks, and the zeros of a server that counts the end of its string.

@@ -165,9 +165,9 @@ CimRequest RequestDecoder::decode(const HttpRequest& http)
     if (!base::isUtf8(http.body)) {
         refuse("request-not-valid", "Invalid UTF-8 character detected.");
     }
-    fText.assign(http.body); // the parser works in place, and an agent may get the body as it came
+    fText.assign(http.body); // the request's elements are views of it
     try {
-        const XmlElement cim = fDocument.parseMessage(fText.data(), fText.size());
+        const XmlElement cim = fDocument.parseMessage(fText);
         static constexpr std::string_view kMessageNames[] = {"ID", "PROTOCOLVERSION"};
         CimRequest request = decodeMessage(cim);
         XmlAttribute message[2];

@@ -73,7 +73,7 @@ CIMValue readAs(const CIMValue& sent, CIMType type)
     wire::appendValue(element, sent);
     wire::XmlDocument document;
     wire::ElementDecoder decoder;
-    return decoder.decodeValue(document.parseFragment(element.data(), element.size()), type);
+    return decoder.decodeValue(document.parseFragment(element), type);
 }
 
 } // namespace

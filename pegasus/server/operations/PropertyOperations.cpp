@@ -20,7 +20,7 @@ class KeptAnswer : public ElementSink
     {
         try {
             wire::XmlDocument document;
-            return wire::ElementDecoder().decodeInstance(document.parseElement(fText.data(), fText.size(), {}));
+            return wire::ElementDecoder().decodeInstance(document.parseFragment(fText));
         } catch (const wire::XmlError& error) {
             throw CIMException(CIM_ERR_FAILED, error.getMessage());
         }

@@ -196,7 +196,7 @@ std::string decodeMembers(std::size_t count, const std::string& last, double& se
     Pegasus::wire::XmlDocument document;
     const std::clock_t start = std::clock();
     try {
-        Pegasus::wire::ElementDecoder().decodeInstance(document.parseFragment(text.data(), text.size()));
+        Pegasus::wire::ElementDecoder().decodeInstance(document.parseFragment(text));
     } catch (const Pegasus::wire::XmlError& error) {
         return std::string(error.getMessage().getCString());
     }

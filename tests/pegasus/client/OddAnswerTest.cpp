@@ -53,6 +53,12 @@ const OddRow kRows[] = {
     {"char16 0", kScalar, "TYPE=\"char16\"><VALUE>&#0;</VALUE>", "<VALUE>&#0;</VALUE>"},
     {"char16 0 in an array", kArray, "TYPE=\"char16\"><VALUE.ARRAY><VALUE>&#x00;</VALUE>", "<VALUE>&#0;</VALUE>"},
 
+    {"blanks between comments", "text", "te<!-- 1 --> <!-- 2 -->xt", "<VALUE>te xt</VALUE>"},
+    {"a section and a reference", "text", " <![CDATA[<a]]>&amp; ", "<VALUE>&lt;a&amp;</VALUE>"},
+    {"'<' in an attribute that nobody reads", "<INSTANCE ", "<INSTANCE a=\"<\" ", "'<' in attribute \"a\""},
+    {"attributes without a blank between", "TYPE=\"string\"", "a=\"1\"TYPE=\"string\"", "XmlError"},
+    {"another end tag", "</VALUE></PROPERTY>", "</VALUE ></PROPERTYX>", "Start-end tags mismatch"},
+    {"a second root element", "</CIM>\n", "</CIM><CIM/>", "a second root element"},
     {"character 0 in a string", "text", "a&#0;b", "Not well-formed: on line 2: a bad reference \"&#0\""},
     {"a null among strings", "<VALUE>x</VALUE>", "<VALUE.NULL/>", kNullInArray},
     {"a null among numbers", kArray, "TYPE=\"uint8\"><VALUE.ARRAY><VALUE>1</VALUE><VALUE.NULL/>", kNullInArray},
@@ -80,7 +86,7 @@ TEST(OddAnswer, IsReadAsItWasMeantOrRefused)
         EXPECT_NE(read.find(row.outcome), std::string::npos) << row.name << ": " << read;
         if (row.outcome == kWhole) {
             // The server reads requests with another parser of the same rules.
-            EXPECT_NO_THROW(Pegasus::wire::XmlDocument().parseMessage(body.data(), body.size())) << row.name;
+            EXPECT_NO_THROW(Pegasus::wire::XmlDocument().parseMessage(body)) << row.name;
         }
     }
 }

@@ -44,7 +44,7 @@ class RecordedCall
   public:
     explicit RecordedCall(const WireCase& wireCase)
         : fBody(wireCase.request.body), fMethod(wireCase.request.method()),
-          fCall(fDocument.parseMessage(fBody.data(), fBody.size()).onlyChild().onlyChild().onlyChild())
+          fCall(fDocument.parseMessage(fBody).onlyChild().onlyChild().onlyChild())
     {
         fNameSpace = wireCase.request.object();
         fNameSpace.erase(std::min(fNameSpace.find(':'), fNameSpace.size()));

@@ -81,7 +81,7 @@ std::string canonicalText(std::string text, int depth, Order order)
     }
     XmlDocument document;
     std::string out = "\n";
-    appendCanonical(out, document.parseFragment(text.data(), text.size()), depth + 1, order);
+    appendCanonical(out, document.parseFragment(text), depth + 1, order);
     return out;
 }
 
@@ -140,7 +140,7 @@ std::string canonicalBody(std::string body, Order order)
     }
     XmlDocument document;
     std::string out;
-    appendCanonical(out, document.parseMessage(body.data(), body.size()), 0, order);
+    appendCanonical(out, document.parseMessage(body), 0, order);
     return out;
 }
 

@@ -71,8 +71,7 @@ void readFile(const std::string& name, std::initializer_list<const char*> elemen
     }
     XmlDocument document;
     ElementDecoder decoder;
-    forEach(document.parseMessage(text.data(), text.size()), elements,
-            [&](const XmlElement& element) { take(decoder, element); });
+    forEach(document.parseMessage(text), elements, [&](const XmlElement& element) { take(decoder, element); });
 }
 
 CMPIStatus statusOf(const std::string& name)
