@@ -53,7 +53,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     Array<CIMParamValue> parameters;
     parameters.append(CIMParamValue(String("Text"), CIMValue(String("x"))));
     const PropertyFilter filter;
-    ContextObject context(broker, request);
+    ContextObject context(broker, request, 1);
     const Frame frame(context.origin);
     ObjectPathObject path(broker, CIMObjectPath(String("root/fuzz:F.Id=\"1\",Number=2")));
     ArgsObject given(broker, parameters, request.nameSpace);
