@@ -34,13 +34,11 @@ CIMPropertyList InstanceSources::properties(const repository::InstanceOptions& o
     repository::ClassOptions classOptions;
     classOptions.localOnly = false;
     classOptions.includeQualifiers = false;
+    classOptions.propertyList = options.propertyList;
     const CIMConstClass named = fCore.repository.getClass(fNameSpace, fClassName, classOptions);
     Array<CIMName> names;
     for (Uint32 i = 0; i < named.getPropertyCount(); ++i) {
-        const CIMName name = named.getProperty(i).getName();
-        if (options.propertyList.isNull() || options.propertyList.contains(name)) {
-            names.append(name);
-        }
+        names.append(named.getProperty(i).getName());
     }
     return CIMPropertyList(names);
 }

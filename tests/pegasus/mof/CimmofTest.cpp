@@ -100,6 +100,7 @@ TEST_F(Cimmof, AnswersTheCommandLineAsOpenPegasusDoes)
         {"checkOnly", {"-E", good, good}, 0, "", ""},
         {"checkOnlyBad", {"-E", bad}, 250, "", "bad.mof:1:7: error: expected a class name instead of '{'\n"},
         {"strict", {"-E", "--strict", capital}, 250, "", ":1:1: error: fails on OpenPegasus 2.14: the word"},
+        {"outsideInclude", {"-E", outside}, 250, "", "lies outside"},
         {"anyInclude", {"-E", "--any-include", outside}, 0, "", ""},
         {"noInclude",
          {"-n", "root/cl", including},

@@ -97,24 +97,27 @@ void createWide(Repository& repository, int memberCount)
 
 using Clock = std::chrono::steady_clock;
 
-// Runs `work` on a thread of its own. Returns: whether calls of `other` were answered all along: each took less than
-// half of the time of `work`.
-bool areAnsweredDuring(const std::function<void()>& work, const std::function<void()>& other)
+// Runs `work` on a thread of its own. Returns: whether a call of `other` began and ended in the first half of that
+// time, apart from its first tenth, in which `work` may still be about to begin.
+bool isAnsweredDuring(const std::function<void()>& work, const std::function<void()>& other)
 {
     std::atomic<bool> isDone{false};
-    const auto start = Clock::now();
+    std::vector<std::pair<Clock::time_point, Clock::time_point>> calls;
+    const Clock::time_point start = Clock::now();
     std::thread worker([&] {
         work();
         isDone = true;
     });
-    auto longest = Clock::duration::zero();
     while (!isDone) {
-        const auto before = Clock::now();
+        const Clock::time_point begin = Clock::now();
         other();
-        longest = std::max(longest, Clock::now() - before);
+        calls.emplace_back(begin, Clock::now());
     }
+    const Clock::duration whole = Clock::now() - start;
     worker.join();
-    return longest < (Clock::now() - start) / 2;
+    return std::any_of(calls.begin(), calls.end(), [&](const auto& call) {
+        return call.first > start + whole / 10 && call.second < start + whole / 2;
+    });
 }
 
 } // namespace
@@ -309,16 +312,16 @@ TEST_F(InstanceTest, LargeObjectsKeepNoOtherRequestWaiting)
         {"getClass", [&] { wide.getClass(kNamespace, CIMName("Wide"), whole); }},
     };
     for (const Row& row : rows) {
-        // The scheduler may starve the other request in a round, but not in each.
-        const auto deadline = Clock::now() + std::chrono::seconds(30);
-        bool isAnswered = false;
-        while (!isAnswered && Clock::now() < deadline) {
+        // A busy machine may let the other thread wait, or the working one begin late.
+        int answered = 0;
+        for (int missed = 0; answered < 3 && missed < 10;) {
             for (const char* name : {"Keys", "Keyless", "Leaf"}) {
                 wide.getClass(kNamespace, CIMName(name), whole);
             }
-            isAnswered = areAnsweredDuring(row.work, [&] { wide.hasClass(kNamespace, CIMName("Keys")); });
+            const bool isAnswered = isAnsweredDuring(row.work, [&] { wide.hasClass(kNamespace, CIMName("Keys")); });
+            ++(isAnswered ? answered : missed);
         }
-        EXPECT_TRUE(isAnswered) << row.name;
+        EXPECT_EQ(answered, 3) << row.name;
     }
 }
 
