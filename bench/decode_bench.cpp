@@ -85,6 +85,19 @@ CIMInstance makeAsset(unsigned index)
     return instance;
 }
 
+// The same properties, of which three have values: a provider's instances have all that their class declares.
+CIMInstance makeSparse(unsigned index)
+{
+    CIMInstance full = makeAsset(index);
+    CIMInstance instance("Bench_Asset");
+    for (Uint32 i = 0; i < full.getPropertyCount(); ++i) {
+        const CIMProperty property = full.getProperty(i);
+        instance.addProperty(i < 3 ? property : CIMProperty(property.getName(), CIMValue(property.getType(), false)));
+    }
+    instance.setPath(full.getPath());
+    return instance;
+}
+
 CIMClass makeClass()
 {
     CIMClass cimClass("Bench_Class", "CIM_LogicalDevice");
@@ -193,6 +206,7 @@ int main(int argc, char** argv)
     };
     const Kind kinds[] = {{"devices", [](unsigned count) { return instances(makeDevice, count); }, asInstances},
                           {"assets", [](unsigned count) { return instances(makeAsset, count); }, asInstances},
+                          {"sparse", [](unsigned count) { return instances(makeSparse, count); }, asInstances},
                           {"classes", classes, asClasses}};
     for (const Kind& kind : kinds) {
         if (argc > 1 && kind.name != std::string(argv[1])) {

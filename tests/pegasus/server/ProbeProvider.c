@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: MIT
 /* A provider that does what a test asks for: many instances, endless instances, errors, upcalls, crashes.
  * Probe_Bulk delivers as many instances as SetCount said (1000 at first); Probe_Endless delivers for ever;
- * Probe_FailAfter delivers one instance, then fails. */
+ * Probe_FailAfter delivers one instance, then fails; Probe_Sparse sets 2 of 17 properties, and Probe_Short has those
+ * alone. */
 #include "tests/pegasus/server/ProbeProcess.h"
 #include "tests/pegasus/server/ProbeTraps.h"
 
@@ -59,7 +60,8 @@ static CMPIObjectPath* makePath(const CMPIObjectPath* of, CMPIUint32 number)
     return path;
 }
 
-static CMPIStatus deliver(const CMPIResult* result, const CMPIObjectPath* of, CMPIUint32 number)
+/* A sparse instance has the properties that every class has. */
+static CMPIStatus deliver(const CMPIResult* result, const CMPIObjectPath* of, CMPIUint32 number, int isSparse)
 {
     static const char* const kTexts[] = {"T2", "T3", "T4", "T5", "T6", "T7", "T8", "T9"};
     char id[32];
@@ -72,10 +74,12 @@ static CMPIStatus deliver(const CMPIResult* result, const CMPIObjectPath* of, CM
     snprintf(id, sizeof id, "bulk-%07u", (unsigned)number);
     setText(instance, "Id", id);
     setText(instance, "T1", gT1);
-    for (size_t i = 0; i < sizeof kTexts / sizeof kTexts[0]; ++i) {
+    for (size_t i = 0; !isSparse && i < sizeof kTexts / sizeof kTexts[0]; ++i) {
         setText(instance, kTexts[i], "A text of about sixty characters, as inventories are full of <them>.");
     }
-    setNumbers(instance, number);
+    if (!isSparse) {
+        setNumbers(instance, number);
+    }
     status = result->ft->returnInstance(result, instance);
     instance->ft->release(instance);
     path->ft->release(path);
@@ -97,15 +101,16 @@ static CMPIStatus enumerateInstances(CMPIInstanceMI* mi, const CMPIContext* cont
     CMPIStatus status = kOk;
     (void)mi, (void)context, (void)properties;
     if (strcasecmp(name, "Probe_FailAfter") == 0) {
-        deliver(result, path, 0);
+        deliver(result, path, 0, 0);
         return failure(CMPI_RC_ERR_ACCESS_DENIED, "the probe says no: \xc3\xa9");
     }
     if (strcasecmp(name, "Probe_Trap") == 0) {
         return deliverPathKey(result, path);
     }
     const int endless = strcasecmp(name, "Probe_Endless") == 0;
+    const int sparse = strcasecmp(name, "Probe_Sparse") == 0 || strcasecmp(name, "Probe_Short") == 0;
     for (CMPIUint32 i = 0; status.rc == CMPI_RC_OK && (endless || i < gCount); ++i) {
-        status = deliver(result, path, i);
+        status = deliver(result, path, i, sparse);
     }
     return status.rc == CMPI_RC_OK ? result->ft->returnDone(result) : status;
 }
@@ -131,7 +136,7 @@ static CMPIStatus getInstance(CMPIInstanceMI* mi, const CMPIContext* context, co
     if (id.type != CMPI_string || sscanf(textOf(id.value.string), "bulk-%u", &number) != 1 || number >= gCount) {
         return failure(CMPI_RC_ERR_NOT_FOUND, "no such probe");
     }
-    CMPIStatus status = deliver(result, path, number);
+    CMPIStatus status = deliver(result, path, number, 0);
     return status.rc == CMPI_RC_OK ? result->ft->returnDone(result) : status;
 }
 
