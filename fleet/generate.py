@@ -103,7 +103,8 @@ class Host:
         records = [self.counted(each, chance) if each["record"] == "instance" else each for each in records]
         if change:
             records = change(records)
-        end = {"command": "inventory", "hostFacts": {"name": self.name, "machineId": self.id},
+        end = {"tool": {"name": "vrxhost", "version": "0.1.0"}, "command": "inventory",
+               "hostFacts": {"name": self.name, "machineId": self.id},
                "classes": sum(each["record"] == "class" for each in records),
                "instances": sum(each["record"] == "instance" for each in records), "complete": not lost,
                "losses": [{"text": LOST.format(each), "vendor": each} for each in lost], "notes": []}

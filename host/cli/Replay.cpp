@@ -49,7 +49,8 @@ EExitStatus Replay(const TOptions& options)
     TDocument document;
     document.fHead = report.GetHead();
     TCollector collector(*record.fNamespace, losses, [&stop] { return stop.IsStopped(); });
-    collector.SetSink(report.BeginStream(), options.fCommand->NeedsInstances());
+    collector.SetSink(options.fCommand->IsStreamed() ? report.BeginStream() : nullptr,
+                      options.fCommand->NeedsInstances());
     try {
         options.fCommand->Fill(collector, document);
         SetTimes(document.fProviders, record.fMilliseconds);

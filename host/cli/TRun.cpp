@@ -199,7 +199,8 @@ void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
     }
     const std::string error = ErrorOf([&] {
         TCollector collector(ns, fLosses, [this] { return fStop.IsStopped(); });
-        collector.SetSink(fReport.BeginStream(), fOptions.fCommand->NeedsInstances());
+        collector.SetSink(fOptions.fCommand->IsStreamed() ? fReport.BeginStream() : nullptr,
+                          fOptions.fCommand->NeedsInstances());
         collector.SetWatch(&fWatch);
         try {
             fOptions.fCommand->Fill(collector, document);

@@ -405,8 +405,14 @@ class BrokenTree(TreeTest):
 
     def test_consequences_are_listed_with_their_cause(self):
         replace_in(self.tree.vendor("linux.properties.mof"), "uint64 TotalBytes;", "uint64 TotalBytes")
-        document = self.expect(PARTIAL, "missing as a consequence: LNX_Memory, LNX_NetworkPort")
+        status, out, err = self.tree.run("doctor", "--format", "json")
+        self.assertEqual(status, PARTIAL, err)
+        self.assertRegex(err, "missing as a consequence: LNX_Memory, LNX_NetworkPort")
+        document = json.loads(out)
         self.assertEqual(len(document["losses"]), 1, document["losses"])
+        _, cause, *classes = document["checks"]
+        self.assertEqual((cause["subject"], cause["ok"]), ("vendor linux", False))
+        self.assertEqual([check["subject"] for check in classes], [f"class {name}" for name in document["losses"][0]["classes"]])
 
     def test_class_that_the_server_does_not_know(self):
         replace_in(self.tree.vendor("linux.classes.xml"), '<class name="LNX_Processor"/>',

@@ -34,7 +34,8 @@ class TDiffCommand : public ICommand
     }
     bool NeedsInstances() const override { return true; }
     std::string GetReplay() const override { return fTo; }
-    bool IsShownAs(const std::string& format) const override { return format == "table" || format == "json"; }
+    bool IsStreamed() const override { return false; }
+    bool IsShownAs(const std::string& format) const override { return format != "tree" && format != "html"; }
 
     void Fill(TCollector& from, TDocument& into) const override
     {

@@ -4,6 +4,7 @@
 #include "host/cli/commands/ICommand.h"
 
 #include <algorithm>
+#include <utility>
 
 namespace vrxhost {
 namespace {
@@ -104,21 +105,30 @@ void AddClassChecks(const TLoss& loss, TDocument& document)
     }
 }
 
+void AddConsequences(const TLoss& loss, TDocument& document)
+{
+    TLoss cause = loss;
+    cause.fClasses.clear();
+    document.fChecks.push_back(CheckOf(cause, document));
+    for (const std::string& name : loss.fClasses) {
+        TCheck check;
+        check.fSubject = "class " + name;
+        check.fText = "missing as a consequence of " + loss.fFile;
+        check.fAdvice = "correct that file first";
+        document.fChecks.push_back(std::move(check));
+    }
+}
+
 // A class that fails has a line of its own, also when several fail of one cause.
 void AddChecks(const TLoss& loss, TDocument& document)
 {
     const bool isOfEachClass = loss.fClasses.size() == 1 || loss.fObjects.size() == loss.fClasses.size();
-    if (loss.fIsNote || loss.fIsCause || loss.fClasses.empty() || !isOfEachClass) {
+    if (loss.fIsCause) {
+        AddConsequences(loss, document);
+    } else if (loss.fIsNote || loss.fClasses.empty() || !isOfEachClass) {
         document.fChecks.push_back(CheckOf(loss, document));
     } else {
         AddClassChecks(loss, document);
-    }
-    for (std::size_t i = 0; loss.fIsCause && i < loss.fClasses.size(); ++i) {
-        TCheck check;
-        check.fSubject = "class " + loss.fClasses[i];
-        check.fText = "missing as a consequence of " + loss.fFile;
-        check.fAdvice = "correct that file first";
-        document.fChecks.push_back(std::move(check));
     }
 }
 

@@ -33,6 +33,9 @@ class ICommand
     // Returns: the record that the command itself names as its machine, in place of --replay; empty for none.
     virtual std::string GetReplay() const { return ""; }
 
+    // Returns: whether formats that write instances as they come do so; a comparison needs both sides first.
+    virtual bool IsStreamed() const { return true; }
+
     // Returns: whether the format can hold what the command shows.
     virtual bool IsShownAs(const std::string& format) const;
 

@@ -7,6 +7,19 @@
 namespace vrxhost {
 namespace {
 
+std::string SideText(const TPropertyRecord& side, const TPropertyDeclRecord& declaration, const TFormatOptions& options)
+{
+    const std::string text = ValueText(side, &declaration, options);
+    return side.fValue.IsNull() ? "null" : text.empty() ? "\"\"" : text;
+}
+
+TJson JsonSide(const TPropertyRecord& side)
+{
+    return {{"value", JsonValue(side.fValue)}, {"text", side.fText}};
+}
+
+} // namespace
+
 const char* NameOf(EDifference kind)
 {
     switch (kind) {
@@ -19,17 +32,6 @@ const char* NameOf(EDifference kind)
     default:
         return "unknown";
     }
-}
-
-std::string SideText(const TPropertyRecord& side, const TPropertyDeclRecord& declaration, const TFormatOptions& options)
-{
-    const std::string text = ValueText(side, &declaration, options);
-    return side.fValue.IsNull() ? "null" : text.empty() ? "\"\"" : text;
-}
-
-TJson JsonSide(const TPropertyRecord& side)
-{
-    return {{"value", JsonValue(side.fValue)}, {"text", side.fText}};
 }
 
 TJson JsonDifference(const TDifference& difference)
@@ -53,8 +55,6 @@ TJson JsonDifference(const TDifference& difference)
     }
     return json;
 }
-
-} // namespace
 
 std::string DifferenceLines(const TComparison& comparison, const TFormatOptions& options)
 {

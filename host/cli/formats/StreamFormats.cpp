@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 // Formats that write each instance as it comes, so that memory does not grow with their number.
+#include "host/cli/formats/Differences.h"
 #include "host/cli/formats/JsonValues.h"
 #include "host/cli/formats/TextLayout.h"
 #include "host/cli/formats/ValueText.h"
@@ -74,7 +75,9 @@ class TNdjsonFormat : public TStreamFormat
     {
         fHead = document.fHead;
         fProvider.clear();
+        const std::string differences = document.fComparison ? DifferenceRecords(*document.fComparison) : "";
         TJson json = Record("end");
+        json["tool"] = {{"name", "vrxhost"}, {"version", VRX_VERSION}};
         json["command"] = fHead.fCommand;
         json["hostFacts"] = JsonHost(fHead.fHost);
         json["classes"] = fClassCount;
@@ -87,10 +90,26 @@ class TNdjsonFormat : public TStreamFormat
                 }
             }
         }
-        return JsonText(json, -1);
+        if (document.fComparison) {
+            const TComparison& compared = *document.fComparison;
+            json["compared"] = {{"from", compared.fFrom}, {"to", compared.fTo}};
+            json["differences"] = compared.fDifferences.size();
+        }
+        return differences + JsonText(json, -1);
     }
 
   private:
+    std::string DifferenceRecords(const TComparison& comparison)
+    {
+        std::string lines;
+        for (const TDifference& each : comparison.fDifferences) {
+            TJson json = Record("difference");
+            json["difference"] = JsonDifference(each);
+            lines += JsonText(json, -1);
+        }
+        return lines;
+    }
+
     TJson Record(const char* kind)
     {
         ++fRecordCount;
@@ -132,12 +151,9 @@ class TCsvFormat : public TStreamFormat
                 continue;
             }
             const TPropertyDeclRecord* const declaration = each.Find(property.fName);
-            const std::string value = JsonText(JsonValue(property.fValue), -1);
-            const bool isText = !property.fValue.IsArray() && value.front() == '"';
             lines += Quoted(fProvider) + "," + Quoted(each.fName) + "," + Quoted(instance.fPath) + "," +
                      Quoted(property.fName) + "," + (declaration ? declaration->fType : "") + "," +
-                     Quoted(isText ? property.fValue.ToString(10) : value.substr(0, value.size() - 1)) + "," +
-                     Quoted(property.fText) + "\n";
+                     ValueField(property.fValue) + "," + Quoted(property.fText) + "\n";
         }
         Write(lines);
     }
@@ -145,6 +161,9 @@ class TCsvFormat : public TStreamFormat
     // A class that was given up is a line without path.
     std::string Finish(const TDocument& document) override
     {
+        if (document.fComparison) {
+            return ComparisonLines(*document.fComparison);
+        }
         std::string lines;
         for (const TProviderRecord& provider : document.fProviders) {
             for (const TClassRecord& each : provider.fClasses) {
@@ -157,6 +176,29 @@ class TCsvFormat : public TStreamFormat
     }
 
   private:
+    // What a side lacks is an empty field, as its null.
+    static std::string ComparisonLines(const TComparison& comparison)
+    {
+        std::string lines = "class,path,property,kind,from,to,reason\n";
+        for (const TDifference& each : comparison.fDifferences) {
+            lines += Quoted(each.fClass) + "," + Quoted(each.fPath) + "," + Quoted(each.fDeclaration.fName) + "," +
+                     NameOf(each.fKind) + "," + ValueField(each.fFrom.fValue) + "," + ValueField(each.fTo.fValue) +
+                     "," + Quoted(each.fReason) + "\n";
+        }
+        return lines;
+    }
+
+    // A text as it is, everything else as in JSON.
+    static std::string ValueField(const NKOLVRX20::TCIMValue& value)
+    {
+        if (value.IsNull()) {
+            return "";
+        }
+        const std::string json = JsonText(JsonValue(value), -1);
+        const bool isText = !value.IsArray() && json.front() == '"';
+        return Quoted(isText ? value.ToString(10) : json.substr(0, json.size() - 1));
+    }
+
     // Control bytes as escapes, so that a record stays one line.
     static std::string Quoted(const std::string& field)
     {

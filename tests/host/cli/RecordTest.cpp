@@ -240,6 +240,22 @@ Fake_Many
               R"("to":{"text":"18446744073709551615 Bits per second","value":18446744073709551615},)"
               R"("units":"Bits per second"})");
     EXPECT_EQ(json["differences"][2].dump(), R"({"class":"Fake_Many","kind":"added","path":"Fake_Many #2"})");
+    const auto csv = Start({VRXHOST, "diff", a, b, "--format", "csv"});
+    EXPECT_TRUE(HasStatus(csv, 4));
+    EXPECT_EQ(csv.fOutput, R"(class,path,property,kind,from,to,reason
+Fake_EveryType,"Fake_EveryType.ID=""one \""two\""\x1b[31m""",Boolean,changed,true,,
+Fake_EveryType,"Fake_EveryType.ID=""one \""two\""\x1b[31m""",Speed,changed,18446744073709551615,1000000000,
+Fake_Many,Fake_Many #2,,removed,,,
+)");
+    std::istringstream lines(Start({VRXHOST, "diff", b, a, "--format", "ndjson"}).fOutput);
+    std::vector<nlohmann::json> records;
+    for (std::string line; std::getline(lines, line);) {
+        records.push_back(nlohmann::json::parse(line));
+    }
+    ASSERT_EQ(records.size(), 4U) << "the differences and the end";
+    EXPECT_EQ(records[1]["difference"], json["differences"][1]);
+    EXPECT_EQ(records[3]["compared"].dump(), nlohmann::json({{"from", b}, {"to", a}}).dump());
+    EXPECT_EQ(records[3]["differences"], 3);
     const auto live = Run({"diff", a, "--set", "fake.count=2"});
     EXPECT_TRUE(HasStatus(live, 0));
 }
@@ -257,7 +273,7 @@ TEST_F(Record, WhatWasNotCompleteIsUnknown)
     Change(b, "about\t" + lost, "");
     EXPECT_EQ(Start({VRXHOST, "diff", a, b}).fOutput, "Fake_Many\n  unknown  " + b + " was not complete\n");
     for (const std::vector<std::string>& wrong :
-         {std::vector<std::string>{VRXHOST, "diff", a, b, "--replay", a}, {VRXHOST, "diff", a, b, "--format", "csv"}})
+         {std::vector<std::string>{VRXHOST, "diff", a, b, "--replay", a}, {VRXHOST, "diff", a, b, "--format", "tree"}})
     {
         EXPECT_TRUE(HasStatus(Start(wrong), 2));
     }
