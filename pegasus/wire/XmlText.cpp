@@ -208,25 +208,25 @@ bool needsResolving(std::string_view text)
 
 std::string resolveReferences(std::string_view text, std::string& out)
 {
-    for (std::size_t i = 0; i < text.size(); ++i) {
-        const char c = text[i];
-        if (c == '\r') {
-            out += '\n';
-            i += i + 1 < text.size() && text[i + 1] == '\n' ? 1 : 0;
-        } else if (c != '&') {
-            out += c;
-        } else {
-            const std::size_t end = text.find(';', i);
-            const std::string_view reference = text.substr(i + 1, end == std::string_view::npos ? end : end - i - 1);
-            if (end == std::string_view::npos || reference.size() > kMaxReferenceBytes ||
-                !appendReference(reference, out))
-            {
-                return "a bad reference \"&" + std::string(reference.substr(0, kMaxReferenceBytes)) + "\"";
-            }
-            i = end;
+    for (std::size_t at = 0;;) {
+        const std::size_t next = base::findEither(text, at, '&', '\r');
+        out.append(text.substr(at, next - at));
+        if (next == text.size()) {
+            return std::string();
         }
+        if (text[next] == '\r') {
+            out += '\n';
+            at = next + (text.substr(next, 2) == "\r\n" ? 2 : 1);
+            continue;
+        }
+        const std::size_t end = text.find(';', next);
+        const std::string_view reference = text.substr(next + 1, end == std::string_view::npos ? end : end - next - 1);
+        if (end == std::string_view::npos || reference.size() > kMaxReferenceBytes || !appendReference(reference, out))
+        {
+            return "a bad reference \"&" + std::string(reference.substr(0, kMaxReferenceBytes)) + "\"";
+        }
+        at = end + 1;
     }
-    return std::string();
 }
 
 bool isZeroReference(std::string_view text)
