@@ -30,10 +30,28 @@ static const char* typesAreAsNamed(const Env* env)
     return NULL;
 }
 
-static const char* oddArraysAreRefused(const Env* env)
+static const char* oddArraysAreMade(const Env* env)
 {
     CMPIStatus rc = kGarbage;
-    REQUIRE(env->mb->eft->newArray(env->mb, 1, 0x0777, &rc) == NULL && rc.rc != CMPI_RC_OK);
+    const CMPIArray* array = env->mb->eft->newArray(env->mb, 1, 0x0777, &rc);
+    REQUIRE(array != NULL && rc.rc == CMPI_RC_OK);
+    return NULL;
+}
+
+static const char* oddArraysTakeNothing(const Env* env)
+{
+    const CMPIInstance* instance = newInst(env, "TST_Everything");
+    const CMPIValue odd = {.array = env->mb->eft->newArray(env->mb, 1, 0x0777, NULL)};
+    const CMPIValue number = {.uint32 = 1};
+    REQUIRE(odd.array->ft->setElementAt(odd.array, 0, &number, CMPI_uint32).rc == CMPI_RC_ERR_INVALID_DATA_TYPE);
+    REQUIRE(odd.array->ft->getElementAt(odd.array, 0, NULL).state == CMPI_nullValue);
+    REQUIRE(instance->ft->setProperty(instance, "U32A", &odd, CMPI_uint32A).rc == CMPI_RC_ERR_INVALID_DATA_TYPE);
+    return NULL;
+}
+
+static const char* hugeArraysAreRefused(const Env* env)
+{
+    CMPIStatus rc = kGarbage;
     REQUIRE(env->mb->eft->newArray(env->mb, 0xFFFFFFFFU, CMPI_uint8, &rc) == NULL && rc.rc != CMPI_RC_OK);
     return NULL;
 }
@@ -205,7 +223,9 @@ static const char* argumentsEnd(const Env* env)
 
 const CheckRow kArrayChecks[] = {{"arrays start null", arraysStartNull, kStandard},
                                  {"array types are as named", typesAreAsNamed, kStandard},
-                                 {"odd arrays are refused", oddArraysAreRefused, kOursOnly},
+                                 {"arrays of odd types are made", oddArraysAreMade, kStandard},
+                                 {"arrays of odd types take nothing", oddArraysTakeNothing, kOursOnly},
+                                 {"huge arrays are refused", hugeArraysAreRefused, kOursOnly},
                                  {"elements are checked", elementsAreChecked, kStandard},
                                  {"elements without value are null", elementsWithoutValueAreNull, kOursOnly},
                                  {"arrays of text", arraysOfText, kStandard},

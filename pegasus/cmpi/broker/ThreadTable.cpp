@@ -11,7 +11,7 @@
 #include <time.h>
 
 // The platform's threads under CMPI's names. CMPI gives providers these so that they run on any platform; here each is
-// one pthread call. Integer results are 0 or an errno.
+// one pthread call. Integer results are 0 or an errno, but for threadOnce().
 namespace Pegasus::cmpi {
 namespace {
 
@@ -69,9 +69,10 @@ int threadSleep(CMPIUint32 milliseconds)
 
 static_assert(sizeof(pthread_once_t) == sizeof(int), "CMPI keeps the once control in an int");
 
+// Success is 1, as on OpenPegasus, whose providers may take 0 for a failure.
 int threadOnce(int* once, CMPIThreadOnceFunc function)
 {
-    return ::pthread_once(once, function);
+    return ::pthread_once(once, function) == 0 ? 1 : 0;
 }
 
 static_assert(sizeof(pthread_key_t) == sizeof(CMPIThreadKey), "CMPI keeps keys in unsigned ints");

@@ -39,12 +39,23 @@ CMPIStatus setElementAt(const CMPIArray* self, CMPICount index, const CMPIValue*
     return perform([&] { objectOf<ArrayObject>(self).set(index, value, type); });
 }
 
+// Returns: the CIM type of a CMPI type. Of a type that CIM lacks an array is made all the same, as on OpenPegasus; its
+// elements stay null.
+CIMType elementTypeOf(CMPIType type)
+{
+    try {
+        return cimTypeOf(type);
+    } catch (const CmpiError&) {
+        return CIMTYPE_BOOLEAN;
+    }
+}
+
 std::vector<CIMValue> nulls(CMPICount size, CMPIType type)
 {
     if (size > kMaxElements) {
         throw CmpiError{CMPI_RC_ERR_INVALID_PARAMETER, "newArray: more than 16777216 elements"};
     }
-    return std::vector<CIMValue>(size, CIMValue(cimTypeOf(type), false));
+    return std::vector<CIMValue>(size, CIMValue(elementTypeOf(type), false));
 }
 
 template <typename T> T valueOf(const CIMValue& value)

@@ -12,8 +12,8 @@ namespace Pegasus::cmpi {
 class ArrayObject final : public Owned, public CMPIArray
 {
   public:
-    // `type` may have the array bit.
-    // Throws: CMPI_RC_ERR_INVALID_DATA_TYPE; CMPI_RC_ERR_INVALID_PARAMETER for more elements than kMaxElements.
+    // `type` may have the array bit, and be one that CIM lacks: no value fits then.
+    // Throws: CMPI_RC_ERR_INVALID_PARAMETER for more elements than kMaxElements.
     ArrayObject(Broker& broker, CMPICount size, CMPIType type);
     ArrayObject(Broker& broker, CMPIType type, std::vector<CIMValue> elements);
     ArrayObject(const ArrayObject& other) : ArrayObject(other.fBroker, other.fType, other.fElements) {}
