@@ -117,8 +117,9 @@ class HealthyTree(TreeTest):
         clone = os.path.join(self.tree.folder, "clone")
         subprocess.run(["git", "clone", "--quiet", SOURCE, clone], check=True)
         self.tree.elsewhere = clone
-        status, _, err = self.tree.run("classes")
+        status, out, err = self.tree.run("doctor", "--stable")
         self.assertEqual((status, err), (COMPLETE, ""))
+        self.assertRegex(out, r"^Vendor linuxinventory  ok: 8 classes, \d+ instances\n$")
         changed = subprocess.run(["git", "-C", clone, "status", "--porcelain", "--ignored"], stdout=subprocess.PIPE, text=True,
                                  check=True)
         self.assertEqual(changed.stdout, "")

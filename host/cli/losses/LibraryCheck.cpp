@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "host/cli/losses/LibraryCheck.h"
 
+#include "host/cli/losses/LossRules.h"
+#include "host/cli/losses/RegistrationText.h"
 #include "host/core/TChildProcess.h"
 
 #include <algorithm>
@@ -56,6 +58,7 @@ std::string DescribeMissing(const NKOLVRX20::TProcessOutcome& outcome)
     std::istringstream lines(outcome.fOutput + "\n" + outcome.fErrorOutput);
     for (std::string line; std::getline(lines, line);) {
         std::smatch parts;
+        line.resize(std::min(line.size(), kMaxMatchedBytes)); // the name of a symbol may have any length
         if (std::regex_match(line, parts, kLibrary)) {
             AddMissing(libraries, "the library " + parts[1].str() + " is missing");
         } else if (std::regex_match(line, parts, kSymbol)) {
@@ -86,11 +89,9 @@ void Enter(TLossLog& losses, const TVendorFolder& folder, const std::string& fil
 
 void CheckLocations(const TVendorFolder& folder, const TVendorFiles& files, const std::string& root, TLossLog& losses)
 {
-    static const std::regex kLocation("Location\\s*=\\s*\"([^\"]+)\"", std::regex::icase);
     for (const std::string& path : folder.fRegistrations) {
-        const std::string text = ReadBeginning(path);
-        for (std::sregex_iterator found(text.begin(), text.end(), kLocation), end; found != end; ++found) {
-            const std::string name = "lib" + (*found)[1].str() + ".so";
+        for (const std::string& location : LocationsOf(path)) {
+            const std::string name = "lib" + location + ".so";
             if (!Exists(name, files, root)) {
                 Enter(losses, folder, path, ELossKind::kLocation,
                       "the library " + name + " (Location) is in no vendor's folder");

@@ -193,6 +193,9 @@ std::optional<TLoss> LossOfListedClass(const std::string& line)
                                       "string\\.");
     std::smatch found;
     TLoss loss;
+    if (line.size() > kMaxMatchedBytes) {
+        return std::nullopt;
+    }
     if (std::regex_match(line, found, kName)) {
         loss = LossOf(EKind::kClassName, "the class name \"" + found[1].str() + "\" is invalid");
         loss.fFile = found[2];
@@ -251,7 +254,7 @@ std::vector<TLoss> NotesOfCompiler(const std::string& text)
     std::istringstream lines(text.find(kTrap) == std::string::npos ? "" : text);
     for (std::string line; std::getline(lines, line);) {
         std::smatch found;
-        if (std::regex_match(line, found, kWarning)) {
+        if (line.size() <= kMaxMatchedBytes && std::regex_match(line, found, kWarning)) {
             TLoss note = LossOf(EKind::kMofPortability, "line " + found[2].str() + ", column " + found[3].str() +
                                                             ": fails on OpenPegasus 2.14: " + found[4].str());
             note.fFile = found[1];
@@ -267,7 +270,7 @@ std::optional<TLoss> NoteOfServerLine(const TServerLogLine& line)
 {
     static const std::regex kKey("addKey: (\\S+) is not a key of class (\\S+)");
     std::smatch found;
-    if (std::regex_search(line.fText, found, kKey)) {
+    if (line.fText.size() <= kMaxMatchedBytes && std::regex_search(line.fText, found, kKey)) {
         TLoss key =
             LossOf(EKind::kUndeclaredKey, "provider module " + line.fModule + " uses " + found[1].str() +
                                               " as a key of class " + found[2].str() + ", which declares it as none");
@@ -290,7 +293,7 @@ std::optional<TLoss> LossOfServerLine(const TServerLogLine& line)
     static const std::regex kRefused("(?:setProperty|addKey): (?:class (\\S+) has no property (\\S+)"
                                      "|(?:property|key) (\\S+) of (\\S+) has another type.*)");
     std::smatch found;
-    if (!std::regex_search(line.fText, found, kRefused)) {
+    if (line.fText.size() > kMaxMatchedBytes || !std::regex_search(line.fText, found, kRefused)) {
         return std::nullopt;
     }
     const bool isUnknown = found[1].matched;

@@ -5,11 +5,16 @@
 #include "host/cli/model/Loss.h"
 #include "host/core/TProcessLog.h"
 
+#include <cstddef>
 #include <optional>
 #include <string>
 #include <vector>
 
 namespace vrxhost {
+
+// Bytes of a line that is matched with an expression: the C++ library's matcher takes stack for each. Longer lines are
+// no losses of a known kind; program output is cut to its lines first.
+constexpr std::size_t kMaxMatchedBytes = 4096;
 
 // Returns: the loss that a log line of the plug-in reports, whatever its severity; empty for other lines.
 std::optional<TLoss> LossOfLine(const std::string& line);

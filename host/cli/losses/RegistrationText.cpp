@@ -102,6 +102,17 @@ std::string Listed(const std::set<std::string>& names)
 
 } // namespace
 
+std::vector<std::string> LocationsOf(const std::string& registrationFile)
+{
+    std::vector<std::string> locations;
+    for (TTexts module : InstancesOf("PG_ProviderModule", TokensOf(ReadBeginning(registrationFile)))) {
+        if (!module["location"].empty()) {
+            locations.push_back(module["location"]);
+        }
+    }
+    return locations;
+}
+
 std::string DescribeUnknownNames(const std::string& registrationFile)
 {
     const TTokens tokens = TokensOf(ReadBeginning(registrationFile));

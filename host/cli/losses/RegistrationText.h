@@ -2,8 +2,12 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 namespace vrxhost {
+
+// Returns: what the modules of a registration file name as their libraries ("acme" for libacme.so).
+std::vector<std::string> LocationsOf(const std::string& registrationFile);
 
 // The server refuses a registration whose provider or module it does not know, and its sentence names neither. The file
 // has the names: this compares them with each other.

@@ -62,6 +62,25 @@ TEST(LossRules, LinesOfThePlugin)
     }
 }
 
+// Expressions are matched with recursion; what a vendor writes must not exhaust the stack.
+TEST(LossRules, LinesOfAnyLengthAreRead)
+{
+    const std::string name(1 << 20, 'x');
+    const std::string trap = ": works here, fails on OpenPegasus 2.14: ";
+    for (const std::string& line :
+         {"TPEGASUSNamespace::CollectClass failed: the class name \"" + name + "\" in /a is invalid",
+          "Not supported type of property " + name + " in class A: 1, default to string.",
+          "x: /a:1:1: warning" + trap + name, "x: /" + name + ":1:1: warning" + trap + "b"})
+    {
+        EXPECT_FALSE(LossOfLine(line)) << line.substr(0, 60);
+        EXPECT_TRUE(NotesOfCompiler(line).empty());
+    }
+    for (const std::string begin : {"setProperty: class ", "addKey: ", "setProperty: property "}) {
+        EXPECT_FALSE(LossOfServerLine({"m", begin + name + " of A has another type"}));
+        EXPECT_FALSE(NoteOfServerLine({"m", begin + name + " is not a key of class A"}));
+    }
+}
+
 struct TProgramRow
 {
     const char* fName;
