@@ -33,6 +33,8 @@ struct KnownDifference
     Why why;
     const char* reason;
     std::vector<Edit> edits; // each is made wherever its pattern matches, and must match
+    // The recorded answer ended early: its instances are among ours, in any order, and are left out of both.
+    bool isCutShort = false;
 };
 
 using KnownDifferences = std::vector<KnownDifference>;
@@ -44,7 +46,7 @@ const KnownDifferences& differencesOfProbes();
 const KnownDifference* findDifference(const KnownDifferences& known, const std::string& name);
 
 // Makes the edits: both texts are equal then, if they differ in those parts only.
-// Returns: the first pattern that matches nothing; empty when all do.
+// Returns: the first pattern that matches nothing, or the first recorded instance that ours lacks; empty without one.
 std::string reconcile(const KnownDifference& known, std::string& ours, std::string& recorded);
 
 } // namespace servertest

@@ -43,7 +43,7 @@ class Tally
             return;
         }
         const std::string missing = row != nullptr ? reconcile(*row, ours, recorded) : std::string();
-        EXPECT_EQ(missing, "") << name << ": the row's pattern matches nothing";
+        EXPECT_EQ(missing, "") << name << ": the row does not describe the difference";
         if (row == nullptr || ours != recorded) {
             ++fDifferent;
             ADD_FAILURE() << name << ": " << firstDifference(ours, recorded);
