@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
-#include "pegasus/cmpi/module/ProviderLibrary.h"
 #include "pegasus/wire/ElementEncoder.h"
-#include "tests/pegasus/cmpi/MofServices.h"
+#include "tests/pegasus/cmpi/ModuleFixture.h"
 
 #include <Pegasus/Common/CIMProperty.h>
 #include <Pegasus/Common/Exception.h>
@@ -16,68 +15,11 @@
 
 #include <dlfcn.h>
 
-#define FAULT_LIBRARY(fault) FAULT_LIBRARY_PREFIX #fault ".so"
-
 namespace Pegasus::cmpi {
 namespace {
 
 using testing::ElementsAre;
 using testing::HasSubstr;
-
-constexpr const char* kProvider = "Conformance";
-
-// Returns: "code: text" of the call's exception, "" on success.
-template <typename Call> std::string errorOf(Call&& call)
-{
-    try {
-        call();
-    } catch (const CIMException& error) {
-        return std::to_string(error.getCode()) + ": " + text(error.getMessage());
-    }
-    return {};
-}
-
-class Module : public testing::Test
-{
-  protected:
-    Module() { services.compileFile(CONFORMANCE_SOURCES "/conformance.mof"); }
-
-    void load(const char* library = CONFORMANCE_LIBRARY, const char* provider = kProvider)
-    {
-        name = provider;
-        module = std::make_unique<ProviderModule>("tests", library, services);
-        services.route(*module, name);
-    }
-
-    ProviderRequest request() const { return MofServices::request(name); }
-
-    CIMValue invoke(const char* method, const Array<CIMParamValue>& in, Array<CIMParamValue>& out)
-    {
-        return module->invokeMethod(request(), CIMObjectPath(String("TST_Check")), CIMName(method), in, out);
-    }
-
-    CIMValue invoke(const char* method, const char* parameter, const CIMValue& value)
-    {
-        Array<CIMParamValue> in;
-        Array<CIMParamValue> out;
-        in.append(CIMParamValue(String(parameter), value));
-        return invoke(method, in, out);
-    }
-
-    void setMode(const std::string& mode) { invoke("SetMode", "Mode", CIMValue(String(mode.c_str()))); }
-
-    std::vector<CIMInstance> items(const CIMPropertyList& properties = CIMPropertyList())
-    {
-        std::vector<CIMInstance> found;
-        module->enumerateInstances(request(), CIMName("TST_Item"), properties,
-                                   [&](const CIMInstance& instance) { found.push_back(instance); });
-        return found;
-    }
-
-    MofServices services;
-    std::string name;
-    std::unique_ptr<ProviderModule> module;
-};
 
 // Returns: the names of all checks, or of those that hold on every server.
 std::vector<std::string> checkNames(bool isStandardOnly)
@@ -453,83 +395,6 @@ TEST_F(Module, ServesSixteenClientsAndNeverCleansUpMeanwhile)
     Array<CIMParamValue> out;
     invoke("Tell", Array<CIMParamValue>(), out);
     EXPECT_EQ(out[0].getValue(), CIMValue(Sint32{0}));
-}
-
-TEST_F(Module, RefusesLibrariesThatAreNone)
-{
-    struct Case
-    {
-        const char* name;
-        const char* library;
-        const char* provider;
-        const char* expected;
-    };
-    const std::vector<Case> cases{
-        {"no such file", "/nonexistent/libx.so", "Faulty",
-         "ProviderLoadFailure: (/nonexistent/libx.so) Cannot load library, error: "},
-        {"not a library", CONFORMANCE_SOURCES "/conformance.mof", "Faulty", "Cannot load library, error: "},
-        {"other provider name", CONFORMANCE_LIBRARY, "conformance",
-         ") Provider is not a CMPI style provider. Cannot find conformance_Create<mi-type>MI symbol."},
-        {"misspelt", FAULT_LIBRARY(MISSPELT), "Faulty", "Cannot find Faulty_Create<mi-type>MI symbol."},
-        {"both styles", FAULT_LIBRARY(BOTH_STYLES), "Faulty", "both generic and Faulty entry points"},
-        {"no interface", FAULT_LIBRARY(NULL_OK), "Faulty", "ProviderInitFailure: "},
-        {"no table", FAULT_LIBRARY(NO_TABLE), "Faulty",
-         "provider Faulty, Faulty_Create_InstanceMI: the interface has no function table"},
-    };
-    for (const Case& row : cases) {
-        const std::string error = errorOf([&] {
-            load(row.library, row.provider);
-            items();
-        });
-        EXPECT_THAT(error, testing::StartsWith("1: Provider")) << row.name;
-        EXPECT_THAT(error, HasSubstr(row.expected)) << row.name;
-    }
-}
-
-TEST_F(Module, TriesAFailedFactoryAgain)
-{
-    load(FAULT_LIBRARY(FAILS_ONCE), "Faulty");
-    const std::string error = errorOf([&] { items(); });
-    EXPECT_THAT(error, HasSubstr("Faulty_Create_InstanceMI: no device yet"));
-    EXPECT_EQ(items().size(), 1U);
-    EXPECT_EQ(errorOf([&] { invoke("Any", "X", CIMValue(Uint8{1})); }),
-              "16: provider Faulty has no Method interface: " FAULT_LIBRARY(
-                  FAILS_ONCE) " defines neither "
-                              "Faulty_Create_MethodMI nor _Generic_Create_MethodMI");
-}
-
-TEST_F(Module, SurvivesWhatProvidersInCppThrow)
-{
-    load(FACTORY_LIBRARY, "Exact");
-    EXPECT_EQ(items().size(), 0U);
-    load(FACTORY_LIBRARY, "Throwing");
-    EXPECT_THAT(errorOf([&] { items(); }), HasSubstr("Throwing_Create_InstanceMI: no device: the factory throws"));
-    load(FACTORY_LIBRARY, "Late");
-    EXPECT_EQ(errorOf([&] { items(); }), "1: Unknown error.");
-}
-
-TEST_F(Module, GenericFactoriesGetTheProvidersName)
-{
-    load(FAULT_LIBRARY(GENERIC), "AnyName");
-    EXPECT_EQ(propertyText(items().at(0), "Id"), "AnyName");
-}
-
-TEST_F(Module, ReadsNothingBehindAnOldTable)
-{
-    load(FAULT_LIBRARY(OLD_TABLE), "Faulty");
-    EXPECT_EQ(propertyText(items().at(0), "Id"), "static");
-    EXPECT_EQ(
-        errorOf([&] { module->getInstance(request(), CIMObjectPath(String("TST_Item.Id=\"1\"")), CIMPropertyList()); }),
-        "7: provider Faulty does not implement getInstance");
-}
-
-TEST(ProviderLibrary, IsTheFirstInTheDirectories)
-{
-    const std::string directory = CONFORMANCE_SOURCES;
-    EXPECT_EQ(findProviderLibrary({"/nonexistent", CONFORMANCE_DIRECTORY, directory}, "conformance", "M"),
-              std::string(CONFORMANCE_DIRECTORY) + "/libconformance.so");
-    EXPECT_EQ(errorOf([&] { findProviderLibrary({directory}, "NoSuchLibrary", "NoLibModule"); }),
-              "1: File \"libNoSuchLibrary.so\" was not found for provider module \"NoLibModule\".");
 }
 
 } // namespace

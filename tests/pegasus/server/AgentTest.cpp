@@ -7,6 +7,7 @@
 #include <fstream>
 #include <iterator>
 #include <tuple>
+#include <utility>
 
 #include <sys/stat.h>
 
@@ -141,6 +142,27 @@ TEST_F(AgentTest, changesReachTheProviderThatHasThem)
     EXPECT_NE(ask("GetProperty", "").find("<VALUE>set</VALUE>"), std::string::npos);
     EXPECT_EQ(errorOf([&] { fClient.deleteInstance(kNamespace, path); }),
               "Unrecognized CIM status code \"99\": not this one");
+}
+
+// A registration can be created and deleted; a change would leave open what it holds for.
+TEST_F(AgentTest, aRegistrationCannotBeChanged)
+{
+    fTree.start();
+    fTree.compileBase();
+    const std::string path = "<INSTANCENAME CLASSNAME=\"PG_ProviderModule\"><KEYBINDING NAME=\"Name\"><KEYVALUE "
+                             "VALUETYPE=\"string\">M</KEYVALUE></KEYBINDING></INSTANCENAME>";
+    const std::string modified = "<IPARAMVALUE NAME=\"ModifiedInstance\"><VALUE.NAMEDINSTANCE>" + path +
+                                 "<INSTANCE CLASSNAME=\"PG_ProviderModule\"/></VALUE.NAMEDINSTANCE></IPARAMVALUE>";
+    const std::string set = "<IPARAMVALUE NAME=\"InstanceName\">" + path +
+                            "</IPARAMVALUE><IPARAMVALUE NAME=\"PropertyName\"><VALUE>Vendor</VALUE></IPARAMVALUE>"
+                            "<IPARAMVALUE NAME=\"NewValue\"><VALUE>V</VALUE></IPARAMVALUE>";
+    for (const auto& [method, parameters] : {std::pair("ModifyInstance", modified), {"SetProperty", set}}) {
+        const HttpAnswer answer = exchange(fTree.port(), intrinsicRequest(method, "root/PG_InterOp", parameters, ""));
+        EXPECT_NE(answer.body.find("<ERROR CODE=\"7\" DESCRIPTION=\"CIM_ERR_NOT_SUPPORTED: PG_ProviderModule: a "
+                                   "registration is created and deleted, not changed\"/>"),
+                  std::string::npos)
+            << method << answer.body;
+    }
 }
 
 TEST_F(AgentTest, aPropertyListReachesTheProvider)

@@ -335,26 +335,6 @@ TEST_F(ProtocolTest, unknownAndUnsupportedOperations)
     }
 }
 
-// A registration can be created and deleted; a change would leave open what it holds for.
-TEST_F(ProtocolTest, aRegistrationCannotBeChanged)
-{
-    fgTree->compileBase();
-    const std::string path = "<INSTANCENAME CLASSNAME=\"PG_ProviderModule\"><KEYBINDING NAME=\"Name\"><KEYVALUE "
-                             "VALUETYPE=\"string\">M</KEYVALUE></KEYBINDING></INSTANCENAME>";
-    const std::string modified = "<IPARAMVALUE NAME=\"ModifiedInstance\"><VALUE.NAMEDINSTANCE>" + path +
-                                 "<INSTANCE CLASSNAME=\"PG_ProviderModule\"/></VALUE.NAMEDINSTANCE></IPARAMVALUE>";
-    const std::string set = "<IPARAMVALUE NAME=\"InstanceName\">" + path +
-                            "</IPARAMVALUE><IPARAMVALUE NAME=\"PropertyName\"><VALUE>Vendor</VALUE></IPARAMVALUE>"
-                            "<IPARAMVALUE NAME=\"NewValue\"><VALUE>V</VALUE></IPARAMVALUE>";
-    for (const auto& [method, parameters] : {std::pair("ModifyInstance", modified), {"SetProperty", set}}) {
-        const HttpAnswer answer = exchange(fgTree->port(), intrinsicRequest(method, "root/PG_InterOp", parameters, ""));
-        EXPECT_NE(answer.body.find("<ERROR CODE=\"7\" DESCRIPTION=\"CIM_ERR_NOT_SUPPORTED: PG_ProviderModule: a "
-                                   "registration is created and deleted, not changed\"/>"),
-                  std::string::npos)
-            << method << answer.body;
-    }
-}
-
 // An unknown configuration property is refused, whatever the call asks to do with it.
 TEST_F(ProtocolTest, anUnknownConfigurationPropertyIsNotFound)
 {
