@@ -28,7 +28,8 @@ class Installed(unittest.TestCase):
         self.root = os.path.join(self.tree.folder, "staged")
 
     def configure(self):
-        options = ["-DCMAKE_BUILD_TYPE=RelWithDebInfo", "-DVRX_BUILD_TESTS=OFF", "-DVRX_BUILD_BENCH=OFF",
+        # Nothing is measured here: without optimisation and debug information the build takes a third less time.
+        options = ["-DCMAKE_BUILD_TYPE=Debug", "-DCMAKE_CXX_FLAGS_DEBUG=", "-DVRX_BUILD_TESTS=OFF", "-DVRX_BUILD_BENCH=OFF",
                    "-DVRX_BUILD_FUZZ=OFF", "-DPEGASUS_CONSUMER=lab"]
         return subprocess.run(["cmake", "--fresh", "-S", SOURCE, "-B", self.build, "-G", "Ninja", f"-DPEGASUS_ROOT={self.pegasus}",
                                *options], capture_output=True, text=True, timeout=120, check=False)
