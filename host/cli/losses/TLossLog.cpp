@@ -64,6 +64,11 @@ void TLossLog::SetVendors(const TVendorFiles& vendors)
 
 void TLossLog::Learn(EVRXLogSeverity severity, const std::string& text)
 {
+    // First, as a line that only announces a request may begin like the one about its failure.
+    if (const auto loss = LossOfLine(text)) {
+        LearnFromRule(*loss);
+        return;
+    }
     if (LearnFromAttempt(text) || LearnFromProperty(text)) {
         return;
     }
@@ -72,8 +77,6 @@ void TLossLog::Learn(EVRXLogSeverity severity, const std::string& text)
     }
     if (BeginsWith(text, kLoading)) {
         fLoadedFile = text.substr(sizeof kLoading - 1);
-    } else if (const auto loss = LossOfLine(text)) {
-        LearnFromRule(*loss);
     } else if (BeginsWith(text, kInvalidName) && fHasInvalidName) {
         return; // the line of the class list has said so
     } else if (severity != kError || IsHarmless(text)) {
