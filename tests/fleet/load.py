@@ -1,8 +1,9 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT
-"""Loads the inventories of many generated hosts by rsyslogd into PostgreSQL, two days of them, and prints what that took.
+"""Loads the inventories of many generated hosts into PostgreSQL, two days of them, and prints what that took.
 
-Usage: load.py HOSTS [FOLDER]      by hand, for docs/benchmarks.md; needs about 200 KB of disk a host
+Usage: load.py rsyslog|files HOSTS [FOLDER]   by hand, for docs/benchmarks.md; needs about 200 KB of disk a host.
+    rsyslog: a line a transaction, by rsyslogd.  files: a file a transaction, by vrx-fleet-ship postgresql
 """
 import json
 import os
@@ -38,32 +39,53 @@ def number(database, query):
     return int(database.run("-c", query))
 
 
-def load_day(database, folder, hosts, day):
-    spool = os.path.join(folder, f"day{day}")
-    queue = os.path.join(folder, f"queue{day}")
-    os.mkdir(spool)
+def load_by_rsyslog(database, folder, spool, is_loaded):
+    """Returns rsyslogd's resident peak."""
+    queue = os.path.join(folder, "queue-" + os.path.basename(spool))
     os.mkdir(queue)
-    made = generate(hosts, day, spool)
-    begin = time.monotonic()
     shipper = subprocess.Popen(["rsyslogd", "-n", "-i", "NONE", "-f", os.path.join(FLEET, "rsyslog", "rsyslog.conf")],
                                env={**os.environ, "VRX_FLEET_SPOOL": spool, "VRX_FLEET_QUEUE": queue,
                                     "VRX_FLEET_DATABASE": database.connection})
-    while number(database, "SELECT count(*) FROM fleet.runs WHERE is_whole") < hosts * (day + 1):
+    while not is_loaded():
         time.sleep(1)  # between two looks
-    seconds = time.monotonic() - begin
     peak = peak_megabytes(shipper)
     shipper.send_signal(signal.SIGTERM)
     shipper.wait()
+    return peak
+
+
+def load_by_files(database, spool, is_loaded):
+    subprocess.run([os.path.join(FLEET, "bin", "vrx-fleet-ship"), "postgresql"], check=True,
+                   env={**os.environ, "VRX_FLEET_SPOOL": spool, "VRX_FLEET_DATABASE": database.connection})
+    if not is_loaded():
+        raise RuntimeError("some runs are missing")
+
+
+def load_day(how, database, folder, hosts, day):
+    spool = os.path.join(folder, f"day{day}")
+    os.mkdir(spool)
+    made = generate(hosts, day, spool)
+
+    def is_loaded():
+        return number(database, "SELECT count(*) FROM fleet.runs WHERE is_whole") == hosts * (day + 1)
+    begin = time.monotonic()
+    if how == "rsyslog":
+        print(f"day {day}: rsyslogd's peak {load_by_rsyslog(database, folder, spool, is_loaded)} MB")
+    else:
+        load_by_files(database, spool, is_loaded)
+    seconds = time.monotonic() - begin
     print(f"day {day}: {made}")
-    print(f"day {day}: {seconds:.0f} s, {made['records'] / seconds:.0f} records/s, rsyslogd's peak {peak} MB, load {os.getloadavg()}")
+    print(f"day {day}: {seconds:.0f} s, {made['records'] / seconds:.0f} records/s, load {os.getloadavg()}")
     print(f"day {day}: database {number(database, 'SELECT pg_database_size(current_database())') >> 20} MB, instances "
           f"{number(database, '''SELECT pg_total_relation_size('fleet.instances')''') >> 20} MB, rows "
           f"{number(database, 'SELECT count(*) FROM fleet.instances')}", flush=True)
 
 
 def main():
-    hosts = int(sys.argv[1])
-    folder = sys.argv[2] if len(sys.argv) > 2 else tempfile.mkdtemp(prefix="vrx-fleet-load-", dir="/var/tmp")
+    if len(sys.argv) < 3 or sys.argv[1] not in ("rsyslog", "files"):
+        sys.exit(__doc__)
+    how, hosts = sys.argv[1], int(sys.argv[2])
+    folder = sys.argv[3] if len(sys.argv) > 3 else tempfile.mkdtemp(prefix="vrx-fleet-load-", dir="/var/tmp")
     os.makedirs(os.path.join(folder, "database"))
     os.chmod(folder, 0o755)
     database = Cluster(os.path.join(folder, "database"))
@@ -71,7 +93,7 @@ def main():
     try:
         database.create()
         for day in (0, 1):
-            load_day(database, folder, hosts, day)
+            load_day(how, database, folder, hosts, day)
         database.run("-c", "VACUUM ANALYZE")
         for name, question in QUESTIONS.items():
             times = []

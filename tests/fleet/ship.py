@@ -1,7 +1,7 @@
 # SPDX-License-Identifier: MIT
-"""vrx-fleet-ship: what arrives by HTTP and in a Kafka topic, and what stays in the spool when it does not.
+"""vrx-fleet-ship: what arrives by HTTP, in a Kafka topic and in PostgreSQL, and what stays in the spool when it does not.
 
-Usage: ship.py Http|Kafka
+Usage: ship.py Http|Kafka|Postgresql
 """
 import http.server
 import os
@@ -11,6 +11,7 @@ import sys
 import threading
 import unittest
 
+from cluster import Cluster
 from support import FLEET, FolderTest, host, need, run, text, wait_until
 
 SPECIAL = {"Megabyte": "m" * (1 << 20), "Hostile": "\u202e\U0001f4a9 \0 \t'\"%$"}
@@ -123,7 +124,35 @@ class Kafka(ShipTest):
         self.assertEqual((done.returncode, "begins with no record of a host" in done.stderr), (65, True))
 
 
+class Postgresql(ShipTest):
+    def test_a_file_is_loaded_whole_or_stays(self):
+        good = list(self.documents)
+        self.write(b'{"a":"\xff"}\n', "spool", "0-invalid.ndjson")
+        self.write(b'{"a":"\0\x02"}\n', "spool", "1-control.ndjson")
+        os.chmod(self.path(), 0o755)  # PostgreSQL runs as another user
+        os.mkdir(self.path("database"))
+        cluster = Cluster(self.path("database"))
+        self.addCleanup(cluster.stop)
+        settings = {"VRX_FLEET_DATABASE": cluster.connection}
+        self.assertEqual(self.ship("postgresql", **settings).returncode, 2)  # nobody listens
+        cluster.start()
+        cluster.create()
+        cluster.run("-c", "ALTER TABLE fleet.hosts RENAME TO away")
+        done = self.ship("postgresql", **settings)  # the database's fault: what is not loaded stays
+        self.assertEqual((done.returncode, "42P01" in done.stderr), (3, True), done.stderr)
+        self.assertIn("0-invalid.ndjson was refused", done.stderr)
+        self.assertEqual(cluster.rows("SELECT count(*) FROM fleet.inbox"), [[0]])
+        cluster.run("-c", "ALTER TABLE fleet.away RENAME TO hosts")
+        done = self.ship("postgresql", **settings)
+        self.assertEqual(done.returncode, 0, done.stderr)
+        self.assertEqual(os.listdir(os.path.join(self.spool, "refused")), ["0-invalid.ndjson"])
+        self.assertEqual(sorted(os.listdir(os.path.join(self.spool, "sent"))), ["1-control.ndjson", *good])
+        self.assertEqual(cluster.rows("SELECT state, is_whole FROM fleet.runs"), [["complete", True], ["complete", True]])
+        self.assertEqual(cluster.rows("SELECT verdict, line FROM fleet.rejects WHERE verdict = 'refused'"),
+                         [["refused", '{"a":"\x01\x01"}']])
+
+
 if __name__ == "__main__":
     case = sys.argv.pop()
-    need("kcat" if case == "Kafka" else "curl")
+    need({"Kafka": "kcat", "Http": "curl", "Postgresql": "psql"}[case])
     unittest.main(defaultTest=case)
