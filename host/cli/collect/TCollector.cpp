@@ -124,7 +124,11 @@ TProviderRecord TCollector::ReadProvider(IProvider& provider, EDetail detail)
     if (fObserver) {
         fObserver->BeginProvider(record);
     }
-    for (const TClassPtr& each : ListClasses(provider, record.fName)) {
+    const std::vector<TClassPtr> classes = ListClasses(provider, record.fName);
+    if (fSink && !fObserver) {
+        fSink->BeginProvider(record, classes.size());
+    }
+    for (const TClassPtr& each : classes) {
         if (!fIsStopped()) {
             record.fClasses.push_back(ReadWatchedClass(*each, detail, nullptr));
             if (record.fClasses.back().fIsPartial) {
@@ -180,7 +184,8 @@ TClassRecord TCollector::ReadWatchedClass(ICIMClass& each, EDetail detail, const
         Ask(LossOfClass(ELossKind::kClass, "class ", record.fName, " could not be described"),
             [&] { ReadDeclarations(each, record); });
     }
-    if (fSink && !fObserver && detail != EDetail::kNames) {
+    const bool isStreamed = fSink && !fObserver && detail != EDetail::kNames;
+    if (isStreamed) {
         fSink->BeginClass(fProviderName, record);
     }
     if (fObserver) {
@@ -194,6 +199,9 @@ TClassRecord TCollector::ReadWatchedClass(ICIMClass& each, EDetail detail, const
         const auto took = std::chrono::steady_clock::now() - begin;
         record.fMilliseconds = std::chrono::duration_cast<std::chrono::milliseconds>(took).count();
         record.fIsPartial = IsGivenUp();
+    }
+    if (isStreamed) {
+        fSink->EndClass(record);
     }
     if (fObserver) {
         fObserver->EndClass(record);

@@ -37,7 +37,7 @@ class IFormat
 // Takes a piece of the document, in order.
 using TDocumentWriter = std::function<void(const std::string&)>;
 
-std::unique_ptr<IFormat> MakeTableFormat(const TFormatOptions& options);
+std::unique_ptr<IFormat> MakeTableFormat(const TFormatOptions& options, TDocumentWriter write);
 std::unique_ptr<IFormat> MakeTreeFormat(const TFormatOptions& options);
 std::unique_ptr<IFormat> MakeJsonFormat(const TFormatOptions& options);
 std::unique_ptr<IFormat> MakeNdjsonFormat(const TFormatOptions& options, TDocumentWriter write);

@@ -250,7 +250,7 @@ std::unique_ptr<IFormat> MakeFormat(const std::string& name, const TFormatOption
     if (name == "html") {
         return MakeHtmlFormat(options, std::move(write));
     }
-    return name == "csv" ? MakeCsvFormat(options, std::move(write)) : MakeTableFormat(options);
+    return name == "csv" ? MakeCsvFormat(options, std::move(write)) : MakeTableFormat(options, std::move(write));
 }
 
 } // namespace vrxhost

@@ -29,7 +29,6 @@ class THtmlFormat : public IFormat, public IInstanceSink
 
     void BeginClass(const std::string& provider, const TClassRecord& each) override
     {
-        EndClass();
         fProvider = provider;
         fClass = each;
         fCount = 0;
@@ -43,6 +42,14 @@ class THtmlFormat : public IFormat, public IInstanceSink
         fClass.fInstances.push_back(instance);
     }
 
+    void EndClass(const TClassRecord&) override
+    {
+        if (fCount > 0 || !fClass.fInstances.empty()) {
+            fWrite(Rows(true));
+        }
+        fContents.push_back({fProvider, fClass.fName, fCount});
+    }
+
     std::string Finish(const TDocument& document) override
     {
         std::string page = fIsStreaming ? "" : Beginning(document.fHead);
@@ -50,7 +57,6 @@ class THtmlFormat : public IFormat, public IInstanceSink
             fWrite = [&page](const std::string& text) { page += text; };
             AddInstances(document);
         }
-        EndClass();
         if (document.fDetail == EDetail::kDeclarations) {
             for (const TProviderRecord& provider : document.fProviders) {
                 for (const TClassRecord& each : provider.fClasses) {
@@ -82,20 +88,10 @@ class THtmlFormat : public IFormat, public IInstanceSink
             for (const TClassRecord& each : provider.fClasses) {
                 if (document.fDetail == EDetail::kInstances) {
                     BeginClass(provider.fName, each);
+                    EndClass(each);
                 }
             }
         }
-    }
-
-    void EndClass()
-    {
-        if (!fClass.fName.empty()) {
-            if (fCount > 0 || !fClass.fInstances.empty()) {
-                fWrite(Rows(true));
-            }
-            fContents.push_back({fProvider, fClass.fName, fCount});
-        }
-        fClass = TClassRecord();
     }
 
     std::string Id() const { return "c" + std::to_string(fContents.size() + 1); }

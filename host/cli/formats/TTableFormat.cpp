@@ -12,18 +12,27 @@ namespace {
 
 constexpr std::size_t kInstancesOfATable = 5; // fewer are shown one below the other
 constexpr std::size_t kTypeWidth = 11;
+// Held back until their class ends, so that its heading counts them and a tree holds them all. The rows of a class with
+// more go out in tables of so many.
+constexpr std::size_t kHeldInstances = 1000;
 
-class TTableFormat : public IFormat
+class TTableFormat : public IFormat, public IInstanceSink
 {
   public:
-    explicit TTableFormat(const TFormatOptions& options) : fOptions(options) {}
+    TTableFormat(const TFormatOptions& options, TDocumentWriter write) : fOptions(options), fWrite(std::move(write)) {}
 
+    IInstanceSink* BeginStream(const TDocumentHead& head) override;
+    void BeginProvider(const TProviderRecord& provider, std::size_t classCount) override;
+    void BeginClass(const std::string& provider, const TClassRecord& each) override;
+    void Add(const TClassRecord& each, const TInstanceRecord& instance) override;
+    void EndClass(const TClassRecord& each) override;
     std::string Finish(const TDocument& document) override;
 
   private:
     std::string Heading(const std::string& text) const;
     std::string Providers(const TDocument& document) const;
     std::string Provider(const TProviderRecord& provider, EDetail detail) const;
+    std::string ProviderHeading(const TProviderRecord& provider, std::size_t classCount) const;
     std::string Class(const TClassRecord& each, EDetail detail, const std::string& indent) const;
     std::string Instances(const TClassRecord& each, const std::string& indent) const;
     std::string InstanceLines(const TClassRecord& each, const TInstanceRecord& instance,
@@ -33,6 +42,11 @@ class TTableFormat : public IFormat
     std::string Invocation(const TInvocation& invocation) const;
 
     const TFormatOptions fOptions;
+    const TDocumentWriter fWrite;
+    bool fIsStreaming = false;
+    std::string fIndent;      // of a streamed class: below its provider
+    TClassRecord fClass;      // with the instances that are held back
+    bool fHasWritten = false; // some of its instances
 };
 
 std::string ParameterList(const TMethodRecord& method)
@@ -43,6 +57,11 @@ std::string ParameterList(const TMethodRecord& method)
         list += (list.empty() ? "" : ", ") + std::string(direction) + parameter.fType + " " + parameter.fName;
     }
     return list;
+}
+
+std::string PartialText(const TClassRecord& each)
+{
+    return each.fIsPartial ? ", partial: the provider was given up" : "";
 }
 
 std::string ClassLine(const TClassRecord& each)
@@ -102,8 +121,54 @@ std::string CheckLines(const std::vector<TCheck>& checks, const TFormatOptions& 
     return LabelledLines(rows, "", options.fWidth);
 }
 
+// Only where the document is about instances; the others are short.
+IInstanceSink* TTableFormat::BeginStream(const TDocumentHead& head)
+{
+    fIsStreaming = head.fCommand == "inventory" || head.fCommand == "instances";
+    return fIsStreaming ? this : nullptr;
+}
+
+void TTableFormat::BeginProvider(const TProviderRecord& provider, std::size_t classCount)
+{
+    fWrite((fIndent.empty() ? "" : "\n") + ProviderHeading(provider, classCount));
+    fIndent = "  ";
+}
+
+void TTableFormat::BeginClass(const std::string&, const TClassRecord& each)
+{
+    fClass = each;
+    fHasWritten = false;
+}
+
+void TTableFormat::Add(const TClassRecord&, const TInstanceRecord& instance)
+{
+    if (fClass.fInstances.size() == kHeldInstances) {
+        fWrite((fHasWritten
+                    ? "\n"
+                    : fIndent + Heading(fClass.fName) + ": more than " + Counted(kHeldInstances, "instance") + "\n") +
+               InstanceTable(fClass, fIndent + "  "));
+        fClass.fInstances.clear();
+        fHasWritten = true;
+    }
+    fClass.fInstances.push_back(instance);
+}
+
+void TTableFormat::EndClass(const TClassRecord& each)
+{
+    fClass.fIsPartial = each.fIsPartial;
+    if (!fHasWritten) {
+        fWrite(Instances(fClass, fIndent));
+        return;
+    }
+    fWrite("\n" + InstanceTable(fClass, fIndent + "  ") + fIndent + Heading(fClass.fName) + ": " +
+           Counted(each.fInstanceCount, "instance") + " in all" + PartialText(each) + "\n");
+}
+
 std::string TTableFormat::Finish(const TDocument& document)
 {
+    if (fIsStreaming) {
+        return "";
+    }
     if (!document.fChecks.empty()) {
         return CheckLines(document.fChecks, fOptions);
     }
@@ -145,12 +210,17 @@ std::string TTableFormat::Providers(const TDocument& document) const
 
 std::string TTableFormat::Provider(const TProviderRecord& provider, EDetail detail) const
 {
-    std::string out = Heading("Provider " + (provider.fName.empty() ? "without a name" : Printable(provider.fName))) +
-                      " (" + Printable(provider.fModule) + "): " + Counted(provider.fClasses.size(), "class") + "\n";
+    std::string out = ProviderHeading(provider, provider.fClasses.size());
     for (const auto& each : provider.fClasses) {
         out += Class(each, detail, "  ");
     }
     return out;
+}
+
+std::string TTableFormat::ProviderHeading(const TProviderRecord& provider, std::size_t classCount) const
+{
+    return Heading("Provider " + (provider.fName.empty() ? "without a name" : Printable(provider.fName))) + " (" +
+           Printable(provider.fModule) + "): " + Counted(classCount, "class") + "\n";
 }
 
 std::string TTableFormat::Class(const TClassRecord& each, EDetail detail, const std::string& indent) const
@@ -167,8 +237,8 @@ std::string TTableFormat::Class(const TClassRecord& each, EDetail detail, const 
 
 std::string TTableFormat::Instances(const TClassRecord& each, const std::string& indent) const
 {
-    std::string out = indent + Heading(each.fName) + ": " + Counted(each.fInstances.size(), "instance") +
-                      (each.fIsPartial ? ", partial: the provider was given up" : "") + "\n";
+    std::string out =
+        indent + Heading(each.fName) + ": " + Counted(each.fInstances.size(), "instance") + PartialText(each) + "\n";
     const std::string tree = each.fIsAssociation && !fOptions.fRaw ? AssociationTree({&each}, indent + "  ") : "";
     if (!tree.empty()) {
         return out + tree;
@@ -248,65 +318,11 @@ std::string TTableFormat::Invocation(const TInvocation& invocation) const
     return LabelledLines(rows, "", fOptions.fWidth);
 }
 
-// Devices below what they belong to, then what no association names.
-class TTreeFormat : public IFormat
-{
-  public:
-    explicit TTreeFormat(const TFormatOptions& options) : fOptions(options) {}
-
-    std::string Finish(const TDocument& document) override
-    {
-        std::vector<const TClassRecord*> associations;
-        std::string rest;
-        for (const TProviderRecord& provider : document.fProviders) {
-            for (const TClassRecord& each : provider.fClasses) {
-                if (each.fIsAssociation) {
-                    associations.push_back(&each);
-                }
-            }
-        }
-        const std::string tree = AssociationTree(associations, "") + Partial(document);
-        for (const TProviderRecord& provider : document.fProviders) {
-            for (const TClassRecord& each : provider.fClasses) {
-                rest += each.fIsAssociation ? "" : Unlinked(each, tree);
-            }
-        }
-        return tree.empty() && rest.empty() ? TTableFormat(fOptions).Finish(document) : tree + rest;
-    }
-
-  private:
-    static std::string Partial(const TDocument& document)
-    {
-        std::string lines;
-        for (const TProviderRecord& provider : document.fProviders) {
-            lines += provider.fIsPartial ? "partial: provider " + Printable(provider.fName) + " was given up\n" : "";
-        }
-        return lines;
-    }
-
-    static std::string Unlinked(const TClassRecord& each, const std::string& tree)
-    {
-        std::string lines;
-        for (const TInstanceRecord& instance : each.fInstances) {
-            const std::string line = PathLabel(instance.fPath) + "\n";
-            lines += tree.find(line) == std::string::npos ? line : "";
-        }
-        return lines;
-    }
-
-    const TFormatOptions fOptions;
-};
-
 } // namespace
 
-std::unique_ptr<IFormat> MakeTableFormat(const TFormatOptions& options)
+std::unique_ptr<IFormat> MakeTableFormat(const TFormatOptions& options, TDocumentWriter write)
 {
-    return std::make_unique<TTableFormat>(options);
-}
-
-std::unique_ptr<IFormat> MakeTreeFormat(const TFormatOptions& options)
-{
-    return std::make_unique<TTreeFormat>(options);
+    return std::make_unique<TTableFormat>(options, std::move(write));
 }
 
 } // namespace vrxhost

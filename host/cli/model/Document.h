@@ -209,13 +209,15 @@ struct TDocument
     std::function<void(TDocument&)> fFinish;
 };
 
-// Takes instances one by one in place of the document.
+// Takes instances one by one in place of the document. A class may come without a provider before it.
 class IInstanceSink
 {
   public:
     virtual ~IInstanceSink() = default;
+    virtual void BeginProvider(const TProviderRecord&, std::size_t /*classCount*/) {}
     virtual void BeginClass(const std::string& provider, const TClassRecord& each) = 0;
     virtual void Add(const TClassRecord& each, const TInstanceRecord& instance) = 0;
+    virtual void EndClass(const TClassRecord&) {} // with the count, and whether it was given up
 };
 
 } // namespace vrxhost

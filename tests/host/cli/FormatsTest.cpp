@@ -18,7 +18,9 @@ namespace vrxhost {
 namespace {
 
 using namespace NKOLVRX20;
+using testing::EndsWith;
 using testing::HasSubstr;
+using testing::StartsWith;
 
 TEST(HtmlText, LeavesNoMarkupAndNothingHidden)
 {
@@ -94,9 +96,42 @@ TEST(HtmlFormat, PropertiesThatTheFirstRowsLackHaveAColumn)
         sink->Add(each, {"", {Text("Name", "n")}});
     }
     sink->Add(each, {"", {Text("Late", "<late>"), Text("Name", "last")}});
+    sink->EndClass(each);
     page += format->Finish({});
     EXPECT_THAT(page, HasSubstr("<th scope=\"col\">Name</th><th scope=\"col\">Other properties</th>"));
     EXPECT_THAT(page, HasSubstr("<tr><th scope=\"row\">last</th><td>Late: &lt;late&gt;</td></tr>"));
+}
+
+// Up to 1000 rows are one table with their number above; more go out in tables of so many, with the number below.
+TEST(TableFormat, StreamedRowsAppearInTablesOfAThousand)
+{
+    std::string text;
+    const auto format = MakeTableFormat({}, [&text](const std::string& piece) { text += piece; });
+    TDocumentHead head;
+    head.fCommand = "inventory";
+    IInstanceSink* const sink = format->BeginStream(head);
+    const auto add = [&](const char* name, int count, bool isPartial) {
+        TClassRecord each;
+        each.fName = name;
+        sink->BeginClass("p", each);
+        for (each.fInstanceCount = 0; each.fInstanceCount < static_cast<std::size_t>(count); ++each.fInstanceCount) {
+            sink->Add(each, {"", {Text("Name", "n" + std::to_string(each.fInstanceCount))}});
+        }
+        each.fIsPartial = isPartial;
+        sink->EndClass(each);
+    };
+    TProviderRecord provider;
+    provider.fName = "p";
+    provider.fModule = "libp";
+    sink->BeginProvider(provider, 2);
+    add("X_Few", 1, true);
+    add("X_Many", 2001, false);
+    text += format->Finish({});
+    EXPECT_THAT(text, StartsWith("Provider p (libp): 2 classes\n"
+                                 "  X_Few: 1 instance, partial: the provider was given up\n    #1\n      Name  n0\n"
+                                 "  X_Many: more than 1000 instances\n    Name\n    n0\n"));
+    EXPECT_THAT(text, HasSubstr("    n999\n\n    Name\n    n1000\n"));
+    EXPECT_THAT(text, EndsWith("    n1999\n\n    Name\n    n2000\n  X_Many: 2001 instances in all\n"));
 }
 
 constexpr int kInstances = 100000;
@@ -143,13 +178,15 @@ class TPassingInstances : public TInmemClass
 TEST(StreamedFormats, MemoryDoesNotGrowWithTheNumberOfInstances)
 {
     constexpr std::size_t kMaxGrowth = 4 * 1024 * 1024;
-    for (const std::string name : {"ndjson", "csv", "html"}) {
+    for (const std::string name : {"ndjson", "csv", "html", "table"}) {
         std::size_t written = 0;
         const auto format = MakeFormat(name, {}, [&written](const std::string& text) { written += text.size(); });
         TInmemNamespace ns;
         TLossLog losses("/");
         TCollector collector(ns, losses, [] { return false; });
-        collector.SetSink(format->BeginStream({}), false);
+        TDocumentHead head;
+        head.fCommand = "instances";
+        collector.SetSink(format->BeginStream(head), false);
         const auto owner = boost::make_shared<TPassingInstances>("X_Passing");
         EXPECT_EQ(collector.ReadClass(*owner, EDetail::kInstances).fInstanceCount, 100000u);
         EXPECT_EQ(owner->fKept, 0) << name;
