@@ -100,6 +100,9 @@ void AddClassChecks(const TLoss& loss, TDocument& document)
         if (loss.fClasses.size() > 1) {
             single.fObjects = {loss.fObjects[i]};
         }
+        if (i > 0) {
+            single.fLog.clear(); // the server's lines stand with the first
+        }
         document.fChecks.push_back(CheckOf(single, document));
         document.fChecks.back().fSubject = "class " + loss.fClasses[i];
     }
