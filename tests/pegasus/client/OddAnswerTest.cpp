@@ -85,7 +85,7 @@ TEST(OddAnswer, IsReadAsItWasMeantOrRefused)
         const std::string read = test::readAnswer({row.name, "1000", "GetInstance", true, bytes});
         EXPECT_NE(read.find(row.outcome), std::string::npos) << row.name << ": " << read;
         if (row.outcome == kWhole) {
-            // The server reads requests with another parser of the same rules.
+            // The server reads a request when all of it has come, by the same rules.
             EXPECT_NO_THROW(Pegasus::wire::XmlDocument().parseMessage(body)) << row.name;
         }
     }
