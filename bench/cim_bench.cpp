@@ -68,26 +68,29 @@ double processorSeconds(pid_t process)
     return ::clock_getcpuclockid(process, &clock) == 0 ? now(clock) : 0;
 }
 
-std::vector<pid_t> childrenOf(pid_t process)
+// Children and theirs: between a server and its agents there may be other processes.
+std::vector<pid_t> descendantsOf(pid_t process)
 {
-    std::vector<pid_t> children;
+    std::vector<pid_t> found;
     for (const auto& thread : std::filesystem::directory_iterator("/proc/" + std::to_string(process) + "/task")) {
         std::ifstream list(thread.path() / "children");
         for (pid_t child = 0; list >> child;) {
-            children.push_back(child);
+            found.push_back(child);
+            const std::vector<pid_t> below = descendantsOf(child);
+            found.insert(found.end(), below.begin(), below.end());
         }
     }
-    return children;
+    return found;
 }
 
-// The processor time of this process as "client", of the server, and of all the server's children as "agents".
+// The processor time of this process as "client", of the server, and of all the processes below it as "agents".
 TTimes processorTimes(pid_t server)
 {
     TTimes times = {{"client", now(CLOCK_PROCESS_CPUTIME_ID)}};
     if (server != 0) {
         times["server"] = processorSeconds(server);
-        for (const pid_t child : childrenOf(server)) {
-            times["agents"] += processorSeconds(child);
+        for (const pid_t process : descendantsOf(server)) {
+            times["agents"] += processorSeconds(process);
         }
     }
     return times;
@@ -112,8 +115,8 @@ void printPeaks(const std::string& name, pid_t server)
     }
     print(name + ", server's peak", peakMegabytes(std::to_string(server)), "MB");
     double agents = 0;
-    for (const pid_t child : childrenOf(server)) {
-        agents = std::max(agents, peakMegabytes(std::to_string(child)));
+    for (const pid_t process : descendantsOf(server)) {
+        agents = std::max(agents, peakMegabytes(std::to_string(process)));
     }
     print(name + ", agent's peak", agents, "MB");
 }
