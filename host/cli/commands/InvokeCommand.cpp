@@ -129,12 +129,12 @@ class TInvokeCommand : public ICommand
         invocation.fMethod = name;
         invocation.fReturned = ReadValue("ReturnValue", returned, &method);
         const auto parameters = ParametersOf(method);
-        for (const auto& [outputName, value] : outputs) {
+        for (const auto& output : outputs) {
             const auto declared = std::find_if(parameters.begin(), parameters.end(), [&](const TParameterPtr& each) {
-                return ::strcasecmp(each->GetName(kNoContext).c_str(), outputName.c_str()) == 0;
+                return ::strcasecmp(each->GetName(kNoContext).c_str(), output.first.c_str()) == 0;
             });
             invocation.fOutputs.push_back(
-                ReadValue(outputName, value, declared == parameters.end() ? nullptr : declared->get()));
+                ReadValue(output.first, output.second, declared == parameters.end() ? nullptr : declared->get()));
         }
         return invocation;
     }
