@@ -13,7 +13,6 @@ namespace Pegasus::programs {
 
 namespace {
 
-constexpr std::chrono::milliseconds kConnectTimeout{1000};
 constexpr Uint32 kAnswerTimeoutMs = 60'000;
 constexpr std::chrono::seconds kEndTimeout{60};
 constexpr std::chrono::seconds kTermTimeout{10};

@@ -22,9 +22,9 @@ std::string SmallLetters(std::string text)
     return text;
 }
 
-bool IsWordPart(unsigned char c)
+bool IsWordPart(char c)
 {
-    return c == '_' || std::isalnum(c) != 0;
+    return c == '_' || std::isalnum(static_cast<unsigned char>(c)) != 0;
 }
 
 std::size_t EndOfToken(const std::string& text, std::size_t begin)
