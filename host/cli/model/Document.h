@@ -214,7 +214,7 @@ class IInstanceSink
 {
   public:
     virtual ~IInstanceSink() = default;
-    virtual void BeginProvider(const TProviderRecord&, std::size_t /*classCount*/) {}
+    virtual void BeginProvider(const TProviderRecord&, std::size_t) {} // with the number of its classes
     virtual void BeginClass(const std::string& provider, const TClassRecord& each) = 0;
     virtual void Add(const TClassRecord& each, const TInstanceRecord& instance) = 0;
     virtual void EndClass(const TClassRecord&) {} // with the count, and whether it was given up
