@@ -107,7 +107,7 @@ class Host:
                "hostFacts": {"name": self.name, "machineId": self.id},
                "classes": sum(each["record"] == "class" for each in records),
                "instances": sum(each["record"] == "instance" for each in records), "complete": not lost,
-               "losses": [{"text": LOST.format(each), "vendor": each} for each in lost], "notes": []}
+               "losses": [{"kind": "library", "text": LOST.format(each), "vendor": each} for each in lost], "notes": []}
         for seq, record in enumerate([*records, {"record": "end", **end}], 1):
             time = started + datetime.timedelta(milliseconds=seq)
             head = {"record": record["record"], "format": 2, "host": self.id, "run": run, "seq": seq,

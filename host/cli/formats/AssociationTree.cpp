@@ -4,8 +4,7 @@
 #include "host/cli/formats/ValueText.h"
 
 #include <algorithm>
-#include <map>
-#include <set>
+#include <iterator>
 
 namespace vrxhost {
 namespace {
@@ -18,64 +17,6 @@ bool IsUpperEnd(const std::string& name)
     return std::any_of(std::begin(beginnings), std::end(beginnings),
                        [&name](const char* begin) { return name.rfind(begin, 0) == 0; });
 }
-
-class TTree
-{
-  public:
-    void Add(const TInstanceRecord& link, const TClassRecord& association)
-    {
-        std::vector<const TPropertyRecord*> ends;
-        for (const TPropertyRecord& property : link.fProperties) {
-            const TPropertyDeclRecord* const declaration = association.Find(property.fName);
-            if (declaration && declaration->fType == "reference" && !property.fText.empty()) {
-                ends.push_back(&property);
-            }
-        }
-        if (ends.size() != 2) {
-            return;
-        }
-        if (IsUpperEnd(ends[1]->fName)) {
-            std::swap(ends[0], ends[1]);
-        }
-        const std::string above = LocalPath(ends[0]->fText);
-        const std::string below = LocalPath(ends[1]->fText);
-        if (fChildren.count(above) == 0) {
-            fOrder.push_back(above);
-        }
-        fChildren[above].push_back(below);
-        fBelow.insert(below);
-    }
-
-    std::vector<TLinkedObject> Objects() const
-    {
-        std::vector<TLinkedObject> objects;
-        std::set<std::string> shown;
-        for (const std::string& root : fOrder) {
-            if (fBelow.count(root) == 0) {
-                objects.push_back(Object(root, 0, shown));
-            }
-        }
-        return objects;
-    }
-
-  private:
-    // shown: the objects whose branches have been shown, which keeps circles finite.
-    TLinkedObject Object(const std::string& path, int depth, std::set<std::string>& shown) const
-    {
-        TLinkedObject object{path, {}};
-        const auto children = fChildren.find(path);
-        if (children != fChildren.end() && depth < kMaxDepth && shown.insert(path).second) {
-            for (const std::string& child : children->second) {
-                object.fParts.push_back(Object(child, depth + 1, shown));
-            }
-        }
-        return object;
-    }
-
-    std::vector<std::string> fOrder;
-    std::map<std::string, std::vector<std::string>> fChildren;
-    std::set<std::string> fBelow;
-};
 
 std::string Branches(const std::vector<TLinkedObject>& parts, const std::string& indent)
 {
@@ -90,21 +31,64 @@ std::string Branches(const std::vector<TLinkedObject>& parts, const std::string&
 
 } // namespace
 
-std::vector<TLinkedObject> LinkedObjects(const std::vector<const TClassRecord*>& associations)
+bool TLinks::Add(const TClassRecord& association, const TInstanceRecord& link)
 {
-    TTree tree;
-    for (const TClassRecord* association : associations) {
-        for (const TInstanceRecord& link : association->fInstances) {
-            tree.Add(link, *association);
+    std::vector<const TPropertyRecord*> ends;
+    for (const TPropertyRecord& property : link.fProperties) {
+        const TPropertyDeclRecord* const declaration = association.Find(property.fName);
+        if (declaration && declaration->fType == "reference" && !property.fText.empty()) {
+            ends.push_back(&property);
         }
     }
-    return tree.Objects();
+    if (ends.size() != 2) {
+        return false;
+    }
+    if (IsUpperEnd(ends[1]->fName)) {
+        std::swap(ends[0], ends[1]);
+    }
+    const std::string above = LocalPath(ends[0]->fText);
+    const std::string below = LocalPath(ends[1]->fText);
+    std::vector<std::string>& parts = fParts[above];
+    if (parts.empty()) {
+        fOrder.push_back(above);
+    }
+    parts.push_back(below);
+    fBelow.insert(below);
+    return true;
 }
 
-std::string AssociationTree(const std::vector<const TClassRecord*>& associations, const std::string& indent)
+// Objects that are below each other in a circle begin where the first link does.
+std::vector<TLinkedObject> TLinks::GetObjects() const
+{
+    std::vector<TLinkedObject> objects;
+    std::set<std::string> shown;
+    for (const bool isInCircle : {false, true}) {
+        for (const std::string& path : fOrder) {
+            if (isInCircle ? shown.count(path) == 0 : fBelow.count(path) == 0) {
+                objects.push_back(ObjectOf(path, 0, shown));
+            }
+        }
+    }
+    return objects;
+}
+
+// shown: the objects whose branches have been shown, which keeps circles finite.
+TLinkedObject TLinks::ObjectOf(const std::string& path, int depth, std::set<std::string>& shown) const
+{
+    TLinkedObject object{path, {}};
+    const auto parts = fParts.find(path);
+    if (parts != fParts.end() && depth < kMaxDepth && shown.insert(path).second) {
+        for (const std::string& part : parts->second) {
+            object.fParts.push_back(ObjectOf(part, depth + 1, shown));
+        }
+    }
+    return object;
+}
+
+std::string AssociationTree(const std::vector<TLinkedObject>& objects, const std::string& indent)
 {
     std::string text;
-    for (const TLinkedObject& object : LinkedObjects(associations)) {
+    for (const TLinkedObject& object : objects) {
         text += indent + PathLabel(object.fPath) + "\n" + Branches(object.fParts, indent);
     }
     return text;

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "host/cli/formats/HtmlParts.h"
 
-#include "host/cli/formats/AssociationTree.h"
 #include "host/cli/formats/HtmlPage.h"
 #include "host/cli/formats/HtmlText.h"
 #include "host/cli/formats/ValueText.h"
@@ -121,13 +120,9 @@ std::string HtmlLosses(const std::vector<TLoss>& losses)
     return LossList(losses, false) + LossList(losses, true);
 }
 
-std::string HtmlDevices(const std::vector<TClassRecord>& associations)
+std::string HtmlDevices(const std::vector<TLinkedObject>& objects)
 {
-    std::vector<const TClassRecord*> links;
-    for (const TClassRecord& association : associations) {
-        links.push_back(&association);
-    }
-    const std::string items = TreeItems(LinkedObjects(links));
+    const std::string items = TreeItems(objects);
     return items.empty() ? "" : "<h2>Devices</h2>\n<ul id=\"devices\">\n" + items + "</ul>\n";
 }
 

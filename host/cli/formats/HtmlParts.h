@@ -2,6 +2,7 @@
 // Pieces of the page that depend on data alone.
 #pragma once
 
+#include "host/cli/formats/AssociationTree.h"
 #include "host/cli/model/Document.h"
 
 #include <string>
@@ -29,7 +30,7 @@ std::string HtmlDeclaration(const TClassRecord& each);
 // Returns: the losses, then the notes; empty when there are none.
 std::string HtmlLosses(const std::vector<TLoss>& losses);
 
-// Returns: what the instances of the associations link, as lists in lists; empty when they link nothing.
-std::string HtmlDevices(const std::vector<TClassRecord>& associations);
+// Returns: linked objects as lists in lists; empty for none.
+std::string HtmlDevices(const std::vector<TLinkedObject>& objects);
 
 } // namespace vrxhost

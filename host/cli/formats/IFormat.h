@@ -39,7 +39,7 @@ using TDocumentWriter = std::function<void(const std::string&)>;
 
 std::unique_ptr<IFormat> MakeTableFormat(const TFormatOptions& options, TDocumentWriter write);
 std::unique_ptr<IFormat> MakeTreeFormat(const TFormatOptions& options);
-std::unique_ptr<IFormat> MakeJsonFormat(const TFormatOptions& options);
+std::unique_ptr<IFormat> MakeJsonFormat(const TFormatOptions& options, TDocumentWriter write);
 std::unique_ptr<IFormat> MakeNdjsonFormat(const TFormatOptions& options, TDocumentWriter write);
 std::unique_ptr<IFormat> MakeCsvFormat(const TFormatOptions& options, TDocumentWriter write);
 std::unique_ptr<IFormat> MakeHtmlFormat(const TFormatOptions& options, TDocumentWriter write);

@@ -56,7 +56,7 @@ TJson ScalarValue(const TCIMValue& value)
 
 TJson Loss(const TLoss& loss)
 {
-    TJson json = {{"text", loss.GetText()}};
+    TJson json = {{"kind", WordOf(loss.fKind)}, {"text", loss.GetText()}};
     const std::pair<const char*, const std::string&> texts[] = {
         {"vendor", loss.fVendor}, {"file", loss.fFile}, {"property", loss.fProperty}};
     for (const auto& [name, text] : texts) {

@@ -242,7 +242,7 @@ std::unique_ptr<IFormat> MakeFormat(const std::string& name, const TFormatOption
         return MakeTreeFormat(options);
     }
     if (name == "json") {
-        return MakeJsonFormat(options);
+        return MakeJsonFormat(options, std::move(write));
     }
     if (name == "ndjson") {
         return MakeNdjsonFormat(options, std::move(write));

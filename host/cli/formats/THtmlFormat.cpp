@@ -107,11 +107,11 @@ class THtmlFormat : public IFormat, public IInstanceSink
         }
         for (const TInstanceRecord& instance : fClass.fInstances) {
             text += Row(instance);
+            if (fClass.fIsAssociation) {
+                fLinks.Add(fClass, instance);
+            }
         }
         fCount += fClass.fInstances.size();
-        if (fClass.fIsAssociation) {
-            fLinks.push_back(fClass);
-        }
         fClass.fInstances.clear();
         return text + (isLast ? "</tbody>\n</table></div>\n</section>\n" : "");
     }
@@ -186,7 +186,7 @@ class THtmlFormat : public IFormat, public IInstanceSink
         text += facts.empty() ? "" : HtmlFacts(facts);
         text += document.fComparison ? HtmlElement("pre", DifferenceLines(*document.fComparison, fOptions)) + "\n" : "";
         text += HtmlLosses(document.fLosses) + Contents(document);
-        return text + HtmlDevices(fLinks) + "</section>\n";
+        return text + HtmlDevices(fLinks.GetObjects()) + "</section>\n";
     }
 
     static std::string ResultText(const TPropertyRecord& value)
@@ -248,7 +248,7 @@ class THtmlFormat : public IFormat, public IInstanceSink
     std::vector<std::string> fColumns;
     bool fHasRest = false; // a last column for what the first rows lacked
     std::vector<TEntry> fContents;
-    std::vector<TClassRecord> fLinks; // associations with their instances
+    TLinks fLinks;
 };
 
 } // namespace

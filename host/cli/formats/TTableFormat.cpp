@@ -239,9 +239,15 @@ std::string TTableFormat::Instances(const TClassRecord& each, const std::string&
 {
     std::string out =
         indent + Heading(each.fName) + ": " + Counted(each.fInstances.size(), "instance") + PartialText(each) + "\n";
-    const std::string tree = each.fIsAssociation && !fOptions.fRaw ? AssociationTree({&each}, indent + "  ") : "";
-    if (!tree.empty()) {
-        return out + tree;
+    if (each.fIsAssociation && !fOptions.fRaw) {
+        TLinks links;
+        bool areLinks = true;
+        for (const TInstanceRecord& instance : each.fInstances) {
+            areLinks &= links.Add(each, instance);
+        }
+        if (areLinks) {
+            return out + AssociationTree(links.GetObjects(), indent + "  ");
+        }
     }
     if (each.fInstances.size() >= kInstancesOfATable) {
         return out + InstanceTable(each, indent + "  ");

@@ -5,36 +5,60 @@
 #include "host/cli/formats/TextLayout.h"
 #include "host/cli/formats/ValueText.h"
 
+#include <set>
+#include <sstream>
+
 namespace vrxhost {
 namespace {
 
-// Devices below what they belong to, then what no association names.
-class TTreeFormat : public IFormat
+// Devices below what they belong to, then what no association names. The last instance may decide where the first one
+// belongs, so the tree is written at the end; until then the names and the links are held, and no other property.
+class TTreeFormat : public IFormat, public IInstanceSink
 {
   public:
     explicit TTreeFormat(const TFormatOptions& options) : fOptions(options) {}
 
+    IInstanceSink* BeginStream(const TDocumentHead&) override
+    {
+        fIsStreaming = true;
+        return this;
+    }
+
+    void BeginClass(const std::string&, const TClassRecord&) override {}
+
+    void Add(const TClassRecord& each, const TInstanceRecord& instance) override
+    {
+        if (!each.fIsAssociation || !fLinks.Add(each, instance)) {
+            fLabels += PathLabel(instance.fPath) + "\n";
+        }
+        fIsEmpty = false;
+    }
+
     std::string Finish(const TDocument& document) override
     {
-        std::vector<const TClassRecord*> associations;
-        std::string rest;
-        for (const TProviderRecord& provider : document.fProviders) {
-            for (const TClassRecord& each : provider.fClasses) {
-                if (each.fIsAssociation) {
-                    associations.push_back(&each);
-                }
-            }
+        if (!fIsStreaming) {
+            AddInstances(document);
         }
-        const std::string tree = AssociationTree(associations, "") + Partial(document);
-        for (const TProviderRecord& provider : document.fProviders) {
-            for (const TClassRecord& each : provider.fClasses) {
-                rest += each.fIsAssociation ? "" : Unlinked(each, tree);
-            }
+        const std::string partial = Partial(document);
+        if (fIsEmpty && partial.empty()) {
+            return MakeTableFormat(fOptions, nullptr)->Finish(document);
         }
-        return tree.empty() && rest.empty() ? MakeTableFormat(fOptions, nullptr)->Finish(document) : tree + rest;
+        const std::vector<TLinkedObject> objects = fLinks.GetObjects();
+        return AssociationTree(objects, "") + partial + Unlinked(objects);
     }
 
   private:
+    void AddInstances(const TDocument& document)
+    {
+        for (const TProviderRecord& provider : document.fProviders) {
+            for (const TClassRecord& each : provider.fClasses) {
+                for (const TInstanceRecord& instance : each.fInstances) {
+                    Add(each, instance);
+                }
+            }
+        }
+    }
+
     static std::string Partial(const TDocument& document)
     {
         std::string lines;
@@ -44,17 +68,31 @@ class TTreeFormat : public IFormat
         return lines;
     }
 
-    static std::string Unlinked(const TClassRecord& each, const std::string& tree)
+    std::string Unlinked(const std::vector<TLinkedObject>& objects) const
     {
+        std::set<std::string> linked;
+        AddLabels(objects, linked);
         std::string lines;
-        for (const TInstanceRecord& instance : each.fInstances) {
-            const std::string line = PathLabel(instance.fPath) + "\n";
-            lines += tree.find(line) == std::string::npos ? line : "";
+        std::istringstream labels(fLabels);
+        for (std::string label; std::getline(labels, label);) {
+            lines += linked.count(label) == 0 ? label + "\n" : "";
         }
         return lines;
     }
 
+    static void AddLabels(const std::vector<TLinkedObject>& objects, std::set<std::string>& labels)
+    {
+        for (const TLinkedObject& object : objects) {
+            labels.insert(PathLabel(object.fPath));
+            AddLabels(object.fParts, labels);
+        }
+    }
+
     const TFormatOptions fOptions;
+    bool fIsStreaming = false;
+    bool fIsEmpty = true;
+    TLinks fLinks;
+    std::string fLabels; // of all other instances, a line each
 };
 
 } // namespace

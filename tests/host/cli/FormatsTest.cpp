@@ -11,6 +11,7 @@
 #include <gmock/gmock.h>
 
 #include <algorithm>
+#include <cstring>
 
 #include <malloc.h>
 
@@ -82,6 +83,21 @@ TEST(HtmlFormat, DevicesAreListsInListsAndLossesNameTheirCause)
     EXPECT_THAT(page, HasSubstr("<p class=\"partial\">"));
     EXPECT_THAT(page, HasSubstr("class C &amp; D<br><small>vendor fan, file /v/fan/x.classes.xml</small><br>"
                                 "<code>&lt;server&gt;</code></li>"));
+}
+
+// What is linked in a circle alone has no root, and what ends in the same words as a linked object is another one.
+TEST(TreeFormat, EveryInstanceIsShownOnce)
+{
+    TDocument document;
+    TClassRecord other;
+    other.fInstances = {{"ABA.ID=\"1\"", {}}, {"A.ID=\"1\"", {}}};
+    document.fProviders = {
+        {"p",
+         "libp",
+         "",
+         {other,
+          Association({{"A.ID=\"1\"", "B.ID=\"2\""}, {"B.ID=\"2\"", "A.ID=\"1\""}, {"C.ID=\"3\"", "BA.ID=\"1\""}})}}};
+    EXPECT_EQ(MakeTreeFormat({})->Finish(document), "C 3\n`-- BA 1\nA 1\n`-- B 2\n    `-- A 1\nABA 1\n");
 }
 
 TEST(HtmlFormat, PropertiesThatTheFirstRowsLackHaveAColumn)
@@ -174,11 +190,11 @@ class TPassingInstances : public TInmemClass
     std::size_t fUsed = 0; // after the first 10,000, when buffers have their size
 };
 
-// 90,000 instances of 200 bytes and more would take 18 MB at least.
+// 90,000 instances of 200 bytes and more would take 18 MB at least. A tree keeps their names until the end.
 TEST(StreamedFormats, MemoryDoesNotGrowWithTheNumberOfInstances)
 {
     constexpr std::size_t kMaxGrowth = 4 * 1024 * 1024;
-    for (const std::string name : {"ndjson", "csv", "html", "table"}) {
+    for (const std::string& name : FormatNames()) {
         std::size_t written = 0;
         const auto format = MakeFormat(name, {}, [&written](const std::string& text) { written += text.size(); });
         TInmemNamespace ns;
@@ -188,10 +204,18 @@ TEST(StreamedFormats, MemoryDoesNotGrowWithTheNumberOfInstances)
         head.fCommand = "instances";
         collector.SetSink(format->BeginStream(head), false);
         const auto owner = boost::make_shared<TPassingInstances>("X_Passing");
-        EXPECT_EQ(collector.ReadClass(*owner, EDetail::kInstances).fInstanceCount, 100000u);
+        TDocument document;
+        document.fProviders = {{"", "", "", {collector.ReadClass(*owner, EDetail::kInstances)}}};
+        EXPECT_EQ(document.fProviders.front().fClasses.front().fInstanceCount, 100000u);
         EXPECT_EQ(owner->fKept, 0) << name;
         EXPECT_LE(owner->fGrowth, kMaxGrowth) << name;
-        EXPECT_GT(written, 20000000u) << name;
+        const std::string end = format->Finish(document);
+        if (name == "tree") {
+            EXPECT_EQ(end.size(), 100000 * std::strlen("X_Passing\n"));
+        } else {
+            EXPECT_GT(written, 20000000u) << name;
+            EXPECT_LT(end.size(), 10000u) << name;
+        }
     }
 }
 

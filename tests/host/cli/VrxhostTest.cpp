@@ -45,39 +45,17 @@ TEST_F(VrxhostProgram, InventoryAsTable)
     EXPECT_THAT(ReadFile(fRoot / "vrxhost.log"), HasSubstr("consumer vrxhost-"));
 }
 
-TEST_F(VrxhostProgram, InstancesAsJsonWithTrueTypes)
+// The cases of golden_test.py are stable documents; these members are the rest.
+TEST_F(VrxhostProgram, JsonHasTimesAndVolatileProperties)
 {
-    const auto outcome = Run({"instances", "fake_everytype", "--format", "json"});
-    EXPECT_TRUE(HasStatus(outcome, 0));
-    EXPECT_EQ(outcome.fOutput.substr(outcome.fOutput.find("  \"instances\"")), R"(  "instances": [
-    {
-      "path": "Fake_EveryType.ID=\"one \\\"two\\\"\u001b[31m\"",
-      "properties": {
-        "Boolean": true,
-        "Character": "€",
-        "Date": "20261121041500.000000+060",
-        "Empty": [],
-        "ID": "one \"two\"\u001b[31m",
-        "Minimum": -9223372036854775808,
-        "MixedCase": -128,
-        "Names": [
-          "a",
-          "b�"
-        ],
-        "Nothing": null,
-        "NullReference": null,
-        "Real32": 0.1,
-        "Real64": 1e+300,
-        "Reference": "root/cimv2:A.k=\"1\"",
-        "Speed": 18446744073709551615
-      }
+    const auto json = nlohmann::ordered_json::parse(Run({"instances", "fake_everytype", "--format", "json"}).fOutput);
+    std::string names;
+    for (const auto& member : json.items()) {
+        names += member.key() + " ";
     }
-  ],
-  "complete": true,
-  "losses": [],
-  "notes": []
-}
-)");
+    EXPECT_EQ(names, "format tool command host run started name superclass properties instances ended complete losses "
+                     "notes ");
+    EXPECT_EQ(json["instances"][0]["properties"]["MixedCase"], -128);
 }
 
 TEST_F(VrxhostProgram, ClassesAndProviders)
@@ -483,7 +461,7 @@ TEST_F(VrxhostProgram, SecondHostInOneRootIsRefused)
     EXPECT_EQ(outcome.fErrorOutput, "vrxhost: " + sentence + "\n");
     const auto json = nlohmann::json::parse(Run({"inventory", "--format", "json"}).fOutput);
     EXPECT_EQ(json["complete"], false);
-    EXPECT_EQ(json["losses"].dump(), nlohmann::json({{{"text", sentence}}}).dump());
+    EXPECT_EQ(json["losses"].dump(), nlohmann::json({{{"kind", "busy-root"}, {"text", sentence}}}).dump());
     EXPECT_EQ(ReadFile(fRoot / "vrxhost.log"), "of the first");
 }
 
