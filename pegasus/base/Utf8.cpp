@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/base/Utf8.h"
 
+#include "pegasus/base/ByteBlock.h"
+
 #include <algorithm>
 #include <cstdint>
 #include <cstring>
@@ -135,17 +137,16 @@ std::size_t validLength(std::string_view bytes, std::size_t at) noexcept
 
 bool isUtf8(std::string_view bytes) noexcept
 {
-    std::size_t at = 0;
-    while (at < bytes.size()) {
-        if (bytes.size() - at >= kBlock && isAsciiBlock(bytes.data() + at)) {
-            at += kBlock;
-            continue;
+    for (std::size_t at = 0; (at = findMarked(bytes, at, [](const ByteBlock& c) { return c >= 0x80; })) < bytes.size();)
+    {
+        // Such sequences seldom come alone.
+        for (std::size_t i = 0; i < kBlock && at < bytes.size(); ++i) {
+            const std::size_t length = validLength(bytes, at);
+            if (length == 0) {
+                return false;
+            }
+            at += length;
         }
-        const std::size_t length = validLength(bytes, at);
-        if (length == 0) {
-            return false;
-        }
-        at += length;
     }
     return true;
 }

@@ -126,34 +126,36 @@ constexpr std::array<bool, 256> kPlain = plainCharacters();
 
 using Block = base::ByteBlock;
 
-// Returns: how many characters of a block stay as they are, up to the first other one.
-// Requires, but for kRaw: a character before the block and one after it.
-std::size_t keptIn(const char* from, Blanks blanks)
+// Marks the characters that are written in another form wherever they stand.
+auto changesIn(const Block& c)
 {
-    const Block c = base::loadBlock(from);
-    auto changes = (c < 0x20) | (c == 0x7F) | (c == '"') | (c == '&') | (c == '\'') | (c == '<') | (c == '>');
-    if (blanks == Blanks::kReferences) {
-        changes |= (c == ' ') & (base::loadBlock(from - 1) == ' ');
-    }
-    return base::firstMarked(changes);
+    return (c < 0x20) | (c == 0x7F) | (c == '"') | (c == '&') | (c == '\'') | (c == '<') | (c == '>');
 }
 
-bool isKept(std::string_view text, std::size_t at, Blanks blanks)
+// Returns: how many characters of a block stay as they are, up to the first other one.
+// Requires: a character before the block and one after it.
+std::size_t keptIn(const char* from)
 {
-    if (text[at] != ' ' || blanks == Blanks::kRaw) {
-        return kPlain[static_cast<unsigned char>(text[at])] || text[at] == ' ';
-    }
-    return at > 0 && at + 1 < text.size() && text[at - 1] != ' ';
+    const Block c = base::loadBlock(from);
+    return base::firstMarked(changesIn(c) | ((c == ' ') & (base::loadBlock(from - 1) == ' ')));
+}
+
+bool isKept(std::string_view text, std::size_t at)
+{
+    return text[at] != ' ' ? kPlain[static_cast<unsigned char>(text[at])]
+                           : at > 0 && at + 1 < text.size() && text[at - 1] != ' ';
 }
 
 // Returns: the next character from `at` on that changes; the text's size when the rest stays as it is.
 std::size_t findEscaped(std::string_view text, std::size_t at, Blanks blanks)
 {
+    if (blanks == Blanks::kRaw) {
+        return base::findMarked(text, at, changesIn);
+    }
     while (at < text.size()) {
         const std::size_t end = std::min(at + sizeof(Block), text.size());
-        const bool isWithin = blanks == Blanks::kRaw ? end - at == sizeof(Block) : at > 0 && end < text.size();
-        if (isWithin) {
-            const std::size_t kept = keptIn(text.data() + at, blanks);
+        if (at > 0 && end < text.size()) {
+            const std::size_t kept = keptIn(text.data() + at);
             at += kept;
             if (kept < sizeof(Block)) {
                 return at;
@@ -161,7 +163,7 @@ std::size_t findEscaped(std::string_view text, std::size_t at, Blanks blanks)
             continue;
         }
         for (; at < end; ++at) {
-            if (!isKept(text, at, blanks)) {
+            if (!isKept(text, at)) {
                 return at;
             }
         }
@@ -259,6 +261,11 @@ void checkXmlDeclaration(std::string_view declaration, XmlPlace place)
     if (encoding && std::none_of(std::begin(kEncodings), std::end(kEncodings), isTaken)) {
         throw XmlError(XmlError::Kind::kInvalid, place, "unsupported encoding \"" + std::string(*encoding) + "\"");
     }
+}
+
+bool isPlainText(std::string_view text)
+{
+    return base::findMarked(text, 0, [](const Block& c) { return changesIn(c) | (c >= 0x80); }) == text.size();
 }
 
 void appendEscaped(std::string& out, std::string_view text, Blanks blanks)

@@ -50,6 +50,9 @@ enum class Blanks
     kRaw         // as they are
 };
 
+// Returns: whether the text is ASCII that appendEscaped() with kRaw leaves as it is.
+bool isPlainText(std::string_view text);
+
 // Appends `text` (UTF-8) as XML text or attribute value: & < > " ' become entities. What a parser would change becomes
 // a character reference: control characters and, unless `blanks` says otherwise, blanks.
 void appendEscaped(std::string& out, std::string_view text, Blanks blanks = Blanks::kReferences);
