@@ -33,6 +33,10 @@ void appendPropertyStart(std::string& out, const CIMConstProperty& property);
 
 // CLASSNAME
 void appendClassName(std::string& out, const CIMName& className);
+// The start tag of INSTANCENAME
+void appendInstanceNameStart(std::string& out, const CIMName& className);
+// The start tags of KEYBINDING and KEYVALUE. Requires: another type than REFERENCE.
+void appendKeyStart(std::string& out, const CIMName& name, CIMKeyBinding::Type type);
 // INSTANCENAME
 void appendInstanceName(std::string& out, const CIMObjectPath& path, Blanks blanks = Blanks::kReferences);
 // LOCALINSTANCEPATH: namespace and INSTANCENAME

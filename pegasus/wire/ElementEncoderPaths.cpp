@@ -21,21 +21,31 @@ const char* keyTypeName(CIMKeyBinding::Type type)
     }
 }
 
+void appendBindingStart(std::string& out, const CIMName& name)
+{
+    out += "<KEYBINDING";
+    appendAttribute(out, "NAME", name.getString());
+    out += ">\n";
+}
+
+void appendValueStart(std::string& out, CIMKeyBinding::Type type)
+{
+    out += "<KEYVALUE";
+    appendAttribute(out, "VALUETYPE", keyTypeName(type));
+    out += '>';
+}
+
 // The one key of a path may come without its name (DSP0201, INSTANCENAME).
 void appendKeyBinding(std::string& out, const CIMKeyBinding& key, Blanks blanks)
 {
     const bool isNamed = !key.getName().isNull();
     if (isNamed) {
-        out += "<KEYBINDING";
-        appendAttribute(out, "NAME", key.getName().getString());
-        out += ">\n";
+        appendBindingStart(out, key.getName());
     }
     if (key.getType() == CIMKeyBinding::REFERENCE) {
         appendReference(out, CIMObjectPath(key.getValue()));
     } else {
-        out += "<KEYVALUE";
-        appendAttribute(out, "VALUETYPE", keyTypeName(key.getType()));
-        out += '>';
+        appendValueStart(out, key.getType());
         appendEscaped(out, key.getValue(), blanks);
         out += "</KEYVALUE>\n";
     }
@@ -82,11 +92,22 @@ void appendClassName(std::string& out, const CIMName& className)
     out += "/>\n";
 }
 
-void appendInstanceName(std::string& out, const CIMObjectPath& path, Blanks blanks)
+void appendInstanceNameStart(std::string& out, const CIMName& className)
 {
     out += "<INSTANCENAME";
-    appendAttribute(out, "CLASSNAME", path.getClassName().getString());
+    appendAttribute(out, "CLASSNAME", className.getString());
     out += ">\n";
+}
+
+void appendKeyStart(std::string& out, const CIMName& name, CIMKeyBinding::Type type)
+{
+    appendBindingStart(out, name);
+    appendValueStart(out, type);
+}
+
+void appendInstanceName(std::string& out, const CIMObjectPath& path, Blanks blanks)
+{
+    appendInstanceNameStart(out, path.getClassName());
     const Array<CIMKeyBinding>& keys = path.getKeyBindings();
     for (Uint32 i = 0; i < keys.size(); ++i) {
         appendKeyBinding(out, keys[i], blanks);

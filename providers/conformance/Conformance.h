@@ -58,3 +58,5 @@ extern const CMPIStatus kGarbage;
 CMPIObjectPath* newPath(const Env* env, const char* className);
 CMPIInstance* newInst(const Env* env, const char* className);
 const char* textOf(const CMPIString* string);
+/* Sets properties of all scalar types of an instance of TST_Everything, and one array. */
+void setScalars(const CMPIBroker* broker, const CMPIInstance* instance);

@@ -115,6 +115,9 @@ static CMPIStatus returnOther(const CMPIResult* result, const char* className)
     instance->ft->setProperty(instance, "Id", (const CMPIValue*)"other", CMPI_chars);
     instance->ft->setProperty(instance, "Text", (const CMPIValue*)"of another class", CMPI_chars);
     instance->ft->setProperty(instance, "OfLeaf", (const CMPIValue*)"of the leaf", CMPI_chars);
+    if (strcmp(className, "TST_Everything") == 0) {
+        setScalars(gBroker, instance);
+    }
     return result->ft->returnInstance(result, instance);
 }
 

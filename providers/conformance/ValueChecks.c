@@ -65,6 +65,21 @@ static const char* scalarsComeBack(const Env* env)
     return NULL;
 }
 
+void setScalars(const CMPIBroker* broker, const CMPIInstance* instance)
+{
+    CMPIArray* numbers = broker->eft->newArray(broker, 2, CMPI_uint8, NULL);
+    const CMPIDateTime* time = broker->eft->newDateTimeFromChars(broker, "20231114221320.123456+060", NULL);
+    for (int i = 0; i < kScalarCount; ++i) {
+        instance->ft->setProperty(instance, kScalars[i].property, &kScalars[i].value, kScalars[i].type);
+    }
+    instance->ft->setProperty(instance, "Number", &kScalars[5].value, CMPI_uint16);
+    instance->ft->setProperty(instance, "S", (const CMPIValue*)"<\xc3\xa9 & a long text with \"quotes\" and\ttabs>",
+                              CMPI_chars);
+    instance->ft->setProperty(instance, "D", (const CMPIValue*)&time, CMPI_dateTime);
+    instance->ft->setProperty(instance, "U8A", (const CMPIValue*)&numbers, CMPI_uint8A);
+    instance->ft->setProperty(instance, "R32", NULL, CMPI_real32);
+}
+
 static const char* textIsThePointerItself(const Env* env)
 {
     const CMPIInstance* instance = newInst(env, "TST_Everything");

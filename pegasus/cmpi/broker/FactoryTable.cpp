@@ -42,8 +42,8 @@ CMPIObjectPath* newObjectPath(const CMPIBroker* broker, const char* nameSpace, c
     return made<CMPIObjectPath>(rc, [&] {
         Broker& owner = Broker::of(broker);
         Frame& frame = Frame::current();
-        const std::string own = base::utf8(frame.origin().nameSpace);
         const bool isNamed = nameSpace != nullptr && *nameSpace != '\0';
+        const std::string own = isNamed ? std::string() : base::utf8(frame.origin().nameSpace);
         return frame.make<ObjectPathObject>(owner, PathState(owner, isNamed ? nameSpace : own.c_str(), className));
     });
 }

@@ -54,6 +54,25 @@ const CallOrigin& Frame::origin() const
     return fOrigin ? *fOrigin : kNone;
 }
 
+std::vector<ProviderValue> Frame::takeValues(std::size_t count)
+{
+    std::vector<ProviderValue> values;
+    values.swap(fSpareValues);
+    values.resize(count);
+    return values;
+}
+
+void Frame::leaveValues(std::vector<ProviderValue> values) noexcept
+{
+    if (tCurrent == nullptr || values.capacity() < tCurrent->fSpareValues.capacity()) {
+        return;
+    }
+    for (ProviderValue& value : values) {
+        value.reset();
+    }
+    tCurrent->fSpareValues.swap(values);
+}
+
 void Frame::adopt(Owned& object)
 {
     object.fPrevious = &fObjects;

@@ -1,11 +1,14 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "pegasus/cmpi/objects/ProviderValue.h"
+
 #include <Pegasus/Common/CIMName.h>
 
 #include <memory>
 #include <string>
 #include <utility>
+#include <vector>
 
 // Who frees what a provider holds, and when. CMPI lets a provider drop every object that the broker makes for it: the
 // broker frees them when the provider's function returns.
@@ -22,6 +25,7 @@
 namespace Pegasus::cmpi {
 
 class Broker;
+class ClassSchema;
 
 // Whose request the objects of a frame are made for.
 struct CallOrigin
@@ -30,6 +34,14 @@ struct CallOrigin
     std::string provider;
     CIMNamespaceName nameSpace;
     unsigned depth = 0; // in upcalls of the module's own
+};
+
+// The class of the path that a provider made last, as it named it: most calls make paths of one class.
+struct NamedClass
+{
+    std::string nameSpaceText;
+    CIMNamespaceName nameSpace;
+    const ClassSchema* schema = nullptr; // null: none yet
 };
 
 // Base of everything that a frame can free.
@@ -72,6 +84,13 @@ class Frame
     static Frame& current();
 
     const CallOrigin& origin() const;
+    // Belongs to the origin's broker.
+    NamedClass& lastClass() { return fLastClass; }
+
+    // Returns: values that are not set, in the memory of an earlier instance where there is one.
+    std::vector<ProviderValue> takeValues(std::size_t count);
+    // Keeps the memory of an instance that ends for the next one of this call.
+    static void leaveValues(std::vector<ProviderValue> values) noexcept;
 
     // Makes an object in this frame.
     // Ownership: the frame's, until the object is deleted or unlinked.
@@ -92,6 +111,8 @@ class Frame
     Owned fObjects; // fixed node of the ring; the newest object comes first
     Frame* fOuter;
     std::shared_ptr<const CallOrigin> fOrigin; // may be null
+    NamedClass fLastClass;
+    std::vector<ProviderValue> fSpareValues; // none is set
 };
 
 } // namespace Pegasus::cmpi

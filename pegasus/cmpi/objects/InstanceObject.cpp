@@ -81,15 +81,23 @@ CIMProperty propertyOf(const PropertySchema& declared, const CIMValue& value)
 
 constexpr wire::Blanks kBlanks = wire::Blanks::kRaw; // how OpenPegasus passes a provider's texts on
 
-void appendDeclared(std::string& out, const PropertySchema& declared, const CIMValue& value)
+// Appends the property of an instance that may or may not have set it.
+void appendDeclared(std::string& out, const PropertySchema& declared, const ProviderValue& value)
 {
     if (declared.start.empty()) {
-        wire::appendProperty(out, propertyOf(declared, value), kBlanks);
-        return;
+        wire::appendProperty(out, propertyOf(declared, value.isSet() ? value.value() : declared.initial), kBlanks);
+    } else if (!value.isSet()) {
+        out += declared.unset;
+    } else if (value.isPlain()) {
+        out += declared.start;
+        out += "<VALUE>";
+        value.appendText(out);
+        out += "</VALUE>\n</PROPERTY>\n";
+    } else {
+        out += declared.start;
+        wire::appendValue(out, value.value(), kBlanks);
+        out += "</PROPERTY>\n";
     }
-    out += declared.start;
-    wire::appendValue(out, value, kBlanks);
-    out += "</PROPERTY>\n";
 }
 
 // The bit in fPathKeys of a key property; none for other properties, and for keys beyond the 32nd.
@@ -103,12 +111,11 @@ std::uint32_t keyBit(const ClassSchema& schema, std::size_t property)
 } // namespace
 
 InstanceObject::InstanceObject(Broker& owner, const PathState& path)
-    : CMPIInstance{nullptr, &kInstanceTable}, broker(owner), fPath(path)
+    : CMPIInstance{nullptr, &kInstanceTable}, broker(owner), fPath(path),
+      fValues(Frame::current().takeValues(path.schema != nullptr ? path.schema->properties().size() : 0)),
+      fLastSet(ClassSchema::kNotFound)
 {
     hdl = this;
-    if (fPath.schema != nullptr) {
-        fPlaces.assign(fPath.schema->properties().size(), 0);
-    }
     takeKeys();
 }
 
@@ -119,22 +126,28 @@ InstanceObject::InstanceObject(Broker& owner, const CIMInstance& instance, const
 }
 
 InstanceObject::InstanceObject(const InstanceObject& other)
-    : CMPIInstance{nullptr, &kInstanceTable}, broker(other.broker), fPath(other.fPath), fPlaces(other.fPlaces),
-      fSet(other.fSet), fPathKeys(other.fPathKeys), fExtra(other.fExtra)
+    : CMPIInstance{nullptr, &kInstanceTable}, broker(other.broker), fPath(other.fPath), fValues(other.fValues),
+      fLastSet(other.fLastSet), fPathKeys(other.fPathKeys), fExtra(other.fExtra)
 {
     hdl = this;
+}
+
+InstanceObject::~InstanceObject()
+{
+    Frame::leaveValues(std::move(fValues));
 }
 
 // A path's keys may be wider than the class declares; a key that the class lacks stays in the path alone.
 void InstanceObject::takeKeys()
 {
-    for (const NamedValue& key : fPath.keys) {
+    for (const PathKey& key : fPath.keys) {
         const std::size_t at = fPath.schema ? fPath.schema->findKey(key.name) : ClassSchema::kNotFound;
         if (at != ClassSchema::kNotFound) {
-            store(at, convertKey(key.value, fPath.schema->properties()[at].type));
+            const CIMType type = fPath.schema->properties()[at].type;
+            fValues[at] = key.value.type() == type ? key.value : ProviderValue(convertKey(key.value.value(), type));
             fPathKeys |= keyBit(*fPath.schema, at);
         } else if (fPath.schema == nullptr) {
-            storeExtra(key.name, key.value);
+            storeExtra(key.name, key.value.value());
         }
     }
 }
@@ -149,20 +162,10 @@ void InstanceObject::takeProperties(const CIMInstance& instance)
         }
         const std::size_t at = fPath.schema->find(base::utf8(property.getName()));
         if (at != ClassSchema::kNotFound && accepts(fPath.schema->properties()[at], property.getValue())) {
-            store(at, property.getValue());
+            fValues[at] = ProviderValue(property.getValue());
         }
     }
     fPathKeys = 0; // an instance of the server's
-}
-
-void InstanceObject::store(std::size_t index, CIMValue value)
-{
-    if (fPlaces[index] != 0) {
-        fSet[fPlaces[index] - 1U] = std::move(value);
-        return;
-    }
-    fSet.push_back(std::move(value));
-    fPlaces[index] = static_cast<std::uint16_t>(fSet.size());
 }
 
 void InstanceObject::storeExtra(const CIMName& name, CIMValue value)
@@ -176,20 +179,20 @@ void InstanceObject::storeExtra(const CIMName& name, CIMValue value)
     fExtra.push_back({name, std::move(value)});
 }
 
-const CIMValue& InstanceObject::valueAt(std::size_t index) const
+CIMValue InstanceObject::valueAt(std::size_t index) const
 {
-    return fPlaces[index] != 0 ? fSet[fPlaces[index] - 1U] : fPath.schema->properties()[index].initial;
+    return fValues[index].isSet() ? fValues[index].value() : fPath.schema->properties()[index].initial;
 }
 
 CMPICount InstanceObject::propertyCount() const
 {
-    return static_cast<CMPICount>(fPath.schema ? fPlaces.size() : fExtra.size());
+    return static_cast<CMPICount>(fPath.schema ? fValues.size() : fExtra.size());
 }
 
 // An empty array reads as null, as it does on OpenPegasus; clients get it as it is.
 CMPIData InstanceObject::encode(std::size_t index) const
 {
-    const CIMValue& value = fPath.schema ? valueAt(index) : fExtra[index].value;
+    const CIMValue value = fPath.schema ? valueAt(index) : fExtra[index].value;
     const bool isEmpty = value.isArray() && !value.isNull() && value.getArraySize() == 0;
     return encodeValue(broker, isEmpty ? CIMValue(value.getType(), true) : value);
 }
@@ -229,12 +232,26 @@ void InstanceObject::setProperty(const char* name, const CMPIValue* value, CMPIT
         storeExtra(requireName(name), decodeValue(value, type));
         return;
     }
-    const std::size_t at = fPath.schema->find(name);
+    const std::size_t at = fPath.schema->findAfter(fLastSet, name);
     if (at == ClassSchema::kNotFound) {
         broker.warnOnce("setProperty: class " + fPath.schema->text() + " has no property " + name);
         return;
     }
+    fLastSet = at;
     const PropertySchema& declared = fPath.schema->properties()[at];
+    const bool mayBeTaken = value != nullptr && !declared.start.empty();
+    if (!mayBeTaken || !fValues[at].take(*value, type, declared.type)) {
+        store(at, value, type);
+    }
+    if (declared.isKey) {
+        fPathKeys &= ~keyBit(*fPath.schema, at);
+    }
+}
+
+// A value of any form.
+void InstanceObject::store(std::size_t index, const CMPIValue* value, CMPIType type)
+{
+    const PropertySchema& declared = fPath.schema->properties()[index];
     if (type == CMPI_null) {
         tolerate(Habit::kUntypedNull);
     } else if (declared.embedded != EmbeddedKind::kNone && value != nullptr && cimTypeOf(type) == CIMTYPE_STRING) {
@@ -248,10 +265,7 @@ void InstanceObject::setProperty(const char* name, const CMPIValue* value, CMPIT
         broker.warnOnce("setProperty: " + text); // many a provider ignores the status
         throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, text};
     }
-    store(at, std::move(decoded));
-    if (declared.isKey) {
-        fPathKeys &= ~keyBit(*fPath.schema, at);
-    }
+    fValues[index] = ProviderValue(std::move(decoded));
 }
 
 // Most providers set keys as properties only; the path that goes to the client needs them all.
@@ -262,7 +276,7 @@ PathState InstanceObject::completePath() const
         return path;
     }
     for (const std::size_t key : path.schema->keys()) {
-        const CIMValue& value = valueAt(key);
+        const ProviderValue value = fValues[key].isSet() ? fValues[key] : ProviderValue(valueAt(key));
         const CIMName& name = path.schema->properties()[key].name;
         if (!value.isNull() && path.findKey(name) == nullptr) {
             path.keys.push_back({name, value});
@@ -323,6 +337,38 @@ CIMObjectPath InstanceObject::deliveredPath() const
     return completePath().delivered();
 }
 
+// Appends the path as INSTANCENAME if it consists of the class's keys, all with plain values.
+// Returns: false, with nothing appended, for any other.
+bool InstanceObject::appendPlainName(std::string& out) const
+{
+    if (fPath.schema == nullptr || fPathKeys != 0) {
+        return false;
+    }
+    const std::size_t size = out.size();
+    out += fPath.schema->nameStart();
+    std::size_t ofPath = 0;
+    for (const std::size_t at : fPath.schema->keys()) {
+        const PropertySchema& declared = fPath.schema->properties()[at];
+        const PathKey* const key = fPath.findKey(declared.name);
+        const ProviderValue& value = key != nullptr ? key->value : fValues[at];
+        if (!value.isPlain() || value.type() != declared.type ||
+            (key != nullptr && key->name.getString() != declared.name.getString()))
+        {
+            out.resize(size);
+            return false;
+        }
+        ofPath += key != nullptr ? 1 : 0;
+        out += declared.keyStart;
+        value.appendText(out);
+        out += "</KEYVALUE>\n</KEYBINDING>\n";
+    }
+    out += "</INSTANCENAME>\n";
+    if (ofPath != fPath.keys.size()) {
+        out.resize(size);
+    }
+    return out.size() > size;
+}
+
 CIMInstance InstanceObject::delivered(const PropertyFilter& filter) const
 {
     CIMInstance result = filtered(filter);
@@ -333,12 +379,16 @@ CIMInstance InstanceObject::delivered(const PropertyFilter& filter) const
 void InstanceObject::appendDelivered(std::string& out, const PropertyFilter& filter) const
 {
     out += "<VALUE.NAMEDINSTANCE>\n";
-    wire::appendInstanceName(out, deliveredPath(), kBlanks);
-    wire::appendInstanceStart(out, fPath.className);
-    if (fPath.schema != nullptr) {
+    if (!appendPlainName(out)) {
+        wire::appendInstanceName(out, deliveredPath(), kBlanks);
+    }
+    if (fPath.schema == nullptr) {
+        wire::appendInstanceStart(out, fPath.className);
+    } else {
+        out += fPath.schema->instanceStart();
         const auto& declared = fPath.schema->properties();
         for (const std::size_t i : filter.passing(*fPath.schema)) {
-            appendDeclared(out, declared[i], valueAt(i));
+            appendDeclared(out, declared[i], fValues[i]);
         }
     }
     for (const NamedValue* extra : undeclared(filter)) {

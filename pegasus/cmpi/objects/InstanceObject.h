@@ -2,6 +2,8 @@
 #pragma once
 
 #include "pegasus/cmpi/objects/ObjectPathObject.h"
+#include "pegasus/cmpi/objects/ProviderValue.h"
+#include "pegasus/cmpi/objects/ValueCodec.h"
 
 #include <Pegasus/Common/CIMInstance.h>
 
@@ -27,6 +29,7 @@ class InstanceObject final : public Owned, public CMPIInstance
     // An instance from the server. `nameSpace` is where its class is declared; null takes it from the instance's path.
     InstanceObject(Broker& owner, const CIMInstance& instance, const CIMNamespaceName& nameSpace = CIMNamespaceName());
     InstanceObject(const InstanceObject& other);
+    ~InstanceObject() override;
 
     CMPICount propertyCount() const;
     // Throws: CMPI_RC_ERR_NO_SUCH_PROPERTY.
@@ -53,22 +56,23 @@ class InstanceObject final : public Owned, public CMPIInstance
     Lifetime lifetime = Lifetime::kFrame;
 
   private:
-    const CIMValue& valueAt(std::size_t index) const;
-    void store(std::size_t index, CIMValue value);
+    CIMValue valueAt(std::size_t index) const;
+    void store(std::size_t index, const CMPIValue* value, CMPIType type);
     void storeExtra(const CIMName& name, CIMValue value);
     void takeKeys();
     void takeProperties(const CIMInstance& instance);
     CMPIData encode(std::size_t index) const;
     CIMObjectPath deliveredPath() const;
+    bool appendPlainName(std::string& out) const;
     CIMInstance filtered(const PropertyFilter& filter) const;
     // Returns: what an instance of an unknown class delivers.
     std::vector<const NamedValue*> undeclared(const PropertyFilter& filter) const;
 
     PathState fPath;
-    std::vector<std::uint16_t> fPlaces; // by declared property: 0 when not set, else its index in fSet, plus 1
-    std::vector<CIMValue> fSet;
-    std::uint32_t fPathKeys = 0;    // by key of the class, up to 32: its property has the path's value alone
-    std::vector<NamedValue> fExtra; // the properties, when the class is unknown
+    std::vector<ProviderValue> fValues; // by declared property
+    std::size_t fLastSet;               // the declared property that the provider set last; kNotFound at first
+    std::uint32_t fPathKeys = 0;        // by key of the class, up to 32: its property has the path's value alone
+    std::vector<NamedValue> fExtra;     // the properties, when the class is unknown
 };
 
 extern const CMPIInstanceFT kInstanceTable;

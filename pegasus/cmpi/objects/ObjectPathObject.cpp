@@ -77,11 +77,11 @@ CMPIData getKey(const CMPIObjectPath* self, const char* name, CMPIStatus* rc)
 {
     return answer(rc, kNothing, [&] {
         const ObjectPathObject& path = objectOf<ObjectPathObject>(self);
-        const NamedValue* key = path.state.findKey(std::string_view(requireText(name)));
+        const PathKey* key = path.state.findKey(std::string_view(requireText(name)));
         if (key == nullptr) {
             throw CmpiError{CMPI_RC_ERR_NOT_FOUND, {}};
         }
-        return encodeKey(path.broker, key->value);
+        return encodeKey(path.broker, key->value.value());
     });
 }
 
@@ -95,7 +95,7 @@ CMPIData getKeyAt(const CMPIObjectPath* self, CMPICount index, CMPIString** name
         if (name != nullptr) {
             *name = makeName(path.state.keys[index].name);
         }
-        return encodeKey(path.broker, path.state.keys[index].value);
+        return encodeKey(path.broker, path.state.keys[index].value.value());
     });
 }
 

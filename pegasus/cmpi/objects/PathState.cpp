@@ -6,6 +6,7 @@
 #include "pegasus/cmpi/objects/Broker.h"
 #include "pegasus/cmpi/objects/KeyCodec.h"
 #include "pegasus/cmpi/objects/TableFunction.h"
+#include "pegasus/cmpi/objects/ValueCodec.h"
 #include "pegasus/common/CIMObjectPathRep.h"
 
 #include <Pegasus/Common/Exception.h>
@@ -112,9 +113,21 @@ CIMKeyBinding missingKey(const PropertySchema& declared)
 
 PathState::PathState(Broker& broker, const char* ns, const char* cls)
 {
-    schema = ns != nullptr && cls != nullptr ? broker.classes().find(ns, cls) : nullptr;
+    Frame& frame = Frame::current();
+    NamedClass& last = frame.lastClass();
+    const bool isNamed = ns != nullptr && cls != nullptr;
+    if (isNamed && last.schema != nullptr && last.schema->text() == cls && last.nameSpaceText == ns) {
+        schema = last.schema;
+        nameSpace = last.nameSpace;
+        className = schema->name();
+        return;
+    }
+    schema = isNamed ? broker.classes().find(ns, cls) : nullptr;
     nameSpace = nameSpaceOf(ns);
     className = schema != nullptr ? schema->name() : classOf(cls);
+    if (schema != nullptr && frame.origin().broker == &broker) {
+        last = {ns, nameSpace, schema};
+    }
 }
 
 PathState::PathState(Broker& broker, const CIMObjectPath& path)
@@ -124,7 +137,7 @@ PathState::PathState(Broker& broker, const CIMObjectPath& path)
     const Array<CIMKeyBinding>& bindings = path.getKeyBindings();
     keys.reserve(bindings.size());
     for (Uint32 i = 0; i < bindings.size(); ++i) {
-        keys.push_back({bindings[i].getName(), typedKey(schema, bindings[i])});
+        keys.push_back({bindings[i].getName(), ProviderValue(typedKey(schema, bindings[i]))});
     }
 }
 
@@ -161,22 +174,24 @@ void PathState::addKey(const char* name, const CMPIValue* value, CMPIType type)
     if (!isKeyType(type)) {
         throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, {}};
     }
-    CIMName keyName = keyNameOf(name, type);
-    CIMValue decoded = decodeValue(value, type);
-    if (decoded.isNull()) {
+    PathKey key{keyNameOf(name, type), {}};
+    if (value == nullptr || !key.value.take(*value, type, cimTypeOf(type))) {
+        key.value = ProviderValue(decodeValue(value, type));
+    }
+    if (key.value.isNull()) {
         throw CmpiError{CMPI_RC_ERR_FAILED, "addKey: the value is null"};
     }
     const auto held =
-        std::find_if(keys.begin(), keys.end(), [&](const NamedValue& key) { return key.name.equal(keyName); });
+        std::find_if(keys.begin(), keys.end(), [&](const PathKey& other) { return other.name.equal(key.name); });
     if (held != keys.end()) {
         keys.erase(held);
     }
-    keys.push_back({std::move(keyName), std::move(decoded)});
+    keys.push_back(std::move(key));
 }
 
-const NamedValue* PathState::findKey(std::string_view name) const
+const PathKey* PathState::findKey(std::string_view name) const
 {
-    for (const NamedValue& key : keys) {
+    for (const PathKey& key : keys) {
         if (base::equalNoCase(base::utf8(key.name), name)) {
             return &key;
         }
@@ -184,9 +199,9 @@ const NamedValue* PathState::findKey(std::string_view name) const
     return nullptr;
 }
 
-const NamedValue* PathState::findKey(const CIMName& name) const
+const PathKey* PathState::findKey(const CIMName& name) const
 {
-    for (const NamedValue& key : keys) {
+    for (const PathKey& key : keys) {
         if (key.name.equal(name)) {
             return &key;
         }
@@ -212,23 +227,23 @@ CIMObjectPath PathState::delivered() const
     Array<CIMKeyBinding> result;
     for (const std::size_t key : schema->keys()) {
         const PropertySchema& declared = schema->properties()[key];
-        if (const NamedValue* held = findKey(declared.name)) {
-            result.append(CIMKeyBinding(held->name, held->value));
+        if (const PathKey* held = findKey(declared.name)) {
+            result.append(CIMKeyBinding(held->name, held->value.value()));
         } else if (declared.type != CIMTYPE_REFERENCE) { // an empty reference is not CIM-XML
             result.append(missingKey(declared));
         }
     }
-    std::vector<const NamedValue*> others;
-    for (const NamedValue& key : keys) {
+    std::vector<const PathKey*> others;
+    for (const PathKey& key : keys) {
         if (schema->findKey(key.name) == ClassSchema::kNotFound) {
             others.push_back(&key);
         }
     }
-    std::sort(others.begin(), others.end(), [](const NamedValue* x, const NamedValue* y) {
+    std::sort(others.begin(), others.end(), [](const PathKey* x, const PathKey* y) {
         return String::compareNoCase(x->name.getString(), y->name.getString()) < 0;
     });
-    for (const NamedValue* key : others) {
-        result.append(CIMKeyBinding(key->name, key->value));
+    for (const PathKey* key : others) {
+        result.append(CIMKeyBinding(key->name, key->value.value()));
     }
     return PathAccess::inOrder(className, result);
 }
@@ -236,8 +251,8 @@ CIMObjectPath PathState::delivered() const
 Array<CIMKeyBinding> PathState::bindings() const
 {
     Array<CIMKeyBinding> result;
-    for (const NamedValue& key : keys) {
-        result.append(CIMKeyBinding(key.name, key.value));
+    for (const PathKey& key : keys) {
+        result.append(CIMKeyBinding(key.name, key.value.value()));
     }
     return result;
 }

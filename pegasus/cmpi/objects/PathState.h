@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include "pegasus/cmpi/objects/ValueCodec.h"
+#include "pegasus/cmpi/objects/ProviderValue.h"
 #include "pegasus/cmpi/services/ClassSchema.h"
 
 #include <Pegasus/Common/CIMObjectPath.h>
@@ -10,6 +10,14 @@
 #include <vector>
 
 namespace Pegasus::cmpi {
+
+class Broker;
+
+struct PathKey
+{
+    CIMName name;
+    ProviderValue value; // not null
+};
 
 // What a CMPIObjectPath and the path of a CMPIInstance hold: the parts of a path, its keys as typed values. The class
 // need not exist: providers make paths to classes of other servers.
@@ -26,8 +34,8 @@ struct PathState
     // Throws: CMPI_RC_ERR_INVALID_DATA_TYPE for arrays, instances and untyped nulls.
     void addKey(const char* name, const CMPIValue* value, CMPIType type);
     // Returns: the key of that name (case-insensitive), or null.
-    const NamedValue* findKey(std::string_view name) const;
-    const NamedValue* findKey(const CIMName& name) const;
+    const PathKey* findKey(std::string_view name) const;
+    const PathKey* findKey(const CIMName& name) const;
     // Looks the class up again, after its name or namespace changed.
     void lookUp(Broker& broker);
 
@@ -41,7 +49,7 @@ struct PathState
     CIMNamespaceName nameSpace;
     String host;
     CIMName className;
-    std::vector<NamedValue> keys; // in the order in which they were added
+    std::vector<PathKey> keys; // in the order in which they were added
 
   private:
     Array<CIMKeyBinding> bindings() const;

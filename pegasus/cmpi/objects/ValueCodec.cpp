@@ -16,7 +16,6 @@
 
 #include <array>
 #include <cmath>
-#include <cstring>
 
 namespace Pegasus::cmpi {
 namespace {
@@ -53,35 +52,20 @@ CIMValue convertInteger(const CIMValue& element, CIMType wanted)
     throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, "an element of the array does not fit the array's new type"};
 }
 
-// The value's memory may end right after the type's own bytes, and may be aligned for that type only.
-template <typename T> T read(const CMPIValue* value)
-{
-    T result;
-    std::memcpy(&result, value, sizeof(T)); // NOLINT(bugprone-sizeof-expression): pointers are meant too
-    return result;
-}
-
 template <typename Object, typename Face> CIMValue decodeObject(const CMPIValue* value, CIMType type)
 {
-    const Face* face = read<const Face*>(value);
+    const Face* face = readValue<const Face*>(value);
     return face == nullptr ? CIMValue(type, false) : CIMValue(objectOf<Object>(face).value());
 }
 
-CIMValue decodeText(const char* text)
+CIMValue decodeChars(const char* text)
 {
-    if (text == nullptr) {
-        return {CIMTYPE_STRING, false};
-    }
-    const std::string_view bytes = text;
-    if (!base::isUtf8(bytes)) {
-        tolerate(Habit::kTextNotUtf8);
-    }
-    return CIMValue(base::fromUtf8Repaired(bytes));
+    return text == nullptr ? CIMValue(CIMTYPE_STRING, false) : CIMValue(decodeText(text));
 }
 
 CIMValue decodeString(const CMPIString* string)
 {
-    return decodeText(string == nullptr ? nullptr : static_cast<const char*>(string->hdl));
+    return decodeChars(string == nullptr ? nullptr : static_cast<const char*>(string->hdl));
 }
 
 template <typename Real> CIMValue decodeReal(Real value)
@@ -122,35 +106,35 @@ CIMValue decodeScalar(const CMPIValue* value, CMPIType type)
 {
     switch (type) {
     case CMPI_boolean:
-        return CIMValue(Boolean{read<CMPIBoolean>(value) != 0});
+        return CIMValue(Boolean{readValue<CMPIBoolean>(value) != 0});
     case CMPI_char16:
-        return decodeChar16(read<CMPIChar16>(value));
+        return decodeChar16(readValue<CMPIChar16>(value));
     case CMPI_uint8:
-        return CIMValue(read<Uint8>(value));
+        return CIMValue(readValue<Uint8>(value));
     case CMPI_uint16:
-        return CIMValue(read<Uint16>(value));
+        return CIMValue(readValue<Uint16>(value));
     case CMPI_uint32:
-        return CIMValue(read<Uint32>(value));
+        return CIMValue(readValue<Uint32>(value));
     case CMPI_uint64:
-        return CIMValue(read<Uint64>(value));
+        return CIMValue(readValue<Uint64>(value));
     case CMPI_sint8:
-        return CIMValue(read<Sint8>(value));
+        return CIMValue(readValue<Sint8>(value));
     case CMPI_sint16:
-        return CIMValue(read<Sint16>(value));
+        return CIMValue(readValue<Sint16>(value));
     case CMPI_sint32:
-        return CIMValue(read<Sint32>(value));
+        return CIMValue(readValue<Sint32>(value));
     case CMPI_sint64:
-        return CIMValue(read<Sint64>(value));
+        return CIMValue(readValue<Sint64>(value));
     case CMPI_real32:
-        return decodeReal(read<Real32>(value));
+        return decodeReal(readValue<Real32>(value));
     case CMPI_real64:
-        return decodeReal(read<Real64>(value));
+        return decodeReal(readValue<Real64>(value));
     case CMPI_string:
-        return decodeString(read<const CMPIString*>(value));
+        return decodeString(readValue<const CMPIString*>(value));
     case CMPI_chars:
-        return decodeText(reinterpret_cast<const char*>(value));
+        return decodeChars(reinterpret_cast<const char*>(value));
     case CMPI_charsptr:
-        return decodeText(read<const char*>(value));
+        return decodeChars(readValue<const char*>(value));
     case CMPI_dateTime:
         return decodeObject<DateTimeObject, CMPIDateTime>(value, CIMTYPE_DATETIME);
     case CMPI_ref:
@@ -252,13 +236,21 @@ CIMType cimTypeOf(CMPIType type)
     throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, {}};
 }
 
+String decodeText(std::string_view text)
+{
+    if (!base::isUtf8(text)) {
+        tolerate(Habit::kTextNotUtf8);
+    }
+    return base::fromUtf8Repaired(text);
+}
+
 CIMValue decodeValue(const CMPIValue* value, CMPIType type)
 {
     const bool isArray = (type & CMPI_ARRAY) != 0;
     if (value == nullptr) {
         return {cimTypeOf(type), isArray};
     }
-    return isArray ? decodeArray(read<const CMPIArray*>(value), type) : decodeScalar(value, type);
+    return isArray ? decodeArray(readValue<const CMPIArray*>(value), type) : decodeScalar(value, type);
 }
 
 CMPIData encodeValue(Broker& broker, const CIMValue& value)

@@ -5,11 +5,21 @@
 #include "pegasus/base/Text.h"
 #include "pegasus/wire/ElementEncoder.h"
 
+#include <Pegasus/Common/CIMObjectPath.h>
 #include <Pegasus/Common/CIMProperty.h>
 #include <Pegasus/Common/CIMQualifier.h>
 
+#include <cstring>
+
 namespace Pegasus::cmpi {
 namespace {
+
+CIMKeyBinding::Type keyKind(CIMType type)
+{
+    return type == CIMTYPE_BOOLEAN                                                        ? CIMKeyBinding::BOOLEAN
+           : type == CIMTYPE_STRING || type == CIMTYPE_DATETIME || type == CIMTYPE_CHAR16 ? CIMKeyBinding::STRING
+                                                                                          : CIMKeyBinding::NUMERIC;
+}
 
 bool isTrue(const CIMConstProperty& property, const char* qualifier)
 {
@@ -37,8 +47,11 @@ std::size_t ClassSchema::NoCaseHash::operator()(std::string_view name) const noe
 }
 
 ClassSchema::ClassSchema(const CIMClass& source)
-    : fName(source.getClassName()), fText(base::utf8(fName)), fSuperClass(source.getSuperClassName())
+    : fName(source.getClassName()), fText(base::utf8(fName)), fSuperClass(source.getSuperClassName()),
+      fFollowers(source.getPropertyCount() + 1)
 {
+    wire::appendInstanceNameStart(fNameStart, fName);
+    wire::appendInstanceStart(fInstanceStart, fName);
     fProperties.reserve(source.getPropertyCount());
     for (Uint32 i = 0; i < source.getPropertyCount(); ++i) {
         addProperty(source.getProperty(i));
@@ -65,6 +78,11 @@ void ClassSchema::addProperty(const CIMConstProperty& property)
         CIMProperty bare(added.name, CIMValue(added.type, false));
         bare.setPropagated(added.isInherited);
         wire::appendPropertyStart(added.start, bare);
+        bare.setValue(added.initial);
+        wire::appendProperty(added.unset, bare, wire::Blanks::kRaw);
+    }
+    if (isPlain && added.isKey) {
+        wire::appendKeyStart(added.keyStart, added.name, keyKind(added.type));
     }
     if (added.isKey) {
         fKeys.push_back(fProperties.size());
@@ -76,6 +94,20 @@ std::size_t ClassSchema::find(std::string_view name) const
 {
     const auto found = fIndices.find(name);
     return found == fIndices.end() ? kNotFound : found->second;
+}
+
+std::size_t ClassSchema::findAfter(std::size_t last, const char* name) const
+{
+    std::atomic<std::uint32_t>& follower = fFollowers[last + 1]; // kNotFound is -1
+    const std::size_t guess = follower.load(std::memory_order_relaxed);
+    if (guess < fProperties.size() && std::strcmp(fProperties[guess].text.c_str(), name) == 0) {
+        return guess;
+    }
+    const std::size_t found = find(name);
+    if (found != kNotFound) {
+        follower.store(static_cast<std::uint32_t>(found), std::memory_order_relaxed);
+    }
+    return found;
 }
 
 std::size_t ClassSchema::findKey(const CIMName& name) const

@@ -177,16 +177,19 @@ TEST_F(Module, WrittenInstancesAreThoseDelivered)
     Array<CIMName> names;
     names.append(CIMName("Number"));
     names.append(CIMName("Missing"));
-    for (const CIMPropertyList& properties : {CIMPropertyList(), CIMPropertyList(names)}) {
-        std::string delivered;
-        for (const CIMInstance& item : items(properties)) {
-            wire::appendNamedInstance(delivered, item, wire::Blanks::kRaw);
+    for (const std::string mode : {"", "class TST_Leaf", "class TST_Unknown", "class TST_Everything"}) {
+        setMode(mode);
+        for (const CIMPropertyList& properties : {CIMPropertyList(), CIMPropertyList(names)}) {
+            std::string delivered;
+            for (const CIMInstance& item : items(properties)) {
+                wire::appendNamedInstance(delivered, item, wire::Blanks::kRaw);
+            }
+            std::string written;
+            module->writeInstances(request(), CIMName("TST_Item"), properties,
+                                   [&](std::string_view element) { written += element; });
+            EXPECT_NE(delivered, "");
+            EXPECT_EQ(written, delivered) << mode;
         }
-        std::string written;
-        module->writeInstances(request(), CIMName("TST_Item"), properties,
-                               [&](std::string_view element) { written += element; });
-        EXPECT_NE(delivered, "");
-        EXPECT_EQ(written, delivered);
     }
 }
 
