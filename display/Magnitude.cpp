@@ -37,12 +37,6 @@ constexpr TUnit kUnits[] = {
 constexpr const char* kBinaryPrefixes[] = {"", "Ki", "Mi", "Gi", "Ti", "Pi", "Ei"};
 constexpr const char* kDecimalPrefixes[] = {"", "k", "M", "G", "T", "P", "E"};
 
-bool IsNumber(const TCIMValue& value)
-{
-    using TType = TCIMValue::TCIMType;
-    return !value.IsNull() && value.GetType() >= TType::kUint8 && value.GetType() <= TType::kReal64;
-}
-
 std::string SmallLetters(std::string text)
 {
     std::transform(text.begin(), text.end(), text.begin(), [](unsigned char c) { return std::tolower(c); });

@@ -3,6 +3,12 @@
 
 namespace NKOLVRX20 {
 
+bool IsNumber(const TCIMValue& value)
+{
+    using TType = TCIMValue::TCIMType;
+    return !value.IsNull() && value.GetType() >= TType::kUint8 && value.GetType() <= TType::kReal64;
+}
+
 std::string PlainText(const TCIMValue& value)
 {
     if (value.IsNull()) {

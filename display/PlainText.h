@@ -14,6 +14,9 @@ namespace NKOLVRX20 {
 // Returns: a datetime as ToUIString, a char16 as CharacterText, every other value as ToString(10); null as empty text.
 std::string PlainText(const TCIMValue& value);
 
+// Returns: true for integers and reals that are not null, and for arrays of them.
+bool IsNumber(const TCIMValue& value);
+
 // Returns: the code unit as one UTF-8 character. An unpaired surrogate becomes U+FFFD.
 std::string CharacterText(TCIMChar16 character);
 

@@ -24,11 +24,6 @@ bool IsInteger(const TCIMValue& value)
     return value.GetType() >= TType::kUint8 && value.GetType() <= TType::kSint64;
 }
 
-bool IsNumber(const TCIMValue& value)
-{
-    return value.GetType() >= TType::kUint8 && value.GetType() <= TType::kReal64;
-}
-
 bool IsText(const TCIMValue& value)
 {
     return value.GetType() == TType::kString || value.GetType() == TType::kChar16;

@@ -12,7 +12,6 @@ namespace {
 
 namespace fs = std::filesystem;
 
-constexpr char kMark[] = "pegasus/tree.conf";
 constexpr char kServerKey[] = "server = ";
 constexpr char kEmbedded[] = "embedded";
 constexpr char kInstalled[] = "installed OpenPegasus";
@@ -35,9 +34,9 @@ struct TMark
 
 TMark ReadMark(const std::string& root)
 {
-    std::ifstream mark(fs::path(root) / kMark);
+    std::ifstream mark(fs::path(root) / kTreeMark);
     if (!mark) {
-        Refuse(root, std::string("it has no readable ") + kMark);
+        Refuse(root, std::string("it has no readable ") + kTreeMark);
     }
     bool hasFormat = false;
     std::string server;
@@ -56,7 +55,7 @@ TMark ReadMark(const std::string& root)
     }
     const bool isKnown = server == kEmbedded || (server == kInstalled && !consumer.empty());
     if (!hasFormat || !isKnown) {
-        Refuse(root, std::string("this program does not know the kind of tree that ") + kMark + " names");
+        Refuse(root, std::string("this program does not know the kind of tree that ") + kTreeMark + " names");
     }
     return {server == kEmbedded ? EServerKind::kEmbedded : EServerKind::kInstalled, consumer, state};
 }

@@ -14,6 +14,9 @@ enum class EServerKind
     kInstalled // an installed OpenPegasus's
 };
 
+// The file, below the root, that only staging writes.
+inline constexpr char kTreeMark[] = "pegasus/tree.conf";
+
 // Why a directory is refused as root, as a sentence. Thrown before anything is changed or run.
 class TTreeError : public TFailure
 {

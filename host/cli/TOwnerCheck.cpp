@@ -22,7 +22,6 @@ namespace {
 namespace fs = std::filesystem;
 
 constexpr mode_t kModeBits = 07777;
-constexpr int kMaxDepth = 8;  // below a folder; links may lead round in circles
 constexpr int kMaxLinks = 40; // as in the kernel
 
 // The folders below pegasus whose content is run, loaded or compiled.
@@ -166,7 +165,7 @@ void TOwnerCheck::CheckBelow(const std::string& folder)
          entry.increment(error))
     {
         CheckFile(entry->path());
-        if (entry.depth() == kMaxDepth) {
+        if (entry.depth() == kMaxTreeDepth) {
             entry.disable_recursion_pending();
         }
     }

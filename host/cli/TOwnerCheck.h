@@ -6,6 +6,9 @@
 
 namespace vrxhost {
 
+// How deep a folder of a tree is looked through; links may lead round in circles.
+inline constexpr int kMaxTreeDepth = 8;
+
 // Refuses programs and libraries that somebody else could have put in place: what is checked must belong to root or to
 // the user of this process and be writable by nobody else. A group counts as its owner when nobody else is in it. The
 // same holds for each folder above, except that there the sticky bit makes up for a writable folder.

@@ -17,10 +17,8 @@ namespace {
 namespace fs = std::filesystem;
 
 constexpr mode_t kOwnerOnly = 0700;
-constexpr char kMark[] = "pegasus/tree.conf";
 constexpr char kPlannedConfiguration[] = "pegasus/cimserver_planned.conf";
 constexpr const char* kMirroredFolders[] = {"pegasus/bin", "pegasus/lib", "pegasus/provider", "pegasus/pegSchema"};
-constexpr int kMaxDepth = 8; // as deep as the owners are checked
 
 bool MayWrite(const fs::path& folder)
 {
@@ -119,7 +117,7 @@ void Mirror(const fs::path& from, const fs::path& to, int depth)
     for (const auto& entry : fs::directory_iterator(from)) {
         if (!entry.is_directory()) {
             Link(entry, to / entry.path().filename());
-        } else if (depth < kMaxDepth) {
+        } else if (depth < kMaxTreeDepth) {
             Mirror(entry, to / entry.path().filename(), depth + 1);
         }
     }
@@ -128,7 +126,7 @@ void Mirror(const fs::path& from, const fs::path& to, int depth)
 // Only an earlier run makes the mark a link; a source tree or a deployed tree is somebody's, with a repository to lose.
 void RefuseForeignContent(const fs::path& root)
 {
-    if (fs::exists(root / "pegasus") && !fs::is_empty(root / "pegasus") && !fs::is_symlink(root / kMark)) {
+    if (fs::exists(root / "pegasus") && !fs::is_empty(root / "pegasus") && !fs::is_symlink(root / kTreeMark)) {
         throw TTreeError(ELossKind::kState,
                          "the state directory " + root.string() + " holds a folder pegasus that vrxhost did not make");
     }
@@ -174,7 +172,7 @@ void TPrivateRoot::Lay() const
         const fs::path root = fPath;
         RefuseForeignContent(root);
         MakeFolders(root / "pegasus");
-        Link(fs::path(fTree) / kMark, root / kMark);
+        Link(fs::path(fTree) / kTreeMark, root / kTreeMark);
         for (const char* folder : kMirroredFolders) {
             MakeFolders(root / folder);
             RemoveLinks(root / folder);

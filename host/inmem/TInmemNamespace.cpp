@@ -25,7 +25,7 @@ boost::shared_ptr<Object> Find(const std::map<std::string, boost::shared_ptr<Obj
 }
 
 // Visitors may change the namespace, so a copy of the entries is visited.
-template <typename Objects, typename Visitor> void VisitEach(const Objects objects, const Visitor& visitor)
+template <typename Objects, typename Visitor> void VisitEntries(const Objects objects, const Visitor& visitor)
 {
     for (const auto& object : objects) {
         if (!visitor(object.second)) {
@@ -86,7 +86,7 @@ boost::shared_ptr<ICIMClass> TInmemNamespace::GetClass(const std::string& name, 
 
 void TInmemNamespace::EnumerateRootClasses(TClassVisitor visitor, TCIMContext context)
 {
-    VisitEach(fClasses, [&](const boost::shared_ptr<ICIMClass>& each) {
+    VisitEntries(fClasses, [&](const boost::shared_ptr<ICIMClass>& each) {
         return each->GetSuperClass(context) ? true : visitor(each);
     });
 }
@@ -115,7 +115,7 @@ boost::shared_ptr<ICIMQualifierDecl> TInmemNamespace::GetQualifierDecl(const std
 
 void TInmemNamespace::EnumerateQualifierDecls(TQualifierDeclVisitor visitor, TCIMContext)
 {
-    VisitEach(fQualifierDecls, visitor);
+    VisitEntries(fQualifierDecls, visitor);
 }
 
 void TInmemNamespace::Subscribe(boost::shared_ptr<ICIMIndicationFilter>, TInstanceVisitor, TCIMContext)

@@ -20,7 +20,7 @@ const char* const kLocalSocketName = "cimxml.socket";
 
 namespace {
 
-[[noreturn]] void fail(const char* operation, const std::string& home)
+[[noreturn]] void failAtSocket(const char* operation, const std::string& home)
 {
     throw std::system_error(errno, std::generic_category(),
                             std::string(operation) + " " + home + "/" + kLocalSocketName);
@@ -30,7 +30,7 @@ Descriptor openHome(const std::string& home)
 {
     Descriptor fd(::open(home.c_str(), O_PATH | O_DIRECTORY | O_CLOEXEC));
     if (!fd) {
-        fail("cannot open the folder of", home);
+        failAtSocket("cannot open the folder of", home);
     }
     return fd;
 }
@@ -39,7 +39,7 @@ Descriptor newSocket(const std::string& home)
 {
     Descriptor fd(::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0));
     if (!fd) {
-        fail("cannot create a socket for", home);
+        failAtSocket("cannot create a socket for", home);
     }
     return fd;
 }
@@ -76,10 +76,10 @@ Descriptor connectLocalSocket(const std::string& home, const Deadline& deadline)
     const int timeoutMs = std::max(deadline.pollTimeoutMs(), 1); // the kernel reads 0 as for ever
     const timeval limit{timeoutMs / 1000, (timeoutMs % 1000) * 1000L};
     if (!deadline.isNever() && ::setsockopt(socket.get(), SOL_SOCKET, SO_SNDTIMEO, &limit, sizeof(limit)) < 0) {
-        fail("cannot set the time-out of", home);
+        failAtSocket("cannot set the time-out of", home);
     }
     if (connectRetrying(socket.get(), addressIn(folder.get())) < 0) {
-        fail("cannot connect to", home);
+        failAtSocket("cannot connect to", home);
     }
     return socket;
 }
@@ -89,18 +89,18 @@ Descriptor listenLocalSocket(const std::string& home, int backlog)
     const Descriptor folder(openHome(home));
     Descriptor socket(newSocket(home));
     if (::unlinkat(folder.get(), kLocalSocketName, 0) < 0 && errno != ENOENT) {
-        fail("cannot remove", home);
+        failAtSocket("cannot remove", home);
     }
     // The mode of the socket file is the descriptor's own, so it keeps others out from the first moment.
     if (::fchmod(socket.get(), S_IRUSR | S_IWUSR) < 0) {
-        fail("cannot set the mode of", home);
+        failAtSocket("cannot set the mode of", home);
     }
     const sockaddr_un address = addressIn(folder.get());
     if (::bind(socket.get(), reinterpret_cast<const sockaddr*>(&address), sizeof(address)) < 0) {
-        fail("cannot bind", home);
+        failAtSocket("cannot bind", home);
     }
     if (::listen(socket.get(), backlog) < 0) {
-        fail("cannot listen on", home);
+        failAtSocket("cannot listen on", home);
     }
     return socket;
 }

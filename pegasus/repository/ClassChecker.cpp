@@ -32,11 +32,6 @@ bool isKind(const CIMConstClass& newClass, const CIMConstClass& superClass, cons
     return isTrue(newClass, qualifier) || (!superClass.isUninitialized() && isTrue(superClass, qualifier));
 }
 
-template <typename Handle> const Array<CIMQualifier>& qualifiersOf(const Handle& handle)
-{
-    return ObjectAccess::rep(handle).fQualifiers;
-}
-
 template <typename Element> void checkOverrides(const Element& element, const Element& inherited)
 {
     const Array<CIMQualifier>& above = qualifiersOf(inherited);

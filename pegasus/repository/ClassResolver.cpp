@@ -9,11 +9,6 @@ namespace {
 // Lists are filled by append(), which leaves out addProperty()'s search for an equal name: the names of one class
 // differ, and an inherited member is taken only if the class has none of its name.
 
-template <typename Handle> const Array<CIMQualifier>& qualifiersOf(const Handle& handle)
-{
-    return ObjectAccess::rep(handle).fQualifiers;
-}
-
 // In reverse order, as OpenPegasus answers.
 void inheritQualifiers(Array<CIMQualifier>& to, const Array<CIMQualifier>& from, const Array<CIMQualifier>& local)
 {

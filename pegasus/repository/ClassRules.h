@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "pegasus/common/ObjectReps.h"
 #include "pegasus/repository/QualifierRules.h"
 #include "pegasus/repository/Repository.h"
 
@@ -42,5 +43,11 @@ CIMClass resolveClass(CIMClass local, CIMClass superClass);
 
 // Returns: the part of a resolved class that the options ask for. It shares unchanged parts with `resolved`.
 CIMClass filterClass(CIMClass resolved, const ClassOptions& options);
+
+// Returns: the list that a class, property, method or parameter holds.
+template <typename Handle> const Array<CIMQualifier>& qualifiersOf(const Handle& handle)
+{
+    return ObjectAccess::rep(handle).fQualifiers;
+}
 
 } // namespace Pegasus::repository

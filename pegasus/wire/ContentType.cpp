@@ -8,17 +8,17 @@
 namespace Pegasus::wire {
 namespace {
 
-constexpr std::string_view kBlanks = " \t";
+constexpr std::string_view kHttpBlanks = " \t";
 
-bool isBlank(std::string_view text) noexcept
+bool isHttpBlank(std::string_view text) noexcept
 {
-    return text.find_first_not_of(kBlanks) == std::string_view::npos;
+    return text.find_first_not_of(kHttpBlanks) == std::string_view::npos;
 }
 
 // Removes the next word from `text`: a token, a quoted text (its quotes dropped), or one of the separators.
 std::string_view takeWord(std::string_view& text) noexcept
 {
-    text.remove_prefix(std::min(text.find_first_not_of(kBlanks), text.size()));
+    text.remove_prefix(std::min(text.find_first_not_of(kHttpBlanks), text.size()));
     if (text.empty()) {
         return text;
     }
@@ -42,11 +42,12 @@ bool isXmlInUtf8(std::string_view contentType) noexcept
     if (!base::equalNoCase(type, "application/xml") && !base::equalNoCase(type, "text/xml")) {
         return false;
     }
-    if (isBlank(contentType)) {
+    if (isHttpBlank(contentType)) {
         return true;
     }
     return takeWord(contentType) == ";" && base::equalNoCase(takeWord(contentType), "charset") &&
-           takeWord(contentType) == "=" && base::equalNoCase(takeWord(contentType), "utf-8") && isBlank(contentType);
+           takeWord(contentType) == "=" && base::equalNoCase(takeWord(contentType), "utf-8") &&
+           isHttpBlank(contentType);
 }
 
 } // namespace Pegasus::wire

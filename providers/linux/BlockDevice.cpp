@@ -9,14 +9,14 @@ namespace {
 
 constexpr std::uint64_t kSectorBytes = 512; // of /sys/block/*/size, whatever the device's own blocks are
 
-struct Counter
+struct DiskCounter
 {
     const char* property;
     std::size_t column; // of /sys/block/*/stat
 };
 
-constexpr std::array kCounters{Counter{"ReadsCompleted", 0}, Counter{"SectorsRead", 2}, Counter{"WritesCompleted", 4},
-                               Counter{"SectorsWritten", 6}};
+constexpr std::array kDiskCounters{DiskCounter{"ReadsCompleted", 0}, DiskCounter{"SectorsRead", 2},
+                                   DiskCounter{"WritesCompleted", 4}, DiskCounter{"SectorsWritten", 6}};
 
 // The one in brackets of "none [mq-deadline] kyber".
 std::optional<std::string> activeScheduler(const std::optional<std::string>& text)
@@ -47,7 +47,7 @@ void describeActivity(const SystemTree& tree, const std::string& directory, Reco
 {
     const auto stat = tree.text(directory + "stat");
     const auto columns = stat ? words(*stat) : std::vector<std::string>();
-    for (const Counter& counter : kCounters) {
+    for (const DiskCounter& counter : kDiskCounters) {
         if (counter.column < columns.size()) {
             record.set(counter.property, toNatural(columns[counter.column]));
         }

@@ -11,22 +11,22 @@
 namespace lnx {
 namespace {
 
-struct Counter
+struct PortCounter
 {
     const char* property;
     const char* file;
 };
 
-constexpr std::array kCounters{
-    Counter{"BytesReceived", "rx_bytes"},
-    Counter{"BytesTransmitted", "tx_bytes"},
-    Counter{"PacketsReceived", "rx_packets"},
-    Counter{"PacketsTransmitted", "tx_packets"},
-    Counter{"ReceiveErrors", "rx_errors"},
-    Counter{"TransmitErrors", "tx_errors"},
-    Counter{"ReceivePacketsDropped", "rx_dropped"},
-    Counter{"TransmitPacketsDropped", "tx_dropped"},
-    Counter{"Collisions", "collisions"},
+constexpr std::array kPortCounters{
+    PortCounter{"BytesReceived", "rx_bytes"},
+    PortCounter{"BytesTransmitted", "tx_bytes"},
+    PortCounter{"PacketsReceived", "rx_packets"},
+    PortCounter{"PacketsTransmitted", "tx_packets"},
+    PortCounter{"ReceiveErrors", "rx_errors"},
+    PortCounter{"TransmitErrors", "tx_errors"},
+    PortCounter{"ReceivePacketsDropped", "rx_dropped"},
+    PortCounter{"TransmitPacketsDropped", "tx_dropped"},
+    PortCounter{"Collisions", "collisions"},
 };
 
 // The kernel's words for a link's state, at the numbers of RFC 2863 that the kernel gives them.
@@ -129,7 +129,7 @@ Record networkPort(const SystemTree& tree, const std::string& name)
     record.set("ActiveMaximumTransmissionUnit", tree.natural(directory + "mtu"));
     describeAddress(tree, name, record);
     describeLink(tree, directory, record);
-    for (const Counter& counter : kCounters) {
+    for (const PortCounter& counter : kPortCounters) {
         record.set(counter.property, tree.natural(directory + "statistics/" + counter.file));
     }
     return record;

@@ -25,4 +25,10 @@ inline const std::string kCdmTag = "CDM";
 inline const std::string kNspKey = "nsp";
 inline const std::string kTimeoutKey = "timeout";
 
+// The radix in which numbers are written and read.
+inline constexpr unsigned char kDecimal = 10;
+
+// The qualifier of a property or method that takes the place of an inherited one.
+inline constexpr char kOverrideQualifier[] = "OVERRIDE";
+
 } // namespace NKOLVRX20

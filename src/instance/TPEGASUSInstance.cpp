@@ -2,6 +2,7 @@
 #include "src/instance/TPEGASUSInstance.h"
 
 #include "src/common/ClientConnection.h"
+#include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/instance/MethodValues.h"
 
@@ -17,7 +18,6 @@ namespace NKOLVRX20 {
 namespace {
 
 constexpr Pegasus::Uint32 kMethodTimeoutMs = 300000;
-constexpr unsigned char kDecimal = 10; // the radix of ToString
 
 boost::shared_ptr<ICIMParameterDecl> ParameterDeclOf(const ICIMClass& instanceClass, const std::string& method,
                                                      const std::string& parameter)

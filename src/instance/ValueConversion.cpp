@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "src/instance/ValueConversion.h"
 
+#include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 
 #include <host/ICIMClass.h>
@@ -13,8 +14,6 @@ namespace NKOLVRX20 {
 namespace {
 
 using TType = TCIMValue::TCIMType;
-
-constexpr unsigned char kDecimal = 10; // the radix of ToString
 
 // One element of a host value from one of the client library's, one function for each type whose host type differs.
 // The library's 64-bit integers are long long, which TCIMValue lacks a constructor for; long has the same 64 bits.

@@ -17,7 +17,6 @@ namespace {
 
 // Far above any real schema; it ends the chain of a server that names classes as each other's superclass.
 constexpr unsigned int kMaxSuperClassDepth = 128;
-constexpr unsigned char kDecimal = 10; // the radix of ToString
 
 std::string TextFromContext(const TCIMContext& context, const std::string& key, const std::string& fallback)
 {

@@ -23,7 +23,6 @@ constexpr char kDefaultConsumer[] = "quvex";
 
 constexpr int kStartAttempts = 6;
 constexpr unsigned int kRestartPauseSeconds = 1;
-constexpr unsigned char kDecimal = 10; // the radix of ToString
 
 // The LSI provider reads its configuration from the file-system root.
 constexpr char kLsiConfiguration[] = "/lsi_mr.conf";

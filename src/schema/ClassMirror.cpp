@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "src/schema/ClassMirror.h"
 
+#include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/instance/ValueConversion.h"
 #include "src/schema/DeclarationAttributes.h"
@@ -21,8 +22,6 @@ constexpr char kClassFailure[] = "- error when Adding Qualifiers for class: ";
 constexpr char kPropertyFailure[] = " - error when Adding Qualifiers for property: ";
 constexpr char kMethodFailure[] = " - error when Adding Qualifiers for method: ";
 constexpr char kDetail[] = "\tdetail: ";
-
-constexpr char kOverrideQualifier[] = "OVERRIDE";
 
 template <typename TElement> std::string NameOf(const TElement& element)
 {

@@ -17,7 +17,6 @@ namespace NKOLVRX20 {
 
 namespace {
 
-constexpr unsigned char kDecimal = 10; // the radix of ToString
 constexpr char kInstanceIdName[] = "InstanceID";
 constexpr char kSlotClass[] = "OMC_ProcessorSlot";
 constexpr char kSlotNumber[] = "Number";

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "src/schema/InstanceRetrieval.h"
 
+#include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/instance/TPEGASUSInstance.h"
 // Upwards, on purpose: a class holds its provider by the provider's own type, and asks on the provider's client. This
@@ -16,7 +17,6 @@ namespace NKOLVRX20 {
 
 namespace {
 
-constexpr unsigned char kDecimal = 10; // the radix of ToString
 constexpr char kRecordClass[] = "CIM_RecordAppliesToElement";
 // Only this operation has a log line of its own for a timeout.
 constexpr char kEnumeration[] = "EnumerateInstances";

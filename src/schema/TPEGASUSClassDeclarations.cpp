@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 // The properties and methods that a class declares, and the rules for adding one.
+#include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
 #include "src/schema/TPEGASUSClass.h"
 #include "src/schema/TPEGASUSMethodDecl.h"
@@ -16,7 +17,6 @@ namespace {
 constexpr char kCollectionTimeProperty[] = "DateTimeOfCollection";
 // Vendors declare this one twice; the later declaration holds.
 constexpr char kRepeatableName[] = "PortType";
-constexpr char kOverrideQualifier[] = "OVERRIDE";
 constexpr char kKeyQualifier[] = "KEY";
 
 } // namespace

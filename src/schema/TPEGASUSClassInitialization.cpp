@@ -13,7 +13,6 @@ namespace NKOLVRX20 {
 
 namespace {
 
-constexpr int kDecimal = 10; // the radix of strtol
 constexpr unsigned long kMsPerSecond = 1000;
 constexpr unsigned long kLongestSeconds = std::numeric_limits<unsigned int>::max() / kMsPerSecond;
 

@@ -15,8 +15,6 @@ namespace NKOLVRX20 {
 
 namespace {
 
-constexpr unsigned char kDecimal = 10; // the radix of ToString
-
 // Vendors' diagnostic services and software inventories take minutes.
 constexpr char kDiagnosticServicePart[] = "AvailableDiagnosticService";
 constexpr unsigned int kDiagnosticServiceTimeoutMs = 199000;

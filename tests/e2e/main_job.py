@@ -446,7 +446,7 @@ class VendorExample(TreeTest):
     def test_worked_example(self):
         with open(os.path.join(SOURCE, "docs", "vendors.md"), encoding="utf-8") as file:
             commands = re.search(r"```sh\n(.*?)```", file.read(), re.DOTALL).group(1)
-        commands = commands.replace("cmake --install build/release --prefix build/example", ":")
+        commands = commands.replace("cmake --install build/product --prefix build/example", ":")
         commands = commands.replace("build/example", self.tree.root).replace("lamps-example", self.tree.consumer)
         shown = subprocess.run(commands, shell=True, cwd=SOURCE, capture_output=True, text=True, timeout=120, check=False)
         self.assertEqual((shown.returncode, shown.stderr), (0, ""))

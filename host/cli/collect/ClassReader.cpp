@@ -2,6 +2,7 @@
 #include "host/cli/collect/ClassReader.h"
 
 #include "display/PropertyText.h"
+#include "host/cli/model/NoContext.h"
 #include "host/inmem/TInmemProperty.h"
 
 #include <host/ICIMMethodDecl.h>
@@ -20,8 +21,6 @@ namespace {
 
 constexpr int kMaxDepth = 128; // of a chain of superclasses
 constexpr unsigned char kDecimal = 10;
-
-const TCIMContext kNoContext;
 
 std::string TypeText(TCIMValue::TCIMType type)
 {

@@ -3,13 +3,13 @@
 
 #include "host/cli/collect/ClassReader.h"
 #include "host/cli/model/ErrorReport.h"
+#include "host/cli/model/Names.h"
+#include "host/cli/model/NoContext.h"
 
 #include <host/IProvider.h>
 
 #include <chrono>
 #include <mutex>
-
-#include <strings.h>
 
 namespace vrxhost {
 
@@ -17,9 +17,7 @@ using namespace NKOLVRX20;
 
 namespace {
 
-// What every question carries, and the one that lists this kind of plug-in's providers.
-const TCIMContext kNoContext;
-constexpr signed char kPluginType = 7;
+constexpr signed char kPluginType = 7; // which providers are listed
 
 // "BEGIN NAME END: CAUSE"
 TLoss LossOfClass(ELossKind kind, const std::string& begin, const std::string& name, const std::string& end)
@@ -97,7 +95,7 @@ TCollector::TClassPtr TCollector::FindClass(const std::string& name)
         const std::string providerName = provider->GetName(kNoContext);
         for (const TClassPtr& each : ListClasses(*provider, providerName)) {
             names.push_back(each->GetName(kNoContext));
-            if (::strcasecmp(names.back().c_str(), name.c_str()) == 0) {
+            if (IsSame(names.back(), name)) {
                 fProviderName = providerName;
                 return each;
             }

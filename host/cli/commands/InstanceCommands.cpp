@@ -4,6 +4,7 @@
 #include "host/cli/collect/TCollector.h"
 #include "host/cli/commands/ICommand.h"
 #include "host/cli/model/ErrorReport.h"
+#include "host/cli/model/Names.h"
 
 #include <host/ICIMClass.h>
 
@@ -11,15 +12,8 @@
 
 #include <algorithm>
 
-#include <strings.h>
-
 namespace vrxhost {
 namespace {
-
-bool IsSame(const std::string& left, const std::string& right)
-{
-    return ::strcasecmp(left.c_str(), right.c_str()) == 0;
-}
 
 void RequireProperty(const TClassRecord& each, const std::string& name)
 {

@@ -4,6 +4,8 @@
 #include "host/cli/collect/TCollector.h"
 #include "host/cli/commands/ICommand.h"
 #include "host/cli/model/ErrorReport.h"
+#include "host/cli/model/Names.h"
+#include "host/cli/model/NoContext.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMMethodDecl.h>
@@ -14,15 +16,11 @@
 
 #include <algorithm>
 
-#include <strings.h>
-
 namespace vrxhost {
 
 using namespace NKOLVRX20;
 
 namespace {
-
-const TCIMContext kNoContext;
 
 using TMethodPtr = boost::shared_ptr<ICIMMethodDecl>;
 using TParameterPtr = boost::shared_ptr<ICIMParameterDecl>;
@@ -35,7 +33,7 @@ Pointer Find(const std::vector<Pointer>& all, const std::string& name, const std
     std::vector<std::string> names;
     for (const Pointer& each : all) {
         names.push_back(each->GetName(kNoContext));
-        if (::strcasecmp(names.back().c_str(), name.c_str()) == 0) {
+        if (IsSame(names.back(), name)) {
             return each;
         }
     }
@@ -131,7 +129,7 @@ class TInvokeCommand : public ICommand
         const auto parameters = ParametersOf(method);
         for (const auto& output : outputs) {
             const auto declared = std::find_if(parameters.begin(), parameters.end(), [&](const TParameterPtr& each) {
-                return ::strcasecmp(each->GetName(kNoContext).c_str(), output.first.c_str()) == 0;
+                return IsSame(each->GetName(kNoContext), output.first);
             });
             invocation.fOutputs.push_back(
                 ReadValue(output.first, output.second, declared == parameters.end() ? nullptr : declared->get()));

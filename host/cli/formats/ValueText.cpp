@@ -33,12 +33,6 @@ std::string NumberText(const TCIMValue& number, const std::string& unit)
     return NKOLVRX20::GroupedDigits(number.ToString(kDecimal)) + (unit.empty() ? "" : " " + unit);
 }
 
-bool IsNumeric(const TCIMValue& value)
-{
-    using TType = TCIMValue::TCIMType;
-    return !value.IsNull() && value.GetType() >= TType::kUint8 && value.GetType() <= TType::kReal64;
-}
-
 // Returns: the text that a plain number has, to tell it from one that Values replaces.
 std::string PlainNumber(const TCIMValue& number, const std::string& unit)
 {
@@ -93,13 +87,14 @@ std::string ValueText(const TPropertyRecord& property, const TPropertyDeclRecord
     const std::string unit = UnitOf(declaration);
     const TCIMValue& value = property.fValue;
     if (!value.IsArray()) {
-        return Printable(IsNumeric(value) && property.fText == PlainNumber(value, unit) ? NumberText(value, unit)
-                                                                                        : property.fText);
+        return Printable(NKOLVRX20::IsNumber(value) && property.fText == PlainNumber(value, unit)
+                             ? NumberText(value, unit)
+                             : property.fText);
     }
     std::string plain;
     std::string joined;
     for (const TCIMValue& element : static_cast<const std::vector<TCIMValue>&>(value)) {
-        if (!IsNumeric(element)) {
+        if (!NKOLVRX20::IsNumber(element)) {
             return Printable(property.fText);
         }
         plain += (plain.empty() ? "" : ", ") + PlainNumber(element, unit);
@@ -112,7 +107,7 @@ std::string ShownNumber(const TPropertyRecord& property, const TPropertyDeclReco
 {
     const TCIMValue& value = property.fValue;
     const bool isShown =
-        !value.IsArray() && IsNumeric(value) && property.fText == PlainNumber(value, UnitOf(declaration));
+        !value.IsArray() && NKOLVRX20::IsNumber(value) && property.fText == PlainNumber(value, UnitOf(declaration));
     return isShown ? value.ToString(kDecimal) : "";
 }
 

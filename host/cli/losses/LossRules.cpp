@@ -70,7 +70,6 @@ constexpr TRule kRules[] = {
 
 // Lines of every healthy start: the class list's reader knows neither its root element nor the closing tags, and the
 // adapter tool exists on machines with the adapter alone.
-constexpr char kDescription[] = "Performance Data RDD Parser line ";
 const char* const kHealthyMessages[] = {":Unrecognized identifier:vrx", ":Unrecognized identifier"};
 
 // What the server's log and the MOF compiler say of a text or a call that another server refuses.
@@ -242,7 +241,7 @@ bool IsHarmless(const std::string& errorLine)
     if (EndsWith(errorLine, TVRXStatusCode(TVRXStatusCode::kProcessFailed).TranslateStatusCode())) {
         return true;
     }
-    return BeginsWith(errorLine, kDescription) &&
+    return BeginsWith(errorLine, kClassListLine) &&
            std::any_of(std::begin(kHealthyMessages), std::end(kHealthyMessages),
                        [&errorLine](const char* message) { return EndsWith(errorLine, message); });
 }

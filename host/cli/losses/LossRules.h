@@ -16,6 +16,9 @@ namespace vrxhost {
 // no losses of a known kind; program output is cut to its lines first.
 constexpr std::size_t kMaxMatchedBytes = 4096;
 
+// How a line about a fault in a class list begins.
+inline constexpr char kClassListLine[] = "Performance Data RDD Parser line ";
+
 // Returns: the loss that a log line of the plug-in reports, whatever its severity; empty for other lines.
 std::optional<TLoss> LossOfLine(const std::string& line);
 

@@ -3,6 +3,7 @@
 
 #include "host/cli/losses/TVendorFiles.h"
 #include "host/cli/model/Loss.h"
+#include "host/cli/model/Names.h"
 
 #include <algorithm>
 #include <cctype>
@@ -15,12 +16,6 @@ namespace vrxhost {
 namespace {
 
 using TTokens = std::vector<std::string>; // words, texts with their first quotation mark, and single characters
-
-std::string SmallLetters(std::string text)
-{
-    std::transform(text.begin(), text.end(), text.begin(), [](unsigned char c) { return std::tolower(c); });
-    return text;
-}
 
 bool IsWordPart(char c)
 {

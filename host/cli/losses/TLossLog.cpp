@@ -16,7 +16,6 @@ constexpr char kLoading[] = "Loading... ";
 constexpr char kEnumerating[] = "TPEGASUSClass::EnumerateInstances ";
 constexpr char kLostProperty[] = "4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: ";
 // Every message about a class list begins thus.
-constexpr char kDescription[] = "Performance Data RDD Parser line ";
 constexpr char kInvalidName[] = "PEGASUS: CIM name '";
 constexpr char kUnknownName[] = ":Unrecognized ";
 constexpr std::size_t kMaxServerLines = 3; // the last ones, of each loss
@@ -81,7 +80,7 @@ void TLossLog::Learn(EVRXLogSeverity severity, const std::string& text)
         return; // the line of the class list has said so
     } else if (severity != kError || IsHarmless(text)) {
         return;
-    } else if (!BeginsWith(text, kDescription)) {
+    } else if (!BeginsWith(text, kClassListLine)) {
         Enter(WithoutLineFeed(text));
     } else {
         LearnFromDescription(text);
@@ -102,7 +101,7 @@ void TLossLog::LearnFromRule(const TLoss& loss)
 void TLossLog::LearnFromDescription(const std::string& text)
 {
     TLoss loss =
-        LossOf(ELossKind::kClassList, "class list " + fLoadedFile + ", line " + text.substr(sizeof kDescription - 1));
+        LossOf(ELossKind::kClassList, "class list " + fLoadedFile + ", line " + text.substr(sizeof kClassListLine - 1));
     loss.fIsNote = text.find(kUnknownName) != std::string::npos;
     Enter(loss);
 }

@@ -2,6 +2,8 @@
 #include "host/cli/losses/TRegistrationCheck.h"
 
 #include "host/cli/model/ErrorReport.h"
+#include "host/cli/model/Names.h"
+#include "host/cli/model/NoContext.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>
@@ -9,8 +11,6 @@
 
 #include <algorithm>
 #include <cctype>
-
-#include <strings.h>
 
 namespace vrxhost {
 
@@ -21,19 +21,6 @@ namespace {
 constexpr char kInterOpNamespace[] = "root/PG_InterOp";
 constexpr char kCapabilitiesClass[] = "PG_ProviderCapabilities";
 constexpr int kMaxDepth = 128; // of a chain of superclasses
-
-const TCIMContext kNoContext;
-
-bool IsSame(const std::string& left, const std::string& right)
-{
-    return ::strcasecmp(left.c_str(), right.c_str()) == 0;
-}
-
-std::string SmallLetters(std::string text)
-{
-    std::transform(text.begin(), text.end(), text.begin(), [](unsigned char c) { return std::tolower(c); });
-    return text;
-}
 
 TCIMContext In(const std::string& serverNamespace)
 {

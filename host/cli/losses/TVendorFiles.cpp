@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "host/cli/losses/TVendorFiles.h"
 
+#include "host/cli/model/Names.h"
+
 #include <host/TXmlParser.h>
 
 #include <algorithm>
@@ -9,8 +11,6 @@
 #include <filesystem>
 #include <fstream>
 
-#include <strings.h>
-
 namespace vrxhost {
 namespace {
 
@@ -18,11 +18,6 @@ namespace fs = std::filesystem;
 
 constexpr char kDefaultNamespace[] = "root/cimv2";
 constexpr char kHiddenTag[] = "%^CDM^%";
-
-bool IsSame(const std::string& left, const std::string& right)
-{
-    return ::strcasecmp(left.c_str(), right.c_str()) == 0;
-}
 
 class TClassListParser : public NKOLVRX20::TXmlParser
 {

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "host/cli/model/Comparison.h"
 
+#include "host/cli/model/Names.h"
+
 #include <algorithm>
 #include <map>
 #include <set>
@@ -49,7 +51,7 @@ TInstances InstancesOf(const std::vector<const TClassRecord*>& classes)
 bool Names(const TLoss& loss, const std::string& className)
 {
     return std::any_of(loss.fClasses.begin(), loss.fClasses.end(),
-                       [&](const std::string& name) { return ::strcasecmp(name.c_str(), className.c_str()) == 0; });
+                       [&](const std::string& name) { return IsSame(name, className); });
 }
 
 // Returns: why instances of the class may be missing on that side, as a sentence; empty when they cannot be.
@@ -71,9 +73,8 @@ std::string DoubtAbout(const std::string& className, const TSide& side)
 
 bool IsPropertyLost(const std::string& className, const std::string& property, const TSide& side)
 {
-    return std::any_of(side.fLosses.begin(), side.fLosses.end(), [&](const TLoss& loss) {
-        return Names(loss, className) && ::strcasecmp(loss.fProperty.c_str(), property.c_str()) == 0;
-    });
+    return std::any_of(side.fLosses.begin(), side.fLosses.end(),
+                       [&](const TLoss& loss) { return Names(loss, className) && IsSame(loss.fProperty, property); });
 }
 
 const TPropertyDeclRecord* FindDeclaration(const std::vector<const TClassRecord*>& classes, const std::string& name)

@@ -1,18 +1,13 @@
 // SPDX-License-Identifier: MIT
 #include "host/cli/model/Document.h"
 
+#include "host/cli/model/Names.h"
+
 #include <algorithm>
 #include <fstream>
 
-#include <strings.h>
-
 namespace vrxhost {
 namespace {
-
-bool IsSame(const std::string& left, const std::string& right)
-{
-    return ::strcasecmp(left.c_str(), right.c_str()) == 0;
-}
 
 template <typename Record> const Record* FindByName(const std::vector<Record>& records, const std::string& name)
 {

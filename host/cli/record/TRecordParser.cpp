@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "host/cli/record/TRecordParser.h"
 
+#include "host/cli/model/NoContext.h"
+
 #include <boost/make_shared.hpp>
 
 #include <stdexcept>
@@ -10,8 +12,6 @@ namespace vrxhost {
 using namespace NKOLVRX20;
 
 namespace {
-
-const TCIMContext kNoContext;
 
 // Its path is the one that it was recorded with, whatever the class declares as keys.
 class TRecordedInstance : public TInmemInstance

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "host/cli/record/TRecordWriter.h"
 
+#include "host/cli/model/NoContext.h"
 #include "host/inmem/TInmemProperty.h"
 
 #include <host/ICIMMethodDecl.h>
@@ -23,7 +24,6 @@ using namespace NKOLVRX20;
 
 namespace {
 
-const TCIMContext kNoContext;
 constexpr std::size_t kSumIntervalBytes = 64u << 10;
 constexpr std::size_t kReservedBytes = 32u << 20; // of a record's limit, for losses and the log
 

@@ -12,7 +12,7 @@ namespace Pegasus::server {
 
 namespace {
 
-constexpr std::size_t kReadBytes = 128u << 10;
+constexpr std::size_t kFrameReadBytes = 128u << 10;
 constexpr unsigned kOk = 200;
 
 std::string encoded(const std::string& text)
@@ -77,7 +77,7 @@ std::string_view AgentChannel::readMore(std::chrono::milliseconds timeout)
 
 CimStatus AgentChannel::receive(ElementSink& sink, std::chrono::milliseconds timeout)
 {
-    fBuffer.resize(kReadBytes);
+    fBuffer.resize(kFrameReadBytes);
     // Instances may be of any number: only what surrounds them is bounded.
     const wire::HttpAnswerLimits limits = {fMaxHeadBytes, fMaxHeadBytes, std::numeric_limits<std::uint64_t>::max()};
     // The sink gets the bytes of each chunk as they lie in the buffer: nothing is copied on the way to the client.

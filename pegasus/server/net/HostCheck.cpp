@@ -54,7 +54,7 @@ bool namesLoopback(std::string_view authority)
     return !host.empty() && (isLoopbackAddress(host) || isLoopbackName(host));
 }
 
-[[noreturn]] void refuse(const char* header, const std::string& value)
+[[noreturn]] void refuseHeader(const char* header, const std::string& value)
 {
     throw HttpError(403, HttpError::After::kClose, "",
                     std::string("The ") + header + " header must be localhost or a loopback address: " + value);
@@ -66,14 +66,14 @@ void requireLocalHost(const HttpRequest& http)
 {
     const std::string* host = http.header("Host");
     if (host != nullptr && !host->empty() && !namesLoopback(*host)) {
-        refuse("Host", *host);
+        refuseHeader("Host", *host);
     }
     const std::string* origin = http.header("Origin"); // "scheme://host:port" or "null"
     const std::size_t authority = origin != nullptr ? origin->find("://") : std::string::npos;
     if (origin != nullptr &&
         (authority == std::string::npos || !namesLoopback(std::string_view(*origin).substr(authority + 3))))
     {
-        refuse("Origin", *origin);
+        refuseHeader("Origin", *origin);
     }
 }
 

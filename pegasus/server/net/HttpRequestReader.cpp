@@ -23,7 +23,7 @@ namespace {
 
 constexpr std::size_t kReadBytes = 64u << 10;
 
-[[noreturn]] void failFor(const boost::system::error_code& error)
+[[noreturn]] void failForParser(const boost::system::error_code& error)
 {
     using After = HttpError::After;
     if (error == http::error::body_limit || error == http::error::buffer_overflow) {
@@ -81,7 +81,7 @@ std::size_t HttpRequestParser::parse(std::string_view bytes)
     boost::system::error_code error;
     const std::size_t taken = fImpl->parser.put(boost::asio::const_buffer(bytes.data(), bytes.size()), error);
     if (error && error != http::error::need_more) {
-        failFor(error);
+        failForParser(error);
     }
     return taken;
 }
@@ -92,7 +92,7 @@ std::size_t HttpRequestParser::putHead(std::string_view bytes)
     const std::size_t taken = parse(bytes);
     fImpl->headBytes += taken;
     if (fImpl->headBytes + (isHeaderDone() ? 0 : bytes.size() - taken) > fImpl->maxHeadBytes) {
-        failFor(http::error::header_limit);
+        failForParser(http::error::header_limit);
     }
     fImpl->parser.eager(isHeaderDone());
     return taken;
