@@ -323,7 +323,7 @@ class BrokenTree(TreeTest):
         replace_in(self.tree.vendor("linux.registration.mof"), "instance of PG_Provider\n", "instance off PG_Provider\n")
         self.expect(PARTIAL, r"linux\.registration\.mof.*:\d+:\d+: error: ")
 
-    def expect_golden(self, sentence, note=False, **about):
+    def expect_golden(self, kind, sentence, note=False, **about):
         """One loss or note is all that standard error and the document say; VENDOR is the folder, FILE the class list."""
         for word, text in (("VENDOR", self.tree.vendor()), ("FILE", self.tree.vendor("linux.classes.xml"))):
             sentence = sentence.replace(word, text)
@@ -331,37 +331,37 @@ class BrokenTree(TreeTest):
         self.assertEqual((status, err), (COMPLETE, f"vrxhost: note: {sentence}\n") if note
                          else (PARTIAL, f"vrxhost: {sentence}\n"))
         loss, = document["notes" if note else "losses"]
-        self.assertEqual({"text": sentence, "vendor": "linux", **about}, {key: loss[key] for key in loss if key != "file"})
+        self.assertEqual({"kind": kind, "text": sentence, "vendor": "linux", **about}, {key: loss[key] for key in loss if key != "file"})
         self.assert_nothing_left()
         return document
 
     def test_class_without_capabilities(self):
         replace_in(self.tree.vendor("linux.registration.mof"), 'ClassName = "LNX_Processor"', 'ClassName = "LNX_Other"')
-        document = self.expect_golden("vendor linux, FILE: class LNX_Processor: no provider, because no "
+        document = self.expect_golden("no-capabilities", "vendor linux, FILE: class LNX_Processor: no provider, because no "
                                       "PG_ProviderCapabilities instance of a registration file names it",
                                       classes=["LNX_Processor"])
         self.assertNotEqual(instances(document, "LNX_Memory"), [])
 
     def test_no_registration_file(self):
         os.unlink(self.tree.vendor("linux.registration.mof"))
-        self.expect_golden(f"vendor linux, FILE: class {', '.join(CLASSES)}: no provider, because the folder has no "
+        self.expect_golden("no-registration", f"vendor linux, FILE: class {', '.join(CLASSES)}: no provider, because the folder has no "
                            "registration file (*.registration.mof)", classes=CLASSES)
 
     def test_no_class_list(self):
         os.unlink(self.tree.vendor("linux.classes.xml"))
-        document = self.expect_golden("vendor linux, VENDOR: the folder has no class list (*.classes.xml), so that "
+        document = self.expect_golden("no-class-list", "vendor linux, VENDOR: the folder has no class list (*.classes.xml), so that "
                                       "nothing of it is shown")
         self.assertEqual(document["providers"], [])
 
     def test_libraries_alone_are_a_note(self):
         for name in ("linux.classes.xml", "linux.properties.mof", "linux.registration.mof"):
             os.unlink(self.tree.vendor(name))
-        self.expect_golden("vendor linux, VENDOR: the folder has no class list (*.classes.xml), so that nothing of it "
+        self.expect_golden("no-class-list", "vendor linux, VENDOR: the folder has no class list (*.classes.xml), so that nothing of it "
                            "is shown", note=True)
 
     def test_namespace_without_registration(self):
         replace_in(self.tree.vendor("linux.classes.xml"), '<nsp name="root/cimv2"/>', '<nsp name="root/other"/>')
-        self.expect_golden(f"vendor linux, FILE: class {', '.join(CLASSES)}: asked for in namespace root/other (<nsp>), "
+        self.expect_golden("other-namespace", f"vendor linux, FILE: class {', '.join(CLASSES)}: asked for in namespace root/other (<nsp>), "
                            "but a provider is registered for it in root/cimv2", classes=CLASSES)
 
     def test_property_of_another_type(self):
@@ -376,7 +376,7 @@ class BrokenTree(TreeTest):
 
     def test_property_that_is_not_declared(self):
         replace_in(self.tree.vendor("linux.properties.mof"), "uint64 FreeBytes;", "uint64 IdleBytes;")
-        self.expect_golden("vendor linux, FILE: property FreeBytes of class LNX_Memory is not declared, so that the "
+        self.expect_golden("undeclared-property", "vendor linux, FILE: property FreeBytes of class LNX_Memory is not declared, so that the "
                            "value which provider module linuxinventory sets is lost", classes=["LNX_Memory"],
                            property="FreeBytes")
 
@@ -411,7 +411,9 @@ class BrokenTree(TreeTest):
         self.assertRegex(err, "missing as a consequence: LNX_Memory, LNX_NetworkPort")
         document = json.loads(out)
         self.assertEqual(len(document["losses"]), 1, document["losses"])
-        _, cause, *classes = document["checks"]
+        vendor, cause, *classes = document["checks"]
+        self.assertEqual((vendor["subject"], vendor["ok"]), ("Vendor linuxinventory", False))
+        self.assertRegex(vendor["text"], r"^missing LNX_Memory, LNX_NetworkPort.*; \d classes, \d+ instances$")
         self.assertEqual((cause["subject"], cause["ok"]), ("vendor linux", False))
         self.assertEqual([check["subject"] for check in classes], [f"class {name}" for name in document["losses"][0]["classes"]])
 

@@ -4,6 +4,7 @@
 #include "host/cli/commands/ICommand.h"
 
 #include <algorithm>
+#include <iterator>
 #include <utility>
 
 namespace vrxhost {
@@ -135,25 +136,43 @@ void AddChecks(const TLoss& loss, TDocument& document)
     }
 }
 
-// A line for each provider: what it delivers, and how long its slowest class took.
+bool Has(const std::vector<std::string>& names, const std::string& name)
+{
+    return std::find(names.begin(), names.end(), name) != names.end();
+}
+
+bool IsAbout(const TLoss& loss, const TProviderRecord& provider)
+{
+    return (!loss.fProvider.empty() && loss.fProvider == provider.fName) ||
+           std::any_of(provider.fClasses.begin(), provider.fClasses.end(),
+                       [&loss](const TClassRecord& each) { return Has(loss.fClasses, each.fName); });
+}
+
+// A line for each provider: what it should deliver besides, what it delivers, and how long its slowest class took.
 TCheck CheckOf(const TProviderRecord& provider, const TDocument& document)
 {
     TCheck check;
     const TFact fact = DescribeVendor(provider);
     check.fSubject = fact.fLabel;
-    check.fText = fact.fText;
+    check.fIsOk = true;
     long total = 0;
     const TClassRecord* slowest = nullptr;
-    check.fIsOk = true;
+    std::vector<std::string> names;
     for (const TClassRecord& each : provider.fClasses) {
+        names.push_back(each.fName);
         total += each.fMilliseconds;
         slowest = !slowest || each.fMilliseconds > slowest->fMilliseconds ? &each : slowest;
-        for (const TLoss& loss : document.fLosses) {
-            const bool isAbout =
-                std::find(loss.fClasses.begin(), loss.fClasses.end(), each.fName) != loss.fClasses.end();
-            check.fIsOk &= loss.fIsNote || !isAbout;
-        }
     }
+    std::vector<std::string> missing;
+    for (const TLoss& loss : document.fLosses) {
+        if (loss.fIsNote || !IsAbout(loss, provider)) {
+            continue;
+        }
+        check.fIsOk = false;
+        std::copy_if(loss.fClasses.begin(), loss.fClasses.end(), std::back_inserter(missing),
+                     [&](const std::string& name) { return !Has(names, name) && !Has(missing, name); });
+    }
+    check.fText = (missing.empty() ? "" : "missing " + JoinNames(missing) + "; ") + fact.fText;
     if (slowest) {
         check.fTook =
             std::to_string(total) + " ms (" + slowest->fName + " " + std::to_string(slowest->fMilliseconds) + " ms)";

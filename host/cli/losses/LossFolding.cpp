@@ -22,11 +22,16 @@ void AddNames(std::vector<std::string>& names, const std::vector<std::string>& m
 
 void NameVendor(TLoss& loss, const TVendorFiles& vendors)
 {
-    const TClassList* list =
-        loss.fVendor.empty() && !loss.fClasses.empty() ? vendors.FindClass(loss.fClasses.front()) : nullptr;
-    if (list) {
+    const TClassList* list = loss.fClasses.empty() ? nullptr : vendors.FindClass(loss.fClasses.front());
+    if (list && loss.fVendor.empty()) {
         loss.fVendor = list->fVendor;
         loss.fFile = list->fPath;
+    }
+    if (!list || list->fVendor != loss.fVendor) {
+        list = vendors.FindOnlyList(loss.fVendor);
+    }
+    if (list) {
+        loss.fProvider = list->fModule;
     }
 }
 

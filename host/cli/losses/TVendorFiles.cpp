@@ -149,4 +149,18 @@ const TVendorFolder* TVendorFiles::FindFolder(const std::string& name) const
     return found == fFolders.end() ? nullptr : &*found;
 }
 
+const TClassList* TVendorFiles::FindOnlyList(const std::string& vendor) const
+{
+    const TClassList* found = nullptr;
+    for (const TClassList& list : fClassLists) {
+        if (list.fVendor == vendor) {
+            if (found) {
+                return nullptr;
+            }
+            found = &list;
+        }
+    }
+    return found;
+}
+
 } // namespace vrxhost

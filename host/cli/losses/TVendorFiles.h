@@ -55,6 +55,8 @@ class TVendorFiles
     // Returns: the list that names the class (letter case ignored); null for an unlisted class.
     const TClassList* FindClass(const std::string& name) const;
     const TVendorFolder* FindFolder(const std::string& name) const;
+    // Returns: the one list of the vendor; null for none and for several.
+    const TClassList* FindOnlyList(const std::string& vendor) const;
 
   private:
     std::vector<TVendorFolder> fFolders; // in the order of their names

@@ -19,8 +19,9 @@ struct TLoss
     std::vector<std::string> fObjects;
     std::string fEnd;
 
-    std::string fVendor; // the name of the folder
-    std::string fFile;   // the vendor's file that the loss is about
+    std::string fVendor;   // the name of the folder
+    std::string fProvider; // the name of the provider whose class list is there; empty where there are none or several
+    std::string fFile;     // the vendor's file that the loss is about
     std::vector<std::string> fClasses;
     std::string fProperty;
     std::vector<std::string> fLog; // what the server's log says about the vendor

@@ -16,7 +16,7 @@
 //         value      NAME VALUE
 //     served         COUNT MILLISECONDS
 //   loss             FLAGS BEGIN END VENDOR FILE PROPERTY  flags: note, cause, consequence, kind:WORD, each and a blank
-//     about          object|class|log TEXT
+//     about          provider|object|class|log TEXT
 //   log              LINE                                 of the host's log
 //   sum              SUM                                  of all bytes before, at intervals
 //   end              complete|partial ENDED SUM

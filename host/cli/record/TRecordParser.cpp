@@ -252,11 +252,18 @@ void TRecordParser::AddAbout(TRecordFields& fields)
 {
     static const std::map<std::string, std::vector<std::string> TLoss::*> lists = {
         {"object", &TLoss::fObjects}, {"class", &TLoss::fClasses}, {"log", &TLoss::fLog}};
-    const auto list = lists.find(fields.Next());
-    if (fRecord.fLosses.empty() || list == lists.end()) {
+    const std::string kind = fields.Next();
+    const auto list = lists.find(kind);
+    const bool isProvider = kind == "provider";
+    if (fRecord.fLosses.empty() || (list == lists.end() && !isProvider)) {
         throw std::runtime_error("a detail of a loss stands alone or is of an unknown kind");
     }
-    (fRecord.fLosses.back().*list->second).push_back(fields.Next());
+    TLoss& loss = fRecord.fLosses.back();
+    if (isProvider) {
+        loss.fProvider = fields.Next();
+    } else {
+        (loss.*list->second).push_back(fields.Next());
+    }
 }
 
 void TRecordParser::AddLog(TRecordFields& fields)

@@ -209,6 +209,9 @@ void TRecordWriter::WriteLoss(const TLoss& loss)
     const std::string flags = std::string(loss.fIsNote ? "note " : "") + (loss.fIsCause ? "cause " : "") +
                               (loss.fIsConsequence ? "consequence " : "") + kKindFlag + WordOf(loss.fKind) + " ";
     Write(Line("loss", flags, loss.fBegin, loss.fEnd, loss.fVendor, loss.fFile, loss.fProperty));
+    if (!loss.fProvider.empty()) {
+        Write(Line("about", std::string("provider"), loss.fProvider));
+    }
     const std::pair<const char*, const std::vector<std::string>&> lists[] = {
         {"object", loss.fObjects}, {"class", loss.fClasses}, {"log", loss.fLog}};
     for (const auto& [kind, texts] : lists) {
