@@ -134,8 +134,7 @@ void ClassParser::addMethod(CIMClass& owner, const CIMMethod& method, std::size_
 void ClassParser::checkNamedClasses(const CIMClass& owner, const CIMConstProperty& property, std::size_t offset)
 {
     const auto isUnknown = [&](const CIMName& name) {
-        CIMClass found;
-        return !name.isNull() && !name.equal(owner.getClassName()) && !fCompilation.handler.findClass(name, found);
+        return !name.isNull() && !name.equal(owner.getClassName()) && !fCompilation.handler.hasClass(name);
     };
     if (isUnknown(property.getReferenceClassName())) {
         fCompilation.portability.report(fCursor, offset, "a reference to a class that is not declared yet");

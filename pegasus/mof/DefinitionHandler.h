@@ -31,6 +31,8 @@ class DefinitionHandler
     // alias's path.
     // Returns: false when it is absent.
     virtual bool findClass(const CIMName& name, CIMClass& found) = 0;
+    // Returns: whether the class exists.
+    virtual bool hasClass(const CIMName& name) = 0;
 
     virtual void declareQualifier(const CIMQualifierDecl& declaration) = 0;
     // Returns: false when the class exists already; it stays as it is.

@@ -51,6 +51,11 @@ bool MemoryHandler::findClass(const CIMName& name, CIMClass& found)
     return held != fWholeClasses.end();
 }
 
+bool MemoryHandler::hasClass(const CIMName& name)
+{
+    return fWholeClasses.count(keyOf(name)) != 0;
+}
+
 void MemoryHandler::declareQualifier(const CIMQualifierDecl& declaration)
 {
     fQualifiers[keyOf(declaration.getName())] = declaration;
@@ -59,7 +64,7 @@ void MemoryHandler::declareQualifier(const CIMQualifierDecl& declaration)
 bool MemoryHandler::createClass(const CIMClass& newClass)
 {
     const std::string key = keyOf(newClass.getClassName());
-    if (fWholeClasses.count(key) != 0) {
+    if (hasClass(newClass.getClassName())) {
         return false;
     }
     CIMClass whole = newClass.clone();

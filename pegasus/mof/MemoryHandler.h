@@ -17,6 +17,7 @@ class MemoryHandler : public DefinitionHandler
     void useNamespace(const CIMNamespaceName& nameSpace) override;
     bool findQualifier(const CIMName& name, CIMQualifierDecl& declaration) override;
     bool findClass(const CIMName& name, CIMClass& found) override;
+    bool hasClass(const CIMName& name) override;
     void declareQualifier(const CIMQualifierDecl& declaration) override;
     bool createClass(const CIMClass& newClass) override;
     bool createInstance(const CIMInstance& newInstance) override;

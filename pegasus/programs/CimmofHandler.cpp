@@ -11,8 +11,9 @@ namespace Pegasus::cimmof {
 
 namespace {
 
-// Instances of more classes than this in turn ask the server again.
+// Instances of more classes than this in turn ask the server again, and references to more names.
 constexpr std::size_t kMaxRememberedClasses = 256;
+constexpr std::size_t kMaxRememberedNames = 64u << 10;
 
 // The message that stays in front of whatever the server said.
 [[noreturn]] void failAdding(const String& what, const Exception& cause)
@@ -27,6 +28,7 @@ void ServerHandler::useNamespace(const CIMNamespaceName& nameSpace)
     fNamespace = nameSpace;
     fQualifiers.clear();
     fClasses.clear();
+    fClassNames.clear();
     CIMInstance instance(CIMName("__NameSpace"));
     instance.addProperty(CIMProperty(CIMName("Name"), CIMValue(String())));
     try {
@@ -81,6 +83,32 @@ bool ServerHandler::findClass(const CIMName& name, CIMClass& found)
     return true;
 }
 
+// Asks for as little of the class as there is.
+bool ServerHandler::hasClass(const CIMName& name)
+{
+    if (fClassNames.count(base::utf8(name.getString())) != 0) {
+        return true;
+    }
+    try {
+        fClient.getClass(fNamespace, name, true, false, false, CIMPropertyList(Array<CIMName>()));
+    } catch (const CIMException& error) {
+        if (error.getCode() == CIM_ERR_NOT_FOUND) {
+            return false;
+        }
+        throw;
+    }
+    rememberName(name);
+    return true;
+}
+
+void ServerHandler::rememberName(const CIMName& name)
+{
+    if (fClassNames.size() >= kMaxRememberedNames) {
+        fClassNames.clear();
+    }
+    fClassNames.insert(base::utf8(name.getString()));
+}
+
 // What the server then holds may differ: it keeps a declaration whose type would change.
 void ServerHandler::declareQualifier(const CIMQualifierDecl& declaration)
 {
@@ -96,9 +124,11 @@ bool ServerHandler::createClass(const CIMClass& newClass)
 {
     try {
         fClient.createClass(fNamespace, newClass);
+        rememberName(newClass.getClassName());
         return true;
     } catch (const CIMException& error) {
         if (error.getCode() == CIM_ERR_ALREADY_EXISTS) {
+            rememberName(newClass.getClassName());
             return false;
         }
         failAdding(String("class ") + newClass.getClassName().getString() + String(" to the repository"), error);

@@ -6,6 +6,7 @@
 #include <Pegasus/Client/CIMClient.h>
 
 #include <map>
+#include <set>
 #include <string>
 
 namespace Pegasus::cimmof {
@@ -23,6 +24,7 @@ class ServerHandler : public mof::DefinitionHandler
     void useNamespace(const CIMNamespaceName& nameSpace) override;
     bool findQualifier(const CIMName& name, CIMQualifierDecl& declaration) override;
     bool findClass(const CIMName& name, CIMClass& found) override;
+    bool hasClass(const CIMName& name) override;
     void declareQualifier(const CIMQualifierDecl& declaration) override;
     bool createClass(const CIMClass& newClass) override;
     bool createInstance(const CIMInstance& newInstance) override;
@@ -31,11 +33,14 @@ class ServerHandler : public mof::DefinitionHandler
     void warn(const std::string& place, const std::string& text) override;
 
   private:
+    void rememberName(const CIMName& name);
+
     CIMClient& fClient;
     bool fHideWarnings;
     CIMNamespaceName fNamespace;
     std::map<std::string, CIMQualifierDecl> fQualifiers; // of fNamespace, by name as written
     std::map<std::string, CIMClass> fClasses;            // of fNamespace, by name as written
+    std::set<std::string> fClassNames;                   // of classes that fNamespace has, as written
 };
 
 } // namespace Pegasus::cimmof

@@ -18,6 +18,7 @@ class RepositoryHandler : public Pegasus::mof::DefinitionHandler
     void useNamespace(const Pegasus::CIMNamespaceName& nameSpace) override;
     bool findQualifier(const Pegasus::CIMName& name, Pegasus::CIMQualifierDecl& declaration) override;
     bool findClass(const Pegasus::CIMName& name, Pegasus::CIMClass& found) override;
+    bool hasClass(const Pegasus::CIMName& name) override { return fRepository.hasClass(fNamespace, name); }
     void declareQualifier(const Pegasus::CIMQualifierDecl& declaration) override;
     bool createClass(const Pegasus::CIMClass& newClass) override;
     bool createInstance(const Pegasus::CIMInstance& newInstance) override;
