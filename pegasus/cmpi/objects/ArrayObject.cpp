@@ -90,7 +90,7 @@ template <typename T> void appendElements(const CIMValue& array, std::vector<CIM
 }
 
 // Calls the template with the C++ type of each CIM type that an array may have.
-template <typename Visitor> auto visitType(CIMType type, Visitor&& visit)
+template <typename Visitor> auto visitElementType(CIMType type, Visitor&& visit)
 {
     switch (type) {
     case CIMTYPE_BOOLEAN:
@@ -219,14 +219,14 @@ void ArrayObject::requireIndex(CMPICount index) const
 
 CIMValue arrayOf(CIMType type, const std::vector<CIMValue>& elements)
 {
-    return visitType(type, [&](auto sample) { return typedArray<decltype(sample)>(elements); });
+    return visitElementType(type, [&](auto sample) { return typedArray<decltype(sample)>(elements); });
 }
 
 std::vector<CIMValue> elementsOf(const CIMValue& array)
 {
     std::vector<CIMValue> elements;
     if (!array.isNull()) {
-        visitType(array.getType(), [&](auto sample) { appendElements<decltype(sample)>(array, elements); });
+        visitElementType(array.getType(), [&](auto sample) { appendElements<decltype(sample)>(array, elements); });
     }
     return elements;
 }
