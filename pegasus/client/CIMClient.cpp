@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/base/Text.h"
 #include "pegasus/client/CIMClientRep.h"
+#include "pegasus/client/InstanceReader.h"
 
 #include <Pegasus/Client/CIMClient.h>
 
@@ -45,6 +46,15 @@ Array<T> readAll(CIMClientRep& rep, const client::Request& request, T (ElementDe
         results.append((decoder.*decode)(element));
     });
     return results;
+}
+
+Array<CIMInstance> readInstances(CIMClientRep& rep, const client::Request& request)
+{
+    client::InstanceReader reader(rep.knownInstances());
+    rep.exchange(
+        request, [&](const XmlElement& element, ElementDecoder& decoder) { reader.read(element, decoder); },
+        [&](std::string_view text, ElementDecoder& decoder) { return reader.offer(text, decoder); });
+    return reader.instances();
 }
 
 void readNothing(CIMClientRep& rep, const client::Request& request)
@@ -174,7 +184,7 @@ Array<CIMInstance> CIMClient::enumerateInstances(const CIMNamespaceName& nameSpa
         .flag("IncludeQualifiers", includeQualifiers, false)
         .flag("IncludeClassOrigin", includeClassOrigin, false)
         .propertyList(propertyList);
-    return readAll(*fRep, makeRequest(call), &ElementDecoder::decodeNamedInstance);
+    return readInstances(*fRep, makeRequest(call));
 }
 
 Array<CIMObjectPath> CIMClient::enumerateInstanceNames(const CIMNamespaceName& nameSpace, const CIMName& className)

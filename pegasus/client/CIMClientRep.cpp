@@ -125,13 +125,14 @@ void CIMClientRep::disconnect()
     fAddress.reset();
 }
 
-void CIMClientRep::exchange(const client::Request& request, const ContentHandler& onContent)
+void CIMClientRep::exchange(const client::Request& request, const ContentHandler& onContent,
+                            const OfferHandler& onOffer)
 {
     if (!fAddress) {
         throw NotConnectedException();
     }
     try {
-        exchangeOnce(request, onContent);
+        exchangeOnce(request, onContent, onOffer);
     } catch (const CIMException&) {
         throw; // an answer like any other; the connection is still good
     } catch (const wire::XmlError& error) {
@@ -149,7 +150,8 @@ void CIMClientRep::exchange(const client::Request& request, const ContentHandler
     }
 }
 
-void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHandler& onContent)
+void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHandler& onContent,
+                                const OfferHandler& onOffer)
 {
     const Deadline deadline = Deadline::after(std::chrono::milliseconds(fTimeoutMs));
     if (fTimeoutMs == 0) {
@@ -159,6 +161,7 @@ void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHan
     const std::string message = client::encodeHttpRequest(request, expected.messageId, fAddress->text(),
                                                           fAddress->isLocal ? localUser() : std::string());
     ResponseReader reader(expected, fDecoder, onContent, deadline);
+    reader.setOfferHandler(onOffer);
     HttpAnswerReader response(fLimits.http, checkHeader, [&](std::string_view body) { reader.feed(body); });
     send(message, deadline);
     receive(response, deadline);

@@ -5,6 +5,7 @@
 #include "pegasus/client/ResponseReader.h"
 #include "pegasus/client/ServerConnection.h"
 #include "pegasus/wire/HttpAnswerReader.h"
+#include "pegasus/wire/KnownInstances.h"
 #include "pegasus/wire/XmlLimits.h"
 
 #include <Pegasus/Common/String.h>
@@ -33,9 +34,10 @@ class CIMClientRep
 {
   public:
     using ContentHandler = client::ResponseReader::ContentHandler;
+    using OfferHandler = client::ResponseReader::OfferHandler;
 
     CIMClientRep() = default;
-    explicit CIMClientRep(const client::ClientLimits& limits) : fLimits(limits), fDecoder(limits.xml) {}
+    explicit CIMClientRep(const client::ClientLimits& limits) : fLimits(limits) {}
 
     Uint32 timeoutMs() const { return fTimeoutMs; }
     void setTimeoutMs(Uint32 timeoutMs) { fTimeoutMs = timeoutMs; }
@@ -50,18 +52,22 @@ class CIMClientRep
     void connect(const client::ServerAddress& address);
     void disconnect();
 
-    // Sends the request, once, and passes each element of the result to `onContent`. After a failure the connection is
-    // closed and the next call opens a new one. An ERROR element with the code 0 is a success with an empty result.
-    // Throws: what CIMClient's operations throw.
-    void exchange(const client::Request& request, const ContentHandler& onContent);
+    // Sends the request, once, and passes each element of the result to `onContent`, after it was offered to `onOffer`.
+    // After a failure the connection is closed and the next call opens a new one. An ERROR element with the code 0 is a
+    // success with an empty result. Throws: what CIMClient's operations throw.
+    void exchange(const client::Request& request, const ContentHandler& onContent, const OfferHandler& onOffer = {});
+
+    // What this client knows of instances that it has read.
+    wire::KnownInstances& knownInstances() { return fKnownInstances; }
 
   private:
-    void exchangeOnce(const client::Request& request, const ContentHandler& onContent);
+    void exchangeOnce(const client::Request& request, const ContentHandler& onContent, const OfferHandler& onOffer);
     void send(const std::string& message, const base::Deadline& deadline);
     void receive(wire::HttpAnswerReader& response, const base::Deadline& deadline);
 
     client::ClientLimits fLimits;
     wire::ElementDecoder fDecoder{fLimits.xml}; // kept, so that the names of all answers share their texts
+    wire::KnownInstances fKnownInstances{fLimits.xml};
     std::optional<client::ServerAddress> fAddress;
     client::ServerConnection fConnection;
     std::vector<char> fReceiveBuffer;

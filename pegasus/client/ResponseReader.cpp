@@ -146,11 +146,10 @@ void ResponseReader::closeEnvelope(std::string_view)
 
 void ResponseReader::slice(const XmlElement& element)
 {
-    const bool isContent = fDepth == (fExpected.isIntrinsic ? kReturnLevel + 1 : kResponseLevel + 1);
     if (element.is("ERROR") && fDepth == kResponseLevel + 1 && !fHasReturnValue && !fError) {
         return readError(element);
     }
-    if (!isContent || fError) {
+    if (!isInResult()) {
         if (fDepth < std::size(kLevels) && fDepth != kResponseLevel + 1) {
             element.fail(Kind::kInvalid, "Expected open of " + std::string(kLevels[fDepth]) + " element");
         }
@@ -159,17 +158,49 @@ void ResponseReader::slice(const XmlElement& element)
     readContent(element);
 }
 
+// Whether an element that begins here belongs to the result.
+bool ResponseReader::isInResult() const
+{
+    return fDepth == (fExpected.isIntrinsic ? kReturnLevel + 1 : kResponseLevel + 1) && !fError;
+}
+
+wire::XmlOffer ResponseReader::offer(std::string_view text)
+{
+    if (!fOnOffer || !isInResult()) {
+        return {};
+    }
+    checkDeadline();
+    const wire::XmlOffer offer = fOnOffer(text, fDecoder);
+    if (offer.result == wire::XmlOffer::Result::kTaken) {
+        fHasContent = true;
+        checkDecodedBytes();
+    }
+    return offer;
+}
+
 void ResponseReader::readContent(const XmlElement& element)
+{
+    checkDeadline();
+    fHasContent = true;
+    fOnContent(element, fDecoder);
+    checkDecodedBytes();
+}
+
+void ResponseReader::checkDeadline() const
 {
     if (fDeadline.hasPassed()) {
         throw ConnectionTimeoutException();
     }
-    fHasContent = true;
-    fOnContent(element, fDecoder);
+}
+
+// After an element was decoded, and before the slicer goes on.
+void ResponseReader::checkDecodedBytes() const
+{
     const std::size_t limit = fDecoder.limits().maxDecodedBytes;
     if (fDecoder.decodedBytes() - fBytesBefore > limit) {
-        element.fail(Kind::kTooLarge,
-                     "objects of more than " + std::to_string(limit) + " bytes in one answer (maxDecodedBytes)");
+        throw wire::XmlError(Kind::kTooLarge, fSlicer.place(),
+                             "objects of more than " + std::to_string(limit) +
+                                 " bytes in one answer (maxDecodedBytes)");
     }
 }
 

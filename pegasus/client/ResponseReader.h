@@ -11,6 +11,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 
 namespace Pegasus::client {
 
@@ -33,9 +34,14 @@ class ResponseReader : private wire::XmlSliceHandler
     // Gets each element of the result: the children of IRETURNVALUE, or of METHODRESPONSE.
     using ContentHandler = std::function<void(const wire::XmlElement&, wire::ElementDecoder&)>;
 
+    // May take an element of the result before it is read, from the text that begins with it.
+    using OfferHandler = std::function<wire::XmlOffer(std::string_view, wire::ElementDecoder&)>;
+
     // Both references must outlive the reader.
     ResponseReader(const ExpectedResponse& expected, wire::ElementDecoder& decoder, ContentHandler onContent,
                    const base::Deadline& deadline = base::Deadline::never());
+
+    void setOfferHandler(OfferHandler onOffer) { fOnOffer = std::move(onOffer); }
 
     void feed(std::string_view bytes) { fSlicer.feed(bytes); }
     // The body has ended. Throws: XmlError when the answer is incomplete.
@@ -48,16 +54,21 @@ class ResponseReader : private wire::XmlSliceHandler
   private:
     void openEnvelope(const wire::XmlElement& tag) override;
     void closeEnvelope(std::string_view name) override;
+    wire::XmlOffer offer(std::string_view text) override;
     void slice(const wire::XmlElement& element) override;
 
     void openMessage(const wire::XmlElement& tag);
     void openMethodResponse(const wire::XmlElement& tag);
     void readError(const wire::XmlElement& element);
     void readContent(const wire::XmlElement& element);
+    bool isInResult() const;
+    void checkDeadline() const;
+    void checkDecodedBytes() const;
 
     const ExpectedResponse& fExpected;
     wire::ElementDecoder& fDecoder;
     ContentHandler fOnContent;
+    OfferHandler fOnOffer;
     base::Deadline fDeadline;
     std::size_t fBytesBefore; // that the decoder had decoded before this answer
     std::size_t fDepth = 0;

@@ -1,6 +1,10 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/common/ObjectReps.h"
 
+#include <array>
+#include <cstdint>
+#include <mutex>
+
 namespace Pegasus {
 
 template class RepPointer<CIMInstanceRep>;
@@ -24,7 +28,39 @@ void dropQualifiersAndOrigins(CIMProperty property, Boolean includeQualifiers, B
     }
 }
 
+// A lock is shared by many instances: each is unpacked once, and few at the same time.
+std::mutex& unpackingLock(const CIMInstanceRep& rep)
+{
+    static std::array<std::mutex, 16> fgLocks;
+    return fgLocks[reinterpret_cast<std::uintptr_t>(&rep) / sizeof(CIMInstanceRep) % fgLocks.size()];
+}
+
+void unpack(CIMInstanceRep& rep)
+{
+    const std::lock_guard<std::mutex> lock(unpackingLock(rep));
+    const PackedInstance* const packed = rep.fPacked.load(std::memory_order_relaxed);
+    if (packed == nullptr) {
+        return; // another thread has done it meanwhile
+    }
+    CIMObjectPath path;
+    Array<CIMProperty> properties;
+    packed->unpack(path, properties);
+    rep.fPath = path;
+    rep.fProperties.swap(properties);
+    rep.fPacked.store(nullptr, std::memory_order_release);
+    delete packed;
+}
+
 } // namespace
+
+CIMInstanceRep& CIMConstInstance::unpacked() const
+{
+    CIMInstanceRep& rep = fRep.checked();
+    if (rep.fPacked.load(std::memory_order_acquire) != nullptr) {
+        unpack(rep);
+    }
+    return rep;
+}
 
 CIMConstInstance::CIMConstInstance(const CIMName& className) : fRep(new CIMInstanceRep())
 {
@@ -42,42 +78,42 @@ CIMInstance::CIMInstance(const CIMObject& object) : CIMConstInstance(static_cast
 
 const CIMName& CIMConstInstance::getClassName() const
 {
-    return fRep.checked().fPath.getClassName();
+    return unpacked().fPath.getClassName();
 }
 
 const CIMObjectPath& CIMConstInstance::getPath() const
 {
-    return fRep.checked().fPath;
+    return unpacked().fPath;
 }
 
 Uint32 CIMConstInstance::findQualifier(const CIMName& name) const
 {
-    return ObjectAccess::find(fRep.checked().fQualifiers, name);
+    return ObjectAccess::find(unpacked().fQualifiers, name);
 }
 
 CIMConstQualifier CIMConstInstance::getQualifier(Uint32 index) const
 {
-    return ObjectAccess::at(fRep.checked().fQualifiers, index);
+    return ObjectAccess::at(unpacked().fQualifiers, index);
 }
 
 Uint32 CIMConstInstance::getQualifierCount() const
 {
-    return fRep.checked().fQualifiers.size();
+    return unpacked().fQualifiers.size();
 }
 
 Uint32 CIMConstInstance::findProperty(const CIMName& name) const
 {
-    return ObjectAccess::find(fRep.checked().fProperties, name);
+    return ObjectAccess::find(unpacked().fProperties, name);
 }
 
 CIMConstProperty CIMConstInstance::getProperty(Uint32 index) const
 {
-    return ObjectAccess::at(fRep.checked().fProperties, index);
+    return ObjectAccess::at(unpacked().fProperties, index);
 }
 
 Uint32 CIMConstInstance::getPropertyCount() const
 {
-    return fRep.checked().fProperties.size();
+    return unpacked().fProperties.size();
 }
 
 CIMObjectPath CIMConstInstance::buildPath(const CIMConstClass& cimClass) const
@@ -90,7 +126,7 @@ CIMObjectPath CIMConstInstance::buildPath(const CIMConstClass& cimClass) const
         if (index == PEG_NOT_FOUND) {
             throw NoSuchProperty(keyNames[i].getString());
         }
-        keys.append(CIMKeyBinding(keyNames[i], fRep->fProperties[index].getValue()));
+        keys.append(CIMKeyBinding(keyNames[i], unpacked().fProperties[index].getValue()));
     }
     return CIMObjectPath(String(), CIMNamespaceName(), getClassName(), keys);
 }
@@ -102,15 +138,15 @@ Boolean CIMConstInstance::isUninitialized() const
 
 Boolean CIMConstInstance::identical(const CIMConstInstance& instance) const
 {
-    const CIMInstanceRep& x = fRep.checked();
-    const CIMInstanceRep& y = instance.fRep.checked();
+    const CIMInstanceRep& x = unpacked();
+    const CIMInstanceRep& y = instance.unpacked();
     return &x == &y || (x.fPath.identical(y.fPath) && ObjectAccess::identical(x.fQualifiers, y.fQualifiers) &&
                         ObjectAccess::identical(x.fProperties, y.fProperties));
 }
 
 CIMInstance CIMConstInstance::clone() const
 {
-    auto* copy = new CIMInstanceRep(fRep.checked());
+    auto* copy = new CIMInstanceRep(unpacked());
     CIMInstance instance = ObjectAccess::wrap<CIMInstance>(copy);
     copy->fQualifiers = ObjectAccess::clone(copy->fQualifiers);
     copy->fProperties = ObjectAccess::clone(copy->fProperties);
@@ -122,45 +158,45 @@ void CIMInstance::setPath(const CIMObjectPath& path)
     if (!path.getClassName().equal(getClassName())) {
         throw TypeMismatchException();
     }
-    fRep->fPath = path;
+    unpacked().fPath = path;
 }
 
 CIMInstance& CIMInstance::addQualifier(const CIMQualifier& qualifier)
 {
-    ObjectAccess::add(fRep.checked().fQualifiers, qualifier, "qualifier");
+    ObjectAccess::add(unpacked().fQualifiers, qualifier, "qualifier");
     return *this;
 }
 
 CIMQualifier CIMInstance::getQualifier(Uint32 index)
 {
-    return ObjectAccess::at(fRep.checked().fQualifiers, index);
+    return ObjectAccess::at(unpacked().fQualifiers, index);
 }
 
 void CIMInstance::removeQualifier(Uint32 index)
 {
-    fRep.checked().fQualifiers.remove(index);
+    unpacked().fQualifiers.remove(index);
 }
 
 CIMInstance& CIMInstance::addProperty(const CIMProperty& property)
 {
-    ObjectAccess::add(fRep.checked().fProperties, property, "property");
+    ObjectAccess::add(unpacked().fProperties, property, "property");
     return *this;
 }
 
 CIMProperty CIMInstance::getProperty(Uint32 index)
 {
-    return ObjectAccess::at(fRep.checked().fProperties, index);
+    return ObjectAccess::at(unpacked().fProperties, index);
 }
 
 void CIMInstance::removeProperty(Uint32 index)
 {
-    fRep.checked().fProperties.remove(index);
+    unpacked().fProperties.remove(index);
 }
 
 void CIMInstance::instanceFilter(Boolean includeQualifiers, Boolean includeClassOrigin,
                                  const CIMPropertyList& propertyList)
 {
-    CIMInstanceRep& rep = fRep.checked();
+    CIMInstanceRep& rep = unpacked();
     if (!includeQualifiers) {
         rep.fQualifiers.clear();
     }

@@ -3,13 +3,16 @@
 
 #include "pegasus/common/ArrayImpl.h"
 #include "pegasus/common/NameAccess.h"
+#include "pegasus/common/PackedInstance.h"
 #include "pegasus/common/RepPointerImpl.h"
 
 #include <Pegasus/Common/CIMClass.h>
 #include <Pegasus/Common/CIMObject.h>
 #include <Pegasus/Common/CIMQualifierDecl.h>
 
-#include <string>
+#include <atomic>
+#include <memory>
+#include <type_traits>
 
 namespace Pegasus {
 
@@ -63,12 +66,23 @@ struct CIMMethodRep : RefCounted
     bool fPropagated = false;
 };
 
-// The class name is the path's.
+// The class name is the path's. While the instance is packed, everything else here is empty;
+// CIMConstInstance::unpacked() fills it.
 struct CIMInstanceRep : RefCounted
 {
+    CIMInstanceRep() = default;
+    explicit CIMInstanceRep(std::unique_ptr<const PackedInstance> packed) : fPacked(packed.release()) {}
+    // Requires: `other` is unpacked.
+    CIMInstanceRep(const CIMInstanceRep& other)
+        : RefCounted(other), fPath(other.fPath), fQualifiers(other.fQualifiers), fProperties(other.fProperties)
+    {
+    }
+    ~CIMInstanceRep() { delete fPacked.load(std::memory_order_relaxed); }
+
     CIMObjectPath fPath;
     Array<CIMQualifier> fQualifiers;
     Array<CIMProperty> fProperties;
+    std::atomic<const PackedInstance*> fPacked{nullptr}; // null once it is unpacked
 };
 
 // The class name is the path's.
@@ -84,7 +98,14 @@ struct CIMClassRep : RefCounted
 // Sub-objects by name, in lists that hold handles. `what` names the kind in "already exists: property "p"".
 struct ObjectAccess
 {
-    template <typename Handle> static auto& rep(const Handle& handle) { return handle.fRep.checked(); }
+    template <typename Handle> static auto& rep(const Handle& handle)
+    {
+        if constexpr (std::is_base_of_v<CIMConstInstance, Handle>) {
+            return handle.unpacked();
+        } else {
+            return handle.fRep.checked();
+        }
+    }
     template <typename Handle, typename Rep> static Handle wrap(Rep* adopted)
     {
         Handle handle;

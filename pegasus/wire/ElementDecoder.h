@@ -61,6 +61,8 @@ class ElementDecoder
     // Returns: about how many bytes of memory all objects that were decoded so far took, the allocator's share
     // included. A name counts with its bytes in the message, each time.
     std::size_t decodedBytes() const { return fDecodedBytes; }
+    // Adds to it what an object takes that was decoded elsewhere.
+    void addDecodedBytes(std::size_t bytes) { fDecodedBytes += bytes; }
 
   private:
     // An object of so many bytes, its handle in the owner and the allocator's share.
@@ -94,8 +96,6 @@ class ElementDecoder
     template <typename T> T parseElement(const XmlElement& element);
     template <typename T> CIMValue decodeScalar(const XmlElement& element);
     template <typename T> CIMValue decodeArray(const XmlElement& element);
-    template <typename T> T parseUnsigned(const XmlElement& element, std::string_view text);
-    template <typename T> T parseSigned(const XmlElement& element, std::string_view text);
     CIMValue decodeParameterContent(const XmlElement& element, CIMType type);
     CIMObject decodeEmbedded(const XmlElement& element, std::string_view text);
     CIMType embeddedType(const XmlElement& element, CIMType type, XmlAttribute value1, XmlAttribute value2);

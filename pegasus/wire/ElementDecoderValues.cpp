@@ -1,12 +1,10 @@
 // SPDX-License-Identifier: MIT
-#include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/NumberText.h"
 #include "pegasus/base/Text.h"
 #include "pegasus/common/CIMValueRep.h"
 #include "pegasus/wire/ElementDecoder.h"
+#include "pegasus/wire/ValueText.h"
 #include "pegasus/wire/XmlText.h"
-
-#include <limits>
 
 namespace Pegasus::wire {
 namespace {
@@ -19,6 +17,20 @@ template <typename T> std::string typeWord()
     std::string word = cimTypeToString(CIMTypeOf<T>::kType);
     word.front() = static_cast<char>(word.front() - ('a' - 'A'));
     return word;
+}
+
+// Returns: what is wrong with a text that fails to be a value of the type.
+template <typename T> std::string complaintAbout(std::string_view text)
+{
+    if constexpr (std::is_same_v<T, Boolean>) {
+        return "Invalid boolean value";
+    } else if constexpr (std::is_floating_point_v<T>) {
+        return "Invalid real number value";
+    } else if constexpr (std::is_unsigned_v<T>) {
+        return base::parseUnsigned(text) ? typeWord<T>() + " value out of range" : "Invalid unsigned integer value";
+    } else {
+        return base::parseSigned(text) ? typeWord<T>() + " value out of range" : "Invalid signed integer value";
+    }
 }
 
 // Counts one embedded object while it is decoded.
@@ -36,62 +48,9 @@ class EmbeddingGuard
 
 } // namespace
 
-template <typename T> T ElementDecoder::parseUnsigned(const XmlElement& element, std::string_view text)
-{
-    const auto parsed = base::parseUnsigned(text);
-    if (!parsed) {
-        element.fail(Kind::kSemantic, "Invalid unsigned integer value");
-    }
-    if (*parsed > std::numeric_limits<T>::max()) {
-        element.fail(Kind::kSemantic, typeWord<T>() + " value out of range");
-    }
-    return static_cast<T>(*parsed);
-}
-
-template <typename T> T ElementDecoder::parseSigned(const XmlElement& element, std::string_view text)
-{
-    const auto parsed = base::parseSigned(text);
-    if (!parsed) {
-        element.fail(Kind::kSemantic, "Invalid signed integer value");
-    }
-    if (*parsed > std::numeric_limits<T>::max() || *parsed < std::numeric_limits<T>::min()) {
-        element.fail(Kind::kSemantic, typeWord<T>() + " value out of range");
-    }
-    return static_cast<T>(*parsed);
-}
-
 template <> String ElementDecoder::parseText<String>(const XmlElement& element, std::string_view text)
 {
     return toString(element, text);
-}
-
-template <> Boolean ElementDecoder::parseText<Boolean>(const XmlElement& element, std::string_view text)
-{
-    if (base::equalNoCase(text, "true")) {
-        return true;
-    }
-    if (base::equalNoCase(text, "false")) {
-        return false;
-    }
-    element.fail(Kind::kSemantic, "Invalid boolean value");
-}
-
-template <> Real32 ElementDecoder::parseText<Real32>(const XmlElement& element, std::string_view text)
-{
-    const auto parsed = base::parseReal32(text);
-    if (!parsed) {
-        element.fail(Kind::kSemantic, "Invalid real number value");
-    }
-    return *parsed;
-}
-
-template <> Real64 ElementDecoder::parseText<Real64>(const XmlElement& element, std::string_view text)
-{
-    const auto parsed = base::parseReal64(text);
-    if (!parsed) {
-        element.fail(Kind::kSemantic, "Invalid real number value");
-    }
-    return *parsed;
 }
 
 template <> Char16 ElementDecoder::parseText<Char16>(const XmlElement& element, std::string_view text)
@@ -133,11 +92,10 @@ template <> CIMInstance ElementDecoder::parseText<CIMInstance>(const XmlElement&
 
 template <typename T> T ElementDecoder::parseText(const XmlElement& element, std::string_view text)
 {
-    if constexpr (std::is_unsigned_v<T>) {
-        return parseUnsigned<T>(element, text);
-    } else {
-        return parseSigned<T>(element, text);
+    if (const auto value = parseValue<T>(text)) {
+        return *value;
     }
+    element.fail(Kind::kSemantic, complaintAbout<T>(text));
 }
 
 CIMObject ElementDecoder::decodeEmbedded(const XmlElement& element, std::string_view text)

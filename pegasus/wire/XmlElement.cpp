@@ -19,6 +19,12 @@ bool isSame(std::string_view x, std::string_view y)
 
 } // namespace
 
+std::string_view XmlElement::startTag() const
+{
+    const std::size_t begin = node().name.begin - 1; // of the '<'
+    return text().substr(begin, node().content.begin - begin);
+}
+
 XmlElement XmlElement::firstChild() const
 {
     if (!node().hasChild && !node().hasText) {

@@ -43,6 +43,10 @@ class XmlElement
     std::string_view name() const { return node().name.in(text()); }
     bool is(std::string_view expectedName) const { return fNodes && name() == expectedName; }
 
+    // As they stand in the text: the start tag, or the empty one; what is between the tags.
+    std::string_view startTag() const;
+    std::string_view content() const { return node().content.in(text()); }
+
     // The children that are elements. Text beside them is an error.
     XmlElement firstChild() const;
     XmlElement nextSibling() const;

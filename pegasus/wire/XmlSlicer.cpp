@@ -14,6 +14,12 @@ using Type = XmlToken::Type;
 // So many bytes are read before the delivered ones among them are dropped.
 constexpr std::size_t kPieceBytes = 64UL * 1024;
 
+// An element that is cut off is offered again when more of it is there, but so often at most: each offer begins from
+// its start.
+constexpr std::size_t kMaxOffers = 4;
+// The levels that an element may have which is offered.
+constexpr std::size_t kOfferedDepth = 8;
+
 } // namespace
 
 XmlSlicer::XmlSlicer(std::vector<std::string_view> envelope, XmlSliceHandler& handler, const XmlLimits& limits)
@@ -46,7 +52,28 @@ void XmlSlicer::feedPiece(std::string_view bytes)
 // Takes one token of the envelope, or what has arrived of an element in it. Returns: false when more is needed.
 bool XmlSlicer::step()
 {
-    return fNodes.depth() > 0 ? stepInSlice() : stepInEnvelope();
+    if (fNodes.depth() > 0) {
+        return stepInSlice();
+    }
+    if (mayOffer()) {
+        const XmlOffer offer = fHandler.offer(rest().substr(0, fNodes.limits().maxElementBytes));
+        if (offer.result == XmlOffer::Result::kTaken) {
+            consume(offer.size);
+            return true;
+        }
+        const bool isCut = offer.result == XmlOffer::Result::kCut;
+        fOffers = isCut ? fOffers + 1 : kMaxOffers;
+        if (isCut && fOffers < kMaxOffers) {
+            return false;
+        }
+    }
+    return stepInEnvelope();
+}
+
+bool XmlSlicer::mayOffer() const
+{
+    return fOffers < kMaxOffers && !fOpen.empty() && fOpen.size() + kOfferedDepth <= fNodes.limits().maxDepth &&
+           rest().front() == '<';
 }
 
 // Text may be taken in parts.
@@ -163,6 +190,7 @@ void XmlSlicer::consume(std::size_t size)
     fPlace = advance(fPlace, rest().substr(0, size));
     fStart += size;
     fRead = 0;
+    fOffers = 0;
     fNodes.setSource({rest(), fPlace});
 }
 

@@ -3,6 +3,7 @@
 
 #include "pegasus/wire/XmlElement.h"
 #include "pegasus/wire/XmlNodes.h"
+#include "pegasus/wire/XmlOffer.h"
 
 #include <string>
 #include <string_view>
@@ -18,6 +19,9 @@ class XmlSliceHandler
     // A start tag of the envelope, as an empty element.
     virtual void openEnvelope(const XmlElement& tag) = 0;
     virtual void closeEnvelope(std::string_view name) = 0;
+    // The text from an element inside the envelope on, before it is read. A handler that knows such elements may take
+    // one that is well formed and within the limits; the rest of the text may be anything.
+    virtual XmlOffer offer(std::string_view) { return {}; }
     // An element inside the envelope, with everything in it.
     virtual void slice(const XmlElement& element) = 0;
 };
@@ -42,6 +46,7 @@ class XmlSlicer
     void feedPiece(std::string_view bytes);
     bool step();
     bool stepInSlice();
+    bool mayOffer() const;
     bool stepInEnvelope();
     void takeDeclaration(const XmlToken& token);
     void takeInEnvelope(const XmlToken& token);
@@ -60,6 +65,7 @@ class XmlSlicer
     std::string fBuffer;
     std::size_t fStart = 0;         // in the buffer: where what was not delivered yet begins
     std::size_t fRead = 0;          // from fStart: how far the element that begins there was read
+    std::size_t fOffers = 0;        // of the element that begins there, and refused or cut
     XmlPlace fPlace{1, 1};          // of fStart
     std::vector<std::string> fOpen; // names of the envelope's open elements
     bool fHasDeclaration = false;

@@ -3,8 +3,10 @@
 
 #include "pegasus/wire/ElementDecoder.h"
 #include "pegasus/wire/ElementEncoder.h"
+#include "pegasus/wire/KnownInstances.h"
 
 #include <string>
+#include <string_view>
 
 namespace test {
 
@@ -31,5 +33,40 @@ inline void encodeAgain(const Pegasus::wire::XmlElement& element, Pegasus::wire:
         wire::appendInstanceName(out, decoder.decodeInstanceName(element));
     }
 }
+
+// The content of an answer as the client reads it: instances are learned, and taken when they are offered. It appends
+// the encoding of each object to `out`. All references must outlive it.
+class ContentReader
+{
+  public:
+    ContentReader(Pegasus::wire::ElementDecoder& decoder, std::string& out,
+                  const Pegasus::wire::XmlLimits& limits = Pegasus::wire::XmlLimits())
+        : fDecoder(decoder), fOut(out), fKnown(limits)
+    {
+    }
+
+    void read(const Pegasus::wire::XmlElement& element)
+    {
+        encodeAgain(element, fDecoder, fOut);
+        if (element.is("VALUE.NAMEDINSTANCE")) {
+            fKnown.learn(element, fDecoder.decodeNamedInstance(element));
+        }
+    }
+
+    Pegasus::wire::XmlOffer offer(std::string_view text)
+    {
+        Pegasus::CIMInstance instance;
+        const Pegasus::wire::XmlOffer offer = fKnown.take(text, instance);
+        if (offer.result == Pegasus::wire::XmlOffer::Result::kTaken) {
+            Pegasus::wire::appendNamedInstance(fOut, instance);
+        }
+        return offer;
+    }
+
+  private:
+    Pegasus::wire::ElementDecoder& fDecoder;
+    std::string& fOut;
+    Pegasus::wire::KnownInstances fKnown;
+};
 
 } // namespace test

@@ -71,6 +71,39 @@ CIMInstance sampleInstance(const char* id)
     return instance;
 }
 
+// Instances that differ in their values alone: the second and the later ones are known by their tags.
+std::string plainInstances()
+{
+    std::string out;
+    for (const char* text : {"one", " two  é ", "<3> & \"q\"", "\xF0\x9F\x98\x80\r\n", ""}) {
+        const auto number = static_cast<Uint8>(out.size());
+        CIMInstance instance("T_Fan");
+        const CIMValue values[] = {CIMValue(String(text)),
+                                   CIMValue(number % 2 == 0),
+                                   CIMValue(number),
+                                   CIMValue(Sint8(-5)),
+                                   CIMValue(Sint64(1) << number % 63),
+                                   CIMValue(Real32(number) / 3),
+                                   CIMValue(Real64(1e-300)),
+                                   CIMDateTime("20200102030405.678901+060"),
+                                   CIMValue(CIMTYPE_UINT16, false),
+                                   CIMValue(Array<Boolean>(2, true)),
+                                   CIMValue(Array<String>(number % 3, String(text)))};
+        for (const CIMValue& value : values) {
+            const bool isNull = instance.getPropertyCount() == number % 5;
+            const std::string name = "P" + std::to_string(instance.getPropertyCount());
+            instance.addProperty(CIMProperty(name.c_str(), isNull ? CIMValue(value.getType(), value.isArray()) : value,
+                                             0, CIMName(), "T_Origin"));
+        }
+        Array<CIMKeyBinding> keys;
+        keys.append(CIMKeyBinding("Name", String(text), CIMKeyBinding::STRING));
+        keys.append(CIMKeyBinding("Number", String("7"), CIMKeyBinding::NUMERIC));
+        instance.setPath(CIMObjectPath(String(), CIMNamespaceName(), "T_Fan", keys));
+        wire::appendNamedInstance(out, instance);
+    }
+    return out;
+}
+
 AnswerCase sample(const char* name, const char* method, const PeerAnswer& answer, bool isIntrinsic = true)
 {
     return {name, "1000", method, isIntrinsic, answer.bytes};
@@ -79,14 +112,17 @@ AnswerCase sample(const char* name, const char* method, const PeerAnswer& answer
 } // namespace
 
 std::string readAnswer(const AnswerCase& answer, const std::vector<std::size_t>& cuts,
-                       const client::ClientLimits& limits)
+                       const client::ClientLimits& limits, Decoding decoding)
 {
     const client::ExpectedResponse expected{answer.messageId, answer.method, answer.isIntrinsic};
     std::string out;
     wire::ElementDecoder decoder(limits.xml);
-    client::ResponseReader reader(expected, decoder, [&](const wire::XmlElement& element, wire::ElementDecoder&) {
-        encodeAgain(element, decoder, out);
-    });
+    ContentReader content(decoder, out, limits.xml);
+    client::ResponseReader reader(
+        expected, decoder, [&](const wire::XmlElement& element, wire::ElementDecoder&) { content.read(element); });
+    if (decoding == Decoding::kKnownTags) {
+        reader.setOfferHandler([&](std::string_view text, wire::ElementDecoder&) { return content.offer(text); });
+    }
     wire::HttpAnswerReader response(
         limits.http, [](const wire::HttpAnswerFields&) {}, [&](std::string_view body) { reader.feed(body); });
     try {
@@ -128,6 +164,7 @@ std::vector<AnswerCase> sampleAnswers()
         sample("class", "GetClass", classAnswer(getClass, sampleClass())),
         sample("instances", "EnumerateInstances", httpAnswer(intrinsicBody(enumerate, instances))),
         sample("instances in chunks", "EnumerateInstances", chunkedAnswer(intrinsicBody(enumerate, instances), 700)),
+        sample("plain instances", "EnumerateInstances", httpAnswer(intrinsicBody(enumerate, plainInstances()))),
         sample("no instances", "EnumerateInstances", httpAnswer(intrinsicBody(enumerate, ""))),
         sample("qualifier", "GetQualifier",
                qualifierAnswer(getQualifier, CIMQualifierDecl("Key", CIMValue(false), CIMScope::PROPERTY))),

@@ -19,10 +19,18 @@ struct AnswerCase
     std::string bytes; // the whole HTTP message
 };
 
+// How instances are decoded: those with known tags from the text, or each one from its elements.
+enum class Decoding
+{
+    kKnownTags,
+    kElements
+};
+
 // Reads the answer as the client does, in pieces that end at `cuts`.
 // Returns: what was decoded, encoded again; or "EXC class: message"; "incomplete" when the bytes end too early.
 std::string readAnswer(const AnswerCase& answer, const std::vector<std::size_t>& cuts = {},
-                       const Pegasus::client::ClientLimits& limits = Pegasus::client::ClientLimits());
+                       const Pegasus::client::ClientLimits& limits = Pegasus::client::ClientLimits(),
+                       Decoding decoding = Decoding::kKnownTags);
 
 // Answers with every kind of element, chunks, trailers and errors.
 std::vector<AnswerCase> sampleAnswers();

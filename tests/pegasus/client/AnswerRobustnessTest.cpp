@@ -107,6 +107,8 @@ TEST(AnswerRobustness, ChangedMarkupIsRefusedOrMeansTheSame)
                 answer.bytes = bytes;
                 answer.bytes[at] = static_cast<char>(answer.bytes[at] ^ flip);
                 const std::string result = readAnswer(answer); // must end, whatever the byte
+                ASSERT_EQ(result, readAnswer(answer, {}, {}, test::Decoding::kElements))
+                    << answer.name << " byte " << at << " ^ " << flip;
                 ASSERT_TRUE(!isMarkup[at] || isRefused(result) || result == whole)
                     << answer.name << " byte " << at << " ^ " << flip << ":\n"
                     << result;

@@ -206,10 +206,10 @@ TEST(ClientExchange, MemoryOfAnAnswerHasALimitThatCanBeSet)
     const auto enumerate = [&] { return outcome([&] { client.enumerateInstances(kNameSpace, "T_Fan", false); }); };
     EXPECT_EQ(client.getMaxDecodedBytes(), 256u << 20);
     EXPECT_EQ(enumerate(), "ok");
-    client.setMaxDecodedBytes(600);
+    client.setMaxDecodedBytes(300);
     const std::string refused = enumerate();
     EXPECT_EQ(refused.rfind("Pegasus::CIMClientXmlException: ", 0), 0u) << refused;
-    EXPECT_NE(refused.find("objects of more than 600 bytes in one answer (maxDecodedBytes)"), std::string::npos)
+    EXPECT_NE(refused.find("objects of more than 300 bytes in one answer (maxDecodedBytes)"), std::string::npos)
         << refused;
     client.setMaxDecodedBytes(6000);
     for (int i = 0; i < 20; ++i) {

@@ -45,6 +45,10 @@ class PEGASUS_COMMON_LINKAGE CIMConstInstance
   protected:
     friend struct ObjectAccess;
 
+    // The representation with its path and properties as objects. An instance of an answer has them from the first
+    // time that something asks for them. Thread: any.
+    CIMInstanceRep& unpacked() const;
+
     RepPointer<CIMInstanceRep> fRep;
 };
 

@@ -1,0 +1,118 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <Pegasus/Common/CIMInstance.h>
+
+#include <cstddef>
+#include <cstring>
+#include <memory>
+#include <new>
+#include <string>
+#include <string_view>
+#include <type_traits>
+#include <utility>
+#include <vector>
+
+namespace Pegasus {
+
+// The types of values that are packed.
+template <typename T>
+constexpr bool kIsPackable = std::is_arithmetic_v<T> || std::is_same_v<T, String> || std::is_same_v<T, CIMDateTime>;
+
+// What instances of one shape have in common. Thread: any; it stays as it was made.
+struct InstanceLayout
+{
+    struct Key
+    {
+        CIMName fName;
+        CIMKeyBinding::Type fType;
+    };
+
+    CIMName fClassName; // of the path
+    std::vector<Key> fKeys;
+    std::vector<CIMProperty> fProperties; // of packable types, with null values and without qualifiers
+};
+
+// Writes the values of an instance one after the other: the texts of the keys, then the properties.
+class PackedWriter
+{
+  public:
+    void clear() { fBytes.clear(); }
+    std::string_view bytes() const { return fBytes; }
+
+    // Where a property's value begins. The value follows, an array's as its size and its elements.
+    void putIsNull(bool isNull) { put<Uint8>(isNull ? 1 : 0); }
+    template <typename T> void put(T value)
+    {
+        static_assert(std::is_arithmetic_v<T>);
+        fBytes.append(reinterpret_cast<const char*>(&value), sizeof value);
+    }
+    void putText(std::string_view utf8)
+    {
+        put(static_cast<Uint32>(utf8.size()));
+        fBytes.append(utf8);
+    }
+    // An array's size, once its elements are known. Returns: where to put it.
+    std::size_t reserveSize()
+    {
+        put(Uint32(0));
+        return fBytes.size() - sizeof(Uint32);
+    }
+    void putSize(std::size_t at, Uint32 size) { std::memcpy(fBytes.data() + at, &size, sizeof size); }
+
+  private:
+    std::string fBytes;
+};
+
+// Reads what a PackedWriter wrote, in the same order.
+class PackedReader
+{
+  public:
+    explicit PackedReader(const char* bytes) : fAt(bytes) {}
+
+    bool takeIsNull() { return take<Uint8>() != 0; }
+    template <typename T> T take()
+    {
+        T value;
+        std::memcpy(&value, fAt, sizeof value);
+        fAt += sizeof value;
+        return value;
+    }
+    std::string_view takeText()
+    {
+        const auto size = take<Uint32>();
+        fAt += size;
+        return {fAt - size, size};
+    }
+
+  private:
+    const char* fAt;
+};
+
+// The values of an instance in one piece of memory, with a layout that it shares with others. An answer's instances
+// are kept so until something asks for what is in them: packed they take a fraction of the memory, and none of them
+// makes an object for a property.
+class PackedInstance
+{
+  public:
+    // `values` come from a PackedWriter and fit the layout: each text is UTF-8, as base::decodeUtf8() has it, and a
+    // datetime's is one.
+    static std::unique_ptr<const PackedInstance> create(std::shared_ptr<const InstanceLayout> layout,
+                                                        std::string_view values)
+    {
+        void* memory = ::operator new(sizeof(PackedInstance) + values.size());
+        auto* packed = new (memory) PackedInstance(std::move(layout));
+        std::memcpy(static_cast<void*>(packed + 1), values.data(), values.size());
+        return std::unique_ptr<const PackedInstance>(packed);
+    }
+    static void operator delete(void* memory) { ::operator delete(memory); }
+
+    void unpack(CIMObjectPath& path, Array<CIMProperty>& properties) const;
+
+  private:
+    explicit PackedInstance(std::shared_ptr<const InstanceLayout> layout) : fLayout(std::move(layout)) {}
+
+    std::shared_ptr<const InstanceLayout> fLayout;
+};
+
+} // namespace Pegasus

@@ -1,0 +1,39 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include "pegasus/wire/InstancePattern.h"
+
+#include <cstddef>
+#include <memory>
+#include <string_view>
+#include <vector>
+
+namespace Pegasus::wire {
+
+// Reads the instances of an answer whose tags are those of an earlier one. It keeps a few patterns, the last used one
+// first, because the instances of one class follow each other.
+// Thread: one thread at a time.
+class KnownInstances
+{
+  public:
+    explicit KnownInstances(const XmlLimits& limits = XmlLimits()) : fLimits(limits) {}
+
+    // Notes the tags of a VALUE.NAMEDINSTANCE that was decoded into this instance.
+    void learn(const XmlElement& element, const CIMInstance& instance);
+    // Takes an element that begins the text if a pattern fits. Returns: what became of it; a taken one is in `instance`
+    // and in bytes().
+    XmlOffer take(std::string_view text, CIMInstance& instance);
+    // Returns: about how many bytes of memory the last taken instance has, the allocator's share included, with some
+    // for what it gets when its properties are asked for.
+    std::size_t bytes() const { return fBytes; }
+
+  private:
+    CIMInstance packed(const std::shared_ptr<const InstanceLayout>& layout);
+
+    const XmlLimits fLimits;
+    std::vector<InstancePattern> fPatterns;
+    PackedWriter fValues;
+    std::size_t fBytes = 0;
+};
+
+} // namespace Pegasus::wire
