@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/base/NumberText.h"
 #include "pegasus/base/Text.h"
+#include "pegasus/base/ValueText.h"
 #include "pegasus/common/CIMValueRep.h"
 #include "pegasus/wire/ElementDecoder.h"
-#include "pegasus/wire/ValueText.h"
 #include "pegasus/wire/XmlText.h"
 
 namespace Pegasus::wire {
@@ -92,7 +92,7 @@ template <> CIMInstance ElementDecoder::parseText<CIMInstance>(const XmlElement&
 
 template <typename T> T ElementDecoder::parseText(const XmlElement& element, std::string_view text)
 {
-    if (const auto value = parseValue<T>(text)) {
+    if (const auto value = base::parseValue<T>(text)) {
         return *value;
     }
     element.fail(Kind::kSemantic, complaintAbout<T>(text));

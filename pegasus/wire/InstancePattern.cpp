@@ -2,9 +2,9 @@
 #include "pegasus/wire/InstancePattern.h"
 
 #include "pegasus/base/Text.h"
+#include "pegasus/base/ValueText.h"
 #include "pegasus/common/CIMValueRep.h"
 #include "pegasus/wire/TextCursor.h"
-#include "pegasus/wire/ValueText.h"
 
 #include <algorithm>
 
@@ -194,7 +194,7 @@ template <typename T> bool InstanceMatch::putElement(std::string_view text)
         fValues.putText(text);
         return isDateTime(text);
     } else {
-        const std::optional<T> value = parseValue<T>(text);
+        const std::optional<T> value = base::parseValue<T>(text);
         fValues.put(value.value_or(T()));
         return value.has_value();
     }

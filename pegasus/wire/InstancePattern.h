@@ -3,7 +3,7 @@
 
 #include "pegasus/common/PackedInstance.h"
 #include "pegasus/wire/XmlElement.h"
-#include "pegasus/wire/XmlOffer.h"
+#include "pegasus/wire/XmlSlicer.h"
 
 #include <Pegasus/Common/CIMInstance.h>
 

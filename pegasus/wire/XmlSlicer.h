@@ -3,13 +3,26 @@
 
 #include "pegasus/wire/XmlElement.h"
 #include "pegasus/wire/XmlNodes.h"
-#include "pegasus/wire/XmlOffer.h"
 
 #include <string>
 #include <string_view>
 #include <vector>
 
 namespace Pegasus::wire {
+
+// What became of an element that was offered as text, before it is read.
+struct XmlOffer
+{
+    enum class Result
+    {
+        kRefused, // it is to be read
+        kCut,     // it goes on after the text, and may be offered again when more of it is there
+        kTaken
+    };
+
+    Result result = Result::kRefused;
+    std::size_t size = 0; // of the element that was taken
+};
 
 // What a sliced message is delivered to. A view is valid until the call returns.
 class XmlSliceHandler
