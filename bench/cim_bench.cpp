@@ -8,6 +8,8 @@
 // PORT may be "local", the server's local socket. --before calls a method with a uint32 once, --method measures calls
 // with a string. With --server, the processor time of that process and of its children (the agents) is shown too. Each
 // line has a name, a figure and a unit, separated by tabs; a figure is the median of the rounds (9).
+#include "bench/ReadValues.h"
+
 #include <Pegasus/Client/CIMClient.h>
 
 #include <algorithm>
@@ -165,7 +167,8 @@ void run(const TArguments& arguments)
     if (!arguments.fBefore.empty()) {
         invoke(client, arguments, arguments.fBefore, CIMValue(Uint32(std::stoul(arguments.fBefore[2]))));
     }
-    const auto enumerate = [&] { return client.enumerateInstances(arguments.fNamespace, arguments.fClass).size(); };
+    const auto instances = [&] { return client.enumerateInstances(arguments.fNamespace, arguments.fClass); };
+    const auto enumerate = [&] { return instances().size(); };
     const double idle = peakMegabytes("self");
     const Uint32 count = enumerate();
     if (count == 0) {
@@ -178,6 +181,9 @@ void run(const TArguments& arguments)
             throw std::runtime_error("the number of instances changed");
         }
     });
+    measure("EnumerateInstances, values read", count, arguments, [&] { bench::readValues(instances()); });
+    print("EnumerateInstances, values read, client's memory for an instance",
+          (peakMegabytes("self") - idle) * 1024 / count, "KB");
     printPeaks("EnumerateInstances", arguments.fServer);
     measure("GetClass", kCallsOfARound, arguments, [&] {
         for (int i = 0; i < kCallsOfARound; ++i) {

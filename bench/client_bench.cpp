@@ -7,6 +7,7 @@
 // both also as a ratio to a bare expat pass with empty handlers over the same bytes in the same run, and the growth of
 // the process's memory. Then what decoding during arrival saves, and GetClass calls on one connection. --quick leaves
 // out the biggest answer, --calls all but the calls.
+#include "pegasus/client/InstanceReader.h"
 #include "pegasus/client/Request.h"
 #include "pegasus/client/ResponseReader.h"
 #include "pegasus/client/ServerConnection.h"
@@ -260,15 +261,18 @@ Array<CIMInstance> readThenDecode(client::ServerConnection& connection, const st
         connection.receive(buffer.data(), buffer.size(), deadline, received);
         response.feed(std::string_view(buffer.data(), received));
     }
-    Array<CIMInstance> instances;
     const client::ExpectedResponse expected{"1000", "EnumerateInstances", true};
     wire::ElementDecoder decoder;
+    wire::KnownInstances known;
+    client::InstanceReader instances(known);
     client::ResponseReader reader(expected, decoder, [&](const wire::XmlElement& element, wire::ElementDecoder&) {
-        instances.append(decoder.decodeNamedInstance(element));
+        instances.read(element, decoder);
     });
+    reader.setOfferHandler(
+        [&](std::string_view bytes, wire::ElementDecoder&) { return instances.offer(bytes, decoder); });
     reader.feed(text);
     reader.finish();
-    return instances;
+    return instances.instances();
 }
 
 // A server that needs time for its answer: what decoding meanwhile is worth.

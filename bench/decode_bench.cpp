@@ -5,6 +5,7 @@
 //
 // Prints a line for each kind: the decoder's processor time and a bare expat pass's over the same bytes, taken in
 // turns, and their ratio. With PASSES it decodes so many times and measures nothing: for a profiler.
+#include "bench/ReadValues.h"
 #include "pegasus/client/InstanceReader.h"
 #include "pegasus/client/ResponseReader.h"
 #include "pegasus/wire/ElementEncoder.h"
@@ -137,53 +138,6 @@ std::string classes(unsigned count)
     return answerOf("EnumerateClasses", content);
 }
 
-template <typename T> bool has(const CIMValue& value)
-{
-    T held{};
-    value.get(held);
-    return true;
-}
-
-bool isReadable(const CIMConstProperty& property)
-{
-    const CIMValue& value = property.getValue();
-    if (value.isNull()) {
-        return true;
-    }
-    switch (property.getType()) {
-    case CIMTYPE_STRING:
-        return has<String>(value);
-    case CIMTYPE_DATETIME:
-        return has<CIMDateTime>(value);
-    case CIMTYPE_UINT64:
-        return has<Uint64>(value);
-    case CIMTYPE_UINT32:
-        return has<Uint32>(value);
-    case CIMTYPE_UINT16:
-        return property.isArray() ? has<Array<Uint16>>(value) : has<Uint16>(value);
-    case CIMTYPE_REAL64:
-        return has<Real64>(value);
-    case CIMTYPE_BOOLEAN:
-        return has<Boolean>(value);
-    default:
-        return false;
-    }
-}
-
-// Returns: how many instances there were.
-Uint32 readValues(const Array<CIMInstance>& instances)
-{
-    for (Uint32 i = 0; i < instances.size(); ++i) {
-        const CIMConstInstance instance = instances[i];
-        for (Uint32 j = 0; j < instance.getPropertyCount(); ++j) {
-            if (!isReadable(instance.getProperty(j))) {
-                return i;
-            }
-        }
-    }
-    return instances.size();
-}
-
 // Decodes and drops an answer, as a call of the client does. Returns: how many objects there were.
 template <typename Object>
 Uint32 decode(const std::string& answer, const char* operation,
@@ -219,7 +173,7 @@ Uint32 decodeInstances(const std::string& answer, bool andRead)
         reader.feed(std::string_view(answer).substr(at, kPieceBytes));
     }
     reader.finish();
-    return andRead ? readValues(instances.instances()) : instances.instances().size();
+    return andRead ? bench::readValues(instances.instances()) : instances.instances().size();
 }
 
 void bareExpat(const std::string& answer)

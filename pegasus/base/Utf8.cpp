@@ -11,6 +11,8 @@ namespace Pegasus::base {
 namespace {
 
 constexpr std::size_t kBlock = 8;
+using Bytes [[gnu::vector_size(kBlock)]] = unsigned char;
+using Units [[gnu::vector_size(kBlock * sizeof(Char16))]] = Uint16;
 
 bool isContinuation(unsigned char byte)
 {
@@ -32,9 +34,10 @@ std::size_t copyAsciiBlocks(const char* from, std::size_t size, Char16* to) noex
         if (!isAsciiBlock(from + done)) {
             break;
         }
-        for (std::size_t i = 0; i < kBlock; ++i) {
-            to[done + i] = Char16(static_cast<unsigned char>(from[done + i]));
-        }
+        Bytes bytes;
+        std::memcpy(&bytes, from + done, sizeof bytes);
+        const Units units = __builtin_convertvector(bytes, Units);
+        std::memcpy(static_cast<void*>(to + done), &units, sizeof units);
     }
     return done;
 }
