@@ -13,8 +13,8 @@ SOURCE = os.path.dirname(os.path.dirname(os.path.abspath(__file__)))
 sys.path.insert(0, os.path.join(SOURCE, "tests", "e2e"))
 from tree import Tree  # noqa: E402
 
-INSTANCES = 20_000       # of 17 properties and 2 KB of XML each
-MANY_INSTANCES = 60_000  # the client refuses an answer of more than 256 MB of objects, about 74,000 of these
+INSTANCES = 20_000 # of 17 properties and 2 KB of XML each
+MANY_INSTANCES = 100_000
 ROUNDS = 9
 CLASS_LIST = """<vrx>
   <timeout value="600"/>
