@@ -9,10 +9,16 @@ namespace lnx {
 namespace {
 
 constexpr std::array kClasses{
-    ClassEntry{"LNX_ComputerSystem", computerSystems}, ClassEntry{"LNX_OperatingSystem", operatingSystems},
-    ClassEntry{"LNX_Processor", processors},           ClassEntry{"LNX_Memory", memories},
-    ClassEntry{"LNX_NetworkPort", networkPorts},       ClassEntry{"LNX_BlockDevice", blockDevices},
-    ClassEntry{"LNX_PciDevice", pciDevices},           ClassEntry{"LNX_SystemDevice", systemDevices},
+    ClassEntry{"LNX_ComputerSystem", computerSystems},
+    ClassEntry{"LNX_OperatingSystem", operatingSystems},
+    ClassEntry{"LNX_Processor", processors},
+    ClassEntry{"LNX_Memory", memories},
+    ClassEntry{"LNX_NetworkPort", networkPorts},
+    ClassEntry{"LNX_BlockDevice", blockDevices},
+    ClassEntry{"LNX_PciDevice", pciDevices},
+    ClassEntry{"LNX_PhysicalMemory", physicalMemories},
+    ClassEntry{"LNX_TemperatureSensor", temperatureSensors},
+    ClassEntry{"LNX_SystemDevice", systemDevices},
 };
 
 } // namespace

@@ -35,7 +35,13 @@ std::vector<Record> networkPorts(const SystemTree& tree);
 std::vector<Record> blockDevices(const SystemTree& tree);
 // LNX_PciDevice: one for each function of /sys/bus/pci/devices. Names are null without the file pci.ids.
 std::vector<Record> pciDevices(const SystemTree& tree);
-// LNX_SystemDevice: one for each device of the five collectors above that are devices, linking it with the system.
+// LNX_PhysicalMemory: one for each module in the firmware's table (/sys/firmware/dmi/tables/DMI), which only root may
+// read; empty slots are left out.
+std::vector<Record> physicalMemories(const SystemTree& tree);
+// LNX_TemperatureSensor: one for each channel tempN of /sys/class/hwmon. Reading it may ask a chip, for milliseconds.
+std::vector<Record> temperatureSensors(const SystemTree& tree);
+// LNX_SystemDevice: one for each instance of the six collectors above whose classes are devices, linking it with the
+// system.
 std::vector<Record> systemDevices(const SystemTree& tree);
 
 struct ClassEntry

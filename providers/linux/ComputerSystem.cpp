@@ -43,7 +43,7 @@ std::vector<Record> systemDevices(const SystemTree& tree)
 {
     const Reference system = computerSystems(tree).front().reference();
     std::vector<Record> links;
-    for (const auto collect : {processors, memories, networkPorts, blockDevices, pciDevices}) {
+    for (const auto collect : {processors, memories, networkPorts, blockDevices, pciDevices, temperatureSensors}) {
         for (const Record& part : collect(tree)) {
             Record link("LNX_SystemDevice");
             link.key("GroupComponent", system);

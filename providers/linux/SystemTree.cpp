@@ -8,7 +8,9 @@
 #include <bitset>
 #include <cerrno>
 #include <cstring>
+#include <filesystem>
 #include <memory>
+#include <system_error>
 
 #include <arpa/inet.h>
 #include <dirent.h>
@@ -127,7 +129,7 @@ std::vector<std::string> ipAddressesOf(const std::string& interface)
     return found;
 }
 
-std::optional<std::string> SystemTree::text(const std::string& path) const
+std::optional<std::string> SystemTree::bytes(const std::string& path) const
 {
     const Descriptor file(::open((fRoot + path).c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
     if (!file.isOpen()) {
@@ -145,7 +147,13 @@ std::optional<std::string> SystemTree::text(const std::string& path) const
         }
         content.append(buffer.data(), static_cast<std::size_t>(got));
     }
-    return std::string(trimmed(content));
+    return content;
+}
+
+std::optional<std::string> SystemTree::text(const std::string& path) const
+{
+    const std::optional<std::string> content = bytes(path);
+    return content ? std::optional<std::string>(trimmed(*content)) : std::nullopt;
 }
 
 std::optional<std::string> SystemTree::word(const std::string& path) const
@@ -197,6 +205,13 @@ std::vector<std::string> SystemTree::entries(const std::string& path) const
 bool SystemTree::exists(const std::string& path) const
 {
     return ::access((fRoot + path).c_str(), F_OK) == 0;
+}
+
+std::optional<std::string> SystemTree::linkedName(const std::string& path) const
+{
+    std::error_code error;
+    const auto target = std::filesystem::read_symlink(fRoot + path, error);
+    return error || target.filename().empty() ? std::nullopt : std::optional<std::string>(target.filename());
 }
 
 } // namespace lnx

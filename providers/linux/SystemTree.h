@@ -41,7 +41,9 @@ class SystemTree
     {
     }
 
-    // Returns: the file's text, blanks at its ends cut off, at most kMaxFileBytes of it; absent for an unreadable file.
+    // Returns: the file's bytes, at most kMaxFileBytes of them; absent for an unreadable file.
+    std::optional<std::string> bytes(const std::string& path) const;
+    // Returns: the same as text, blanks at its ends cut off.
     std::optional<std::string> text(const std::string& path) const;
     // The same; absent also for a file of blanks.
     std::optional<std::string> word(const std::string& path) const;
@@ -56,6 +58,8 @@ class SystemTree
     std::vector<std::string> entries(const std::string& path) const;
 
     bool exists(const std::string& path) const;
+    // Returns: the last name in the path that a symbolic link has; absent for everything else.
+    std::optional<std::string> linkedName(const std::string& path) const;
 
     // Returns: as permanentAddressOf.
     std::vector<std::uint8_t> permanentAddress(const std::string& interface) const

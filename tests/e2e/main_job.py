@@ -26,7 +26,8 @@ BUILD = sys.argv[1] if len(sys.argv) > 1 else None
 SOURCE = os.path.dirname(os.path.dirname(os.path.dirname(os.path.abspath(__file__))))
 COMPLETE, FAILED, USAGE, PARTIAL, INTERRUPTED = 0, 1, 2, 3, 130
 CLASSES = [f"LNX_{name}" for name in ("ComputerSystem", "OperatingSystem", "Processor", "Memory", "NetworkPort",
-                                      "BlockDevice", "PciDevice", "SystemDevice")]
+                                      "BlockDevice", "PciDevice", "PhysicalMemory", "TemperatureSensor",
+                                      "SystemDevice")]
 
 
 def instances(document, class_name):
@@ -119,7 +120,7 @@ class HealthyTree(TreeTest):
         self.tree.elsewhere = clone
         status, out, err = self.tree.run("doctor", "--stable")
         self.assertEqual((status, err), (COMPLETE, ""))
-        self.assertRegex(out, r"^Vendor linuxinventory  ok: 8 classes, \d+ instances\n$")
+        self.assertRegex(out, r"^Vendor linuxinventory  ok: 10 classes, \d+ instances\n$")
         changed = subprocess.run(["git", "-C", clone, "status", "--porcelain", "--ignored"], stdout=subprocess.PIPE, text=True,
                                  check=True)
         self.assertEqual(changed.stdout, "")
@@ -413,7 +414,7 @@ class BrokenTree(TreeTest):
         self.assertEqual(len(document["losses"]), 1, document["losses"])
         vendor, cause, *classes = document["checks"]
         self.assertEqual((vendor["subject"], vendor["ok"]), ("Vendor linuxinventory", False))
-        self.assertRegex(vendor["text"], r"^missing LNX_Memory, LNX_NetworkPort.*; \d classes, \d+ instances$")
+        self.assertRegex(vendor["text"], r"^missing LNX_Memory, LNX_NetworkPort.*; \d+ classes, \d+ instances$")
         self.assertEqual((cause["subject"], cause["ok"]), ("vendor linux", False))
         self.assertEqual([check["subject"] for check in classes], [f"class {name}" for name in document["losses"][0]["classes"]])
 

@@ -297,6 +297,93 @@ TEST(AllClasses, SurviveAMachineWithoutFiles)
     }
 }
 
+// A structure of the firmware's table: header, area of the given length, texts with their ends.
+std::string smbios(std::uint8_t type, std::uint8_t handle, std::string area, const std::vector<std::string>& texts)
+{
+    area =
+        std::string{static_cast<char>(type), static_cast<char>(area.size() + 4), static_cast<char>(handle), 0} + area;
+    for (const std::string& each : texts) {
+        area += each + '\0';
+    }
+    return area + std::string(texts.empty() ? 2 : 1, '\0');
+}
+
+// The area of a memory device up to the speed that it is set to.
+std::string module(const std::string& size, const std::string& extendedSize)
+{
+    return std::string("\x10\0\xfe\xff\x48\0\x40\0", 8) + size +
+           std::string("\x09\0\1\2\x22\0\0\xc0\x12\3\4\0\5\2", 14) + extendedSize + std::string("\xc0\x12", 2);
+}
+
+const std::string kNoExtension(4, '\0');
+const std::vector<std::string> kTexts = {"DIMM A1", "BANK 0 ", "Maker", "S\x01N", "PN-1"};
+
+TEST(PhysicalMemories, AreTheModulesOfTheFirmwaresTable)
+{
+    FixtureTree fixture;
+    fixture.file("/sys/firmware/dmi/tables/DMI",
+                 smbios(0, 1, "", {"firmware"}) +
+                     smbios(17, 2, module(std::string("\0\x40", 2), kNoExtension), kTexts) +
+                     smbios(17, 3, module(std::string("\0\0", 2), kNoExtension), kTexts) +
+                     smbios(17, 4, module("\xff\x7f", std::string("\0\0\1\0", 4)), {"DIMM A1"}) +
+                     smbios(17, 5, module(std::string("\0\x82", 2), kNoExtension), {}) + smbios(17, 6, "", {}) +
+                     smbios(127, 7, "", {}) + smbios(17, 8, module("\1\1", kNoExtension), kTexts));
+    const std::vector<Record> modules = physicalMemories(fixture.tree());
+    ASSERT_EQ(modules.size(), 4U);
+    expectProperties(modules[0],
+                     "Tag=DIMM A1|BankLabel=BANK 0|Capacity=17179869184|MemoryType=1|Technology=34|"
+                     "FormFactor=8|TotalWidth=72|DataWidth=64|MaxTransferRate=4800|ConfiguredTransferRate=4800|"
+                     "Manufacturer=Maker|SerialNumber=<null>|PartNumber=PN-1|UserTracking=<null>");
+    expectProperties(modules[1], "Tag=DIMM A1 0x0004|Capacity=68719476736|Manufacturer=<null>");
+    expectProperties(modules[2], "Tag=Memory|Capacity=524288");
+    expectProperties(modules[3], "Tag=Memory 0x0006|Capacity=<null>|MemoryType=<null>|MaxTransferRate=<null>");
+}
+
+// Every beginning of a table, and tables whose lengths and texts are wrong, end without a read outside of them.
+TEST(PhysicalMemories, OfADamagedTableAreThoseBeforeTheDamage)
+{
+    const std::string whole = smbios(17, 2, module("\1\1", kNoExtension), kTexts);
+    for (std::size_t length = 0; length < whole.size(); ++length) {
+        FixtureTree fixture;
+        fixture.file("/sys/firmware/dmi/tables/DMI", whole + whole.substr(0, length));
+        EXPECT_EQ(physicalMemories(fixture.tree()).size(), 1U) << length;
+    }
+    for (const std::string& odd : {std::string("\x11\3\1\0\0\0", 6), std::string("\x11\xff\1\0\0\0", 6),
+                                   std::string(1000, '\0'), std::string(1000, '\x11')})
+    {
+        FixtureTree fixture;
+        fixture.file("/sys/firmware/dmi/tables/DMI", odd);
+        EXPECT_TRUE(physicalMemories(fixture.tree()).empty());
+    }
+}
+
+TEST(TemperatureSensors, AreTheChannelsOfTheKernelsChips)
+{
+    FixtureTree fixture;
+    addFiles(
+        fixture, "/sys/class/hwmon/hwmon0",
+        "name=coretemp|temp1_input=41500|temp1_label=Package id 0|temp1_max=80000|temp1_crit=100000|temp2_input=-1600|"
+        "temp3_input=99999|temp3_max=80000|temp3_crit=100001|temp4_input=5000|temp4_crit_alarm=1|fan1_input=1200|"
+        "temp5_input=x|temp5_fault=1|temp6_input=65261850|temp6_max=65261850");
+    std::filesystem::create_symlink("../../../coretemp.0", fixture.root() / "sys/class/hwmon/hwmon0/device");
+    fixture.file("/sys/class/hwmon/hwmon1/temp1_input", "20000\n");
+    const std::vector<Record> sensors = temperatureSensors(fixture.tree());
+    ASSERT_EQ(sensors.size(), 7U);
+    const std::vector<std::string> expected = {
+        "DeviceID=coretemp.0/temp1|Name=coretemp Package id 0|CurrentReading=42|UpperThresholdNonCritical=80|"
+        "UpperThresholdCritical=100|UpperThresholdFatal=<null>|CurrentState=Normal|BaseUnits=2|UnitModifier=0",
+        "DeviceID=coretemp.0/temp2|Name=coretemp temp2|CurrentReading=-2|CurrentState=Normal",
+        "CurrentReading=100|CurrentState=Critical",
+        "CurrentReading=5|CurrentState=Critical",
+        "CurrentReading=<null>|CurrentState=Fault",
+        "CurrentReading=<null>|UpperThresholdNonCritical=<null>|CurrentState=Unknown",
+        "DeviceID=hwmon1/temp1|Name=hwmon1 temp1|CurrentReading=20"};
+    for (std::size_t i = 0; i < expected.size(); ++i) {
+        expectProperties(sensors[i], expected[i]);
+    }
+    EXPECT_EQ(systemDevices(fixture.tree()).size(), 7U);
+}
+
 TEST(SystemDevices, LinkTheSystemWithEveryDevice)
 {
     FixtureTree fixture;

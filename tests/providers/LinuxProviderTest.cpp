@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: MIT
+#include "providers/linux/Classes.h"
 #include "tests/pegasus/cmpi/MofServices.h"
+#include "tests/providers/FixtureTree.h"
 
 #include <Pegasus/Common/CIMProperty.h>
 #include <Pegasus/Common/Exception.h>
@@ -18,8 +20,11 @@ namespace {
 
 constexpr const char* kProvider = "LinuxInventory";
 
-const char* const kClasses[] = {"LNX_ComputerSystem", "LNX_OperatingSystem", "LNX_Processor", "LNX_Memory",
-                                "LNX_NetworkPort",    "LNX_BlockDevice",     "LNX_PciDevice", "LNX_SystemDevice"};
+const char* const kClasses[] = {"LNX_ComputerSystem",    "LNX_OperatingSystem", "LNX_Processor", "LNX_Memory",
+                                "LNX_NetworkPort",       "LNX_BlockDevice",     "LNX_PciDevice", "LNX_PhysicalMemory",
+                                "LNX_TemperatureSensor", "LNX_SystemDevice"};
+// Of which a machine may have none.
+const std::set<std::string> kOptional = {"LNX_PciDevice", "LNX_PhysicalMemory", "LNX_TemperatureSensor"};
 
 // The vendor's library in the broker, with the vendor's own MOF as schema.
 class LinuxProvider : public testing::Test
@@ -93,7 +98,7 @@ TEST_F(LinuxProvider, EveryInstanceIsFoundByItsPath)
             const CIMInstance found = module->getInstance(MofServices::request(kProvider), path, CIMPropertyList());
             EXPECT_EQ(text(found.getPath().toString()), text(path.toString()));
         }
-        EXPECT_TRUE(!paths.empty() || name == std::string("LNX_PciDevice")) << name; // a machine may have none
+        EXPECT_TRUE(!paths.empty() || kOptional.count(name) > 0) << name;
 
         std::set<std::string> names;
         module->enumerateInstanceNames(MofServices::request(kProvider), CIMName(name),
@@ -101,6 +106,40 @@ TEST_F(LinuxProvider, EveryInstanceIsFoundByItsPath)
         EXPECT_EQ(names, paths) << name;
     }
     EXPECT_TRUE(services.logged().empty()) << services.logged().front();
+}
+
+struct TypeOf
+{
+    CIMType operator()(std::uint16_t) const { return CIMTYPE_UINT16; }
+    CIMType operator()(std::uint32_t) const { return CIMTYPE_UINT32; }
+    CIMType operator()(std::int32_t) const { return CIMTYPE_SINT32; }
+    CIMType operator()(std::uint64_t) const { return CIMTYPE_UINT64; }
+    CIMType operator()(const std::string&) const { return CIMTYPE_STRING; }
+    template <typename T> CIMType operator()(const std::vector<T>& values) const { return (*this)(values.front()); }
+    template <typename T> CIMType operator()(const T&) const { return CIMTYPE_OBJECT; } // used by no class below
+};
+
+// Virtual machines have neither of the two; here they do.
+TEST_F(LinuxProvider, DeclaresWhatHardwareAloneDelivers)
+{
+    lnx::FixtureTree fixture;
+    std::string memory("\x11\x22\1\0\x10\0\xfe\xff\x48\0\x40\0\1\1\x09\0\1\1\x22\0\0\xc0\x12\1\1\1\1", 27);
+    memory += std::string("\2\0\0\0\0\xc0\x12", 7) + std::string("text\0\0", 6);
+    fixture.file("/sys/firmware/dmi/tables/DMI", memory);
+    for (const char* file : {"input", "min", "max", "lcrit", "crit", "emergency"}) {
+        fixture.file(std::string("/sys/class/hwmon/hwmon0/temp1_") + file, "1000\n");
+    }
+    for (const std::string& name : kOptional) {
+        const CIMClass declared = services.getClass(CIMNamespaceName(MofServices::kNameSpace), CIMName(name.c_str()));
+        for (const lnx::Record& record : lnx::findClass(name)->collect(fixture.tree())) {
+            EXPECT_GT(record.properties().size(), 15U);
+            for (const lnx::Property& each : record.properties()) {
+                const Uint32 at = declared.findProperty(CIMName(each.name.c_str()));
+                ASSERT_NE(at, PEG_NOT_FOUND) << each.name;
+                EXPECT_EQ(declared.getProperty(at).getType(), std::visit(TypeOf(), each.value)) << each.name;
+            }
+        }
+    }
 }
 
 TEST_F(LinuxProvider, DeclaresAndDeliversEveryCimType)

@@ -58,6 +58,16 @@ std::string DescribePort(const TInstanceRecord& port)
                    link.empty() ? "" : "link " + link});
 }
 
+std::string DescribeModule(const TInstanceRecord& module)
+{
+    const TPropertyRecord* const capacity = module.Find("Capacity");
+    const std::string size = capacity && !capacity->fValue.IsNull()
+                                 ? NKOLVRX20::Magnitude(capacity->fValue, "Bytes").value_or(capacity->fText)
+                                 : "module";
+    return Joined({size, module.TextOf({"Technology", "MemoryType"}), module.TextOf({"Manufacturer"}),
+                   module.TextOf({"PartNumber"})});
+}
+
 // Gathers the lines of each kind; the first class above a class that has a kind decides.
 class TSummary
 {
@@ -69,6 +79,8 @@ class TSummary
                 ++fProcessors[instance.TextOf({"Name", "ElementName", "OtherFamilyDescription", "DeviceID"})];
             } else if (each.IsA("CIM_Memory")) {
                 Put("Memory", SizeOf(instance));
+            } else if (each.IsA("CIM_PhysicalMemory")) {
+                ++fModules[DescribeModule(instance)];
             } else if (each.IsA("CIM_NetworkPort")) {
                 Put("Adapter", DescribePort(instance));
             } else if (each.IsA("CIM_StorageExtent") || each.IsA("CIM_MediaAccessDevice")) {
@@ -84,6 +96,9 @@ class TSummary
     {
         for (const auto& [model, count] : fProcessors) {
             Put("Processor", std::to_string(count) + " x " + model);
+        }
+        for (const auto& [module, count] : fModules) {
+            Put("Memory", std::to_string(count) + " x " + module);
         }
         std::vector<TFact> facts;
         for (const char* kind : {"System", "Processor", "Memory", "Disk", "Adapter"}) {
@@ -107,6 +122,7 @@ class TSummary
     }
 
     std::map<std::string, std::size_t> fProcessors; // by model
+    std::map<std::string, std::size_t> fModules;    // of memory, by size and kind
     std::map<std::string, std::vector<std::string>> fLines;
 };
 
