@@ -8,11 +8,14 @@ import os
 import re
 import subprocess
 import sys
+import tempfile
+import textwrap
 import unittest
 
 from fake_tree import FakeTree
 
 VRXHOST, PLUGIN = sys.argv[1:3]
+README = os.path.join(os.path.dirname(os.path.abspath(__file__)), "..", "..", "..", "README.md")
 CASES = os.path.join(os.path.dirname(os.path.abspath(__file__)), "cases")
 OBJECT = 'Fake_EveryType.ID="one \\"two\\"\x1b[31m"'
 COMMANDS = {
@@ -36,6 +39,43 @@ def normalised(text):
     text = re.sub(r"(?s)<header>.*?</table>", "<header>", text)
     text = re.sub(r"<title>.*?: ", "<title>", text)
     return re.sub(r"(Machine</th><td>)[^<]*", r"\1", text)
+
+
+def sealed(text):
+    """The record of the text, whose last line lacks its sum (host/cli/record/RecordForm.h)."""
+    record = text.rstrip("\n").encode() + b"\t"
+    value = 14695981039346656037
+    for byte in record:
+        value = (value ^ byte) * 1099511628211 % 2**64
+    return record + f"{value:016x}\n".encode()
+
+
+class Summary(unittest.TestCase):
+    """Of cases/machine: a record of a virtual machine, without the properties that a summary leaves out."""
+
+    MODULE = """instance\tLNX_PhysicalMemory.Tag="A1"
+value\tCapacity\tuint64\t17179869184
+value\tTechnology\tuint16\t34
+value\tManufacturer\tstring\tMaker
+"""
+
+    def summary(self, change):
+        with open(os.path.join(CASES, "machine"), encoding="utf-8") as file, tempfile.NamedTemporaryFile() as record:
+            record.write(sealed(change(file.read())))
+            record.flush()
+            return subprocess.run([VRXHOST, "summary", "--replay", record.name], env={"COLUMNS": "80"}, capture_output=True,
+                                  text=True, timeout=SECONDS, check=True).stdout
+
+    def test_readme_shows_what_is_printed(self):
+        with open(README, encoding="utf-8") as file:
+            shown = re.search(r"prints, on a virtual machine:\n\n((?:    .*\n)+)", file.read()).group(1)
+        self.assertEqual(textwrap.dedent(shown), self.summary(lambda text: text))
+
+    def test_memory_modules_stand_below_the_memory(self):
+        served = "serves\tLNX_PhysicalMemory\n"
+        unknown = 'instance\tLNX_PhysicalMemory.Tag="A2"\n'
+        shown = self.summary(lambda text: text.replace(f"{served}served\t0", f"{served}{2 * self.MODULE}{unknown}served\t3"))
+        self.assertRegex(shown, r"\nMemory +23\.5 GiB\n +2 x 16 GiB  DDR5  Maker\n +1 x module\nDisk ")
 
 
 class Golden(unittest.TestCase):
