@@ -34,11 +34,12 @@ template <typename T> CIMValue takeValue(PackedReader& values, bool isArray)
     return ValueAccess::make(std::move(array));
 }
 
-CIMProperty takeProperty(PackedReader& values, const CIMProperty& declared)
+// Returns: a property with its value, which follows.
+CIMProperty makeProperty(const CIMProperty& declared, PackedState state, PackedReader& values)
 {
     auto* made = new CIMPropertyRep(ObjectAccess::rep(declared));
     CIMProperty property = ObjectAccess::wrap<CIMProperty>(made);
-    if (values.takeIsNull()) {
+    if (state == PackedState::kNull) {
         return property;
     }
     visitType(made->fValue.getType(), [&](auto tag) {
@@ -62,7 +63,10 @@ void PackedInstance::unpack(CIMObjectPath& path, Array<CIMProperty>& properties)
     path = CIMObjectPath(String(), CIMNamespaceName(), fLayout->fClassName, keys);
     properties.reserveCapacity(static_cast<Uint32>(fLayout->fProperties.size()));
     for (const CIMProperty& declared : fLayout->fProperties) {
-        properties.append(takeProperty(values, declared));
+        const PackedState state = values.takeState();
+        if (state != PackedState::kAbsent) {
+            properties.append(makeProperty(declared, state, values));
+        }
     }
 }
 

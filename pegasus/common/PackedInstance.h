@@ -33,15 +33,23 @@ struct InstanceLayout
     std::vector<CIMProperty> fProperties; // of packable types, with null values and without qualifiers
 };
 
-// Writes the values of an instance one after the other: the texts of the keys, then the properties.
+// What an instance has of a property of its layout.
+enum class PackedState : Uint8
+{
+    kAbsent, // it lacks the property
+    kNull,
+    kValue
+};
+
+// Writes the values of an instance one after the other: the texts of the keys, then a state for each property. A value
+// follows its state, an array's as its size and its elements.
 class PackedWriter
 {
   public:
     void clear() { fBytes.clear(); }
     std::string_view bytes() const { return fBytes; }
 
-    // Where a property's value begins. The value follows, an array's as its size and its elements.
-    void putIsNull(bool isNull) { put<Uint8>(isNull ? 1 : 0); }
+    void putState(PackedState state) { put(static_cast<Uint8>(state)); }
     template <typename T> void put(T value)
     {
         static_assert(std::is_arithmetic_v<T>);
@@ -70,7 +78,7 @@ class PackedReader
   public:
     explicit PackedReader(const char* bytes) : fAt(bytes) {}
 
-    bool takeIsNull() { return take<Uint8>() != 0; }
+    PackedState takeState() { return static_cast<PackedState>(take<Uint8>()); }
     template <typename T> T take()
     {
         T value;

@@ -1,12 +1,15 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/wire/InstancePattern.h"
 
+#include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/Text.h"
 #include "pegasus/base/ValueText.h"
 #include "pegasus/common/CIMValueRep.h"
 #include "pegasus/wire/TextCursor.h"
 
 #include <algorithm>
+#include <unordered_map>
+#include <unordered_set>
 
 namespace Pegasus::wire {
 namespace {
@@ -44,6 +47,11 @@ std::optional<Uint32> placeOf(const Array<CIMKeyBinding>& keys, const String& na
     const CIMKeyBinding* const found = std::find_if(keys.getData(), end, isIt);
     const bool isOne = found != end && std::none_of(found + 1, end, isIt);
     return isOne ? std::optional<Uint32>(static_cast<Uint32>(found - keys.getData())) : std::nullopt;
+}
+
+std::string foldedName(const CIMConstProperty& property)
+{
+    return base::foldCase(base::utf8(property.getName()));
 }
 
 // The attribute NAME of an element that was decoded.
@@ -89,7 +97,7 @@ class InstanceMatch
   private:
     bool takeElement();
     bool takeKeys();
-    bool takeProperty(const InstancePattern::Property& property);
+    bool takeRest(const InstancePattern::Property& property);
     bool takeContent(const InstancePattern::Property& property);
     template <typename T> bool takeArray();
     template <typename T> bool takeValue();
@@ -103,9 +111,15 @@ class InstanceMatch
 
 bool InstanceMatch::takeElement()
 {
-    const auto take = [this](const InstancePattern::Property& property) { return takeProperty(property); };
-    if (!takeKeys() || !std::all_of(fPattern.fProperties.begin(), fPattern.fProperties.end(), take)) {
+    if (!takeKeys()) {
         return false;
+    }
+    for (const InstancePattern::Property& property : fPattern.fProperties) {
+        if (!fText.take(property.start)) {
+            fValues.putState(PackedState::kAbsent);
+        } else if (!takeRest(property)) {
+            return false;
+        }
     }
     if (!fText.take("</INSTANCE>")) {
         return false;
@@ -128,13 +142,11 @@ bool InstanceMatch::takeKeys()
     return fText.take(head.back());
 }
 
-bool InstanceMatch::takeProperty(const InstancePattern::Property& property)
+// After the beginning of the start tag.
+bool InstanceMatch::takeRest(const InstancePattern::Property& property)
 {
-    if (!fText.take(property.start)) {
-        return false;
-    }
     if (fText.take("/>")) {
-        fValues.putIsNull(true);
+        fValues.putState(PackedState::kNull);
     } else if (!fText.take(">") || !takeContent(property) ||
                !fText.take(property.isArray ? "</PROPERTY.ARRAY>" : "</PROPERTY>"))
     {
@@ -148,7 +160,7 @@ bool InstanceMatch::takeContent(const InstancePattern::Property& property)
 {
     fText.skipBlanks();
     const bool hasValue = fText.take(property.isArray ? "<VALUE.ARRAY>" : "<VALUE>");
-    fValues.putIsNull(!hasValue);
+    fValues.putState(hasValue ? PackedState::kValue : PackedState::kNull);
     if (!hasValue) {
         return true;
     }
@@ -284,11 +296,49 @@ std::size_t InstancePattern::bytes() const
     return sum;
 }
 
-bool InstancePattern::hasTagsOf(const InstancePattern& other) const
+bool InstancePattern::add(const InstancePattern& other)
 {
-    return fHead == other.fHead &&
-           std::equal(fProperties.begin(), fProperties.end(), other.fProperties.begin(), other.fProperties.end(),
-                      [](const Property& x, const Property& y) { return x.start == y.start; });
+    std::unordered_map<std::string_view, std::size_t> places;
+    std::unordered_set<std::string> names;
+    for (std::size_t i = 0; i < fProperties.size(); ++i) {
+        places.emplace(fProperties[i].start, i);
+        names.insert(foldedName(fLayout->fProperties[i]));
+    }
+    InstancePattern merged;
+    merged.fHead = fHead;
+    const auto layout = std::make_shared<InstanceLayout>();
+    layout->fClassName = fLayout->fClassName;
+    layout->fKeys = fLayout->fKeys;
+    const auto append = [&](const InstancePattern& from, std::size_t at) {
+        merged.fProperties.push_back(from.fProperties[at]);
+        layout->fProperties.push_back(from.fLayout->fProperties[at]);
+    };
+    std::size_t done = 0; // of our own properties
+    for (std::size_t i = 0; i < other.fProperties.size(); ++i) {
+        const auto place = places.find(other.fProperties[i].start);
+        if (place == places.end()) {
+            if (names.count(foldedName(other.fLayout->fProperties[i])) != 0) {
+                return false; // the same property with another tag
+            }
+            append(other, i);
+            continue;
+        }
+        if (place->second < done) {
+            return false; // in another order
+        }
+        while (done <= place->second) {
+            append(*this, done++);
+        }
+    }
+    while (done < fProperties.size()) {
+        append(*this, done++);
+    }
+    if (merged.bytes() > kMaxPatternBytes) {
+        return false;
+    }
+    merged.fLayout = layout;
+    *this = std::move(merged);
+    return true;
 }
 
 } // namespace Pegasus::wire

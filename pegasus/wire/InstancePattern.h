@@ -36,7 +36,10 @@ class InstancePattern
     static std::optional<InstancePattern> of(const XmlElement& element, const CIMInstance& instance,
                                              const XmlLimits& limits);
 
-    bool hasTagsOf(const InstancePattern& other) const;
+    bool hasHeadOf(const InstancePattern& other) const { return fHead == other.fHead; }
+    // Adds the properties that it lacks. Returns: false when it stays as it is, because order or names contradict, or
+    // the tags become very long. Requires: hasHeadOf(other).
+    bool add(const InstancePattern& other);
     const std::shared_ptr<const InstanceLayout>& layout() const { return fLayout; }
 
     // Reads the element that begins the text, up to its end tag, and writes its values. It refuses whatever may be an

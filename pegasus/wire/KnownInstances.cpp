@@ -11,6 +11,10 @@ namespace {
 // Answers with instances of several classes have them in turns at worst.
 constexpr std::size_t kMaxPatterns = 8;
 
+// Of so many instances that were learned, one should have been of use. An answer whose instances differ in their tags,
+// each from all others, is learned from ever less.
+constexpr std::size_t kTrials = 16;
+
 constexpr std::size_t kAllocationBytes = 16;
 // What a property counts beside its value. With its objects it takes at most five times what it counts.
 constexpr std::size_t kPropertyReserve = 32;
@@ -19,9 +23,18 @@ constexpr std::size_t kPropertyReserve = 32;
 
 void KnownInstances::learn(const XmlElement& element, const CIMInstance& instance)
 {
+    ++fLearnedInVain;
+    const bool isPowerOfTwo = (fLearnedInVain & (fLearnedInVain - 1)) == 0;
+    if (fLearnedInVain > kTrials && !isPowerOfTwo) {
+        return;
+    }
     std::optional<InstancePattern> pattern = InstancePattern::of(element, instance, fLimits);
-    const auto isSame = [&pattern](const InstancePattern& known) { return known.hasTagsOf(*pattern); };
-    if (!pattern || std::any_of(fPatterns.begin(), fPatterns.end(), isSame)) {
+    if (!pattern) {
+        return;
+    }
+    const auto known = std::find_if(fPatterns.begin(), fPatterns.end(),
+                                    [&](const InstancePattern& old) { return old.hasHeadOf(*pattern); });
+    if (known != fPatterns.end() && known->add(*pattern)) {
         return;
     }
     if (fPatterns.size() == kMaxPatterns) {
@@ -36,6 +49,7 @@ XmlOffer KnownInstances::take(std::string_view text, CIMInstance& instance)
         const XmlOffer offer = known->read(text, fLimits, fValues);
         if (offer.result == XmlOffer::Result::kTaken) {
             instance = packed(known->layout());
+            fLearnedInVain = 0;
             std::rotate(fPatterns.begin(), known, known + 1);
             return offer;
         }

@@ -33,6 +33,7 @@ class KnownInstances
     const XmlLimits fLimits;
     std::vector<InstancePattern> fPatterns;
     PackedWriter fValues;
+    std::size_t fLearnedInVain = 0; // since an instance was taken
     std::size_t fBytes = 0;
 };
 

@@ -82,6 +82,11 @@ TEST(KnownInstances, AreTakenWhereTheirTagsAreEqualAndTheirValuesAreSound)
         {"empty values", element(value(""), null, value(""), "><VALUE.ARRAY></VALUE.ARRAY></PROPERTY.ARRAY>"),
          Result::kTaken},
         {"blanks elsewhere", element("> <VALUE>b</VALUE></PROPERTY>\t", null, null, "/>\n\n"), Result::kTaken},
+        {"no property", kStart + "k" + kSecondKey + "1" + kInstance + kEnd, Result::kTaken},
+        {"missing properties", kStart + "k" + kSecondKey + "1" + kInstance + kNumber + "/>" + kEnd, Result::kTaken},
+        {"properties in another order",
+         kStart + "k" + kSecondKey + "1" + kInstance + kNumber + "/>" + kText + "/>" + kEnd, Result::kRefused},
+        {"a property twice", element("/>" + kText + "/>", "/>", "/>", "/>"), Result::kRefused},
         {"another tag", element(value("b"), value("7").insert(0, " A=\"\""), null, list), Result::kRefused},
         {"a CDATA section", elementWith("<![CDATA[b]]>"), Result::kRefused},
         {"a comment", elementWith("b<!-- c -->"), Result::kRefused},
@@ -133,6 +138,25 @@ TEST(KnownInstances, OthersAreNotLearned)
         CIMInstance instance;
         EXPECT_EQ(known.take(text, instance).result, Result::kRefused) << text;
     }
+}
+
+// Instances that have some of the properties of their class each.
+TEST(KnownInstances, PropertiesOfSeveralInstancesAreKnownTogether)
+{
+    const std::string head = kStart + "k" + kSecondKey + "1" + kInstance;
+    const std::string other = "<PROPERTY NAME=\"number\" TYPE=\"string\"/>";
+    wire::KnownInstances known;
+    decoded(head + kText + "/>" + kTime + "/>" + kEnd, &known);
+    decoded(head + kText + "/>" + kNumber + "/>" + kTime + "/>" + kList + "/>" + kEnd, &known);
+    CIMInstance instance;
+    const std::string all = elementWith("b");
+    ASSERT_EQ(known.take(all, instance).result, Result::kTaken);
+    EXPECT_TRUE(instance.identical(decoded(all)));
+    // A property with another tag makes a pattern of its own: both tags in one instance are two properties of a name.
+    decoded(head + kText + "/>" + other + kEnd, &known);
+    EXPECT_EQ(known.take(head + kText + "/>" + other + kEnd, instance).result, Result::kTaken);
+    EXPECT_EQ(known.take(all, instance).result, Result::kTaken);
+    EXPECT_EQ(known.take(head + kNumber + "/>" + other + kEnd, instance).result, Result::kRefused);
 }
 
 // A class after another one, and back; a long list of classes pushes out the oldest.
