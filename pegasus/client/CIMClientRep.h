@@ -5,8 +5,8 @@
 #include "pegasus/client/ResponseReader.h"
 #include "pegasus/client/ServerConnection.h"
 #include "pegasus/wire/HttpAnswerReader.h"
-#include "pegasus/wire/KnownInstances.h"
 #include "pegasus/wire/XmlLimits.h"
+#include "pegasus/wire/instances/KnownInstances.h"
 
 #include <Pegasus/Common/String.h>
 

@@ -2,7 +2,7 @@
 #pragma once
 
 #include "pegasus/wire/ElementDecoder.h"
-#include "pegasus/wire/KnownInstances.h"
+#include "pegasus/wire/instances/KnownInstances.h"
 
 #include <Pegasus/Common/Array.h>
 #include <Pegasus/Common/CIMInstance.h>

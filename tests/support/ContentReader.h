@@ -3,7 +3,7 @@
 
 #include "pegasus/wire/ElementDecoder.h"
 #include "pegasus/wire/ElementEncoder.h"
-#include "pegasus/wire/KnownInstances.h"
+#include "pegasus/wire/instances/KnownInstances.h"
 
 #include <string>
 #include <string_view>

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 // Instances that are known by their tags: what is taken, what is left to the decoder, and that a packed instance is an
 // instance like any other.
-#include "pegasus/wire/KnownInstances.h"
+#include "pegasus/wire/instances/KnownInstances.h"
 
 #include "pegasus/wire/ElementDecoder.h"
 

@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include "pegasus/wire/InstancePattern.h"
+#include "pegasus/wire/XmlSlicer.h"
+#include "pegasus/wire/instances/InstancePattern.h"
 
 #include <cstddef>
 #include <memory>

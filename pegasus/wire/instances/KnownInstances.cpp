@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: MIT
-#include "pegasus/wire/KnownInstances.h"
+#include "pegasus/wire/instances/KnownInstances.h"
 
 #include "pegasus/common/ObjectReps.h"
+#include "pegasus/wire/instances/InstanceMatch.h"
 
 #include <algorithm>
 
@@ -46,7 +47,8 @@ void KnownInstances::learn(const XmlElement& element, const CIMInstance& instanc
 XmlOffer KnownInstances::take(std::string_view text, CIMInstance& instance)
 {
     for (auto known = fPatterns.begin(); known != fPatterns.end(); ++known) {
-        const XmlOffer offer = known->read(text, fLimits, fValues);
+        fValues.clear();
+        const XmlOffer offer = InstanceMatch(*known, text, fLimits, fValues).result();
         if (offer.result == XmlOffer::Result::kTaken) {
             instance = packed(known->layout());
             fLearnedInVain = 0;

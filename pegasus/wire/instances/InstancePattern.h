@@ -3,34 +3,41 @@
 
 #include "pegasus/common/PackedInstance.h"
 #include "pegasus/wire/XmlElement.h"
-#include "pegasus/wire/XmlSlicer.h"
+#include "pegasus/wire/XmlLimits.h"
 
 #include <Pegasus/Common/CIMInstance.h>
 
+#include <cstddef>
 #include <memory>
 #include <optional>
 #include <string>
-#include <string_view>
 #include <vector>
 
 namespace Pegasus::wire {
 
-// The tags of a VALUE.NAMEDINSTANCE that was read and decoded. The instances of an answer differ in their values,
-// seldom in their tags: another element with the same bytes for tags needs neither reading nor checking, but for its
-// values.
+// The tags of a VALUE.NAMEDINSTANCE that was read and decoded, and of others of its class. The instances of an answer
+// differ in their values, seldom in their tags: an element with known tags needs no reading, and of all checks those of
+// its values alone.
 //
-// A pattern has keys with values and properties of packable types. It knows the elements below, with blanks between
-// them; each name with a "k" stands for known bytes:
+// A pattern has keys with values, and properties of packable types. It knows the elements below, with blanks between
+// them. "head" and "start" stand for known bytes. The properties have an order, and each of them may be missing:
 //
-//   element  = kHead (text kHead)* property+ "</INSTANCE>" "</VALUE.NAMEDINSTANCE>"
-//   property = kStart ( "/>" | ">" value? "</PROPERTY>" ) | kStart ( "/>" | ">" array? "</PROPERTY.ARRAY>" )
+//   element  = head (text head)* property* "</INSTANCE>" "</VALUE.NAMEDINSTANCE>"
+//   property = start ( "/>" | ">" value? "</PROPERTY>" ) | start ( "/>" | ">" array? "</PROPERTY.ARRAY>" )
 //   value    = "<VALUE>" text "</VALUE>"
 //   array    = "<VALUE.ARRAY>" value* "</VALUE.ARRAY>"
 //
-// Thread: any; it stays as it was made.
+// Thread: one thread at a time.
 class InstancePattern
 {
   public:
+    struct Property
+    {
+        std::string start; // its start tag without ">" or "/>"
+        CIMType type;
+        bool isArray;
+    };
+
     // Returns: nullopt for an element that has something else, or very long tags.
     // Requires: the instance was decoded from the element.
     static std::optional<InstancePattern> of(const XmlElement& element, const CIMInstance& instance,
@@ -42,27 +49,21 @@ class InstancePattern
     bool add(const InstancePattern& other);
     const std::shared_ptr<const InstanceLayout>& layout() const { return fLayout; }
 
-    // Reads the element that begins the text, up to its end tag, and writes its values. It refuses whatever may be an
-    // error: whoever reads the element then finds it, at its place.
-    XmlOffer read(std::string_view text, const XmlLimits& limits, PackedWriter& values) const;
+    // The bytes before, between and after the texts of the keys.
+    const std::vector<std::string>& head() const { return fHead; }
+    const std::vector<Property>& properties() const { return fProperties; }
 
   private:
-    friend class InstanceMatch;
-
-    struct Property
-    {
-        std::string start; // its start tag without ">" or "/>"
-        CIMType type;
-        bool isArray;
-    };
-
     bool learn(const XmlElement& element, const CIMInstance& instance, InstanceLayout& layout);
     bool learnKeys(const XmlElement& instanceName, const CIMObjectPath& path, const char*& from,
                    InstanceLayout& layout);
     bool learnProperty(const XmlElement& element, const CIMConstProperty& property, InstanceLayout& layout);
     std::size_t bytes() const;
 
-    std::vector<std::string> fHead; // the bytes before, between and after the texts of the keys
+    // Of all tags of a pattern: more than a class has, and little for a client to keep.
+    static constexpr std::size_t kMaxPatternBytes = 64UL * 1024;
+
+    std::vector<std::string> fHead;
     std::vector<Property> fProperties;
     std::shared_ptr<const InstanceLayout> fLayout;
 };

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "pegasus/wire/TextCursor.h"
+#include "pegasus/wire/instances/TextCursor.h"
 
 #include "pegasus/base/ByteBlock.h"
 #include "pegasus/base/Utf8.h"
