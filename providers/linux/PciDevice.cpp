@@ -6,11 +6,11 @@
 namespace lnx {
 namespace {
 
-constexpr char kFolder[] = "/sys/bus/pci/devices";
+constexpr char kPciFolder[] = "/sys/bus/pci/devices";
 
 Record pciDevice(const SystemTree& tree, const std::string& slot, const PciNames& names)
 {
-    const std::string directory = std::string(kFolder) + "/" + slot + "/";
+    const std::string directory = std::string(kPciFolder) + "/" + slot + "/";
     const auto number = [&](const char* file) { return narrowed<std::uint16_t>(tree.natural(directory + file)); };
     Record record = device(tree, "LNX_PciDevice", slot);
     const auto vendor = number("vendor");
@@ -40,7 +40,7 @@ Record pciDevice(const SystemTree& tree, const std::string& slot, const PciNames
 
 std::vector<Record> pciDevices(const SystemTree& tree)
 {
-    const std::vector<std::string> slots = tree.entries(kFolder);
+    const std::vector<std::string> slots = tree.entries(kPciFolder);
     std::vector<Record> result;
     if (slots.empty()) {
         return result; // the file of names is large

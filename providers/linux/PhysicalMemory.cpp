@@ -11,8 +11,7 @@ namespace lnx {
 namespace {
 
 constexpr std::uint8_t kMemoryDevice = 17;
-constexpr std::uint64_t kKilobyte = 1024;
-constexpr std::uint64_t kMegabyte = kKilobyte * kKilobyte;
+constexpr std::uint64_t kMegabyte = 1UL << 20;
 
 // Offsets in the structure of a memory device, and what its numbers mean.
 namespace offset {
@@ -64,7 +63,7 @@ std::optional<std::uint64_t> capacity(const SmbiosStructure& device)
         const auto extended = device.number<std::uint32_t>(offset::kExtendedSize);
         return extended ? std::optional<std::uint64_t>((*extended & kExtendedMask) * kMegabyte) : std::nullopt;
     }
-    return std::uint64_t(*size & ~kIsInKilobytes) * ((*size & kIsInKilobytes) != 0 ? kKilobyte : kMegabyte);
+    return std::uint64_t(*size & ~kIsInKilobytes) * ((*size & kIsInKilobytes) != 0 ? kMegabyte / 1024 : kMegabyte);
 }
 
 // Returns: the number of a field in which 0 and 65535 mean that it is unknown.

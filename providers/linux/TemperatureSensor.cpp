@@ -7,7 +7,7 @@
 namespace lnx {
 namespace {
 
-constexpr char kFolder[] = "/sys/class/hwmon/";
+constexpr char kSensorFolder[] = "/sys/class/hwmon/";
 constexpr std::string_view kInput = "_input";
 constexpr std::int64_t kThousandths = 1000; // the kernel's unit is a thousandth of a degree
 constexpr std::int64_t kLowest = -273;      // degrees; chips report nonsense for limits that they lack
@@ -58,7 +58,7 @@ std::string stateOf(const SystemTree& tree, const std::string& path, const Recor
 
 Record temperature(const SystemTree& tree, const std::string& chip, const std::string& channel)
 {
-    const std::string folder = kFolder + chip + "/";
+    const std::string folder = kSensorFolder + chip + "/";
     const std::string path = folder + channel;
     const std::string name = tree.word(folder + "name").value_or(chip);
     // Each boot numbers the chips again; the devices that they belong to keep their names.
@@ -85,7 +85,7 @@ std::vector<Record> temperatureSensors(const SystemTree& tree)
 {
     std::vector<Record> result;
     for (const std::string& chip : tree.entries("/sys/class/hwmon")) {
-        for (const std::string& file : tree.entries(kFolder + chip)) {
+        for (const std::string& file : tree.entries(kSensorFolder + chip)) {
             const std::size_t end = file.rfind(kInput);
             if (file.rfind("temp", 0) == 0 && end != std::string::npos && end + kInput.size() == file.size()) {
                 result.push_back(temperature(tree, chip, file.substr(0, end)));
