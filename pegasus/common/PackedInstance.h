@@ -46,8 +46,17 @@ enum class PackedState : Uint8
 class PackedWriter
 {
   public:
-    void clear() { fBytes.clear(); }
+    void clear()
+    {
+        fBytes.clear();
+        if (fBytes.capacity() > kKeptBytes) {
+            fBytes.shrink_to_fit();
+        }
+        fTexts = 0;
+    }
     std::string_view bytes() const { return fBytes; }
+    // Returns: the number of texts among the values.
+    std::size_t texts() const { return fTexts; }
 
     void putState(PackedState state) { put(static_cast<Uint8>(state)); }
     template <typename T> void put(T value)
@@ -59,6 +68,7 @@ class PackedWriter
     {
         put(static_cast<Uint32>(utf8.size()));
         fBytes.append(utf8);
+        ++fTexts;
     }
     // An array's size, once its elements are known. Returns: where to put it.
     std::size_t reserveSize()
@@ -69,7 +79,11 @@ class PackedWriter
     void putSize(std::size_t at, Uint32 size) { std::memcpy(fBytes.data() + at, &size, sizeof size); }
 
   private:
+    // More than usual instances have. The memory of a bigger one is given back, because writers live long.
+    static constexpr std::size_t kKeptBytes = 64UL * 1024;
+
     std::string fBytes;
+    std::size_t fTexts = 0;
 };
 
 // Reads what a PackedWriter wrote, in the same order.

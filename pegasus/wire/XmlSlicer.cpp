@@ -55,19 +55,25 @@ bool XmlSlicer::step()
     if (fNodes.depth() > 0) {
         return stepInSlice();
     }
-    if (mayOffer()) {
-        const XmlOffer offer = fHandler.offer(rest().substr(0, fNodes.limits().maxElementBytes));
-        if (offer.result == XmlOffer::Result::kTaken) {
-            consume(offer.size);
-            return true;
-        }
-        const bool isCut = offer.result == XmlOffer::Result::kCut;
-        fOffers = isCut ? fOffers + 1 : kMaxOffers;
-        if (isCut && fOffers < kMaxOffers) {
-            return false;
-        }
+    switch (mayOffer() ? offer() : XmlOffer::Result::kRefused) {
+    case XmlOffer::Result::kTaken:
+        return true;
+    case XmlOffer::Result::kCut:
+        return false;
+    default:
+        return stepInEnvelope();
     }
-    return stepInEnvelope();
+}
+
+XmlOffer::Result XmlSlicer::offer()
+{
+    const XmlOffer offer = fHandler.offer(rest().substr(0, fNodes.limits().maxElementBytes));
+    if (offer.result == XmlOffer::Result::kTaken) {
+        consume(offer.size);
+        return offer.result;
+    }
+    fOffers = offer.result == XmlOffer::Result::kCut ? fOffers + 1 : kMaxOffers;
+    return fOffers < kMaxOffers ? XmlOffer::Result::kCut : XmlOffer::Result::kRefused;
 }
 
 bool XmlSlicer::mayOffer() const

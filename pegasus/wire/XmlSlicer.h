@@ -60,6 +60,7 @@ class XmlSlicer
     bool step();
     bool stepInSlice();
     bool mayOffer() const;
+    XmlOffer::Result offer();
     bool stepInEnvelope();
     void takeDeclaration(const XmlToken& token);
     void takeInEnvelope(const XmlToken& token);

@@ -59,7 +59,7 @@ bool InstanceMatch::takeKeys()
     const std::vector<std::string>& head = fPattern.head();
     for (std::size_t i = 0; i + 1 < head.size(); ++i) {
         std::string_view text;
-        if (!fText.take(head[i]) || !fText.takeText(text, fLimits.maxTextBytes)) {
+        if (!fText.take(head[i]) || !fText.takeText(text)) {
             return false;
         }
         fValues.putText(text);
@@ -119,7 +119,7 @@ template <typename T> bool InstanceMatch::takeArray()
 template <typename T> bool InstanceMatch::takeValue()
 {
     std::string_view text;
-    return fText.takeText(text, fLimits.maxTextBytes) && putElement<T>(text) && fText.take("</VALUE>");
+    return fText.takeText(text) && putElement<T>(text) && fText.take("</VALUE>");
 }
 
 template <typename T> bool InstanceMatch::putElement(std::string_view text)

@@ -67,6 +67,9 @@ bool InstancePattern::add(const InstancePattern& other)
     while (done < fProperties.size()) {
         append(*this, done++);
     }
+    if (merged.fProperties.size() == fProperties.size()) {
+        return true; // its instances go on sharing one layout
+    }
     if (merged.bytes() > kMaxPatternBytes) {
         return false;
     }

@@ -16,9 +16,11 @@ constexpr std::size_t kMaxPatterns = 8;
 // each from all others, is learned from ever less.
 constexpr std::size_t kTrials = 16;
 
+// What an instance counts beside its values: its two pieces of memory; for each object that it gets when it is asked
+// for its properties, a part of what that takes. All objects of an instance take at most four times what it counts.
 constexpr std::size_t kAllocationBytes = 16;
-// What a property counts beside its value. With its objects it takes at most five times what it counts.
-constexpr std::size_t kPropertyReserve = 32;
+constexpr std::size_t kMemberBytes = 32;
+constexpr std::size_t kTextBytes = 16;
 
 } // namespace
 
@@ -46,6 +48,7 @@ void KnownInstances::learn(const XmlElement& element, const CIMInstance& instanc
 
 XmlOffer KnownInstances::take(std::string_view text, CIMInstance& instance)
 {
+    text = text.substr(0, fLimits.maxTextBytes); // then no text in it is longer
     for (auto known = fPatterns.begin(); known != fPatterns.end(); ++known) {
         fValues.clear();
         const XmlOffer offer = InstanceMatch(*known, text, fLimits, fValues).result();
@@ -65,8 +68,9 @@ XmlOffer KnownInstances::take(std::string_view text, CIMInstance& instance)
 CIMInstance KnownInstances::packed(const std::shared_ptr<const InstanceLayout>& layout)
 {
     const std::string_view values = fValues.bytes();
-    fBytes = sizeof(CIMInstance) + sizeof(CIMInstanceRep) + sizeof(PackedInstance) + values.size() +
-             2 * kAllocationBytes + layout->fProperties.size() * kPropertyReserve;
+    const std::size_t members = 1 + layout->fKeys.size() + layout->fProperties.size(); // the path is one
+    fBytes = sizeof(CIMInstance) + sizeof(CIMInstanceRep) + sizeof(PackedInstance) + 2 * kAllocationBytes +
+             values.size() + members * kMemberBytes + fValues.texts() * kTextBytes;
     return ObjectAccess::wrap<CIMInstance>(new CIMInstanceRep(PackedInstance::create(layout, values)));
 }
 

@@ -24,8 +24,8 @@ class KnownInstances
     // Takes an element that begins the text if a pattern fits. Returns: what became of it; a taken one is in `instance`
     // and in bytes().
     XmlOffer take(std::string_view text, CIMInstance& instance);
-    // Returns: about how many bytes of memory the last taken instance has, the allocator's share included, with some
-    // for what it gets when its properties are asked for.
+    // Returns: what the last taken instance counts: the bytes of memory that it has, the allocator's share included,
+    // and some for the objects that it may get.
     std::size_t bytes() const { return fBytes; }
 
   private:

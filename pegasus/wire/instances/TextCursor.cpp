@@ -36,7 +36,7 @@ bool isDecodable(std::string_view utf8)
 
 } // namespace
 
-bool TextCursor::takeText(std::string_view& text, std::size_t maxBytes)
+bool TextCursor::takeText(std::string_view& text)
 {
     const char* const special = findSpecial(fAt, fEnd);
     const void* const found = std::memchr(special, '<', static_cast<std::size_t>(fEnd - special));
@@ -45,9 +45,8 @@ bool TextCursor::takeText(std::string_view& text, std::size_t maxBytes)
         return false;
     }
     const char* const end = static_cast<const char*>(found);
-    const auto size = static_cast<std::size_t>(end - fAt);
-    text = trimBlanks({fAt, size});
-    if (size > maxBytes || (special != end && !resolve(text))) {
+    text = trimBlanks({fAt, static_cast<std::size_t>(end - fAt)});
+    if (special != end && !resolve(text)) {
         return false;
     }
     fAt = end;

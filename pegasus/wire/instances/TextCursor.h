@@ -43,9 +43,9 @@ class TextCursor
         }
     }
 
-    // Character data of at most so many bytes up to the next "<", as XmlElement::text() gives it. It refuses what would
-    // fail there, and what is not UTF-8. The view is valid until the next call.
-    bool takeText(std::string_view& text, std::size_t maxBytes);
+    // Character data up to the next "<", as XmlElement::text() gives it. It refuses what would fail there, and what is
+    // not UTF-8. The view is valid until the next call.
+    bool takeText(std::string_view& text);
 
   private:
     bool resolve(std::string_view& text);

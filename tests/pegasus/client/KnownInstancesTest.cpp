@@ -9,6 +9,8 @@
 
 #include <thread>
 
+#include <malloc.h>
+
 using namespace Pegasus;
 using Result = wire::XmlOffer::Result;
 
@@ -179,6 +181,60 @@ TEST(KnownInstances, SeveralClassesAreKnownAtOnce)
         results += known.take(ofClass(number), instance).result == Result::kTaken ? 't' : 'r';
     }
     EXPECT_EQ(results, "ttttrr");
+}
+
+// What docs/limits.md promises of maxDecodedBytes. A sanitizer's allocator reports nothing, and the test passes.
+TEST(KnownInstances, CountTheMemoryThatTheyHaveAndAFourthOfWhatTheyMayGet)
+{
+    const auto repeated = [](const std::string& text, int count) {
+        std::string all;
+        for (int i = 0; i < count; ++i) {
+            all += text;
+        }
+        return all;
+    };
+    const auto properties = [](const std::string& type, const std::string& content) {
+        std::string all;
+        for (int i = 0; i < 50; ++i) {
+            all += "<PROPERTY NAME=\"P" + std::to_string(i) + "\" TYPE=\"" + type + "\">" + content + "</PROPERTY>";
+        }
+        return all;
+    };
+    const auto array = [&](const std::string& type, const std::string& content) {
+        return "<PROPERTY.ARRAY NAME=\"A\" TYPE=\"" + type + "\"><VALUE.ARRAY>" + repeated(content, 1000) +
+               "</VALUE.ARRAY></PROPERTY.ARRAY>";
+    };
+    const std::string texts[] = {
+        properties("string", ""),
+        properties("string", "<VALUE></VALUE>"),
+        properties("string", "<VALUE>a</VALUE>"),
+        properties("string", "<VALUE>" + repeated("long ", 100) + "</VALUE>"),
+        properties("boolean", "<VALUE>TRUE</VALUE>"),
+        properties("datetime", "<VALUE>20200102030405.678901+060</VALUE>"),
+        array("string", "<VALUE></VALUE>"),
+        array("string", "<VALUE>a</VALUE>"),
+        array("uint8", "<VALUE>1</VALUE>"),
+        array("datetime", "<VALUE>20200102030405.678901+060</VALUE>"),
+        array("datetime", "<VALUE></VALUE>"),
+    };
+    for (const std::string& text : texts) {
+        const std::string whole = kStart + "k" + kSecondKey + "1" + kInstance + text + kEnd;
+        wire::KnownInstances known;
+        decoded(whole, &known);
+        CIMInstance first;
+        known.take(whole, first); // so that only the instances take memory below
+        std::vector<CIMInstance> instances(20);
+        const std::size_t before = ::mallinfo2().uordblks;
+        for (CIMInstance& instance : instances) {
+            ASSERT_EQ(known.take(whole, instance).result, Result::kTaken) << text;
+        }
+        const std::size_t counted = instances.size() * known.bytes();
+        EXPECT_LE(::mallinfo2().uordblks - before, counted) << text;
+        for (const CIMInstance& instance : instances) {
+            static_cast<void>(instance.getPropertyCount());
+        }
+        EXPECT_LE(::mallinfo2().uordblks - before, 4 * counted) << text;
+    }
 }
 
 // Handles share what they stand for, and a clone does not.
