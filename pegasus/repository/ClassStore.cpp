@@ -66,7 +66,8 @@ void ClassStore::keepText(NamespaceId nameSpace, const CIMName& name, const Clas
 bool ClassStore::has(NamespaceId nameSpace, const CIMName& name)
 {
     const Lock lock(fMutex);
-    return fStorage.findSuperClass(nameSpace, base::utf8(name)).has_value();
+    return !fCache.find(nameSpace, nameKey(name)).isUninitialized() ||
+           fStorage.findSuperClass(nameSpace, base::utf8(name)).has_value();
 }
 
 std::vector<CIMName> ClassStore::listNames(NamespaceId nameSpace, const CIMName& name, bool isDeep)

@@ -122,6 +122,11 @@ CIMConstClass Repository::getClass(const CIMNamespaceName& nameSpace, const CIMN
     return filterClass(fState->classes.existing(fState->idOf(nameSpace), className), options);
 }
 
+CIMConstClass Repository::getWholeClass(const CIMNamespaceName& nameSpace, const CIMName& className) const
+{
+    return fState->classes.existing(fState->idOf(nameSpace), className);
+}
+
 std::shared_ptr<const std::string> Repository::getClassText(const CIMNamespaceName& nameSpace, const CIMName& className,
                                                             const ClassOptions& options) const
 {

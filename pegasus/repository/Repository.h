@@ -93,7 +93,9 @@ class Repository
     // Throws: CIM_ERR_NOT_FOUND.
     CIMConstClass getClass(const CIMNamespaceName& nameSpace, const CIMName& className,
                            const ClassOptions& options) const;
-    // The same as a CLASS element (DSP0201). Forms that clients ask for repeatedly are encoded once.
+    // The class with everything that it inherits, as the cache has it: no part is copied.
+    CIMConstClass getWholeClass(const CIMNamespaceName& nameSpace, const CIMName& className) const;
+    // getClass() as a CLASS element (DSP0201). Forms that clients ask for repeatedly are encoded once.
     std::shared_ptr<const std::string> getClassText(const CIMNamespaceName& nameSpace, const CIMName& className,
                                                     const ClassOptions& options) const;
     bool hasClass(const CIMNamespaceName& nameSpace, const CIMName& className) const;

@@ -9,6 +9,9 @@ namespace Pegasus::server {
 
 namespace {
 
+// Holds most answers that are one object: their text is not moved while it grows.
+constexpr std::size_t kUsualBytes = 16u << 10;
+
 iovec part(std::string_view text)
 {
     return {const_cast<char*>(text.data()), text.size()};
@@ -53,6 +56,9 @@ std::string AnswerStream::makeHead(std::size_t length) const
 
 void AnswerStream::write(std::string_view bytes)
 {
+    if (fPending.empty()) {
+        fPending.reserve(kUsualBytes);
+    }
     if (!isChunked()) {
         if (fPending.size() + bytes.size() > fOptions.maxBufferedBytes) {
             throw AnswerTooLarge("The answer is larger than maxBufferedAnswerBytes; ask for it with TE: trailers");

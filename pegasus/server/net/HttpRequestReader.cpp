@@ -22,6 +22,7 @@ struct HttpRequestParser::Impl
 namespace {
 
 constexpr std::size_t kReadBytes = 64u << 10;
+constexpr std::size_t kUsualHeaderCount = 16;
 
 [[noreturn]] void failForParser(const boost::system::error_code& error)
 {
@@ -153,6 +154,7 @@ HttpRequest HttpRequestParser::take()
     HttpRequest request;
     request.method = std::string(message.method_string());
     request.isVersion10 = message.version() < 11;
+    request.headers.reserve(kUsualHeaderCount);
     for (const auto& field : message) {
         request.headers.emplace_back(std::string(field.name_string()), std::string(field.value()));
     }

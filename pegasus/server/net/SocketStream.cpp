@@ -53,15 +53,16 @@ void advance(iovec*& parts, std::size_t& count, std::size_t sent)
 std::size_t SocketStream::readSome(char* data, std::size_t size, const base::Deadline& deadline)
 {
     for (;;) {
+        // A peer that sent less than there was room for is waited for before it is read from.
+        if (fIsDrained && !waitFor(fSocket.get(), POLLIN, deadline)) {
+            throw SocketTimeout("the peer sends nothing");
+        }
         const ssize_t n = ::recv(fSocket.get(), data, size, MSG_DONTWAIT);
+        fIsDrained = n < static_cast<ssize_t>(size);
         if (n >= 0) {
             return static_cast<std::size_t>(n);
         }
-        if (errno == EAGAIN) {
-            if (!waitFor(fSocket.get(), POLLIN, deadline)) {
-                throw SocketTimeout("the peer sends nothing");
-            }
-        } else if (errno != EINTR) {
+        if (errno != EAGAIN && errno != EINTR) {
             fail("cannot read from the connection");
         }
     }

@@ -50,6 +50,7 @@ class SocketStream
 
   private:
     base::Descriptor fSocket;
+    bool fIsDrained = true; // whether the last read took all that had arrived
 };
 
 } // namespace Pegasus::server

@@ -37,10 +37,7 @@ bool areAllTyped(const Array<CIMParamValue>& parameters)
 // Throws: CIM_ERR_NOT_FOUND when the class is absent, CIM_ERR_INVALID_NAMESPACE.
 MethodDeclaration declarationOf(ServerCore& core, const CimRequest& request)
 {
-    repository::ClassOptions methodsOnly;
-    methodsOnly.localOnly = false;
-    methodsOnly.propertyList = CIMPropertyList(Array<CIMName>());
-    return {core.repository.getClass(request.nameSpace, request.object.getClassName(), methodsOnly),
+    return {core.repository.getWholeClass(request.nameSpace, request.object.getClassName()),
             CIMName(String(request.method.c_str()))};
 }
 
