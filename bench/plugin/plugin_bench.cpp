@@ -6,12 +6,14 @@
 // Opens the namespace, prints "open", and carries out one command a line of standard input, each answered with the
 // count and the seconds it took:
 //   instances CLASS            one enumeration, each instance offered to a visitor
+//   values CLASS               the same, the visitor reads every property's value
 //   classes NAMESPACE FILE     the classes named in the file, a name a line, through ICIMNamespace::GetClass
 #include "host/cli/TPrivateServer.h"
 #include "host/cli/TSession.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMInstance.h>
+#include <host/ICIMProperty.h>
 #include <host/TCIMValue.h>
 #include <host/TRootObject.h>
 
@@ -35,12 +37,26 @@ class TQuietLog : public ILogger
     void Log(EVRXLogSeverity, const std::string&) override {}
 };
 
-int CountInstances(ICIMNamespace& nameSpace, const std::string& className)
+// Returns: the values that are set.
+int CountValues(const ICIMInstance& instance)
+{
+    int count = 0;
+    instance.EnumerateProperties(
+        [&](boost::shared_ptr<ICIMProperty> property) { return count += !property->GetValue({}).IsNull(), true; }, {});
+    return count;
+}
+
+int CountInstances(ICIMNamespace& nameSpace, const std::string& className, bool reads)
 {
     const boost::shared_ptr<ICIMClass> source = nameSpace.GetClass(className, {});
     int count = 0;
     if (source) {
-        source->EnumerateInstances([&](boost::shared_ptr<ICIMInstance>) { return ++count, true; }, false, {});
+        source->EnumerateInstances(
+            [&](boost::shared_ptr<ICIMInstance> instance) {
+                count += !reads || CountValues(*instance) > 0;
+                return true;
+            },
+            false, {});
     }
     return count;
 }
@@ -74,7 +90,8 @@ void Serve(ICIMNamespace& nameSpace)
         std::string second;
         words >> command >> first >> second;
         Answer([&] {
-            return command == "classes" ? CountClasses(nameSpace, first, second) : CountInstances(nameSpace, first);
+            return command == "classes" ? CountClasses(nameSpace, first, second)
+                                        : CountInstances(nameSpace, first, command == "values");
         });
     }
 }

@@ -16,22 +16,22 @@ bool IsElementCode(TCIMValue::TCIMType type)
 } // namespace
 
 TCIMValue::TCIMValue() = default;
-TCIMValue::TCIMValue(bool value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
-TCIMValue::TCIMValue(unsigned char value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
-TCIMValue::TCIMValue(signed char value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
-TCIMValue::TCIMValue(unsigned short value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
-TCIMValue::TCIMValue(short value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
-TCIMValue::TCIMValue(unsigned int value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
-TCIMValue::TCIMValue(int value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
-TCIMValue::TCIMValue(unsigned long value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
-TCIMValue::TCIMValue(long value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
-TCIMValue::TCIMValue(float value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
-TCIMValue::TCIMValue(double value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
-TCIMValue::TCIMValue(const std::string& value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
+TCIMValue::TCIMValue(bool value) : fRep(TRep::Of(value)) {}
+TCIMValue::TCIMValue(unsigned char value) : fRep(TRep::Of(value)) {}
+TCIMValue::TCIMValue(signed char value) : fRep(TRep::Of(value)) {}
+TCIMValue::TCIMValue(unsigned short value) : fRep(TRep::Of(value)) {}
+TCIMValue::TCIMValue(short value) : fRep(TRep::Of(value)) {}
+TCIMValue::TCIMValue(unsigned int value) : fRep(TRep::Of(value)) {}
+TCIMValue::TCIMValue(int value) : fRep(TRep::Of(value)) {}
+TCIMValue::TCIMValue(unsigned long value) : fRep(TRep::Of(value)) {}
+TCIMValue::TCIMValue(long value) : fRep(TRep::Of(value)) {}
+TCIMValue::TCIMValue(float value) : fRep(TRep::Of(value)) {}
+TCIMValue::TCIMValue(double value) : fRep(TRep::Of(value)) {}
+TCIMValue::TCIMValue(const std::string& value) : fRep(TRep::Of(value)) {}
 TCIMValue::TCIMValue(const char* value) : TCIMValue(std::string(value)) {}
-TCIMValue::TCIMValue(const TCIMChar16& value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
-TCIMValue::TCIMValue(const TCIMDateTime& value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
-TCIMValue::TCIMValue(const TCIMReference& value) : fRep(boost::make_shared<TRep>(TRep::TData(value))) {}
+TCIMValue::TCIMValue(const TCIMChar16& value) : fRep(TRep::Of(value)) {}
+TCIMValue::TCIMValue(const TCIMDateTime& value) : fRep(TRep::Of(value)) {}
+TCIMValue::TCIMValue(const TCIMReference& value) : fRep(TRep::Of(value)) {}
 
 TCIMValue::TCIMValue(TCIMType type, unsigned int)
 {
@@ -58,7 +58,8 @@ TCIMValue::TCIMValue(TCIMType elementType, unsigned int, const std::vector<TCIMV
             ThrowTypeMismatch();
         }
     }
-    fRep = boost::make_shared<TRep>(elementType, TRep::TData(elements));
+    fRep = TRep::Of(elements);
+    fRep->fElementType = elementType;
 }
 
 TCIMValue::TCIMValue(const TCIMValue& other)

@@ -4,8 +4,10 @@
 #include <host/TCIMValue.h>
 #include <host/TVRXException.h>
 
+#include <boost/make_shared.hpp>
 #include <boost/weak_ptr.hpp>
 
+#include <utility>
 #include <variant>
 
 namespace NKOLVRX20 {
@@ -26,7 +28,15 @@ struct TCIMValue::TRep
                                TCIMReference, std::vector<TCIMValue>>;
 
     TRep(TCIMType elementType, TData data) : fElementType(elementType), fData(std::move(data)) {}
-    explicit TRep(TData data) : fElementType(TCIMType::ECIMType(data.index())), fData(std::move(data)) {}
+    // A scalar's. An array's maker sets the type of its elements.
+    template <typename T> TRep(std::in_place_type_t<T> alternative, T held) : fData(alternative, std::move(held))
+    {
+        fElementType = TCIMType::ECIMType(fData.index());
+    }
+    template <typename T> static boost::shared_ptr<TRep> Of(T held)
+    {
+        return boost::make_shared<TRep>(std::in_place_type<T>, std::move(held));
+    }
 
     bool IsNull() const { return fData.index() == 0; }
     bool IsArray() const { return std::holds_alternative<std::vector<TCIMValue>>(fData); }

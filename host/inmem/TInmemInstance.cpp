@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
+#include "host/inmem/InstanceValues.h"
 #include "host/inmem/ObjectNames.h"
-#include "host/inmem/TInmemProperty.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMProperty.h>
@@ -8,24 +8,11 @@
 #include <host/TInmemInstance.h>
 #include <host/TVRXException.h>
 
-#include <boost/make_shared.hpp>
+#include <map>
+#include <utility>
 
 namespace NKOLVRX20 {
 namespace {
-
-// Returns: null for a property that the class lacks: it is kept and shown with its plain text.
-boost::shared_ptr<ICIMPropertyDecl> FindDeclaration(const boost::shared_ptr<ICIMClass>& instanceClass,
-                                                    const std::string& name, const TCIMContext& context)
-{
-    try {
-        return instanceClass ? instanceClass->GetPropertyDecl(name, context) : nullptr;
-    } catch (const TVRXException& e) {
-        if (e.GetStatusCode() != TVRXStatusCode::kUnknownProperty) {
-            throw;
-        }
-        return nullptr;
-    }
-}
 
 std::string ClassNameOf(const ICIMInstance& instance)
 {
@@ -67,7 +54,7 @@ std::map<std::string, TCIMValue> ValuesOf(const ICIMInstance& instance)
 } // namespace
 
 TInmemInstance::TInmemInstance(boost::shared_ptr<ICIMClass> instanceClass, TCIMContext)
-    : fClass(std::move(instanceClass))
+    : fClass(std::move(instanceClass)), fValues(std::make_unique<TInmemValues>(fClass.get()))
 {
 }
 
@@ -105,9 +92,8 @@ TCIMReference TInmemInstance::GetReference(TCIMContext context) const
     std::vector<TKeyBinding> keys;
     fClass->EnumerateKeyNames(
         [&](const std::string* name) {
-            const auto found = fProperties.find(NormalizedName(*name));
-            if (found != fProperties.end()) {
-                keys.emplace_back(*name, KeyValue(*found->second));
+            if (const auto property = fValues->Find(*name)) {
+                keys.emplace_back(*name, KeyValue(*property));
             }
             return true;
         },
@@ -139,29 +125,22 @@ void TInmemInstance::EnumerateAssociationInstances(TInstanceVisitor, const std::
 
 boost::shared_ptr<ICIMProperty> TInmemInstance::GetProperty(const std::string& name, TCIMContext) const
 {
-    const auto found = fProperties.find(NormalizedName(name));
-    if (found == fProperties.end()) {
+    auto property = fValues->Find(name);
+    if (!property) {
         throw TVRXException(TVRXStatusCode::kUnknownProperty);
     }
-    return found->second;
+    return property;
 }
 
 void TInmemInstance::SetPropertyValue(const std::string& name, TCIMValue value, TCIMContext context)
 {
-    const std::string key = NormalizedName(name);
-    const auto found = fProperties.find(key);
-    if (found != fProperties.end()) {
-        return found->second->SetValue(std::move(value), context);
-    }
-    fProperties[key] =
-        boost::make_shared<TInmemProperty>(name, std::move(value), FindDeclaration(fClass, name, context), fClass);
+    fValues->Set(name, std::move(value), fClass, context);
 }
 
 void TInmemInstance::EnumerateProperties(TPropertyVisitor visitor, TCIMContext) const
 {
-    const auto properties = fProperties; // the visitor may set values
-    for (const auto& property : properties) {
-        if (!visitor(property.second)) {
+    for (const auto& property : fValues->All()) { // a copy: the visitor may set values
+        if (!visitor(property)) {
             return;
         }
     }
@@ -188,8 +167,9 @@ ICIMInstance& TInmemInstance::operator=(const ICIMInstance& other)
     if (this == &other) {
         return *this;
     }
+    fValues.reset(); // before the class, which it relies on
     fClass = other.GetClass(TCIMContext());
-    fProperties.clear();
+    fValues = std::make_unique<TInmemValues>(fClass.get());
     for (const auto& value : ValuesOf(other)) {
         SetPropertyValue(value.first, value.second, TCIMContext());
     }

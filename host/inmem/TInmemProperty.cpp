@@ -6,19 +6,18 @@
 #include <host/ICIMClass.h>
 #include <host/ICIMPropertyDecl.h>
 
+#include <utility>
+
 namespace NKOLVRX20 {
 
-TInmemProperty::TInmemProperty(const std::string& name, TCIMValue value,
-                               const boost::shared_ptr<ICIMPropertyDecl>& declaration,
-                               const boost::shared_ptr<ICIMClass>& instanceClass)
-    : fName(declaration ? declaration->GetName(TCIMContext()) : name), fValue(std::move(value)),
-      fDeclaration(declaration), fClass(instanceClass)
+TInmemProperty::TInmemProperty(std::shared_ptr<const TInmemMember> member, TCIMValue value)
+    : fMember(std::move(member)), fValue(std::move(value))
 {
 }
 
 std::string TInmemProperty::GetName() const
 {
-    return fName;
+    return fMember->fName;
 }
 
 std::string TInmemProperty::NameOf(const ICIMProperty& property)
@@ -36,7 +35,7 @@ TCIMValue::TCIMType TInmemProperty::GetType(TCIMContext context) const
     if (fValue.IsArray()) {
         return TCIMValue::TCIMType::ECIMType(fValue.GetType() + TCIMValue::TCIMType::kArrayOffset);
     }
-    const auto declaration = fDeclaration.lock();
+    const auto declaration = fMember->fDeclaration.lock();
     const bool typeless = fValue.GetType() == TCIMValue::TCIMType::kNone;
     return typeless && declaration ? declaration->GetType(context) : fValue.GetType();
 }
@@ -48,7 +47,7 @@ bool TInmemProperty::IsArray(TCIMContext context) const
 
 bool TInmemProperty::IsDefaultValue(TCIMContext context) const
 {
-    const auto declaration = fDeclaration.lock();
+    const auto declaration = fMember->fDeclaration.lock();
     return declaration && declaration->GetDefaultValue(context) == fValue;
 }
 
@@ -64,14 +63,14 @@ void TInmemProperty::SetValue(TCIMValue value, TCIMContext)
 
 bool TInmemProperty::GetPropagated(TCIMContext context) const
 {
-    const auto declaration = fDeclaration.lock();
+    const auto declaration = fMember->fDeclaration.lock();
     const auto owner = declaration ? declaration->GetClass(context) : boost::shared_ptr<ICIMClass>();
-    return owner && owner != fClass.lock();
+    return owner && owner != fMember->fClass.lock();
 }
 
 boost::shared_ptr<ICIMPropertyDecl> TInmemProperty::GetDeclaration(TCIMContext) const
 {
-    return fDeclaration.lock();
+    return fMember->fDeclaration.lock();
 }
 
 bool TInmemProperty::operator==(const ICIMProperty& other) const
@@ -112,17 +111,17 @@ bool TInmemProperty::IsPrevValueDifferent() const
 
 std::string TInmemProperty::ToString() const
 {
-    return PropertyText(fValue, fDeclaration.lock());
+    return PropertyText(fValue, fMember->fDeclaration.lock());
 }
 
 std::string TInmemProperty::PrevValueToString() const
 {
-    return PropertyText(fPrevValue, fDeclaration.lock());
+    return PropertyText(fPrevValue, fMember->fDeclaration.lock());
 }
 
 std::vector<std::string> TInmemProperty::ToStringVector() const
 {
-    return PropertyTexts(fValue, fDeclaration.lock());
+    return PropertyTexts(fValue, fMember->fDeclaration.lock());
 }
 
 } // namespace NKOLVRX20

@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <host/ICIMProperty.h>
+#include "host/inmem/InstanceLayout.h"
 
-#include <boost/weak_ptr.hpp>
+#include <host/ICIMProperty.h>
 
 namespace NKOLVRX20 {
 
@@ -12,8 +12,7 @@ namespace NKOLVRX20 {
 class TInmemProperty : public ICIMProperty
 {
   public:
-    TInmemProperty(const std::string& name, TCIMValue value, const boost::shared_ptr<ICIMPropertyDecl>& declaration,
-                   const boost::shared_ptr<ICIMClass>& instanceClass);
+    TInmemProperty(std::shared_ptr<const TInmemMember> member, TCIMValue value);
 
     // Returns: the declaration's name, or the name that the instance was given where the class lacks the property.
     std::string GetName() const;
@@ -43,11 +42,9 @@ class TInmemProperty : public ICIMProperty
     std::vector<std::string> ToStringVector() const override;
 
   private:
-    std::string fName;
+    std::shared_ptr<const TInmemMember> fMember;
     TCIMValue fValue;
     TCIMValue fPrevValue;
-    boost::weak_ptr<ICIMPropertyDecl> fDeclaration;
-    boost::weak_ptr<ICIMClass> fClass;
 };
 
 } // namespace NKOLVRX20

@@ -6,9 +6,11 @@
 #include <boost/enable_shared_from_this.hpp>
 #include <boost/shared_ptr.hpp>
 
-#include <map>
+#include <memory>
 
 namespace NKOLVRX20 {
+
+class TInmemValues;
 
 // An instance whose property values are kept in memory; the base of the instances that a plug-in serves. It implements
 // every slot of ICIMInstance, whose comments hold; what is said there of the host's part is this class.
@@ -63,7 +65,7 @@ class TInmemInstance : public ICIMInstance, public boost::enable_shared_from_thi
 
   private:
     boost::shared_ptr<ICIMClass> fClass;
-    std::map<std::string, boost::shared_ptr<ICIMProperty>> fProperties; // by normalised name
+    std::unique_ptr<TInmemValues> fValues; // relies on the class
 };
 
 } // namespace NKOLVRX20

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "host/inmem/TInmemClass.h"
 #include "host/inmem/TInmemNamespace.h"
+#include "host/inmem/TInmemProperty.h"
 
 #include <host/ICIMProperty.h>
 #include <host/TInmemInstance.h>
@@ -9,6 +10,7 @@
 #include <gtest/gtest.h>
 
 #include <climits>
+#include <map>
 
 namespace NKOLVRX20 {
 namespace {
@@ -58,6 +60,68 @@ TEST(TInmemInstance, UnknownPropertiesAreKeptAndMissingOnesThrow)
     EXPECT_THROW(fan->GetProperty("Speed", TCIMContext()), TVRXException);
     EXPECT_THROW(fan->SetPropertyValue("1st", TCIMValue(1), TCIMContext()), TVRXException);
     EXPECT_THROW(fan->GetProperty("1st", TCIMContext()), TVRXException) << "a refused name left a property";
+}
+
+using TTexts = std::map<std::string, std::string>; // value by name
+
+TTexts TextsOf(const ICIMInstance& instance)
+{
+    TTexts texts;
+    instance.EnumerateProperties(
+        [&](boost::shared_ptr<ICIMProperty> each) {
+            texts[TInmemProperty::NameOf(*each)] = each->ToString();
+            return true;
+        },
+        TCIMContext());
+    return texts;
+}
+
+// Whatever the instances of a class share, each has the names that it was given, in any order, and its own values.
+TEST(TInmemInstance, InstancesOfAClassDisturbNoOther)
+{
+    const struct
+    {
+        std::vector<std::string> fGiven;
+        TTexts fExpected;
+    } rows[] = {
+        {{"systemname", "deviceid"}, {{"SystemName", "0"}, {"DeviceID", "1"}}},
+        {{"deviceid", "systemname"}, {{"SystemName", "1"}, {"DeviceID", "0"}}},
+        {{"deviceid", "DeviceID"}, {{"DeviceID", "1"}}},
+        {{"Other", "speed", "systemname"}, {{"Other", "0"}, {"Speed", "1"}, {"SystemName", "2"}}},
+        {{"systemname", "other"}, {{"SystemName", "0"}, {"other", "1"}}},
+        {{"Other"}, {{"Other", "0"}}},
+        {{}, {}},
+    };
+    const auto fan = FanClass();
+    std::vector<boost::shared_ptr<TInmemInstance>> instances;
+    for (const auto& row : rows) {
+        instances.push_back(boost::make_shared<TInmemInstance>(fan, TCIMContext()));
+        int value = 0;
+        for (const std::string& name : row.fGiven) {
+            instances.back()->SetPropertyValue(name, TCIMValue(value++), TCIMContext());
+        }
+    }
+    for (std::size_t i = 0; i < instances.size(); ++i) {
+        EXPECT_EQ(TextsOf(*instances[i]), rows[i].fExpected) << "instance " << i;
+    }
+}
+
+TEST(TInmemInstance, ADeclarationHoldsFromTheNextInstanceOn)
+{
+    const auto fan = FanClass();
+    std::vector<boost::shared_ptr<TInmemInstance>> instances;
+    const auto add = [&] {
+        instances.push_back(boost::make_shared<TInmemInstance>(fan, TCIMContext()));
+        instances.back()->SetPropertyValue("late", TCIMValue(1), TCIMContext());
+    };
+    add();
+    const auto declaration = fan->Declare("LATE", TType::kSint32);
+    add();
+    EXPECT_FALSE(instances[0]->GetProperty("late", TCIMContext())->GetDeclaration(TCIMContext()));
+    EXPECT_EQ(instances[1]->GetProperty("late", TCIMContext())->GetDeclaration(TCIMContext()), declaration);
+    *static_cast<ICIMInstance*>(instances[1].get()) = *boost::make_shared<TInmemInstance>(nullptr, TCIMContext());
+    EXPECT_EQ(TextsOf(*instances[1]), TTexts());
+    EXPECT_EQ(TextsOf(*instances[0]), (TTexts{{"late", "1"}}));
 }
 
 TEST(TInmemInstance, PathHoldsTheKeysInTheOrderOfTheClass)
