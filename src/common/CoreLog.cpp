@@ -2,18 +2,11 @@
 #include "src/common/CoreLog.h"
 
 #include <Pegasus/Common/Exception.h>
-#include <Pegasus/Common/String.h>
 #include <host/TRootObject.h>
 
 #include <exception>
 
 namespace NKOLVRX20 {
-
-std::string ToStdString(const Pegasus::String& text)
-{
-    const Pegasus::CString bytes = text.getCString();
-    return static_cast<const char*>(bytes);
-}
 
 void WriteCoreLog(ILogger::EVRXLogSeverity severity, const std::string& text)
 {

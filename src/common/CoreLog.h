@@ -2,6 +2,8 @@
 // Entries of the host's core log, put together with a string stream in the "C" locale.
 #pragma once
 
+#include "src/common/Text.h"
+
 #include <host/ILogger.h>
 #include <host/TVRXException.h>
 
@@ -9,15 +11,7 @@
 #include <sstream>
 #include <string>
 
-namespace Pegasus {
-class String;
-}
-
 namespace NKOLVRX20 {
-
-// Returns: the text in UTF-8. (What the stream operator of Pegasus::String writes depends on how OpenPegasus was
-// built.)
-std::string ToStdString(const Pegasus::String& text);
 
 void WriteCoreLog(ILogger::EVRXLogSeverity severity, const std::string& text);
 

@@ -2,7 +2,7 @@
 #include "src/instance/ValueConversion.h"
 
 #include "src/common/Constants.h"
-#include "src/common/CoreLog.h"
+#include "src/common/Text.h"
 
 #include <host/ICIMClass.h>
 #include <host/ICIMNamespace.h>
@@ -39,9 +39,13 @@ TCIMValue ToHost(const Pegasus::CIMDateTime& element)
 }
 
 // For the elements of arrays. The stream operator writes UTF-8 in this client library; in OpenPegasus its encoding
-// depends on how the library was built, and hosts rely on that text. A scalar is UTF-8 with either.
+// depends on how the library was built, and hosts rely on that text. A scalar is UTF-8 with either, and ASCII is the
+// same with all.
 TCIMValue ToHost(const Pegasus::String& element)
 {
+    if (auto ascii = AsciiText(element)) {
+        return TCIMValue(*ascii);
+    }
     std::ostringstream text;
     text << element;
     return TCIMValue(text.str());
@@ -62,22 +66,34 @@ template <typename TPeg> TPeg Get(const Pegasus::CIMValue& value)
     return held;
 }
 
-template <typename TPeg> TCIMValue ScalarToHost(const Pegasus::CIMValue& value)
+template <typename TPeg> TCIMValue ScalarToHost(const Pegasus::CIMValue& value, const ICIMClass*)
 {
     return ToHost(Get<TPeg>(value));
 }
 
+// By comparison: a value of another type counts as false; in all other cases it throws.
+TCIMValue BooleanToHost(const Pegasus::CIMValue& value, const ICIMClass*)
+{
+    return TCIMValue(value == Pegasus::CIMValue(true));
+}
+
+TCIMValue StringToHost(const Pegasus::CIMValue& value, const ICIMClass*)
+{
+    return TCIMValue(ToStdString(Get<Pegasus::String>(value)));
+}
+
 // The keys stay in the path's text, as the client library writes it. The reference is bound to the namespace of the
 // class even when the path names another one: the host has one namespace for all server namespaces.
-TCIMValue ReferenceToHost(const Pegasus::CIMValue& value, const ICIMClass& forClass)
+TCIMValue ReferenceToHost(const Pegasus::CIMValue& value, const ICIMClass* forClass)
 {
     TCIMReference reference((boost::shared_ptr<ICIMNamespace>()), TCIMContext());
-    reference.SetNamespace(forClass.GetNamespace({}));
+    reference.SetNamespace(forClass->GetNamespace({}));
     reference.SetPath(ToStdString(Get<Pegasus::CIMObjectPath>(value).toString()));
     return TCIMValue(reference);
 }
 
-template <typename TPeg> TCIMValue ArrayToHost(const Pegasus::CIMValue& value, TType::ECIMType elementType)
+template <typename TPeg, TType::ECIMType kElement>
+TCIMValue ArrayToHost(const Pegasus::CIMValue& value, const ICIMClass*)
 {
     const auto held = Get<Pegasus::Array<TPeg>>(value);
     std::vector<TCIMValue> elements;
@@ -86,112 +102,43 @@ template <typename TPeg> TCIMValue ArrayToHost(const Pegasus::CIMValue& value, T
         elements.push_back(ToHost(held[i]));
     }
     // The host wants the element's code here, where a declaration has the array's; the 0 is reserved.
-    return TCIMValue(elementType, 0, elements);
+    return TCIMValue(kElement, 0, elements);
 }
 
-void ScalarFromPegasus(const Pegasus::CIMValue& value, Pegasus::CIMType type, TCIMValue& out,
-                       const boost::shared_ptr<ICIMClass>& forClass)
-{
-    switch (type) {
-    case Pegasus::CIMTYPE_BOOLEAN:
-        // By comparison: a value of another type counts as false; in all other cases it throws.
-        out = TCIMValue(value == Pegasus::CIMValue(true));
-        break;
-    case Pegasus::CIMTYPE_UINT8:
-        out = ScalarToHost<Pegasus::Uint8>(value);
-        break;
-    case Pegasus::CIMTYPE_SINT8:
-        out = ScalarToHost<Pegasus::Sint8>(value);
-        break;
-    case Pegasus::CIMTYPE_UINT16:
-        out = ScalarToHost<Pegasus::Uint16>(value);
-        break;
-    case Pegasus::CIMTYPE_SINT16:
-        out = ScalarToHost<Pegasus::Sint16>(value);
-        break;
-    case Pegasus::CIMTYPE_UINT32:
-        out = ScalarToHost<Pegasus::Uint32>(value);
-        break;
-    case Pegasus::CIMTYPE_SINT32:
-        out = ScalarToHost<Pegasus::Sint32>(value);
-        break;
-    case Pegasus::CIMTYPE_UINT64:
-        out = ScalarToHost<Pegasus::Uint64>(value);
-        break;
-    case Pegasus::CIMTYPE_SINT64:
-        out = ScalarToHost<Pegasus::Sint64>(value);
-        break;
-    case Pegasus::CIMTYPE_REAL32:
-        out = ScalarToHost<Pegasus::Real32>(value);
-        break;
-    case Pegasus::CIMTYPE_REAL64:
-        out = ScalarToHost<Pegasus::Real64>(value);
-        break;
-    case Pegasus::CIMTYPE_CHAR16:
-        out = ScalarToHost<Pegasus::Char16>(value);
-        break;
-    case Pegasus::CIMTYPE_STRING:
-        out = TCIMValue(ToStdString(Get<Pegasus::String>(value)));
-        break;
-    case Pegasus::CIMTYPE_DATETIME:
-        out = ScalarToHost<Pegasus::CIMDateTime>(value);
-        break;
-    case Pegasus::CIMTYPE_REFERENCE:
-        out = ReferenceToHost(value, *forClass);
-        break;
-    default: // objects and instances: the host has no type for them, and the output stays as it was
-        break;
-    }
-}
+// The conversions by the server's type code. Objects, instances and arrays of references are beyond the tables: the
+// host has no type for them.
+using TConversion = TCIMValue (*)(const Pegasus::CIMValue& value, const ICIMClass* forClass);
+constexpr TConversion kScalarConversions[] = {
+    BooleanToHost,
+    ScalarToHost<Pegasus::Uint8>,
+    ScalarToHost<Pegasus::Sint8>,
+    ScalarToHost<Pegasus::Uint16>,
+    ScalarToHost<Pegasus::Sint16>,
+    ScalarToHost<Pegasus::Uint32>,
+    ScalarToHost<Pegasus::Sint32>,
+    ScalarToHost<Pegasus::Uint64>,
+    ScalarToHost<Pegasus::Sint64>,
+    ScalarToHost<Pegasus::Real32>,
+    ScalarToHost<Pegasus::Real64>,
+    ScalarToHost<Pegasus::Char16>,
+    StringToHost,
+    ScalarToHost<Pegasus::CIMDateTime>,
+    ReferenceToHost,
+};
+constexpr TConversion kArrayConversions[] = {
+    ArrayToHost<Pegasus::Boolean, TType::kBoolean>, ArrayToHost<Pegasus::Uint8, TType::kUint8>,
+    ArrayToHost<Pegasus::Sint8, TType::kSint8>,     ArrayToHost<Pegasus::Uint16, TType::kUint16>,
+    ArrayToHost<Pegasus::Sint16, TType::kSint16>,   ArrayToHost<Pegasus::Uint32, TType::kUint32>,
+    ArrayToHost<Pegasus::Sint32, TType::kSint32>,   ArrayToHost<Pegasus::Uint64, TType::kUint64>,
+    ArrayToHost<Pegasus::Sint64, TType::kSint64>,   ArrayToHost<Pegasus::Real32, TType::kReal32>,
+    ArrayToHost<Pegasus::Real64, TType::kReal64>,   ArrayToHost<Pegasus::Char16, TType::kChar16>,
+    ArrayToHost<Pegasus::String, TType::kString>,   ArrayToHost<Pegasus::CIMDateTime, TType::kDatetime>,
+};
 
-void ArrayFromPegasus(const Pegasus::CIMValue& value, Pegasus::CIMType type, TCIMValue& out)
+template <std::size_t kCount> TConversion ConversionIn(const TConversion (&table)[kCount], Pegasus::CIMType type)
 {
-    switch (type) {
-    case Pegasus::CIMTYPE_BOOLEAN:
-        out = ArrayToHost<Pegasus::Boolean>(value, TType::kBoolean);
-        break;
-    case Pegasus::CIMTYPE_UINT8:
-        out = ArrayToHost<Pegasus::Uint8>(value, TType::kUint8);
-        break;
-    case Pegasus::CIMTYPE_SINT8:
-        out = ArrayToHost<Pegasus::Sint8>(value, TType::kSint8);
-        break;
-    case Pegasus::CIMTYPE_UINT16:
-        out = ArrayToHost<Pegasus::Uint16>(value, TType::kUint16);
-        break;
-    case Pegasus::CIMTYPE_SINT16:
-        out = ArrayToHost<Pegasus::Sint16>(value, TType::kSint16);
-        break;
-    case Pegasus::CIMTYPE_UINT32:
-        out = ArrayToHost<Pegasus::Uint32>(value, TType::kUint32);
-        break;
-    case Pegasus::CIMTYPE_SINT32:
-        out = ArrayToHost<Pegasus::Sint32>(value, TType::kSint32);
-        break;
-    case Pegasus::CIMTYPE_UINT64:
-        out = ArrayToHost<Pegasus::Uint64>(value, TType::kUint64);
-        break;
-    case Pegasus::CIMTYPE_SINT64:
-        out = ArrayToHost<Pegasus::Sint64>(value, TType::kSint64);
-        break;
-    case Pegasus::CIMTYPE_REAL32:
-        out = ArrayToHost<Pegasus::Real32>(value, TType::kReal32);
-        break;
-    case Pegasus::CIMTYPE_REAL64:
-        out = ArrayToHost<Pegasus::Real64>(value, TType::kReal64);
-        break;
-    case Pegasus::CIMTYPE_CHAR16:
-        out = ArrayToHost<Pegasus::Char16>(value, TType::kChar16);
-        break;
-    case Pegasus::CIMTYPE_STRING:
-        out = ArrayToHost<Pegasus::String>(value, TType::kString);
-        break;
-    case Pegasus::CIMTYPE_DATETIME:
-        out = ArrayToHost<Pegasus::CIMDateTime>(value, TType::kDatetime);
-        break;
-    default: // references, objects and instances: the output stays as it was
-        break;
-    }
+    const auto code = static_cast<std::size_t>(type);
+    return code < kCount ? table[code] : nullptr;
 }
 
 // Datetimes and references travel as their texts, which the client library parses again and may refuse.
@@ -325,14 +272,20 @@ void ArrayToPegasus(const TCIMValue& in, Pegasus::CIMValue& out)
 
 } // namespace
 
+void ToHostValue(const Pegasus::CIMValue& value, Pegasus::CIMType type, bool isArray, const ICIMClass* forClass,
+                 TCIMValue& out)
+{
+    const TConversion convert =
+        isArray ? ConversionIn(kArrayConversions, type) : ConversionIn(kScalarConversions, type);
+    if (convert) {
+        out = convert(value, forClass);
+    }
+}
+
 void pegValToVRX(std::string, Pegasus::CIMValue value, Pegasus::CIMType type, bool isArray, TCIMValue& out,
                  boost::shared_ptr<ICIMClass> forClass)
 {
-    if (isArray) {
-        ArrayFromPegasus(value, type, out);
-    } else {
-        ScalarFromPegasus(value, type, out, forClass);
-    }
+    ToHostValue(value, type, isArray, forClass.get(), out);
 }
 
 void vrxValToPeg(const TCIMValue& in, Pegasus::CIMValue& out)

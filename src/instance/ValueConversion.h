@@ -21,6 +21,10 @@ namespace NKOLVRX20 {
 void pegValToVRX(std::string name, Pegasus::CIMValue value, Pegasus::CIMType type, bool isArray, TCIMValue& out,
                  boost::shared_ptr<ICIMClass> forClass);
 
+// The same without copies, for properties by the thousand. The class may be null unless the value is a reference.
+void ToHostValue(const Pegasus::CIMValue& value, Pegasus::CIMType type, bool isArray, const ICIMClass* forClass,
+                 TCIMValue& out);
+
 // Converts a host's value for a method call. Elements of 16-bit integer arrays keep only their low byte and travel as
 // 8-bit arrays. An untyped value and an array of references leave the output as it was.
 void vrxValToPeg(const TCIMValue& in, Pegasus::CIMValue& out);

@@ -11,6 +11,11 @@
 #include "src/schema/TPEGASUSPropertyDecl.h"
 #include "src/schema/TPEGASUSQualifierDecl.h"
 
+#include <boost/make_shared.hpp>
+
+#include <algorithm>
+#include <utility>
+
 namespace NKOLVRX20 {
 
 namespace {
@@ -44,7 +49,7 @@ TClassMirror::TClassMirror(TPEGASUSClass& target) : fTarget(target), fNamespace(
 
 void TClassMirror::Mirror(const Pegasus::CIMClass& source)
 {
-    MirrorQualifiers(source, {fTarget, kClassFailure, fTarget.GetName({})});
+    MirrorQualifiers(source, fTarget, kClassFailure, fTarget.GetName({}));
     for (Pegasus::Uint32 i = 0; i < source.getPropertyCount(); ++i) {
         const Pegasus::CIMConstProperty property = source.getProperty(i);
         const std::string name = NameOf(property);
@@ -57,53 +62,73 @@ void TClassMirror::Mirror(const Pegasus::CIMClass& source)
     }
 }
 
-template <typename TSource> void TClassMirror::MirrorQualifiers(const TSource& source, const TElement& element)
+template <typename TSource, typename TElement>
+void TClassMirror::MirrorQualifiers(const TSource& source, TElement& element, const char* failureText,
+                                    const std::string& name)
 {
     for (Pegasus::Uint32 i = 0; i < source.getQualifierCount(); ++i) {
-        Guarded(element.fFailureText, element.fName,
-                [&] { MirrorQualifier(source.getQualifier(i), element.fElement); });
+        Guarded(failureText, name, [&] { MirrorQualifier(source.getQualifier(i), element); });
     }
 }
 
-void TClassMirror::MirrorQualifier(const Pegasus::CIMConstQualifier& source, ICIMNamedElement& element)
+template <typename TElement>
+void TClassMirror::MirrorQualifier(const Pegasus::CIMConstQualifier& source, TElement& element)
 {
-    const std::string name = NameOf(source);
-    const auto declaration = DeclarationOf(source.getName(), name);
-    if (!declaration) {
+    TQualifierKind& kind = KindOf(source.getName());
+    if (!kind.fDeclaration) {
         return;
     }
-    const auto qualifier = element.AllocateQualifier(declaration, ValueOf(source, name),
-                                                     FlavorFromText(ToStdString(source.getFlavor().toString())), {});
-    boost::static_pointer_cast<TPEGASUSQualifier>(qualifier)->SetPropagated(source.getPropagated() != 0);
-    element.AddQualifier(qualifier, {});
+    if (!kind.fServedFlavor.equal(source.getFlavor())) {
+        kind.fServedFlavor = source.getFlavor();
+        kind.fFlavor = FlavorFromText(ToStdString(kind.fServedFlavor.toString()));
+    }
+    const auto qualifier = boost::make_shared<TPEGASUSQualifier>(element.shared_from_this(), kind.fDeclaration,
+                                                                 ValueOf(source), kind.fFlavor);
+    qualifier->SetPropagated(source.getPropagated() != 0);
+    element.EnterQualifier(kind.fKey, qualifier);
 }
 
-template <typename TSource> TCIMValue TClassMirror::ValueOf(const TSource& source, const std::string& name) const
+template <typename TSource> TCIMValue TClassMirror::ValueOf(const TSource& source) const
 {
     TCIMValue value;
     if (!source.getValue().isNull()) {
-        pegValToVRX(name, source.getValue(), source.getType(), source.isArray(), value, fTarget.shared_from_this());
+        ToHostValue(source.getValue(), source.getType(), source.isArray(), &fTarget, value);
     }
     return value;
 }
 
-boost::shared_ptr<ICIMQualifierDecl> TClassMirror::DeclarationOf(const Pegasus::CIMName& qualifier,
-                                                                 const std::string& name)
+// Throws: TVRXException 25, after a log line, for an invalid name.
+TClassMirror::TQualifierKind& TClassMirror::KindOf(const Pegasus::CIMName& qualifier)
 {
-    if (const auto known = fNamespace.FindQualifierDecl(name)) {
-        return known;
+    const Pegasus::String& served = qualifier.getString();
+    const auto known = std::find_if(fKinds.begin(), fKinds.end(),
+                                    [&](const TQualifierKind& kind) { return IsSameText(kind.fServed, served); });
+    if (known != fKinds.end()) {
+        return *known;
     }
-    return fUnknownQualifiers.count(name) == 0 ? FetchDeclaration(qualifier, name) : nullptr;
+    const std::string name = ToStdString(served);
+    TQualifierKind kind;
+    kind.fServed = served;
+    kind.fDeclaration = fNamespace.FindQualifierDecl(name);
+    if (!kind.fDeclaration) {
+        kind.fDeclaration = FetchDeclaration(qualifier, name);
+    }
+    if (kind.fDeclaration) {
+        kind.fKey = NormalizedName(kind.fDeclaration->GetName({}));
+    }
+    fKinds.push_back(std::move(kind));
+    return fKinds.back();
 }
 
+// Returns: null after a failure, which is logged. The next class asks again, when the server may answer.
 boost::shared_ptr<ICIMQualifierDecl> TClassMirror::FetchDeclaration(const Pegasus::CIMName& qualifier,
-                                                                    const std::string& name)
+                                                                    const std::string& name) const
 {
     try {
         const auto source = fNamespace.ConnectedClient().getQualifier(fTarget.GetPegasusNSP(), qualifier);
         const TCIMValue defaultValue = source.getValue().isNull()
                                            ? TCIMValue(pegTypeToVRXType(source.getType(), source.isArray()), 0)
-                                           : ValueOf(source, name);
+                                           : ValueOf(source);
         auto declaration = fNamespace.AllocateQualifierDecl(NameOf(source), defaultValue,
                                                             ScopeFromText(ToStdString(source.getScope().toString())),
                                                             FlavorFromText(ToStdString(source.getFlavor().toString())));
@@ -114,7 +139,6 @@ boost::shared_ptr<ICIMQualifierDecl> TClassMirror::FetchDeclaration(const Pegasu
         return declaration;
     } catch (...) {
         LogFailure(kQualifierFailure, name, kDetail, DescribeCurrentException());
-        fUnknownQualifiers.insert(name); // asked for once more by the next class, when the server may answer
         return nullptr;
     }
 }
@@ -135,14 +159,15 @@ TType TClassMirror::PropertyType(const Pegasus::CIMConstProperty& source, const 
 void TClassMirror::MirrorProperty(const Pegasus::CIMConstProperty& source, const std::string& name)
 {
     const TType type = PropertyType(source, name);
-    const auto declaration = fTarget.AllocatePropertyDecl(name, TCIMValue(type, 0), {});
-    const TCIMValue defaultValue = ValueOf(source, name);
+    const auto declaration =
+        boost::static_pointer_cast<TPEGASUSPropertyDecl>(fTarget.AllocatePropertyDecl(name, TCIMValue(type, 0), {}));
+    const TCIMValue defaultValue = ValueOf(source);
     // A scalar that lacks a default keeps the typed null. An array's default is always set: the empty array that the
     // declaration starts with would be a value.
     if (type.IsArray() || !defaultValue.IsNull()) {
         declaration->SetDefaultValue(defaultValue, {});
     }
-    MirrorQualifiers(source, {*declaration, kPropertyFailure, name});
+    MirrorQualifiers(source, *declaration, kPropertyFailure, name);
     // After its qualifiers, because they decide how the class takes the declaration.
     if (declaration->GetQualifier(kOverrideQualifier, {})) {
         fTarget.AdoptPropertyDecl(name);
@@ -157,7 +182,7 @@ void TClassMirror::MirrorMethod(const Pegasus::CIMConstMethod& source, const std
 {
     const auto method = boost::dynamic_pointer_cast<TPEGASUSMethodDecl>(
         fTarget.AllocateMethodDecl(name, pegTypeToVRXType(source.getType(), false), {}));
-    MirrorQualifiers(source, {*method, kMethodFailure, name});
+    MirrorQualifiers(source, *method, kMethodFailure, name);
     for (Pegasus::Uint32 i = 0; i < source.getParameterCount(); ++i) {
         Guarded(kMethodFailure, name, [&] { MirrorParameter(source.getParameter(i), *method); });
     }
@@ -166,9 +191,9 @@ void TClassMirror::MirrorMethod(const Pegasus::CIMConstMethod& source, const std
 
 void TClassMirror::MirrorParameter(const Pegasus::CIMConstParameter& source, TPEGASUSMethodDecl& method)
 {
-    const auto parameter =
-        method.AllocateParameterDecl(NameOf(source), pegTypeToVRXType(source.getType(), source.isArray()), {});
-    MirrorQualifiers(source, {*parameter, kMethodFailure, method.GetName({})});
+    const auto parameter = boost::static_pointer_cast<TPEGASUSParameterDecl>(
+        method.AllocateParameterDecl(NameOf(source), pegTypeToVRXType(source.getType(), source.isArray()), {}));
+    MirrorQualifiers(source, *parameter, kMethodFailure, method.GetName({}));
     parameter->AddToMethod({});
 }
 

@@ -2,10 +2,13 @@
 #pragma once
 
 #include <Pegasus/Client/CIMClient.h>
-#include <host/ICIMNamedElement.h>
+#include <host/ICIMQualifierDecl.h>
+#include <host/TCIMValue.h>
 
-#include <set>
+#include <boost/shared_ptr.hpp>
+
 #include <string>
+#include <vector>
 
 namespace NKOLVRX20 {
 
@@ -28,27 +31,32 @@ class TClassMirror
     void Mirror(const Pegasus::CIMClass& source);
 
   private:
-    // Where the qualifiers of an element go, and how the log names it.
-    struct TElement
+    // A qualifier as it occurs throughout a class.
+    struct TQualifierKind
     {
-        ICIMNamedElement& fElement;
-        const char* fFailureText;
-        std::string fName;
+        Pegasus::String fServed;                           // the name as it came
+        boost::shared_ptr<ICIMQualifierDecl> fDeclaration; // null: the server failed to give it
+        std::string fKey;                                  // the declaration's name, normalised
+        Pegasus::CIMFlavor fServedFlavor;                  // the last one's
+        ICIMQualifierDecl::EFlavor fFlavor = ICIMQualifierDecl::kFlavorNone;
     };
 
-    template <typename TSource> void MirrorQualifiers(const TSource& source, const TElement& element);
-    void MirrorQualifier(const Pegasus::CIMConstQualifier& source, ICIMNamedElement& element);
+    // The failure's text and the name are how the log names the element.
+    template <typename TSource, typename TElement>
+    void MirrorQualifiers(const TSource& source, TElement& element, const char* failureText, const std::string& name);
+    template <typename TElement> void MirrorQualifier(const Pegasus::CIMConstQualifier& source, TElement& element);
+    TQualifierKind& KindOf(const Pegasus::CIMName& qualifier);
     void MirrorProperty(const Pegasus::CIMConstProperty& source, const std::string& name);
     void MirrorMethod(const Pegasus::CIMConstMethod& source, const std::string& name);
     void MirrorParameter(const Pegasus::CIMConstParameter& source, TPEGASUSMethodDecl& method);
     TCIMValue::TCIMType PropertyType(const Pegasus::CIMConstProperty& source, const std::string& name) const;
-    template <typename TSource> TCIMValue ValueOf(const TSource& source, const std::string& name) const;
-    boost::shared_ptr<ICIMQualifierDecl> DeclarationOf(const Pegasus::CIMName& qualifier, const std::string& name);
-    boost::shared_ptr<ICIMQualifierDecl> FetchDeclaration(const Pegasus::CIMName& qualifier, const std::string& name);
+    template <typename TSource> TCIMValue ValueOf(const TSource& source) const;
+    boost::shared_ptr<ICIMQualifierDecl> FetchDeclaration(const Pegasus::CIMName& qualifier,
+                                                          const std::string& name) const;
 
     TPEGASUSClass& fTarget;
     const TOwningNamespace& fNamespace;
-    std::set<std::string> fUnknownQualifiers;
+    std::vector<TQualifierKind> fKinds; // a class has few, on many elements
 };
 
 } // namespace NKOLVRX20

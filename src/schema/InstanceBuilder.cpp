@@ -6,12 +6,13 @@
 #include "src/common/Names.h"
 #include "src/instance/TPEGASUSInstance.h"
 #include "src/instance/ValueConversion.h"
-#include "src/schema/TPEGASUSClass.h"
 
 #include <host/ICIMProperty.h>
 #include <host/TCIMValue.h>
 
+#include <algorithm>
 #include <optional>
+#include <utility>
 
 namespace NKOLVRX20 {
 
@@ -39,92 +40,101 @@ std::optional<std::string> ReferencedClassName(const std::string& path, const st
     return dot == std::string::npos ? std::nullopt : std::make_optional(fromClass->substr(0, dot));
 }
 
-boost::shared_ptr<ICIMClass> ReferencedClass(const TPEGASUSClass& holder, const Pegasus::CIMInstance& source,
-                                             const std::string& property, const std::string& operation)
+// Returns: the name as the log gives it: normalised, or in the server's spelling where that is an invalid name.
+std::string LoggedName(const Pegasus::CIMConstProperty& property)
 {
-    const auto name = ReferencedClassName(ToStdString(source.getPath().toString()), property);
-    if (name && !IsCimName(*name)) {
-        LogProgress("TPEGASUSClass::", operation, " keeps reference property ", property, " of ", holder.GetName({}),
-                    " without its class: \"", *name, "\" is not a class name");
-        return nullptr;
-    }
-    return name ? holder.GetOwningNamespace().GetClass(*name, {{kNspKey, holder.GetPegasusNSPStr()}}) : nullptr;
+    const std::string name = ToStdString(property.getName().getString());
+    const std::string normalized = LowerCase(name);
+    return IsCimName(normalized) ? normalized : name;
 }
 
-// One property on its way from the server's instance to the host's.
-class TPropertyTransfer
+// Servers disagree on the width of a slot's number; the host knows it as 16 bits.
+void Narrow(TPEGASUSInstance& target, const std::string& name)
 {
-  public:
-    TPropertyTransfer(TPEGASUSClass& instanceClass, const Pegasus::CIMInstance& source,
-                      const Pegasus::CIMConstProperty& property, const std::string& operation)
-        : fClass(instanceClass), fSource(source), fProperty(property), fOperation(operation),
-          fServerName(ToStdString(property.getName().getString()))
-    {
-    }
-
-    // Returns: the name as the log gives it: normalised, or in the server's spelling where that is an invalid name.
-    const std::string& Name() const { return fName.empty() ? fServerName : fName; }
-
-    void To(TPEGASUSInstance& target)
-    {
-        fName = NormalizedName(fServerName);
-        target.SetPropertyValue(fName, Value(), {});
-        if (fServerName == kSlotNumber && fClass.GetName({}) == kSlotClass) {
-            Narrow(target);
-        }
-    }
-
-  private:
-    TCIMValue Value() const
-    {
-        TCIMValue value;
-        const bool isReference = fProperty.getType() == Pegasus::CIMTYPE_REFERENCE;
-        const auto referenced = isReference ? ReferencedClass(fClass, fSource, fServerName, fOperation) : nullptr;
-        if (!fProperty.getValue().isNull()) {
-            pegValToVRX(fName, fProperty.getValue(), fProperty.getType(), fProperty.isArray(), value,
-                        fClass.shared_from_this());
-        }
-        if (referenced) {
-            value.SetReferencedClass(referenced);
-        }
-        if (fServerName.find(kInstanceIdName) != std::string::npos && value.ToString(kDecimal).empty()) {
-            value.Set("");
-        }
-        return value;
-    }
-
-    // Servers disagree on the width of a slot's number; the host knows it as 16 bits.
-    void Narrow(TPEGASUSInstance& target) const
-    {
-        const int number = target.GetProperty(fName, {})->GetValue({});
-        target.SetPropertyValue(fName, static_cast<unsigned short>(number), {});
-    }
-
-    TPEGASUSClass& fClass;
-    const Pegasus::CIMInstance& fSource;
-    const Pegasus::CIMConstProperty& fProperty;
-    const std::string& fOperation; // the function's name, as the log has it
-    const std::string fServerName;
-    std::string fName;
-};
+    const int number = target.GetProperty(name, {})->GetValue({});
+    target.SetPropertyValue(name, static_cast<unsigned short>(number), {});
+}
 
 } // namespace
 
-boost::shared_ptr<TPEGASUSInstance> BuildInstance(TPEGASUSClass& instanceClass, const Pegasus::CIMInstance& source,
-                                                  const std::string& operation)
+TInstanceBuilder::TInstanceBuilder(TPEGASUSClass& instanceClass, std::string operation)
+    : fClass(instanceClass), fOperation(std::move(operation))
 {
-    auto target = boost::dynamic_pointer_cast<TPEGASUSInstance>(instanceClass.AllocateInstance({}));
-    for (Pegasus::Uint32 i = 0; i < source.getPropertyCount(); ++i) {
-        const Pegasus::CIMConstProperty property = source.getProperty(i);
-        TPropertyTransfer transfer(instanceClass, source, property, operation);
+}
+
+// Throws: TVRXException 25, after a log line, for an invalid name.
+const TInstanceBuilder::TName& TInstanceBuilder::NameAt(Pegasus::Uint32 place, const Pegasus::String& served)
+{
+    if (place < fNames.size() && IsSameText(fNames[place].fServed, served)) {
+        return fNames[place];
+    }
+    TName name;
+    name.fServed = served;
+    name.fServerName = ToStdString(served);
+    name.fKey = NormalizedName(name.fServerName);
+    name.fIsInstanceId = name.fServerName.find(kInstanceIdName) != std::string::npos;
+    name.fIsSlotNumber = name.fServerName == kSlotNumber && fClass.GetName({}) == kSlotClass;
+    fNames.resize(std::max<std::size_t>(fNames.size(), place + 1));
+    return fNames[place] = std::move(name);
+}
+
+boost::shared_ptr<ICIMClass> TInstanceBuilder::ReferencedClass(const Pegasus::CIMInstance& source,
+                                                               const std::string& property) const
+{
+    const auto name = ReferencedClassName(ToStdString(source.getPath().toString()), property);
+    if (name && !IsCimName(*name)) {
+        LogProgress("TPEGASUSClass::", fOperation, " keeps reference property ", property, " of ", fClass.GetName({}),
+                    " without its class: \"", *name, "\" is not a class name");
+        return nullptr;
+    }
+    return name ? fClass.GetOwningNamespace().GetClass(*name, {{kNspKey, fClass.GetPegasusNSPStr()}}) : nullptr;
+}
+
+TCIMValue TInstanceBuilder::Value(const Pegasus::CIMInstance& source, const TName& name,
+                                  const Pegasus::CIMConstProperty& property) const
+{
+    TCIMValue value;
+    const Pegasus::CIMValue& served = property.getValue();
+    const Pegasus::CIMType type = property.getType();
+    const auto referenced =
+        type == Pegasus::CIMTYPE_REFERENCE ? ReferencedClass(source, name.fServerName) : boost::shared_ptr<ICIMClass>();
+    if (!served.isNull()) {
+        ToHostValue(served, type, property.isArray(), &fClass, value);
+    }
+    if (referenced) {
+        value.SetReferencedClass(referenced);
+    }
+    if (name.fIsInstanceId && value.ToString(kDecimal).empty()) {
+        value.Set("");
+    }
+    return value;
+}
+
+void TInstanceBuilder::Transfer(const Pegasus::CIMInstance& source, Pegasus::Uint32 place,
+                                const Pegasus::CIMConstProperty& property, TPEGASUSInstance& target)
+{
+    const TName& name = NameAt(place, property.getName().getString());
+    target.SetPropertyValue(name.fKey, Value(source, name, property), {});
+    if (name.fIsSlotNumber) {
+        Narrow(target, name.fKey);
+    }
+}
+
+boost::shared_ptr<TPEGASUSInstance> TInstanceBuilder::Build(const Pegasus::CIMInstance& source)
+{
+    const auto target = boost::dynamic_pointer_cast<TPEGASUSInstance>(fClass.AllocateInstance({}));
+    const Pegasus::Uint32 count = source.getPropertyCount();
+    for (Pegasus::Uint32 place = 0; place < count; ++place) {
+        const Pegasus::CIMConstProperty property = source.getProperty(place);
         try {
-            transfer.To(*target);
+            Transfer(source, place, property, *target);
         } catch (...) { // one property must not cost the others
-            LogProgress("4TPEGASUSClass::", operation, " - Unable to retrieve property: ", transfer.Name());
+            LogProgress("4TPEGASUSClass::", fOperation, " - Unable to retrieve property: ", LoggedName(property));
         }
     }
-    target->setPegNameSpace(instanceClass.GetPegasusNSP());
+    target->setPegNameSpace(fClass.GetPegasusNSP());
     target->setPegInstanceName(source.getPath());
+    fBuilt = target;
     return target;
 }
 

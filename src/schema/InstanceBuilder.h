@@ -1,22 +1,57 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "src/schema/TPEGASUSClass.h"
+
 #include <Pegasus/Client/CIMClient.h>
 
 #include <boost/shared_ptr.hpp>
 
 #include <string>
+#include <vector>
 
 namespace NKOLVRX20 {
 
-class TPEGASUSClass;
 class TPEGASUSInstance;
 
-// Makes the host's instance of a class from the server's. A property that fails to convert is left out and logged
-// under the name of the operation that asked.
-// Throws: boost::bad_weak_ptr when the namespace is gone; Pegasus::Exception for an unreadable instance.
-// Blocks: for each reference property to a class that is new to the namespace, as long as its GetClass.
-boost::shared_ptr<TPEGASUSInstance> BuildInstance(TPEGASUSClass& instanceClass, const Pegasus::CIMInstance& source,
-                                                  const std::string& operation);
+// Makes the host's instances of a class from the server's, in one retrieval. A property that fails to convert is left
+// out and logged under the name of the operation that asked.
+//
+// Instances of a class have the same properties, mostly at the same places. What follows from a property's name is
+// therefore kept for the next instance.
+// Ownership: the class outlives the builder.
+class TInstanceBuilder
+{
+  public:
+    TInstanceBuilder(TPEGASUSClass& instanceClass, std::string operation);
+
+    // Throws: boost::bad_weak_ptr when the namespace is gone; Pegasus::Exception for an unreadable instance.
+    // Blocks: for each reference property to a class that is new to the namespace, as long as its GetClass.
+    boost::shared_ptr<TPEGASUSInstance> Build(const Pegasus::CIMInstance& source);
+
+  private:
+    // A property's name, and what follows from it.
+    struct TName
+    {
+        Pegasus::String fServed; // as it came
+        std::string fServerName; // the same text
+        std::string fKey;        // normalised
+        bool fIsInstanceId;      // its value is never null
+        bool fIsSlotNumber;      // its value is 16 bits wide
+    };
+
+    const TName& NameAt(Pegasus::Uint32 place, const Pegasus::String& served);
+    void Transfer(const Pegasus::CIMInstance& source, Pegasus::Uint32 place, const Pegasus::CIMConstProperty& property,
+                  TPEGASUSInstance& target);
+    TCIMValue Value(const Pegasus::CIMInstance& source, const TName& name,
+                    const Pegasus::CIMConstProperty& property) const;
+    boost::shared_ptr<ICIMClass> ReferencedClass(const Pegasus::CIMInstance& source, const std::string& property) const;
+
+    TPEGASUSClass& fClass;
+    const std::string fOperation; // the function's name, as the log has it
+    std::vector<TName> fNames;    // by place in the instance
+    // The last one: the host lets the instances of a class that live at one time share what they have in common.
+    boost::shared_ptr<TPEGASUSInstance> fBuilt;
+};
 
 } // namespace NKOLVRX20

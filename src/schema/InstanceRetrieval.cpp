@@ -7,7 +7,6 @@
 // Upwards, on purpose: a class holds its provider by the provider's own type, and asks on the provider's client. This
 // is the one source of the folder that includes it.
 #include "src/provider/TPEGASUSProvider.h"
-#include "src/schema/InstanceBuilder.h"
 #include "src/schema/TPEGASUSClass.h"
 
 #include <host/ICIMProperty.h>
@@ -57,7 +56,8 @@ std::string TextOf(const ICIMInstance& instance, const char* property)
 } // namespace
 
 TInstanceRetrieval::TInstanceRetrieval(TPEGASUSClass& instanceClass, const char* operation)
-    : fClass(instanceClass), fClassName(instanceClass.GetName({})), fOperation(operation)
+    : fClass(instanceClass), fClassName(instanceClass.GetName({})), fOperation(operation),
+      fBuilder(instanceClass, operation)
 {
 }
 
@@ -144,16 +144,15 @@ template <typename TStep> void TInstanceRetrieval::Guarded(Pegasus::Uint32 index
     }
 }
 
-boost::shared_ptr<TPEGASUSInstance> TInstanceRetrieval::Build(const TAnswer& answer, Pegasus::Uint32 index) const
+boost::shared_ptr<TPEGASUSInstance> TInstanceRetrieval::Build(const TAnswer& answer, Pegasus::Uint32 index)
 {
     boost::shared_ptr<TPEGASUSInstance> built;
-    Guarded(index, [&] { built = BuildInstance(fClass, answer[index], fOperation); });
+    Guarded(index, [&] { built = fBuilder.Build(answer[index]); });
     return built;
 }
 
 // Byte for byte: the host returns a path that an enumeration gave it. Keys in another order make another path.
-boost::shared_ptr<TPEGASUSInstance> TInstanceRetrieval::Find(const TAnswer& answer,
-                                                             const TCIMReference& reference) const
+boost::shared_ptr<TPEGASUSInstance> TInstanceRetrieval::Find(const TAnswer& answer, const TCIMReference& reference)
 {
     boost::shared_ptr<TPEGASUSInstance> found;
     for (Pegasus::Uint32 i = 0; i < answer.size() && !found; ++i) {
@@ -164,7 +163,7 @@ boost::shared_ptr<TPEGASUSInstance> TInstanceRetrieval::Find(const TAnswer& answ
                 return;
             }
             LogProgress("TPEGASUSClass:", fOperation, " ObjectPath matched : ", path);
-            found = BuildInstance(fClass, answer[i], fOperation);
+            found = fBuilder.Build(answer[i]);
         });
     }
     return found;
@@ -181,13 +180,16 @@ void TInstanceRetrieval::LogCallingNamespace() const
     LogProgress("TPEGASUSClass:", fOperation, ". Calling NSP =  ", ProviderNamespaceName());
 }
 
-void TInstanceRetrieval::LogBuilt(const TPEGASUSInstance& instance) const
+void TInstanceRetrieval::LogBuilt(const TPEGASUSInstance& instance)
 {
     if (fClassName == kRecordClass) {
         LogProgress("TPEGASUSClass::", fOperation, " Antecedent = ", TextOf(instance, "Antecedent"), " Dependent",
                     TextOf(instance, "Dependent"));
     }
-    LogProgress("TPEGASUSClass::", fOperation, " nsp=", instance.GetPegasusNSPStr());
+    if (fBuiltLine.empty()) {
+        fBuiltLine = JoinText("TPEGASUSClass::", fOperation, " nsp=", instance.GetPegasusNSPStr());
+    }
+    WriteCoreLog(ILogger::kInfo, fBuiltLine);
 }
 
 void TInstanceRetrieval::LogTimeout(const Pegasus::ConnectionTimeoutException& exception) const

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "src/schema/InstanceBuilder.h"
+
 #include <Pegasus/Client/CIMClient.h>
 #include <host/TCIMReference.h>
 
@@ -35,12 +37,13 @@ class TInstanceRetrieval
 
     // Each of these returns null after a failure, which is logged and costs the one instance alone.
 
-    boost::shared_ptr<TPEGASUSInstance> Build(const TAnswer& answer, Pegasus::Uint32 index) const;
+    boost::shared_ptr<TPEGASUSInstance> Build(const TAnswer& answer, Pegasus::Uint32 index);
     // Returns: the first instance whose path is the reference's to the letter; null also when every path differs.
-    boost::shared_ptr<TPEGASUSInstance> Find(const TAnswer& answer, const TCIMReference& reference) const;
+    boost::shared_ptr<TPEGASUSInstance> Find(const TAnswer& answer, const TCIMReference& reference);
 
     void LogCallingNamespace() const;
-    void LogBuilt(const TPEGASUSInstance& instance) const;
+    // All instances of one retrieval have the same server namespace: the line is put together once.
+    void LogBuilt(const TPEGASUSInstance& instance);
 
   private:
     Pegasus::CIMClient& Client(unsigned int timeoutMs) const;
@@ -55,6 +58,8 @@ class TInstanceRetrieval
     TPEGASUSClass& fClass;
     const std::string fClassName;
     const std::string fOperation;
+    TInstanceBuilder fBuilder;
+    std::string fBuiltLine; // empty before the first instance
 };
 
 } // namespace NKOLVRX20

@@ -25,7 +25,9 @@ template <typename TElement> class TNamedMap
     }
 
     // The element takes the place of one of the same name.
-    void Put(const std::string& name, const TPointer& element) { fElements[NormalizedName(name)] = element; }
+    void Put(const std::string& name, const TPointer& element) { PutAs(NormalizedName(name), element); }
+    // Requires: a normalised name.
+    void PutAs(const std::string& key, const TPointer& element) { fElements[key] = element; }
 
     // Calls the visitor with each element until it returns false. The walk is on a copy: the visitor may change or
     // destroy this map.

@@ -49,7 +49,7 @@ boost::shared_ptr<ICIMInstance> TPEGASUSClass::AllocateInstance(TCIMContext cont
 void TPEGASUSClass::EnumerateInstances(TInstanceVisitor visitor, bool deep, TCIMContext)
 {
     const auto self = shared_from_this(); // the visitor may drop the namespace, and this class with it
-    const TInstanceRetrieval retrieval(*this, "EnumerateInstances");
+    TInstanceRetrieval retrieval(*this, "EnumerateInstances");
     LogProgress("TPEGASUSClass::EnumerateInstances ", fName);
     retrieval.LogCallingNamespace();
     auto answer = retrieval.AskProvider(deep, EnumerationTimeoutMs(*this));
@@ -73,7 +73,7 @@ void TPEGASUSClass::EnumerateInstances(TInstanceVisitor visitor, bool deep, TCIM
 
 boost::shared_ptr<ICIMInstance> TPEGASUSClass::GetInstance(const TCIMReference& reference, TCIMContext)
 {
-    const TInstanceRetrieval retrieval(*this, "GetInstance");
+    TInstanceRetrieval retrieval(*this, "GetInstance");
     LogProgress("TPEGASUSClass::GetInstance : ", fName, "\nWith path = ", reference.GetPath());
     const auto answer = retrieval.Ask(fDefaultTimeoutMs);
     if (!answer) {
@@ -85,7 +85,7 @@ boost::shared_ptr<ICIMInstance> TPEGASUSClass::GetInstance(const TCIMReference& 
 
 boost::shared_ptr<ICIMInstance> TPEGASUSClass::GetInstanceWithNsp(const TCIMReference& reference, TCIMContext context)
 {
-    const TInstanceRetrieval retrieval(*this, "GetInstanceWithNsp");
+    TInstanceRetrieval retrieval(*this, "GetInstanceWithNsp");
     LogProgress("Entering TPEGASUSClass::GetInstanceWithNsp class = ", fName,
                 " nsp = ", context[kNspKey].ToString(kDecimal));
     retrieval.LogCallingNamespace();

@@ -67,6 +67,12 @@ class TQualifiedElement : public TInterface, public boost::enable_shared_from_th
 
     void EnumerateQualifiers(TQualifierVisitor visitor, TCIMContext) const override { fQualifiers.Visit(visitor); }
 
+    // For initialisation, where the maker of many qualifiers has normalised their declaration's name once.
+    void EnterQualifier(const std::string& key, const boost::shared_ptr<TPEGASUSQualifier>& qualifier)
+    {
+        fQualifiers.PutAs(key, qualifier);
+    }
+
   private:
     TNamedMap<TPEGASUSQualifier> fQualifiers;
 };
