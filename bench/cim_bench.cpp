@@ -3,11 +3,12 @@
 // library or with an installed OpenPegasus's, and works on any server that listens on the loopback interface.
 //
 //   cim_bench PORT NAMESPACE CLASS [--server PID] [--rounds N] [--before METHOD PARAMETER NUMBER]
-//             [--method METHOD PARAMETER TEXT]
+//             [--method METHOD PARAMETER TEXT] [--class CLASS]
 //
 // PORT may be "local", the server's local socket. --before calls a method with a uint32 once, --method measures calls
-// with a string. With --server, the processor time of that process and of its children (the agents) is shown too. Each
-// line has a name, a figure and a unit, separated by tabs; a figure is the median of the rounds (9).
+// with a string, --class GetClass of another class. With --server, the processor time of that process and of its
+// children (the agents) is shown too. Each line has a name, a figure and a unit, separated by tabs; a figure is the
+// median of the rounds (9).
 #include "bench/ReadValues.h"
 
 #include <Pegasus/Client/CIMClient.h>
@@ -42,6 +43,7 @@ struct TArguments
     int fRounds = 9;
     std::vector<std::string> fBefore; // method, parameter, number
     std::vector<std::string> fMethod; // method, parameter, text
+    std::string fOtherClass;          // none when empty
 };
 
 using TTimes = std::map<std::string, double>; // process -> seconds of processor time
@@ -155,6 +157,15 @@ void invoke(CIMClient& client, const TArguments& arguments, const std::vector<st
                         CIMName(method[0].c_str()), in, out);
 }
 
+void measureGetClass(CIMClient& client, const std::string& name, const CIMName& className, const TArguments& arguments)
+{
+    measure(name, kCallsOfARound, arguments, [&] {
+        for (int i = 0; i < kCallsOfARound; ++i) {
+            client.getClass(arguments.fNamespace, className, false);
+        }
+    });
+}
+
 void run(const TArguments& arguments)
 {
     CIMClient client;
@@ -185,11 +196,11 @@ void run(const TArguments& arguments)
     print("EnumerateInstances, values read, client's memory for an instance",
           (peakMegabytes("self") - idle) * 1024 / count, "KB");
     printPeaks("EnumerateInstances", arguments.fServer);
-    measure("GetClass", kCallsOfARound, arguments, [&] {
-        for (int i = 0; i < kCallsOfARound; ++i) {
-            client.getClass(arguments.fNamespace, arguments.fClass, false);
-        }
-    });
+    measureGetClass(client, "GetClass", arguments.fClass, arguments);
+    if (!arguments.fOtherClass.empty()) {
+        measureGetClass(client, "GetClass of " + arguments.fOtherClass, CIMName(arguments.fOtherClass.c_str()),
+                        arguments);
+    }
     if (!arguments.fMethod.empty()) {
         const CIMValue text(String(arguments.fMethod[2].c_str()));
         measure("InvokeMethod", kCallsOfARound, arguments, [&] {
@@ -225,6 +236,8 @@ TArguments parse(const std::vector<std::string>& words)
             arguments.fBefore = take(3);
         } else if (words[i] == "--method") {
             arguments.fMethod = take(3);
+        } else if (words[i] == "--class") {
+            arguments.fOtherClass = take(1)[0];
         } else {
             throw std::invalid_argument("unknown word " + words[i]);
         }
