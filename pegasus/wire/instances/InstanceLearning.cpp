@@ -89,7 +89,7 @@ bool InstancePattern::learnKeys(const XmlElement& instanceName, const CIMObjectP
                                 InstanceLayout& layout)
 {
     layout.fClassName = path.getClassName();
-    const Array<CIMKeyBinding> keys = path.getKeyBindings();
+    const Array<CIMKeyBinding>& keys = path.getKeyBindings();
     for (XmlElement child = instanceName.firstChild(); child; child = child.nextSibling()) {
         const XmlElement value = child.firstChild();
         if (!child.is("KEYBINDING") || !value.is("KEYVALUE") || isEmptyTag(value.startTag())) {

@@ -45,7 +45,8 @@ class PEGASUS_CLIENT_LINKAGE CIMClient
     void setTimeout(Uint32 timeoutMilliseconds);
 
     // Bytes in memory of the objects of one answer, such as all instances of an enumeration; at first 256 MiB. An
-    // extension of this library: a program that is to compile against OpenPegasus too does without these two.
+    // instance gets objects for its properties when it is asked for them, and then takes up to four times as much.
+    // An extension of this library: a program that is to compile against OpenPegasus too does without these two.
     Uint64 getMaxDecodedBytes() const;
     // From the next call on. Beyond it an operation throws CIMClientXmlException, which names maxDecodedBytes.
     void setMaxDecodedBytes(Uint64 bytes);
