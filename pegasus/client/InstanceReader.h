@@ -16,7 +16,7 @@ namespace Pegasus::client {
 class InstanceReader
 {
   public:
-    explicit InstanceReader(wire::KnownInstances& known) : fKnown(known) {}
+    explicit InstanceReader(wire::KnownInstances& known) : fKnown(known) { fKnown.beginAnswer(); }
 
     void read(const wire::XmlElement& element, wire::ElementDecoder& decoder)
     {

@@ -60,8 +60,8 @@ class InstancePattern
     bool learnProperty(const XmlElement& element, const CIMConstProperty& property, InstanceLayout& layout);
     std::size_t bytes() const;
 
-    // Of all tags of a pattern: more than a class has, and little for a client to keep.
-    static constexpr std::size_t kMaxPatternBytes = 64UL * 1024;
+    // Of all tags of a pattern: those of some 200 properties. Each instance is compared with all of them.
+    static constexpr std::size_t kMaxPatternBytes = 16UL * 1024;
 
     std::vector<std::string> fHead;
     std::vector<Property> fProperties;

@@ -12,8 +12,8 @@ namespace {
 // Answers with instances of several classes have them in turns at worst.
 constexpr std::size_t kMaxPatterns = 8;
 
-// Of so many instances that were learned, one should have been of use. An answer whose instances differ in their tags,
-// each from all others, is learned from ever less.
+// Learning takes time with the number of properties that are known. An answer may have so many instances that are
+// learned, and one more for each so many that are taken.
 constexpr std::size_t kTrials = 16;
 
 // What an instance counts beside its values: its two pieces of memory; for each object that it gets when it is asked
@@ -24,13 +24,20 @@ constexpr std::size_t kTextBytes = 16;
 
 } // namespace
 
+// Beyond its share an answer is learned from ever less: a class that comes late should be known at last.
+bool KnownInstances::mayLearn() const
+{
+    const bool isPowerOfTwo = (fRead & (fRead - 1)) == 0;
+    return fLearned < kTrials + fTaken / kTrials || isPowerOfTwo;
+}
+
 void KnownInstances::learn(const XmlElement& element, const CIMInstance& instance)
 {
-    ++fLearnedInVain;
-    const bool isPowerOfTwo = (fLearnedInVain & (fLearnedInVain - 1)) == 0;
-    if (fLearnedInVain > kTrials && !isPowerOfTwo) {
+    ++fRead;
+    if (!mayLearn()) {
         return;
     }
+    ++fLearned;
     std::optional<InstancePattern> pattern = InstancePattern::of(element, instance, fLimits);
     if (!pattern) {
         return;
@@ -54,7 +61,7 @@ XmlOffer KnownInstances::take(std::string_view text, CIMInstance& instance)
         const XmlOffer offer = InstanceMatch(*known, text, fLimits, fValues).result();
         if (offer.result == XmlOffer::Result::kTaken) {
             instance = packed(known->layout());
-            fLearnedInVain = 0;
+            ++fTaken;
             std::rotate(fPatterns.begin(), known, known + 1);
             return offer;
         }

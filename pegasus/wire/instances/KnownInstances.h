@@ -19,6 +19,8 @@ class KnownInstances
   public:
     explicit KnownInstances(const XmlLimits& limits = XmlLimits()) : fLimits(limits) {}
 
+    // Between two answers.
+    void beginAnswer() { fTaken = fRead = fLearned = 0; }
     // Notes the tags of a VALUE.NAMEDINSTANCE that was decoded into this instance.
     void learn(const XmlElement& element, const CIMInstance& instance);
     // Takes an element that begins the text if a pattern fits. Returns: what became of it; a taken one is in `instance`
@@ -29,12 +31,16 @@ class KnownInstances
     std::size_t bytes() const { return fBytes; }
 
   private:
+    bool mayLearn() const;
     CIMInstance packed(const std::shared_ptr<const InstanceLayout>& layout);
 
     const XmlLimits fLimits;
     std::vector<InstancePattern> fPatterns;
     PackedWriter fValues;
-    std::size_t fLearnedInVain = 0; // since an instance was taken
+    // Instances of the answer.
+    std::size_t fTaken = 0;
+    std::size_t fRead = 0; // by others, and offered to learn()
+    std::size_t fLearned = 0;
     std::size_t fBytes = 0;
 };
 

@@ -129,6 +129,7 @@ TEST(KnownInstances, OthersAreNotLearned)
         element(" EmbeddedObject=\"instance\"/>", "/>", "/>", "/>"),
         element("/><PROPERTY.REFERENCE NAME=\"R\"/>", "/>", "/>", "/>"),
         element("/><PROPERTY NAME=\"C\" TYPE=\"char16\"/>", "/>", "/>", "/>"),
+        element(" A=\"" + std::string(20000, 'a') + "\"/>", "/>", "/>", "/>"),
         "<VALUE.NAMEDINSTANCE><INSTANCENAME CLASSNAME=\"T\"><KEYBINDING NAME=\"K\"><KEYVALUE/></KEYBINDING>"
         "</INSTANCENAME><INSTANCE CLASSNAME=\"T\"><PROPERTY NAME=\"P\" TYPE=\"string\"/></INSTANCE>"
         "</VALUE.NAMEDINSTANCE>",
