@@ -1,8 +1,9 @@
 // SPDX-License-Identifier: MIT
-// A careless provider. An input is a sequence of its calls: the first byte chooses strict providers, then each call is
-// a byte for the function and bytes for its arguments. Objects lie in a few places of each kind, so that later calls
-// use those that earlier ones made; a place may be empty, and any argument may be null or an object without a handle.
-// Objects that were released are not passed again, since no broker survives that.
+// A careless provider. An input is a sequence of its calls: the first byte chooses strict providers and the form of
+// delivered instances, objects or XML; then each call is a byte for the function and bytes for its arguments. Objects
+// lie in a few places of each kind, so that later calls use those that earlier ones made; a place may be empty, and any
+// argument may be null or an object without a handle. Objects that were released are not passed again, since no broker
+// survives that.
 //
 // Every call answers: a function of the factories gives an object or an error. What is delivered can be written as
 // CIM-XML and read again.
@@ -23,6 +24,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <string>
+#include <string_view>
 
 using namespace Pegasus;
 using namespace Pegasus::cmpi;
@@ -39,13 +41,21 @@ void checkInstance(const CIMInstance& instance)
     fuzz::require(again.getPropertyCount() == instance.getPropertyCount());
 }
 
+void checkText(std::string_view element)
+{
+    wire::XmlDocument document;
+    wire::ElementDecoder decoder;
+    decoder.decodeNamedInstance(document.parseFragment(element));
+}
+
 } // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
     static fuzz::FuzzServices fgServices;
     fuzz::CallInput in(data, size);
-    fgServices.strict = in.byte() % 2 != 0;
+    const unsigned choice = in.byte();
+    fgServices.strict = choice % 2 != 0;
     Broker broker(fgServices, brokerTables());
     ProviderRequest request;
     request.provider = "Fuzz";
@@ -58,9 +68,11 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     ObjectPathObject path(broker, CIMObjectPath(String("root/fuzz:F.Id=\"1\",Number=2")));
     ArgsObject given(broker, parameters, request.nameSpace);
     ArgsObject out(broker);
-    ResultObject result(
+    ResultObject texts(filter, checkText);
+    ResultObject objects(
         filter, checkInstance, [](const CIMObjectPath& delivered) { delivered.toString(); },
         [](const CIMValue& delivered) { delivered.toString(); });
+    ResultObject& result = choice / 2 % 2 != 0 ? texts : objects;
     context.lifetime = path.lifetime = given.lifetime = out.lifetime = Lifetime::kArgument;
     broker.classes().beginRequest();
     fuzz::CarelessProvider(in, {&broker, &context, &path, &given, &out, &result}).run();

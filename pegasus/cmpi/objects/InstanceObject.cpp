@@ -4,14 +4,13 @@
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/Text.h"
 #include "pegasus/cmpi/objects/Broker.h"
+#include "pegasus/cmpi/objects/DeclaredProperty.h"
 #include "pegasus/cmpi/objects/Habits.h"
 #include "pegasus/cmpi/objects/KeyCodec.h"
 #include "pegasus/cmpi/objects/NamedValues.h"
 #include "pegasus/cmpi/services/PropertyFilter.h"
 #include "pegasus/common/ObjectReps.h"
-#include "pegasus/wire/ElementEncoder.h"
 
-#include <Pegasus/Common/CIMObject.h>
 #include <Pegasus/Common/CIMProperty.h>
 
 #include <algorithm>
@@ -28,76 +27,6 @@ CIMObjectPath placed(const CIMInstance& instance, const CIMNamespaceName& nameSp
         path.setNameSpace(nameSpace);
     }
     return path;
-}
-
-bool accepts(const PropertySchema& property, const CIMValue& value)
-{
-    if (property.isArray != value.isArray()) {
-        return false;
-    }
-    const CIMType type = value.getType();
-    return type == property.type || (property.embedded != EmbeddedKind::kNone &&
-                                     (type == CIMTYPE_INSTANCE || type == CIMTYPE_OBJECT || type == CIMTYPE_STRING));
-}
-
-// CMPI has one type for embedded objects of either kind; the class says which kind its property has.
-CIMValue asDeclared(const PropertySchema& property, const CIMValue& value)
-{
-    if (property.embedded == EmbeddedKind::kNone) {
-        return value;
-    }
-    if (value.isNull()) { // a null embedded object is marked as an instance or not at all
-        return {property.embedded == EmbeddedKind::kInstance ? CIMTYPE_INSTANCE : CIMTYPE_STRING, property.isArray};
-    }
-    if (property.embedded != EmbeddedKind::kObject || value.getType() != CIMTYPE_INSTANCE) {
-        return value;
-    }
-    if (!value.isArray()) {
-        CIMInstance instance;
-        value.get(instance);
-        return CIMValue(CIMObject(instance));
-    }
-    Array<CIMInstance> instances;
-    value.get(instances);
-    Array<CIMObject> objects;
-    for (Uint32 i = 0; i < instances.size(); ++i) {
-        objects.append(CIMObject(instances[i]));
-    }
-    return CIMValue(objects);
-}
-
-Uint32 sizeOf(const CIMValue& value)
-{
-    return value.isArray() && !value.isNull() ? value.getArraySize() : 0;
-}
-
-CIMProperty propertyOf(const PropertySchema& declared, const CIMValue& value)
-{
-    const bool isReference = declared.type == CIMTYPE_REFERENCE && !declared.isArray;
-    const CIMValue typed = asDeclared(declared, value);
-    return {declared.name,       typed, sizeOf(typed), isReference ? declared.referenceClass : CIMName(), CIMName(),
-            declared.isInherited};
-}
-
-constexpr wire::Blanks kBlanks = wire::Blanks::kRaw; // how OpenPegasus passes a provider's texts on
-
-// Appends the property of an instance that may or may not have set it.
-void appendDeclared(std::string& out, const PropertySchema& declared, const ProviderValue& value)
-{
-    if (declared.start.empty()) {
-        wire::appendProperty(out, propertyOf(declared, value.isSet() ? value.value() : declared.initial), kBlanks);
-    } else if (!value.isSet()) {
-        out += declared.unset;
-    } else if (value.isPlain()) {
-        out += declared.start;
-        out += "<VALUE>";
-        value.appendText(out);
-        out += "</VALUE>\n</PROPERTY>\n";
-    } else {
-        out += declared.start;
-        wire::appendValue(out, value.value(), kBlanks);
-        out += "</PROPERTY>\n";
-    }
 }
 
 // The bit in fPathKeys of a key property; none for other properties, and for keys beyond the 32nd.
@@ -337,64 +266,11 @@ CIMObjectPath InstanceObject::deliveredPath() const
     return completePath().delivered();
 }
 
-// Appends the path as INSTANCENAME if it consists of the class's keys, all with plain values.
-// Returns: false, with nothing appended, for any other.
-bool InstanceObject::appendPlainName(std::string& out) const
-{
-    if (fPath.schema == nullptr || fPathKeys != 0) {
-        return false;
-    }
-    const std::size_t size = out.size();
-    out += fPath.schema->nameStart();
-    std::size_t ofPath = 0;
-    for (const std::size_t at : fPath.schema->keys()) {
-        const PropertySchema& declared = fPath.schema->properties()[at];
-        const PathKey* const key = fPath.findKey(declared.name);
-        const ProviderValue& value = key != nullptr ? key->value : fValues[at];
-        if (!value.isPlain() || value.type() != declared.type ||
-            (key != nullptr && key->name.getString() != declared.name.getString()))
-        {
-            out.resize(size);
-            return false;
-        }
-        ofPath += key != nullptr ? 1 : 0;
-        out += declared.keyStart;
-        value.appendText(out);
-        out += "</KEYVALUE>\n</KEYBINDING>\n";
-    }
-    out += "</INSTANCENAME>\n";
-    if (ofPath != fPath.keys.size()) {
-        out.resize(size);
-    }
-    return out.size() > size;
-}
-
 CIMInstance InstanceObject::delivered(const PropertyFilter& filter) const
 {
     CIMInstance result = filtered(filter);
     result.setPath(deliveredPath());
     return result;
-}
-
-void InstanceObject::appendDelivered(std::string& out, const PropertyFilter& filter) const
-{
-    out += "<VALUE.NAMEDINSTANCE>\n";
-    if (!appendPlainName(out)) {
-        wire::appendInstanceName(out, deliveredPath(), kBlanks);
-    }
-    if (fPath.schema == nullptr) {
-        wire::appendInstanceStart(out, fPath.className);
-    } else {
-        out += fPath.schema->instanceStart();
-        const auto& declared = fPath.schema->properties();
-        for (const std::size_t i : filter.passing(*fPath.schema)) {
-            appendDeclared(out, declared[i], fValues[i]);
-        }
-    }
-    for (const NamedValue* extra : undeclared(filter)) {
-        wire::appendProperty(out, CIMProperty(extra->name, extra->value), kBlanks);
-    }
-    out += "</INSTANCE>\n</VALUE.NAMEDINSTANCE>\n";
 }
 
 CIMInstance InstanceObject::value() const
