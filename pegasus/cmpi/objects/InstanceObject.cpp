@@ -4,10 +4,10 @@
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/Text.h"
 #include "pegasus/cmpi/objects/Broker.h"
-#include "pegasus/cmpi/objects/DeclaredProperty.h"
 #include "pegasus/cmpi/objects/Habits.h"
 #include "pegasus/cmpi/objects/KeyCodec.h"
 #include "pegasus/cmpi/objects/NamedValues.h"
+#include "pegasus/cmpi/services/DeclaredProperty.h"
 #include "pegasus/cmpi/services/PropertyFilter.h"
 #include "pegasus/common/ObjectReps.h"
 

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
-#include "pegasus/cmpi/objects/DeclaredProperty.h"
 #include "pegasus/cmpi/objects/InstanceObject.h"
+#include "pegasus/cmpi/services/DeclaredProperty.h"
 #include "pegasus/cmpi/services/PropertyFilter.h"
 #include "pegasus/wire/ElementEncoder.h"
 

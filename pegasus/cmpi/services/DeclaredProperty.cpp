@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "pegasus/cmpi/objects/DeclaredProperty.h"
+#include "pegasus/cmpi/services/DeclaredProperty.h"
 
 #include <Pegasus/Common/CIMInstance.h>
 #include <Pegasus/Common/CIMObject.h>
