@@ -73,7 +73,17 @@ bool IsColorWanted()
 
 void AddFormatOptions(CLI::App& app, TOptions& options)
 {
-    app.add_option("--format", options.fFormat, "Of the document (default table)")->check(CLI::IsMember(FormatNames()));
+    std::string listed; // the completion reads it
+    for (const std::string& name : FormatNames()) {
+        listed += (listed.empty() ? "TEXT:{" : ",") + name;
+    }
+    app.add_option("--format", options.fFormat, "Of the document (default table)")
+        ->type_name(listed + "}")
+        ->check([](const std::string& name) {
+            const std::vector<std::string> names = FormatNames();
+            const bool isKnown = std::find(names.begin(), names.end(), name) != names.end();
+            return isKnown ? "" : "there is no format " + name + Suggestion(name, names);
+        });
     app.add_flag("--all", options.fFormatOptions.fAll, "Show keys too that repeat the class's or the system's name");
     app.add_flag("--raw", options.fFormatOptions.fRaw, "Show numbers as they were delivered");
     app.add_flag("--stable", options.fFormatOptions.fStable,

@@ -3,6 +3,7 @@
 
 #include "host/cli/formats/TextLayout.h"
 #include "host/cli/formats/ValueText.h"
+#include "host/cli/model/Printable.h"
 
 namespace vrxhost {
 namespace {

@@ -4,6 +4,7 @@
 #include "host/cli/formats/JsonValues.h"
 #include "host/cli/formats/TextLayout.h"
 #include "host/cli/formats/ValueText.h"
+#include "host/cli/model/Printable.h"
 
 #include <utility>
 

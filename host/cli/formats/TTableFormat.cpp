@@ -4,6 +4,7 @@
 #include "host/cli/formats/Differences.h"
 #include "host/cli/formats/TextLayout.h"
 #include "host/cli/formats/ValueText.h"
+#include "host/cli/model/Printable.h"
 
 #include <algorithm>
 
@@ -12,6 +13,7 @@ namespace {
 
 constexpr std::size_t kInstancesOfATable = 5; // fewer are shown one below the other
 constexpr std::size_t kTypeWidth = 11;
+const std::string kDetailIndent(6, ' '); // of what a declaration says about a property
 // Held back until their class ends, so that its heading counts them and a tree holds them all. The rows of a class with
 // more go out in tables of so many.
 constexpr std::size_t kHeldInstances = 1000;
@@ -295,13 +297,17 @@ std::string TTableFormat::Declaration(const TClassRecord& each) const
     std::string out = Heading(ClassLine(each)) + "\n" + LabelledLines(qualifiers, "  ", fOptions.fWidth);
     for (const TPropertyDeclRecord& property : each.fProperties) {
         out += "\n  " + std::string(property.fIsKey ? "[key] " : "") + property.fType + " " + property.fName + "\n";
-        std::vector<TLabelled> rows = {{"", Printable(property.fDescription)},
-                                       {"unit", property.fUnits.empty() ? property.fPUnit : property.fUnits},
+        for (const std::string& line : Folded(Printable(property.fDescription),
+                                              fOptions.fWidth - std::min(fOptions.fWidth / 2, kDetailIndent.size())))
+        {
+            out += line.empty() ? "" : kDetailIndent + line + "\n";
+        }
+        std::vector<TLabelled> rows = {{"unit", property.fUnits.empty() ? property.fPUnit : property.fUnits},
                                        {"values", Printable(ValueList(property))},
                                        {"counter", property.fIsCounter ? "yes" : ""}};
         rows.erase(std::remove_if(rows.begin(), rows.end(), [](const TLabelled& row) { return row.fText.empty(); }),
                    rows.end());
-        out += LabelledLines(rows, "      ", fOptions.fWidth);
+        out += LabelledLines(rows, kDetailIndent, fOptions.fWidth);
     }
     for (const TMethodRecord& method : each.fMethods) {
         out += "\n  " + method.fReturnType + " " + method.fName + "(" + ParameterList(method) + ")\n";

@@ -4,6 +4,7 @@
 #include "host/cli/formats/IFormat.h"
 #include "host/cli/formats/TextLayout.h"
 #include "host/cli/formats/ValueText.h"
+#include "host/cli/model/Printable.h"
 
 #include <set>
 #include <sstream>

@@ -2,7 +2,6 @@
 #include "host/cli/formats/TextLayout.h"
 
 #include <algorithm>
-#include <cstdio>
 
 namespace vrxhost {
 namespace {
@@ -94,22 +93,6 @@ std::string Block(const std::vector<const TColumn*>& columns, const std::string&
 }
 
 } // namespace
-
-std::string Printable(const std::string& text)
-{
-    std::string printable;
-    for (const char c : text) {
-        const auto byte = static_cast<unsigned char>(c);
-        if (byte >= 0x20 && byte != 0x7f) {
-            printable += c;
-            continue;
-        }
-        char escape[8];
-        std::snprintf(escape, sizeof escape, c == '\n' ? "\\n" : c == '\t' ? "\\t" : "\\x%02x", byte);
-        printable += escape;
-    }
-    return printable;
-}
 
 std::size_t ColumnCount(const std::string& text)
 {

@@ -8,9 +8,6 @@
 
 namespace vrxhost {
 
-// Returns: the text with control bytes as escapes: a value from a device must not steer the user's terminal.
-std::string Printable(const std::string& text);
-
 // Returns: the columns that UTF-8 text takes, one for each character.
 std::size_t ColumnCount(const std::string& text);
 

@@ -3,6 +3,7 @@
 
 #include "display/PlainText.h"
 #include "host/cli/formats/TextLayout.h"
+#include "host/cli/model/Printable.h"
 
 #include <algorithm>
 

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "host/cli/model/ErrorReport.h"
 
+#include "host/cli/model/Printable.h"
+
 #include <host/TVRXException.h>
 
 #include <cstdlib>
@@ -35,7 +37,9 @@ std::string CurrentTypeName()
 
 void ReportError(const std::string& sentence)
 {
-    const std::string line = "vrxhost: " + sentence + "\n";
+    const std::string text =
+        sentence.substr(0, sentence.find_last_not_of('\n') + 1); // a program's answer may have ended so
+    const std::string line = "vrxhost: " + Printable(text) + "\n";
     if (Route()) {
         Route()(line);
     } else {

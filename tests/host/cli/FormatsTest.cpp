@@ -3,6 +3,7 @@
 #include "host/cli/collect/TCollector.h"
 #include "host/cli/formats/HtmlText.h"
 #include "host/cli/formats/IFormat.h"
+#include "host/cli/model/Printable.h"
 #include "host/inmem/TInmemClass.h"
 #include "host/inmem/TInmemNamespace.h"
 
@@ -39,6 +40,9 @@ TEST(HtmlText, LeavesNoMarkupAndNothingHidden)
         EXPECT_EQ(HtmlText(text), html);
     }
     EXPECT_EQ(HtmlAttribute("id", "\" onclick=\""), " id=\"&quot; onclick=&quot;\"");
+    EXPECT_EQ(Printable("\xc2\x9b"
+                        "31m <b>"),
+              "\\u{9b}31m <b>"); // as one character, a terminal's CSI
 }
 
 TPropertyRecord Text(const std::string& name, const std::string& text)
