@@ -125,6 +125,33 @@ TEST_F(ClassMirrorTest, AQualifierKeepsItsValueFlavorAndOrigin)
     EXPECT_EQ(TDecl::kScopeProperty | TDecl::kScopeMethod, declaration->GetScope({}));
 }
 
+TEST_F(ClassMirrorTest, AQualifierHasAFlavorOfItsOwnOnEachElement)
+{
+    using Pegasus::CIMFlavor;
+    const struct
+    {
+        const char* fProperty;
+        CIMFlavor fServed;
+        unsigned int fExpected;
+    } rows[] = {
+        {"A", CIMFlavor::OVERRIDABLE + CIMFlavor::RESTRICTED, TDecl::kFlavorOverridable | TDecl::kFlavorRestricted},
+        {"B", CIMFlavor::OVERRIDABLE + CIMFlavor::TOSUBCLASS, TDecl::kFlavorOverridable | TDecl::kFlavorToSubclass},
+        {"C", CIMFlavor::OVERRIDABLE + CIMFlavor::RESTRICTED, TDecl::kFlavorOverridable | TDecl::kFlavorRestricted},
+    };
+    Pegasus::CIMClass source(CIMName("CIM_A"));
+    for (const auto& row : rows) {
+        Pegasus::CIMProperty property = Property(row.fProperty, CIMValue(Pegasus::Uint8(1)));
+        property.addQualifier(Pegasus::CIMQualifier(CIMName("Key"), CIMValue(true), row.fServed));
+        source.addProperty(property);
+    }
+    fServed.fModel.addClass(kNsp, source);
+    const auto mirrored = fServed.Class("CIM_A");
+    for (const auto& row : rows) {
+        EXPECT_EQ(row.fExpected, mirrored->GetPropertyDecl(row.fProperty, {})->GetQualifier("Key", {})->GetFlavor({}))
+            << row.fProperty;
+    }
+}
+
 TEST_F(ClassMirrorTest, WhatCannotBeMirroredIsLoggedAndLeftOut)
 {
     Pegasus::CIMClass source(CIMName("CIM_A"));
