@@ -45,9 +45,8 @@ bool InstanceObject::appendPlainName(std::string& out) const
         const PropertySchema& declared = fPath.schema->properties()[at];
         const PathKey* const key = fPath.findKey(declared.name);
         const ProviderValue& value = key != nullptr ? key->value : fValues[at];
-        if (!value.isPlain() || value.type() != declared.type ||
-            (key != nullptr && key->name.getString() != declared.name.getString()))
-        {
+        const bool isSpelled = key == nullptr || key->name.getString() == declared.name.getString();
+        if (declared.keyStart.empty() || !value.isPlain() || value.type() != declared.type || !isSpelled) {
             out.resize(size);
             return false;
         }
