@@ -47,7 +47,8 @@ class InstanceObject final : public Owned, public CMPIInstance
     //     of an unknown class has the properties that were set, the last one first, and none where the client gave a
     //     list: as on OpenPegasus. The log names the class then.
     CIMInstance delivered(const PropertyFilter& filter) const;
-    // Appends the same instance as VALUE.NAMEDINSTANCE, without making the objects in between.
+    // Throws: UninitializedObjectException for an instance without a class name.
+    // Appends the same instance as VALUE.NAMEDINSTANCE, without making the objects in between. Throws: the same.
     void appendDelivered(std::string& out, const PropertyFilter& filter) const;
     // Returns: the instance with all properties, for embedding and upcalls.
     CIMInstance value() const;

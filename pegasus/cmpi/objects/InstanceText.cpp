@@ -2,6 +2,7 @@
 #include "pegasus/cmpi/objects/InstanceObject.h"
 #include "pegasus/cmpi/services/DeclaredProperty.h"
 #include "pegasus/cmpi/services/PropertyFilter.h"
+#include "pegasus/common/NameAccess.h"
 #include "pegasus/wire/ElementEncoder.h"
 
 // An instance as the XML of an answer, written from its values and the texts of its class.
@@ -64,6 +65,7 @@ bool InstanceObject::appendPlainName(std::string& out) const
 
 void InstanceObject::appendDelivered(std::string& out, const PropertyFilter& filter) const
 {
+    notNull(fPath.className); // as delivered() does
     out += "<VALUE.NAMEDINSTANCE>\n";
     if (!appendPlainName(out)) {
         wire::appendInstanceName(out, deliveredPath(), kBlanks);
