@@ -34,12 +34,15 @@ template <typename T> CIMValue takeValue(PackedReader& values, bool isArray)
     return ValueAccess::make(std::move(array));
 }
 
-// Returns: a property with its value, which follows.
+// Returns: a property with its value, which may follow.
 CIMProperty makeProperty(const CIMProperty& declared, PackedState state, PackedReader& values)
 {
     auto* made = new CIMPropertyRep(ObjectAccess::rep(declared));
     CIMProperty property = ObjectAccess::wrap<CIMProperty>(made);
     if (state == PackedState::kNull) {
+        made->fValue.setNullValue(made->fValue.getType(), made->fValue.isArray(), made->fArraySize);
+    }
+    if (state != PackedState::kValue) {
         return property;
     }
     visitType(made->fValue.getType(), [&](auto tag) {

@@ -30,7 +30,8 @@ struct InstanceLayout
 
     CIMName fClassName; // of the path
     std::vector<Key> fKeys;
-    std::vector<CIMProperty> fProperties; // of packable types, with null values and without qualifiers
+    // Of packable types and without qualifiers. A value that is short is one that many instances may have.
+    std::vector<CIMProperty> fProperties;
 };
 
 // What an instance has of a property of its layout.
@@ -38,11 +39,12 @@ enum class PackedState : Uint8
 {
     kAbsent, // it lacks the property
     kNull,
+    kShared, // the value that the layout has
     kValue
 };
 
 // Writes the values of an instance one after the other: the texts of the keys, then a state for each property. A value
-// follows its state, an array's as its size and its elements.
+// of its own follows the state, an array's as its size and its elements.
 class PackedWriter
 {
   public:

@@ -10,6 +10,9 @@
 namespace Pegasus::wire {
 namespace {
 
+// Of a property's value: with longer ones instances seldom agree.
+constexpr std::size_t kMaxLearnedBytes = 256;
+
 bool isEmptyTag(std::string_view tag)
 {
     return tag.substr(tag.size() - 2) == "/>";
@@ -23,6 +26,14 @@ std::string_view withoutEnd(std::string_view tag)
 std::string between(const char* from, const char* to)
 {
     return std::string(from, static_cast<std::size_t>(to - from));
+}
+
+// Requires: it has a start tag and an end tag.
+std::string learnedValue(const XmlElement& element)
+{
+    std::string bytes = ">";
+    bytes.append(element.content()).append("</").append(element.name());
+    return bytes += '>';
 }
 
 bool isPackable(const CIMConstProperty& property)
@@ -112,9 +123,14 @@ bool InstancePattern::learnProperty(const XmlElement& element, const CIMConstPro
     if (!isPackable(property)) {
         return false;
     }
-    fProperties.push_back({std::string(withoutEnd(element.startTag())), property.getType(), property.isArray()});
+    const std::string_view tag = element.startTag();
+    fProperties.push_back({std::string(withoutEnd(tag)), property.getType(), property.isArray(), {}});
     CIMProperty declared = property.clone();
-    declared.setValue(CIMValue(property.getType(), property.isArray(), property.getArraySize()));
+    if (!isEmptyTag(tag) && element.content().size() <= kMaxLearnedBytes) {
+        fProperties.back().learned = learnedValue(element);
+    } else {
+        declared.setValue(CIMValue(property.getType(), property.isArray(), property.getArraySize()));
+    }
     layout.fProperties.push_back(declared);
     return true;
 }

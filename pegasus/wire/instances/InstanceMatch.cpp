@@ -42,6 +42,9 @@ bool InstanceMatch::takeElement()
     for (const InstancePattern::Property& property : fPattern.properties()) {
         if (!fText.take(property.start)) {
             fValues.putState(PackedState::kAbsent);
+        } else if (!property.learned.empty() && fText.take(property.learned)) {
+            fValues.putState(PackedState::kShared);
+            fText.skipBlanks();
         } else if (!takeRest(property)) {
             return false;
         }

@@ -17,7 +17,8 @@ namespace Pegasus::wire {
 
 // The tags of a VALUE.NAMEDINSTANCE that was read and decoded, and of others of its class. The instances of an answer
 // differ in their values, seldom in their tags: an element with known tags needs no reading, and of all checks those of
-// its values alone.
+// its values alone. Many properties have the same value in all of them: one with the bytes of the learned instance
+// needs no check, and shares the value of the layout.
 //
 // A pattern has keys with values, and properties of packable types. It knows the elements below, with blanks between
 // them. "head" and "start" stand for known bytes. The properties have an order, and each of them may be missing:
@@ -36,6 +37,7 @@ class InstancePattern
         std::string start; // its start tag without ">" or "/>"
         CIMType type;
         bool isArray;
+        std::string learned; // what followed the start where it was learned, with the end tag; empty when that was long
     };
 
     // Returns: nullopt for an element that has something else, or very long tags.
