@@ -89,8 +89,9 @@ std::size_t TInmemValues::PlaceFor(const std::string& name, const boost::shared_
         return place;
     }
     const std::string spelling = declaration ? declaration->GetName(TCIMContext()) : name;
-    auto member =
-        std::make_shared<const TInmemMember>(TInmemMember{name, std::move(key), spelling, declaration, instanceClass});
+    // Not std::make_shared: its unique symbol would keep the library in the process for ever.
+    std::shared_ptr<const TInmemMember> member(
+        new TInmemMember{name, std::move(key), spelling, declaration, instanceClass});
     TInmemLayout::MakeWritable(fLayout);
     if (isKnown) {
         fLayout->Replace(place, std::move(member));

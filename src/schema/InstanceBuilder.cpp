@@ -122,7 +122,7 @@ void TInstanceBuilder::Transfer(const Pegasus::CIMInstance& source, Pegasus::Uin
 
 boost::shared_ptr<TPEGASUSInstance> TInstanceBuilder::Build(const Pegasus::CIMInstance& source)
 {
-    const auto target = boost::dynamic_pointer_cast<TPEGASUSInstance>(fClass.AllocateInstance({}));
+    auto target = boost::dynamic_pointer_cast<TPEGASUSInstance>(fClass.AllocateInstance({}));
     const Pegasus::Uint32 count = source.getPropertyCount();
     for (Pegasus::Uint32 place = 0; place < count; ++place) {
         const Pegasus::CIMConstProperty property = source.getProperty(place);

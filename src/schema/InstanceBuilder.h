@@ -33,11 +33,11 @@ class TInstanceBuilder
     // A property's name, and what follows from it.
     struct TName
     {
-        Pegasus::String fServed; // as it came
-        std::string fServerName; // the same text
-        std::string fKey;        // normalised
-        bool fIsInstanceId;      // its value is never null
-        bool fIsSlotNumber;      // its value is 16 bits wide
+        Pegasus::String fServed;    // as it came
+        std::string fServerName;    // the same text
+        std::string fKey;           // normalised
+        bool fIsInstanceId = false; // its value is never null
+        bool fIsSlotNumber = false; // its value is 16 bits wide
     };
 
     const TName& NameAt(Pegasus::Uint32 place, const Pegasus::String& served);
