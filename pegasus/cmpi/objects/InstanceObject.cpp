@@ -169,7 +169,7 @@ void InstanceObject::setProperty(const char* name, const CMPIValue* value, CMPIT
     fLastSet = at;
     const PropertySchema& declared = fPath.schema->properties()[at];
     const bool mayBeTaken = value != nullptr && !declared.start.empty();
-    if (!mayBeTaken || !fValues[at].take(*value, type, declared.type)) {
+    if (!mayBeTaken || !fValues[at].take(value, type, declared.type)) {
         store(at, value, type);
     }
     if (declared.isKey) {

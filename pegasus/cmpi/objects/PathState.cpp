@@ -175,7 +175,7 @@ void PathState::addKey(const char* name, const CMPIValue* value, CMPIType type)
         throw CmpiError{CMPI_RC_ERR_INVALID_DATA_TYPE, {}};
     }
     PathKey key{keyNameOf(name, type), {}};
-    if (value == nullptr || !key.value.take(*value, type, cimTypeOf(type))) {
+    if (value == nullptr || !key.value.take(value, type, cimTypeOf(type))) {
         key.value = ProviderValue(decodeValue(value, type));
     }
     if (key.value.isNull()) {

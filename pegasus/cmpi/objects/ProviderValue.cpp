@@ -41,9 +41,9 @@ bool ProviderValue::takeInteger(Uint64 bits, CIMType type, CIMType wanted)
     return true;
 }
 
-template <typename T> bool ProviderValue::takeInteger(const CMPIValue& value, CIMType wanted)
+template <typename T> bool ProviderValue::takeInteger(const CMPIValue* value, CIMType wanted)
 {
-    return takeInteger(static_cast<Uint64>(readValue<T>(&value)), CIMTypeOf<T>::kType, wanted);
+    return takeInteger(static_cast<Uint64>(readValue<T>(value)), CIMTypeOf<T>::kType, wanted);
 }
 
 bool ProviderValue::takeText(const char* text, CIMType wanted)
@@ -64,11 +64,11 @@ bool ProviderValue::takeText(const char* text, CIMType wanted)
     return true;
 }
 
-bool ProviderValue::take(const CMPIValue& value, CMPIType type, CIMType wanted)
+bool ProviderValue::take(const CMPIValue* value, CMPIType type, CIMType wanted)
 {
     switch (type) {
     case CMPI_boolean:
-        return takeInteger(readValue<CMPIBoolean>(&value) != 0 ? 1 : 0, CIMTYPE_BOOLEAN, wanted);
+        return takeInteger(readValue<CMPIBoolean>(value) != 0 ? 1 : 0, CIMTYPE_BOOLEAN, wanted);
     case CMPI_uint8:
         return takeInteger<Uint8>(value, wanted);
     case CMPI_uint16:
@@ -86,11 +86,11 @@ bool ProviderValue::take(const CMPIValue& value, CMPIType type, CIMType wanted)
     case CMPI_sint64:
         return takeInteger<Sint64>(value, wanted);
     case CMPI_chars:
-        return takeText(reinterpret_cast<const char*>(&value), wanted);
+        return takeText(reinterpret_cast<const char*>(value), wanted);
     case CMPI_charsptr:
-        return takeText(readValue<const char*>(&value), wanted);
+        return takeText(readValue<const char*>(value), wanted);
     case CMPI_string: {
-        const CMPIString* const string = readValue<const CMPIString*>(&value);
+        const CMPIString* const string = readValue<const CMPIString*>(value);
         return takeText(string == nullptr ? nullptr : static_cast<const char*>(string->hdl), wanted);
     }
     default:

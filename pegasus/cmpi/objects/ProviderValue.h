@@ -20,7 +20,7 @@ class ProviderValue
     // Copies what a provider passes as (value, type) if it is of the type `wanted` and can be kept as it is.
     // Returns: false for any other value, which decodeValue() reads; this one stays as it was.
     // Throws: with strict providers CMPI_RC_ERR_FAILED for a text that is not UTF-8.
-    bool take(const CMPIValue& value, CMPIType type, CIMType wanted);
+    bool take(const CMPIValue* value, CMPIType type, CIMType wanted);
 
     // Makes it one that is not set; the memory of a short text stays for the next.
     void reset() noexcept;
@@ -46,7 +46,7 @@ class ProviderValue
     };
 
     bool takeInteger(Uint64 bits, CIMType type, CIMType wanted);
-    template <typename T> bool takeInteger(const CMPIValue& value, CIMType wanted);
+    template <typename T> bool takeInteger(const CMPIValue* value, CIMType wanted);
     bool takeText(const char* text, CIMType wanted);
 
     Form fForm = Form::kUnset;
