@@ -5,25 +5,27 @@
 
 #include <algorithm>
 #include <cstdint>
-#include <cstring>
+
+#include <emmintrin.h> // every x86-64 processor has it
 
 namespace Pegasus::base {
 namespace {
 
-constexpr std::size_t kBlock = 8;
-using Bytes [[gnu::vector_size(kBlock)]] = unsigned char;
-using Units [[gnu::vector_size(kBlock * sizeof(Char16))]] = Uint16;
+constexpr std::size_t kBlock = sizeof(__m128i); // bytes, or units in two halves
 
 bool isContinuation(unsigned char byte)
 {
     return (byte & 0xC0) == 0x80;
 }
 
-bool isAsciiBlock(const char* from) noexcept
+__m128i load(const void* from) noexcept
 {
-    std::uint64_t block = 0;
-    std::memcpy(&block, from, kBlock);
-    return (block & 0x8080808080808080u) == 0;
+    return _mm_loadu_si128(static_cast<const __m128i*>(from));
+}
+
+void store(void* to, __m128i block) noexcept
+{
+    _mm_storeu_si128(static_cast<__m128i*>(to), block);
 }
 
 // Copies whole blocks of ASCII, the common case. Returns: how many bytes.
@@ -31,33 +33,34 @@ std::size_t copyAsciiBlocks(const char* from, std::size_t size, Char16* to) noex
 {
     std::size_t done = 0;
     for (; size - done >= kBlock; done += kBlock) {
-        if (!isAsciiBlock(from + done)) {
+        const __m128i bytes = load(from + done);
+        if (_mm_movemask_epi8(bytes) != 0) {
             break;
         }
-        Bytes bytes;
-        std::memcpy(&bytes, from + done, sizeof bytes);
-        const Units units = __builtin_convertvector(bytes, Units);
-        std::memcpy(static_cast<void*>(to + done), &units, sizeof units);
+        store(to + done, _mm_unpacklo_epi8(bytes, _mm_setzero_si128()));
+        store(to + done + kBlock / 2, _mm_unpackhi_epi8(bytes, _mm_setzero_si128()));
     }
     return done;
 }
 
-bool isAsciiBlock(const Char16* from) noexcept
+bool isAscii(__m128i units) noexcept
 {
-    std::uint64_t blocks[2] = {};
-    static_assert(sizeof blocks == kBlock * sizeof(Char16));
-    std::memcpy(blocks, static_cast<const void*>(from), sizeof blocks);
-    return ((blocks[0] | blocks[1]) & 0xFF80FF80FF80FF80u) == 0;
+    const __m128i beyond = _mm_and_si128(units, _mm_set1_epi16(~0x7F));
+    return _mm_movemask_epi8(_mm_cmpeq_epi16(beyond, _mm_setzero_si128())) == 0xFFFF;
 }
 
 // Copies ASCII up to the first other unit. Returns: how many units.
 std::size_t copyAscii(const Char16* from, std::size_t count, char* to) noexcept
 {
+    static_assert(sizeof(Char16) == sizeof(Uint16));
     std::size_t done = 0;
-    for (; count - done >= kBlock && isAsciiBlock(from + done); done += kBlock) {
-        for (std::size_t i = 0; i < kBlock; ++i) {
-            to[done + i] = static_cast<char>(Uint16(from[done + i]));
+    for (; count - done >= kBlock; done += kBlock) {
+        const __m128i first = load(from + done);
+        const __m128i second = load(from + done + kBlock / 2);
+        if (!isAscii(_mm_or_si128(first, second))) {
+            break;
         }
+        store(to + done, _mm_packus_epi16(first, second));
     }
     for (; done < count && Uint16(from[done]) < 0x80; ++done) {
         to[done] = static_cast<char>(Uint16(from[done]));
