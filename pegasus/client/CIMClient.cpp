@@ -37,6 +37,34 @@ T readOne(CIMClientRep& rep, client::Request request, const char* elementName,
     return result;
 }
 
+CIMClass readClass(CIMClientRep& rep, client::Request request)
+{
+    CIMClass result;
+    bool found = false;
+    request.result = "CLASS";
+    client::KnownClasses& known = rep.knownClasses();
+    rep.exchange(
+        request,
+        [&](const XmlElement& element, ElementDecoder& decoder) {
+            if (found) {
+                failUnexpected(element);
+            }
+            const std::size_t before = decoder.decodedBytes();
+            result = decoder.decodeClass(element);
+            known.learn(element, result, decoder.decodedBytes() - before);
+            found = true;
+        },
+        [&](std::string_view text, ElementDecoder& decoder) {
+            const wire::XmlOffer offer = found ? wire::XmlOffer() : known.take(text, result);
+            if (offer.result == wire::XmlOffer::Result::kTaken) {
+                decoder.addDecodedBytes(known.bytes());
+                found = true;
+            }
+            return offer;
+        });
+    return result;
+}
+
 // An operation whose result is a list.
 template <typename T>
 Array<T> readAll(CIMClientRep& rep, const client::Request& request, T (ElementDecoder::*decode)(const XmlElement&))
@@ -129,7 +157,7 @@ CIMClass CIMClient::getClass(const CIMNamespaceName& nameSpace, const CIMName& c
         .flag("IncludeQualifiers", includeQualifiers, true)
         .flag("IncludeClassOrigin", includeClassOrigin, false)
         .propertyList(propertyList);
-    return readOne(*fRep, makeRequest(call), "CLASS", &ElementDecoder::decodeClass);
+    return readClass(*fRep, makeRequest(call));
 }
 
 Array<CIMClass> CIMClient::enumerateClasses(const CIMNamespaceName& nameSpace, const CIMName& className,

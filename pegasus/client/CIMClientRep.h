@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "pegasus/client/KnownClasses.h"
 #include "pegasus/client/Request.h"
 #include "pegasus/client/ResponseReader.h"
 #include "pegasus/client/ServerConnection.h"
@@ -57,8 +58,9 @@ class CIMClientRep
     // success with an empty result. Throws: what CIMClient's operations throw.
     void exchange(const client::Request& request, const ContentHandler& onContent, const OfferHandler& onOffer = {});
 
-    // What this client knows of instances that it has read.
+    // What this client knows of what it has read.
     wire::KnownInstances& knownInstances() { return fKnownInstances; }
+    client::KnownClasses& knownClasses() { return fKnownClasses; }
 
   private:
     void exchangeOnce(const client::Request& request, const ContentHandler& onContent, const OfferHandler& onOffer);
@@ -68,6 +70,7 @@ class CIMClientRep
     client::ClientLimits fLimits;
     wire::ElementDecoder fDecoder{fLimits.xml}; // kept, so that the names of all answers share their texts
     wire::KnownInstances fKnownInstances{fLimits.xml};
+    client::KnownClasses fKnownClasses;
     std::optional<client::ServerAddress> fAddress;
     client::ServerConnection fConnection;
     std::vector<char> fReceiveBuffer;

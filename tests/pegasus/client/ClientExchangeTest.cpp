@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 // A client and a peer that plays good and bad answers: the exceptions, the deadline, and that the next call works.
+#include "pegasus/wire/ElementEncoder.h"
 #include "tests/support/PeerAnswers.h"
 
 #include <Pegasus/Client/CIMClient.h>
@@ -141,6 +142,13 @@ const Fault kFaults[] = {
          return good(other);
      },
      "Pegasus::CIMClientResponseException: Mismatched response:  Got an answer to \"EnumerateInstances\""},
+    {"a second class",
+     [](const PeerRequest& r) {
+         std::string xml;
+         wire::appendClass(xml, fanClass());
+         return test::httpAnswer(test::intrinsicBody(r, xml + xml));
+     },
+     "Pegasus::CIMClientXmlException: Validation error: on line "},
     {"no result", [](const PeerRequest& r) { return test::httpAnswer(test::intrinsicBody(r, "")); },
      "Pegasus::CIMClientXmlException: Validation error: on line 11: expected ERROR or IRETURNVALUE element with CLASS "
      "(GetClass answer, column "},
@@ -173,7 +181,11 @@ TEST(ClientExchange, ReadsClassesAndInstancesOverOneConnection)
     CIMClient client;
     connect(client, peer);
 
-    EXPECT_TRUE(client.getClass(kNameSpace, "t_fan", false).identical(fanClass()));
+    for (int i = 0; i < 3; ++i) {
+        CIMClass read = client.getClass(kNameSpace, "t_fan", false);
+        EXPECT_TRUE(read.identical(fanClass())) << i;
+        read.removeProperty(0);
+    }
     const Array<CIMInstance> fans = client.enumerateInstances(kNameSpace, "T_Fan", false);
     ASSERT_EQ(fans.size(), 2u);
     EXPECT_TRUE(fans[1].identical(fan("b", 2)));
@@ -183,15 +195,21 @@ TEST(ClientExchange, ReadsClassesAndInstancesOverOneConnection)
 TEST(ClientExchange, EachFaultHasItsExceptionAndTheNextCallWorks)
 {
     for (const Fault& fault : kFaults) {
-        SCOPED_TRACE(fault.name);
-        test::ServedModel model;
-        model.addClass(kNameSpace, fanClass()).addFault("GetClass", fault.answer);
-        test::ScriptedPeer peer(model.handler());
-        CIMClient client;
-        connect(client, peer);
-        const std::string result = getClassOutcome(client);
-        EXPECT_EQ(result.rfind(fault.outcome, 0), 0u) << result;
-        EXPECT_EQ(getClassOutcome(client), "ok");
+        for (const char* classIs : {"new", "known"}) {
+            SCOPED_TRACE(std::string(fault.name) + ", the class is " + classIs);
+            test::ServedModel model;
+            model.addClass(kNameSpace, fanClass());
+            test::ScriptedPeer peer(model.handler());
+            CIMClient client;
+            connect(client, peer);
+            if (std::string(classIs) == "known") {
+                EXPECT_EQ(getClassOutcome(client), "ok");
+            }
+            model.addFault("GetClass", fault.answer);
+            const std::string result = getClassOutcome(client);
+            EXPECT_EQ(result.rfind(fault.outcome, 0), 0u) << result;
+            EXPECT_EQ(getClassOutcome(client), "ok");
+        }
     }
 }
 
