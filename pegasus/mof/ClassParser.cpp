@@ -133,12 +133,14 @@ void ClassParser::addMethod(CIMClass& owner, const CIMMethod& method, std::size_
 // Other servers look a property's class up when the class is created; a class may name itself.
 void ClassParser::checkNamedClasses(const CIMClass& owner, const CIMConstProperty& property, std::size_t offset)
 {
-    const auto isUnknown = [&](const CIMName& name) {
-        return !name.isNull() && !name.equal(owner.getClassName()) && !fCompilation.handler.hasClass(name);
+    const auto check = [&](const CIMName& name, const std::string& kind) {
+        if (!name.isNull() && !name.equal(owner.getClassName()) && fCompilation.portability.isNews(kind) &&
+            !fCompilation.delivery.hasClass(name))
+        {
+            fCompilation.portability.report(fCursor, offset, kind);
+        }
     };
-    if (isUnknown(property.getReferenceClassName())) {
-        fCompilation.portability.report(fCursor, offset, "a reference to a class that is not declared yet");
-    }
+    check(property.getReferenceClassName(), "a reference to a class that is not declared yet");
     const Uint32 index = property.findQualifier(CIMName("EmbeddedInstance"));
     const CIMValue embedded = index == PEG_NOT_FOUND ? CIMValue() : property.getQualifier(index).getValue();
     if (embedded.isNull() || embedded.getType() != CIMTYPE_STRING || embedded.isArray()) {
@@ -146,8 +148,8 @@ void ClassParser::checkNamedClasses(const CIMClass& owner, const CIMConstPropert
     }
     String name;
     embedded.get(name);
-    if (CIMName::legal(name) && isUnknown(CIMName(name))) {
-        fCompilation.portability.report(fCursor, offset, "EmbeddedInstance of a class that is not declared yet");
+    if (CIMName::legal(name)) {
+        check(CIMName(name), "EmbeddedInstance of a class that is not declared yet");
     }
 }
 

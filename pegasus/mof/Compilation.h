@@ -3,10 +3,11 @@
 
 #include "pegasus/mof/AliasTable.h"
 #include "pegasus/mof/Compiler.h"
+#include "pegasus/mof/Delivery.h"
 #include "pegasus/mof/Includes.h"
 #include "pegasus/mof/InstanceQueue.h"
 #include "pegasus/mof/Portability.h"
-#include "pegasus/mof/ShownText.h"
+#include "pegasus/mof/SkippedDefinitions.h"
 
 namespace Pegasus::mof {
 
@@ -15,20 +16,18 @@ namespace Pegasus::mof {
 struct Compilation
 {
     Compilation(const CompileOptions& given, const std::string& firstFile, DefinitionHandler& target)
-        : options(given), handler(target), instances(target, aliases), includes(firstFile, given.includeDirectories),
-          portability(given.isStrict)
+        : options(given), delivery(target, given.limits), instances(delivery, aliases),
+          includes(firstFile, given.includeDirectories), portability(given.isStrict)
     {
     }
 
-    void warn(const SourcePlace& place, const std::string& text) const { handler.warn(place.text(), shownText(text)); }
-
     const CompileOptions& options;
-    DefinitionHandler& handler;
+    Delivery delivery;
     AliasTable aliases;
     InstanceQueue instances;
     Includes includes;
     Portability portability;
-    std::size_t includeDepth = 0;
+    OpenFiles files;
     std::size_t includeCount = 0;
 };
 

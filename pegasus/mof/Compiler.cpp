@@ -3,16 +3,26 @@
 
 #include "pegasus/mof/FileCompiler.h"
 
+#include <memory>
+
 namespace Pegasus::mof {
 
 namespace {
 
-void compile(const SourceText& source, const CompileOptions& options, DefinitionHandler& handler)
+void compile(SourceText text, const CompileOptions& options, DefinitionHandler& handler)
 {
-    Compilation compilation(options, source.name(), handler);
+    const auto source = std::make_shared<const SourceText>(std::move(text));
+    Compilation compilation(options, source->name(), handler);
     handler.useNamespace(options.nameSpace);
-    FileCompiler(source, compilation).run();
-    compilation.instances.finish();
+    try {
+        FileCompiler(source, compilation).run();
+        compilation.instances.finish();
+        compilation.delivery.finish();
+    } catch (MofError& error) {
+        compilation.delivery.finish(); // a class before this error may fail; its error is the first one then
+        error.addSkipped(countDefinitionsAfter(compilation.files, options.limits));
+        throw;
+    }
 }
 
 } // namespace

@@ -33,9 +33,11 @@ struct CompileOptions
 
 // Compiles one MOF file (DSP0004 v2) and what it includes, definition by definition, into a handler.
 //
-// It is one pass: a definition is parsed, typed and delivered before the next one is read. A qualifier takes its type
-// from its declaration and an instance's value from its class, both as the handler knows them at that moment, so both
-// must come first in the text. Only aliases may be used before their definition: such instances wait.
+// It is one pass. A qualifier takes its type from its declaration and an instance's value from its class, both as the
+// handler knows them at that moment, so both must come first in the text. Only aliases may be used before their
+// definition: such instances wait. While the handler creates a class, a few classes after it are parsed (Delivery);
+// what is delivered and reported, and in which order, is the same as if each definition were delivered before the next
+// is read.
 //
 // An include is looked for in the including file's directory, the current directory and the include directories. A file
 // outside the first file's directory and the include directories is refused.

@@ -15,7 +15,8 @@ namespace Pegasus::mof {
 //
 // Throws: any function may throw a Pegasus::Exception. The compiler turns it into an error at the definition's place in
 //     the text and stops.
-// Thread: called on the thread that compiles.
+// Thread: createClass(), and warn() for a class that exists already, may be called on a thread of the compiler's own;
+//     the others on the thread that compiles. One call at a time, in the order of the text.
 class DefinitionHandler
 {
   public:

@@ -4,7 +4,6 @@
 #include "pegasus/base/Text.h"
 #include "pegasus/mof/ClassParser.h"
 #include "pegasus/mof/InstanceParser.h"
-#include "pegasus/mof/SkippedDefinitions.h"
 #include "pegasus/mof/ValueBuilder.h"
 
 #include <Pegasus/Common/Exception.h>
@@ -50,28 +49,25 @@ bool isVersion(const std::string& text)
 
 } // namespace
 
-FileCompiler::FileCompiler(const SourceText& source, Compilation& compilation)
-    : fSource(source), fCompilation(compilation),
-      fCursor(source, compilation.options.limits,
-              [&compilation](const SourcePlace& place, const std::string& text) { compilation.warn(place, text); })
+FileCompiler::FileCompiler(const std::shared_ptr<const SourceText>& source, Compilation& compilation)
+    : fSource(*source), fCompilation(compilation),
+      fCursor(fSource, compilation.options.limits, [&compilation](const SourcePlace& place, const std::string& text) {
+          compilation.delivery.warn(place, text);
+      })
 {
+    compilation.files.push_back({source, std::nullopt});
 }
 
 void FileCompiler::run()
 {
-    std::optional<std::size_t> current; // where the definition starts that is being compiled
-    try {
-        if (fSource.hasByteOrderMark()) {
-            fCompilation.portability.report(fCursor, 0, "a byte-order mark");
-        }
-        while (fCursor.current().kind != TokenKind::kEnd) {
-            current = fSubject = fCursor.current().offset;
-            compileDefinition();
-        }
-    } catch (MofError& error) {
-        error.addSkipped(countDefinitionsAfter(fSource, fCursor.limits(), current));
-        throw;
+    if (fSource.hasByteOrderMark()) {
+        fCompilation.portability.report(fCursor, 0, "a byte-order mark");
     }
+    while (fCursor.current().kind != TokenKind::kEnd) {
+        fCompilation.files.back().definition = fSubject = fCursor.current().offset;
+        compileDefinition();
+    }
+    fCompilation.files.pop_back();
 }
 
 // An exception of the handler becomes an error at the definition's subject.
@@ -110,10 +106,11 @@ void FileCompiler::definition()
 void FileCompiler::defineClass(const Qualifiers& qualifiers)
 {
     fSubject = fCursor.current().offset;
+    const SourcePlace place = fCursor.place(fSubject);
     const ParsedClass parsed = ClassParser(fCursor, fCompilation).parse(qualifiers);
     const CIMName name = parsed.itsClass.getClassName();
-    if (isWelcome(parsed.itsClass) && !fCompilation.handler.createClass(parsed.itsClass)) {
-        warn("Class " + base::utf8(name.getString()) + " already exists in the repository");
+    if (isWelcome(parsed.itsClass)) {
+        fCompilation.delivery.createClass(parsed.itsClass, place, fCompilation.files);
     }
     if (!parsed.alias.empty() &&
         !fCompilation.aliases.define(parsed.alias, CIMObjectPath(String(), CIMNamespaceName(), name)))
@@ -151,7 +148,7 @@ void FileCompiler::defineQualifier(const Qualifiers& qualifiers)
         fCursor.failAt(fSubject, "a qualifier declaration cannot have qualifiers");
     }
     fSubject = fCursor.current().offset;
-    fCompilation.handler.declareQualifier(QualifierParser(fCursor, fCompilation).parseDeclaration());
+    fCompilation.delivery.declareQualifier(QualifierParser(fCursor, fCompilation).parseDeclaration());
 }
 
 // OpenPegasus's compiler ignores `#pragma namespace` too: everything goes to the namespace of the command line.
@@ -176,7 +173,7 @@ void FileCompiler::obeyPragma()
 void FileCompiler::include(const std::string& name)
 {
     const CompileLimits& limits = fCompilation.options.limits;
-    if (fCompilation.includeDepth == limits.includeDepth) {
+    if (fCompilation.files.size() > limits.includeDepth) {
         fCursor.failAt(fSubject, "include is nested deeper than the limit includeDepth (" +
                                      std::to_string(limits.includeDepth) + ")");
     }
@@ -203,13 +200,11 @@ void FileCompiler::compileIncluded(const std::string& path)
                                      "folders; cimmof --any-include accepts it");
     }
     try {
-        SourceText source = SourceText::read(path, fCompilation.options.limits.fileBytes);
+        const auto source = std::make_shared<SourceText>(SourceText::read(path, fCompilation.options.limits.fileBytes));
         if (!isOwn) {
-            source.hideLines();
+            source->hideLines();
         }
-        ++fCompilation.includeDepth;
         FileCompiler(source, fCompilation).run();
-        --fCompilation.includeDepth;
     } catch (const FileError& error) {
         fCursor.failAt(fSubject, error.what());
     }

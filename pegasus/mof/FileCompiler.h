@@ -6,6 +6,7 @@
 
 #include <Pegasus/Common/CIMQualifier.h>
 
+#include <memory>
 #include <vector>
 
 namespace Pegasus::mof {
@@ -16,9 +17,9 @@ namespace Pegasus::mof {
 class FileCompiler
 {
   public:
-    FileCompiler(const SourceText& source, Compilation& compilation);
+    FileCompiler(const std::shared_ptr<const SourceText>& source, Compilation& compilation);
 
-    // Throws: MofError at the first error.
+    // Throws: MofError at the first error. Compilation::files then says where each open file stands.
     void run();
 
   private:

@@ -61,7 +61,7 @@ CIMClass InstanceParser::parseClass()
 {
     const Token name = fCursor.expect(TokenKind::kIdentifier, "a class name");
     CIMClass found;
-    if (!fCompilation.handler.findClass(CIMName(name.text.c_str()), found)) {
+    if (!fCompilation.delivery.findClass(CIMName(name.text.c_str()), found)) {
         fCursor.failAt(name.offset, "Error getting class " + name.text + " from namespace " +
                                         base::utf8(fCompilation.options.nameSpace.getString()) +
                                         ": CIM_ERR_NOT_FOUND: " + name.text);

@@ -56,8 +56,8 @@ void InstanceQueue::settle()
             if (it->open.empty()) {
                 const ParsedInstance complete = std::move(*it);
                 it = fWaiting.erase(it);
-                if (!fHandler.createInstance(complete.instance)) {
-                    fHandler.warn(complete.place.text(), "the instance already exists, it is not changed");
+                if (!fDelivery.createInstance(complete.instance)) {
+                    fDelivery.warn(complete.place, "the instance already exists, it is not changed");
                 }
             } else {
                 ++it;

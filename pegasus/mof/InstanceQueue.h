@@ -2,7 +2,7 @@
 #pragma once
 
 #include "pegasus/mof/AliasTable.h"
-#include "pegasus/mof/DefinitionHandler.h"
+#include "pegasus/mof/Delivery.h"
 #include "pegasus/mof/MofError.h"
 
 #include <list>
@@ -29,13 +29,13 @@ struct ParsedInstance
     SourcePlace place;
 };
 
-// Delivers instances to the handler. DSP0004 lets an instance use an alias that is defined further down, in circles
+// Delivers instances. DSP0004 lets an instance use an alias that is defined further down, in circles
 // too. Such an instance waits until the alias has a path, which it has as soon as the keys of its own instance are
 // known. Requires: what the constructor takes outlives the queue.
 class InstanceQueue
 {
   public:
-    InstanceQueue(DefinitionHandler& handler, AliasTable& aliases) : fHandler(handler), fAliases(aliases) {}
+    InstanceQueue(Delivery& delivery, AliasTable& aliases) : fDelivery(delivery), fAliases(aliases) {}
 
     // Delivers the instance and those that waited for it, or lets it wait.
     // Throws: MofError for an alias that is defined already; what the handler throws.
@@ -49,7 +49,7 @@ class InstanceQueue
     bool nameAlias(ParsedInstance& parsed);
     void settle();
 
-    DefinitionHandler& fHandler;
+    Delivery& fDelivery;
     AliasTable& fAliases;
     std::list<ParsedInstance> fWaiting;
 };

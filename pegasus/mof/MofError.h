@@ -4,8 +4,13 @@
 #include <cstddef>
 #include <stdexcept>
 #include <string>
+#include <string_view>
 
 namespace Pegasus::mof {
+
+// Text of a foreign file or of a server, for a terminal or a log: control characters and bytes outside UTF-8 become
+// "\x1B", and the text stays on one line. Tabs and backslashes stay. Text that was converted before is unchanged.
+std::string shownText(std::string_view text);
 
 // A place in a source text. Lines and columns count from 1, columns in bytes.
 struct SourcePlace

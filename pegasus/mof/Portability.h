@@ -19,6 +19,10 @@ class Portability
   public:
     explicit Portability(bool isStrict) : fIsStrict(isStrict) {}
 
+    // Returns: whether report() would still say something of this kind. Whoever must ask the handler to find such a
+    //     text asks this first.
+    bool isNews(const std::string& kind) const { return fIsStrict || fReported.count(kind) == 0; }
+
     // `kind`: the text as a noun phrase without names; the place says which one it is.
     // Throws: MofError when the check is strict.
     void report(const TokenCursor& cursor, std::size_t offset, const std::string& kind)

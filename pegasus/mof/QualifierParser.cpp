@@ -94,7 +94,7 @@ CIMQualifier QualifierParser::parseUse()
 CIMQualifierDecl QualifierParser::declarationOf(const Token& name)
 {
     CIMQualifierDecl declaration;
-    if (!fCompilation.handler.findQualifier(CIMName(name.text.c_str()), declaration)) {
+    if (!fCompilation.delivery.findQualifier(CIMName(name.text.c_str()), declaration)) {
         fCursor.failAt(name.offset, "Could not find declaration for Qualifier named " + name.text);
     }
     return declaration;

@@ -61,4 +61,13 @@ std::size_t countDefinitionsAfter(const SourceText& source, const CompileLimits&
     return hasCountedFaulty ? count - 1 : count;
 }
 
+std::size_t countDefinitionsAfter(const OpenFiles& files, const CompileLimits& limits)
+{
+    std::size_t count = 0;
+    for (const OpenFile& file : files) {
+        count += countDefinitionsAfter(*file.source, limits, file.definition);
+    }
+    return count;
+}
+
 } // namespace Pegasus::mof

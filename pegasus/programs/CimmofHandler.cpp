@@ -11,9 +11,8 @@ namespace Pegasus::cimmof {
 
 namespace {
 
-// Instances of more classes than this in turn ask the server again, and references to more names.
+// Instances of more classes than this in turn ask the server again.
 constexpr std::size_t kMaxRememberedClasses = 256;
-constexpr std::size_t kMaxRememberedNames = 64u << 10;
 
 // The message that stays in front of whatever the server said.
 [[noreturn]] void failAdding(const String& what, const Exception& cause)
@@ -26,9 +25,7 @@ constexpr std::size_t kMaxRememberedNames = 64u << 10;
 void ServerHandler::useNamespace(const CIMNamespaceName& nameSpace)
 {
     fNamespace = nameSpace;
-    fQualifiers.clear();
     fClasses.clear();
-    fClassNames.clear();
     CIMInstance instance(CIMName("__NameSpace"));
     instance.addProperty(CIMProperty(CIMName("Name"), CIMValue(String())));
     try {
@@ -42,17 +39,10 @@ void ServerHandler::useNamespace(const CIMNamespaceName& nameSpace)
 
 bool ServerHandler::findQualifier(const CIMName& name, CIMQualifierDecl& declaration)
 {
-    const std::string key = base::utf8(name.getString());
-    const auto known = fQualifiers.find(key);
-    if (known != fQualifiers.end()) {
-        declaration = known->second;
-        return true;
-    }
     try {
-        declaration = fQualifiers[key] = fClient.getQualifier(fNamespace, name);
+        declaration = fClient.getQualifier(fNamespace, name);
         return true;
     } catch (const CIMException& error) {
-        fQualifiers.erase(key);
         if (error.getCode() == CIM_ERR_NOT_FOUND) {
             return false;
         }
@@ -86,33 +76,19 @@ bool ServerHandler::findClass(const CIMName& name, CIMClass& found)
 // Asks for as little of the class as there is.
 bool ServerHandler::hasClass(const CIMName& name)
 {
-    if (fClassNames.count(base::utf8(name.getString())) != 0) {
-        return true;
-    }
     try {
         fClient.getClass(fNamespace, name, true, false, false, CIMPropertyList(Array<CIMName>()));
+        return true;
     } catch (const CIMException& error) {
         if (error.getCode() == CIM_ERR_NOT_FOUND) {
             return false;
         }
         throw;
     }
-    rememberName(name);
-    return true;
 }
 
-void ServerHandler::rememberName(const CIMName& name)
-{
-    if (fClassNames.size() >= kMaxRememberedNames) {
-        fClassNames.clear();
-    }
-    fClassNames.insert(base::utf8(name.getString()));
-}
-
-// What the server then holds may differ: it keeps a declaration whose type would change.
 void ServerHandler::declareQualifier(const CIMQualifierDecl& declaration)
 {
-    fQualifiers.clear();
     try {
         fClient.setQualifier(fNamespace, declaration);
     } catch (const CIMException& error) {
@@ -124,11 +100,9 @@ bool ServerHandler::createClass(const CIMClass& newClass)
 {
     try {
         fClient.createClass(fNamespace, newClass);
-        rememberName(newClass.getClassName());
         return true;
     } catch (const CIMException& error) {
         if (error.getCode() == CIM_ERR_ALREADY_EXISTS) {
-            rememberName(newClass.getClassName());
             return false;
         }
         failAdding(String("class ") + newClass.getClassName().getString() + String(" to the repository"), error);

@@ -6,12 +6,11 @@
 #include <Pegasus/Client/CIMClient.h>
 
 #include <map>
-#include <set>
 #include <string>
 
 namespace Pegasus::cimmof {
 
-// Brings definitions into a server, and remembers the declarations and classes that it had to ask for.
+// Brings definitions into a server, and remembers the classes that it had to fetch.
 //
 // Thread: one thread at a time. Throws: Pegasus::Exception whose message names the action that failed.
 class ServerHandler : public mof::DefinitionHandler
@@ -33,14 +32,10 @@ class ServerHandler : public mof::DefinitionHandler
     void warn(const std::string& place, const std::string& text) override;
 
   private:
-    void rememberName(const CIMName& name);
-
     CIMClient& fClient;
     bool fHideWarnings;
     CIMNamespaceName fNamespace;
-    std::map<std::string, CIMQualifierDecl> fQualifiers; // of fNamespace, by name as written
-    std::map<std::string, CIMClass> fClasses;            // of fNamespace, by name as written
-    std::set<std::string> fClassNames;                   // of classes that fNamespace has, as written
+    std::map<std::string, CIMClass> fClasses; // of fNamespace, by name as written
 };
 
 } // namespace Pegasus::cimmof

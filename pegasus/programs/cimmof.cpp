@@ -2,7 +2,7 @@
 #include "pegasus/base/Text.h"
 #include "pegasus/mof/Compiler.h"
 #include "pegasus/mof/MemoryHandler.h"
-#include "pegasus/mof/ShownText.h"
+#include "pegasus/mof/MofError.h"
 #include "pegasus/programs/CimmofHandler.h"
 #include "pegasus/programs/CimmofOptions.h"
 #include "pegasus/server/admin/ConfigFile.h"

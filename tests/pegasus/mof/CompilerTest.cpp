@@ -7,6 +7,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <atomic>
+
 using namespace Pegasus;
 using namespace Pegasus::mof;
 using mof_test::describe;
@@ -37,6 +39,47 @@ MemoryHandler compile(const std::string& text, const CompileOptions& with = opti
     compileText(kQualifiers + text, "t.mof", with, handler);
     return handler;
 }
+
+// Writes down its calls, and finds one that begins while another runs.
+class Recorder : public MemoryHandler
+{
+  public:
+    void declareQualifier(const CIMQualifierDecl& declaration) override
+    {
+        const Call call(*this, "declare " + utf8(declaration.getName().getString()));
+        MemoryHandler::declareQualifier(declaration);
+    }
+    bool createClass(const CIMClass& newClass) override
+    {
+        const Call call(*this, utf8(newClass.getClassName().getString()));
+        return MemoryHandler::createClass(newClass);
+    }
+    bool createInstance(const CIMInstance& newInstance) override
+    {
+        const Call call(*this, "instance of " + utf8(newInstance.getClassName().getString()));
+        return MemoryHandler::createInstance(newInstance);
+    }
+    void warn(const std::string& place, const std::string& text) override
+    {
+        const Call call(*this, "warn " + place);
+        MemoryHandler::warn(place, text);
+    }
+
+    std::string calls; // each with a semicolon
+
+  private:
+    struct Call
+    {
+        Call(Recorder& owner, const std::string& text) : running(owner.fRunning)
+        {
+            EXPECT_EQ(running.fetch_add(1), 0) << text;
+            owner.calls += text + ";";
+        }
+        ~Call() { --running; }
+        std::atomic<int>& running;
+    };
+    std::atomic<int> fRunning{0};
+};
 
 // Returns: the error as "line:column: cause"; empty on success.
 std::string failureOf(const std::string& text, const CompileOptions& with = options())
@@ -336,6 +379,47 @@ TEST(Compiler, DeliversEverythingInFrontOfTheFirstError)
         EXPECT_THROW(compileText(text, "t.mof", options(), handler), MofError) << fault;
         ASSERT_EQ(handler.classes().size(), 1u) << fault;
         EXPECT_EQ(describe(handler.classes()[0]), "class A { }") << fault;
+    }
+}
+
+// The compiler parses on while the handler creates a class; whoever watches the handler must not notice.
+TEST(Compiler, CallsTheHandlerInTheOrderOfTheText)
+{
+    std::string many;
+    std::string manyCalls;
+    for (int i = 0; i < 300; ++i) {
+        many += "class M" + std::to_string(i) + " {};";
+        manyCalls += "M" + std::to_string(i) + ";";
+    }
+    struct Row
+    {
+        std::string text;
+        std::string calls;
+        const char* cause;
+    };
+    const Row rows[] = {
+        {"class A {}; class A {}; #pragma other (\"x\")\nclass B {};", "A;A;warn t.mof:1:19;warn t.mof:1:40;B;", ""},
+        {"class A {}; Qualifier Q : string, Scope(any); class B {}; instance of B {}; class C {};",
+         "A;declare Q;B;instance of B;C;", ""},
+        {"class A {}; class X : Nope {}; class B {};", "A;X;", "superclass does not exist: Nope"},
+        {"class X : Nope {}; #pragma other (\"x\")\nclass B {};", "X;", "superclass does not exist: Nope"},
+        {"class X : Nope {}; Qualifier Q : string, Scope(any);", "X;", "superclass does not exist: Nope"},
+        {"class X : Nope {}; instance of X {};", "X;", "superclass does not exist: Nope"},
+        {"class X : Nope {}; class { fault", "X;", "superclass does not exist: Nope"},
+        {"class A {}; class { fault", "A;", "expected a class name instead of '{'"},
+        {many, manyCalls, ""},
+        {many + "class X : Nope {};" + many, manyCalls + "X;", "superclass does not exist: Nope"},
+    };
+    for (const Row& row : rows) {
+        Recorder handler;
+        std::string cause;
+        try {
+            compileText(row.text, "t.mof", options(), handler);
+        } catch (const MofError& error) {
+            cause = error.cause();
+        }
+        EXPECT_EQ(handler.calls, row.calls) << row.text.substr(0, 80);
+        EXPECT_EQ(cause, row.cause) << row.text.substr(0, 80);
     }
 }
 

@@ -170,15 +170,36 @@ TEST(Include, GoesOnWithoutAMissingFile)
 
 TEST(Include, CountsWhatAnErrorKeepsFromBeingCompiledInEveryFile)
 {
-    const TemporaryDirectory tree;
-    tree.write("inner.mof", "class A { fault }; class B {};");
-    const std::string file = tree.write("outer.mof", "class C {};\n#pragma include (\"inner.mof\")\nclass D {};");
-    MemoryHandler handler;
-    try {
-        compileFile(file, {}, handler);
-        ADD_FAILURE() << "no error";
-    } catch (const MofError& error) {
-        EXPECT_THAT(error.diagnostic(), testing::EndsWith("^\n2 definitions after it were not compiled\n"));
+    struct Row
+    {
+        const char* inner;
+        const char* after; // in the outer file
+        const char* error;
+        const char* skipped;
+    };
+    // The compiler may have parsed the rest of both files when a class fails.
+    const Row rows[] = {
+        {"class A { fault }; class B {};", "", "1:11: error: ", "2 definitions after it were not compiled\n"},
+        {"class A : Nope {}; class B {};", "", "1:7: error: ", "2 definitions after it were not compiled\n"},
+        {"class B {}; class A : Nope {};", "class { fault", "1:19: error: superclass does not exist: Nope\n",
+         "1 definition after it was not compiled\n"},
+        {"class B {}; class A : Nope {};", "#pragma unknown (\"warning\") class E {", "1:19: error: superclass",
+         "2 definitions after it were not compiled\n"},
+    };
+    for (const Row& row : rows) {
+        const TemporaryDirectory tree;
+        tree.write("inner.mof", row.inner);
+        const std::string file = tree.write("outer.mof", "class C {};\n#pragma include (\"inner.mof\")\nclass D {}; " +
+                                                             std::string(row.after));
+        MemoryHandler handler;
+        try {
+            compileFile(file, {}, handler);
+            ADD_FAILURE() << "no error";
+        } catch (const MofError& error) {
+            EXPECT_THAT(error.diagnostic(), testing::StartsWith(tree.path() + "/inner.mof:" + row.error));
+            EXPECT_THAT(error.diagnostic(), testing::EndsWith(std::string("^\n") + row.skipped));
+        }
+        EXPECT_THAT(handler.warnings(), testing::IsEmpty()) << row.after;
     }
 }
 
