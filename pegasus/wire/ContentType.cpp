@@ -9,6 +9,7 @@ namespace Pegasus::wire {
 namespace {
 
 constexpr std::string_view kHttpBlanks = " \t";
+constexpr std::string_view kUsual = "application/xml; charset=utf-8"; // as nearly all clients and servers write it
 
 bool isHttpBlank(std::string_view text) noexcept
 {
@@ -38,6 +39,9 @@ std::string_view takeWord(std::string_view& text) noexcept
 
 bool isXmlInUtf8(std::string_view contentType) noexcept
 {
+    if (contentType == kUsual) {
+        return true;
+    }
     const std::string_view type = takeWord(contentType);
     if (!base::equalNoCase(type, "application/xml") && !base::equalNoCase(type, "text/xml")) {
         return false;

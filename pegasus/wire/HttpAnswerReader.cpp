@@ -62,6 +62,16 @@ std::size_t headerEnd(std::string_view bytes, std::size_t from)
     return std::string_view::npos;
 }
 
+bool hasBareLineFeed(std::string_view header)
+{
+    for (std::size_t at = header.find('\n'); at != std::string_view::npos; at = header.find('\n', at + 1)) {
+        if (at == 0 || header[at - 1] != '\r') {
+            return true;
+        }
+    }
+    return false;
+}
+
 // The parser insists on CRLF; headers with bare line feeds, as some servers send them, are understood too.
 std::string withCrLf(std::string_view header)
 {
@@ -177,23 +187,37 @@ void HttpAnswerReader::feed(std::string_view bytes)
     }
 }
 
-// Takes bytes up to the end of the header.
+// Takes bytes up to the end of the header. One that comes in a piece, as nearly all do, is read where it lies.
 void HttpAnswerReader::feedHeader(std::string_view& bytes)
 {
     constexpr std::size_t kMaxEndBytes = 3; // of a line feed and the empty line after it
     const std::size_t before = fPending.size();
-    fPending.append(bytes);
-    checkStart(fPending);
-    const std::size_t end = headerEnd(fPending, before - std::min(before, kMaxEndBytes));
-    if (std::min(end, fPending.size()) > fLimits.maxHeaderBytes) {
+    if (before > 0) {
+        fPending.append(bytes);
+    }
+    const std::string_view seen = before > 0 ? std::string_view(fPending) : bytes;
+    checkStart(seen);
+    const std::size_t end = headerEnd(seen, before - std::min(before, kMaxEndBytes));
+    if (std::min(end, seen.size()) > fLimits.maxHeaderBytes) {
         throwTooLarge("a header", fLimits.maxHeaderBytes);
     }
-    bytes.remove_prefix(end == std::string::npos ? bytes.size() : end - before);
-    if (end == std::string::npos) {
+    if (end == std::string_view::npos) {
+        if (before == 0) {
+            fPending = bytes;
+        }
+        bytes = {};
         return;
     }
-    const std::string header = withCrLf(std::string_view(fPending).substr(0, end));
+    putHeader(seen.substr(0, end));
+    bytes.remove_prefix(end - before);
     fPending.clear();
+}
+
+void HttpAnswerReader::putHeader(std::string_view header)
+{
+    if (hasBareLineFeed(header)) {
+        return putHeader(withCrLf(header));
+    }
     if (putSome(header) != header.size() || !hasHeader()) {
         throwMalformed();
     }

@@ -78,6 +78,7 @@ class HttpAnswerReader
     class Parser;
 
     void feedHeader(std::string_view& bytes);
+    void putHeader(std::string_view header);
     std::size_t put(std::string_view bytes);
     std::size_t putSome(std::string_view bytes);
 

@@ -3,8 +3,8 @@
 
 #include "pegasus/wire/HttpAnswerReader.h"
 
-#include <boost/beast/http/parser.hpp>
-#include <boost/beast/http/string_body.hpp>
+#include <boost/asio/buffer.hpp>
+#include <boost/beast/http/basic_parser.hpp>
 
 #include <cstring>
 
@@ -12,19 +12,20 @@ namespace Pegasus::server {
 
 namespace http = boost::beast::http;
 
-struct HttpRequestParser::Impl
-{
-    http::request_parser<http::string_body> parser;
-    std::size_t maxHeadBytes = 0;
-    std::size_t headBytes = 0; // parsed so far
-};
-
 namespace {
+
+using boost::beast::error_code;
+using BeastView = boost::beast::string_view;
 
 constexpr std::size_t kReadBytes = 64u << 10;
 constexpr std::size_t kUsualHeaderCount = 16;
 
-[[noreturn]] void failForParser(const boost::system::error_code& error)
+std::string toStd(BeastView text)
+{
+    return std::string(text.data(), text.size());
+}
+
+[[noreturn]] void failForParser(const error_code& error)
 {
     using After = HttpError::After;
     if (error == http::error::body_limit || error == http::error::buffer_overflow) {
@@ -68,19 +69,64 @@ void resolveExtension(HttpRequest& request)
 
 } // namespace
 
-HttpRequestParser::HttpRequestParser(const HttpLimits& limits) : fImpl(std::make_unique<Impl>())
+// Beast's grammar. What it reads is entered into the request at once, the trailer's fields like those of the head.
+class HttpRequestParser::Impl : public http::basic_parser<true>
 {
-    fImpl->maxHeadBytes = limits.maxHeaderBytes;
-    fImpl->parser.header_limit(static_cast<std::uint32_t>(std::min<std::size_t>(limits.maxHeaderBytes, 1u << 30)));
-    fImpl->parser.body_limit(limits.maxBodyBytes);
-}
+  public:
+    explicit Impl(const HttpLimits& limits) : maxHeadBytes(limits.maxHeaderBytes)
+    {
+        header_limit(static_cast<std::uint32_t>(std::min<std::size_t>(limits.maxHeaderBytes, 1u << 30)));
+        body_limit(limits.maxBodyBytes);
+        request.headers.reserve(kUsualHeaderCount);
+    }
+
+    HttpRequest request;
+    const std::size_t maxHeadBytes;
+    std::size_t headBytes = 0; // parsed so far
+
+  private:
+    void on_request_impl(http::verb, BeastView method, BeastView, int version, error_code&) override
+    {
+        request.method = toStd(method);
+        request.isVersion10 = version < 11;
+    }
+    void on_response_impl(int, BeastView, int, error_code&) override {}
+
+    void on_field_impl(http::field, BeastView name, BeastView value, error_code&) override
+    {
+        request.headers.emplace_back(toStd(name), toStd(value));
+    }
+
+    void on_header_impl(error_code&) override {}
+
+    // A length that is over the limit was refused before.
+    void on_body_init_impl(const boost::optional<std::uint64_t>& length, error_code&) override
+    {
+        request.body.reserve(length ? static_cast<std::size_t>(*length) : 0);
+    }
+
+    std::size_t on_body_impl(BeastView body, error_code&) override
+    {
+        request.body.append(body.data(), body.size());
+        return body.size();
+    }
+
+    void on_chunk_header_impl(std::uint64_t, BeastView, error_code&) override {}
+    std::size_t on_chunk_body_impl(std::uint64_t, BeastView body, error_code& error) override
+    {
+        return on_body_impl(body, error);
+    }
+    void on_finish_impl(error_code&) override {}
+};
+
+HttpRequestParser::HttpRequestParser(const HttpLimits& limits) : fImpl(std::make_unique<Impl>(limits)) {}
 
 HttpRequestParser::~HttpRequestParser() = default;
 
 std::size_t HttpRequestParser::parse(std::string_view bytes)
 {
-    boost::system::error_code error;
-    const std::size_t taken = fImpl->parser.put(boost::asio::const_buffer(bytes.data(), bytes.size()), error);
+    error_code error;
+    const std::size_t taken = fImpl->put(boost::asio::const_buffer(bytes.data(), bytes.size()), error);
     if (error && error != http::error::need_more) {
         failForParser(error);
     }
@@ -95,7 +141,7 @@ std::size_t HttpRequestParser::putHead(std::string_view bytes)
     if (fImpl->headBytes + (isHeaderDone() ? 0 : bytes.size() - taken) > fImpl->maxHeadBytes) {
         failForParser(http::error::header_limit);
     }
-    fImpl->parser.eager(isHeaderDone());
+    fImpl->eager(isHeaderDone());
     return taken;
 }
 
@@ -106,7 +152,7 @@ std::size_t HttpRequestParser::putBody(std::string_view bytes)
     std::size_t taken = 0;
     while (taken < bytes.size() && !isDone()) {
         const std::string_view window = bytes.substr(taken, fImpl->maxHeadBytes);
-        if (fImpl->parser.chunked() && wire::mayBeCutLastChunk(window)) {
+        if (fImpl->chunked() && wire::mayBeCutLastChunk(window)) {
             break;
         }
         const std::size_t n = parse(window);
@@ -133,33 +179,24 @@ std::size_t HttpRequestParser::put(std::string_view bytes)
 
 bool HttpRequestParser::isHeaderDone() const
 {
-    return fImpl->parser.is_header_done();
+    return fImpl->is_header_done();
 }
 
 bool HttpRequestParser::isDone() const
 {
-    return fImpl->parser.is_done();
+    return fImpl->is_done();
 }
 
 bool HttpRequestParser::expectsContinue() const
 {
-    const auto& fields = fImpl->parser.get();
-    const auto expect = fields.find(http::field::expect);
-    return expect != fields.end() && expect->value() == "100-continue";
+    const std::string* expect = fImpl->request.header("Expect");
+    return expect != nullptr && *expect == "100-continue";
 }
 
 HttpRequest HttpRequestParser::take()
 {
-    auto message = fImpl->parser.release();
-    HttpRequest request;
-    request.method = std::string(message.method_string());
-    request.isVersion10 = message.version() < 11;
-    request.headers.reserve(kUsualHeaderCount);
-    for (const auto& field : message) {
-        request.headers.emplace_back(std::string(field.name_string()), std::string(field.value()));
-    }
-    request.hasBodyLength = request.header("Content-Length") != nullptr || message.chunked();
-    request.body = std::move(message.body());
+    HttpRequest request = std::move(fImpl->request);
+    request.hasBodyLength = fImpl->content_length().has_value() || fImpl->chunked();
     if (request.method == "M-POST") {
         resolveExtension(request);
     }

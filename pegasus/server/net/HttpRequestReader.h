@@ -43,7 +43,7 @@ class HttpRequestParser
     std::size_t putHead(std::string_view bytes);
     std::size_t putBody(std::string_view bytes);
 
-    struct Impl;
+    class Impl;
     std::unique_ptr<Impl> fImpl;
 };
 
