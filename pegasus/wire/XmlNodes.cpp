@@ -15,6 +15,9 @@ namespace {
 
 // More than any usual element has. The memory of a bigger one is given back, because readers live long.
 constexpr std::size_t kKeptNodes = 64UL * 1024;
+// Enough for a request or a small answer without growing.
+constexpr std::size_t kFirstNodes = 64;
+constexpr std::size_t kFirstDepth = 16;
 
 template <typename Item> void clearList(std::vector<Item>& items)
 {
@@ -25,6 +28,13 @@ template <typename Item> void clearList(std::vector<Item>& items)
 }
 
 } // namespace
+
+XmlNodes::XmlNodes(const XmlLimits& limits) : fLimits(limits), fScanner(fLimits)
+{
+    fNodes.reserve(kFirstNodes);
+    fAttributes.reserve(kFirstNodes);
+    fOpen.reserve(kFirstDepth);
+}
 
 void XmlNodes::clear(std::size_t outerDepth)
 {
@@ -43,6 +53,9 @@ XmlToken XmlNodes::next(std::size_t from)
 std::size_t XmlNodes::read(std::size_t from)
 {
     while (from < fSource.text.size() && !fOpen.empty()) {
+        if (isLineFeedBetween(fSource.text, from)) {
+            ++from;
+        }
         if (const std::size_t size = endTagSize(from)) {
             closeInner(from);
             from += size;

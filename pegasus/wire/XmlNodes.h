@@ -30,7 +30,7 @@ struct XmlNode
 class XmlNodes
 {
   public:
-    explicit XmlNodes(const XmlLimits& limits) : fLimits(limits), fScanner(fLimits) {}
+    explicit XmlNodes(const XmlLimits& limits);
     XmlNodes(const XmlNodes&) = delete;
     XmlNodes& operator=(const XmlNodes&) = delete;
 

@@ -97,6 +97,13 @@ class XmlScanner
     const XmlLimits& fLimits;
 };
 
+// Whether the text from `at` on is a line feed and then markup, as most texts between elements are. It needs no token:
+// a blank text may stand anywhere. Requires: at < text.size().
+inline bool isLineFeedBetween(std::string_view text, std::size_t at)
+{
+    return text.data()[at] == '\n' && at + 1 < text.size() && text.data()[at + 1] == '<';
+}
+
 // Moves a place over `bytes`.
 XmlPlace advance(XmlPlace place, std::string_view bytes);
 

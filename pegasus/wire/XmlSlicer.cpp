@@ -25,6 +25,7 @@ constexpr std::size_t kOfferedDepth = 8;
 XmlSlicer::XmlSlicer(std::vector<std::string_view> envelope, XmlSliceHandler& handler, const XmlLimits& limits)
     : fEnvelope(std::move(envelope)), fHandler(handler), fNodes(limits)
 {
+    fOpen.reserve(fEnvelope.size());
 }
 
 void XmlSlicer::feed(std::string_view bytes)
@@ -190,9 +191,12 @@ void XmlSlicer::deliver()
     consume(fRead);
 }
 
-// Drops so many bytes, which were read and delivered.
+// Drops so many bytes, which were read and delivered, and the end of their line.
 void XmlSlicer::consume(std::size_t size)
 {
+    if (size < rest().size() && isLineFeedBetween(rest(), size)) {
+        ++size;
+    }
     fPlace = advance(fPlace, rest().substr(0, size));
     fStart += size;
     fRead = 0;
