@@ -45,13 +45,13 @@ String toString(std::string_view text)
     }
 }
 
-std::string localUser()
+std::string nameOf(uid_t user)
 {
     char buffer[4096];
     passwd entry{};
     passwd* found = nullptr;
-    if (::getpwuid_r(::geteuid(), &entry, buffer, sizeof(buffer), &found) != 0 || !found) {
-        return std::to_string(::geteuid());
+    if (::getpwuid_r(user, &entry, buffer, sizeof(buffer), &found) != 0 || !found) {
+        return std::to_string(user);
     }
     return found->pw_name;
 }
@@ -117,6 +117,8 @@ void CIMClientRep::connect(const client::ServerAddress& address)
     fConnection.setAddress(address);
     fConnection.open(deadline);
     fAddress = address;
+    fHost = address.text();
+    fLocalUser.reset();
 }
 
 void CIMClientRep::disconnect()
@@ -158,8 +160,8 @@ void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHan
         throw ConnectionTimeoutException();
     }
     const client::ExpectedResponse expected{nextMessageId(), request.method, request.isIntrinsic, request.result};
-    const std::string message = client::encodeHttpRequest(request, expected.messageId, fAddress->text(),
-                                                          fAddress->isLocal ? localUser() : std::string());
+    const std::string message = client::encodeHttpRequest(request, expected.messageId, fHost,
+                                                          fAddress->isLocal ? localUser() : std::string_view());
     ResponseReader reader(expected, fDecoder, onContent, deadline);
     reader.setOfferHandler(onOffer);
     HttpAnswerReader response(fLimits.http, checkHeader, [&](std::string_view body) { reader.feed(body); });
@@ -177,6 +179,16 @@ void CIMClientRep::exchangeOnce(const client::Request& request, const ContentHan
     if (reader.error() && reader.error()->getCode() != CIM_ERR_SUCCESS) {
         throw *reader.error();
     }
+}
+
+// The user database is asked once for each user that the process runs as while it is connected.
+std::string_view CIMClientRep::localUser()
+{
+    const uid_t user = ::geteuid();
+    if (!fLocalUser || fLocalUser->first != user) {
+        fLocalUser.emplace(user, nameOf(user));
+    }
+    return fLocalUser->second;
 }
 
 // A server may act on a request whose first bytes it has, so a request is sent once. An idle connection that the server

@@ -13,7 +13,11 @@
 
 #include <optional>
 #include <string>
+#include <string_view>
+#include <utility>
 #include <vector>
+
+#include <sys/types.h>
 
 namespace Pegasus::client {
 
@@ -64,6 +68,7 @@ class CIMClientRep
 
   private:
     void exchangeOnce(const client::Request& request, const ContentHandler& onContent, const OfferHandler& onOffer);
+    std::string_view localUser();
     void send(const std::string& message, const base::Deadline& deadline);
     void receive(wire::HttpAnswerReader& response, const base::Deadline& deadline);
 
@@ -72,6 +77,8 @@ class CIMClientRep
     wire::KnownInstances fKnownInstances{fLimits.xml};
     client::KnownClasses fKnownClasses;
     std::optional<client::ServerAddress> fAddress;
+    std::string fHost;                                       // of fAddress, as the Host field has it
+    std::optional<std::pair<uid_t, std::string>> fLocalUser; // the last one, and the name
     client::ServerConnection fConnection;
     std::vector<char> fReceiveBuffer;
     Uint32 fTimeoutMs = 20000;

@@ -6,10 +6,12 @@
 
 #include <Pegasus/Common/Exception.h>
 
-#include <cstdio>
+#include <algorithm>
 
 namespace Pegasus::client {
 namespace {
+
+constexpr std::size_t kLengthDigits = 10; // of a length with its leading zeros
 
 std::string encoded(const String& object)
 {
@@ -48,13 +50,15 @@ std::string encodeHttpRequest(const Request& request, std::string_view messageId
                               std::string_view localUser)
 {
     const std::string content = wire::encodeRequestMessage(messageId, request.call);
-    char length[16];
-    std::snprintf(length, sizeof(length), "%010zu", content.size());
+    const std::string length = std::to_string(content.size());
     std::string out;
     out.reserve(content.size() + 512);
     out.append("POST /cimom HTTP/1.1\r\nHOST: ").append(host).append("\r\n");
     out.append("Content-Type: application/xml; charset=utf-8\r\n");
-    out.append("content-length: ").append(length).append("\r\n");
+    out.append("content-length: ")
+        .append(kLengthDigits - std::min(kLengthDigits, length.size()), '0')
+        .append(length)
+        .append("\r\n");
     out.append("TE: chunked, trailers\r\n");
     out.append("CIMOperation: MethodCall\r\n");
     const std::string method = base::percentEncoded(request.method, base::PercentSet::kStrict);

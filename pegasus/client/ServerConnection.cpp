@@ -138,6 +138,7 @@ void ServerConnection::close()
         ::close(fFd);
     }
     fFd = -1;
+    fIsDrained = true;
 }
 
 bool ServerConnection::isStale() const
@@ -187,21 +188,23 @@ ServerConnection::Result ServerConnection::receive(char* buffer, std::size_t cap
                                                    std::size_t& received)
 {
     for (;;) {
+        // A server that sent less than there was room for is waited for before it is read from.
+        const Result waited = fIsDrained ? waitFor(POLLIN, deadline) : Result::kDone;
+        if (waited != Result::kDone) {
+            return waited;
+        }
         // Asked before each read: the deadline also bounds a server that goes on sending.
         if (deadline.hasPassed()) {
             return Result::kTimedOut;
         }
         const ssize_t count = ::recv(fFd, buffer, capacity, 0);
+        fIsDrained = count < static_cast<ssize_t>(capacity);
         if (count >= 0) {
             received = static_cast<std::size_t>(count);
             return count == 0 ? Result::kClosed : Result::kDone;
         }
         if (!isRetry(errno)) {
             return Result::kClosed;
-        }
-        const Result waited = waitFor(POLLIN, deadline);
-        if (waited != Result::kDone) {
-            return waited;
         }
     }
 }

@@ -69,6 +69,7 @@ class ServerConnection
     ServerAddress fAddress;
     std::shared_ptr<addrinfo> fCandidates; // what a host name was looked up to; null for the private socket
     int fFd = -1;
+    bool fIsDrained = true; // whether the last receive() took all that had arrived
 };
 
 } // namespace Pegasus::client
