@@ -3,7 +3,9 @@
 
 #include "pegasus/base/PercentCoding.h"
 
+#include <charconv>
 #include <cstdio>
+#include <iterator>
 
 namespace Pegasus::server {
 
@@ -11,6 +13,7 @@ namespace {
 
 // Holds most answers that are one object: their text is not moved while it grows.
 constexpr std::size_t kUsualBytes = 16u << 10;
+constexpr std::size_t kUsualHeadBytes = 256;
 
 iovec part(std::string_view text)
 {
@@ -32,7 +35,9 @@ AnswerStream::AnswerStream(SocketStream& stream, Options options) : fStream(stre
 
 std::string AnswerStream::makeHead(std::size_t length) const
 {
-    std::string head = "HTTP/1.1 200 OK\r\nContent-Type: application/xml; charset=utf-8\r\n";
+    std::string head;
+    head.reserve(kUsualHeadBytes);
+    head += "HTTP/1.1 200 OK\r\nContent-Type: application/xml; charset=utf-8\r\n";
     if (isChunked()) {
         head += "transfer-encoding: chunked\r\n";
     } else {
@@ -40,18 +45,19 @@ std::string AnswerStream::makeHead(std::size_t length) const
         std::snprintf(text, sizeof text, "content-length: %010zu\r\n", length);
         head += text;
     }
-    if (fOptions.extensionPrefix.size() > 1) {
-        head += "Ext:\r\nCache-Control: no-cache\r\nMan: http://www.dmtf.org/cim/mapping/http/v1.0; ns=" +
-                fOptions.extensionPrefix.substr(0, fOptions.extensionPrefix.size() - 1) + "\r\n";
+    const std::string& prefix = fOptions.extensionPrefix;
+    if (prefix.size() > 1) {
+        head += "Ext:\r\nCache-Control: no-cache\r\nMan: http://www.dmtf.org/cim/mapping/http/v1.0; ns=";
+        head.append(prefix, 0, prefix.size() - 1).append("\r\n");
     }
-    head += fOptions.extensionPrefix + "CIMOperation: " + fOptions.operation + "\r\n";
+    head.append(prefix).append("CIMOperation: ").append(fOptions.operation).append("\r\n");
     if (isChunked()) {
         head += "Trailer: CIMStatusCode, CIMStatusCodeDescription, Content-Language\r\n";
     }
     if (fOptions.closes) {
         head += "Connection: close\r\n";
     }
-    return head + "\r\n";
+    return head += "\r\n";
 }
 
 void AnswerStream::write(std::string_view bytes)
@@ -78,9 +84,14 @@ void AnswerStream::sendChunk(std::string_view more, std::string_view ending)
     fStarted = true;
     const std::size_t size = fPending.size() + more.size();
     char sizeLine[32];
-    const int sizeLength = size == 0 ? 0 : std::snprintf(sizeLine, sizeof sizeLine, "%zx\r\n", size);
+    char* sizeEnd = sizeLine;
+    if (size > 0) {
+        sizeEnd = std::to_chars(sizeLine, std::end(sizeLine) - 2, size, 16).ptr;
+        *sizeEnd++ = '\r';
+        *sizeEnd++ = '\n';
+    }
     iovec parts[] = {part(head),
-                     part({sizeLine, static_cast<std::size_t>(sizeLength)}),
+                     part({sizeLine, static_cast<std::size_t>(sizeEnd - sizeLine)}),
                      part(fPending),
                      part(more),
                      part(size == 0 ? "" : "\r\n"),

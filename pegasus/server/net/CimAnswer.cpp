@@ -9,6 +9,7 @@ namespace Pegasus::server {
 
 namespace {
 
+constexpr std::size_t kUsualEnvelopeBytes = 256;
 constexpr std::string_view kTail = "</SIMPLERSP>\n</MESSAGE>\n</CIM>\n";
 
 const char* responseElement(const CimRequest& request)
@@ -64,8 +65,9 @@ void CimAnswer::open()
     if (fEnvelope == Envelope::kBare) {
         return;
     }
-    std::string head = "<?xml version=\"1.0\" encoding=\"utf-8\" ?>\n<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">\n"
-                       "<MESSAGE ID=\"";
+    std::string head;
+    head.reserve(kUsualEnvelopeBytes);
+    head += "<?xml version=\"1.0\" encoding=\"utf-8\" ?>\n<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">\n<MESSAGE ID=\"";
     wire::appendEscaped(head, std::string_view(fRequest.messageId));
     head += "\" PROTOCOLVERSION=\"1.0\">\n<SIMPLERSP>\n<";
     head += responseElement(fRequest);
@@ -98,12 +100,11 @@ void CimAnswer::close()
         return;
     }
     std::string tail;
+    tail.reserve(kUsualEnvelopeBytes);
     if (fReturnValueOpen) {
         tail += "</IRETURNVALUE>\n";
     }
-    tail += std::string("</") + responseElement(fRequest) + ">\n";
-    tail += kTail;
-    fStream.write(tail);
+    fStream.write(tail.append("</").append(responseElement(fRequest)).append(">\n").append(kTail));
 }
 
 void CimAnswer::finish()

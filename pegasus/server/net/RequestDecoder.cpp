@@ -81,24 +81,24 @@ void checkCimVersions(std::string_view cimVersion, std::string_view dtdVersion)
     }
 }
 
-void checkProtocolVersion(const HttpRequest& http, const std::string& version)
+void checkProtocolVersion(const HttpRequest& http, std::string_view version)
 {
     if (version.compare(0, 2, "1.") == 0) {
         return;
     }
     const std::string* header = http.header("CIMProtocolVersion");
     refuse("header-mismatch", "CIMProtocolVersion value \"" + (header != nullptr ? *header : "1.0") +
-                                  "\" does not match CIM request protocol version \"" + version + "\".");
+                                  "\" does not match CIM request protocol version \"" + std::string(version) + "\".");
 }
 
 std::string requestObject(const CimRequest& request)
 {
-    String text = request.nameSpace.getString();
+    std::string text = base::utf8(request.nameSpace);
     if (!request.isIntrinsic) {
-        text.append(String(":"));
-        text.append(request.object.toString());
+        text += ":";
+        base::appendUtf8(text, request.object.toString());
     }
-    return base::utf8(text);
+    return text;
 }
 
 // Texts that name the same object: alike but for case, or paths that are equal.
@@ -133,12 +133,12 @@ void checkMatch(const HttpRequest& http, const CimRequest& request)
     }
 }
 
-std::string requiredAttribute(XmlElement element, XmlAttribute value, const char* name)
+std::string_view requiredAttribute(XmlElement element, XmlAttribute value, const char* name)
 {
     if (!value) {
         element.fail(XmlError::Kind::kInvalid, std::string("missing ") + name + " attribute");
     }
-    return std::string(*value);
+    return *value;
 }
 
 } // namespace

@@ -111,7 +111,9 @@ void update(Config& config, const CimRequest& request, const std::string& name)
 
 bool isConfigClass(const CIMNamespaceName& nameSpace, const CIMName& className)
 {
-    return className == CIMName(kConfigClass) && nameSpace == CIMNamespaceName(kConfigNamespace);
+    static const CIMName kClass(kConfigClass);
+    static const CIMNamespaceName kNamespace(kConfigNamespace);
+    return className == kClass && nameSpace == kNamespace;
 }
 
 std::unique_ptr<ServerInstances> makeConfigInstances(const ServerCore& core)

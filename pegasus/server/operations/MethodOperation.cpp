@@ -11,8 +11,9 @@ namespace {
 
 bool isShutdownClass(const CimRequest& request)
 {
-    return request.object.getClassName() == CIMName("PG_ShutdownService") &&
-           request.nameSpace == CIMNamespaceName("root/PG_Internal");
+    static const CIMName kClass("PG_ShutdownService");
+    static const CIMNamespaceName kNamespace("root/PG_Internal");
+    return request.object.getClassName() == kClass && request.nameSpace == kNamespace;
 }
 
 CIMValue invokeShutdown(ServerCore& core, const CimRequest& request)
@@ -74,8 +75,7 @@ void passToProvider(ServerCore& core, const HttpRequest& http, const CimRequest&
 
 void invokeMethod(ServerCore& core, const HttpRequest& http, const CimRequest& request, ElementSink& answer)
 {
-    requireNamespace(core, request.nameSpace);
-    if (!core.repository.hasClass(request.nameSpace, request.object.getClassName())) {
+    if (!core.repository.hasClass(request.nameSpace, request.object.getClassName())) { // or CIM_ERR_INVALID_NAMESPACE
         throw CIMException(CIM_ERR_NOT_FOUND, request.object.getClassName().getString());
     }
     std::string text;
