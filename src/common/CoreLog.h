@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// Entries of the host's core log, put together with a string stream in the "C" locale.
+// Entries of the host's core log.
 #pragma once
 
 #include "src/common/Text.h"
@@ -7,21 +7,33 @@
 #include <host/ILogger.h>
 #include <host/TVRXException.h>
 
-#include <locale>
-#include <sstream>
 #include <string>
+#include <string_view>
+#include <type_traits>
 
 namespace NKOLVRX20 {
 
 void WriteCoreLog(ILogger::EVRXLogSeverity severity, const std::string& text);
 
-// Returns: the parts, one after the other, with numbers in plain decimal whatever the host's locale is.
+inline void AppendPart(std::string& text, std::string_view part)
+{
+    text += part;
+}
+
+// In plain decimal, whatever the host's locale is.
+template <typename TNumber, typename = std::enable_if_t<std::is_integral_v<TNumber>>>
+void AppendPart(std::string& text, TNumber part)
+{
+    static_assert(!std::is_same_v<TNumber, char>, "a character is a text");
+    text += std::to_string(part);
+}
+
+// Returns: the parts, one after the other.
 template <typename... TParts> std::string JoinText(const TParts&... parts)
 {
-    std::ostringstream text;
-    text.imbue(std::locale::classic());
-    (text << ... << parts);
-    return text.str();
+    std::string text;
+    (AppendPart(text, parts), ...);
+    return text;
 }
 
 // A failure: severity 0.

@@ -12,6 +12,8 @@
 #include <host/ICIMProperty.h>
 #include <host/TVRXException.h>
 
+#include <cstdio>
+
 namespace NKOLVRX20 {
 
 namespace {
@@ -51,6 +53,13 @@ std::string TextOf(const ICIMInstance& instance, const char* property)
     } catch (const TVRXException&) {
         return "";
     }
+}
+
+std::string AddressText(const void* address)
+{
+    char text[20];
+    std::snprintf(text, sizeof text, "%p", address);
+    return text;
 }
 
 } // namespace
@@ -93,7 +102,7 @@ std::optional<TInstanceRetrieval::TAnswer> TInstanceRetrieval::Ask(unsigned int 
     return Guarded([&] {
         Pegasus::CIMClient& client = Client(timeoutMs);
         LogProgress("DEBUG: TPEGASUSClass:", fOperation, " pegclient object before ", fOperation, " call (",
-                    static_cast<const void*>(&client), ")\n");
+                    AddressText(&client), ")\n");
         return Enumerate(client, fClass.GetPegasusNSP(), false);
     });
 }
