@@ -153,19 +153,16 @@ std::size_t findEscaped(std::string_view text, std::size_t at, Blanks blanks)
         return base::findMarked(text, at, changesIn);
     }
     while (at < text.size()) {
-        const std::size_t end = std::min(at + sizeof(Block), text.size());
-        if (at > 0 && end < text.size()) {
+        if (at > 0 && text.size() - at > sizeof(Block)) {
             const std::size_t kept = keptIn(text.data() + at);
             at += kept;
             if (kept < sizeof(Block)) {
                 return at;
             }
-            continue;
-        }
-        for (; at < end; ++at) {
-            if (!isKept(text, at)) {
-                return at;
-            }
+        } else if (isKept(text, at)) {
+            ++at;
+        } else {
+            return at;
         }
     }
     return at;
