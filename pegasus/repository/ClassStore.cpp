@@ -17,27 +17,28 @@ ClassStore::ClassStore(std::mutex& mutex, Storage& storage, const ObjectEncoder&
 // Resolves from the root class down, and keeps every class on the way. The recursion is bounded: superClassFor() limits
 // the depth. Two threads may resolve the same class at once; the cache keeps the first result, and both are equal,
 // since a stored class stays as it is.
-CIMClass ClassStore::resolved(NamespaceId nameSpace, const CIMName& name)
+ResolvedClass ClassStore::resolve(NamespaceId nameSpace, const CIMName& name)
 {
     const std::string key = nameKey(name);
     std::optional<std::string> text;
     {
         const Lock lock(fMutex);
-        CIMClass cached = fCache.find(nameSpace, key);
-        if (!cached.isUninitialized()) {
+        ResolvedClass cached = fCache.find(nameSpace, key);
+        if (cached.depth != 0) {
             return cached;
         }
         text = fStorage.findClass(nameSpace, key);
     }
     if (!text) {
-        return CIMClass();
+        return ResolvedClass();
     }
     const CIMClass local = withEmbeddedTypes(ObjectDecoder(fEncoder).decodeClass(std::move(*text)));
     const CIMName& superName = local.getSuperClassName();
-    CIMClass whole = resolveClass(local, superName.isNull() ? CIMClass() : resolved(nameSpace, superName));
+    const ResolvedClass superClass = superName.isNull() ? ResolvedClass() : resolve(nameSpace, superName);
+    ResolvedClass found{resolveClass(local, superClass.whole), superClass.depth + 1};
     const Lock lock(fMutex);
-    fCache.insert(nameSpace, key, whole);
-    return whole;
+    fCache.insert(nameSpace, key, found);
+    return found;
 }
 
 CIMClass ClassStore::existing(NamespaceId nameSpace, const CIMName& name)
@@ -66,7 +67,7 @@ void ClassStore::keepText(NamespaceId nameSpace, const CIMName& name, const Clas
 bool ClassStore::has(NamespaceId nameSpace, const CIMName& name)
 {
     const Lock lock(fMutex);
-    return !fCache.find(nameSpace, nameKey(name)).isUninitialized() ||
+    return fCache.find(nameSpace, nameKey(name)).depth != 0 ||
            fStorage.findSuperClass(nameSpace, base::utf8(name)).has_value();
 }
 
@@ -83,20 +84,20 @@ std::vector<CIMName> ClassStore::listNames(NamespaceId nameSpace, const CIMName&
     return names;
 }
 
-// Returns: the resolved superclass of a class that can be created; uninitialised for a root class.
-// Throws: CIM_ERR_ALREADY_EXISTS, CIM_ERR_INVALID_SUPERCLASS.
-CIMClass ClassStore::superClassFor(NamespaceId nameSpace, const CIMConstClass& newClass)
+// Returns: the superclass of a class that can be created; absent for a root class.
+// Throws: CIM_ERR_ALREADY_EXISTS, CIM_ERR_INVALID_SUPERCLASS, CIM_ERR_SERVER_LIMITS_EXCEEDED.
+ResolvedClass ClassStore::superClassFor(NamespaceId nameSpace, const CIMConstClass& newClass)
 {
     if (has(nameSpace, newClass.getClassName())) {
         fail(CIM_ERR_ALREADY_EXISTS, base::utf8(newClass.getClassName()));
     }
-    checkDepth(nameSpace, newClass);
     const CIMName& superName = newClass.getSuperClassName();
-    if (superName.isNull()) {
-        return CIMClass();
+    ResolvedClass superClass = superName.isNull() ? ResolvedClass() : resolve(nameSpace, superName);
+    if (superClass.depth >= fLimits.inheritanceDepth) {
+        fail(CIM_ERR_SERVER_LIMITS_EXCEEDED,
+             "class is deeper than the limit inheritanceDepth (" + std::to_string(fLimits.inheritanceDepth) + ")");
     }
-    CIMClass superClass = resolved(nameSpace, superName);
-    if (superClass.isUninitialized() || superName.equal(newClass.getClassName())) {
+    if (!superName.isNull() && superClass.depth == 0) {
         fail(CIM_ERR_INVALID_SUPERCLASS, base::utf8(superName));
     }
     return superClass;
@@ -104,32 +105,17 @@ CIMClass ClassStore::superClassFor(NamespaceId nameSpace, const CIMConstClass& n
 
 void ClassStore::create(NamespaceId nameSpace, const CIMConstClass& newClass, const QualifierLookup& lookup)
 {
-    const CIMClass superClass = superClassFor(nameSpace, newClass);
-    const CIMClass local = checkClass(newClass, superClass, lookup);
+    const ResolvedClass superClass = superClassFor(nameSpace, newClass);
+    const CIMClass local = checkClass(newClass, superClass.whole, lookup);
     const std::string text = fEncoder.encodeClass(local);
-    const CIMClass whole = resolveClass(local, superClass);
+    const ResolvedClass created{resolveClass(local, superClass.whole), superClass.depth + 1};
     const std::string name = base::utf8(local.getClassName());
     const Lock lock(fMutex);
-    if (fStorage.findSuperClass(nameSpace, name)) { // another thread was faster
-        fail(CIM_ERR_ALREADY_EXISTS, name);
+    if (!fStorage.insertClass(nameSpace, name, base::utf8(local.getSuperClassName()), text)) {
+        fail(CIM_ERR_ALREADY_EXISTS, name); // another thread was faster
     }
-    fStorage.insertClass(nameSpace, name, base::utf8(local.getSuperClassName()), text);
     // Into the cache at once: a compiler creates subclasses of it next.
-    fCache.insert(nameSpace, nameKey(local.getClassName()), whole);
-}
-
-void ClassStore::checkDepth(NamespaceId nameSpace, const CIMConstClass& newClass)
-{
-    const Lock lock(fMutex);
-    std::size_t depth = 1;
-    std::string above = base::utf8(newClass.getSuperClassName());
-    while (!above.empty()) {
-        if (++depth > fLimits.inheritanceDepth) {
-            fail(CIM_ERR_SERVER_LIMITS_EXCEEDED,
-                 "class is deeper than the limit inheritanceDepth (" + std::to_string(fLimits.inheritanceDepth) + ")");
-        }
-        above = fStorage.findSuperClass(nameSpace, above).value_or("");
-    }
+    fCache.insert(nameSpace, nameKey(local.getClassName()), created);
 }
 
 } // namespace Pegasus::repository

@@ -22,7 +22,7 @@ class ClassStore
     ClassStore(std::mutex& mutex, Storage& storage, const ObjectEncoder& encoder, const RepositoryLimits& limits);
 
     // Returns: the class with everything that it inherits; uninitialised when absent.
-    CIMClass resolved(NamespaceId nameSpace, const CIMName& name);
+    CIMClass resolved(NamespaceId nameSpace, const CIMName& name) { return resolve(nameSpace, name).whole; }
     // The same. Throws: CIM_ERR_NOT_FOUND.
     CIMClass existing(NamespaceId nameSpace, const CIMName& name);
     // Returns: the CLASS element that keepText() got for these options, which have no property list; null if none.
@@ -37,8 +37,8 @@ class ClassStore
     void create(NamespaceId nameSpace, const CIMConstClass& newClass, const QualifierLookup& lookup);
 
   private:
-    CIMClass superClassFor(NamespaceId nameSpace, const CIMConstClass& newClass);
-    void checkDepth(NamespaceId nameSpace, const CIMConstClass& newClass);
+    ResolvedClass resolve(NamespaceId nameSpace, const CIMName& name);
+    ResolvedClass superClassFor(NamespaceId nameSpace, const CIMConstClass& newClass);
 
     std::mutex& fMutex;
     Storage& fStorage;

@@ -44,6 +44,11 @@ void Database::execute(const char* sql)
     }
 }
 
+int Database::changedRowCount() const noexcept
+{
+    return sqlite3_changes(fHandle);
+}
+
 void Database::fail(const char* operation) const
 {
     const std::string text = std::string("cannot ") + operation +

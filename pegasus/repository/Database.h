@@ -26,6 +26,8 @@ class Database
 
     // Runs statements without parameters and rows.
     void execute(const char* sql);
+    // Returns: how many rows the last statement inserted, changed or deleted.
+    int changedRowCount() const noexcept;
     sqlite3* handle() const noexcept { return fHandle; }
     [[noreturn]] void fail(const char* operation) const;
 

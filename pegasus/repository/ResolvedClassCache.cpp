@@ -28,13 +28,13 @@ ResolvedClassCache::Entry* ResolvedClassCache::touch(const std::string& key)
     return &fEntries.front();
 }
 
-CIMClass ResolvedClassCache::find(NamespaceId nameSpace, const std::string& nameKey)
+ResolvedClass ResolvedClassCache::find(NamespaceId nameSpace, const std::string& nameKey)
 {
     const Entry* entry = touch(keyOf(nameSpace, nameKey));
-    return entry ? entry->resolved : CIMClass();
+    return entry ? entry->resolved : ResolvedClass();
 }
 
-void ResolvedClassCache::insert(NamespaceId nameSpace, const std::string& nameKey, const CIMClass& resolved)
+void ResolvedClassCache::insert(NamespaceId nameSpace, const std::string& nameKey, const ResolvedClass& resolved)
 {
     std::string key = keyOf(nameSpace, nameKey);
     if (fByKey.count(key) != 0) {

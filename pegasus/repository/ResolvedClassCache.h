@@ -12,6 +12,13 @@
 
 namespace Pegasus::repository {
 
+// A class with everything that it inherits.
+struct ResolvedClass
+{
+    CIMClass whole;        // uninitialised: the class is absent
+    std::size_t depth = 0; // 1 for a root class
+};
+
 // Resolved classes, at most so many; the least recently used one is dropped first. Each keeps the encoded forms that
 // clients asked for. Entries stay valid, since a stored class stays as it is.
 // Thread: one thread at a time.
@@ -20,10 +27,9 @@ class ResolvedClassCache
   public:
     explicit ResolvedClassCache(std::size_t capacity) : fCapacity(capacity) {}
 
-    // Returns: the class; uninitialised when absent.
-    CIMClass find(NamespaceId nameSpace, const std::string& nameKey);
+    ResolvedClass find(NamespaceId nameSpace, const std::string& nameKey);
     // Keeps the class, unless the cache has it.
-    void insert(NamespaceId nameSpace, const std::string& nameKey, const CIMClass& resolved);
+    void insert(NamespaceId nameSpace, const std::string& nameKey, const ResolvedClass& resolved);
     // Returns: the class as a CLASS element, if keepText() got it; null else.
     // Requires: the options have no property list.
     std::shared_ptr<const std::string> findText(NamespaceId nameSpace, const std::string& nameKey,
@@ -36,7 +42,7 @@ class ResolvedClassCache
     struct Entry
     {
         std::string key;
-        CIMClass resolved;
+        ResolvedClass resolved;
         std::array<std::shared_ptr<const std::string>, 8> texts; // by the three switches of ClassOptions
     };
 

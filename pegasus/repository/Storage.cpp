@@ -66,7 +66,8 @@ struct Storage::Statements
           findSuperClass(db, "SELECT super FROM classes WHERE namespace = ? AND name = ?"),
           listSubclasses(db, "SELECT name FROM classes WHERE namespace = ? AND super = ? ORDER BY sequence"),
           listDeepSubclasses(db, kListDeepSubclasses),
-          insertClass(db, "INSERT INTO classes(namespace, name, super, body) VALUES(?, ?, ?, ?)"),
+          insertClass(db, "INSERT INTO classes(namespace, name, super, body) VALUES(?, ?, ?, ?)"
+                          " ON CONFLICT(namespace, name) DO NOTHING"),
           findInstance(db, "SELECT sequence, body FROM instances WHERE namespace = ? AND path = ?"),
           insertInstance(db, "INSERT INTO instances(namespace, class, path, body) VALUES(?, ?, ?, ?)"),
           replaceInstance(db, "UPDATE instances SET body = ?3 WHERE sequence = ?1 AND body = ?2 RETURNING sequence"),
@@ -138,10 +139,11 @@ std::vector<std::string> Storage::listSubclasses(NamespaceId id, const std::stri
     return allTexts(statement.run(id, std::string_view(name)));
 }
 
-void Storage::insertClass(NamespaceId id, const std::string& name, const std::string& superName,
+bool Storage::insertClass(NamespaceId id, const std::string& name, const std::string& superName,
                           const std::string& body)
 {
     fStatements->insertClass.execute(id, std::string_view(name), std::string_view(superName), std::string_view(body));
+    return fDatabase.changedRowCount() != 0;
 }
 
 std::optional<InstanceRow> Storage::findInstance(NamespaceId id, const std::string& path)

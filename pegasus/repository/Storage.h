@@ -48,7 +48,8 @@ class Storage
     std::optional<std::string> findSuperClass(NamespaceId id, const std::string& name);
     // Returns: the names of the direct subclasses, or of all below when deep; of root classes when `name` is empty.
     std::vector<std::string> listSubclasses(NamespaceId id, const std::string& name, bool isDeep);
-    void insertClass(NamespaceId id, const std::string& name, const std::string& superName, const std::string& body);
+    // Returns: false when there is a class of that name, which stays as it is.
+    bool insertClass(NamespaceId id, const std::string& name, const std::string& superName, const std::string& body);
 
     // `path`: as pathKey() forms it.
     std::optional<InstanceRow> findInstance(NamespaceId id, const std::string& path);

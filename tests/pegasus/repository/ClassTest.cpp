@@ -263,6 +263,7 @@ TEST(LimitsOfARepository, AreNamedWhereTheyAreExceeded)
     tight.objectBytes = 2000;
     tight.inheritanceDepth = 3;
     tight.namespaceCount = 2;
+    tight.cachedClassCount = 1; // depths are counted from the file
     Repository repository(directory.path(), tight);
     compileText(repository, "root/test", "class A {}; class B : A {}; class C : B {};");
     EXPECT_THAT(failureOf([&] { repository.createNamespace(CIMNamespaceName("x")); }),
