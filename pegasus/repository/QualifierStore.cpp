@@ -1,9 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/repository/QualifierStore.h"
 
+#include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/Text.h"
-#include "pegasus/repository/CimError.h"
-#include "pegasus/repository/LookupKey.h"
 
 namespace Pegasus::repository {
 
@@ -13,16 +12,24 @@ namespace {
 // cost more than decoding them again.
 constexpr std::size_t kMaxKnown = 4096;
 
-std::string keyOf(NamespaceId nameSpace, const CIMName& name)
-{
-    return std::to_string(nameSpace) + ":" + nameKey(name);
-}
-
 } // namespace
+
+// FNV-1a over the name in lower case. A new class looks up dozens of declarations: the name itself is the key, since
+// making a text of it would take longer than all the rest.
+std::size_t QualifierStore::Hash::operator()(const Key& key) const noexcept
+{
+    auto hash = static_cast<std::uint64_t>(key.nameSpace) ^ 0xcbf29ce484222325u;
+    const String& name = key.name.getString();
+    const Char16* const units = name.getChar16Data();
+    for (Uint32 i = 0; i < name.size(); ++i) {
+        hash = (hash ^ base::lowerAscii(Uint16(units[i]))) * 0x100000001b3u;
+    }
+    return static_cast<std::size_t>(hash);
+}
 
 CIMQualifierDecl QualifierStore::find(NamespaceId nameSpace, const CIMName& name)
 {
-    const std::string key = keyOf(nameSpace, name);
+    const Key key{nameSpace, name};
     std::optional<std::string> text;
     std::uint64_t setCount = 0;
     {
@@ -76,7 +83,7 @@ void QualifierStore::set(NamespaceId nameSpace, const CIMConstQualifierDecl& dec
     const std::string text = fEncoder.encodeQualifier(declaration);
     const Lock lock(fMutex);
     fStorage.putQualifier(nameSpace, base::utf8(name), text);
-    fKnown.erase(keyOf(nameSpace, name));
+    fKnown.erase(Key{nameSpace, name});
     ++fSetCount;
 }
 

@@ -6,7 +6,6 @@
 
 #include <cstdint>
 #include <mutex>
-#include <string>
 #include <unordered_map>
 #include <vector>
 
@@ -31,12 +30,24 @@ class QualifierStore
     void set(NamespaceId nameSpace, const CIMConstQualifierDecl& declaration);
 
   private:
+    struct Key
+    {
+        NamespaceId nameSpace;
+        CIMName name;
+
+        bool operator==(const Key& other) const { return nameSpace == other.nameSpace && name.equal(other.name); }
+    };
+    struct Hash
+    {
+        std::size_t operator()(const Key& key) const noexcept;
+    };
+
     std::mutex fSetting; // taken before fMutex: one set() at a time, which may take long without blocking find()
     std::mutex& fMutex;
     Storage& fStorage;
     const ObjectEncoder& fEncoder;
     std::uint64_t fSetCount = 0; // of finished set(): tells find() that what it decoded may be out of date
-    std::unordered_map<std::string, CIMQualifierDecl> fKnown; // by namespace and name key
+    std::unordered_map<Key, CIMQualifierDecl, Hash> fKnown;
 };
 
 } // namespace Pegasus::repository
