@@ -49,18 +49,37 @@ bool isAscii(__m128i units) noexcept
     return _mm_movemask_epi8(_mm_cmpeq_epi16(beyond, _mm_setzero_si128())) == 0xFFFF;
 }
 
+// Copies half a block of units, if it is ASCII.
+bool copyHalfBlock(const Char16* from, char* to) noexcept
+{
+    const __m128i units = load(from);
+    if (!isAscii(units)) {
+        return false;
+    }
+    _mm_storel_epi64(reinterpret_cast<__m128i*>(to), _mm_packus_epi16(units, units));
+    return true;
+}
+
 // Copies ASCII up to the first other unit. Returns: how many units.
 std::size_t copyAscii(const Char16* from, std::size_t count, char* to) noexcept
 {
+    constexpr std::size_t kHalf = kBlock / 2;
     static_assert(sizeof(Char16) == sizeof(Uint16));
     std::size_t done = 0;
     for (; count - done >= kBlock; done += kBlock) {
         const __m128i first = load(from + done);
-        const __m128i second = load(from + done + kBlock / 2);
+        const __m128i second = load(from + done + kHalf);
         if (!isAscii(_mm_or_si128(first, second))) {
             break;
         }
         store(to + done, _mm_packus_epi16(first, second));
+    }
+    if (count - done >= kHalf && copyHalfBlock(from + done, to + done)) {
+        done += kHalf;
+    }
+    // The last units as half a block that overlaps what is copied already.
+    if (count >= kHalf && count - done < kHalf && copyHalfBlock(from + count - kHalf, to + count - kHalf)) {
+        return count;
     }
     for (; done < count && Uint16(from[done]) < 0x80; ++done) {
         to[done] = static_cast<char>(Uint16(from[done]));

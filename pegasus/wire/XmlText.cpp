@@ -8,8 +8,8 @@
 #include "pegasus/base/Utf8.h"
 
 #include <algorithm>
-#include <array>
 #include <cstdint>
+#include <cstring>
 #include <optional>
 
 namespace Pegasus::wire {
@@ -111,18 +111,11 @@ constexpr bool isControl(char c)
     return static_cast<unsigned char>(c) < 0x20 || c == 0x7F;
 }
 
-// The characters that stay as they are wherever they stand; a blank does so in most places.
-constexpr std::array<bool, 256> plainCharacters()
+// Whether the character stays as it is wherever it stands. A blank does so in most places.
+constexpr bool isPlain(char c)
 {
-    std::array<bool, 256> plain{};
-    for (int c = 0; c < 256; ++c) {
-        const char character = static_cast<char>(c);
-        plain[static_cast<std::size_t>(c)] =
-            entityOf(character) == nullptr && !isControl(character) && character != ' ';
-    }
-    return plain;
+    return entityOf(c) == nullptr && !isControl(c) && c != ' ';
 }
-constexpr std::array<bool, 256> kPlain = plainCharacters();
 
 using Block = base::ByteBlock;
 
@@ -132,18 +125,35 @@ auto changesIn(const Block& c)
     return (c < 0x20) | (c == 0x7F) | (c == '"') | (c == '&') | (c == '\'') | (c == '<') | (c == '>');
 }
 
-// Returns: how many characters of a block stay as they are, up to the first other one.
-// Requires: a character before the block and one after it.
-std::size_t keptIn(const char* from)
+// Returns: a bit for each character of a block that changes, blanks after a blank included. `before` is the block that
+// begins one character earlier.
+unsigned changedBits(const char* before)
 {
-    const Block c = base::loadBlock(from);
-    return base::firstMarked(changesIn(c) | ((c == ' ') & (base::loadBlock(from - 1) == ' ')));
+    const Block c = base::loadBlock(before + 1);
+    return base::markedBits(changesIn(c) | ((c == ' ') & (base::loadBlock(before) == ' ')));
 }
 
-bool isKept(std::string_view text, std::size_t at)
+// As findMarked(), for characters whose meaning depends on the one before.
+// Requires: at > 0.
+std::size_t findChanged(std::string_view text, std::size_t at)
 {
-    return text[at] != ' ' ? kPlain[static_cast<unsigned char>(text[at])]
-                           : at > 0 && at + 1 < text.size() && text[at - 1] != ' ';
+    constexpr std::size_t kSize = sizeof(Block);
+    const auto place = [&text](std::size_t start, unsigned bits) {
+        return bits != 0 ? start + static_cast<std::size_t>(__builtin_ctz(bits)) : text.size();
+    };
+    for (; text.size() - at >= kSize; at += kSize) {
+        const unsigned bits = changedBits(text.data() + at - 1);
+        if (bits != 0) {
+            return place(at, bits);
+        }
+    }
+    const std::size_t rest = text.size() - at;
+    if (text.size() > kSize) { // the last characters as a block that overlaps the one before
+        return place(at, changedBits(text.data() + text.size() - kSize - 1) >> (kSize - rest));
+    }
+    char few[kSize + 1] = {};
+    std::memcpy(few, text.data() + at - 1, rest + 1);
+    return place(at, changedBits(few) & ((1U << rest) - 1));
 }
 
 // Returns: the next character from `at` on that changes; the text's size when the rest stays as it is.
@@ -152,20 +162,11 @@ std::size_t findEscaped(std::string_view text, std::size_t at, Blanks blanks)
     if (blanks == Blanks::kRaw) {
         return base::findMarked(text, at, changesIn);
     }
-    while (at < text.size()) {
-        if (at > 0 && text.size() - at > sizeof(Block)) {
-            const std::size_t kept = keptIn(text.data() + at);
-            at += kept;
-            if (kept < sizeof(Block)) {
-                return at;
-            }
-        } else if (isKept(text, at)) {
-            ++at;
-        } else {
-            return at;
-        }
+    if (at == text.size() || (at == 0 && !isPlain(text.front()))) {
+        return at;
     }
-    return at;
+    const std::size_t found = findChanged(text, std::max<std::size_t>(at, 1));
+    return found == text.size() && text.back() == ' ' ? text.size() - 1 : found;
 }
 
 void appendCharacterReference(std::string& out, char c)

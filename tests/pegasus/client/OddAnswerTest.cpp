@@ -116,7 +116,9 @@ TEST(EscapedText, EveryPlaceInABlock)
             }
         }
     }
-    std::string edges;
-    appendEscaped(edges, std::string_view(" a "));
-    EXPECT_EQ(edges, "&#32;a&#32;");
+    for (std::size_t size = 0; size < 40; ++size) {
+        std::string edges;
+        appendEscaped(edges, " " + std::string(size, 'a') + " ");
+        EXPECT_EQ(edges, "&#32;" + std::string(size, 'a') + "&#32;");
+    }
 }
