@@ -101,7 +101,7 @@ PEGASUS_COMMON_LINKAGE Boolean operator>(const String& s1, const String& s2);
 PEGASUS_COMMON_LINKAGE Boolean operator>=(const String& s1, const String& s2);
 PEGASUS_COMMON_LINKAGE String operator+(const String& s1, const String& s2);
 
-// Not UTF-8: code units 1 to 255 as one byte, 0 and all above 255 as the text `\xHHHH`.
+// The text as UTF-8. In OpenPegasus the encoding depends on how the library was built.
 PEGASUS_COMMON_LINKAGE std::ostream& operator<<(std::ostream& os, const String& str);
 
 PEGASUS_NAMESPACE_END
