@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "pegasus/client/KnownClasses.h"
 #include "pegasus/wire/ElementDecoder.h"
 #include "pegasus/wire/ElementEncoder.h"
 #include "pegasus/wire/instances/KnownInstances.h"
@@ -34,8 +35,8 @@ inline void encodeAgain(const Pegasus::wire::XmlElement& element, Pegasus::wire:
     }
 }
 
-// The content of an answer as the client reads it: instances are learned, and taken when they are offered. It appends
-// the encoding of each object to `out`. All references must outlive it.
+// The content of an answer as the client reads it: instances and classes are learned, and taken when they are offered.
+// It appends the encoding of each object to `out`. All references must outlive it.
 class ContentReader
 {
   public:
@@ -50,15 +51,24 @@ class ContentReader
         encodeAgain(element, fDecoder, fOut);
         if (element.is("VALUE.NAMEDINSTANCE")) {
             fKnown.learn(element, fDecoder.decodeNamedInstance(element));
+        } else if (element.is("CLASS")) {
+            fClasses.learn(element, fDecoder.decodeClass(element), 0);
         }
     }
 
     Pegasus::wire::XmlOffer offer(std::string_view text)
     {
+        using Result = Pegasus::wire::XmlOffer::Result;
+        Pegasus::CIMClass cimClass;
         Pegasus::CIMInstance instance;
-        const Pegasus::wire::XmlOffer offer = fKnown.take(text, instance);
-        if (offer.result == Pegasus::wire::XmlOffer::Result::kTaken) {
-            Pegasus::wire::appendNamedInstance(fOut, instance);
+        Pegasus::wire::XmlOffer offer = fClasses.take(text, cimClass);
+        if (offer.result == Result::kTaken) {
+            Pegasus::wire::appendClass(fOut, cimClass);
+        } else if (offer.result == Result::kRefused) {
+            offer = fKnown.take(text, instance);
+            if (offer.result == Result::kTaken) {
+                Pegasus::wire::appendNamedInstance(fOut, instance);
+            }
         }
         return offer;
     }
@@ -67,6 +77,7 @@ class ContentReader
     Pegasus::wire::ElementDecoder& fDecoder;
     std::string& fOut;
     Pegasus::wire::KnownInstances fKnown;
+    Pegasus::client::KnownClasses fClasses;
 };
 
 } // namespace test

@@ -160,8 +160,12 @@ std::vector<AnswerCase> sampleAnswers()
     std::string instances;
     wire::appendNamedInstance(instances, sampleInstance("one"));
     wire::appendNamedInstance(instances, sampleInstance("two \"q\""));
+    std::string classes;
+    wire::appendClass(classes, sampleClass());
+    classes += classes; // the second one is known
     return {
         sample("class", "GetClass", classAnswer(getClass, sampleClass())),
+        sample("classes", "EnumerateClasses", httpAnswer(intrinsicBody(requestFor("EnumerateClasses"), classes))),
         sample("instances", "EnumerateInstances", httpAnswer(intrinsicBody(enumerate, instances))),
         sample("instances in chunks", "EnumerateInstances", chunkedAnswer(intrinsicBody(enumerate, instances), 700)),
         sample("plain instances", "EnumerateInstances", httpAnswer(intrinsicBody(enumerate, plainInstances()))),
