@@ -1,6 +1,6 @@
 # SPDX-License-Identifier: MIT
 # vrx_add_product_target(): the target "product" builds every library and program of the folders that were added so far,
-# which is what staging takes.
+# which is what staging takes. It shares the precompiled headers, where the preset has them.
 function(vrx_targets_below folder targets)
   get_property(found DIRECTORY ${folder} PROPERTY BUILDSYSTEM_TARGETS)
   get_property(subfolders DIRECTORY ${folder} PROPERTY SUBDIRECTORIES)
@@ -20,5 +20,6 @@ function(vrx_add_product_target)
       list(APPEND built ${target})
     endif()
   endforeach()
+  vrx_precompile(${built})
   add_custom_target(product DEPENDS ${built})
 endfunction()
