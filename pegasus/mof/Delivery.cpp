@@ -38,20 +38,18 @@ Delivery::~Delivery()
     fCreator.join();
 }
 
-bool Delivery::findQualifier(const CIMName& name, CIMQualifierDecl& declaration)
+const KnownQualifier* Delivery::findQualifier(const std::string& written)
 {
-    const std::string key = writtenName(name);
-    const auto known = fQualifiers.find(key);
+    const auto known = fQualifiers.find(written);
     if (known != fQualifiers.end()) {
-        declaration = known->second;
-        return true;
+        return &known->second;
     }
     finish();
-    if (!fHandler.findQualifier(name, declaration)) {
-        return false;
+    KnownQualifier found{CIMName(written.c_str()), CIMQualifierDecl()};
+    if (!fHandler.findQualifier(found.name, found.declaration)) {
+        return nullptr;
     }
-    fQualifiers[key] = declaration;
-    return true;
+    return &fQualifiers.emplace(written, std::move(found)).first->second;
 }
 
 bool Delivery::findClass(const CIMName& name, CIMClass& found)

@@ -7,13 +7,20 @@
 #include <condition_variable>
 #include <deque>
 #include <exception>
-#include <map>
 #include <mutex>
-#include <set>
 #include <string>
 #include <thread>
+#include <unordered_map>
+#include <unordered_set>
 
 namespace Pegasus::mof {
+
+// A qualifier as a text names it.
+struct KnownQualifier
+{
+    CIMName name; // in the letter case of the text
+    CIMQualifierDecl declaration;
+};
 
 // Delivers a compilation's definitions to the handler and asks it for earlier ones.
 //
@@ -36,8 +43,10 @@ class Delivery
     Delivery(const Delivery&) = delete;
     Delivery& operator=(const Delivery&) = delete;
 
+    // Returns: the declaration of the qualifier that is written so; null when it is absent.
+    // Ownership: the object's, until the next declaration is delivered.
+    const KnownQualifier* findQualifier(const std::string& written);
     // As in DefinitionHandler.
-    bool findQualifier(const CIMName& name, CIMQualifierDecl& declaration);
     bool findClass(const CIMName& name, CIMClass& found);
     // Returns: true also for a class that still waits: if it fails, the compilation ends with its error.
     bool hasClass(const CIMName& name);
@@ -66,8 +75,8 @@ class Delivery
 
     DefinitionHandler& fHandler;
     const CompileLimits& fLimits;
-    std::map<std::string, CIMQualifierDecl> fQualifiers; // by name as written
-    std::set<std::string> fClassNames;                   // of classes that exist or wait, as written
+    std::unordered_map<std::string, KnownQualifier> fQualifiers; // by name as written
+    std::unordered_set<std::string> fClassNames;                 // of classes that exist or wait, as written
 
     std::mutex fMutex; // for the members below
     std::condition_variable fChanged;

@@ -2,6 +2,7 @@
 #include "pegasus/mof/Lexer.h"
 
 #include "pegasus/base/AsciiCase.h"
+#include "pegasus/base/ByteBlock.h"
 #include "pegasus/base/NumberText.h"
 
 #include <cstdio>
@@ -215,23 +216,24 @@ Token Lexer::number()
 
 Token Lexer::strings()
 {
-    Token token{TokenKind::kString, "", fAt};
+    const std::size_t start = fAt;
+    fJoined.clear();
     do {
-        stringLiteral(token.text);
-        if (token.text.size() > fLimits.stringBytes) {
-            fail(token.offset,
-                 "string is longer than the limit stringBytes (" + std::to_string(fLimits.stringBytes) + ")");
+        stringLiteral(fJoined);
+        if (fJoined.size() > fLimits.stringBytes) {
+            fail(start, "string is longer than the limit stringBytes (" + std::to_string(fLimits.stringBytes) + ")");
         }
         skipBlanksAndComments();
     } while (peek() == '"');
-    return token;
+    return Token{TokenKind::kString, fJoined, start};
 }
 
 void Lexer::stringLiteral(std::string& value)
 {
     const std::size_t start = fAt++;
     for (;;) {
-        const std::size_t plainEnd = std::min(fText.find_first_of("\"\\\n", fAt), fText.size());
+        const std::size_t plainEnd = base::findMarked(
+            fText, fAt, [](const base::ByteBlock& c) { return (c == '"') | (c == '\\') | (c == '\n'); });
         value.append(fText, fAt, plainEnd - fAt);
         fAt = plainEnd;
         if (atEnd() || peek() == '\n') {

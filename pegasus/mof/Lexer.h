@@ -53,6 +53,7 @@ class Lexer
     const CompileLimits& fLimits;
     WarningSink fWarn;
     std::size_t fAt = 0;
+    std::string fJoined; // of strings(), for its memory
 };
 
 } // namespace Pegasus::mof

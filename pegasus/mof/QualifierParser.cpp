@@ -81,23 +81,22 @@ Qualifiers QualifierParser::parseList()
 
 CIMQualifier QualifierParser::parseUse()
 {
-    const Token name = fCursor.expect(TokenKind::kIdentifier, "a qualifier name");
-    const CIMQualifierDecl declaration = declarationOf(name);
-    const CIMValue value = parseParameter(declaration);
+    const KnownQualifier qualifier = known(fCursor.expect(TokenKind::kIdentifier, "a qualifier name"));
+    const CIMValue value = parseParameter(qualifier.declaration);
     CIMFlavor flavor;
     if (fCursor.skipPunctuation(':')) {
-        flavor = parseUseFlavors(declaration.getFlavor());
+        flavor = parseUseFlavors(qualifier.declaration.getFlavor());
     }
-    return CIMQualifier(CIMName(name.text.c_str()), value, flavor);
+    return CIMQualifier(qualifier.name, value, flavor);
 }
 
-CIMQualifierDecl QualifierParser::declarationOf(const Token& name)
+KnownQualifier QualifierParser::known(const Token& name)
 {
-    CIMQualifierDecl declaration;
-    if (!fCompilation.delivery.findQualifier(CIMName(name.text.c_str()), declaration)) {
+    const KnownQualifier* const found = fCompilation.delivery.findQualifier(name.text);
+    if (found == nullptr) {
         fCursor.failAt(name.offset, "Could not find declaration for Qualifier named " + name.text);
     }
-    return declaration;
+    return *found;
 }
 
 // The parameter may be left out: a boolean qualifier is true then, any other null (DSP0004, 7.6.3).

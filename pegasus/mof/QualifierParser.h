@@ -27,7 +27,7 @@ class QualifierParser
 
   private:
     CIMQualifier parseUse();
-    CIMQualifierDecl declarationOf(const Token& name);
+    KnownQualifier known(const Token& name);
     CIMValue parseParameter(const CIMQualifierDecl& declaration);
     CIMScope parseScopes();
     CIMFlavor parseUseFlavors(CIMFlavor declared);
