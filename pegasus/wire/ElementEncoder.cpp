@@ -6,14 +6,14 @@
 namespace Pegasus::wire {
 namespace {
 
-void appendNameIfAny(std::string& out, const char* attribute, const CIMName& name)
+void appendNameIfAny(std::string& out, std::string_view attribute, const CIMName& name)
 {
     if (!name.isNull()) {
         appendAttribute(out, attribute, name.getString());
     }
 }
 
-void appendTrueIf(std::string& out, const char* attribute, bool condition)
+void appendTrueIf(std::string& out, std::string_view attribute, bool condition)
 {
     if (condition) {
         appendAttribute(out, attribute, "true");
