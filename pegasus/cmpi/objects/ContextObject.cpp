@@ -52,11 +52,17 @@ ContextObject::ContextObject(Broker& owner, const ProviderRequest& request, unsi
 {
     const Uint32 flags = (request.includeQualifiers ? CMPI_FLAG_IncludeQualifiers : 0U) |
                          (request.includeClassOrigin ? CMPI_FLAG_IncludeClassOrigin : 0U);
-    values.append(CIMName(CMPIInvocationFlags), CIMValue(flags));
-    values.append(CIMName(CMPIPrincipal), CIMValue(request.principal));
-    values.append(CIMName(CMPIAcceptLanguage), CIMValue(request.acceptLanguages));
-    values.append(CIMName(CMPIInitNameSpace), CIMValue(request.nameSpace.getString()));
-    values.append(CIMName(CMPIRole), CIMValue(String())); // this server has no roles
+    static const CIMName kFlags(CMPIInvocationFlags);
+    static const CIMName kPrincipal(CMPIPrincipal);
+    static const CIMName kLanguage(CMPIAcceptLanguage);
+    static const CIMName kNamespace(CMPIInitNameSpace);
+    static const CIMName kRole(CMPIRole);
+    values.reserve(5);
+    values.append(kFlags, CIMValue(flags));
+    values.append(kPrincipal, CIMValue(request.principal));
+    values.append(kLanguage, CIMValue(request.acceptLanguages));
+    values.append(kNamespace, CIMValue(request.nameSpace.getString()));
+    values.append(kRole, CIMValue(String())); // this server has no roles
     origin = std::make_shared<const CallOrigin>(CallOrigin{&owner, request.provider, request.nameSpace, depth});
 }
 

@@ -16,6 +16,8 @@ class NamedValues
     // Appends; a value of the same name goes.
     // Throws: CMPI_RC_ERR_INVALID_PARAMETER for an illegal name; also as decodeValue.
     void set(const char* name, const CMPIValue* value, CMPIType type);
+    // Makes room for so many values.
+    void reserve(std::size_t count) { fValues.reserve(count); }
     // Appends, even when the name is there already; find() then returns the first one.
     void append(const CIMName& name, const CIMValue& value) { fValues.push_back({name, value}); }
 

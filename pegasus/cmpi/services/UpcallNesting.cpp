@@ -24,10 +24,14 @@ void UpcallNesting::end(Place place)
 
 unsigned UpcallNesting::depthOf(SchemaCache& classes, const CIMNamespaceName& nameSpace, const CIMName& className) const
 {
-    const std::string space = base::utf8(nameSpace.getString());
+    std::string space;
     std::vector<Pending> pending;
     {
         const std::lock_guard lock(fMutex); // ends before the server is asked for classes
+        if (fPending.empty()) {
+            return 0;
+        }
+        space = base::utf8(nameSpace.getString());
         std::copy_if(fPending.begin(), fPending.end(), std::back_inserter(pending),
                      [&](const Pending& at) { return base::equalNoCase(at.nameSpace, space); });
     }

@@ -27,7 +27,8 @@ cmpi::ProviderRequest providerRequest(const HttpRequest& http, const CimRequest&
     cmpi::ProviderRequest result;
     result.provider = privateHeader(http, "PG-Provider");
     result.nameSpace = request.nameSpace;
-    result.principal = String("root"); // the server's clients are its own user and root, and providers ask for one name
+    static const String kPrincipal("root");
+    result.principal = kPrincipal; // the server's clients are its own user and root, and providers ask for one name
     return result;
 }
 
