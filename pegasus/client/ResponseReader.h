@@ -53,6 +53,7 @@ class ResponseReader : private wire::XmlSliceHandler
 
   private:
     void openEnvelope(const wire::XmlElement& tag) override;
+    void openExpected() override;
     void closeEnvelope(std::string_view name) override;
     wire::XmlOffer offer(std::string_view text) override;
     void slice(const wire::XmlElement& element) override;

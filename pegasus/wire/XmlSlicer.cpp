@@ -17,6 +17,8 @@ constexpr std::size_t kPieceBytes = 64UL * 1024;
 // An element that is cut off is offered again when more of it is there, but so often at most: each offer begins from
 // its start.
 constexpr std::size_t kMaxOffers = 4;
+// Of a tag in an opening that is expected.
+constexpr std::size_t kMaxOpeningAttributes = 2;
 // The levels that an element may have which is offered.
 constexpr std::size_t kOfferedDepth = 8;
 
@@ -26,6 +28,17 @@ XmlSlicer::XmlSlicer(std::vector<std::string_view> envelope, XmlSliceHandler& ha
     : fEnvelope(std::move(envelope)), fHandler(handler), fNodes(limits)
 {
     fOpen.reserve(fEnvelope.size());
+}
+
+void XmlSlicer::expectOpening(std::string opening, std::vector<std::string_view> names)
+{
+    const XmlLimits& limits = fNodes.limits();
+    if (names.size() <= limits.maxDepth && opening.size() <= limits.maxTagBytes &&
+        kMaxOpeningAttributes <= limits.maxAttributes)
+    {
+        fOpening = std::move(opening);
+        fOpeningNames = std::move(names);
+    }
 }
 
 void XmlSlicer::feed(std::string_view bytes)
@@ -41,6 +54,9 @@ void XmlSlicer::feedPiece(std::string_view bytes)
 {
     fBuffer.append(bytes);
     fNodes.setSource({rest(), fPlace});
+    if (!fOpening.empty()) {
+        takeOpening();
+    }
     while (fRead < rest().size() && step()) {
     }
     if (fNodes.depth() > 0) {
@@ -48,6 +64,18 @@ void XmlSlicer::feedPiece(std::string_view bytes)
     }
     fBuffer.erase(0, fStart);
     fStart = 0;
+}
+
+void XmlSlicer::takeOpening()
+{
+    if (rest().substr(0, fOpening.size()) == fOpening) {
+        fHasDeclaration = true;
+        fHasRoot = true;
+        fOpen = std::move(fOpeningNames);
+        fHandler.openExpected();
+        consume(fOpening.size());
+    }
+    fOpening.clear();
 }
 
 // Takes one token of the envelope, or what has arrived of an element in it. Returns: false when more is needed.
@@ -155,8 +183,8 @@ void XmlSlicer::begin(const XmlToken& token)
     }
     fNodes.take(token, 0);
     fRead = token.size;
-    const std::string name(token.name.in(rest()));
-    if (!isEnvelope(name)) {
+    const std::string_view* const name = findEnvelope(token.name.in(rest()));
+    if (name == nullptr) {
         if (token.type == Type::kEmptyTag) {
             deliver();
         }
@@ -164,11 +192,11 @@ void XmlSlicer::begin(const XmlToken& token)
     }
     fNodes.source().expectNoZero(fRead);
     fHasRoot = true;
-    fOpen.push_back(name);
+    fOpen.push_back(*name);
     fHandler.openEnvelope(XmlElement(fNodes, 0));
     fNodes.clear();
     if (token.type == Type::kEmptyTag) {
-        close(name);
+        close(*name);
     }
     consume(fRead);
 }
@@ -212,9 +240,11 @@ void XmlSlicer::checkElementSize(std::size_t size) const
     }
 }
 
-bool XmlSlicer::isEnvelope(std::string_view name) const
+// Returns: null for an element inside the envelope.
+const std::string_view* XmlSlicer::findEnvelope(std::string_view name) const
 {
-    return std::find(fEnvelope.begin(), fEnvelope.end(), name) != fEnvelope.end();
+    const auto found = std::find(fEnvelope.begin(), fEnvelope.end(), name);
+    return found != fEnvelope.end() ? &*found : nullptr;
 }
 
 void XmlSlicer::finish()

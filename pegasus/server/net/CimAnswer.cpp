@@ -2,6 +2,7 @@
 #include "pegasus/server/net/CimAnswer.h"
 
 #include "pegasus/base/Text.h"
+#include "pegasus/wire/AnswerEnvelope.h"
 #include "pegasus/wire/ElementEncoder.h"
 #include "pegasus/wire/XmlText.h"
 
@@ -9,13 +10,8 @@ namespace Pegasus::server {
 
 namespace {
 
-constexpr std::size_t kUsualEnvelopeBytes = 256;
+constexpr std::size_t kMaxTailBytes = 96;
 constexpr std::string_view kTail = "</SIMPLERSP>\n</MESSAGE>\n</CIM>\n";
-
-const char* responseElement(const CimRequest& request)
-{
-    return request.isIntrinsic ? "IMETHODRESPONSE" : "METHODRESPONSE";
-}
 
 std::string symbolicName(unsigned code)
 {
@@ -66,14 +62,7 @@ void CimAnswer::open()
         return;
     }
     std::string head;
-    head.reserve(kUsualEnvelopeBytes);
-    head += "<?xml version=\"1.0\" encoding=\"utf-8\" ?>\n<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">\n<MESSAGE ID=\"";
-    wire::appendEscaped(head, std::string_view(fRequest.messageId));
-    head += "\" PROTOCOLVERSION=\"1.0\">\n<SIMPLERSP>\n<";
-    head += responseElement(fRequest);
-    head += " NAME=\"";
-    wire::appendEscaped(head, std::string_view(fRequest.method));
-    head += "\">\n";
+    wire::appendAnswerOpening(head, fRequest.messageId, fRequest.method, fRequest.isIntrinsic);
     fStream.write(head);
 }
 
@@ -100,11 +89,11 @@ void CimAnswer::close()
         return;
     }
     std::string tail;
-    tail.reserve(kUsualEnvelopeBytes);
+    tail.reserve(kMaxTailBytes);
     if (fReturnValueOpen) {
         tail += "</IRETURNVALUE>\n";
     }
-    fStream.write(tail.append("</").append(responseElement(fRequest)).append(">\n").append(kTail));
+    fStream.write(tail.append("</").append(wire::responseElement(fRequest.isIntrinsic)).append(">\n").append(kTail));
 }
 
 void CimAnswer::finish()

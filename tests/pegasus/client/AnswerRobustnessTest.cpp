@@ -135,6 +135,7 @@ const LimitCase kLimits[] = {
     {"body bytes in chunks", [](auto& l) { l.http.maxBodyBytes = 100; }, "instances in chunks",
      "a body of more than 100 bytes"},
     {"depth", [](auto& l) { l.xml.maxDepth = 7; }, "instances", "nested more than 7 deep"},
+    {"depth of the envelope", [](auto& l) { l.xml.maxDepth = 3; }, "class", "nested more than 3 deep"},
     {"attributes", [](auto& l) { l.xml.maxAttributes = 2; }, "class", "more than 2 attributes"},
     {"tag bytes", [](auto& l) { l.xml.maxTagBytes = 40; }, "class", "a tag of more than 40 bytes"},
     {"text", [](auto& l) { l.xml.maxTextBytes = 8; }, "class", "text of more than 8 bytes"},
