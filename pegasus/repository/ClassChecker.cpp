@@ -99,6 +99,7 @@ class Checker
 Array<CIMQualifier> Checker::checkQualifiers(const Array<CIMQualifier>& uses, const CIMScope& scope) const
 {
     Array<CIMQualifier> checked;
+    checked.reserveCapacity(uses.size());
     for (Uint32 i = 0; i < uses.size(); ++i) {
         checked.append(checkedQualifier(uses[i], scope, fLookup));
     }
@@ -172,6 +173,7 @@ CIMClass checkClass(const CIMConstClass& newClass, const CIMConstClass& superCla
     if (!superClass.isUninitialized()) {
         checkOverrides(newClass, superClass);
     }
+    to.fProperties.reserveCapacity(from.fProperties.size());
     for (Uint32 i = 0; i < from.fProperties.size(); ++i) {
         to.fProperties.append(checker.checkProperty(from.fProperties[i], isAssociation));
     }

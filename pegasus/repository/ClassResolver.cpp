@@ -81,6 +81,7 @@ template <typename Rep, typename Handle>
 void addInherited(Array<Handle>& to, const Array<Handle>& local, const Array<Handle>& inherited)
 {
     const NameIndex<Handle> own(local);
+    to.reserveCapacity(local.size() + inherited.size());
     for (Uint32 i = 0; i < inherited.size(); ++i) {
         if (!own.has(inherited[i].getName())) {
             to.append(inheritedMember<Rep>(inherited[i]));
