@@ -6,10 +6,6 @@
 #include "host/cli/model/ErrorReport.h"
 #include "host/cli/record/TRecordReader.h"
 
-#include <CLI/CLI.hpp>
-
-#include <filesystem>
-
 namespace vrxhost {
 namespace {
 
@@ -26,11 +22,11 @@ class TDiffCommand : public ICommand
   public:
     const char* GetName() const override { return "diff"; }
     const char* GetPurpose() const override { return "Compare two records, or a record and this machine"; }
-    void AddArguments(CLI::App& command) override
+    void AddArguments(IArguments& arguments) override
     {
-        const auto absolute = [](const std::string& path) { return std::filesystem::absolute(path).string(); };
-        command.add_option("A", fFrom, "The earlier record")->required()->transform(absolute);
-        command.add_option("B", fTo, "The later record (default: this machine, as it is now)")->transform(absolute);
+        arguments.AddPath("A", IArguments::ENeed::kRequired, fFrom, "The earlier record");
+        arguments.AddPath("B", IArguments::ENeed::kOptional, fTo,
+                          "The later record (default: this machine, as it is now)");
     }
     bool NeedsInstances() const override { return true; }
     std::string GetReplay() const override { return fTo; }

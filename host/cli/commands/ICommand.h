@@ -1,15 +1,12 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "host/cli/commands/IArguments.h"
 #include "host/cli/model/Document.h"
 
 #include <memory>
 #include <string>
 #include <vector>
-
-namespace CLI {
-class App;
-}
 
 namespace vrxhost {
 
@@ -25,7 +22,7 @@ class ICommand
     virtual const char* GetPurpose() const = 0; // one line of the help
 
     // Declares the command's own arguments and options, which are read into this object.
-    virtual void AddArguments(CLI::App& command);
+    virtual void AddArguments(IArguments& arguments);
 
     // Returns: whether Fill looks at the instances itself; they are kept for it then, whatever takes them besides.
     virtual bool NeedsInstances() const { return false; }

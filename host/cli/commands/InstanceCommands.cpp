@@ -8,8 +8,6 @@
 
 #include <host/ICIMClass.h>
 
-#include <CLI/CLI.hpp>
-
 #include <algorithm>
 
 namespace vrxhost {
@@ -26,7 +24,7 @@ void RequireProperty(const TClassRecord& each, const std::string& name)
     }
 }
 
-std::string CheckCondition(const std::string& text)
+std::string RefuseCondition(const std::string& text)
 {
     return text.find('=') == std::string::npos ? "PROPERTY=VALUE is expected, not \"" + text + "\"" : "";
 }
@@ -36,16 +34,12 @@ class TInstancesCommand : public ICommand
   public:
     const char* GetName() const override { return "instances"; }
     const char* GetPurpose() const override { return "Show one class's instances"; }
-    void AddArguments(CLI::App& command) override
+    void AddArguments(IArguments& arguments) override
     {
-        command.add_option("CLASS", fName, "The class's name; letter case is ignored")->required();
-        command
-            .add_option("--where", fWhere,
-                        "PROPERTY=VALUE: instances with this value or text; several times: all of them")
-            ->type_size(1)
-            ->allow_extra_args(false)
-            ->check(CheckCondition);
-        command.add_option("--props", fProperties, "Properties to show, separated by commas")->delimiter(',');
+        arguments.AddText("CLASS", fName, "The class's name; letter case is ignored");
+        arguments.AddRepeatedOption("--where", fWhere, RefuseCondition,
+                                    "PROPERTY=VALUE: instances with this value or text; several times: all of them");
+        arguments.AddListOption("--props", fProperties, "Properties to show, separated by commas");
     }
     void Fill(TCollector& from, TDocument& into) const override
     {
@@ -106,9 +100,9 @@ class TGetCommand : public ICommand
   public:
     const char* GetName() const override { return "get"; }
     const char* GetPurpose() const override { return "Show the instance of a path"; }
-    void AddArguments(CLI::App& command) override
+    void AddArguments(IArguments& arguments) override
     {
-        command.add_option("PATH", fPath, "Class.Key=\"value\",... as the JSON document has it")->required();
+        arguments.AddText("PATH", fPath, "Class.Key=\"value\",... as the JSON document has it");
     }
     // Through the class, so that a mistyped path can be answered with the most similar one.
     void Fill(TCollector& from, TDocument& into) const override

@@ -12,8 +12,6 @@
 #include <host/ICIMParameterDecl.h>
 #include <host/TCIMReference.h>
 
-#include <CLI/CLI.hpp>
-
 #include <algorithm>
 
 namespace vrxhost {
@@ -69,11 +67,11 @@ class TInvokeCommand : public ICommand
   public:
     const char* GetName() const override { return "invoke"; }
     const char* GetPurpose() const override { return "Call a method of an instance (by its path) or of a class"; }
-    void AddArguments(CLI::App& command) override
+    void AddArguments(IArguments& arguments) override
     {
-        command.add_option("TARGET", fTarget, "Class.Key=\"value\",... or a class's name")->required();
-        command.add_option("METHOD", fMethod, "The method's name; letter case is ignored")->required();
-        command.add_option("NAME=VALUE", fArguments, "Input parameters; elements of an array separated by commas");
+        arguments.AddText("TARGET", fTarget, "Class.Key=\"value\",... or a class's name");
+        arguments.AddText("METHOD", fMethod, "The method's name; letter case is ignored");
+        arguments.AddRest("NAME=VALUE", fArguments, "Input parameters; elements of an array separated by commas");
     }
 
     const char* WhyNotReplayed() const override { return "a record answers no calls of methods"; }

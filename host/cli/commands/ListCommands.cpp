@@ -5,8 +5,6 @@
 
 #include <host/ICIMClass.h>
 
-#include <CLI/CLI.hpp>
-
 namespace vrxhost {
 namespace {
 
@@ -39,9 +37,9 @@ class TClassesCommand : public ICommand
   public:
     const char* GetName() const override { return "classes"; }
     const char* GetPurpose() const override { return "List the classes with their properties and methods"; }
-    void AddArguments(CLI::App& command) override
+    void AddArguments(IArguments& arguments) override
     {
-        command.add_flag("--tree", fIsTree, "Show the names alone, below their superclasses");
+        arguments.AddFlag("--tree", fIsTree, "Show the names alone, below their superclasses");
     }
     void Fill(TCollector& from, TDocument& into) const override
     {
@@ -59,9 +57,9 @@ class TClassCommand : public ICommand
   public:
     const char* GetName() const override { return "class"; }
     const char* GetPurpose() const override { return "Show the declaration of one class"; }
-    void AddArguments(CLI::App& command) override
+    void AddArguments(IArguments& arguments) override
     {
-        command.add_option("CLASS", fName, "The class's name; letter case is ignored")->required();
+        arguments.AddText("CLASS", fName, "The class's name; letter case is ignored");
     }
     void Fill(TCollector& from, TDocument& into) const override
     {
@@ -76,7 +74,7 @@ class TClassCommand : public ICommand
 
 } // namespace
 
-void ICommand::AddArguments(CLI::App&) {}
+void ICommand::AddArguments(IArguments&) {}
 
 void ICommand::Complete(TDocument&) const {}
 

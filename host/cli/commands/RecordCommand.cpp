@@ -5,10 +5,6 @@
 #include "host/cli/model/ErrorReport.h"
 #include "host/cli/record/TRecordWriter.h"
 
-#include <CLI/CLI.hpp>
-
-#include <filesystem>
-
 namespace vrxhost {
 namespace {
 
@@ -17,11 +13,10 @@ class TRecordCommand : public ICommand
   public:
     const char* GetName() const override { return "record"; }
     const char* GetPurpose() const override { return "Keep this machine in a file, for --replay and diff"; }
-    void AddArguments(CLI::App& command) override
+    void AddArguments(IArguments& arguments) override
     {
-        command.add_option("FILE", fFile, "The record; one that exists is replaced when the new one is whole")
-            ->required()
-            ->transform([](const std::string& path) { return std::filesystem::absolute(path).string(); });
+        arguments.AddPath("FILE", IArguments::ENeed::kRequired, fFile,
+                          "The record; one that exists is replaced when the new one is whole");
     }
     const char* WhyNotReplayed() const override { return "a record of it is there"; }
 

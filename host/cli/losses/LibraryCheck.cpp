@@ -1,14 +1,13 @@
 // SPDX-License-Identifier: MIT
 #include "host/cli/losses/LibraryCheck.h"
 
-#include "host/cli/losses/LossRules.h"
+#include "host/cli/losses/LinePattern.h"
 #include "host/cli/losses/RegistrationText.h"
 #include "host/core/TChildProcess.h"
 
 #include <algorithm>
 #include <chrono>
 #include <filesystem>
-#include <regex>
 #include <sstream>
 
 namespace vrxhost {
@@ -50,21 +49,19 @@ void AddMissing(std::vector<std::string>& missing, const std::string& text)
 // Returns: what is missing, as text; empty for a library that loads. What a missing library would define is left out.
 std::string DescribeMissing(const NKOLVRX20::TProcessOutcome& outcome)
 {
-    static const std::regex kLibrary("\\s*(\\S+) => not found");
-    static const std::regex kSymbol("undefined symbol: ([^\\s,]+).*");
-    static const std::regex kOther(".*error while loading shared libraries: (.*)");
     std::vector<std::string> libraries;
     std::vector<std::string> symbols;
     std::istringstream lines(outcome.fOutput + "\n" + outcome.fErrorOutput);
     for (std::string line; std::getline(lines, line);) {
-        std::smatch parts;
         line.resize(std::min(line.size(), kMaxMatchedBytes)); // the name of a symbol may have any length
-        if (std::regex_match(line, parts, kLibrary)) {
-            AddMissing(libraries, "the library " + parts[1].str() + " is missing");
-        } else if (std::regex_match(line, parts, kSymbol)) {
-            AddMissing(symbols, "the symbol " + parts[1].str() + " is missing");
-        } else if (std::regex_match(line, parts, kOther)) {
-            AddMissing(libraries, parts[1]);
+        line.erase(0, line.find_first_not_of(" \t"));
+        if (const auto library = MatchLine("<word> => not found", line)) {
+            AddMissing(libraries, "the library " + library->front() + " is missing");
+        } else if (const auto symbol = MatchLine("undefined symbol: <word><text>", line)) {
+            const std::string name = symbol->front(); // a comma and the symbol's version may follow
+            AddMissing(symbols, "the symbol " + name.substr(0, name.find(',')) + " is missing");
+        } else if (const auto other = MatchLine("<text>error while loading shared libraries: <text>", line)) {
+            AddMissing(libraries, other->back());
         }
     }
     return JoinNames(libraries.empty() ? symbols : libraries);

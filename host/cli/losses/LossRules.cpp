@@ -1,13 +1,13 @@
 // SPDX-License-Identifier: MIT
 #include "host/cli/losses/LossRules.h"
 
+#include "host/cli/losses/LinePattern.h"
 #include "host/cli/losses/RegistrationText.h"
 
 #include <host/TVRXStatusCode.h>
 
 #include <algorithm>
 #include <filesystem>
-#include <regex>
 #include <sstream>
 #include <vector>
 
@@ -184,39 +184,40 @@ TLoss LossOfCompilation(const NKOLVRX20::TFailedProgram& program)
 // What the plug-in finds in class lists and in the classes that they name.
 std::optional<TLoss> LossOfListedClass(const std::string& line)
 {
-    static const std::regex kName("TPEGASUSNamespace::CollectClass failed: the class name \"(.*)\" in (.*) is invalid");
-    static const std::regex kTimeout(
-        "TPEGASUSNamespace::CollectClass: the timeout of class (.*) in (.*) is not a number "
-        "of seconds up to ([0-9]+): \"(.*)\" becomes ([0-9]+ ms)");
-    static const std::regex kEmbedded("Not supported type of property (\\S+) in class (\\S+): [0-9]+, default to "
-                                      "string\\.");
-    std::smatch found;
+    constexpr char kName[] = "TPEGASUSNamespace::CollectClass failed: the class name \"<text>\" in <text> is invalid";
+    constexpr char kTimeout[] = "TPEGASUSNamespace::CollectClass: the timeout of class <text> in <text> is not a "
+                                "number of seconds up to <number>: \"<text>\" becomes <text>";
+    constexpr char kEmbedded[] = "Not supported type of property <word> in class <word>: <number>, default to string.";
     TLoss loss;
-    if (line.size() > kMaxMatchedBytes) {
-        return std::nullopt;
-    }
-    if (std::regex_match(line, found, kName)) {
-        loss = LossOf(EKind::kClassName, "the class name \"" + found[1].str() + "\" is invalid");
-        loss.fFile = found[2];
+    if (const auto name = MatchLine(kName, line)) {
+        loss = LossOf(EKind::kClassName, "the class name \"" + name->at(0) + "\" is invalid");
+        loss.fFile = name->at(1);
         loss.fVendor = VendorOfFile(loss.fFile);
-        loss.fClasses = {found[1]};
-    } else if (std::regex_match(line, found, kTimeout)) {
-        loss = LossOf(EKind::kTimeout, "the timeout of class " + found[1].str() + " is \"" + found[4].str() +
-                                           "\", which is not a number of seconds up to " + found[3].str() +
-                                           ", and becomes " + found[5].str());
-        loss.fFile = found[2];
+        loss.fClasses = {name->at(0)};
+    } else if (const auto timeout = MatchLine(kTimeout, line)) {
+        loss = LossOf(EKind::kTimeout, "the timeout of class " + timeout->at(0) + " is \"" + timeout->at(3) +
+                                           "\", which is not a number of seconds up to " + timeout->at(2) +
+                                           ", and becomes " + timeout->at(4));
+        loss.fFile = timeout->at(1);
         loss.fVendor = VendorOfFile(loss.fFile);
-        loss.fClasses = {found[1]};
+        loss.fClasses = {timeout->at(0)};
         loss.fIsNote = true;
-    } else if (std::regex_match(line, found, kEmbedded)) {
+    } else if (const auto embedded = MatchLine(kEmbedded, line)) {
         loss = LossOf(EKind::kEmbeddedObject, "an embedded object is shown as text: ");
-        loss.fObjects = {found[2].str() + "." + found[1].str()};
-        loss.fClasses = {found[2]};
+        loss.fObjects = {embedded->at(1) + "." + embedded->at(0)};
+        loss.fClasses = {embedded->at(1)};
         loss.fIsNote = true;
     } else {
         return std::nullopt;
     }
     return loss;
+}
+
+// "FILE:LINE:COLUMN", at the end of what the compiler's warning begins with; the plug-in's log may write before it.
+std::optional<std::vector<std::string>> PlaceIn(const std::string& text)
+{
+    const std::size_t before = text.rfind(": ");
+    return MatchLine("/<text>:<number>:<number>", before == std::string::npos ? text : text.substr(before + 2));
 }
 
 } // namespace
@@ -248,15 +249,16 @@ bool IsHarmless(const std::string& errorLine)
 
 std::vector<TLoss> NotesOfCompiler(const std::string& text)
 {
-    static const std::regex kWarning("(?:.*: )?(/[^:]*):([0-9]+):([0-9]+): warning: " + std::string(kTrap) + "(.*)");
+    static const std::string kWarning = "<text>: warning: " + std::string(kTrap) + "<text>";
     std::vector<TLoss> notes;
     std::istringstream lines(text.find(kTrap) == std::string::npos ? "" : text);
     for (std::string line; std::getline(lines, line);) {
-        std::smatch found;
-        if (line.size() <= kMaxMatchedBytes && std::regex_match(line, found, kWarning)) {
-            TLoss note = LossOf(EKind::kMofPortability, "line " + found[2].str() + ", column " + found[3].str() +
-                                                            ": fails on OpenPegasus 2.14: " + found[4].str());
-            note.fFile = found[1];
+        const auto warning = MatchLine(kWarning, line);
+        const auto place = warning ? PlaceIn(warning->front()) : std::nullopt;
+        if (place) {
+            TLoss note = LossOf(EKind::kMofPortability, "line " + place->at(1) + ", column " + place->at(2) +
+                                                            ": fails on OpenPegasus 2.14: " + warning->back());
+            note.fFile = "/" + place->front();
             note.fVendor = VendorOfFile(note.fFile);
             note.fIsNote = true;
             notes.push_back(std::move(note));
@@ -267,12 +269,10 @@ std::vector<TLoss> NotesOfCompiler(const std::string& text)
 
 std::optional<TLoss> NoteOfServerLine(const TServerLogLine& line)
 {
-    static const std::regex kKey("addKey: (\\S+) is not a key of class (\\S+)");
-    std::smatch found;
-    if (line.fText.size() <= kMaxMatchedBytes && std::regex_search(line.fText, found, kKey)) {
+    if (const auto found = MatchLine("<text>addKey: <word> is not a key of class <word><text>", line.fText)) {
         TLoss key =
-            LossOf(EKind::kUndeclaredKey, "provider module " + line.fModule + " uses " + found[1].str() +
-                                              " as a key of class " + found[2].str() + ", which declares it as none");
+            LossOf(EKind::kUndeclaredKey, "provider module " + line.fModule + " uses " + found->at(1) +
+                                              " as a key of class " + found->at(2) + ", which declares it as none");
         key.fIsNote = true;
         return key;
     }
@@ -289,19 +289,20 @@ std::optional<TLoss> NoteOfServerLine(const TServerLogLine& line)
 
 std::optional<TLoss> LossOfServerLine(const TServerLogLine& line)
 {
-    static const std::regex kRefused("(?:setProperty|addKey): (?:class (\\S+) has no property (\\S+)"
-                                     "|(?:property|key) (\\S+) of (\\S+) has another type.*)");
-    std::smatch found;
-    if (line.fText.size() > kMaxMatchedBytes || !std::regex_search(line.fText, found, kRefused)) {
+    const auto unknown = MatchLine("<text>setProperty: class <word> has no property <word><text>", line.fText);
+    auto other = MatchLine("<text>setProperty: property <word> of <word> has another type<text>", line.fText);
+    if (!other) {
+        other = MatchLine("<text>addKey: key <word> of <word> has another type<text>", line.fText);
+    }
+    if (!unknown && !other) {
         return std::nullopt;
     }
-    const bool isUnknown = found[1].matched;
     TLoss loss;
-    loss.fKind = isUnknown ? EKind::kUndeclaredProperty : EKind::kPropertyType;
-    loss.fClasses = {isUnknown ? found[1] : found[4]};
-    loss.fProperty = isUnknown ? found[2] : found[3];
+    loss.fKind = unknown ? EKind::kUndeclaredProperty : EKind::kPropertyType;
+    loss.fClasses = {unknown ? unknown->at(1) : other->at(2)};
+    loss.fProperty = unknown ? unknown->at(2) : other->at(1);
     loss.fBegin = "property " + loss.fProperty + " of class " + loss.fClasses.front();
-    loss.fEnd = std::string(isUnknown ? " is not declared" : " is declared with another type") +
+    loss.fEnd = std::string(unknown ? " is not declared" : " is declared with another type") +
                 ", so that the value which provider module " + line.fModule + " sets is lost";
     return loss;
 }

@@ -5,16 +5,11 @@
 #include "host/cli/model/Loss.h"
 #include "host/core/TProcessLog.h"
 
-#include <cstddef>
 #include <optional>
 #include <string>
 #include <vector>
 
 namespace vrxhost {
-
-// Bytes of a line that is matched with an expression: the C++ library's matcher takes stack for each. Longer lines are
-// no losses of a known kind; program output is cut to its lines first.
-constexpr std::size_t kMaxMatchedBytes = 4096;
 
 // How a line about a fault in a class list begins.
 inline constexpr char kClassListLine[] = "Performance Data RDD Parser line ";

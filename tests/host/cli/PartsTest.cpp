@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 // Parts of vrxhost, each tested apart from any plug-in.
 #include "host/cli/TPrivateServer.h"
+#include "host/cli/losses/LinePattern.h"
 #include "host/cli/losses/LossRules.h"
 #include "host/cli/losses/RegistrationText.h"
 #include "host/cli/losses/TLossLog.h"
@@ -78,7 +79,33 @@ TEST(LossRules, LinesOfThePlugin)
     }
 }
 
-// Expressions are matched with recursion; what a vendor writes must not exhaust the stack.
+struct TPatternRow
+{
+    const char* fPattern;
+    const char* fLine;
+    std::optional<std::vector<std::string>> fTaken;
+};
+
+const TPatternRow kPatterns[] = {
+    {"in class <word>: <number>, end.", "in class A: B: 12, end.", std::nullopt}, // the word ends at the first colon
+    {"in class <word>: <number>, end.", "in class A: 12, end.", {{"A", "12"}}},
+    {"in class <word>: <number>, end.", "in class A: 12, end. More", std::nullopt},
+    {"in class <word>: <number>, end.", "in class : 12, end.", std::nullopt},
+    {"in class <word>: <number>, end.", "in class A: x, end.", std::nullopt},
+    {"<text>key <word> of <word><text>", "a: key K of C, late", {{"a: ", "K", "C,", " late"}}},
+    {"<text>key <word> of <word><text>", "key two words of C", std::nullopt},
+    {"<text> is invalid", "x is invalid is invalid", {{"x is invalid"}}},
+    {"<text> is invalid", "invalid", std::nullopt},
+};
+
+TEST(LossRules, GapsOfPatterns)
+{
+    for (const TPatternRow& row : kPatterns) {
+        EXPECT_EQ(MatchLine(row.fPattern, row.fLine), row.fTaken) << row.fPattern << "\n" << row.fLine;
+    }
+}
+
+// What a vendor writes must not fill the screen.
 TEST(LossRules, LinesOfAnyLengthAreRead)
 {
     const std::string name(1 << 20, 'x');
