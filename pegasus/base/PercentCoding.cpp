@@ -26,12 +26,13 @@ constexpr ByteSet kUnreserved = keptBytes("-_.!~*'()");
 
 } // namespace
 
-std::string percentEncoded(std::string_view text, PercentSet kept)
+void appendPercentEncoded(std::string& out, std::string_view text, PercentSet kept)
 {
     static constexpr char kDigits[] = "0123456789ABCDEF";
     const ByteSet& isKept = kept == PercentSet::kStrict ? kStrict : kUnreserved;
-    std::string out(text.size() * 3, '\0'); // the longest form of each byte
-    char* end = out.data();
+    const std::size_t start = out.size();
+    out.resize(start + text.size() * 3); // the longest form of each byte
+    char* end = out.data() + start;
     for (const char c : text) {
         const auto byte = static_cast<unsigned char>(c);
         if (isKept[byte]) {
@@ -43,6 +44,12 @@ std::string percentEncoded(std::string_view text, PercentSet kept)
         *end++ = kDigits[byte & 15];
     }
     out.resize(static_cast<std::size_t>(end - out.data()));
+}
+
+std::string percentEncoded(std::string_view text, PercentSet kept)
+{
+    std::string out;
+    appendPercentEncoded(out, text, kept);
     return out;
 }
 

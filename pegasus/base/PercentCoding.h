@@ -15,6 +15,7 @@ enum class PercentSet
     kUnreserved, // "-_.!~*'()": RFC 2396's unreserved, what OpenPegasus's server sends and compares with
 };
 
+void appendPercentEncoded(std::string& out, std::string_view text, PercentSet kept);
 std::string percentEncoded(std::string_view text, PercentSet kept);
 
 // Returns: the text with its escapes decoded, whatever set it was encoded with. A "%" that lacks two hexadecimal

@@ -61,8 +61,9 @@ std::string encodeHttpRequest(const Request& request, std::string_view messageId
         .append("\r\n");
     out.append("TE: chunked, trailers\r\n");
     out.append("CIMOperation: MethodCall\r\n");
-    const std::string method = base::percentEncoded(request.method, base::PercentSet::kStrict);
-    out.append("CIMMethod: ").append(method).append("\r\n");
+    out.append("CIMMethod: ");
+    base::appendPercentEncoded(out, request.method, base::PercentSet::kStrict);
+    out.append("\r\n");
     out.append("CIMObject: ").append(request.object).append("\r\n");
     if (!localUser.empty()) {
         out.append("PegasusAuthorization: Local \"").append(localUser).append("\"\r\n");

@@ -18,6 +18,7 @@ namespace {
 // &#x10FFFF; and a few leading zeros.
 constexpr std::size_t kMaxReferenceBytes = 16;
 
+constexpr std::string_view kUsualDeclaration = "<?xml version=\"1.0\" encoding=\"utf-8\" ?>";
 constexpr std::string_view kEncodings[] = {"utf-8", "us-ascii", "iso-8859-1"};
 
 struct Entity
@@ -250,6 +251,9 @@ void appendNormalized(std::string& out, std::string_view text)
 
 void checkXmlDeclaration(std::string_view declaration, XmlPlace place)
 {
+    if (declaration == kUsualDeclaration) {
+        return;
+    }
     const std::string_view version = pseudoAttribute(declaration, "version").value_or("");
     if (version.substr(0, 2) != "1." || version.size() < 3) {
         throw XmlError(XmlError::Kind::kInvalid, place, "Expected <?xml ... ?> style declaration with version 1.x");

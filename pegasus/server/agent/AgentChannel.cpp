@@ -13,11 +13,14 @@ namespace Pegasus::server {
 namespace {
 
 constexpr std::size_t kFrameReadBytes = 128u << 10;
+constexpr std::size_t kUsualHeadBytes = 1024;
 constexpr unsigned kOk = 200;
 
-std::string encoded(const std::string& text)
+void appendField(std::string& head, const char* name, const std::string& value)
 {
-    return base::percentEncoded(text, base::PercentSet::kUnreserved);
+    head.append(name).append(": ");
+    base::appendPercentEncoded(head, value, base::PercentSet::kUnreserved);
+    head += "\r\n";
 }
 
 CimStatus statusIn(const wire::HttpAnswerFields& fields)
@@ -45,11 +48,15 @@ CimStatus AgentChannel::request(const AgentRequest& request, ElementSink& sink, 
 
 void AgentChannel::send(const AgentRequest& request, std::chrono::milliseconds timeout)
 try {
-    std::string head = "POST /agent HTTP/1.1\r\nHost: agent\r\nContent-Type: application/xml; charset=utf-8\r\n"
-                       "TE: chunked, trailers\r\nCIMOperation: MethodCall\r\nCIMMethod: " +
-                       encoded(request.method) + "\r\nCIMObject: " + encoded(request.object) +
-                       "\r\nPG-Provider: " + encoded(request.provider) + "\r\nPG-Library: " + encoded(request.library) +
-                       "\r\nContent-Length: " + std::to_string(request.body.size()) + "\r\n\r\n";
+    std::string head;
+    head.reserve(kUsualHeadBytes);
+    head += "POST /agent HTTP/1.1\r\nHost: agent\r\nContent-Type: application/xml; charset=utf-8\r\n"
+            "TE: chunked, trailers\r\nCIMOperation: MethodCall\r\n";
+    appendField(head, "CIMMethod", request.method);
+    appendField(head, "CIMObject", request.object);
+    appendField(head, "PG-Provider", request.provider);
+    appendField(head, "PG-Library", request.library);
+    head.append("Content-Length: ").append(std::to_string(request.body.size())).append("\r\n\r\n");
     iovec parts[] = {{head.data(), head.size()}, {const_cast<char*>(request.body.data()), request.body.size()}};
     fStream.writeAll(parts, std::size(parts), timeout);
 } catch (const std::system_error& error) {

@@ -44,7 +44,7 @@ struct AgentRequest
 //
 // The protocol is the public one, CIM-XML over HTTP, with two differences: the headers PG-Provider and PG-Library name
 // the provider and its library, and the answer's body is only the elements within IRETURNVALUE or METHODRESPONSE, so
-// that they can be passed on unread, whatever their number.
+// that they can be passed on unread, whatever their number; its head lacks the fields that say what the body is.
 //
 // Thread: one at a time; shutDown(): any.
 class AgentChannel

@@ -37,7 +37,10 @@ std::string AnswerStream::makeHead(std::size_t length) const
 {
     std::string head;
     head.reserve(kUsualHeadBytes);
-    head += "HTTP/1.1 200 OK\r\nContent-Type: application/xml; charset=utf-8\r\n";
+    head += "HTTP/1.1 200 OK\r\n";
+    if (!fOptions.isForServer) {
+        head += "Content-Type: application/xml; charset=utf-8\r\n";
+    }
     if (isChunked()) {
         head += "transfer-encoding: chunked\r\n";
     } else {
@@ -45,19 +48,26 @@ std::string AnswerStream::makeHead(std::size_t length) const
         std::snprintf(text, sizeof text, "content-length: %010zu\r\n", length);
         head += text;
     }
-    const std::string& prefix = fOptions.extensionPrefix;
-    if (prefix.size() > 1) {
-        head += "Ext:\r\nCache-Control: no-cache\r\nMan: http://www.dmtf.org/cim/mapping/http/v1.0; ns=";
-        head.append(prefix, 0, prefix.size() - 1).append("\r\n");
-    }
-    head.append(prefix).append("CIMOperation: ").append(fOptions.operation).append("\r\n");
-    if (isChunked()) {
-        head += "Trailer: CIMStatusCode, CIMStatusCodeDescription, Content-Language\r\n";
+    if (!fOptions.isForServer) {
+        appendCimFields(head);
     }
     if (fOptions.closes) {
         head += "Connection: close\r\n";
     }
     return head += "\r\n";
+}
+
+void AnswerStream::appendCimFields(std::string& head) const
+{
+    const std::string& prefix = fOptions.extensionPrefix;
+    if (prefix.size() > 1) {
+        head += "Ext:\r\nCache-Control: no-cache\r\nMan: http://www.dmtf.org/cim/mapping/http/v1.0; ns=";
+        head.append(prefix, 0, prefix.size() - 1).append("\r\n");
+    }
+    head.append(prefix).append("CIMOperation: MethodResponse\r\n");
+    if (isChunked()) {
+        head += "Trailer: CIMStatusCode, CIMStatusCodeDescription, Content-Language\r\n";
+    }
 }
 
 void AnswerStream::write(std::string_view bytes)

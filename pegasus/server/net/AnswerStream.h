@@ -48,7 +48,7 @@ class AnswerStream
         std::chrono::milliseconds writeTimeout = std::chrono::seconds(20);
         bool closes = false;         // whether the connection ends after the answer
         std::string extensionPrefix; // of an M-POST: HttpRequest::extensionPrefix
-        const char* operation = "MethodResponse";
+        bool isForServer = false;    // an agent's: its reader needs the status and the framing alone
     };
 
     AnswerStream(SocketStream& stream, Options options);
@@ -66,6 +66,7 @@ class AnswerStream
 
   private:
     std::string makeHead(std::size_t length) const;
+    void appendCimFields(std::string& head) const;
     void sendChunk(std::string_view more, std::string_view ending);
     void sendWhole();
 

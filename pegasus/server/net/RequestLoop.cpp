@@ -24,7 +24,8 @@ bool wantsClose(const HttpRequest& http)
     return http.headerHas("Connection", "close");
 }
 
-AnswerStream::Options answerOptions(const HttpRequest& http, const ConnectionSettings& settings)
+AnswerStream::Options answerOptions(const HttpRequest& http, const ConnectionSettings& settings,
+                                    CimAnswer::Envelope envelope)
 {
     AnswerStream::Options options;
     const bool takesTrailers = http.headerHas("TE", "chunked") || http.headerHas("TE", "trailers");
@@ -33,6 +34,7 @@ AnswerStream::Options answerOptions(const HttpRequest& http, const ConnectionSet
     options.maxBufferedBytes = settings.maxBufferedAnswerBytes;
     options.writeTimeout = settings.writeTimeout;
     options.closes = wantsClose(http);
+    options.isForServer = envelope == CimAnswer::Envelope::kBare;
     options.extensionPrefix = http.extensionPrefix;
     return options;
 }
@@ -119,7 +121,7 @@ try {
 void RequestLoop::answer(const HttpRequest& http)
 {
     const CimRequest request = fDecoder.decode(http);
-    AnswerStream stream(fStream, answerOptions(http, fSettings));
+    AnswerStream stream(fStream, answerOptions(http, fSettings, fEnvelope));
     CimAnswer answer(stream, request, fEnvelope);
     if (!fHandler.knowsMethod(request)) {
         answer.fail(makeStatus(CIM_ERR_NOT_SUPPORTED, "Unrecognized intrinsic method: " + request.method),
