@@ -1,6 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "host/cli/CommandLine.h"
-
+#include "host/cli/Options.h"
 #include "host/cli/commands/IArguments.h"
 #include "host/cli/model/ErrorReport.h"
 #include "host/cli/model/Loss.h"

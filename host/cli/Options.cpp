@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "host/cli/Options.h"
 
-#include "host/cli/CommandLine.h"
-
 #include <cstdlib>
 #include <filesystem>
 

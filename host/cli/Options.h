@@ -60,6 +60,10 @@ constexpr char kLogFile[] = "vrxhost.log";
 // TUsageError, std::filesystem::filesystem_error.
 bool ParseOptions(int argc, const char* const* argv, TOptions& options);
 
+// Reads the command line as it stands (CommandLine.cpp): paths are as they were written, and what is not given keeps
+// its value. Returns: as ParseOptions. Throws: TUsageError.
+bool ReadCommandLine(int argc, const char* const* argv, TOptions& options);
+
 // Makes a tree the root: the default place of the plug-in, the settings file and the log, and what decides on the
 // consumer. Throws: TTreeError when the tree's server does not run for the wanted consumer.
 void SetRoot(const TDeployedTree& tree, TOptions& options);
