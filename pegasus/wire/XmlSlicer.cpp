@@ -17,8 +17,8 @@ constexpr std::size_t kPieceBytes = 64UL * 1024;
 // An element that is cut off is offered again when more of it is there, but so often at most: each offer begins from
 // its start.
 constexpr std::size_t kMaxOffers = 4;
-// Of a tag in an opening that is expected.
-constexpr std::size_t kMaxOpeningAttributes = 2;
+// The most that a tag in an opening has which is expected.
+constexpr std::size_t kOpeningAttributes = 2;
 // The levels that an element may have which is offered.
 constexpr std::size_t kOfferedDepth = 8;
 
@@ -34,7 +34,7 @@ void XmlSlicer::expectOpening(std::string opening, std::vector<std::string_view>
 {
     const XmlLimits& limits = fNodes.limits();
     if (names.size() <= limits.maxDepth && opening.size() <= limits.maxTagBytes &&
-        kMaxOpeningAttributes <= limits.maxAttributes)
+        kOpeningAttributes <= limits.maxAttributes)
     {
         fOpening = std::move(opening);
         fOpeningNames = std::move(names);

@@ -10,7 +10,7 @@ namespace Pegasus::server {
 
 namespace {
 
-constexpr std::size_t kMaxTailBytes = 96;
+constexpr std::size_t kTailBytes = 96;
 constexpr std::string_view kTail = "</SIMPLERSP>\n</MESSAGE>\n</CIM>\n";
 
 std::string symbolicName(unsigned code)
@@ -89,7 +89,7 @@ void CimAnswer::close()
         return;
     }
     std::string tail;
-    tail.reserve(kMaxTailBytes);
+    tail.reserve(kTailBytes);
     if (fReturnValueOpen) {
         tail += "</IRETURNVALUE>\n";
     }
