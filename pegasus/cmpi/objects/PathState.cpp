@@ -181,6 +181,10 @@ void PathState::addKey(const char* name, const CMPIValue* value, CMPIType type)
     if (key.value.isNull()) {
         throw CmpiError{CMPI_RC_ERR_FAILED, "addKey: the value is null"};
     }
+    // A path holds a character as text, and a text with this one would cost the client the whole answer.
+    if (type == CMPI_char16 && value->char16 == 0) {
+        throw CmpiError{CMPI_RC_ERR_FAILED, "addKey: the value is the character 0"};
+    }
     const auto held =
         std::find_if(keys.begin(), keys.end(), [&](const PathKey& other) { return other.name.equal(key.name); });
     if (held != keys.end()) {
