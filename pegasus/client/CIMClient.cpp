@@ -12,6 +12,7 @@ using client::makeRequest;
 using wire::ElementDecoder;
 using wire::IntrinsicCall;
 using wire::XmlElement;
+using wire::XmlOffer;
 
 [[noreturn]] void failUnexpected(const XmlElement& element)
 {
@@ -19,50 +20,59 @@ using wire::XmlElement;
                  "Expected close of IRETURNVALUE element, got " + std::string(element.name()) + " instead");
 }
 
-// An operation whose result is one object. A success whose result is absent gives an uninitialised object.
-template <typename T>
-T readOne(CIMClientRep& rep, client::Request request, const char* elementName,
-          T (ElementDecoder::*decode)(const XmlElement&))
+// An operation whose result is one object, which is read, or taken from its text. A success whose result is absent
+// gives an uninitialised object.
+template <typename T, typename Read, typename Take>
+T readOne(CIMClientRep& rep, client::Request request, const char* elementName, const Read& read, const Take& take)
 {
     T result;
     bool found = false;
     request.result = elementName;
-    rep.exchange(request, [&](const XmlElement& element, ElementDecoder& decoder) {
-        if (found) {
-            failUnexpected(element);
-        }
-        result = (decoder.*decode)(element);
-        found = true;
-    });
-    return result;
-}
-
-CIMClass readClass(CIMClientRep& rep, client::Request request)
-{
-    CIMClass result;
-    bool found = false;
-    request.result = "CLASS";
-    client::KnownClasses& known = rep.knownClasses();
     rep.exchange(
         request,
         [&](const XmlElement& element, ElementDecoder& decoder) {
             if (found) {
                 failUnexpected(element);
             }
-            const std::size_t before = decoder.decodedBytes();
-            result = decoder.decodeClass(element);
-            known.learn(element, result, decoder.decodedBytes() - before);
+            result = read(element, decoder);
             found = true;
         },
         [&](std::string_view text, ElementDecoder& decoder) {
-            const wire::XmlOffer offer = found ? wire::XmlOffer() : known.take(text, result);
-            if (offer.result == wire::XmlOffer::Result::kTaken) {
-                decoder.addDecodedBytes(known.bytes());
-                found = true;
-            }
+            const XmlOffer offer = found ? XmlOffer() : take(text, decoder, result);
+            found = found || offer.result == XmlOffer::Result::kTaken;
             return offer;
         });
     return result;
+}
+
+template <typename T>
+T readOne(CIMClientRep& rep, const client::Request& request, const char* elementName,
+          T (ElementDecoder::*decode)(const XmlElement&))
+{
+    return readOne<T>(
+        rep, request, elementName,
+        [decode](const XmlElement& element, ElementDecoder& decoder) { return (decoder.*decode)(element); },
+        [](std::string_view, ElementDecoder&, T&) { return XmlOffer(); });
+}
+
+CIMClass readClass(CIMClientRep& rep, const client::Request& request)
+{
+    client::KnownClasses& known = rep.knownClasses();
+    return readOne<CIMClass>(
+        rep, request, "CLASS",
+        [&](const XmlElement& element, ElementDecoder& decoder) {
+            const std::size_t before = decoder.decodedBytes();
+            const CIMClass decoded = decoder.decodeClass(element);
+            known.learn(element, decoded, decoder.decodedBytes() - before);
+            return decoded;
+        },
+        [&](std::string_view text, ElementDecoder& decoder, CIMClass& taken) {
+            const XmlOffer offer = known.take(text, taken);
+            if (offer.result == XmlOffer::Result::kTaken) {
+                decoder.addDecodedBytes(known.bytes());
+            }
+            return offer;
+        });
 }
 
 // An operation whose result is a list.
