@@ -6,33 +6,13 @@
 #include <fstream>
 #include <stdexcept>
 
-#include <arpa/inet.h>
-#include <netinet/in.h>
 #include <poll.h>
-#include <sys/socket.h>
 #include <sys/syscall.h>
 #include <unistd.h>
 
 namespace test {
 
 namespace {
-
-// A port that was free a moment ago.
-int freePort()
-{
-    const int probe = ::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0);
-    sockaddr_in address = {};
-    address.sin_family = AF_INET;
-    address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
-    socklen_t size = sizeof address;
-    const bool isBound = ::bind(probe, reinterpret_cast<sockaddr*>(&address), size) == 0 &&
-                         ::getsockname(probe, reinterpret_cast<sockaddr*>(&address), &size) == 0;
-    ::close(probe);
-    if (!isBound) {
-        throw std::runtime_error("no free port");
-    }
-    return ntohs(address.sin_port);
-}
 
 std::string newDirectory()
 {
@@ -68,9 +48,9 @@ constexpr int kEndTimeoutMs = 20000;
 
 } // namespace
 
-PrivateServer::PrivateServer() : fDirectory(newDirectory()), fPort(freePort())
+PrivateServer::PrivateServer() : fDirectory(newDirectory())
 {
-    fConsumer = "test" + std::to_string(::getpid()) + "_" + std::to_string(fPort);
+    fConsumer = "test" + std::to_string(::getpid()) + "_" + std::to_string(port());
     std::filesystem::create_directories(home());
 }
 
@@ -87,7 +67,7 @@ PrivateServer::~PrivateServer()
 void PrivateServer::start()
 {
     expectSuccess(run("cimconfig", {"-s", "consumer=" + fConsumer, "-p"}), "cimconfig");
-    expectSuccess(run("cimserver", {"httpPort=" + std::to_string(fPort), "enableHttpsConnection=false"}), "cimserver");
+    expectSuccess(run("cimserver", {"httpPort=" + std::to_string(port()), "enableHttpsConnection=false"}), "cimserver");
     fProcessId = readProcessId();
 }
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "tests/support/ReservedPort.h"
 #include "tests/support/RunProgram.h"
 
 #include <string>
@@ -34,7 +35,7 @@ class PrivateServer
 
     const std::string& directory() const { return fDirectory; }  // of the whole tree
     std::string home() const { return fDirectory + "/pegasus"; } // PEGASUS_HOME
-    int port() const { return fPort; }
+    int port() const { return fPort.number(); }
     pid_t processId() const { return fProcessId; }
 
   private:
@@ -43,7 +44,7 @@ class PrivateServer
 
     std::string fDirectory;
     std::string fConsumer;
-    int fPort = 0;
+    ReservedPort fPort;
     pid_t fProcessId = 0;
 };
 

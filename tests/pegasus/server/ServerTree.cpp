@@ -10,10 +10,8 @@
 #include <sstream>
 #include <stdexcept>
 
-#include <netinet/in.h>
 #include <poll.h>
 #include <signal.h>
-#include <sys/socket.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -33,19 +31,6 @@ std::string makeRoot()
         throw std::runtime_error("cannot make a temporary folder");
     }
     return path;
-}
-
-std::uint16_t freePort()
-{
-    const int fd = ::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0);
-    sockaddr_in address = {};
-    address.sin_family = AF_INET;
-    address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
-    socklen_t size = sizeof address;
-    ::bind(fd, reinterpret_cast<const sockaddr*>(&address), size);
-    ::getsockname(fd, reinterpret_cast<sockaddr*>(&address), &size);
-    ::close(fd);
-    return ntohs(address.sin_port);
 }
 
 std::string readFile(const std::string& path)
@@ -107,7 +92,7 @@ std::vector<int> childrenOf(int pid)
     return children;
 }
 
-ServerTree::ServerTree() : fRoot(makeRoot()), fHome(fRoot + "/pegasus"), fPort(freePort())
+ServerTree::ServerTree() : fRoot(makeRoot()), fHome(fRoot + "/pegasus")
 {
     fConsumer = fs::path(fRoot).filename().string();
     fs::create_directories(fHome + "/lib");
@@ -164,7 +149,7 @@ ProgramResult ServerTree::run(const std::string& program, const std::vector<std:
 
 void ServerTree::start(const std::vector<std::string>& properties)
 {
-    std::vector<std::string> words = {"httpPort=" + std::to_string(fPort), "enableHttpsConnection=false"};
+    std::vector<std::string> words = {"httpPort=" + std::to_string(port()), "enableHttpsConnection=false"};
     words.insert(words.end(), properties.begin(), properties.end());
     const ProgramResult result = run("cimserver", words);
     if (result.exitStatus != 0) {

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "tests/support/ReservedPort.h"
+
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -26,7 +28,7 @@ class ServerTree
 
     const std::string& home() const { return fHome; }
     const std::string& consumer() const { return fConsumer; }
-    std::uint16_t port() const { return fPort; }
+    std::uint16_t port() const { return fPort.number(); }
     std::string startFile() const { return "/var/tmp/cimserverkol_tc_" + fConsumer + "_start.conf"; }
     std::string log() const;
 
@@ -50,7 +52,7 @@ class ServerTree
     std::string fRoot;
     std::string fHome;
     std::string fConsumer;
-    std::uint16_t fPort;
+    test::ReservedPort fPort;
 };
 
 // Returns: the path of one of the build's programs.
