@@ -28,6 +28,12 @@ void AddRepeated(CLI::App& app, const char* name, std::vector<std::string>& text
     app.add_option(name, texts, purpose)->type_size(1)->allow_extra_args(false)->check(refusal);
 }
 
+// An unset variable of a script makes such a text: it would stand for the default, and --replay "" for a run.
+std::string RefuseEmpty(const std::string& text)
+{
+    return text.empty() ? "a name is expected, not an empty text" : "";
+}
+
 class TCommandArguments : public IArguments
 {
   public:
@@ -41,7 +47,9 @@ class TCommandArguments : public IArguments
     {
         fCommand.add_option(name, path, purpose)
             ->required(need == ENeed::kRequired)
-            ->transform([](const std::string& text) { return std::filesystem::absolute(text).string(); });
+            ->check(RefuseEmpty)
+            ->transform(
+                [](const std::string& text) { return text.empty() ? text : std::filesystem::absolute(text).string(); });
     }
     void AddRest(const char* name, std::vector<std::string>& words, const char* purpose) override
     {
@@ -93,24 +101,30 @@ std::string RefuseSetting(const std::string& text)
 void AddOptions(CLI::App& app, TOptions& options, std::vector<std::string>& settings)
 {
     app.add_option("--consumer", options.fConsumer,
-                   "Name that keeps this host's server apart from others' (default: made of the root)");
+                   "Name that keeps this host's server apart from others' (default: made of the root)")
+        ->check(RefuseEmpty);
     app.add_option("--config", options.fConfigFile, "Settings file, lines \"key = value\" (default ROOT/vrx.conf)")
         ->check(CLI::ExistingFile);
     AddRepeated(app, "--set", settings, RefuseSetting,
                 "key=value, before the settings file; may be given several times");
-    app.add_option("--log", options.fLogFile, "The host's log, truncated by each run (default ROOT/vrxhost.log)");
-    app.add_option("--plugin", options.fPlugin, "The plug-in (default ROOT/libpegasus.nsp.so)");
+    app.add_option("--log", options.fLogFile, "The host's log, truncated by each run (default ROOT/vrxhost.log)")
+        ->check(RefuseEmpty);
+    app.add_option("--plugin", options.fPlugin, "The plug-in (default ROOT/libpegasus.nsp.so)")->check(RefuseEmpty);
     app.add_option("--replay", options.fReplay,
-                   "A record (see the command record) in place of this machine: no root, no server");
+                   "A record (see the command record) in place of this machine: no root, no server")
+        ->check(RefuseEmpty);
     app.add_option("--root", options.fRoot, "The root directory")->check(CLI::ExistingDirectory);
     app.add_option(
-        "--state", options.fState,
-        "A private root, with links to the root's files, for what a run writes (default: the root when it can be "
-        "written, else $XDG_STATE_HOME/vrxhost, ~/.local/state/vrxhost or a folder in /tmp)");
+           "--state", options.fState,
+           "A private root, with links to the root's files, for what a run writes (default: the root when it can be "
+           "written, else $XDG_STATE_HOME/vrxhost, ~/.local/state/vrxhost or a folder in /tmp)")
+        ->check(RefuseEmpty);
     app.add_flag("-v,--verbose", options.fVerbose, "Show the log on standard error too");
     app.add_flag("-q,--quiet", options.fQuiet, "Show no status line on a terminal");
-    app.add_option("--deadline", options.fDeadlineSeconds,
-                   "Give a provider up after so many seconds, and show what it delivered until then")
+    app.add_option(
+           "--deadline", options.fDeadlineSeconds,
+           "Give a provider up after so many seconds, and show what it delivered until then; they count from its "
+           "first class, after the server's start")
         ->check(CLI::Range(1, kMaxDeadlineSeconds));
 }
 
@@ -152,6 +166,30 @@ std::vector<std::string> OptionNames(const CLI::App& app)
     return names;
 }
 
+// Returns: the commands that have the option.
+std::vector<std::string> CommandsWith(CLI::App& app, const std::string& option)
+{
+    std::vector<std::string> names;
+    for (const CLI::App* command : app.get_subcommands([](const CLI::App*) { return true; })) {
+        if (command->get_option_no_throw(option) != nullptr) {
+            names.push_back(command->get_name());
+        }
+    }
+    return names;
+}
+
+// Throws: TUsageError.
+[[noreturn]] void RefuseOption(CLI::App& app, const std::string& name)
+{
+    const std::vector<std::string> others = CommandsWith(app, name);
+    if (others.empty()) {
+        throw TUsageError("there is no option " + name + Suggestion(name, OptionNames(app)));
+    }
+    const std::vector<CLI::App*> used = app.get_subcommands();
+    throw TUsageError((used.empty() ? "a command is missing, and " : used.front()->get_name() + " has no option ") +
+                      name + (used.empty() ? " belongs to " : "; it belongs to ") + JoinNames(others));
+}
+
 // Refuses a missing command, and the first word that is left over: unknown options before other words.
 // Throws: TUsageError.
 void RefuseUnknown(CLI::App& app)
@@ -159,8 +197,7 @@ void RefuseUnknown(CLI::App& app)
     const std::vector<std::string> unknown = app.remaining(true);
     for (const std::string& word : unknown) {
         if (word.front() == '-') {
-            const std::string name = word.substr(0, word.find('='));
-            throw TUsageError("there is no option " + name + Suggestion(name, OptionNames(app)));
+            RefuseOption(app, word.substr(0, word.find('=')));
         }
     }
     const bool hasCommand = !app.get_subcommands().empty();

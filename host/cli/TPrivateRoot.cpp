@@ -188,7 +188,8 @@ void TPrivateRoot::Lay() const
         }
         CopyPlannedConfiguration(fs::path(fTree) / kPlannedConfiguration, root / kPlannedConfiguration);
     } catch (const fs::filesystem_error& e) {
-        throw TTreeError(ELossKind::kState, std::string("the private root could not be laid: ") + e.what());
+        throw TTreeError(ELossKind::kState,
+                         "the private root could not be laid: " + e.path1().string() + ": " + e.code().message());
     }
 }
 

@@ -75,9 +75,11 @@ int TReport::WriteAll(const std::string& text)
     return fOutput.Write(text, fStop.GetFd());
 }
 
+// What follows a piece that was not written is left out: a later piece would make a document with a hole.
 void TReport::Write(const std::string& text)
 {
-    const int error = WriteAll(text);
+    const int error = fBrokeOff ? 0 : WriteAll(text);
+    fBrokeOff |= error != 0;
     if (error == ECANCELED) {
         fInterrupted = true;
     } else if (error != 0) {

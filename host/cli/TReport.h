@@ -58,6 +58,7 @@ class TReport
     const std::unique_ptr<IFormat> fFormat;
     bool fShown = false;
     bool fInterrupted = false; // before the document was written whole
+    bool fBrokeOff = false;    // a piece of the document could not be written
     bool fFailed = false;
     bool fPartial = false;
     bool fDiffers = false;

@@ -39,6 +39,9 @@ void OpenLog(const TOptions& options)
     log.fLeastSevere = ILogger::kDebug;
     log.fFile = options.fLogFile;
     log.fTruncate = true;
+    log.fOnFailure = [file = options.fLogFile](const std::string& reason) {
+        ReportError("the log file " + file + " could not be written: " + reason + "; the run goes on without");
+    };
     try {
         TCoreLogger::Instance().Configure(log);
     } catch (const NKOLVRX20::TVRXException&) {
@@ -105,10 +108,31 @@ EExitStatus Refuse(const TOptions& options, const std::exception& reason, EExitS
     return status;
 }
 
+// The number of a closed stream would go to the next file that is opened, such as the root's lock, and the document's
+// descriptor would replace that file. The stand-in fails when it is used as the stream is.
+void FillStandardStreams()
+{
+    for (int fd = STDIN_FILENO; fd <= STDERR_FILENO; ++fd) {
+        if (::fcntl(fd, F_GETFD) < 0) {
+            static_cast<void>(::open("/dev/null", fd == STDIN_FILENO ? O_WRONLY : O_RDONLY));
+        }
+    }
+}
+
+// Throws: TFailure when the help or the version could not be written.
+EExitStatus EndOfHelp()
+{
+    if (!std::cout.flush()) {
+        throw TFailure(ELossKind::kOther, "standard output could not be written");
+    }
+    return kComplete;
+}
+
 EExitStatus Run(TOptions& options)
 {
     std::signal(SIGPIPE, SIG_IGN); // a reader that has gone is a write error here
     if (!options.fReplay.empty()) {
+        LoadSettings(options.fConfigFile, options.fSettings); // a record needs none; mistakes are reported all the same
         return Replay(options);
     }
     const TPrivateRoot root(TDeployedTree(options.fRoot), options.fState);
@@ -133,7 +157,7 @@ int Main(int argc, const char* const* argv)
 {
     TOptions options;
     try {
-        return ParseOptions(argc, argv, options) ? Run(options) : kComplete;
+        return ParseOptions(argc, argv, options) ? Run(options) : EndOfHelp();
     } catch (const TUsageError& e) {
         return Refuse(options, e, kUsage);
     } catch (const TTreeError& e) {
@@ -148,6 +172,7 @@ int Main(int argc, const char* const* argv)
 
 int main(int argc, char** argv)
 {
+    vrxhost::FillStandardStreams();
     try {
         return vrxhost::Main(argc, argv);
     } catch (const std::exception& e) {

@@ -10,6 +10,8 @@
 #include <spdlog/sinks/basic_file_sink.h>
 #include <spdlog/sinks/stdout_sinks.h>
 
+#include <atomic>
+
 #include <fcntl.h>
 #include <sys/stat.h>
 
@@ -37,6 +39,17 @@ spdlog::level::level_enum ToLevel(ILogger::EVRXLogSeverity severity)
     default:
         return spdlog::level::debug;
     }
+}
+
+// What spdlog says on a failure names the file by its descriptor; the reason comes last.
+std::function<void(const std::string&)> ReportOnce(const std::function<void(const std::string&)>& report)
+{
+    return [report, isFirst = std::make_shared<std::atomic<bool>>(true)](const std::string& text) {
+        if (isFirst->exchange(false) && report) {
+            const std::size_t reason = text.rfind(": ");
+            report(reason == std::string::npos ? text : text.substr(reason + 2));
+        }
+    };
 }
 
 // The log holds what vendors print, and its folder may be anybody's: it is created for the user alone, and a link, a
@@ -92,6 +105,7 @@ void TCoreLogger::Configure(const TOptions& options)
         throw TVRXException(TVRXStatusCode::kBadPath);
     }
     sinks->fLogger.set_pattern(kPattern);
+    sinks->fLogger.set_error_handler(ReportOnce(options.fOnFailure));
     sinks->fLogger.set_level(ToLevel(options.fLeastSevere));
     sinks->fLogger.flush_on(spdlog::level::trace); // the last lines before a crash are the ones that matter
     std::atomic_store(&fSinks, sinks);

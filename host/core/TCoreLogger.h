@@ -3,6 +3,7 @@
 
 #include <host/ILogger.h>
 
+#include <functional>
 #include <memory>
 #include <string>
 
@@ -20,6 +21,8 @@ class TCoreLogger : public ILogger
         bool fTruncate = false; // replaces the file's content instead of appending
         bool fToStandardError = false;
         EVRXLogSeverity fLeastSevere = kInfo; // less severe entries (higher numbers) are dropped
+        // Gets the reason when an entry cannot be written, the first time only. Called by Log.
+        std::function<void(const std::string& reason)> fOnFailure = nullptr;
     };
 
     static TCoreLogger& Instance();

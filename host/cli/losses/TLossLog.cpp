@@ -164,9 +164,9 @@ void TLossLog::AddServerLog(const std::vector<TServerLogLine>& lines, const std:
     const std::lock_guard<std::mutex> lock(fMutex);
     for (const TServerLogLine& line : lines) {
         const auto vendor = vendors.find(line.fModule);
-        if (auto loss = LossOfServerLine(line)) {
+        if (auto loss = line.fIsOutput ? std::nullopt : LossOfServerLine(line)) {
             Enter(*loss);
-        } else if (auto note = NoteOfServerLine(line)) {
+        } else if (auto note = line.fIsOutput ? std::nullopt : NoteOfServerLine(line)) {
             note->fVendor = vendor == vendors.end() ? "" : vendor->second;
             Enter(*note);
         } else if (vendor != vendors.end()) {

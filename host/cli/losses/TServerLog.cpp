@@ -29,6 +29,11 @@ std::string ModuleOf(const std::string& text)
     return end == std::string::npos ? "" : text.substr(begin, end - begin);
 }
 
+bool IsOutputOf(const std::string& module, const std::string& text)
+{
+    return text.rfind("info: provider module \"" + module + "\" wrote: ", 0) == 0;
+}
+
 } // namespace
 
 TServerLog::TServerLog(const std::string& root) : fPath(root + "/pegasus/cimserver.log"), fStart(SizeOf(fPath)) {}
@@ -46,7 +51,7 @@ std::vector<TServerLogLine> TServerLog::Read() const
         const std::string text = process == std::string::npos ? line : line.substr(process + 2);
         const std::string module = ModuleOf(text);
         if (!module.empty()) {
-            lines.push_back({module, text});
+            lines.push_back({module, text, IsOutputOf(module, text)});
         }
     }
     return lines;

@@ -11,7 +11,8 @@ namespace vrxhost {
 struct TServerLogLine
 {
     std::string fModule;
-    std::string fText; // with the severity, without time and process
+    std::string fText;      // with the severity, without time and process
+    bool fIsOutput = false; // what the module's process printed, and may say anything
 };
 
 // The log of a tree's own server, from where the object was made on. An installed OpenPegasus writes elsewhere: no

@@ -5,6 +5,7 @@
 #include "host/cli/losses/LossRules.h"
 #include "host/cli/losses/RegistrationText.h"
 #include "host/cli/losses/TLossLog.h"
+#include "host/cli/losses/TServerLog.h"
 
 #include <host/TOSSpecific.h>
 #include <host/TRootObject.h>
@@ -289,6 +290,28 @@ TEST(TLossLog, LossesAreFoldedUnderTheirCause)
     EXPECT_EQ(log.GetLosses()[1].fLog, std::vector<std::string>{"warning: a"});
     EXPECT_TRUE(log.GetLosses()[0].fLog.empty());
     fs::remove_all(vendors);
+}
+
+// A provider may print anything, the server's own sentences too.
+TEST(TServerLog, WhatAProviderPrintsCausesNoLoss)
+{
+    const fs::path root = fs::path(testing::TempDir()) / ("server-log-" + std::to_string(::getpid()));
+    fs::create_directories(root / "pegasus");
+    const TServerLog log(root);
+    std::ofstream file(root / "pegasus/cimserver.log");
+    for (const std::string sentence : {"setProperty: class A has no property B", "addKey: C is not a key of class A",
+                                       "works here, fails on OpenPegasus 2.14: x"})
+    {
+        file << "2026-11-22T12:00:00Z [7] info: provider module \"fans\" wrote: " << sentence << "\n"
+             << "2026-11-22T12:00:00Z [7] info: provider module \"fans\" wrote: provider module \"fans\": " << sentence
+             << "\n2026-11-22T12:00:00Z [7] warning: provider module \"fans\": " << sentence << "\n";
+    }
+    file.close();
+    TLossLog losses("/");
+    losses.AddServerLog(log.Read(), {{"fans", "fan"}});
+    EXPECT_EQ(losses.GetLosses().size(), 3U);
+    EXPECT_EQ(log.Read().size(), 9U) << "all of them explain a loss";
+    fs::remove_all(root);
 }
 
 // A tree whose "server" is a copy of a program that waits, and its start file.

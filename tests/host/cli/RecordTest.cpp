@@ -180,6 +180,23 @@ TEST_F(Record, EveryCommandShowsOfARecordWhatItShowsOfTheMachine)
         EXPECT_TRUE(HasStatus(outcome, 2));
         EXPECT_THAT(outcome.fErrorOutput, HasSubstr(refused.front() + " needs the machine itself: a record "));
     }
+    EXPECT_TRUE(HasStatus(Start(Replay(record, {"providers", "--set", "threads=on"})), 2)) << "a mistake all the same";
+}
+
+TEST_F(Record, DocumentThatCannotBeWrittenIsOneSentence)
+{
+    const std::string replay = "exec \"$0\" --replay '" + Make("record") + "' ";
+    const std::pair<std::string, std::string> rows[] = {
+        {"inventory >/dev/full", "the document could not be written: No space left on device"},
+        {"inventory >&-", "the document could not be written: Bad file descriptor"}, // not into a file of the run
+        {"--help >/dev/full", "standard output could not be written"},
+    };
+    for (const auto& [arguments, sentence] : rows) {
+        SCOPED_TRACE(arguments);
+        const auto outcome = Start({"/bin/sh", "-c", replay + arguments, VRXHOST});
+        EXPECT_TRUE(HasStatus(outcome, 1));
+        EXPECT_EQ(outcome.fErrorOutput, "vrxhost: " + sentence + "\n");
+    }
 }
 
 TEST_F(Record, LossesAndInterruptionsAreRecorded)

@@ -38,6 +38,9 @@ TEST_F(VrxhostProgram, SettingsFileAndLogFile)
     const auto noLog = Run({"--config", "/dev/null", "--log", "/dev/null/x", "providers"});
     EXPECT_TRUE(HasStatus(noLog, 0));
     EXPECT_THAT(noLog.fErrorOutput, HasSubstr("the log file /dev/null/x could not be opened"));
+    EXPECT_EQ(Run({"--config", "/dev/null", "--log", "/dev/full", "providers"}).fErrorOutput,
+              "vrxhost: the log file /dev/full could not be written: No space left on device; the run goes on "
+              "without\n");
 }
 
 TEST_F(VrxhostProgram, ConsumerIsPlannedBeforeTheNamespaceIsOpened)
