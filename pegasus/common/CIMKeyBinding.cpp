@@ -1,20 +1,12 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/base/NumberText.h"
 #include "pegasus/base/Text.h"
-#include "pegasus/common/RepPointerImpl.h"
+#include "pegasus/common/CIMObjectPathRep.h"
 
-#include <Pegasus/Common/CIMObjectPath.h>
 #include <Pegasus/Common/CIMValue.h>
 #include <Pegasus/Common/Exception.h>
 
 namespace Pegasus {
-
-struct CIMKeyBindingRep : RefCounted
-{
-    CIMName fName;
-    String fValue;
-    CIMKeyBinding::Type fType = CIMKeyBinding::BOOLEAN;
-};
 
 template class RepPointer<CIMKeyBindingRep>;
 

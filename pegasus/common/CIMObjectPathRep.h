@@ -8,6 +8,13 @@
 
 namespace Pegasus {
 
+struct CIMKeyBindingRep : RefCounted
+{
+    CIMName fName;
+    String fValue;
+    CIMKeyBinding::Type fType = CIMKeyBinding::BOOLEAN;
+};
+
 struct CIMObjectPathRep : RefCounted
 {
     String fHost;

@@ -1,16 +1,7 @@
 // SPDX-License-Identifier: MIT
-#include "pegasus/common/RepPointerImpl.h"
-
-#include <Pegasus/Common/CIMParamValue.h>
+#include "pegasus/common/ObjectReps.h"
 
 namespace Pegasus {
-
-struct CIMParamValueRep : RefCounted
-{
-    String fName;
-    CIMValue fValue;
-    bool fIsTyped = true;
-};
 
 template class RepPointer<CIMParamValueRep>;
 

@@ -8,6 +8,7 @@
 
 #include <Pegasus/Common/CIMClass.h>
 #include <Pegasus/Common/CIMObject.h>
+#include <Pegasus/Common/CIMParamValue.h>
 #include <Pegasus/Common/CIMQualifierDecl.h>
 
 #include <atomic>
@@ -64,6 +65,13 @@ struct CIMMethodRep : RefCounted
     Array<CIMQualifier> fQualifiers;
     Array<CIMParameter> fParameters;
     bool fPropagated = false;
+};
+
+struct CIMParamValueRep : RefCounted
+{
+    String fName;
+    CIMValue fValue;
+    bool fIsTyped = true;
 };
 
 // The class name is the path's. While the instance is packed, everything else here is empty;

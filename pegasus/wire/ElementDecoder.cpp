@@ -4,6 +4,8 @@
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/NumberText.h"
 #include "pegasus/base/Text.h"
+#include "pegasus/common/CIMObjectPathRep.h"
+#include "pegasus/common/CIMValueRep.h"
 #include "pegasus/common/EmbeddedKind.h"
 #include "pegasus/common/ObjectReps.h"
 #include "pegasus/wire/MemberList.h"
@@ -89,10 +91,10 @@ const CIMName& ElementDecoder::nameAttribute(const XmlElement& element, std::str
     if (!value) {
         failMissing(element, attribute);
     }
-    fDecodedBytes += value->size();
     if (const CIMName* known = fNames.find(*value)) {
         return *known;
     }
+    countText(value->size());
     try {
         return fNames.add(element.resolved(*value, fScratch));
     } catch (const XmlError&) {
@@ -169,11 +171,20 @@ CIMFlavor ElementDecoder::flavor(const XmlElement& element, const XmlAttribute* 
 
 String ElementDecoder::toString(const XmlElement& element, std::string_view utf8)
 {
-    countBytes(utf8.size() * sizeof(Char16));
+    countText(utf8.size());
     try {
         return base::fromUtf8(utf8);
     } catch (const Exception&) {
         element.fail(Kind::kNotWellFormed, "text that is not UTF-8 in " + std::string(element.name()) + " element");
+    }
+}
+
+// ---- memory
+
+void ElementDecoder::countText(std::size_t units)
+{
+    if (units > 0) {
+        countPiece(sizeof(StringRep) + (units + 1) * sizeof(Char16));
     }
 }
 
@@ -194,7 +205,7 @@ CIMQualifier ElementDecoder::decodeQualifier(const XmlElement& element)
         expectEnd(element, child.nextSibling());
     }
     const CIMValue value = child ? decodeValue(child, type) : CIMValue(type, false);
-    countBytes(sizeof(CIMQualifierRep));
+    countObject(sizeof(CIMQualifierRep));
     return CIMQualifier(name, value, flavor(element, values + kFirstFlavor), propagated);
 }
 
@@ -205,6 +216,7 @@ XmlElement ElementDecoder::decodeQualifiers(XmlElement child, Array<CIMQualifier
     for (; child.is("QUALIFIER"); child = child.nextSibling()) {
         members.add(child, decodeQualifier(child));
     }
+    countList(qualifiers);
     return child;
 }
 
@@ -239,12 +251,13 @@ CIMQualifierDecl ElementDecoder::decodeQualifierDeclaration(const XmlElement& el
         scope = decodeScope(child);
         child = child.nextSibling();
     }
-    CIMValue value(type, isArray, arraySize);
+    CIMValue value = nullValue(type, isArray, arraySize);
     if (isOneOf(child, {"VALUE", "VALUE.ARRAY"})) {
         value = decodeValue(child, type);
         child = child.nextSibling();
     }
     expectEnd(element, child);
+    countObject(sizeof(CIMQualifierDeclRep));
     return CIMQualifierDecl(name, value, scope, flavor(element, values + kFirstFlavor), arraySize);
 }
 
@@ -253,7 +266,7 @@ CIMQualifierDecl ElementDecoder::decodeQualifierDeclaration(const XmlElement& el
 CIMProperty ElementDecoder::decodeProperty(const XmlElement& element)
 {
     CIMProperty property = ObjectAccess::wrap<CIMProperty>(new CIMPropertyRep());
-    countBytes(sizeof(CIMPropertyRep));
+    countObject(sizeof(CIMPropertyRep));
     CIMPropertyRep& rep = ObjectAccess::rep(property);
     if (element.is("PROPERTY.REFERENCE")) {
         readReferenceProperty(element, rep);
@@ -283,7 +296,7 @@ void ElementDecoder::readTypedProperty(const XmlElement& element, bool isArray, 
         rep.fArraySize = sizeAttribute(element, values[6]);
     }
     const bool hasValue = child.is(isArray ? "VALUE.ARRAY" : "VALUE");
-    rep.fValue = hasValue ? decodeValue(child, type) : CIMValue(type, isArray, rep.fArraySize);
+    rep.fValue = hasValue ? decodeValue(child, type) : nullValue(type, isArray, rep.fArraySize);
     expectEnd(element, hasValue ? child.nextSibling() : child);
 }
 
@@ -294,8 +307,17 @@ void ElementDecoder::readReferenceProperty(const XmlElement& element, CIMPropert
     const XmlElement child = beginProperty(element, values, rep);
     rep.fReferenceClassName = optionalName(element, "REFERENCECLASS", values[3]);
     const bool hasValue = child.is("VALUE.REFERENCE");
-    rep.fValue = hasValue ? CIMValue(decodeReference(child)) : CIMValue(CIMTYPE_REFERENCE, false);
+    rep.fValue = hasValue ? referenceValue(decodeReference(child)) : CIMValue(CIMTYPE_REFERENCE, false);
     expectEnd(element, hasValue ? child.nextSibling() : child);
+}
+
+// Nulls of one scalar type are one representation.
+CIMValue ElementDecoder::nullValue(CIMType type, bool isArray, Uint32 arraySize)
+{
+    if (isArray) {
+        countObject(sizeof(CIMValueRep));
+    }
+    return CIMValue(type, isArray, arraySize);
 }
 
 // Returns: the first child after the properties.
@@ -306,6 +328,7 @@ XmlElement ElementDecoder::decodeProperties(XmlElement child, Array<CIMProperty>
     for (; isOneOf(child, {"PROPERTY", "PROPERTY.ARRAY", "PROPERTY.REFERENCE"}); child = child.nextSibling()) {
         members.add(child, decodeProperty(child));
     }
+    countList(properties);
     return child;
 }
 
@@ -317,7 +340,7 @@ CIMParameter ElementDecoder::decodeParameter(const XmlElement& element)
     element.attributes(kParameterAttributes, values);
     const bool isReference = isOneOf(element, {"PARAMETER.REFERENCE", "PARAMETER.REFARRAY"});
     CIMParameter parameter = ObjectAccess::wrap<CIMParameter>(new CIMParameterRep());
-    countBytes(sizeof(CIMParameterRep));
+    countObject(sizeof(CIMParameterRep));
     CIMParameterRep& rep = ObjectAccess::rep(parameter);
     rep.fName = nameAttribute(element, "NAME", values[0]);
     rep.fIsArray = isOneOf(element, {"PARAMETER.ARRAY", "PARAMETER.REFARRAY"});
@@ -334,7 +357,7 @@ CIMMethod ElementDecoder::decodeMethod(const XmlElement& element)
     XmlAttribute values[std::size(kMethodAttributes)];
     element.attributes(kMethodAttributes, values);
     CIMMethod method = ObjectAccess::wrap<CIMMethod>(new CIMMethodRep());
-    countBytes(sizeof(CIMMethodRep));
+    countObject(sizeof(CIMMethodRep));
     CIMMethodRep& rep = ObjectAccess::rep(method);
     rep.fName = nameAttribute(element, "NAME", values[0]);
     rep.fType = embeddedType(element, typeAttribute(element, "TYPE", values[1]), values[4], values[5]);
@@ -347,6 +370,7 @@ CIMMethod ElementDecoder::decodeMethod(const XmlElement& element)
     {
         parameters.add(child, decodeParameter(child));
     }
+    countList(rep.fParameters);
     expectEnd(element, child);
     return method;
 }
@@ -359,13 +383,15 @@ CIMClass ElementDecoder::decodeClass(const XmlElement& element)
     const CIMName name = nameAttribute(element, "NAME", values[0]);
     CIMClass cimClass(name, optionalName(element, "SUPERCLASS", values[1]));
     CIMClassRep& rep = ObjectAccess::rep(cimClass);
-    countBytes(sizeof(CIMClassRep));
+    countObject(sizeof(CIMClassRep));
+    countPiece(sizeof(CIMObjectPathRep));
     XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
     child = decodeProperties(child, rep.fProperties);
     MemberList<CIMMethod> methods(rep.fMethods, fLimits.maxMembers);
     for (; child.is("METHOD"); child = child.nextSibling()) {
         methods.add(child, decodeMethod(child));
     }
+    countList(rep.fMethods);
     expectEnd(element, child);
     return cimClass;
 }
@@ -379,7 +405,8 @@ CIMInstance ElementDecoder::decodeInstance(const XmlElement& element)
     element.attributes({"CLASSNAME", "xml:lang"}, values);
     CIMInstance instance(nameAttribute(element, "CLASSNAME", values[0]));
     CIMInstanceRep& rep = ObjectAccess::rep(instance);
-    countBytes(sizeof(CIMInstanceRep));
+    countObject(sizeof(CIMInstanceRep));
+    countPiece(sizeof(CIMObjectPathRep));
     XmlElement child = decodeQualifiers(element.firstChild(), rep.fQualifiers);
     child = decodeProperties(child, rep.fProperties);
     expectEnd(element, child);

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "pegasus/common/ArrayImpl.h"
 #include "pegasus/wire/NameCache.h"
 #include "pegasus/wire/XmlDocument.h"
 
@@ -59,14 +60,25 @@ class ElementDecoder
 
     const XmlLimits& limits() const { return fLimits; }
     // Returns: about how many bytes of memory all objects that were decoded so far took, the allocator's share
-    // included. A name counts with its bytes in the message, each time.
+    // included. A name that is remembered counts once: objects share its text.
     std::size_t decodedBytes() const { return fDecodedBytes; }
     // Adds to it what an object takes that was decoded elsewhere.
     void addDecodedBytes(std::size_t bytes) { fDecodedBytes += bytes; }
 
   private:
-    // An object of so many bytes, its handle in the owner and the allocator's share.
-    void countBytes(std::size_t size) { fDecodedBytes += size + sizeof(void*) + kAllocationBytes; }
+    // A piece of memory, and the allocator's share.
+    void countPiece(std::size_t size) { fDecodedBytes += size + kAllocationBytes; }
+    // A representation, and its handle in the owner.
+    void countObject(std::size_t size) { countPiece(size + sizeof(void*)); }
+    // A text of so many units at most; an empty one has no memory.
+    void countText(std::size_t units);
+    // A finished list, without the places of its items.
+    template <typename Item> void countList(const Array<Item>& items)
+    {
+        if (items.size() > 0) {
+            countPiece(sizeof(ArrayHeader) + (items.getCapacity() - items.size()) * sizeof(Item));
+        }
+    }
     static constexpr std::size_t kAllocationBytes = 16;
 
     // ElementDecoder.cpp
@@ -78,6 +90,7 @@ class ElementDecoder
     CIMMethod decodeMethod(const XmlElement& element);
     CIMParameter decodeParameter(const XmlElement& element);
     CIMScope decodeScope(const XmlElement& element);
+    CIMValue nullValue(CIMType type, bool isArray, Uint32 arraySize);
     XmlElement decodeQualifiers(XmlElement child, Array<CIMQualifier>& qualifiers);
     XmlElement decodeProperties(XmlElement child, Array<CIMProperty>& properties);
     CIMName optionalName(const XmlElement& element, std::string_view attribute, XmlAttribute value);
@@ -88,7 +101,7 @@ class ElementDecoder
 
     // ElementDecoderPaths.cpp
     CIMKeyBinding decodeKeyBinding(const XmlElement& element);
-    CIMKeyBinding decodeKeyValue(const XmlElement& element, const CIMName& name);
+    CIMKeyBinding decodeKey(const XmlElement& element, const CIMName& name);
     CIMObjectPath decodeNameIn(const XmlElement& element, const String& host, const CIMNamespaceName& nameSpace);
 
     // ElementDecoderValues.cpp
@@ -96,6 +109,7 @@ class ElementDecoder
     template <typename T> T parseElement(const XmlElement& element);
     template <typename T> CIMValue decodeScalar(const XmlElement& element);
     template <typename T> CIMValue decodeArray(const XmlElement& element);
+    CIMValue referenceValue(const CIMObjectPath& path);
     CIMValue decodeParameterContent(const XmlElement& element, CIMType type);
     CIMObject decodeEmbedded(const XmlElement& element, std::string_view text);
     CIMType embeddedType(const XmlElement& element, CIMType type, XmlAttribute value1, XmlAttribute value2);

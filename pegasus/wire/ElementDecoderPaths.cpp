@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/base/Text.h"
+#include "pegasus/common/CIMObjectPathRep.h"
 #include "pegasus/wire/ElementDecoder.h"
 
 namespace Pegasus::wire {
@@ -51,11 +52,19 @@ CIMName ElementDecoder::decodeClassName(const XmlElement& element)
     XmlAttribute values[1];
     element.attributes({"NAME"}, values);
     element.expectNoChildren();
+    fDecodedBytes += sizeof(CIMName);
     return nameAttribute(element, "NAME", values[0]);
 }
 
-CIMKeyBinding ElementDecoder::decodeKeyValue(const XmlElement& element, const CIMName& name)
+// KEYVALUE or VALUE.REFERENCE
+CIMKeyBinding ElementDecoder::decodeKey(const XmlElement& element, const CIMName& name)
 {
+    countObject(sizeof(CIMKeyBindingRep));
+    if (!element.is("KEYVALUE")) {
+        const String path = decodeReference(element).toString();
+        countText(path.size());
+        return CIMKeyBinding(name, path, CIMKeyBinding::REFERENCE);
+    }
     XmlAttribute values[2];
     element.attributes({"VALUETYPE", "TYPE"}, values);
     const CIMKeyBinding::Type type = keyType(element, values[0]);
@@ -64,15 +73,10 @@ CIMKeyBinding ElementDecoder::decodeKeyValue(const XmlElement& element, const CI
 
 CIMKeyBinding ElementDecoder::decodeKeyBinding(const XmlElement& element)
 {
-    countBytes(sizeof(CIMObjectPath)); // the binding's share of the path
     XmlAttribute values[1];
     element.attributes({"NAME"}, values);
     const CIMName name = nameAttribute(element, "NAME", values[0]);
-    const XmlElement child = element.onlyChild();
-    if (child.is("KEYVALUE")) {
-        return decodeKeyValue(child, name);
-    }
-    return CIMKeyBinding(name, decodeReference(child).toString(), CIMKeyBinding::REFERENCE);
+    return decodeKey(element.onlyChild(), name);
 }
 
 CIMObjectPath ElementDecoder::decodeInstanceName(const XmlElement& element)
@@ -84,6 +88,7 @@ CIMObjectPath ElementDecoder::decodeInstanceName(const XmlElement& element)
 CIMObjectPath ElementDecoder::decodeNameIn(const XmlElement& element, const String& host,
                                            const CIMNamespaceName& nameSpace)
 {
+    countObject(sizeof(CIMObjectPathRep));
     if (element.is("CLASSNAME")) {
         return CIMObjectPath(host, nameSpace, decodeClassName(element));
     }
@@ -101,14 +106,13 @@ CIMObjectPath ElementDecoder::decodeNameIn(const XmlElement& element, const Stri
     }
     // A single key may omit its name.
     if (child && keys.size() == 0 && !child.nextSibling()) {
-        keys.append(child.is("KEYVALUE")
-                        ? decodeKeyValue(child, CIMName())
-                        : CIMKeyBinding(CIMName(), decodeReference(child).toString(), CIMKeyBinding::REFERENCE));
+        keys.append(decodeKey(child, CIMName()));
         child = XmlElement();
     }
     if (child) {
         child.failIn(element);
     }
+    countList(keys);
     return CIMObjectPath(host, nameSpace, className, keys);
 }
 

@@ -3,6 +3,7 @@
 #include "pegasus/base/Text.h"
 #include "pegasus/base/ValueText.h"
 #include "pegasus/common/CIMValueRep.h"
+#include "pegasus/common/ObjectReps.h"
 #include "pegasus/wire/ElementDecoder.h"
 #include "pegasus/wire/XmlText.h"
 
@@ -151,7 +152,7 @@ template <typename T> CIMValue ElementDecoder::decodeScalar(const XmlElement& el
             return CIMValue(CIMTypeOf<T>::kType, false);
         }
     }
-    countBytes(sizeof(CIMValueRep));
+    countObject(sizeof(CIMValueRep));
     return ValueAccess::make(parseElement<T>(element));
 }
 
@@ -177,14 +178,22 @@ template <typename T> CIMValue ElementDecoder::decodeArray(const XmlElement& ele
             array.append(parseElement<T>(child));
         }
     }
-    countBytes(sizeof(CIMValueRep) + array.size() * sizeof(T));
+    countObject(sizeof(CIMValueRep));
+    countList(array);
+    fDecodedBytes += array.size() * sizeof(T);
     return ValueAccess::make(std::move(array));
+}
+
+CIMValue ElementDecoder::referenceValue(const CIMObjectPath& path)
+{
+    countObject(sizeof(CIMValueRep));
+    return CIMValue(path);
 }
 
 CIMValue ElementDecoder::decodeValue(const XmlElement& element, CIMType type)
 {
     if (element.is("VALUE.REFERENCE")) {
-        return CIMValue(decodeReference(element));
+        return referenceValue(decodeReference(element));
     }
     if (element.is("VALUE.REFARRAY")) {
         return decodeArray<CIMObjectPath>(element);
@@ -210,7 +219,7 @@ CIMValue ElementDecoder::decodeParameterContent(const XmlElement& element, CIMTy
     }
     const XmlElement only = element.onlyChild();
     if (only.is("INSTANCENAME") || only.is("CLASSNAME")) {
-        return CIMValue(decodeObjectPath(only));
+        return referenceValue(decodeObjectPath(only));
     }
     const bool isReference = only.is("VALUE.REFERENCE") || only.is("VALUE.REFARRAY");
     if (isReference && type != CIMTYPE_REFERENCE && type != CIMTYPE_STRING) {
@@ -225,6 +234,7 @@ CIMParamValue ElementDecoder::decodeParamValue(const XmlElement& element)
     XmlAttribute values[4];
     element.attributes({"NAME", "PARAMTYPE", "EmbeddedObject", "EMBEDDEDOBJECT"}, values);
     const CIMName name = nameAttribute(element, "NAME", values[0]);
+    countObject(sizeof(CIMParamValueRep));
     const bool isTyped = bool(values[1]);
     // An untyped null: the value is the untyped one that a default-constructed CIMValue is.
     if (!isTyped && !element.firstChild()) {

@@ -8,6 +8,8 @@
 
 #include <ctime>
 
+#include <malloc.h>
+
 namespace {
 
 using test::AnswerCase;
@@ -224,4 +226,68 @@ TEST(AnswerLimits, TimeGrowsWithTheNumberOfMembersAndNotWithItsSquare)
               std::string::npos);
     EXPECT_NE(decodeMembers(limit / 2, "<PROPERTY NAME=\"p9\" TYPE=\"string\"/>", atLimit).find("named \"p9\""),
               std::string::npos);
+}
+
+namespace {
+
+// Returns: the bytes that a list of such objects takes for 100 that were counted. A sanitizer's allocator reports 0.
+template <typename T>
+std::size_t memoryInPercent(T (Pegasus::wire::ElementDecoder::*decode)(const Pegasus::wire::XmlElement&),
+                            const std::string& start, const std::string& end)
+{
+    constexpr int kObjects = 4096; // a power of two: the list has no room to spare
+    Pegasus::wire::ElementDecoder decoder;
+    Pegasus::wire::XmlDocument document;
+    const auto decoded = [&](int number) {
+        const std::string text = start + std::to_string(100000 + number) + end;
+        return (decoder.*decode)(document.parseFragment(text));
+    };
+    for (int i = 0; i < 2 * kObjects; ++i) {
+        decoded(i); // then the decoder has the memory that it keeps
+    }
+    const std::size_t countedBefore = decoder.decodedBytes();
+    const std::size_t before = ::mallinfo2().uordblks;
+    Pegasus::Array<T> objects;
+    for (int i = 0; i < kObjects; ++i) {
+        objects.append(decoded(i));
+    }
+    return (::mallinfo2().uordblks - before) * 100 / (decoder.decodedBytes() - countedBefore);
+}
+
+} // namespace
+
+// Lists of small objects of each kind, every one with a name or a value of its own.
+TEST(AnswerLimits, ObjectsTakeNoMoreMemoryThanWasCounted)
+{
+    using Decoder = Pegasus::wire::ElementDecoder;
+    const std::string path = "<INSTANCENAME CLASSNAME=\"I\"><KEYBINDING NAME=\"";
+    const std::string pathEnd = "</KEYBINDING></INSTANCENAME>";
+    const std::string reference = "<VALUE.REFERENCE><CLASSNAME NAME=\"N";
+    const std::string referenceEnd = "\"/></VALUE.REFERENCE>";
+    const std::string output = "<PARAMVALUE NAME=\"A\" PARAMTYPE=\"";
+    const std::pair<const char*, std::size_t> rows[] = {
+        {"class names", memoryInPercent(&Decoder::decodeClassName, "<CLASSNAME NAME=\"N", "\"/>")},
+        {"classes", memoryInPercent(&Decoder::decodeClass, "<CLASS NAME=\"N", "\"/>")},
+        {"properties", memoryInPercent(&Decoder::decodeClass, "<CLASS NAME=\"C\"><PROPERTY.ARRAY NAME=\"N",
+                                       "\" TYPE=\"uint8\"/></CLASS>")},
+        {"methods", memoryInPercent(&Decoder::decodeClass, "<CLASS NAME=\"C\"><METHOD NAME=\"N",
+                                    "\" TYPE=\"uint8\"><PARAMETER NAME=\"A\" TYPE=\"uint8\"/></METHOD></CLASS>")},
+        {"instances", memoryInPercent(&Decoder::decodeInstance, "<INSTANCE CLASSNAME=\"N", "\"/>")},
+        {"paths", memoryInPercent(&Decoder::decodeInstanceName, path + "N", "\"><KEYVALUE/>" + pathEnd)},
+        {"references as keys",
+         memoryInPercent(&Decoder::decodeInstanceName, path + "K\">" + reference, referenceEnd + pathEnd)},
+        {"qualifier declarations",
+         memoryInPercent(&Decoder::decodeQualifierDeclaration,
+                         "<QUALIFIER.DECLARATION ISARRAY=\"true\" TYPE=\"uint8\" NAME=\"N", "\"/>")},
+        {"outputs", memoryInPercent(&Decoder::decodeParamValue, "<PARAMVALUE NAME=\"N", "\"/>")},
+        {"references", memoryInPercent(&Decoder::decodeParamValue, output + "reference\">" + reference,
+                                       referenceEnd + "</PARAMVALUE>")},
+        {"datetimes", memoryInPercent(&Decoder::decodeParamValue, output + "datetime\"><VALUE>20200101000000.",
+                                      "+000</VALUE></PARAMVALUE>")},
+        {"arrays", memoryInPercent(&Decoder::decodeParamValue, output + "string\"><VALUE.ARRAY><VALUE>",
+                                   "</VALUE></VALUE.ARRAY></PARAMVALUE>")},
+    };
+    for (const auto& [kind, percent] : rows) {
+        EXPECT_LE(percent, 100u) << kind;
+    }
 }
