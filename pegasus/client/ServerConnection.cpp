@@ -2,6 +2,7 @@
 #include "pegasus/client/ServerConnection.h"
 
 #include "pegasus/base/LocalSocket.h"
+#include "pegasus/base/Text.h"
 #include "pegasus/client/TreeRoute.h"
 
 #include <Pegasus/Common/Exception.h>
@@ -23,11 +24,6 @@ namespace {
 
 using base::Deadline;
 
-String toString(const std::string& text)
-{
-    return String(text.c_str());
-}
-
 std::shared_ptr<addrinfo> lookUp(const ServerAddress& address)
 {
     addrinfo hints{};
@@ -36,7 +32,7 @@ std::shared_ptr<addrinfo> lookUp(const ServerAddress& address)
     hints.ai_flags = AI_NUMERICSERV;
     addrinfo* list = nullptr;
     if (::getaddrinfo(address.host.c_str(), std::to_string(address.port).c_str(), &hints, &list) != 0) {
-        throw InvalidLocatorException(toString(address.text()));
+        throw InvalidLocatorException(base::fromUtf8Repaired(address.text()));
     }
     return {list, ::freeaddrinfo};
 }
@@ -109,7 +105,8 @@ void ServerConnection::openTcp(const Deadline& deadline)
         }
         close();
     }
-    throw CannotConnectException(toString("Cannot connect to " + fAddress.text() + ". Connection failed."));
+    throw CannotConnectException(
+        base::fromUtf8Repaired("Cannot connect to " + fAddress.text() + ". Connection failed."));
 }
 
 void ServerConnection::requireTrustedServer()
@@ -117,7 +114,8 @@ void ServerConnection::requireTrustedServer()
     const std::string fault = serverFault(fFd, fAddress.port);
     if (!fault.empty()) {
         close();
-        throw CannotConnectException(toString("Cannot connect to " + fAddress.text() + ". " + fault + "."));
+        throw CannotConnectException(
+            base::fromUtf8Repaired("Cannot connect to " + fAddress.text() + ". " + fault + "."));
     }
 }
 
@@ -126,7 +124,7 @@ void ServerConnection::openLocal(const std::string& home, const std::string& ref
     try {
         fFd = base::connectLocalSocket(home, deadline).release();
     } catch (const std::system_error&) {
-        throw CannotConnectException(toString(refusal));
+        throw CannotConnectException(base::fromUtf8Repaired(refusal));
     }
     const int flags = ::fcntl(fFd, F_GETFL);
     ::fcntl(fFd, F_SETFL, flags | O_NONBLOCK);

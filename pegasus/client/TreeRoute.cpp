@@ -2,6 +2,7 @@
 #include "pegasus/client/TreeRoute.h"
 
 #include "pegasus/base/TcpOwner.h"
+#include "pegasus/base/Text.h"
 
 #include <Pegasus/Common/Exception.h>
 
@@ -18,9 +19,10 @@ namespace {
 
 namespace fs = std::filesystem;
 
+// The reason may name a folder, whose name may be any bytes.
 [[noreturn]] void refuse(const std::string& address, const std::string& reason)
 {
-    throw CannotConnectException(String(("Cannot connect to " + address + ". " + reason + ".").c_str()));
+    throw CannotConnectException(base::fromUtf8Repaired("Cannot connect to " + address + ". " + reason + "."));
 }
 
 base::TreeLockStatus lockOf(const std::string& home, const std::string& address)

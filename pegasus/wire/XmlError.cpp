@@ -21,21 +21,10 @@ const char* wordFor(XmlError::Kind kind)
 }
 
 // The cause may quote bytes of the message that are invalid UTF-8.
-String printable(std::string text)
-{
-    try {
-        return base::fromUtf8(text);
-    } catch (const Exception&) {
-        for (char& c : text) {
-            c = static_cast<unsigned char>(c) < 0x80 ? c : '?';
-        }
-        return base::fromUtf8(text);
-    }
-}
-
 String messageFor(XmlError::Kind kind, XmlPlace place, const std::string& cause)
 {
-    return printable(std::string(wordFor(kind)) + ": on line " + std::to_string(place.line) + ": " + cause);
+    return base::fromUtf8Repaired(std::string(wordFor(kind)) + ": on line " + std::to_string(place.line) + ": " +
+                                  cause);
 }
 
 } // namespace

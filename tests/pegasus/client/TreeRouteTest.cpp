@@ -4,6 +4,7 @@
 
 #include "pegasus/base/LocalSocket.h"
 #include "pegasus/base/TreeLockFile.h"
+#include "pegasus/base/Utf8.h"
 #include "tests/support/RunProgram.h"
 
 #include <gtest/gtest.h>
@@ -171,13 +172,14 @@ class ForgedServer
     std::uint16_t fPort = 0;
 };
 
-// A staged tree: its library is a link to the build's, as in a tree of links to another one's files.
+// A staged tree: its library is a link to the build's, as in a tree of links to another one's files. Its name is in
+// Latin-1, as any bytes may be.
 class StagedTreeTest : public testing::Test
 {
   protected:
     void SetUp() override
     {
-        std::string pattern = fs::temp_directory_path() / "staged-tree-XXXXXX";
+        std::string pattern = fs::temp_directory_path() / "staged-tr\xE9\xE9-XXXXXX";
         ASSERT_NE(::mkdtemp(pattern.data()), nullptr);
         fRoot = pattern;
         fHome = fRoot + "/pegasus";
@@ -195,7 +197,7 @@ class StagedTreeTest : public testing::Test
 
     static std::string refusal(std::uint16_t port, const std::string& reason)
     {
-        return "Cannot connect to 127.0.0.1:" + std::to_string(port) + ". " + reason + ".\n";
+        return base::repairedUtf8("Cannot connect to 127.0.0.1:" + std::to_string(port) + ". " + reason + ".\n");
     }
 
     std::string fRoot;
