@@ -3,8 +3,11 @@
 
 #include "pegasus/base/AsciiCase.h"
 
+#include <algorithm>
 #include <charconv>
 #include <cmath>
+#include <cstddef>
+#include <cstdint>
 #include <limits>
 #include <system_error>
 
@@ -72,14 +75,26 @@ template <typename Real> std::optional<Real> parseNamed(std::string_view text)
     return negative ? -std::numeric_limits<Real>::infinity() : std::numeric_limits<Real>::infinity();
 }
 
-// After an out-of-range result: was the number too small (then it is 0) or too big?
+// `text` is what follows the "e". One beyond any number of digits becomes large of its sign.
+std::ptrdiff_t readExponent(std::string_view text)
+{
+    constexpr std::ptrdiff_t kLarge = std::numeric_limits<std::int32_t>::max();
+    const bool negative = !text.empty() && text.front() == '-';
+    takeSign(text);
+    std::int32_t value = 0;
+    const std::errc problem = std::from_chars(text.data(), text.data() + text.size(), value).ec;
+    const std::ptrdiff_t magnitude = problem == std::errc::result_out_of_range ? kLarge : value;
+    return negative ? -magnitude : magnitude;
+}
+
+// After an out-of-range result: was the number too small (then it is 0) or too big? Its first digit has a place before
+// or after the point, and the exponent moves the point.
 bool isTiny(std::string_view text)
 {
-    const std::size_t exponent = text.find_first_of("eE");
-    if (exponent != std::string_view::npos) {
-        return text[exponent + 1] == '-';
-    }
-    return text.find_first_of("123456789") > text.find('.');
+    const std::size_t exponentAt = std::min(text.find_first_of("eE"), text.size());
+    const auto before =
+        static_cast<std::ptrdiff_t>(text.find('.')) - static_cast<std::ptrdiff_t>(text.find_first_of("123456789"));
+    return before + readExponent(text.substr(std::min(exponentAt + 1, text.size()))) < 0;
 }
 
 template <typename Real> std::optional<Real> parseReal(std::string_view text)

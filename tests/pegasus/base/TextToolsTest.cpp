@@ -156,5 +156,28 @@ TEST(NumberTextTest, HexadecimalDigits)
     }
 }
 
+TEST(NumberTextTest, RealsOutsideTheTypeAreTooSmallOrTooBig)
+{
+    const std::string zeros(400, '0');
+    const std::pair<std::string, std::optional<Real64>> rows[] = {
+        {"1.0e-400", 0.0},
+        {"-1.0E-400", 0.0},
+        {"0." + zeros + "1", 0.0},
+        {"0." + zeros + "1e+5", 0.0},
+        {"0." + zeros + "1e399", 0.01},
+        {"1.0e-99999999999999999999", 0.0},
+        {"1.0e400", std::nullopt},
+        {"1" + zeros + ".0", std::nullopt},
+        {"1" + zeros + ".0e-5", std::nullopt},
+        {"-1" + zeros + ".0e-399", -10.0},
+        {"0.01e+99999999999999999999", std::nullopt},
+    };
+    for (const auto& [text, value] : rows) {
+        EXPECT_EQ(parseReal64(text), value) << text;
+    }
+    EXPECT_EQ(parseReal32("1.0e-50"), 0.0F);
+    EXPECT_EQ(parseReal32("1.0e50"), std::nullopt);
+}
+
 } // namespace
 } // namespace Pegasus::base
