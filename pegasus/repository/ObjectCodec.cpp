@@ -15,6 +15,7 @@ wire::XmlLimits storageLimits(std::size_t maxBytes)
     wire::XmlLimits limits;
     limits.maxTextBytes = maxBytes;
     limits.maxElementBytes = maxBytes;
+    limits.maxElements = maxBytes;
     limits.maxArrayElements = maxBytes;
     return limits;
 }

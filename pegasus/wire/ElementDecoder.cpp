@@ -73,10 +73,11 @@ CIMType valueType(CIMType declared, const Array<CIMQualifier>& qualifiers)
     }
 }
 
-Uint32 countFrom(XmlElement child)
+// Returns: how many siblings there are from the child on, or the limit.
+Uint32 countFrom(XmlElement child, std::size_t limit)
 {
     Uint32 count = 0;
-    for (; child; child = child.nextSibling()) {
+    for (; child && count < limit; child = child.nextSibling()) {
         ++count;
     }
     return count;
@@ -323,7 +324,7 @@ CIMValue ElementDecoder::nullValue(CIMType type, bool isArray, Uint32 arraySize)
 // Returns: the first child after the properties.
 XmlElement ElementDecoder::decodeProperties(XmlElement child, Array<CIMProperty>& properties)
 {
-    properties.reserveCapacity(countFrom(child));
+    properties.reserveCapacity(countFrom(child, fLimits.maxMembers));
     MemberList<CIMProperty> members(properties, fLimits.maxMembers);
     for (; isOneOf(child, {"PROPERTY", "PROPERTY.ARRAY", "PROPERTY.REFERENCE"}); child = child.nextSibling()) {
         members.add(child, decodeProperty(child));

@@ -18,6 +18,8 @@ struct XmlLimits
     std::size_t maxTextBytes = 16UL * 1024 * 1024;
     // Bytes of one element that is decoded as a whole (an instance, a class).
     std::size_t maxElementBytes = 64UL * 1024 * 1024;
+    // Elements in it, itself included. A reader has 32 bytes for each, which may be eight times its text.
+    std::size_t maxElements = 4UL * 1024 * 1024;
     // Elements of one array value.
     std::size_t maxArrayElements = 1024UL * 1024;
     // Members of one owner and kind: properties, methods or qualifiers of a class, parameters of a method.

@@ -113,6 +113,9 @@ void XmlNodes::open(const XmlToken& token, std::size_t from)
     if (fOuterDepth + fOpen.size() >= fLimits.maxDepth) {
         fSource.fail(Kind::kTooLarge, from, "elements nested more than " + std::to_string(fLimits.maxDepth) + " deep");
     }
+    if (fNodes.size() >= fLimits.maxElements) {
+        fSource.fail(Kind::kTooLarge, from, "more than " + std::to_string(fLimits.maxElements) + " elements in one");
+    }
     const auto index = static_cast<std::uint32_t>(fNodes.size());
     XmlNode& node = fNodes.emplace_back();
     node.name = token.name;

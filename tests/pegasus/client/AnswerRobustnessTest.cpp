@@ -142,6 +142,7 @@ const LimitCase kLimits[] = {
     {"tag bytes", [](auto& l) { l.xml.maxTagBytes = 40; }, "class", "a tag of more than 40 bytes"},
     {"text", [](auto& l) { l.xml.maxTextBytes = 8; }, "class", "text of more than 8 bytes"},
     {"element bytes", [](auto& l) { l.xml.maxElementBytes = 300; }, "instances", "an element of more than 300 bytes"},
+    {"elements", [](auto& l) { l.xml.maxElements = 5; }, "class", "more than 5 elements in one"},
     {"array elements", [](auto& l) { l.xml.maxArrayElements = 1; }, "instances", "an array of more than 1 elements"},
     {"properties", [](auto& l) { l.xml.maxMembers = 2; }, "class", "more than 2 members of one owner"},
     {"qualifiers", [](auto& l) { l.xml.maxMembers = 0; }, "class", "more than 0 members of one owner"},
