@@ -96,8 +96,9 @@ bool XmlSlicer::step()
 
 XmlOffer::Result XmlSlicer::offer()
 {
-    const XmlOffer offer = fHandler.offer(rest().substr(0, fNodes.limits().maxElementBytes));
+    const XmlOffer offer = fHandler.offer(rest());
     if (offer.result == XmlOffer::Result::kTaken) {
+        checkElementSize(offer.size);
         consume(offer.size);
         return offer.result;
     }

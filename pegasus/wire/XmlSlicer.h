@@ -35,7 +35,7 @@ class XmlSliceHandler
     virtual void openExpected() {}
     virtual void closeEnvelope(std::string_view name) = 0;
     // The text from an element inside the envelope on, before it is read. A handler that knows such elements may take
-    // one that is well formed and within the limits; the rest of the text may be anything.
+    // one that is well formed and within the limits of what is in it; the rest of the text may be anything.
     virtual XmlOffer offer(std::string_view) { return {}; }
     // An element inside the envelope, with everything in it.
     virtual void slice(const XmlElement& element) = 0;

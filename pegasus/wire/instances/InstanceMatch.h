@@ -18,7 +18,7 @@ class InstanceMatch
   public:
     // The element begins the text. All of these must outlive the object.
     InstanceMatch(const InstancePattern& pattern, std::string_view text, const XmlLimits& limits, PackedWriter& values)
-        : fPattern(pattern), fLimits(limits), fValues(values), fText(text)
+        : fPattern(pattern), fLimits(limits), fValues(values), fText(text, limits.maxTextBytes)
     {
     }
 

@@ -55,7 +55,6 @@ void KnownInstances::learn(const XmlElement& element, const CIMInstance& instanc
 
 XmlOffer KnownInstances::take(std::string_view text, CIMInstance& instance)
 {
-    text = text.substr(0, fLimits.maxTextBytes); // then no text in it is longer
     for (auto known = fPatterns.begin(); known != fPatterns.end(); ++known) {
         fValues.clear();
         const XmlOffer offer = InstanceMatch(*known, text, fLimits, fValues).result();

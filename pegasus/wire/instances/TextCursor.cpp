@@ -45,8 +45,9 @@ bool TextCursor::takeText(std::string_view& text)
         return false;
     }
     const char* const end = static_cast<const char*>(found);
-    text = trimBlanks({fAt, static_cast<std::size_t>(end - fAt)});
-    if (special != end && !resolve(text)) {
+    const std::size_t size = static_cast<std::size_t>(end - fAt);
+    text = trimBlanks({fAt, size});
+    if (size > fMaxTextBytes || (special != end && !resolve(text))) {
         return false;
     }
     fAt = end;

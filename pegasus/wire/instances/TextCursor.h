@@ -16,7 +16,10 @@ namespace Pegasus::wire {
 class TextCursor
 {
   public:
-    explicit TextCursor(std::string_view text) : fBegin(text.data()), fAt(fBegin), fEnd(fBegin + text.size()) {}
+    TextCursor(std::string_view text, std::size_t maxTextBytes)
+        : fBegin(text.data()), fAt(fBegin), fEnd(fBegin + text.size()), fMaxTextBytes(maxTextBytes)
+    {
+    }
 
     // Whether a function failed because the text ended.
     bool isCut() const { return fIsCut; }
@@ -53,6 +56,7 @@ class TextCursor
     const char* const fBegin;
     const char* fAt;
     const char* const fEnd;
+    const std::size_t fMaxTextBytes;
     bool fIsCut = false;
     std::string fScratch;
 };

@@ -125,6 +125,18 @@ TEST(KnownInstances, AreTakenWhereTheirTagsAreEqualAndTheirValuesAreSound)
     }
 }
 
+// An element that is all there is cut for nobody: whoever waits for more of it may wait for ever.
+TEST(KnownInstances, ALimitRefusesTheTextThatExceedsItAndNoOther)
+{
+    wire::XmlLimits limits;
+    limits.maxTextBytes = 20;
+    wire::KnownInstances known(limits);
+    decoded(elementWith("a"), &known);
+    CIMInstance instance;
+    EXPECT_EQ(known.take(elementWith(std::string(20, 'b')), instance).result, Result::kTaken);
+    EXPECT_EQ(known.take(elementWith(std::string(21, 'b')), instance).result, Result::kRefused);
+}
+
 // Whatever a pattern lacks would be dropped from the instances that it takes.
 TEST(KnownInstances, OthersAreNotLearned)
 {
