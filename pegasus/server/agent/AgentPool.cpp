@@ -32,6 +32,14 @@ std::chrono::seconds backOff(unsigned deaths)
     return std::min(AgentPool::kFirstBackOff * (1 << doublings), AgentPool::kLastBackOff);
 }
 
+// Throws: AgentGone; CIMException when descriptors run out.
+std::shared_ptr<AgentChannel> channelTo(AgentProcess& process)
+try {
+    return process.takeChannel();
+} catch (const std::system_error& error) { // one of the sink's would mean that the client has gone
+    fail(error.what());
+}
+
 // Runs its function at the end of the scope.
 class ScopeGuard
 {
@@ -81,7 +89,7 @@ CimStatus AgentPool::requestOnce(const std::string& module, const AgentRequest& 
     const std::shared_ptr<AgentProcess> process = acquire(module);
     const ScopeGuard releaser([&] { release(module); });
     try {
-        std::shared_ptr<AgentChannel> channel = process->takeChannel();
+        std::shared_ptr<AgentChannel> channel = channelTo(*process);
         CimStatus status = channel->request(request, sink, timeout);
         process->giveBack(std::move(channel));
         succeeded(module);

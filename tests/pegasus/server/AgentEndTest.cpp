@@ -7,6 +7,7 @@
 #include <utility>
 
 #include <signal.h>
+#include <sys/resource.h>
 
 namespace servertest {
 namespace {
@@ -39,11 +40,12 @@ TEST_F(AgentTest, aDeathIsReportedWithModuleAndCauseAndTheOthersGoOn)
 TEST_F(AgentTest, aModuleThatKeepsDyingIsLeftAloneForAWhile)
 {
     start();
+    const auto crash = [&] { return errorOf([&] { call(fClient, "Probe_Bulk", "Crash"); }); };
     for (int i = 0; i < 3; ++i) {
-        EXPECT_NE(errorOf([&] { call(fClient, "Probe_Bulk", "Crash"); }).find("Lost connection"), std::string::npos);
+        EXPECT_NE(crash().find("Lost connection"), std::string::npos);
     }
-    EXPECT_NE(errorOf([&] { call(fClient, "Probe_Bulk", "Crash"); }).find("it is not started again yet"),
-              std::string::npos);
+    // A second at first, which a busy machine may let pass; then twice the time after each death.
+    EXPECT_TRUE(eventually([&] { return crash().find("it is not started again yet") != std::string::npos; }));
     EXPECT_TRUE(eventually([&] { return errorOf([&] { call(fClient, "Probe_Bulk", "ProcessId"); }) == "no error"; }));
 }
 
@@ -89,13 +91,27 @@ TEST_F(AgentTest, killedInTheMiddleOfAnEnumeration)
     RawConnection endless(fTree.port());
     endless.send(intrinsicRequest("EnumerateInstances", "root/probe", classNameParameter("Probe_Endless")));
     const HttpAnswer begun = endless.receive(std::chrono::seconds(1));
-    EXPECT_GT(begun.body.size(), 256u << 10); // several chunks
+    EXPECT_GT(begun.body.size(), 128u << 10); // several chunks
     EXPECT_FALSE(begun.isComplete);
     ASSERT_EQ(::kill(agent, SIGKILL), 0);
     EXPECT_FALSE(endless.isClosed(std::chrono::milliseconds(200))) << "the answer is ended properly";
     EXPECT_EQ(countOf("Probe_Other"), 1000u);
     EXPECT_EQ(fClient.enumerateInstances(kNamespace, "Probe_Stored").size(), 1u);
     EXPECT_TRUE(eventually([&] { return !isRunning(agent); }));
+}
+
+// Out of descriptors, a server answers on the connections that it has.
+TEST_F(AgentTest, aRequestThatNeedsADescriptorTooManyIsAnswered)
+{
+    start();
+    call(fClient, "Probe_Bulk", "ProcessId");
+    RawConnection endless(fTree.port());
+    endless.send(intrinsicRequest("EnumerateInstances", "root/probe", classNameParameter("Probe_Endless")));
+    EXPECT_EQ(endless.receive(std::chrono::seconds(1)).status, 200) << "it has the agent's only channel";
+    const rlimit none = {3, 3};
+    ASSERT_EQ(::prlimit(fTree.serverProcess(), RLIMIT_NOFILE, &none, nullptr), 0);
+    EXPECT_EQ(errorOf([&] { call(fClient, "Probe_Bulk", "ProcessId"); }),
+              "CIM_ERR_FAILED: cannot create a socket pair for an agent: Too many open files");
 }
 
 TEST_F(AgentTest, aClientThatLeavesEndsItsEnumeration)
