@@ -251,8 +251,8 @@ class Interrupted(unittest.TestCase):
 
     STEP_SECONDS = 0.25
     WHOLE_RUN_SECONDS = 10
-    END_SECONDS = 6.5
-    ANNOUNCED_SECONDS = 1.5
+    END_SECONDS = 8.5  # a third pause would make it nine
+    ANNOUNCED_SECONDS = 5
 
     def first_error(self, process):
         """Returns the beginning of standard error as soon as there is one; empty when the process ends without."""

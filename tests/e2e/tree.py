@@ -122,7 +122,7 @@ exec {program}.real "$@"
 
     def leftovers(self):
         """What a finished run must have taken away; agents get a moment to notice that their server has gone."""
-        deadline = time.monotonic() + 5
+        deadline = time.monotonic() + 30
         while self.processes() and time.monotonic() < deadline:
             time.sleep(0.05)
         left = [f"process {pid}" for pid in self.processes()]

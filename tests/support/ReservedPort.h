@@ -16,9 +16,10 @@
 
 namespace test {
 
-// A port of the loopback interface for one test's server, which may stop and start again on it. The kernel gives it to
-// no outgoing connection, because it lies below the range of those, and no other test's process gets it while this
-// object lives: each holds an abstract socket named after its port.
+// A port of the loopback interface for one test's server, which may stop and start again on it. No other test's process
+// gets it while this object lives: each holds an abstract socket named after its port. The kernel gives it to no
+// outgoing connection where the range of those begins above it, as it does unless the machine was set up for many
+// connections.
 class ReservedPort
 {
   public:
@@ -27,8 +28,9 @@ class ReservedPort
     {
         int above = 0;
         std::ifstream("/proc/sys/net/ipv4/ip_local_port_range") >> above;
-        const int count = std::min(above, 32768) - kFirst;
-        const int start = count > 0 ? static_cast<int>(std::random_device{}() % static_cast<unsigned>(count)) : 0;
+        const int end = above > kFirst ? std::min(above, kEnd) : kEnd;
+        const int count = end - kFirst;
+        const int start = static_cast<int>(std::random_device{}() % static_cast<unsigned>(count));
         for (int i = 0; i < count; ++i) {
             fPort = static_cast<std::uint16_t>(kFirst + (start + i) % count);
             fReservation = reserve(fPort);
@@ -36,7 +38,7 @@ class ReservedPort
                 return;
             }
         }
-        throw std::runtime_error("no port below " + std::to_string(above) + " is free");
+        throw std::runtime_error("no port from " + std::to_string(kFirst) + " to " + std::to_string(end) + " is free");
     }
     ~ReservedPort() { ::close(fReservation); }
     ReservedPort(const ReservedPort&) = delete;
@@ -46,6 +48,7 @@ class ReservedPort
 
   private:
     static constexpr int kFirst = 20000;
+    static constexpr int kEnd = 32768;
 
     // Returns: the descriptor that holds the reservation; -1 when another process has it or listens on the port.
     static int reserve(std::uint16_t port)

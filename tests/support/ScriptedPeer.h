@@ -70,7 +70,7 @@ class ScriptedPeer
     std::vector<PeerRequest> requests() const;
     std::size_t connectionCount() const;
     // Returns: whether so many requests had come before the time was over.
-    bool waitForRequests(std::size_t count, std::chrono::milliseconds limit = std::chrono::seconds(10)) const;
+    bool waitForRequests(std::size_t count, std::chrono::milliseconds limit = std::chrono::seconds(60)) const;
 
   private:
     void bindPort();

@@ -207,7 +207,7 @@ TEST(TChildProcess, TimeoutKillsAChildThatLeftItsGroup)
 {
     const auto start = std::chrono::steady_clock::now();
     const auto request = Probe({"leave-group"});
-    const auto outcome = TChildProcess(request).Run(milliseconds(500));
+    const auto outcome = TChildProcess(request).Run(milliseconds(1000));
     EXPECT_EQ(outcome.fEnd, TProcessOutcome::kTimedOut);
     EXPECT_EQ(outcome.fOutput, "left");
     EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(10)) << "it ended by itself";
@@ -216,7 +216,7 @@ TEST(TChildProcess, TimeoutKillsAChildThatLeftItsGroup)
 TEST(TChildProcess, ChildThatNeverStopsWritingCannotHoldTheTimeout)
 {
     const auto request = Probe({"write-forever"});
-    const auto outcome = TChildProcess(request).Run(milliseconds(200));
+    const auto outcome = TChildProcess(request).Run(milliseconds(1000));
     EXPECT_EQ(outcome.fEnd, TProcessOutcome::kTimedOut);
     EXPECT_FALSE(outcome.fOutput.empty());
 }

@@ -35,9 +35,9 @@ class RawConnection
     bool send(const std::string& bytes);
     void endSending();
     // Reads one answer; bytes after it are kept for the next. Ends at the time limit with what there is.
-    HttpAnswer receive(std::chrono::milliseconds limit = std::chrono::seconds(10));
+    HttpAnswer receive(std::chrono::milliseconds limit = std::chrono::seconds(60));
     // Whether the server has closed, seen within the limit.
-    bool isClosed(std::chrono::milliseconds limit = std::chrono::seconds(5));
+    bool isClosed(std::chrono::milliseconds limit = std::chrono::seconds(60));
     int fd() const { return fSocket; }
 
   private:

@@ -456,7 +456,7 @@ TEST_F(LimitsTest, aSlowSenderIsToldAndEnded)
         answer = connection.receive(std::chrono::milliseconds(20));
     }
     EXPECT_EQ(answer.status, 408) << answer.statusLine;
-    EXPECT_LT(std::chrono::steady_clock::now() - begin, std::chrono::seconds(4));
+    EXPECT_LT(std::chrono::steady_clock::now() - begin, std::chrono::seconds(20)) << "of the default's 30";
     EXPECT_TRUE(connection.isClosed());
 }
 

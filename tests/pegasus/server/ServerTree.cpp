@@ -22,7 +22,8 @@ namespace fs = std::filesystem;
 
 namespace {
 
-constexpr std::chrono::seconds kProgramLimit{30};
+constexpr std::chrono::seconds kProgramLimit{120};
+constexpr std::chrono::seconds kEventLimit{60};
 
 std::string makeRoot()
 {
@@ -63,7 +64,7 @@ std::string programPath(const std::string& name)
 
 bool waitUntil(bool (*condition)(const void*), const void* argument)
 {
-    const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(10);
+    const auto deadline = std::chrono::steady_clock::now() + kEventLimit;
     while (!condition(argument)) {
         if (std::chrono::steady_clock::now() > deadline) {
             return false;
