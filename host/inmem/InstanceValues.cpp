@@ -8,6 +8,7 @@
 
 #include <boost/make_shared.hpp>
 
+#include <algorithm>
 #include <utility>
 
 namespace NKOLVRX20 {
@@ -29,42 +30,65 @@ boost::shared_ptr<ICIMPropertyDecl> FindDeclaration(const boost::shared_ptr<ICIM
 
 } // namespace
 
-boost::shared_ptr<ICIMProperty> TInmemValues::Find(const std::string& name)
+TInmemValues::TInmemValues(const ICIMClass* instanceClass)
+    : fLayout(TInmemLayout::Of(instanceClass)), fBlock(boost::make_shared<TBlock>(fLayout->Size()))
+{
+}
+
+boost::shared_ptr<ICIMProperty> TInmemValues::Find(const std::string& name) const
 {
     const std::size_t place = fLayout->Find(NormalizedName(name));
-    return IsSet(place) ? PropertyAt(place) : nullptr;
+    return At(place) ? Shared(place) : nullptr;
 }
 
-std::vector<boost::shared_ptr<ICIMProperty>> TInmemValues::All()
+void TInmemValues::Visit(const TPropertyVisitor& visitor) const
 {
-    std::vector<boost::shared_ptr<ICIMProperty>> properties;
-    properties.reserve(fEntries.size());
-    for (const std::size_t place : fLayout->InOrder()) {
-        if (IsSet(place)) {
-            properties.push_back(PropertyAt(place));
+    const TInmemValues kept = *this; // the visitor may set values, which can make another layout
+    for (const std::size_t place : kept.fLayout->InOrder()) {
+        if (kept.At(place) && !visitor(kept.Shared(place))) {
+            return;
         }
     }
-    return properties;
 }
 
-void TInmemValues::Set(const std::string& name, TCIMValue value, const boost::shared_ptr<ICIMClass>& instanceClass,
+TInmemProperty* TInmemValues::At(std::size_t place) const
+{
+    if (place < fBlock->size()) {
+        return (*fBlock)[place].IsSet() ? &(*fBlock)[place] : nullptr;
+    }
+    const std::size_t later = place - fBlock->size();
+    return later < fLater.size() ? fLater[later].get() : nullptr;
+}
+
+boost::shared_ptr<ICIMProperty> TInmemValues::Shared(std::size_t place) const
+{
+    if (place < fBlock->size()) {
+        return boost::shared_ptr<ICIMProperty>(fBlock, &(*fBlock)[place]);
+    }
+    return fLater[place - fBlock->size()];
+}
+
+void TInmemValues::Set(const std::string& name, TCIMValue&& value, const boost::shared_ptr<ICIMClass>& instanceClass,
                        const TCIMContext& context)
 {
     const std::size_t place = IsExpected(name) ? fNext : PlaceFor(name, instanceClass, context);
-    if (fEntries.empty()) {
-        fEntries.reserve(fLayout->Size());
-    }
-    if (place >= fEntries.size()) {
-        fEntries.resize(place + 1);
-    }
-    TEntry& entry = fEntries[place];
-    if (entry.fProperty) {
-        entry.fProperty->SetValue(std::move(value), context);
-    } else {
-        entry.fValue = std::move(value);
-        entry.fIsSet = true;
-    }
     fNext = place + 1;
+    if (TInmemProperty* const property = At(place)) {
+        property->ReplaceValue(std::move(value));
+    } else {
+        Make(place).Set(fLayout->At(place), std::move(value));
+    }
+}
+
+TInmemProperty& TInmemValues::Make(std::size_t place)
+{
+    if (place < fBlock->size()) {
+        return (*fBlock)[place];
+    }
+    const std::size_t later = place - fBlock->size();
+    fLater.resize(std::max(fLater.size(), later + 1));
+    fLater[later] = boost::make_shared<TInmemProperty>();
+    return *fLater[later];
 }
 
 // Most instances are given the same names in the same order as the one before.
@@ -81,7 +105,7 @@ std::size_t TInmemValues::PlaceFor(const std::string& name, const boost::shared_
     std::string key = NormalizedName(name);
     const std::size_t place = fLayout->Find(key);
     const bool isKnown = place != TInmemLayout::kNowhere;
-    if (isKnown && (IsSet(place) || !fLayout->At(place)->fDeclaration.expired())) {
+    if (isKnown && (At(place) || !fLayout->At(place)->fDeclaration.expired())) {
         return place;
     }
     const auto declaration = FindDeclaration(instanceClass, name, context);
@@ -98,15 +122,6 @@ std::size_t TInmemValues::PlaceFor(const std::string& name, const boost::shared_
         return place;
     }
     return fLayout->Append(std::move(member));
-}
-
-const boost::shared_ptr<TInmemProperty>& TInmemValues::PropertyAt(std::size_t place)
-{
-    TEntry& entry = fEntries[place];
-    if (!entry.fProperty) {
-        entry.fProperty = boost::make_shared<TInmemProperty>(fLayout->At(place), std::move(entry.fValue));
-    }
-    return entry.fProperty;
 }
 
 } // namespace NKOLVRX20

@@ -139,11 +139,7 @@ void TInmemInstance::SetPropertyValue(const std::string& name, TCIMValue value, 
 
 void TInmemInstance::EnumerateProperties(TPropertyVisitor visitor, TCIMContext) const
 {
-    for (const auto& property : fValues->All()) { // a copy: the visitor may set values
-        if (!visitor(property)) {
-            return;
-        }
-    }
+    fValues->Visit(visitor);
 }
 
 TCIMValue TInmemInstance::InvokeMethod(const std::string&, TCIMContext&, TCIMContext)

@@ -10,11 +10,6 @@
 
 namespace NKOLVRX20 {
 
-TInmemProperty::TInmemProperty(std::shared_ptr<const TInmemMember> member, TCIMValue value)
-    : fMember(std::move(member)), fValue(std::move(value))
-{
-}
-
 std::string TInmemProperty::GetName() const
 {
     return fMember->fName;

@@ -12,7 +12,15 @@ namespace NKOLVRX20 {
 class TInmemProperty : public ICIMProperty
 {
   public:
-    TInmemProperty(std::shared_ptr<const TInmemMember> member, TCIMValue value);
+    // A place for a property. Set makes it one; before that, the instance lacks it.
+    TInmemProperty() = default;
+    void Set(std::shared_ptr<const TInmemMember> member, TCIMValue&& value)
+    {
+        fMember = std::move(member);
+        fValue = std::move(value);
+    }
+    bool IsSet() const { return fMember != nullptr; }
+    void ReplaceValue(TCIMValue&& value) { fValue = std::move(value); }
 
     // Returns: the declaration's name, or the name that the instance was given where the class lacks the property.
     std::string GetName() const;

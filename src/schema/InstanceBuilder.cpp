@@ -48,6 +48,12 @@ std::string LoggedName(const Pegasus::CIMConstProperty& property)
     return IsCimName(normalized) ? normalized : name;
 }
 
+// Equal reals and datetimes can differ: 0 and -0, and one time in two time zones. A reference depends on its instance.
+bool IsTheSameWhenEqual(Pegasus::CIMType type)
+{
+    return type <= Pegasus::CIMTYPE_SINT64 || type == Pegasus::CIMTYPE_CHAR16 || type == Pegasus::CIMTYPE_STRING;
+}
+
 // Servers disagree on the width of a slot's number; the host knows it as 16 bits.
 void Narrow(TPEGASUSInstance& target, const std::string& name)
 {
@@ -63,19 +69,19 @@ TInstanceBuilder::TInstanceBuilder(TPEGASUSClass& instanceClass, std::string ope
 }
 
 // Throws: TVRXException 25, after a log line, for an invalid name.
-const TInstanceBuilder::TName& TInstanceBuilder::NameAt(Pegasus::Uint32 place, const Pegasus::String& served)
+TInstanceBuilder::TMember& TInstanceBuilder::MemberAt(Pegasus::Uint32 place, const Pegasus::String& served)
 {
-    if (place < fNames.size() && IsSameText(fNames[place].fServed, served)) {
-        return fNames[place];
+    if (place < fMembers.size() && IsSameText(fMembers[place].fServed, served)) {
+        return fMembers[place];
     }
-    TName name;
-    name.fServed = served;
-    name.fServerName = ToStdString(served);
-    name.fKey = NormalizedName(name.fServerName);
-    name.fIsInstanceId = name.fServerName.find(kInstanceIdName) != std::string::npos;
-    name.fIsSlotNumber = name.fServerName == kSlotNumber && fClass.GetName({}) == kSlotClass;
-    fNames.resize(std::max<std::size_t>(fNames.size(), place + 1));
-    return fNames[place] = std::move(name);
+    TMember member;
+    member.fServed = served;
+    member.fServerName = ToStdString(served);
+    member.fKey = NormalizedName(member.fServerName);
+    member.fIsInstanceId = member.fServerName.find(kInstanceIdName) != std::string::npos;
+    member.fIsSlotNumber = member.fServerName == kSlotNumber && fClass.GetName({}) == kSlotClass;
+    fMembers.resize(std::max<std::size_t>(fMembers.size(), place + 1));
+    return fMembers[place] = std::move(member);
 }
 
 boost::shared_ptr<ICIMClass> TInstanceBuilder::ReferencedClass(const Pegasus::CIMInstance& source,
@@ -90,21 +96,33 @@ boost::shared_ptr<ICIMClass> TInstanceBuilder::ReferencedClass(const Pegasus::CI
     return name ? fClass.GetOwningNamespace().GetClass(*name, {{kNspKey, fClass.GetPegasusNSPStr()}}) : nullptr;
 }
 
-TCIMValue TInstanceBuilder::Value(const Pegasus::CIMInstance& source, const TName& name,
+// Requires: a value. Throws: what ToHostValue throws.
+TCIMValue TInstanceBuilder::Converted(const Pegasus::CIMConstProperty& property, TMember& member) const
+{
+    const Pegasus::CIMValue& served = property.getValue();
+    if (!member.fServedValue.isNull() && served == member.fServedValue) {
+        return member.fValue;
+    }
+    TCIMValue value;
+    ToHostValue(served, property.getType(), property.isArray(), &fClass, value);
+    if (member.fServedValue.isNull() && IsTheSameWhenEqual(property.getType())) {
+        member.fServedValue = served;
+        member.fValue = value;
+    }
+    return value;
+}
+
+TCIMValue TInstanceBuilder::Value(const Pegasus::CIMInstance& source, TMember& member,
                                   const Pegasus::CIMConstProperty& property) const
 {
-    TCIMValue value;
-    const Pegasus::CIMValue& served = property.getValue();
-    const Pegasus::CIMType type = property.getType();
-    const auto referenced =
-        type == Pegasus::CIMTYPE_REFERENCE ? ReferencedClass(source, name.fServerName) : boost::shared_ptr<ICIMClass>();
-    if (!served.isNull()) {
-        ToHostValue(served, type, property.isArray(), &fClass, value);
-    }
+    const auto referenced = property.getType() == Pegasus::CIMTYPE_REFERENCE
+                                ? ReferencedClass(source, member.fServerName)
+                                : boost::shared_ptr<ICIMClass>();
+    TCIMValue value = property.getValue().isNull() ? TCIMValue() : Converted(property, member);
     if (referenced) {
         value.SetReferencedClass(referenced);
     }
-    if (name.fIsInstanceId && value.ToString(kDecimal).empty()) {
+    if (member.fIsInstanceId && value.ToString(kDecimal).empty()) {
         value.Set("");
     }
     return value;
@@ -113,10 +131,10 @@ TCIMValue TInstanceBuilder::Value(const Pegasus::CIMInstance& source, const TNam
 void TInstanceBuilder::Transfer(const Pegasus::CIMInstance& source, Pegasus::Uint32 place,
                                 const Pegasus::CIMConstProperty& property, TPEGASUSInstance& target)
 {
-    const TName& name = NameAt(place, property.getName().getString());
-    target.SetPropertyValue(name.fKey, Value(source, name, property), {});
-    if (name.fIsSlotNumber) {
-        Narrow(target, name.fKey);
+    TMember& member = MemberAt(place, property.getName().getString());
+    target.SetPropertyValue(member.fKey, Value(source, member, property), {});
+    if (member.fIsSlotNumber) {
+        Narrow(target, member.fKey);
     }
 }
 

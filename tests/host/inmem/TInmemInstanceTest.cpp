@@ -106,6 +106,34 @@ TEST(TInmemInstance, InstancesOfAClassDisturbNoOther)
     }
 }
 
+// The second instance begins with the layout of the first: its properties lie together.
+TEST(TInmemInstance, AVisitorMaySetValuesAndGiveTheInstanceOtherOnes)
+{
+    const auto fan = FanClass();
+    const auto first = Fan(fan, 1);
+    const auto second = Fan(fan, 2);
+    second->SetPropertyValue("Undeclared", TCIMValue(2), TCIMContext());
+    std::vector<boost::shared_ptr<ICIMProperty>> visited;
+    second->EnumerateProperties(
+        [&](boost::shared_ptr<ICIMProperty> each) {
+            visited.push_back(each);
+            second->SetPropertyValue("a" + std::to_string(visited.size()), TCIMValue(3), TCIMContext());
+            second->SetPropertyValue("systemname", TCIMValue("set"), TCIMContext());
+            if (visited.size() == 2) {
+                *static_cast<ICIMInstance*>(second.get()) = *static_cast<const ICIMInstance*>(first.get());
+            }
+            return true;
+        },
+        TCIMContext());
+    std::vector<std::string> texts;
+    for (const auto& property : visited) {
+        texts.push_back(property->ToString());
+    }
+    EXPECT_THAT(texts, ElementsAre("2", "set", "2"));
+    EXPECT_EQ(TextsOf(*second), (TTexts{{"SystemName", "set"}, {"DeviceID", "1"}, {"a3", "3"}}));
+    EXPECT_EQ(TextsOf(*first), (TTexts{{"SystemName", "a\"b\\c"}, {"DeviceID", "1"}}));
+}
+
 TEST(TInmemInstance, ADeclarationHoldsFromTheNextInstanceOn)
 {
     const auto fan = FanClass();

@@ -59,6 +59,56 @@ TEST_F(InstanceValuesTest, ASlotsNumberIsAlways16BitsWide)
                 ElementsAre("3|4TPEGASUSClass::EnumerateInstances - Unable to retrieve property: number"));
 }
 
+TEST_F(InstanceValuesTest, EachInstanceHasItsOwnValuesWhateverTheFirstOneHas)
+{
+    const auto words = [](const char* last) {
+        Pegasus::Array<Pegasus::String> array;
+        array.append("a");
+        array.append(last);
+        return CIMValue(array);
+    };
+    const CIMValue null(Pegasus::CIMTYPE_STRING, false);
+    const std::string noon = "20261122120000.000000+000";
+    const std::string sameNoon = "20261122130000.000000+060"; // in another time zone
+    const auto time = [](const std::string& text) { return Pegasus::CIMDateTime(Pegasus::String(text.c_str())); };
+    struct
+    {
+        const char* fName;
+        std::vector<CIMValue> fServed; // one for each instance
+        std::vector<std::string> fTexts;
+    } const rows[] = {
+        {"Text", {null, Pegasus::String("x"), Pegasus::String("xy"), Pegasus::String("x")}, {"", "x", "xy", "x"}},
+        {"Words", {words("b"), words("b"), words("c"), null}, {"a, b", "a, b", "a, c", ""}},
+        {"Number", {Pegasus::Uint8(7), Pegasus::Uint8(7), Pegasus::Uint8(8), Pegasus::Uint8(7)}, {"7", "7", "8", "7"}},
+        {"Other",
+         {Pegasus::Uint8(7), Pegasus::Uint16(7), CIMValue(true), Pegasus::String("7")},
+         {"7", "7", "true", "7"}},
+        {"Zero", {0.0, -0.0, 0.0, -0.0}, {"0", "-0", "0", "-0"}},
+        {"When", {time(noon), time(sameNoon), null, time(noon)}, {noon, sameNoon, "", noon}},
+    };
+    std::vector<Pegasus::CIMInstance> served;
+    for (std::size_t i = 0; i < 4; ++i) {
+        std::vector<Pegasus::CIMProperty> properties;
+        for (const auto& row : rows) {
+            properties.push_back(Property(row.fName, row.fServed[i]));
+        }
+        served.push_back(Instance("CIM_A", "CIM_A.K=" + std::to_string(i), properties));
+    }
+    const auto instances = Enumerate(*Serve("CIM_A", served));
+    ASSERT_EQ(4U, instances.size());
+    TCIMValue changed = ValueOf(*instances[0], "Words");
+    static_cast<std::vector<TCIMValue>&>(changed)[0] = TCIMValue("changed");
+    for (const auto& row : rows) {
+        for (std::size_t i = 0; i < 4; ++i) {
+            const TCIMValue got = ValueOf(*instances[i], row.fName);
+            EXPECT_EQ(row.fTexts[i], got.ToString(10)) << row.fName << " of instance " << i;
+            if (!got.IsNull()) {
+                EXPECT_EQ(int(row.fServed[i].getType()) + 1, int(got.GetType())) << row.fName << " of instance " << i;
+            }
+        }
+    }
+}
+
 TEST_F(InstanceValuesTest, AReferenceKnowsItsClassWhenThePathSpellsItOut)
 {
     fServed.fModel.addClass(kNsp, Pegasus::CIMClass(CIMName("CIM_Y")));
