@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/base/OwnedPath.h"
 
+#include "pegasus/base/Users.h"
+
 #include <algorithm>
 #include <cerrno>
 #include <climits>
@@ -21,19 +23,7 @@ namespace Pegasus::base {
 
 namespace {
 
-constexpr std::size_t kMaxDatabaseEntryBytes = 64u << 10; // of one user or group
-constexpr int kMaxLinks = 40;                             // as in the kernel
-
-// Returns: the user's name, or the number of an unnamed user.
-std::string userName(uid_t user)
-{
-    std::vector<char> space(kMaxDatabaseEntryBytes);
-    passwd entry = {};
-    passwd* found = nullptr;
-    return ::getpwuid_r(user, &entry, space.data(), space.size(), &found) == 0 && found != nullptr
-               ? found->pw_name
-               : std::to_string(user);
-}
+constexpr int kMaxLinks = 40; // as in the kernel
 
 std::optional<gid_t> primaryGroup(uid_t user)
 {
@@ -83,11 +73,6 @@ bool isPrivateGroup(gid_t group, uid_t user)
     return primaryGroup(user) == group && !hasOtherMembers(group, userName(user)) && !isPrimaryOfAnother(group, user);
 }
 
-bool isTrusted(uid_t user)
-{
-    return user == 0 || user == ::geteuid();
-}
-
 bool mayOthersWrite(const struct stat& info)
 {
     if ((info.st_mode & S_IWOTH) != 0) {
@@ -111,7 +96,7 @@ std::string faultOf(const std::string& path, Part part)
         return {};
     }
     const bool sticky = part == Part::kFolderAbove && (info.st_mode & S_ISVTX) != 0;
-    if (isTrusted(info.st_uid) && (sticky || !mayOthersWrite(info))) {
+    if (isTrustedUser(info.st_uid) && (sticky || !mayOthersWrite(info))) {
         return {};
     }
     char mode[8];

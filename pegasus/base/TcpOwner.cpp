@@ -1,10 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/base/TcpOwner.h"
 
-#include "pegasus/base/TcpTable.h"
-
 #include <netinet/tcp.h>
-#include <unistd.h>
 
 namespace Pegasus::base {
 
@@ -98,11 +95,6 @@ std::optional<uid_t> TcpOwnerLookup::serverOf(int fd)
         return accepted;
     }
     return tcpState(fd) == TCP_ESTABLISHED ? listener : std::nullopt;
-}
-
-bool isTrustedUser(std::optional<uid_t> user)
-{
-    return user && (*user == 0 || *user == ::geteuid());
 }
 
 } // namespace Pegasus::base

@@ -52,7 +52,4 @@ class TcpOwnerLookup
     SocketDiag fKernel;
 };
 
-// Returns: whether a user's process may be talked to: root's and this process's own user's may.
-bool isTrustedUser(std::optional<uid_t> user);
-
 } // namespace Pegasus::base

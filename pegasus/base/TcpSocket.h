@@ -4,6 +4,7 @@
 #include <array>
 #include <cstdint>
 #include <optional>
+#include <string>
 
 #include <sys/types.h>
 
@@ -52,5 +53,9 @@ struct TcpSocketQuery
     // Whether a socket is the one that is asked for. A listener on all addresses is.
     bool matches(const TcpSocketRecord& socket) const;
 };
+
+// Looks a socket up in a table such as /proc/net/tcp, and then in the one of IPv6, with a "6" after its name.
+// Returns: nullopt when the socket is absent from both, or the tables themselves are absent.
+std::optional<TcpSocketRecord> findInTcpTable(const std::string& table, const TcpSocketQuery& query);
 
 } // namespace Pegasus::base

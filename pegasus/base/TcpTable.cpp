@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "pegasus/base/TcpTable.h"
+#include "pegasus/base/TcpSocket.h"
 
 #include <cstdio>
 #include <cstring>

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "pegasus/base/TreeLockFile.h"
 
+#include "pegasus/base/Users.h"
+
 #include <cerrno>
 #include <charconv>
 #include <string_view>
@@ -31,7 +33,7 @@ struct flock wholeFile()
 bool isOwnRegularFile(const Descriptor& file)
 {
     struct stat info = {};
-    return ::fstat(file.get(), &info) == 0 && S_ISREG(info.st_mode) && (info.st_uid == 0 || info.st_uid == ::geteuid());
+    return ::fstat(file.get(), &info) == 0 && S_ISREG(info.st_mode) && isTrustedUser(info.st_uid);
 }
 
 bool isHeld(const Descriptor& file)

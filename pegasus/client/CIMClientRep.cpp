@@ -4,13 +4,13 @@
 #include "pegasus/base/AsciiCase.h"
 #include "pegasus/base/NumberText.h"
 #include "pegasus/base/Text.h"
+#include "pegasus/base/Users.h"
 #include "pegasus/wire/ContentType.h"
 
 #include <Pegasus/Client/CIMClientException.h>
 
 #include <atomic>
 
-#include <pwd.h>
 #include <unistd.h>
 
 namespace Pegasus {
@@ -43,17 +43,6 @@ String toString(std::string_view text)
         }
         return result;
     }
-}
-
-std::string nameOf(uid_t user)
-{
-    char buffer[4096];
-    passwd entry{};
-    passwd* found = nullptr;
-    if (::getpwuid_r(user, &entry, buffer, sizeof(buffer), &found) != 0 || !found) {
-        return std::to_string(user);
-    }
-    return found->pw_name;
 }
 
 void checkHeader(const HttpAnswerFields& fields)
@@ -186,7 +175,7 @@ std::string_view CIMClientRep::localUser()
 {
     const uid_t user = ::geteuid();
     if (!fLocalUser || fLocalUser->first != user) {
-        fLocalUser.emplace(user, nameOf(user));
+        fLocalUser.emplace(user, base::userName(user));
     }
     return fLocalUser->second;
 }

@@ -3,6 +3,7 @@
 
 #include "pegasus/base/TcpOwner.h"
 #include "pegasus/base/Text.h"
+#include "pegasus/base/Users.h"
 
 #include <Pegasus/Common/Exception.h>
 

@@ -2,6 +2,7 @@
 #include "pegasus/server/net/Acceptor.h"
 
 #include "pegasus/base/TcpOwner.h"
+#include "pegasus/base/Users.h"
 #include "pegasus/server/admin/Log.h"
 #include "pegasus/server/net/Listener.h"
 

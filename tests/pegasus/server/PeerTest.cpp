@@ -2,6 +2,7 @@
 // Who may talk to the server: whose process is at the other end of a connection, and what the kernel says when that
 // changes while it is asked.
 #include "pegasus/base/TcpOwner.h"
+#include "pegasus/base/Users.h"
 #include "pegasus/server/net/Listener.h"
 #include "tests/support/TemporaryDirectory.h"
 
