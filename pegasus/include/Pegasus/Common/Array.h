@@ -41,7 +41,7 @@ template <typename T> class PEGASUS_COMMON_LINKAGE Array
     Uint32 size() const noexcept;
     Uint32 getCapacity() const noexcept;
     const T* getData() const noexcept;
-    // Unshares the elements first.
+    // Unshares the elements first. Through a reference that is kept while the array is copied, the copy changes too.
     T& operator[](Uint32 index);
     const T& operator[](Uint32 index) const;
 
