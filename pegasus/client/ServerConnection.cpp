@@ -8,6 +8,7 @@
 #include <Pegasus/Common/Exception.h>
 
 #include <cerrno>
+#include <limits>
 #include <memory>
 #include <system_error>
 
@@ -31,7 +32,10 @@ std::shared_ptr<addrinfo> lookUp(const ServerAddress& address)
     hints.ai_socktype = SOCK_STREAM;
     hints.ai_flags = AI_NUMERICSERV;
     addrinfo* list = nullptr;
-    if (::getaddrinfo(address.host.c_str(), std::to_string(address.port).c_str(), &hints, &list) != 0) {
+    // The resolver would take the lower 16 bits of a number.
+    if (address.port > std::numeric_limits<in_port_t>::max() ||
+        ::getaddrinfo(address.host.c_str(), std::to_string(address.port).c_str(), &hints, &list) != 0)
+    {
         throw InvalidLocatorException(base::fromUtf8Repaired(address.text()));
     }
     return {list, ::freeaddrinfo};

@@ -381,6 +381,9 @@ TEST(ClientConnection, LifeCycle)
         ". Connection failed.";
     EXPECT_EQ(outcome([&] { connect(client, peer); }), refused);
     peer.listen();
+    const Uint32 noPort = 65536u + peer.port();
+    EXPECT_EQ(outcome([&] { client.connect("127.0.0.1", noPort, String(), String()); }),
+              "Pegasus::InvalidLocatorException: Invalid locator: 127.0.0.1:" + std::to_string(noPort));
     connect(client, peer);
     EXPECT_EQ(outcome([&] { connect(client, peer); }), "Pegasus::AlreadyConnectedException: already connected");
     EXPECT_EQ(getClassOutcome(client), "ok");
