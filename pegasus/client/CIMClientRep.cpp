@@ -108,6 +108,9 @@ void CIMClientRep::connect(const client::ServerAddress& address)
     fAddress = address;
     fHost = address.text();
     fLocalUser.reset();
+    if (address.isLocal) {
+        localUser(); // here, where no timeout is promised for the user database
+    }
 }
 
 void CIMClientRep::disconnect()

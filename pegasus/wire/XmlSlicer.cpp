@@ -17,9 +17,9 @@ constexpr std::size_t kPieceBytes = 64UL * 1024;
 // An element that is cut off is offered again when more of it is there, but so often at most: each offer begins from
 // its start.
 constexpr std::size_t kMaxOffers = 4;
-// The most that a tag in an opening has which is expected.
+// The most attributes of a tag in an expected opening.
 constexpr std::size_t kOpeningAttributes = 2;
-// The levels that an element may have which is offered.
+// The most levels of an offered element.
 constexpr std::size_t kOfferedDepth = 8;
 
 } // namespace

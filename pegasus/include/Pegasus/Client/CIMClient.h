@@ -28,8 +28,9 @@ class CIMClientRep;
 // ConnectionTimeoutException; CIMClientMalformedHTTPException, CIMClientHTTPErrorException, CIMClientXmlException,
 // CIMClientResponseException; CIMException with the server's status; InvalidNamespaceNameException (null namespace).
 // Thread: one thread at a time for each client.
-// Blocks: at most the time-out for each call, connecting, sending, waiting and reading together. Only connect() may
-// take longer: looking up a host name is bounded by the resolver's own settings.
+// Blocks: at most the time-out for each call, connecting, sending, waiting and reading together. Only connect() and
+// connectLocal() may take longer: looking up a host name, or the name of the process's user, is bounded by the system's
+// own settings.
 class PEGASUS_CLIENT_LINKAGE CIMClient
 {
   public:
