@@ -48,7 +48,7 @@ EExitStatus Replay(const TOptions& options)
     }
     TDocument document;
     document.fHead = report.GetHead();
-    TCollector collector(*record.fNamespace, losses, [&stop] { return stop.IsStopped(); });
+    TCollector collector(*record.fNamespace, losses, [&] { return stop.IsStopped() || report.HasBrokenOff(); });
     collector.SetSink(options.fCommand->IsStreamed() ? report.BeginStream() : nullptr,
                       options.fCommand->NeedsInstances());
     try {

@@ -39,6 +39,9 @@ class TReport
     // of providers.
     void Fail(const std::exception& reason);
 
+    // Returns: whether the document cannot be written any more, as when its reader has left.
+    bool HasBrokenOff() const { return fBrokeOff; }
+
     // Reports the losses since the document. Requires: the plug-in's work is over.
     // Returns: the document's status when it was written whole, also if an interruption came later.
     EExitStatus Finish();

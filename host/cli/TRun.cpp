@@ -198,7 +198,7 @@ void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
         LearnModules(check);
     }
     const std::string error = ErrorOf([&] {
-        TCollector collector(ns, fLosses, [this] { return fStop.IsStopped(); });
+        TCollector collector(ns, fLosses, [this] { return fStop.IsStopped() || fReport.HasBrokenOff(); });
         collector.SetSink(fOptions.fCommand->IsStreamed() ? fReport.BeginStream() : nullptr,
                           fOptions.fCommand->NeedsInstances());
         collector.SetWatch(&fWatch);
@@ -211,7 +211,7 @@ void TRun::Show(NKOLVRX20::ICIMNamespace& ns)
     if (!error.empty()) {
         fLosses.Add("the inventory is incomplete: " + error);
     }
-    if (!fStop.IsStopped()) {
+    if (!fStop.IsStopped() && !fReport.HasBrokenOff()) {
         FindSilentLosses(check, document);
     }
     if (refused) {

@@ -41,6 +41,7 @@ constexpr TAdviceRow kAdvice[] = {
     {ELossKind::kServer, "server", kReadServerLog},
     {ELossKind::kServerProgram, "server", "stage the tree again: one of the programs in pegasus/bin does not work"},
     {ELossKind::kSchema, "schema", "correct the file at that line and column; docs/mof.md describes the language"},
+    {ELossKind::kNoVendor, "vendors", "put a vendor's folder there; docs/vendors.md has an example"},
     {ELossKind::kClassName, "vendors", "correct the name in the class list: letters, digits and underscores"},
     {ELossKind::kClassList, "vendors", "correct the class list at that line"},
     {ELossKind::kTimeout, "vendors", "write whole seconds, 4294967 at most, in <timeout> or in CLASS[SECONDS]"},

@@ -335,6 +335,12 @@ std::optional<TLoss> LossOfProgram(const NKOLVRX20::TFailedProgram& program, con
                          LossOf(EKind::kServerProgram, "provider brocade is disabled, bcu: " + Cause(program)))
                    : std::nullopt;
     }
+    // The plug-in's list of the vendors' folders, which the server refuses when it is empty.
+    if (program.fName == "cimconfig" && program.fArguments == std::vector<std::string>{"-s", "providerDir="}) {
+        TLoss none = LossOf(EKind::kNoVendor, "there is nothing to show: pegasus/provider has no vendor's folder");
+        none.fIsNote = true;
+        return none;
+    }
     std::string command = program.fName;
     for (const std::string& argument : program.fArguments) {
         command += " " + argument;

@@ -28,6 +28,7 @@ constexpr TWordRow kWords[] = {
     {ELossKind::kServer, "server"},
     {ELossKind::kServerProgram, "server-program"},
     {ELossKind::kSchema, "schema"},
+    {ELossKind::kNoVendor, "no-vendor"},
     {ELossKind::kClassName, "class-name"},
     {ELossKind::kClassList, "class-list"},
     {ELossKind::kTimeout, "timeout"},

@@ -27,6 +27,7 @@ enum class ELossKind
     kServerProgram, // one of the server's programs failed
     kSchema,        // a MOF file did not compile
 
+    kNoVendor,
     kClassName,
     kClassList,
     kTimeout, // of a class list

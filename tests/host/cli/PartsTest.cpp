@@ -149,8 +149,11 @@ const TProgramRow kPrograms[] = {
      "the server did not start, cimserver: exit status 1: in use"},
     {"stop of a stopped server", {"cimserver", {"-s"}, TProcessOutcome::kExited, 1, "", "x"}, nullptr},
     {"text on standard output",
+     {"cimconfig", {"-s", "providerDir=x"}, TProcessOutcome::kExited, 1, "Failed\n", ""},
+     "cimconfig -s providerDir=x failed: exit status 1: Failed"},
+    {"no vendor",
      {"cimconfig", {"-s", "providerDir="}, TProcessOutcome::kExited, 1, "Failed\n", ""},
-     "cimconfig -s providerDir= failed: exit status 1: Failed"},
+     "there is nothing to show: pegasus/provider has no vendor's folder"},
     {"no adapter tool, no adapter", {"bcu", {"-v"}, TProcessOutcome::kNotRun, 2, "", ""}, nullptr},
     {"process list", {"ps", {"-e"}, TProcessOutcome::kNotRun, 2, "", ""}, nullptr},
 };

@@ -170,14 +170,15 @@ TEST_F(VrxhostProgram, SecondHostInOneRootIsRefused)
     EXPECT_EQ(ReadFile(fRoot / "vrxhost.log"), "of the first");
 }
 
-TEST_F(VrxhostProgram, ReaderThatLeavesEarlyIsNoCrash)
+// The fault's class delivers without end.
+TEST_F(VrxhostProgram, ReaderThatLeavesEndsTheRun)
 {
     std::vector<std::string> command = {"/bin/bash", "-c", "\"$0\" \"$@\" | head -c 1; exit ${PIPESTATUS[0]}"};
-    const auto run = Command({"inventory", "--set", "fake.count=5000"});
+    const auto run = Command({"inventory", "--format", "ndjson"}, "slow-class");
     command.insert(command.end(), run.begin(), run.end());
     const auto outcome = Start(command);
     EXPECT_TRUE(HasStatus(outcome, 1));
-    EXPECT_EQ(outcome.fOutput, "P");
+    EXPECT_EQ(outcome.fOutput, "{");
     EXPECT_EQ(outcome.fErrorOutput, "");
     EXPECT_TRUE(IsCleared());
 }
