@@ -62,7 +62,8 @@ std::size_t XmlNodes::read(std::size_t from)
             continue;
         }
         const XmlToken token = next(from);
-        if (token.type == Type::kIncomplete) {
+        const bool mayGoOn = token.type == Type::kText && from + token.size == fSource.text.size();
+        if (token.type == Type::kIncomplete || mayGoOn) {
             break;
         }
         take(token, from);

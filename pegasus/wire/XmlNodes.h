@@ -45,8 +45,8 @@ class XmlNodes
     // Enters the token that next() has just returned.
     void take(const XmlToken& token, std::size_t from);
 
-    // Reads on from `from`, which lies in the root element, to the end of the element or of the text.
-    // Returns: the offset after what was read. The element is complete when depth() is 0.
+    // Reads on from `from`, which lies in the root element, to the end of the element or up to a token that the text
+    // cuts. Returns: the offset after what was read. The element is complete when depth() is 0.
     std::size_t read(std::size_t from);
 
     bool isEmpty() const { return fNodes.empty(); }

@@ -112,7 +112,6 @@ bool XmlSlicer::mayOffer() const
            rest().front() == '<';
 }
 
-// Text may be taken in parts.
 bool XmlSlicer::stepInSlice()
 {
     fRead = fNodes.read(fRead);

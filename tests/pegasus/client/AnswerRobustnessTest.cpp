@@ -30,6 +30,15 @@ std::vector<std::size_t> placesIn(const AnswerCase& answer)
     return places;
 }
 
+std::vector<std::size_t> everyByteOf(const AnswerCase& answer)
+{
+    std::vector<std::size_t> cuts;
+    for (std::size_t at = 1; at < answer.bytes.size(); ++at) {
+        cuts.push_back(at);
+    }
+    return cuts;
+}
+
 std::vector<AnswerCase> allAnswers()
 {
     std::vector<AnswerCase> cases = test::sampleAnswers();
@@ -62,10 +71,6 @@ TEST(AnswerRobustness, AnswerSplitAnywhereIsReadTheSame)
     std::size_t splits = 0;
     for (const AnswerCase& answer : allAnswers()) {
         const std::string whole = readAnswer(answer);
-        std::vector<std::size_t> everyByte;
-        for (std::size_t at = 1; at < answer.bytes.size(); ++at) {
-            everyByte.push_back(at);
-        }
         for (const std::size_t cut : placesIn(answer)) {
             // The same error may name another place.
             const std::string result = readAnswer(answer, {cut});
@@ -73,7 +78,7 @@ TEST(AnswerRobustness, AnswerSplitAnywhereIsReadTheSame)
                 << answer.name << " split at " << cut << ": " << result;
             ++splits;
         }
-        const std::string byByte = readAnswer(answer, everyByte);
+        const std::string byByte = readAnswer(answer, everyByteOf(answer));
         EXPECT_TRUE(byByte == whole || (isRefused(whole) && isRefused(byByte))) << answer.name << ": " << byByte;
     }
     std::printf("counted: %zu answers, split at %zu places\n", allAnswers().size(), splits);
@@ -169,6 +174,8 @@ TEST(AnswerLimits, EachLimitHasAnErrorOfItsOwn)
             found = true;
             EXPECT_NE(readAnswer(answer, {}, limits).find(limit.complaint), std::string::npos)
                 << limit.name << ": " << readAnswer(answer, {}, limits);
+            const std::string byByte = readAnswer(answer, everyByteOf(answer), limits);
+            EXPECT_NE(byByte.find(limit.complaint), std::string::npos) << limit.name << ": " << byByte;
         }
         EXPECT_TRUE(found) << limit.name;
     }
