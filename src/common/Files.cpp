@@ -74,11 +74,7 @@ TFile OpenRegularFile(const std::string& path)
     if (!IsRegularFile(path)) {
         return nullptr;
     }
-    TFile file(std::fopen(path.c_str(), "r"));
-    if (file) {
-        static_cast<void>(::fcntl(::fileno(file.get()), F_SETFD, FD_CLOEXEC));
-    }
-    return file;
+    return TFile(std::fopen(path.c_str(), "re")); // close-on-exec
 }
 
 TFile OpenOwnFile(const std::string& path, std::string& reason)
