@@ -4,6 +4,7 @@
 #include "pegasus/base/LocalSocket.h"
 #include "pegasus/base/TcpOwner.h"
 #include "pegasus/server/ServerSettings.h"
+#include "pegasus/server/admin/ConfigFile.h"
 #include "pegasus/server/admin/Log.h"
 #include "pegasus/server/admin/StopSignal.h"
 #include "pegasus/server/admin/TreeClaim.h"
@@ -132,6 +133,10 @@ void Server::run(LaunchSignal& signal)
     claim.take(fConfig);
     Log::open(fConfig.home(), !fConfig.flag("daemon"));
     Log::setLevel(logLevel(fConfig));
+    for (const std::string& value : fConfig.ignored()) {
+        Log::write(LogLevel::kWarning, "Ignored " + value + " in " + plannedConfigPath(fConfig.home()) +
+                                           ": no such property, or no such value; cimconfig -l lists them.");
+    }
     StopSignal stop;
     // The port first: a server that fails to get it leaves the repository as it is.
     const LocalSocketFile socketFile(fConfig.home());

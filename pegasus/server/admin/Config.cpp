@@ -11,6 +11,8 @@ Config::Config(const std::string& home) : fHome(home)
         const ConfigProperty* property = findConfigProperty(name);
         if (property != nullptr && isValidConfigValue(*property, value, fHome)) {
             fValues[name] = value;
+        } else {
+            fIgnored.push_back(name + "=" + value);
         }
     }
 }

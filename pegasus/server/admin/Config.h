@@ -44,6 +44,8 @@ class Config
     explicit Config(const std::string& home);
 
     const std::string& home() const { return fHome; }
+    // Returns: the planned values that were ignored, as NAME=VALUE.
+    const std::vector<std::string>& ignored() const { return fIgnored; }
 
     // Throws: ConfigError.
     void setFromCommandLine(const std::string& name, const std::string& value);
@@ -76,6 +78,7 @@ class Config
     void requireValid(const std::string& name, const std::string& value) const;
 
     std::string fHome;
+    std::vector<std::string> fIgnored;
     mutable std::mutex fMutex;
     std::atomic<unsigned> fGeneration{1};
     ConfigValues fValues; // only what differs from the table's defaults

@@ -147,6 +147,7 @@ TEST_F(StateTest, aPlannedValueThatIsNoLongerValidGivesWay)
     std::ofstream(plannedConfigPath(fHome)) << "# comment\n\nnoequals\nhttpPort=x\nnope=1\nmaxBodyBytes=7\n";
     EXPECT_EQ(Config(fHome).number("maxBodyBytes"), 7u);
     EXPECT_EQ(Config(fHome).text("httpPort"), "5988");
+    EXPECT_EQ(Config(fHome).ignored(), (std::vector<std::string>{"httpPort=x", "nope=1"})) << "for the log";
 }
 
 TEST_F(StateTest, privateFilesReplaceLinksAndAreReadOnlyIfRegular)
