@@ -94,8 +94,10 @@ void Delivery::warn(const SourcePlace& place, const std::string& text)
 void Delivery::createClass(const CIMClass& newClass, const SourcePlace& place, const OpenFiles& files)
 {
     remember(newClass.getClassName());
+    std::vector<WaitingClass> created; // ends after the lock
     std::unique_lock<std::mutex> lock(fMutex);
     fChanged.wait(lock, [this] { return fWaiting.size() < kMaxWaiting; });
+    created.swap(fCreated);
     if (fFailure) {
         std::rethrow_exception(fFailure);
     }
@@ -132,6 +134,7 @@ void Delivery::createWaiting()
         lock.unlock();
         const std::exception_ptr failure = create(first);
         lock.lock();
+        fCreated.push_back(std::move(fWaiting.front()));
         fWaiting.pop_front();
         if (failure) {
             fFailure = failure;

@@ -12,6 +12,7 @@
 #include <thread>
 #include <unordered_map>
 #include <unordered_set>
+#include <vector>
 
 namespace Pegasus::mof {
 
@@ -80,7 +81,8 @@ class Delivery
 
     std::mutex fMutex; // for the members below
     std::condition_variable fChanged;
-    std::deque<WaitingClass> fWaiting; // the first one is being created
+    std::deque<WaitingClass> fWaiting;  // the first one is being created
+    std::vector<WaitingClass> fCreated; // the compiler, which the server does not wait for, frees their memory
     std::exception_ptr fFailure;
     bool fIsEnding = false;
     std::thread fCreator; // runs createWaiting() from the first class on
