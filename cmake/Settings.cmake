@@ -33,6 +33,14 @@ if(CMAKE_CXX_FLAGS MATCHES "-fsanitize" AND CMAKE_CXX_COMPILER_ID STREQUAL "GNU"
   target_compile_options(vrx_warnings INTERFACE -Wno-maybe-uninitialized)
 endif()
 
+# vrx_seldom_run(TARGET...): code that runs once, or once for each command or file. It is compiled with -O1, which takes up
+# to a third less time than -O2. What works for each instance, value or request stays at -O2.
+function(vrx_seldom_run)
+  foreach(target ${ARGN})
+    target_compile_options(${target} PRIVATE $<$<NOT:$<CONFIG:Debug>>:-O1>)
+  endforeach()
+endfunction()
+
 # A library or program of ours: undefined symbols are link errors. Under a sanitizer they are allowed, because the
 # sanitizer's runtime is in the executable.
 add_library(vrx_strict_link INTERFACE)
