@@ -10,14 +10,28 @@
 #include <unistd.h>
 
 namespace vrxhost {
+namespace {
+
+// By whoever started the program: nohup the hang-up, a shell the ^C of a job in the background. A signal that is
+// blocked and waited for would arrive all the same.
+bool IsIgnored(int number)
+{
+    struct sigaction before = {};
+    return ::sigaction(number, nullptr, &before) == 0 && before.sa_handler == SIG_IGN;
+}
+
+} // namespace
 
 TStopSignals::TStopSignals(const char* erasure, std::function<void()> onFirst)
     : fSentence(std::string(erasure) + "vrxhost: stopping ...\n"), fOnFirst(std::move(onFirst)),
       fEvent(::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK))
 {
     sigemptyset(&fSignals);
-    for (const int number : {SIGINT, SIGTERM, SIGHUP}) {
-        sigaddset(&fSignals, number);
+    sigaddset(&fSignals, SIGTERM);
+    for (const int number : {SIGINT, SIGHUP}) {
+        if (!IsIgnored(number)) {
+            sigaddset(&fSignals, number);
+        }
     }
     pthread_sigmask(SIG_BLOCK, &fSignals, nullptr);
     fSignalThread = std::thread([this] { AwaitSignals(); });
@@ -28,7 +42,7 @@ TStopSignals::~TStopSignals()
 {
     fEnding = true;
     ::eventfd_write(fEvent.Get(), 1);
-    pthread_kill(fSignalThread.native_handle(), SIGHUP); // any of the three wakes it
+    pthread_kill(fSignalThread.native_handle(), SIGTERM); // any of the set wakes it
     fSignalThread.join();
     fFirstThread.join();
 }

@@ -13,8 +13,8 @@
 namespace vrxhost {
 
 // ^C and its relatives (SIGINT, SIGTERM, SIGHUP): the first is announced on standard error and calls a function on a
-// thread of its own, the second ends the process at once. Must be made before any other thread starts, so that all
-// inherit the blocked signals.
+// thread of its own, the second ends the process at once. SIGINT and SIGHUP stay ignored where they are. Must be made
+// before any other thread starts, so that all inherit the blocked signals.
 class TStopSignals
 {
   public:

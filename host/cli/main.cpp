@@ -131,6 +131,7 @@ EExitStatus EndOfHelp()
 EExitStatus Run(TOptions& options)
 {
     std::signal(SIGPIPE, SIG_IGN); // a reader that has gone is a write error here
+    std::signal(SIGXFSZ, SIG_IGN); // and so is a file that may not grow
     if (!options.fReplay.empty()) {
         LoadSettings(options.fConfigFile, options.fSettings); // a record needs none; mistakes are reported all the same
         return Replay(options);

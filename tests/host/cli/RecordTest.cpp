@@ -185,10 +185,11 @@ TEST_F(Record, EveryCommandShowsOfARecordWhatItShowsOfTheMachine)
 
 TEST_F(Record, DocumentThatCannotBeWrittenIsOneSentence)
 {
-    const std::string replay = "exec \"$0\" --replay '" + Make("record") + "' ";
+    const std::string replay = "ulimit -f 1; exec \"$0\" --replay '" + Make("record") + "' ";
     const std::pair<std::string, std::string> rows[] = {
         {"inventory >/dev/full", "the document could not be written: No space left on device"},
         {"inventory >&-", "the document could not be written: Bad file descriptor"}, // not into a file of the run
+        {"--format json inventory >" + (fFolder / "out").string(), "the document could not be written: File too large"},
         {"--help >/dev/full", "standard output could not be written"},
     };
     for (const auto& [arguments, sentence] : rows) {

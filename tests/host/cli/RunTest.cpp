@@ -124,6 +124,11 @@ TEST_F(VrxhostProgram, InterruptionEndsWaitingProgramsAndEnumerations)
         }
     }
     EXPECT_TRUE(fs::exists(fRoot / "shut-down-program-ran"));
+    // As a shell starts a job in the background, and nohup any program.
+    std::vector<std::string> ignoring = {"/bin/sh", "-c", "trap '' INT; exec \"$0\" \"$@\""};
+    const auto run = Command({"inventory", "--deadline", "1"}, "interrupt-enumeration");
+    ignoring.insert(ignoring.end(), run.begin(), run.end());
+    EXPECT_TRUE(HasStatus(Start(ignoring), 3)) << "the deadline ends it";
 }
 
 // What was delivered before the deadline is shown, and every format says that it is not all.
