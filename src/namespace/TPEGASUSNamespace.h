@@ -4,6 +4,7 @@
 #include "src/common/ClientConnection.h"
 #include "src/namespace/ServerTree.h"
 #include "src/schema/NamedMap.h"
+#include "src/schema/QualifierValues.h"
 
 #include <host/ICIMNamespace.h>
 
@@ -184,6 +185,8 @@ class TPEGASUSNamespace : public ICIMNamespace,
     void AddQualifierDecl(boost::shared_ptr<TPEGASUSQualifierDecl> declaration);
     // Returns: this namespace's own declaration; null when absent. Throws: TVRXException 25.
     boost::shared_ptr<TPEGASUSQualifierDecl> FindQualifierDecl(const std::string& name) const;
+    // Returns: the values that the classes share.
+    TQualifierValues& GetQualifierValues() { return fQualifierValues; }
     // Returns: the class "<root>"; null before Initialize.
     boost::shared_ptr<TPEGASUSClass> GetRootClass() const { return fRootClass; }
     // Whether AddClass and AddQualifierDecl replace what is there; off at first.
@@ -223,6 +226,7 @@ class TPEGASUSNamespace : public ICIMNamespace,
     std::vector<boost::shared_ptr<TPEGASUSProvider>> fProviders; // in discovery order
     TNamedMap<TPEGASUSClass> fClasses;
     TNamedMap<TPEGASUSQualifierDecl> fQualifierDecls;
+    TQualifierValues fQualifierValues;
     bool fAllowRedefinition = false;
     unsigned int fSuperClassDepth = 0; // of the chain that GetClass is following
 };

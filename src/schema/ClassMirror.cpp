@@ -45,11 +45,14 @@ template <typename TStep> void Guarded(const char* failureText, const std::strin
 
 } // namespace
 
-TClassMirror::TClassMirror(TPEGASUSClass& target) : fTarget(target), fNamespace(target.GetOwningNamespace()) {}
+TClassMirror::TClassMirror(TPEGASUSClass& target)
+    : fTarget(target), fNamespace(target.GetOwningNamespace()), fValues(fNamespace.GetQualifierValues())
+{
+}
 
 void TClassMirror::Mirror(const Pegasus::CIMClass& source)
 {
-    MirrorQualifiers(source, fTarget, kClassFailure, fTarget.GetName({}));
+    MirrorQualifiers(source, fTarget, fValues.On(""), kClassFailure, fTarget.GetName({}));
     for (Pegasus::Uint32 i = 0; i < source.getPropertyCount(); ++i) {
         const Pegasus::CIMConstProperty property = source.getProperty(i);
         const std::string name = NameOf(property);
@@ -63,16 +66,17 @@ void TClassMirror::Mirror(const Pegasus::CIMClass& source)
 }
 
 template <typename TSource, typename TElement>
-void TClassMirror::MirrorQualifiers(const TSource& source, TElement& element, const char* failureText,
-                                    const std::string& name)
+void TClassMirror::MirrorQualifiers(const TSource& source, TElement& element, TQualifierValues::TElement& values,
+                                    const char* failureText, const std::string& name)
 {
     for (Pegasus::Uint32 i = 0; i < source.getQualifierCount(); ++i) {
-        Guarded(failureText, name, [&] { MirrorQualifier(source.getQualifier(i), element); });
+        Guarded(failureText, name, [&] { MirrorQualifier(source.getQualifier(i), element, values); });
     }
 }
 
 template <typename TElement>
-void TClassMirror::MirrorQualifier(const Pegasus::CIMConstQualifier& source, TElement& element)
+void TClassMirror::MirrorQualifier(const Pegasus::CIMConstQualifier& source, TElement& element,
+                                   TQualifierValues::TElement& values)
 {
     TQualifierKind& kind = KindOf(source.getName());
     if (!kind.fDeclaration) {
@@ -83,7 +87,7 @@ void TClassMirror::MirrorQualifier(const Pegasus::CIMConstQualifier& source, TEl
         kind.fFlavor = FlavorFromText(ToStdString(kind.fServedFlavor.toString()));
     }
     const auto qualifier = boost::make_shared<TPEGASUSQualifier>(element.shared_from_this(), kind.fDeclaration,
-                                                                 ValueOf(source), kind.fFlavor);
+                                                                 SharedValueOf(source, values), kind.fFlavor);
     qualifier->SetPropagated(source.getPropagated() != 0);
     element.EnterQualifier(kind.fKey, qualifier);
 }
@@ -97,12 +101,30 @@ template <typename TSource> TCIMValue TClassMirror::ValueOf(const TSource& sourc
     return value;
 }
 
+TCIMValue TClassMirror::SharedValueOf(const Pegasus::CIMConstQualifier& source,
+                                      TQualifierValues::TElement& values) const
+{
+    TConvertedValue& last = values.Of(source.getName());
+    if (!last.IsOf(source.getValue())) {
+        const TCIMValue value = ValueOf(source);
+        last.Keep(source.getValue(), source.getType(), value);
+        return value;
+    }
+    return last.Get();
+}
+
 // Throws: TVRXException 25, after a log line, for an invalid name.
 TClassMirror::TQualifierKind& TClassMirror::KindOf(const Pegasus::CIMName& qualifier)
 {
     const Pegasus::String& served = qualifier.getString();
-    const auto known = std::find_if(fKinds.begin(), fKinds.end(),
-                                    [&](const TQualifierKind& kind) { return IsSameText(kind.fServed, served); });
+    // Names of one answer are most often the very same text.
+    auto known = std::find_if(fKinds.begin(), fKinds.end(), [units = served.getChar16Data()](const auto& kind) {
+        return kind.fServed.getChar16Data() == units;
+    });
+    if (known == fKinds.end()) {
+        known = std::find_if(fKinds.begin(), fKinds.end(),
+                             [&](const TQualifierKind& kind) { return kind.fServed == served; });
+    }
     if (known != fKinds.end()) {
         return *known;
     }
@@ -167,7 +189,7 @@ void TClassMirror::MirrorProperty(const Pegasus::CIMConstProperty& source, const
     if (type.IsArray() || !defaultValue.IsNull()) {
         declaration->SetDefaultValue(defaultValue, {});
     }
-    MirrorQualifiers(source, *declaration, kPropertyFailure, name);
+    MirrorQualifiers(source, *declaration, fValues.On(name), kPropertyFailure, name);
     // After its qualifiers, because they decide how the class takes the declaration.
     if (declaration->GetQualifier(kOverrideQualifier, {})) {
         fTarget.AdoptPropertyDecl(name);
@@ -182,7 +204,7 @@ void TClassMirror::MirrorMethod(const Pegasus::CIMConstMethod& source, const std
 {
     const auto method = boost::dynamic_pointer_cast<TPEGASUSMethodDecl>(
         fTarget.AllocateMethodDecl(name, pegTypeToVRXType(source.getType(), false), {}));
-    MirrorQualifiers(source, *method, kMethodFailure, name);
+    MirrorQualifiers(source, *method, fValues.On(name), kMethodFailure, name);
     for (Pegasus::Uint32 i = 0; i < source.getParameterCount(); ++i) {
         Guarded(kMethodFailure, name, [&] { MirrorParameter(source.getParameter(i), *method); });
     }
@@ -191,9 +213,11 @@ void TClassMirror::MirrorMethod(const Pegasus::CIMConstMethod& source, const std
 
 void TClassMirror::MirrorParameter(const Pegasus::CIMConstParameter& source, TPEGASUSMethodDecl& method)
 {
+    const std::string name = NameOf(source);
+    const std::string methodName = method.GetName({});
     const auto parameter = boost::static_pointer_cast<TPEGASUSParameterDecl>(
-        method.AllocateParameterDecl(NameOf(source), pegTypeToVRXType(source.getType(), source.isArray()), {}));
-    MirrorQualifiers(source, *parameter, kMethodFailure, method.GetName({}));
+        method.AllocateParameterDecl(name, pegTypeToVRXType(source.getType(), source.isArray()), {}));
+    MirrorQualifiers(source, *parameter, fValues.On(methodName + '.' + name), kMethodFailure, methodName);
     parameter->AddToMethod({});
 }
 

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "src/schema/QualifierValues.h"
+
 #include <Pegasus/Client/CIMClient.h>
 #include <host/ICIMQualifierDecl.h>
 #include <host/TCIMValue.h>
@@ -41,10 +43,14 @@ class TClassMirror
         ICIMQualifierDecl::EFlavor fFlavor = ICIMQualifierDecl::kFlavorNone;
     };
 
-    // The failure's text and the name are how the log names the element.
+    // The failure's text and the name are how the log names the element; the values are those of elements of its name.
     template <typename TSource, typename TElement>
-    void MirrorQualifiers(const TSource& source, TElement& element, const char* failureText, const std::string& name);
-    template <typename TElement> void MirrorQualifier(const Pegasus::CIMConstQualifier& source, TElement& element);
+    void MirrorQualifiers(const TSource& source, TElement& element, TQualifierValues::TElement& values,
+                          const char* failureText, const std::string& name);
+    template <typename TElement>
+    void MirrorQualifier(const Pegasus::CIMConstQualifier& source, TElement& element,
+                         TQualifierValues::TElement& values);
+    TCIMValue SharedValueOf(const Pegasus::CIMConstQualifier& source, TQualifierValues::TElement& values) const;
     TQualifierKind& KindOf(const Pegasus::CIMName& qualifier);
     void MirrorProperty(const Pegasus::CIMConstProperty& source, const std::string& name);
     void MirrorMethod(const Pegasus::CIMConstMethod& source, const std::string& name);
@@ -56,6 +62,7 @@ class TClassMirror
 
     TPEGASUSClass& fTarget;
     const TOwningNamespace& fNamespace;
+    TQualifierValues& fValues;
     std::vector<TQualifierKind> fKinds; // a class has few, on many elements
 };
 

@@ -48,12 +48,6 @@ std::string LoggedName(const Pegasus::CIMConstProperty& property)
     return IsCimName(normalized) ? normalized : name;
 }
 
-// Equal reals and datetimes can differ: 0 and -0, and one time in two time zones. A reference depends on its instance.
-bool IsTheSameWhenEqual(Pegasus::CIMType type)
-{
-    return type <= Pegasus::CIMTYPE_SINT64 || type == Pegasus::CIMTYPE_CHAR16 || type == Pegasus::CIMTYPE_STRING;
-}
-
 // Servers disagree on the width of a slot's number; the host knows it as 16 bits.
 void Narrow(TPEGASUSInstance& target, const std::string& name)
 {
@@ -96,18 +90,17 @@ boost::shared_ptr<ICIMClass> TInstanceBuilder::ReferencedClass(const Pegasus::CI
     return name ? fClass.GetOwningNamespace().GetClass(*name, {{kNspKey, fClass.GetPegasusNSPStr()}}) : nullptr;
 }
 
-// Requires: a value. Throws: what ToHostValue throws.
-TCIMValue TInstanceBuilder::Converted(const Pegasus::CIMConstProperty& property, TMember& member) const
+// Throws: what ToHostValue throws.
+TCIMValue TInstanceBuilder::Converted(const Pegasus::CIMValue& served, Pegasus::CIMType type, bool isArray,
+                                      TMember& member) const
 {
-    const Pegasus::CIMValue& served = property.getValue();
-    if (!member.fServedValue.isNull() && served == member.fServedValue) {
-        return member.fValue;
+    if (member.fFirst.IsOf(served)) {
+        return member.fFirst.Get();
     }
     TCIMValue value;
-    ToHostValue(served, property.getType(), property.isArray(), &fClass, value);
-    if (member.fServedValue.isNull() && IsTheSameWhenEqual(property.getType())) {
-        member.fServedValue = served;
-        member.fValue = value;
+    ToHostValue(served, type, isArray, &fClass, value);
+    if (!member.fFirst.IsKept()) {
+        member.fFirst.Keep(served, type, value);
     }
     return value;
 }
@@ -115,10 +108,11 @@ TCIMValue TInstanceBuilder::Converted(const Pegasus::CIMConstProperty& property,
 TCIMValue TInstanceBuilder::Value(const Pegasus::CIMInstance& source, TMember& member,
                                   const Pegasus::CIMConstProperty& property) const
 {
-    const auto referenced = property.getType() == Pegasus::CIMTYPE_REFERENCE
-                                ? ReferencedClass(source, member.fServerName)
-                                : boost::shared_ptr<ICIMClass>();
-    TCIMValue value = property.getValue().isNull() ? TCIMValue() : Converted(property, member);
+    const Pegasus::CIMValue& served = property.getValue();
+    const Pegasus::CIMType type = property.getType();
+    const auto referenced = type == Pegasus::CIMTYPE_REFERENCE ? ReferencedClass(source, member.fServerName)
+                                                               : boost::shared_ptr<ICIMClass>();
+    TCIMValue value = served.isNull() ? TCIMValue() : Converted(served, type, property.isArray(), member);
     if (referenced) {
         value.SetReferencedClass(referenced);
     }

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include "src/instance/ConvertedValue.h"
 #include "src/schema/TPEGASUSClass.h"
 
 #include <Pegasus/Client/CIMClient.h>
@@ -33,13 +34,12 @@ class TInstanceBuilder
     // A property by its place: its name, what follows from it, and its first value.
     struct TMember
     {
-        Pegasus::String fServed;        // as it came
-        std::string fServerName;        // the same text
-        std::string fKey;               // normalised
-        bool fIsInstanceId = false;     // its value is never null
-        bool fIsSlotNumber = false;     // its value is 16 bits wide
-        Pegasus::CIMValue fServedValue; // the first one of a type that is compared; null before
-        TCIMValue fValue;               // the same value, converted
+        Pegasus::String fServed;    // as it came
+        std::string fServerName;    // the same text
+        std::string fKey;           // normalised
+        bool fIsInstanceId = false; // its value is never null
+        bool fIsSlotNumber = false; // its value is 16 bits wide
+        TConvertedValue fFirst;     // its first value
     };
 
     TMember& MemberAt(Pegasus::Uint32 place, const Pegasus::String& served);
@@ -47,7 +47,7 @@ class TInstanceBuilder
                   TPEGASUSInstance& target);
     TCIMValue Value(const Pegasus::CIMInstance& source, TMember& member,
                     const Pegasus::CIMConstProperty& property) const;
-    TCIMValue Converted(const Pegasus::CIMConstProperty& property, TMember& member) const;
+    TCIMValue Converted(const Pegasus::CIMValue& served, Pegasus::CIMType type, bool isArray, TMember& member) const;
     boost::shared_ptr<ICIMClass> ReferencedClass(const Pegasus::CIMInstance& source, const std::string& property) const;
 
     TPEGASUSClass& fClass;

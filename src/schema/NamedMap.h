@@ -18,9 +18,11 @@ template <typename TElement> class TNamedMap
     using TPointer = boost::shared_ptr<TElement>;
 
     // Returns: null when the name is absent.
-    TPointer Find(const std::string& name) const
+    TPointer Find(const std::string& name) const { return FindAs(NormalizedName(name)); }
+    // Requires: a normalised name.
+    TPointer FindAs(const std::string& key) const
     {
-        const auto entry = fElements.find(NormalizedName(name));
+        const auto entry = fElements.find(key);
         return entry == fElements.end() ? nullptr : entry->second;
     }
 

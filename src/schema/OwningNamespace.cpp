@@ -64,4 +64,9 @@ void TOwningNamespace::AddQualifierDecl(const boost::shared_ptr<TPEGASUSQualifie
     Lock()->AddQualifierDecl(declaration);
 }
 
+TQualifierValues& TOwningNamespace::GetQualifierValues() const
+{
+    return Lock()->GetQualifierValues();
+}
+
 } // namespace NKOLVRX20

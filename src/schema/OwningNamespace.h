@@ -14,6 +14,7 @@ namespace NKOLVRX20 {
 class TPEGASUSClass;
 class TPEGASUSNamespace;
 class TPEGASUSQualifierDecl;
+class TQualifierValues;
 
 // The link from a class, or a qualifier declaration, back to its namespace, with all that it asks of the namespace. The
 // one place in this folder that knows the namespace's class.
@@ -45,6 +46,9 @@ class TOwningNamespace
     boost::shared_ptr<TPEGASUSQualifierDecl> FindQualifierDecl(const std::string& name) const;
     // Throws: TVRXException 16, 25.
     void AddQualifierDecl(const boost::shared_ptr<TPEGASUSQualifierDecl>& declaration) const;
+
+    // Returns: the values that the namespace's classes share; they live as long as it.
+    TQualifierValues& GetQualifierValues() const;
 
   private:
     boost::shared_ptr<TPEGASUSNamespace> Lock() const;

@@ -194,11 +194,10 @@ class TPEGASUSClass : public TQualifiedElement<TPEGASUSClass, ICIMClass>
     void EnterProperty(const boost::shared_ptr<ICIMPropertyDecl>& declaration, const TCIMValue& value, bool propagated);
 
   private:
-    // The existing declaration, of the same name, may be null.
-    void OverridePropertyDecl(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing,
-                              const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration);
-    void AddNewPropertyDecl(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing,
-                            const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration);
+    // The existing declaration, of the same name, may be null. Both throw what AddPropertyDecl throws.
+    void CheckOverride(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing,
+                       const TPEGASUSPropertyDecl& declaration) const;
+    void CheckNewPropertyDecl(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing, const std::string& name) const;
     [[noreturn]] void RefuseOverride(const std::string& name, const char* reason, unsigned int status) const;
 
     boost::weak_ptr<TPEGASUSClass> fSuperClass;

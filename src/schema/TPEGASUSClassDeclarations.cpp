@@ -2,6 +2,7 @@
 // The properties and methods that a class declares, and the rules for adding one.
 #include "src/common/Constants.h"
 #include "src/common/CoreLog.h"
+#include "src/common/Names.h"
 #include "src/schema/TPEGASUSClass.h"
 #include "src/schema/TPEGASUSMethodDecl.h"
 #include "src/schema/TPEGASUSProperty.h"
@@ -93,65 +94,51 @@ void TPEGASUSClass::AddPropertyDecl(boost::shared_ptr<ICIMPropertyDecl> declarat
         LogFailure("TPEGASUS: Attempt to add reference property ", name, " to non-association class ", fName);
         throw TVRXException(TVRXStatusCode::kReferenceInNonAssociation);
     }
-    const auto existing = fPropertyDecls.Find(name);
+    const std::string key = NormalizedName(name);
+    const auto existing = fPropertyDecls.FindAs(key);
     if (!own->GetQualifier(kOverrideQualifier, {})) {
-        AddNewPropertyDecl(existing, own);
-        return;
+        CheckNewPropertyDecl(existing, name);
+    } else {
+        CheckOverride(existing, *own);
     }
-    try {
-        OverridePropertyDecl(existing, own);
-    } catch (const TVRXException& exception) {
-        // The second line of a refusal. Log readers know its text, with "failed" close to the class name.
-        if (exception.GetStatusCode() == TVRXStatusCode::kUnknownProperty) {
-            throw;
-        }
-        LogFailure("TPEGASUS: Attempt define property ", name, " in class ", fName,
-                   "failed. Reason = ", exception.what());
-        throw TVRXException(exception.GetStatusCode());
-    }
+    fPropertyDecls.PutAs(key, own);
 }
 
-// When the declaration to override is missing, the new one is logged and added all the same: vendors' MOF has such
-// classes.
-void TPEGASUSClass::OverridePropertyDecl(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing,
-                                         const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration)
+void TPEGASUSClass::CheckOverride(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing,
+                                  const TPEGASUSPropertyDecl& declaration) const
 {
-    const std::string name = declaration->GetName({});
-    if (!existing) {
+    const std::string name = declaration.GetName({});
+    if (!existing) { // vendors' MOF has such classes
         LogFailure("TPEGASUS: Attempt to override property ", name, " in class ", fName,
                    ": property doesn't exist in base class");
-        AddNewPropertyDecl(existing, declaration);
-        return;
-    }
-    if (existing->GetType({}) != declaration->GetType({})) {
+    } else if (existing->GetType({}) != declaration.GetType({})) {
         RefuseOverride(name, ": different types", TVRXStatusCode::kTypeMismatch);
-    }
-    if (existing->GetClass({}) == shared_from_this()) {
+    } else if (existing->GetClass({}).get() == this) {
         RefuseOverride(name, ": original was defined in this class", TVRXStatusCode::kAlreadyExists);
     }
-    fPropertyDecls.Put(name, declaration);
 }
 
+// Log readers know the second line's text, with "failed" close to the class name.
 void TPEGASUSClass::RefuseOverride(const std::string& name, const char* reason, unsigned int status) const
 {
     LogFailure("TPEGASUS: Attempt to override property ", name, " in class ", fName, reason);
-    throw TVRXException(status);
+    const TVRXException refusal(status);
+    LogFailure("TPEGASUS: Attempt define property ", name, " in class ", fName, "failed. Reason = ", refusal.what());
+    throw refusal;
 }
 
-void TPEGASUSClass::AddNewPropertyDecl(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing,
-                                       const boost::shared_ptr<TPEGASUSPropertyDecl>& declaration)
+void TPEGASUSClass::CheckNewPropertyDecl(const boost::shared_ptr<TPEGASUSPropertyDecl>& existing,
+                                         const std::string& name) const
 {
-    const std::string name = declaration->GetName({});
     const bool isRepeatable = name.find(kRepeatableName) != std::string::npos;
     if (existing && !isRepeatable) {
         LogFailure("TPEGASUS: Attempt to add property ", name, " to class ", fName, ": already exists");
         throw TVRXException(TVRXStatusCode::kAlreadyExists);
     }
-    fPropertyDecls.Put(name, declaration);
 }
 
 // An override needs something to override, but a new class starts with an empty map. The superclass's declaration is
-// shared and keeps its owner, by which OverridePropertyDecl knows that it was inherited.
+// shared and keeps its owner, by which CheckOverride knows that it was inherited.
 void TPEGASUSClass::AdoptPropertyDecl(const std::string& name)
 {
     const auto superClass = fSuperClass.lock();

@@ -125,6 +125,31 @@ TEST_F(ClassMirrorTest, AQualifierKeepsItsValueFlavorAndOrigin)
     EXPECT_EQ(TDecl::kScopeProperty | TDecl::kScopeMethod, declaration->GetScope({}));
 }
 
+// Equal values are shared behind the scenes.
+TEST_F(ClassMirrorTest, EachClassHasTheQualifierValuesThatTheServerGaveForIt)
+{
+    const char* const served[] = {"x", "x", "y", "x"};
+    const auto name = [](std::size_t i) { return "CIM_" + std::to_string(i); };
+    for (std::size_t i = 0; i < 4; ++i) {
+        Pegasus::CIMClass source(CIMName(name(i).c_str()));
+        source.addQualifier(TextQualifier("Override", name(i).c_str()));
+        source.addProperty(
+            Property("P", CIMValue(Pegasus::Uint8(1))).addQualifier(TextQualifier("Override", served[i])));
+        source.addProperty(Property("Q", CIMValue(Pegasus::Uint8(1))).addQualifier(TextQualifier("Override", "q")));
+        fServed.fModel.addClass(kNsp, source);
+    }
+    const auto qualifier = [&](std::size_t i, const char* property) {
+        return fServed.Class(name(i))->GetPropertyDecl(property, {})->GetQualifier("Override", {});
+    };
+    qualifier(0, "P")->SetValue(TCIMValue("changed"), {}); // before the other classes are asked for
+    const char* const expected[] = {"changed", "x", "y", "x"};
+    for (std::size_t i = 0; i < 4; ++i) {
+        EXPECT_EQ(TCIMValue(expected[i]), qualifier(i, "P")->GetValue({})) << i;
+        EXPECT_EQ(TCIMValue("q"), qualifier(i, "Q")->GetValue({})) << i;
+        EXPECT_EQ(TCIMValue(name(i)), fServed.Class(name(i))->GetQualifier("Override", {})->GetValue({})) << i;
+    }
+}
+
 TEST_F(ClassMirrorTest, AQualifierHasAFlavorOfItsOwnOnEachElement)
 {
     using Pegasus::CIMFlavor;
