@@ -1,17 +1,21 @@
 // SPDX-License-Identifier: MIT
 #include "host/cli/losses/TServerLog.h"
 
-#include <filesystem>
+#include <algorithm>
 #include <fstream>
+
+#include <sys/stat.h>
 
 namespace vrxhost {
 namespace {
 
-std::uintmax_t SizeOf(const std::string& path)
+struct stat StatusOf(const std::string& path)
 {
-    std::error_code error;
-    const std::uintmax_t size = std::filesystem::file_size(path, error);
-    return error ? 0 : size;
+    struct stat status = {};
+    if (::stat(path.c_str(), &status) != 0) {
+        status = {};
+    }
+    return status;
 }
 
 // "provider module \"NAME\": ..." is the module's own; "... provider module NAME: ..." reports its end.
@@ -36,17 +40,36 @@ bool IsOutputOf(const std::string& module, const std::string& text)
 
 } // namespace
 
-TServerLog::TServerLog(const std::string& root) : fPath(root + "/pegasus/cimserver.log"), fStart(SizeOf(fPath)) {}
+TServerLog::TServerLog(const std::string& root) : fPath(root + "/pegasus/cimserver.log")
+{
+    const struct stat status = StatusOf(fPath);
+    fFile = status.st_ino;
+    fStart = status.st_size;
+}
 
+// A full log was put aside during the run when another file is at its path.
 std::vector<TServerLogLine> TServerLog::Read() const
 {
-    const std::uintmax_t size = SizeOf(fPath);
-    std::uintmax_t start = size < fStart ? 0 : fStart; // a full log was put aside, and a new one begun
-    start = size - start > kMaxBytes ? size - kMaxBytes : start;
-    std::ifstream file(fPath, std::ios::binary);
-    file.seekg(static_cast<std::streamoff>(start));
     std::vector<TServerLogLine> lines;
-    for (std::string line; std::getline(file, line);) {
+    const std::string aside = fPath + ".1";
+    const bool isSame = fFile == 0 || StatusOf(fPath).st_ino == fFile;
+    if (!isSame && StatusOf(aside).st_ino == fFile) {
+        Append(lines, aside, fStart);
+    }
+    Append(lines, fPath, isSame ? fStart : 0);
+    return lines;
+}
+
+void TServerLog::Append(std::vector<TServerLogLine>& lines, const std::string& path, off_t start)
+{
+    const off_t last = StatusOf(path).st_size - static_cast<off_t>(kMaxBytes);
+    std::ifstream file(path, std::ios::binary);
+    file.seekg(std::max(start, last));
+    std::string line;
+    if (last > start) {
+        std::getline(file, line); // the rest of one that is left out
+    }
+    while (std::getline(file, line)) {
         const std::size_t process = line.find("] "); // "TIME [PROCESS] SEVERITY: TEXT"
         const std::string text = process == std::string::npos ? line : line.substr(process + 2);
         const std::string module = ModuleOf(text);
@@ -54,7 +77,6 @@ std::vector<TServerLogLine> TServerLog::Read() const
             lines.push_back({module, text, IsOutputOf(module, text)});
         }
     }
-    return lines;
 }
 
 } // namespace vrxhost

@@ -1,9 +1,11 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <cstdint>
+#include <cstddef>
 #include <string>
 #include <vector>
+
+#include <sys/types.h>
 
 namespace vrxhost {
 
@@ -28,8 +30,11 @@ class TServerLog
     std::vector<TServerLogLine> Read() const;
 
   private:
+    static void Append(std::vector<TServerLogLine>& lines, const std::string& path, off_t start);
+
     const std::string fPath;
-    std::uintmax_t fStart = 0; // bytes
+    ino_t fFile = 0;  // that was at the path then; 0: none
+    off_t fStart = 0; // its size
 };
 
 } // namespace vrxhost

@@ -314,6 +314,11 @@ TEST(TServerLog, WhatAProviderPrintsCausesNoLoss)
     losses.AddServerLog(log.Read(), {{"fans", "fan"}});
     EXPECT_EQ(losses.GetLosses().size(), 3U);
     EXPECT_EQ(log.Read().size(), 9U) << "all of them explain a loss";
+    const TServerLog later(root);
+    std::ofstream(root / "pegasus/cimserver.log", std::ios::app) << "warning: provider module \"a\": before\n";
+    fs::rename(root / "pegasus/cimserver.log", root / "pegasus/cimserver.log.1"); // it is full
+    std::ofstream(root / "pegasus/cimserver.log") << "warning: provider module \"b\": after\n";
+    EXPECT_EQ(later.Read().size(), 2U);
     fs::remove_all(root);
 }
 
