@@ -20,19 +20,25 @@ ClassStore::ClassStore(std::mutex& mutex, Storage& storage, const ObjectEncoder&
 ResolvedClass ClassStore::resolve(NamespaceId nameSpace, const CIMName& name)
 {
     const std::string key = nameKey(name);
+    ResolvedClass cached;
     std::optional<std::string> text;
     {
         const Lock lock(fMutex);
-        ResolvedClass cached = fCache.find(nameSpace, key);
-        if (cached.depth != 0) {
+        cached = fCache.find(nameSpace, key);
+        if (!cached.whole.isUninitialized()) {
             return cached;
         }
-        text = fStorage.findClass(nameSpace, key);
+        if (cached.depth == 0) {
+            text = fStorage.findClass(nameSpace, key);
+        }
     }
-    if (!text) {
-        return ResolvedClass();
+    CIMClass local = cached.created;
+    if (cached.depth == 0) {
+        if (!text) {
+            return ResolvedClass();
+        }
+        local = withEmbeddedTypes(ObjectDecoder(fEncoder).decodeClass(std::move(*text)));
     }
-    const CIMClass local = withEmbeddedTypes(ObjectDecoder(fEncoder).decodeClass(std::move(*text)));
     const CIMName& superName = local.getSuperClassName();
     const ResolvedClass superClass = superName.isNull() ? ResolvedClass() : resolve(nameSpace, superName);
     ResolvedClass found{resolveClass(local, superClass.whole), superClass.depth + 1};
@@ -108,14 +114,13 @@ void ClassStore::create(NamespaceId nameSpace, const CIMConstClass& newClass, co
     const ResolvedClass superClass = superClassFor(nameSpace, newClass);
     const CIMClass local = checkClass(newClass, superClass.whole, lookup);
     const std::string text = fEncoder.encodeClass(local);
-    const ResolvedClass created{resolveClass(local, superClass.whole), superClass.depth + 1};
     const std::string name = base::utf8(local.getClassName());
     const Lock lock(fMutex);
     if (!fStorage.insertClass(nameSpace, name, base::utf8(local.getSuperClassName()), text)) {
         fail(CIM_ERR_ALREADY_EXISTS, name); // another thread was faster
     }
     // Into the cache at once: a compiler creates subclasses of it next.
-    fCache.insert(nameSpace, nameKey(local.getClassName()), created);
+    fCache.insert(nameSpace, nameKey(local.getClassName()), {CIMClass(), superClass.depth + 1, local});
 }
 
 } // namespace Pegasus::repository

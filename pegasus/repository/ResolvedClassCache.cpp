@@ -37,7 +37,10 @@ ResolvedClass ResolvedClassCache::find(NamespaceId nameSpace, const std::string&
 void ResolvedClassCache::insert(NamespaceId nameSpace, const std::string& nameKey, const ResolvedClass& resolved)
 {
     std::string key = keyOf(nameSpace, nameKey);
-    if (fByKey.count(key) != 0) {
+    if (Entry* const entry = touch(key)) {
+        if (entry->resolved.whole.isUninitialized()) {
+            entry->resolved = resolved;
+        }
         return;
     }
     fEntries.push_front(Entry{std::move(key), resolved, {}});

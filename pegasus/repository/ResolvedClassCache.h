@@ -15,8 +15,11 @@ namespace Pegasus::repository {
 // A class with everything that it inherits.
 struct ResolvedClass
 {
-    CIMClass whole;        // uninitialised: the class is absent
-    std::size_t depth = 0; // 1 for a root class
+    CIMClass whole;
+    std::size_t depth = 0; // 1 for a root class, 0 for a class that is absent
+    // The class as it was created, in place of `whole` until somebody asks for it. Most classes of a schema have no
+    // subclass, and few of them are read.
+    CIMClass created = CIMClass();
 };
 
 // Resolved classes, at most so many; the least recently used one is dropped first. Each keeps the encoded forms that
@@ -28,7 +31,7 @@ class ResolvedClassCache
     explicit ResolvedClassCache(std::size_t capacity) : fCapacity(capacity) {}
 
     ResolvedClass find(NamespaceId nameSpace, const std::string& nameKey);
-    // Keeps the class, unless the cache has it.
+    // Keeps the class, unless the cache has the whole of it.
     void insert(NamespaceId nameSpace, const std::string& nameKey, const ResolvedClass& resolved);
     // Returns: the class as a CLASS element, if keepText() got it; null else.
     // Requires: the options have no property list.
