@@ -205,7 +205,7 @@ void ResponseReader::checkDeadline() const
     }
 }
 
-// After an element was decoded, and before the slicer goes on.
+// After an object was decoded, and before the next one is.
 void ResponseReader::checkDecodedBytes() const
 {
     const std::size_t limit = fDecoder.limits().maxDecodedBytes;
@@ -231,6 +231,7 @@ void ResponseReader::readError(const XmlElement& element)
     Array<CIMInstance> instances;
     for (XmlElement child = element.firstChild(); child; child = child.nextSibling()) {
         instances.append(fDecoder.decodeInstance(child));
+        checkDecodedBytes();
     }
     fError = CIMException(static_cast<CIMStatusCode>(*code), description, instances);
 }

@@ -147,6 +147,9 @@ std::string readAnswer(const AnswerCase& answer, const std::vector<std::size_t>&
     if (reader.error()) {
         out += "error " + std::to_string(reader.error()->getCode()) + " " +
                std::string(reader.error()->getMessage().getCString());
+        if (reader.error()->getErrorCount() > 0) {
+            out += " with " + std::to_string(reader.error()->getErrorCount());
+        }
     }
     return out;
 }
@@ -178,7 +181,8 @@ std::vector<AnswerCase> sampleAnswers()
         sample("error element", "GetClass",
                httpAnswer("<?xml version=\"1.0\" encoding=\"utf-8\" ?>\n<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">"
                           "<MESSAGE ID=\"1000\" PROTOCOLVERSION=\"1.0\"><SIMPLERSP><IMETHODRESPONSE NAME=\"GetClass\">"
-                          "<ERROR CODE=\"6\" DESCRIPTION=\"CIM_ERR_NOT_FOUND: &lt;x&gt;\"/>"
+                          "<ERROR CODE=\"6\" DESCRIPTION=\"CIM_ERR_NOT_FOUND: &lt;x&gt;\">"
+                          "<INSTANCE CLASSNAME=\"CIM_Error\"></INSTANCE><INSTANCE CLASSNAME=\"CIM_Error\"/></ERROR>"
                           "</IMETHODRESPONSE></SIMPLERSP></MESSAGE></CIM>")),
         sample("error in the trailer", "GetClass", trailerErrorAnswer(getClass, 6, "CIM_ERR_NOT_FOUND: é")),
     };

@@ -155,6 +155,8 @@ const LimitCase kLimits[] = {
      "objects of more than 3000 bytes in one answer (maxDecodedBytes)"},
     {"decoded bytes of one object", [](auto& l) { l.xml.maxDecodedBytes = 300; }, "class",
      "objects of more than 300 bytes in one answer (maxDecodedBytes)"},
+    {"decoded bytes of an error", [](auto& l) { l.xml.maxDecodedBytes = 100; }, "error element",
+     "objects of more than 100 bytes in one answer (maxDecodedBytes)"},
     {"key bindings", [](auto& l) { l.xml.maxKeyBindings = 1; }, "instances", "more than 1 key bindings"},
     {"embedded objects", [](auto& l) { l.xml.maxEmbedding = 0; }, "instances", "embedded more than 0 deep"},
 };
