@@ -103,6 +103,9 @@ TEST_F(AgentTest, killedInTheMiddleOfAnEnumeration)
 // Out of descriptors, a server answers on the connections that it has.
 TEST_F(AgentTest, aRequestThatNeedsADescriptorTooManyIsAnswered)
 {
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+    GTEST_SKIP() << "the sanitizer looks at memory through a pipe, for which the server has no descriptors";
+#endif
     start();
     call(fClient, "Probe_Bulk", "ProcessId");
     RawConnection endless(fTree.port());
