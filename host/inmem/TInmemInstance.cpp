@@ -163,12 +163,13 @@ ICIMInstance& TInmemInstance::operator=(const ICIMInstance& other)
     if (this == &other) {
         return *this;
     }
-    fValues.reset(); // before the class, which it relies on
-    fClass = other.GetClass(TCIMContext());
-    fValues = std::make_unique<TInmemValues>(fClass.get());
+    const boost::shared_ptr<ICIMClass> otherClass = other.GetClass(TCIMContext());
+    auto values = std::make_unique<TInmemValues>(otherClass.get());
     for (const auto& value : ValuesOf(other)) {
-        SetPropertyValue(value.first, value.second, TCIMContext());
+        values->Set(value.first, TCIMValue(value.second), otherClass, TCIMContext());
     }
+    fValues = std::move(values); // before the class, which the old values rely on
+    fClass = otherClass;
     return *this;
 }
 

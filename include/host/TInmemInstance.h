@@ -61,6 +61,7 @@ class TInmemInstance : public ICIMInstance, public boost::enable_shared_from_thi
     TCIMValue InvokeMethod(const std::string& name, TCIMContext& parameters, TCIMContext context) override;
     bool operator==(const ICIMInstance& other) const override;
     bool operator<(const ICIMInstance& other) const override;
+    // Throws: what the other's class and properties throw; the instance is then as it was.
     ICIMInstance& operator=(const ICIMInstance& other) override;
 
   private:

@@ -220,6 +220,13 @@ TEST(TInmemInstance, EntersAndLeavesItsClass)
     EXPECT_THAT(served(), ElementsAre());
 }
 
+struct TWithoutNamespace : TInmemInstance
+{
+    using TInmemInstance::TInmemInstance;
+    using TInmemInstance::operator=;
+    boost::shared_ptr<ICIMClass> GetClass(TCIMContext) const override { throw boost::bad_weak_ptr(); }
+};
+
 TEST(TInmemInstance, ComparesAndCopiesByClassAndValues)
 {
     const auto fanClass = FanClass();
@@ -232,6 +239,10 @@ TEST(TInmemInstance, ComparesAndCopiesByClassAndValues)
     EXPECT_TRUE(*static_cast<ICIMInstance*>(one.get()) == *two);
     same->ModifyInstance(two, TCIMContext());
     EXPECT_TRUE(*static_cast<ICIMInstance*>(same.get()) == *two);
+
+    const auto orphan = boost::make_shared<TWithoutNamespace>(fanClass, TCIMContext());
+    EXPECT_THROW(*static_cast<ICIMInstance*>(one.get()) = *orphan, boost::bad_weak_ptr);
+    EXPECT_TRUE(*static_cast<ICIMInstance*>(one.get()) == *two);
 }
 
 TEST(TInmemProperty, OutlivesItsClassWithPlainText)
