@@ -5,6 +5,9 @@
 
 #include <Pegasus/Common/Exception.h>
 
+#include <stdexcept>
+#include <system_error>
+
 namespace Pegasus::mof {
 
 namespace {
@@ -93,6 +96,9 @@ void Delivery::warn(const SourcePlace& place, const std::string& text)
 
 void Delivery::createClass(const CIMClass& newClass, const SourcePlace& place, const OpenFiles& files)
 {
+    if (!fCreator.joinable()) {
+        startCreator();
+    }
     remember(newClass.getClassName());
     std::vector<WaitingClass> created; // ends after the lock
     std::unique_lock<std::mutex> lock(fMutex);
@@ -107,8 +113,14 @@ void Delivery::createClass(const CIMClass& newClass, const SourcePlace& place, c
     if (isFirst) {
         fChanged.notify_all();
     }
-    if (!fCreator.joinable()) {
+}
+
+void Delivery::startCreator()
+{
+    try {
         fCreator = std::thread([this] { createWaiting(); });
+    } catch (const std::system_error& error) {
+        throw std::runtime_error("cannot start a thread: " + error.code().message());
     }
 }
 

@@ -70,6 +70,7 @@ class Delivery
         OpenFiles files;
     };
 
+    void startCreator();
     void createWaiting();
     std::exception_ptr create(const WaitingClass& waiting);
     void remember(const CIMName& className);
