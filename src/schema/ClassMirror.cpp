@@ -106,7 +106,7 @@ TCIMValue TClassMirror::SharedValueOf(const Pegasus::CIMConstQualifier& source,
 {
     TConvertedValue& last = values.Of(source.getName());
     if (!last.IsOf(source.getValue())) {
-        const TCIMValue value = ValueOf(source);
+        TCIMValue value = ValueOf(source);
         last.Keep(source.getValue(), source.getType(), value);
         return value;
     }
