@@ -2,6 +2,7 @@
 #include "pegasus/server/admin/PrivateFile.h"
 
 #include "pegasus/base/Descriptor.h"
+#include "pegasus/base/Users.h"
 
 #include <cerrno>
 #include <cstdio>
@@ -56,8 +57,8 @@ std::string readOwnFile(const std::string& path, std::size_t maxBytes)
 {
     const base::Descriptor file(::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
     struct stat info = {};
-    if (!file || ::fstat(file.get(), &info) != 0 || !S_ISREG(info.st_mode) ||
-        (info.st_uid != 0 && info.st_uid != ::geteuid()) || (info.st_mode & S_IWOTH) != 0)
+    if (!file || ::fstat(file.get(), &info) != 0 || !S_ISREG(info.st_mode) || !base::isTrustedUser(info.st_uid) ||
+        (info.st_mode & S_IWOTH) != 0)
     {
         return {};
     }
